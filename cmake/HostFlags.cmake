@@ -1,0 +1,46 @@
+# How everything that runs on the host is compiled: board, tools, tests.
+add_library(pmx_host INTERFACE)
+target_compile_features(pmx_host INTERFACE cxx_std_20)
+target_compile_options(pmx_host INTERFACE
+    -Werror -Wall -Wextra -Wpedantic -Wshadow -Wundef -Wformat=2 -Wcast-qual -Wpointer-arith -Wvla
+    -Wnon-virtual-dtor -Woverloaded-virtual -Wextra-semi -fno-pie)
+# The layer is position-dependent code; record_view finds its private objects by their addresses in the symbol table.
+target_link_options(pmx_host INTERFACE -no-pie)
+target_compile_definitions(pmx_host INTERFACE PMX_SOURCE_DIR="${PROJECT_SOURCE_DIR}")
+target_include_directories(pmx_host INTERFACE ${PROJECT_SOURCE_DIR})
+target_link_libraries(pmx_host INTERFACE pmx_headers)
+
+set(PMX_SANITIZE_FLAGS "")
+if(PMX_SANITIZE)
+    set(PMX_SANITIZE_FLAGS -fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)
+    target_compile_options(pmx_host INTERFACE ${PMX_SANITIZE_FLAGS})
+    target_link_options(pmx_host INTERFACE ${PMX_SANITIZE_FLAGS})
+endif()
+
+# A static library of the C++ sources of the given directories. While there are none, the name still stands for
+# its include directories, so that the rest can be built.
+function(pmx_host_library name)
+    set(globs ${ARGN})
+    list(TRANSFORM globs APPEND /*.cpp)
+    file(GLOB sources CONFIGURE_DEPENDS ${globs})
+    list(FILTER sources EXCLUDE REGEX "/main\\.cpp$")
+    if(sources)
+        add_library(${name} STATIC ${sources})
+        target_include_directories(${name} PUBLIC ${ARGN})
+        target_link_libraries(${name} PUBLIC pmx_host)
+    else()
+        message(STATUS "${name}: no sources")
+        add_library(${name} INTERFACE)
+        target_link_libraries(${name} INTERFACE pmx_host)
+    endif()
+endfunction()
+
+# pmx_host_link(<library> <dependency>...): as target_link_libraries, for a library of pmx_host_library.
+function(pmx_host_link name)
+    get_target_property(type ${name} TYPE)
+    if(type STREQUAL INTERFACE_LIBRARY)
+        target_link_libraries(${name} INTERFACE ${ARGN})
+    else()
+        target_link_libraries(${name} PUBLIC ${ARGN})
+    endif()
+endfunction()

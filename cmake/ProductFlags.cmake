@@ -1,0 +1,29 @@
+# How the layer is compiled, in every preset alike: what ships is what was tested. Nothing of the build type enters.
+
+# The language that the product allows itself, on every target.
+set(PMX_PRODUCT_LANGUAGE
+    -std=c++20 -ffreestanding -fno-exceptions -fno-rtti -fno-threadsafe-statics -fno-use-cxa-atexit
+    -fvisibility=hidden -fno-pic -fno-pie)
+
+# What keeps the objects free of symbols and sections that a stack does not provide for.
+set(PMX_PRODUCT_CODE
+    -fno-stack-protector -fno-asynchronous-unwind-tables -fno-unwind-tables -U_FORTIFY_SOURCE
+    -ffile-prefix-map=${PROJECT_SOURCE_DIR}/= -O2 -g)
+
+set(PMX_PRODUCT_FLAGS ${PMX_PRODUCT_LANGUAGE} ${PMX_PRODUCT_CODE} -fcf-protection=none)
+
+set(PMX_PRODUCT_WARNINGS_GNU
+    -Werror -Wall -Wextra -Wpedantic
+    -Wconversion -Wsign-conversion -Warith-conversion -Wshadow -Wundef -Wformat=2 -Wformat-signedness
+    -Wcast-qual -Wcast-align=strict -Wpointer-arith -Wmissing-declarations -Wredundant-decls -Wvla -Walloca
+    -Wduplicated-cond -Wduplicated-branches -Wlogical-op -Wdouble-promotion -Wnull-dereference -Wdate-time
+    -Wunused-macros -Wunused-const-variable=2 -Wextra-semi -Wcomma-subscript -Wzero-as-null-pointer-constant
+    -Wstack-usage=1024)
+
+# Everything that clang knows, less what contradicts the house: C-style casts, the stack's names with a leading
+# underscore, records with natural padding, and being C++20.
+set(PMX_PRODUCT_WARNINGS_CLANG
+    -Werror -Weverything
+    -Wno-c++98-compat -Wno-c++98-compat-pedantic -Wno-c++20-compat -Wno-old-style-cast -Wno-padded
+    -Wno-reserved-identifier -Wno-reserved-macro-identifier
+    -fcomment-block-commands=context)   # the contracts' own command

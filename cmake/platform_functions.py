@@ -1,0 +1,87 @@
+#!/usr/bin/env python3
+"""Reads the functions that the headers declare, and writes the table of platform functions that the board is built
+with.
+
+usage: platform_functions.py OUTPUT     the table behind board::platform_functions()
+
+As a module: functions(path) yields what one header declares.
+"""
+
+import dataclasses
+import pathlib
+import re
+import sys
+
+ROOT = pathlib.Path(__file__).resolve().parent.parent
+# The headers behind which the rest of the stack stands, and the one that the layer itself offers.
+PLATFORM_HEADERS = ["src/system/inc/u_os.h"] + [f"src/driver/private_inc/{name}.h" for name in (
+    "drv_if", "pmx_hal", "drv_tve", "drv_vdp", "drv_osd", "drv_av_d")]
+LAYER_HEADER = "src/driver/private_inc/drv_pmx.h"
+
+DECLARATION = re.compile(
+    r"""(?:/\*\*(?P<contract>(?:(?!\*/).)*)\*/\s*)?              # right before it
+        ^(?:PMX_API\s+)?
+        (?P<result>(?:const\s+)?\w+(?:\s*\*+)?)\s*\b(?P<name>\w+)
+        \((?P<parameters>[^()]*)\)
+        (?:\s*DRV_PRINTF_FORMAT\(\d+,\s*\d+\))?\s*;""",
+    re.DOTALL | re.MULTILINE | re.VERBOSE)
+LOOKS_LIKE_ONE = {"typedef", "return", "DRV_STATIC_ASSERT", "static_assert", "DRV_ENUM"}
+
+
+@dataclasses.dataclass(frozen=True)
+class Function:
+    name: str
+    has_result: bool
+    parameters: tuple  # names
+    contract: str      # the comment directly above the declaration, or nothing
+    line: int
+
+
+def parameter_names(text):
+    """The names of all parameters but the variable ones."""
+    for parameter in text.split(","):
+        match = re.search(r"(\w+)\s*(?:\[\w*\])?\s*$", parameter)
+        if match and parameter.strip() != "void":
+            yield match.group(1)
+
+
+def functions(path):
+    """Every function that a header declares, in its order."""
+    text = pathlib.Path(path).read_text(encoding="utf-8")
+    for match in DECLARATION.finditer(text):
+        if not {match["result"], match["name"]} & LOOKS_LIKE_ONE:
+            yield Function(match["name"], match["result"] != "void", tuple(parameter_names(match["parameters"])),
+                           (match["contract"] or "").strip(), text.count("\n", 0, match.start("name")) + 1)
+
+
+def table(listed):
+    rows = "\n".join(f'    {{ "{function.name}", {str(function.has_result).lower()} }},' for function in listed)
+    return f"""// Written from the platform headers when the board is built.
+#include "board/trace.h"
+
+namespace board
+{{
+
+std::span<const PlatformFunction> platform_functions()
+{{
+    static constexpr PlatformFunction FUNCTIONS[] = {{
+{rows}
+    }};
+    return FUNCTIONS;
+}}
+
+}} // namespace board
+"""
+
+
+def main():
+    listed = [function for header in PLATFORM_HEADERS for function in functions(ROOT / header)]
+    names = [function.name for function in listed]
+    twice = sorted({name for name in names if names.count(name) > 1})
+    if twice or not listed:
+        sys.exit("declared twice: " + ", ".join(twice) if twice else "the headers declare no function")
+    pathlib.Path(sys.argv[1]).write_text(table(listed), encoding="utf-8")
+
+
+if __name__ == "__main__":
+    main()

@@ -1,0 +1,135 @@
+/** @file
+ * Private to the mixer layer: its one record, its tables and the helpers that its files share. Nothing outside this
+ * folder includes it but the tests of the tables and the record view. */
+#ifndef PMX_IF_H
+#define PMX_IF_H
+
+#include "drv_if_pmx.h"
+#include "drv_if_vdp.h"
+#include "x_typedef.h"
+
+#define PMX_PORT_NUM 8  /* input ports: 0 and 1 video planes, 2 to 7 OSD planes */
+#define PMX_PLANE_NUM 8 /* mixer planes */
+
+/* State of one input port. */
+typedef struct {
+    UINT16 u2CompType; /* upstream component connected to the port */
+    UINT16 u2CompId;
+    BOOL fgConnected;
+    BOOL fgEnabled; /* the source has reported itself enabled */
+    DRV_GFX_COLOR_MODE_T eInputColorMode;
+    DRV_PMX_COLOR_SPACE_T eSrcColorSpace;
+    UINT32 u4SrcWidth;  /* pixels */
+    UINT32 u4SrcHeight; /* lines */
+    UCHAR ucLumaKey;    /* given with a video source */
+} PMX_PORT_INFO_T;
+
+/* All that one mixer is set to and knows. The order of the fields is an interface: memory dumps are read by it. */
+typedef struct {
+    UCHAR ucEnable;      /* master enable, as given */
+    UCHAR ucMode;        /* PMX_RESOLUTION_MODE_T */
+    UCHAR ucTvType;      /* PMX_TV_TYPE_NTSC or PMX_TV_TYPE_PAL, others as given */
+    UCHAR ucVfreq;       /* Hz */
+    UCHAR ucDigitalOut;  /* parallel digital port on */
+    UCHAR u4Phase;       /* digital clock phase: 8 bits in spite of its prefix */
+    UCHAR ucProprietaryMode;
+    UCHAR ucDigitalBit;  /* bus width in bits */
+    UCHAR ucDigitalRgb;  /* PLA_MXR_DIGITAL_OUTPUT_FMT_T */
+    UCHAR ucCAVBlackLv;
+    UCHAR ucCVBSBlackLv;
+    UCHAR ucGamma;       /* 0 off, 1 to 4 curve, others as given */
+    UCHAR ucBrightness;  /* analogue adjustments, 128 = neutral */
+    UCHAR ucContrast;
+    UCHAR ucHue;
+    UCHAR ucSaturation;
+    UCHAR ucCBEnable;    /* colour bar, as given */
+    UCHAR ucMuteEnable;  /* output mute, as given */
+    UINT32 u4AspectRatio; /* ASP_ code */
+    UINT32 u4BgColor;     /* 0x00YYUUVV */
+    UINT32 u4Capability;  /* bits 0 to 16 groups of modes, 20 to 25, 27 and 30 features */
+    UCHAR aucPlaneOrder[PMX_PLANE_NUM]; /* plane id at each position of the stack */
+    UCHAR ucSharpness;
+    IVdp* piVdp1; /* never filled: a video plane's table is fetched anew for every call */
+    void* pvTag1;
+    IVdp* piVdp2;
+    void* pvTag2;
+    PMX_PORT_INFO_T arPortInfo[PMX_PORT_NUM];
+    DRV_PMX_COLOR_SPACE_T eMasterColorSpace; /* in which the planes are mixed */
+    PMX_RESOLUTION_T arOutputConf[PMX_OUTPUT_NUM];
+    BOOL fgAspNext; /* u4AspNext waits for the next mode change */
+    UINT32 u4AspNext;
+    BOOL fgSetModeCalled; /* no mode setting since reset: 0 */
+    UCHAR ucCavYcInputDelay;
+    UCHAR ucCavYcOutputDelay;
+    UCHAR ucCvbsYcInputDelay;
+    UCHAR ucCvbsYcOutputDelay;
+    UCHAR ucCavSyncLvl;
+    UCHAR ucCvbsSyncLvl;
+    UCHAR ucCvbsBurstLvl;
+    UCHAR ucCavYLvl;
+    UCHAR ucCvbsYLvl;
+    BOOL fgDigestEnable; /* the digest view is shown, with u4DigestAsp */
+    UINT32 u4DigestAsp;
+    DRV_EXT_CHIP_USAGE_T rDrvExtScl; /* as PMX_SetModeEx last got it */
+    UINT32 u4PlaneOrder;             /* arbitrary plane order: 4 bits a plane, plane 0 lowest */
+    BOOL fgForceMode;
+    UINT8 fgOSD5; /* fifth-OSD mode as PMX_SetModeEx last got it */
+} PMX_CONF_T;
+
+/* Capability bit of a mode's row, where it is not a bit number. */
+#define PMX_CAP_ALWAYS 0xFE /* admitted whatever the capability word says */
+#define PMX_CAP_NEVER 0xFF
+
+/* Colour group of a mode: which standard its outputs carry. */
+#define PMX_COLOUR_NONE 0 /* converters are left alone */
+#define PMX_COLOUR_SD 1   /* BT.601 */
+#define PMX_COLOUR_HD 2   /* BT.709 */
+
+/* Flags of a mode. */
+#define PMX_MODE_PLL_60 0x01      /* video PLL runs the 60 Hz family's word */
+#define PMX_MODE_BOOT_60 0x02     /* may come from the boot loader, 60 Hz TV type */
+#define PMX_MODE_BOOT_50 0x04     /* may come from the boot loader, 50 Hz TV type */
+#define PMX_MODE_PROGRESSIVE 0x08 /* reported as progressive */
+#define PMX_MODE_HD_OUT 0x10      /* reported as an HD output */
+#define PMX_MODE_TVE_HD 0x20      /* an HD format for the TV encoders and for plane delays */
+
+/* Everything that is decided from the resolution mode. */
+typedef struct {
+    UINT8 u1Mode; /* PMX_RESOLUTION_MODE_T: the row's own number */
+    UINT16 u2Width;
+    UINT16 u2Height;
+    UINT8 u1Flags;   /* PMX_MODE_… */
+    UINT8 u1CapBit;  /* 0 to 16, PMX_CAP_ALWAYS or PMX_CAP_NEVER */
+    UINT8 u1Colour;  /* PMX_COLOUR_… */
+    UINT8 u1CBWidth; /* colour-bar width in the hardware's unit */
+} PMX_MODE_ROW_T;
+
+#define PMX_MODE_ROW_NUM (RES_3D_1080P24HZ_TB + 1)
+#define PMX_GAMMA_CURVE_NUM 4
+#define PMX_GAMMA_POINT_NUM 9
+
+extern PMX_CONF_T _arPmxConf[1];           /* only mixer 0 exists */
+extern const PMX_CONF_T _arPmxConfDefault; /* what every reset loads */
+extern INT32 bComp0OnTop;                  /* first video plane above the second, as given; outlives a reset */
+extern const UCHAR aucGammaCurve[PMX_GAMMA_CURVE_NUM][PMX_GAMMA_POINT_NUM];
+extern const PMX_MODE_ROW_T _arPmxModeRow[PMX_MODE_ROW_NUM + 1]; /* the last row: every number without one */
+
+/* The one record, whatever mixer id an operation was given. */
+static inline PMX_CONF_T* prPmxConf(void)
+{
+    return &_arPmxConf[0];
+}
+
+/* The row of a mode number; never leaves the table. */
+static inline const PMX_MODE_ROW_T* prPmxModeRow(UINT32 u4Mode)
+{
+    return &_arPmxModeRow[u4Mode < PMX_MODE_ROW_NUM ? u4Mode : PMX_MODE_ROW_NUM];
+}
+
+/* The mixer id that an IPMX tag carries. */
+static inline UCHAR ucPmxIdOfTag(void* pvTag)
+{
+    return (UCHAR)(size_t)pvTag;
+}
+
+#endif

@@ -1,0 +1,59 @@
+/** @file
+ *  Interface manager: where a driver publishes its table of functions and others fetch it.
+ *  An interface is named by its component's type and id and by an interface id. Negative results are failures. */
+#ifndef DRV_IF_H
+#define DRV_IF_H
+
+#include "x_typedef.h"
+
+#ifdef __cplusplus
+extern "C" {
+#endif
+
+#define IID_IVdp 6 /**< a video plane's IVdp table */
+#define IID_IPMX 9 /**< the mixer's IPMX table */
+
+/** Publish an interface.
+ *  @param u2CompType  component type
+ *  @param u2CompId    component id
+ *  @param u4IfId      interface id
+ *  @param pvIf        the table; stays where it is until it is unregistered
+ *  @param pvTag       handed to every function of the table as its first argument
+ *  @return 0 or above; negative on a failure
+ *  @context a thread that may sleep */
+INT32 i4ImRegisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, const void* pvIf, void* pvTag);
+
+/** Withdraw an interface.
+ *  @param u2CompType  component type
+ *  @param u2CompId    component id
+ *  @param u4IfId      interface id
+ *  @return 0 or above; negative on a failure, for instance when it is not registered
+ *  @context a thread that may sleep */
+INT32 i4ImUnregisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId);
+
+/** Fetch an interface and hold it until it is released.
+ *  The stack guarantees that a successful query yields a complete table, no function of it null; a failed one
+ *  yields nothing that may be called.
+ *  @param u2CompType  component type
+ *  @param u2CompId    component id
+ *  @param u4IfId      interface id
+ *  @param ppvIf       receives the table
+ *  @param ppvTag      receives its tag
+ *  @return 0 or above; negative on a failure
+ *  @context a thread that may sleep; the mixer holds MutexPMX */
+INT32 i4ImQueryInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void** ppvIf, void** ppvTag);
+
+/** Give a fetched interface back, once for each successful query.
+ *  @param u2CompType  component type
+ *  @param u2CompId    component id
+ *  @param u4IfId      interface id
+ *  @param pvTag       the tag that the query yielded
+ *  @return 0 or above; negative on a failure
+ *  @context a thread that may sleep; the mixer holds MutexPMX */
+INT32 i4ImReleaseInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void* pvTag);
+
+#ifdef __cplusplus
+}
+#endif
+
+#endif

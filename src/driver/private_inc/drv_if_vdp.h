@@ -1,0 +1,37 @@
+/** @file
+ *  A video plane's interface table, fetched from the interface manager under IID_IVdp. */
+#ifndef DRV_IF_VDP_H
+#define DRV_IF_VDP_H
+
+#include "drv_if_pmx.h"
+#include "x_typedef.h"
+
+#ifdef __cplusplus
+extern "C" {
+#endif
+
+/** What a video plane offers. Each function takes first the tag that came with the table. The mixer calls
+ *  pu4SetColorMode alone and ignores its result.
+ *
+ * pu4SetColorMode tells the plane the mixer's colour space. It is called with MutexPMX held: a plane that from inside
+ * it called i4Pmx_Connect or i4Pmx_Disconnect, or made the mixer's colour space change once more, would wait for
+ * itself. */
+typedef struct {
+    UINT32 (*pu4SetPlaybackMode)(void* pvTag);
+    UINT32 (*pu4AssignSyncCtrl)(void* pvTag);
+    UINT32 (*pu4StcIsValid)(void* pvTag);
+    UINT32 (*pu4SetFrameAccurateStartPts)(void* pvTag);
+    UINT32 (*pu4SetFrameAccurateEndPts)(void* pvTag);
+    UINT32 (*pu4Flush)(void* pvTag);
+    UINT32 (*pu4AssignVdecCallback)(void* pvTag);
+    UINT32 (*pu4DesiredResolution)(void* pvTag);
+    UINT32 (*pu4SetColorMode)(void* pvTag, DRV_PMX_COLOR_SPACE_T eColorSpace);
+    UINT32 (*pu4GetCurrPictureInfo)(void* pvTag);
+    UINT32 (*pu4PictureSent)(void* pvTag);
+} IVdp;
+
+#ifdef __cplusplus
+}
+#endif
+
+#endif

@@ -1,0 +1,85 @@
+#!/usr/bin/env python3
+"""Compiles every header of the given directories alone, twice in one file, and all together in both orders: as C and as
+C++, with gcc and clang, hosted and freestanding, for the host, for the 32-bit target and as a kernel's C files see it.
+"""
+
+import argparse
+import itertools
+import pathlib
+import subprocess
+import sys
+import tempfile
+from concurrent.futures import ThreadPoolExecutor
+
+WARNINGS = ["-Wall", "-Wextra", "-Werror", "-pedantic", "-Wshadow", "-Wundef", "-Wredundant-decls"]
+C_WARNINGS = ["-Wstrict-prototypes", "-Wmissing-prototypes", "-fno-short-enums"]
+ARM = ["--target=arm-none-eabi", "-mthumb", "-mcpu=cortex-a9", "-mfloat-abi=soft", "-ffreestanding"]
+
+# What a kernel's C files find in place of the compiler's own headers.
+KERNEL_HEADERS = {
+    "types.h": "typedef __SIZE_TYPE__ size_t;\n#define NULL ((void*)0)\n",
+    "stdarg.h": "typedef __builtin_va_list va_list;\n",
+}
+
+
+def variants(compilers, kernel_directory):
+    """The command for every way in which a header is compiled."""
+    for compiler, (standard, freestanding) in itertools.product(
+            (compilers.gcc, compilers.clang), itertools.product(("c11", "c17"), ([], ["-ffreestanding"]))):
+        yield [compiler, "-x", "c", f"-std={standard}", *C_WARNINGS, *freestanding]
+    for compiler, (standard, freestanding) in itertools.product(
+            (compilers.gxx, compilers.clangxx), itertools.product(("c++17", "c++20"), ([], ["-ffreestanding"]))):
+        yield [compiler, "-x", "c++", f"-std={standard}", *freestanding]
+    yield [compilers.clang, "-x", "c", "-std=c11", *C_WARNINGS, *ARM]
+    yield [compilers.clangxx, "-x", "c++", "-std=c++20", "-fshort-enums", *ARM]
+    for compiler in (compilers.gcc, compilers.clang):
+        yield [compiler, "-x", "c", "-std=c11", *C_WARNINGS, "-D__KERNEL__", "-nostdinc", "-I", kernel_directory]
+
+
+def texts(headers):
+    """(what it is called, text) for every file that is compiled."""
+    for header in headers:
+        include = f'#include "{header.name}"\n'
+        yield header.name, include + "extern int iNotEmpty;\n"
+        yield f"{header.name} twice", include * 2 + "extern int iNotEmpty;\n"
+    for order, together in (("all together", headers), ("all together, backwards", headers[::-1])):
+        yield order, "".join(f'#include "{header.name}"\n' for header in together)
+
+
+def compile_text(command, text, includes):
+    result = subprocess.run([*command, *WARNINGS, *includes, "-fsyntax-only", "-"], input=text, text=True,
+                            capture_output=True, check=False)
+    return result.returncode, result.stderr
+
+
+def main():
+    parser = argparse.ArgumentParser(description="Compile every header alone.")
+    for option in ("--gcc", "--gxx", "--clang", "--clangxx"):
+        parser.add_argument(option, required=True)
+    parser.add_argument("directories", nargs="+", type=pathlib.Path)
+    arguments = parser.parse_args()
+
+    headers = [header for directory in arguments.directories for header in sorted(directory.glob("*.h"))]
+    if not headers:
+        sys.exit("no headers found in " + " ".join(map(str, arguments.directories)))
+    includes = [f"-I{directory}" for directory in arguments.directories]
+
+    with tempfile.TemporaryDirectory() as scratch:
+        kernel = pathlib.Path(scratch, "linux")
+        kernel.mkdir()
+        for name, text in KERNEL_HEADERS.items():
+            (kernel / name).write_text(text)
+
+        jobs = list(itertools.product(variants(arguments, scratch), texts(headers)))
+        with ThreadPoolExecutor(max_workers=2) as pool:
+            results = pool.map(lambda job: compile_text(job[0], job[1][1], includes), jobs)
+            failures = [(job, message) for job, (code, message) in zip(jobs, results) if code != 0]
+
+    for (command, (name, _)), message in failures:
+        print(f"{name}: {' '.join(command)}\n{message}")
+    print(f"{len(headers)} headers, {len(jobs)} compilations, {len(failures)} failures")
+    return 1 if failures else 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())

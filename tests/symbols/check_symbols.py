@@ -1,0 +1,137 @@
+#!/usr/bin/env python3
+"""Holds an object file that ships against two lists: the global symbols it defines, and those it needs.
+
+Refused as well is whatever a plain C driver stack, a kernel's module loader for instance, does not provide for: weak
+symbols, section groups, code that runs before the first call, thread-local data, and relocations that ask for a global
+offset table. The object is read with readelf.
+"""
+
+import argparse
+import re
+import subprocess
+import sys
+
+# Relocations that a loader resolves by address alone. R_X86_64_PLT32 is what assemblers write for every call, also in
+# position-dependent code, where no procedure linkage table exists.
+PLAIN_RELOCATIONS = {
+    "R_X86_64_64", "R_X86_64_32", "R_X86_64_32S", "R_X86_64_PC32", "R_X86_64_PC64", "R_X86_64_PLT32",
+}
+
+RUN_BEFORE_MAIN = re.compile(r"^\.(preinit_array|init_array|fini_array|ctors|dtors|init|fini)(\.|$)")
+
+
+class List:
+    """One of the two lists: names that stand plain, are marked "- " (still to come) or "? " (may be there or not)."""
+
+    def __init__(self, path):
+        self.path = path
+        self.plain, self.to_come, self.optional = set(), set(), set()
+        for number, line in enumerate(open(path, encoding="utf-8"), start=1):
+            line = line.strip()
+            if not line or line.startswith("#"):
+                continue
+            match = re.fullmatch(r"([-?] )?(\w+)", line)
+            if not match:
+                sys.exit(f"{path}:{number}: neither a name nor a comment: {line}")
+            mark, name = match.groups()
+            if name in self.plain | self.to_come | self.optional:
+                sys.exit(f"{path}:{number}: listed twice: {name}")
+            {None: self.plain, "- ": self.to_come, "? ": self.optional}[mark].add(name)
+
+    def compare(self, names, is_there, is_missing):
+        """The complaints about the names of an object; the two texts say what "there" and "missing" mean."""
+        for name in sorted(names - self.plain - self.to_come - self.optional):
+            yield f"{name}: {is_there}, but not listed in {self.path}"
+        for name in sorted(names & self.to_come):
+            yield f"{name}: {is_there}, but marked as still to come in {self.path}: take the mark away"
+        for name in sorted(self.plain - names):
+            yield f"{name}: {is_missing}, but listed in {self.path}"
+
+
+def readelf(option, path):
+    result = subprocess.run(["readelf", "--wide", option, path], capture_output=True, text=True, check=False,
+                            env={"LC_ALL": "C", "PATH": "/usr/bin:/bin"})
+    if result.returncode != 0:
+        sys.exit(f"{path}: cannot be read: {result.stderr.strip()}")
+    return result.stdout.splitlines()
+
+
+def symbols(path):
+    """(name, type, binding, section index) of every symbol."""
+    for line in readelf("--symbols", path):
+        fields = line.split()
+        if len(fields) >= 8 and re.fullmatch(r"\d+:", fields[0]):
+            # number value size type binding visibility index name
+            yield fields[7], fields[3], fields[4], fields[6]
+
+
+def sections(path):
+    """(name, type, flags) of every section."""
+    for line in readelf("--section-headers", path):
+        match = re.match(r"\s*\[\s*\d+\]\s(.*)", line)
+        fields = match.group(1).split() if match else []
+        if len(fields) >= 6 and not fields[0].isupper():
+            flags = fields[6] if len(fields) == 10 else ""
+            yield fields[0], fields[1], flags
+
+
+def relocations(path):
+    """(section, type, symbol) of every relocation."""
+    section = ""
+    for line in readelf("--relocs", path):
+        match = re.match(r"Relocation section '\.rela?(.*)'", line)
+        if match:
+            section = match.group(1)
+            continue
+        fields = line.split()
+        if len(fields) >= 3 and fields[2].startswith("R_"):
+            yield section, fields[2], fields[4] if len(fields) > 4 else ""
+
+
+def complaints(path, defined_list, needed_list):
+    defined, needed = set(), set()
+    for name, kind, binding, index in symbols(path):
+        if kind == "TLS":
+            yield f"{name}: thread-local symbol"
+        if binding in ("WEAK", "UNIQUE"):
+            yield f"{name}: weak symbol"
+        elif index == "COM":
+            yield f"{name}: common symbol"
+        if binding != "LOCAL" and name:
+            (needed if index == "UND" else defined).add(name)
+
+    yield from defined_list.compare(defined, "defined", "not defined")
+    yield from needed_list.compare(needed, "needed", "never called")
+
+    for name, kind, flags in sections(path):
+        if kind == "GROUP":
+            yield f"{name}: section group"
+        if "T" in flags or name.startswith((".tdata", ".tbss")):
+            yield f"{name}: thread-local section"
+        if RUN_BEFORE_MAIN.match(name) or kind.endswith("_ARRAY"):
+            yield f"{name}: code that runs before the first call"
+
+    for section, kind, symbol in relocations(path):
+        if kind not in PLAIN_RELOCATIONS:
+            yield f"{section}: relocation {kind} to {symbol}"
+
+
+def main():
+    parser = argparse.ArgumentParser(description="Hold an object file against the lists of its symbols.")
+    parser.add_argument("--defined", required=True, help="list of the global symbols that it defines")
+    parser.add_argument("--needed", required=True, help="list of the symbols that it needs")
+    parser.add_argument("object")
+    arguments = parser.parse_args()
+
+    defined_list, needed_list = List(arguments.defined), List(arguments.needed)
+    found = list(complaints(arguments.object, defined_list, needed_list))
+    for complaint in found:
+        print(f"{arguments.object}: {complaint}")
+    if not found:
+        print(f"{arguments.object}: defines {len(defined_list.plain)} symbols, {len(defined_list.to_come)} still to "
+              f"come; needs {len(needed_list.plain)} platform functions, {len(needed_list.to_come)} not called yet")
+    return 1 if found else 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())

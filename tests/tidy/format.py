@@ -1,0 +1,59 @@
+#!/usr/bin/env python3
+"""Names the C and C++ files that are not in the house style, with what would change; with --fix, rewrites them.
+
+clang-format does not know that DRV_ENUM(NAME) { … } is an enumeration. It is shown one.
+
+usage: format.py [--fix]
+"""
+
+import difflib
+import os
+import pathlib
+import re
+import subprocess
+import sys
+from concurrent.futures import ThreadPoolExecutor
+
+from tidy import CODE, files
+
+ROOT = pathlib.Path(__file__).resolve().parents[2]
+MOST_LINES = 20  # of one file's differences
+
+
+def with_enumerations(text):
+    text = re.sub(r"\bDRV_ENUM\((\w+)\)(?=\s*\{)", r"enum DRV_ENUM_\1_", text)
+    return re.sub(r"\bDRV_ENUM_UNNAMED(?=\s*\{)", "enum DRV_ENUM__", text)
+
+
+def with_macros(text):
+    text = re.sub(r"\benum DRV_ENUM__(?=\s*\{)", "DRV_ENUM_UNNAMED", text)
+    return re.sub(r"\benum DRV_ENUM_(\w+)_(?=\s*\{)", r"DRV_ENUM(\1)", text)
+
+
+def formatted(path, text):
+    result = subprocess.run(["clang-format", "--style=file", f"--assume-filename={path}"], check=True,
+                            input=with_enumerations(text), capture_output=True, text=True, encoding="utf-8")
+    return with_macros(result.stdout)
+
+
+def main():
+    paths = [path for path in files(ROOT) if path.suffix in CODE]
+    with ThreadPoolExecutor(max_workers=os.cpu_count()) as pool:
+        before = [path.read_text(encoding="utf-8") for path in paths]
+        after = list(pool.map(formatted, paths, before))
+
+    differing = [(path, old, new) for path, old, new in zip(paths, before, after) if old != new]
+    for path, old, new in differing:
+        name = path.relative_to(ROOT).as_posix()
+        if "--fix" in sys.argv[1:]:
+            path.write_text(new, encoding="utf-8")
+            print(f"{name}: rewritten")
+            continue
+        lines = list(difflib.unified_diff(old.splitlines(), new.splitlines(), name, "formatted", "", "", 0, ""))
+        print("\n".join(lines[:MOST_LINES] + ["…"] * (len(lines) > MOST_LINES)))
+    print(f"format: {len(paths)} files, {len(differing)} not in the house style")
+    return 1 if differing and "--fix" not in sys.argv[1:] else 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())

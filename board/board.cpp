@@ -1,0 +1,79 @@
+#include "board/board.h"
+
+#include "board/devices.h"
+#include "board/layer_state.h"
+
+namespace board
+{
+namespace
+{
+
+struct Device
+{
+    std::string_view name;
+    void (*power_on)(const Description&);
+    Value (*state)();
+};
+
+constexpr Device devices[] = {
+    { "os", os::power_on, os::state },
+    { "console", console::power_on, console::state },
+    { "flash", flash::power_on, flash::state },
+    { "registers", registers::power_on, registers::state },
+    { "interface_manager", interface_manager::power_on, interface_manager::state },
+    { "power", power::power_on, power::state },
+    { "mixer", mixer::power_on, mixer::state },
+    { "tv_encoder", tv_encoder::power_on, tv_encoder::state },
+    { "video_planes", video_planes::power_on, video_planes::state },
+    { "osd_planes", osd_planes::power_on, osd_planes::state },
+    { "hdmi_av", hdmi_av::power_on, hdmi_av::state },
+    { "display_control", display_control::power_on, display_control::state },
+};
+
+struct Board
+{
+    Description description;
+    unsigned misuses = 0;
+};
+
+Board board_state;
+
+} // namespace
+
+void power_on(const Description& wanted)
+{
+    const Description given = wanted; // it may be the one in force
+    faults::power_on(given);
+    layer_state::restore();
+    board_state = { given, 0 };
+    for (const Device& device : devices)
+        device.power_on(given);
+    trace::power_on();
+}
+
+const Description& description()
+{
+    return board_state.description;
+}
+
+Value state()
+{
+    Value value;
+    for (const Device& device : devices)
+        value.add(std::string(device.name), device.state());
+    return value;
+}
+
+unsigned misuses()
+{
+    return board_state.misuses;
+}
+
+void report_misuse(std::string text)
+{
+    ++board_state.misuses;
+    console::print("BOARD misuse: " + text + "\n");
+    trace::notice("misuse", std::move(text));
+}
+
+} // namespace board

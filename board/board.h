@@ -1,0 +1,86 @@
+/** @file
+ *  The virtual board: what tools and tests may do to it. Single-threaded; one board in a process. */
+#pragma once
+
+#include <array>
+#include <chrono>
+#include <cstdint>
+#include <filesystem>
+#include <functional>
+#include <map>
+#include <stdexcept>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "board/trace.h"
+#include "board/value.h"
+
+namespace board
+{
+
+/** What a board has; read from a board file or filled by a test. */
+struct Description
+{
+    std::string name = "bare";
+    int console_level = 1;                              ///< PMX_IsLog prints lines of this level and below
+    std::map<std::string, std::filesystem::path> flash; ///< partition name to image file
+    bool sink_plugged = true;                           ///< an HDMI sink is plugged in at power-on
+    std::array<std::int32_t, 8> plane_delay{};          ///< delay that the hardware reports for each mixer plane
+    std::vector<Fault> faults;                          ///< in force from power-on
+};
+
+/** A board file that cannot be used: file, line where known, what is wrong. */
+class DescriptionError : public std::runtime_error
+{
+public:
+    using std::runtime_error::runtime_error;
+};
+
+/** Read a board description: a .toml file, or a directory that holds board.toml, or the name of one under the boards
+ *  directory. Relative paths in it are relative to the file. Unknown keys are errors. Throws DescriptionError. */
+Description load_description(const std::filesystem::path& board);
+
+/** Where named boards are looked up; the project's boards/ unless set. */
+void set_boards_directory(std::filesystem::path directory);
+
+/** Make the board as good as new, any number of times in a process: devices, clock, trace, faults, and the layer's own
+ *  state at load. */
+void power_on(const Description& description);
+
+/** The description in force. */
+const Description& description();
+
+/** Replace or add a flash partition. An image that does not exist is an error (std::invalid_argument); an empty path
+ *  removes the partition. */
+void set_flash(std::string partition, std::filesystem::path image);
+
+/** Console level from now on. */
+void set_console_level(int level);
+int console_level();
+
+/** Where console text goes, as it is printed; the default discards it. Everything printed is kept in console_text()
+ *  too. */
+void set_console(std::function<void(std::string_view text)> sink);
+std::string console_text();
+
+/** Virtual time since power-on. */
+std::chrono::microseconds now();
+
+/** Let virtual time pass: timers that run out call their expiry functions at their moment. */
+void advance(std::chrono::microseconds duration);
+
+/** Run the suspend or resume operation of everything registered, in order of registration (resume: reversed); the first
+ *  non-zero result. */
+int suspend();
+int resume();
+
+/** Everything that the devices hold, by device: os, console, flash, registers, interface_manager, power, mixer,
+ *  tv_encoder, video_planes, osd_planes, hdmi_av, display_control. Stable keys; numbers with their names. */
+Value state();
+
+/** Number of reports since power-on. */
+unsigned asserts();  ///< through Assert
+unsigned misuses();  ///< of the platform, found by the board (a second lock by the holder, unlock without lock, …)
+
+} // namespace board

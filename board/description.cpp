@@ -1,0 +1,253 @@
+// The one place of the board that knows the TOML library: it compiles slowly.
+#include <limits>
+#include <toml++/toml.h>
+
+#include "board/devices.h"
+#include "board/names.h"
+
+namespace board
+{
+namespace
+{
+
+std::filesystem::path& boards_directory()
+{
+    static std::filesystem::path directory = PMX_SOURCE_DIR "/boards";
+    return directory;
+}
+
+/** One board file that is being read. */
+struct File
+{
+    std::filesystem::path path;
+
+    [[noreturn]] void wrong(const toml::source_region& where, const std::string& what) const
+    {
+        throw DescriptionError(path.string() + ":" + std::to_string(where.begin.line) + ": " + what);
+    }
+};
+
+std::string suggestion(std::string_view wrong, const std::vector<std::string_view>& valid)
+{
+    std::string text;
+    for (const std::string& near : names::nearest(wrong, valid))
+        text += (text.empty() ? "; did you mean " : ", ") + near;
+    if (!text.empty())
+        return text + "?";
+    for (const std::string_view key : valid)
+        text += (text.empty() ? "; there are: " : ", ") + std::string(key);
+    return text;
+}
+
+/** Refuses keys that nothing reads. */
+void check_keys(const File& file, const toml::table& table, const std::vector<std::string_view>& valid,
+                const std::string& where)
+{
+    for (const auto& [key, value] : table)
+    {
+        if (std::find(valid.begin(), valid.end(), key.str()) == valid.end())
+            file.wrong(key.source(),
+                       "no such key" + where + ": " + std::string(key.str()) + suggestion(key.str(), valid));
+    }
+}
+
+std::int64_t number_at(const File& file, const toml::node& node, const std::string& key, std::int64_t least,
+                       std::int64_t most)
+{
+    if (!node.is_integer())
+        file.wrong(node.source(), key + " has to be a whole number");
+    const std::int64_t number = node.as_integer()->get();
+    if (number < least || number > most)
+        file.wrong(node.source(), key + " has to be " + std::to_string(least) + " to " + std::to_string(most));
+    return number;
+}
+
+std::string text_at(const File& file, const toml::node& node, const std::string& key)
+{
+    if (!node.is_string() || node.as_string()->get().empty())
+        file.wrong(node.source(), key + " has to be a text, and not an empty one");
+    return node.as_string()->get();
+}
+
+bool switch_at(const File& file, const toml::node& node, const std::string& key)
+{
+    if (!node.is_boolean())
+        file.wrong(node.source(), key + " has to be true or false");
+    return node.as_boolean()->get();
+}
+
+/** A table of the file; null when it is not there. */
+const toml::table* table_at(const File& file, const toml::table& root, std::string_view key,
+                            const std::vector<std::string_view>& valid)
+{
+    const toml::node* const node = root.get(key);
+    if (node == nullptr)
+        return nullptr;
+    if (!node->is_table())
+        file.wrong(node->source(), std::string(key) + " has to be a table: [" + std::string(key) + "]");
+    if (!valid.empty())
+        check_keys(file, *node->as_table(), valid, " in [" + std::string(key) + "]");
+    return node->as_table();
+}
+
+void read_flash(const File& file, const toml::table& flash, Description& description)
+{
+    for (const auto& [key, value] : flash)
+    {
+        const std::string name(key.str());
+        const auto image = file.path.parent_path() / text_at(file, value, "the image of flash partition " + name);
+        if (name.empty())
+            file.wrong(key.source(), "a flash partition has a name");
+        if (!std::filesystem::is_regular_file(image))
+            file.wrong(value.source(), "flash partition " + name + ": no such image file: " + image.string());
+        description.flash[name] = image;
+    }
+}
+
+void read_plane_delay(const File& file, const toml::node& node, Description& description)
+{
+    const toml::array* const delays = node.as_array();
+    if (delays == nullptr || delays->size() != description.plane_delay.size())
+        file.wrong(node.source(), "plane_delay has to be a list of " + std::to_string(description.plane_delay.size()) +
+                                      " numbers, plane 1 first");
+    for (std::size_t plane = 0; plane < delays->size(); ++plane)
+        description.plane_delay[plane] = static_cast<std::int32_t>(number_at(file, (*delays)[plane], "a plane's delay",
+                                                                             std::numeric_limits<std::int32_t>::min(),
+                                                                             std::numeric_limits<std::int32_t>::max()));
+}
+
+/** When a fault answers: one of on, from and always; without any of them the first call. */
+void read_moment(const File& file, const toml::table& table, Fault& fault)
+{
+    unsigned given = 0;
+    for (const auto& [key, when] : { std::pair{ "on", Fault::When::On }, std::pair{ "from", Fault::When::From } })
+    {
+        if (const toml::node* const node = table.get(key))
+        {
+            fault.when = when;
+            fault.n = static_cast<unsigned>(
+                number_at(file, *node, std::string(key) + " of a fault", 1, std::numeric_limits<std::int32_t>::max()));
+            ++given;
+        }
+    }
+    if (const toml::node* const node = table.get("always"))
+    {
+        if (!switch_at(file, *node, "always of a fault"))
+            file.wrong(node->source(), "always of a fault can only be true; leave it out, or use on or from");
+        fault.when = Fault::When::Always;
+        ++given;
+    }
+    if (given > 1)
+        file.wrong(table.source(), "a fault takes one of on, from and always");
+}
+
+Fault read_fault(const File& file, const toml::node& node)
+{
+    const toml::table* const table = node.as_table();
+    if (table == nullptr)
+        file.wrong(node.source(), "a fault has to be a table: [[fault]]");
+    check_keys(file, *table, { "function", "answer", "on", "from", "always" }, " in [[fault]]");
+    const toml::node* const function = table->get("function");
+    const toml::node* const answer = table->get("answer");
+    if (function == nullptr || answer == nullptr)
+        file.wrong(table->source(), "a fault needs function and answer");
+    Fault fault;
+    fault.function = text_at(file, *function, "function of a fault");
+    fault.answer = number_at(file, *answer, "answer of a fault", std::numeric_limits<std::int32_t>::min(),
+                             std::numeric_limits<std::uint32_t>::max());
+    read_moment(file, *table, fault);
+    try
+    {
+        faults::check(fault);
+    }
+    catch (const std::invalid_argument& error)
+    {
+        file.wrong(function->source(), error.what());
+    }
+    return fault;
+}
+
+void read_faults(const File& file, const toml::node& node, Description& description)
+{
+    const toml::array* const list = node.as_array();
+    if (list == nullptr)
+        file.wrong(node.source(), "fault has to be a list of tables: [[fault]]");
+    for (const toml::node& item : *list)
+        description.faults.push_back(read_fault(file, item));
+}
+
+Description read(const File& file, const toml::table& root)
+{
+    check_keys(file, root, { "name", "console", "flash", "hdmi", "mixer", "fault" }, "");
+    Description description;
+    description.name = file.path.parent_path().filename().string();
+    if (const toml::node* const name = root.get("name"))
+        description.name = text_at(file, *name, "name");
+    if (const toml::table* const console = table_at(file, root, "console", { "level" }))
+    {
+        if (const toml::node* const level = console->get("level"))
+            description.console_level = static_cast<int>(number_at(file, *level, "level of the console", -1, 1000));
+    }
+    if (const toml::table* const flash = table_at(file, root, "flash", {}))
+        read_flash(file, *flash, description);
+    if (const toml::table* const hdmi = table_at(file, root, "hdmi", { "plugged" }))
+    {
+        if (const toml::node* const plugged = hdmi->get("plugged"))
+            description.sink_plugged = switch_at(file, *plugged, "plugged of hdmi");
+    }
+    if (const toml::table* const mixer = table_at(file, root, "mixer", { "plane_delay" }))
+    {
+        if (const toml::node* const delay = mixer->get("plane_delay"))
+            read_plane_delay(file, *delay, description);
+    }
+    if (const toml::node* const faults = root.get("fault"))
+        read_faults(file, *faults, description);
+    return description;
+}
+
+std::vector<std::string> boards_by_name()
+{
+    std::vector<std::string> names;
+    std::error_code error;
+    for (const auto& entry : std::filesystem::directory_iterator(boards_directory(), error))
+    {
+        if (std::filesystem::is_regular_file(entry.path() / "board.toml"))
+            names.push_back(entry.path().filename().string());
+    }
+    std::sort(names.begin(), names.end());
+    return names;
+}
+
+std::filesystem::path find_file(const std::filesystem::path& board)
+{
+    for (const auto& candidate : { board, board / "board.toml", boards_directory() / board / "board.toml" })
+    {
+        if (!board.empty() && std::filesystem::is_regular_file(candidate))
+            return candidate;
+    }
+    const std::vector<std::string> known = boards_by_name();
+    throw DescriptionError("no such board: " + board.string() +
+                           suggestion(board.string(), { known.begin(), known.end() }));
+}
+
+} // namespace
+
+void set_boards_directory(std::filesystem::path directory)
+{
+    boards_directory() = std::move(directory);
+}
+
+Description load_description(const std::filesystem::path& board)
+{
+    const File file{ find_file(board) };
+    try
+    {
+        return read(file, toml::parse_file(file.path.string()));
+    }
+    catch (const toml::parse_error& error)
+    {
+        file.wrong(error.source(), std::string(error.description()));
+    }
+}
+
+} // namespace board

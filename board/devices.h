@@ -1,0 +1,118 @@
+/** @file
+ *  The devices of the board: each holds its state in one struct in its own file, makes it good as new and reports it.
+ *  What one device must know of another it asks here. */
+#pragma once
+
+#include "board/board.h"
+
+namespace board
+{
+
+namespace os
+{
+void power_on(const Description& description);
+Value state();
+/** Whether the mutex of this handle is held. */
+bool mutex_held(std::uint32_t handle);
+/** Whether a timer's expiry function is running. */
+bool in_timer_context();
+/** A small number that no object of the operating-system layer has had since power-on. */
+std::uint32_t new_handle();
+/** A call came for an object ("timer", "semaphore") that does not exist. */
+void report_bad_handle(const std::string& function, const std::string& kind, std::uint32_t handle);
+} // namespace os
+
+/** The operating-system layer's timers, and the clock. */
+namespace timers
+{
+void power_on();
+Value state();
+} // namespace timers
+
+namespace console
+{
+void power_on(const Description& description);
+Value state();
+/** Print what is no stack function's print. */
+void print(std::string_view text);
+} // namespace console
+
+namespace flash
+{
+void power_on(const Description& description);
+Value state();
+} // namespace flash
+
+namespace registers
+{
+void power_on(const Description& description);
+Value state();
+} // namespace registers
+
+namespace interface_manager
+{
+void power_on(const Description& description);
+Value state();
+} // namespace interface_manager
+
+namespace power
+{
+void power_on(const Description& description);
+Value state();
+} // namespace power
+
+namespace mixer
+{
+void power_on(const Description& description);
+Value state();
+} // namespace mixer
+
+namespace tv_encoder
+{
+void power_on(const Description& description);
+Value state();
+} // namespace tv_encoder
+
+namespace video_planes
+{
+void power_on(const Description& description);
+Value state();
+} // namespace video_planes
+
+namespace osd_planes
+{
+void power_on(const Description& description);
+Value state();
+} // namespace osd_planes
+
+namespace hdmi_av
+{
+void power_on(const Description& description);
+Value state();
+} // namespace hdmi_av
+
+namespace display_control
+{
+void power_on(const Description& description);
+Value state();
+} // namespace display_control
+
+namespace trace
+{
+/** Empty the trace and count from 1 again; calls that are running are forgotten. */
+void power_on();
+} // namespace trace
+
+namespace faults
+{
+void power_on(const Description& description);
+/** Throws std::invalid_argument when a fault cannot be scripted: see faults::set. */
+void check(const Fault& fault);
+/** Counts a call that begins; the answer when a scripted fault is due. */
+std::optional<std::int64_t> due(std::string_view function);
+} // namespace faults
+
+/** Report a misuse of the platform: console line, trace notice, counted. */
+void report_misuse(std::string text);
+
+} // namespace board

@@ -1,0 +1,141 @@
+// Flash partitions: each is an image file, read anew at every call.
+#include <algorithm>
+#include <fstream>
+#include <stdexcept>
+#include <vector>
+
+#include "board/device_values.h"
+#include "board/devices.h"
+
+#include "u_os.h"
+
+namespace
+{
+
+struct Partition
+{
+    std::string name; ///< empty: removed, so that the ids of the others stay
+    std::filesystem::path image;
+    unsigned reads = 0;
+};
+
+struct Flash
+{
+    std::vector<Partition> partitions; ///< a partition's id is its index
+    unsigned failed_reads = 0;
+};
+
+Flash flash_state;
+
+/** Reads all that is asked for, or nothing. */
+bool read_image(const std::filesystem::path& image, UINT32 offset, std::vector<char>& content)
+{
+    std::ifstream file(image, std::ios::binary | std::ios::ate);
+    if (!file || static_cast<std::uint64_t>(file.tellg()) < std::uint64_t{ offset } + content.size())
+        return false;
+    file.seekg(offset);
+    return static_cast<bool>(file.read(content.data(), static_cast<std::streamsize>(content.size())));
+}
+
+} // namespace
+
+namespace board
+{
+
+void set_flash(std::string partition, std::filesystem::path image)
+{
+    if (partition.empty())
+        throw std::invalid_argument("a flash partition has a name");
+    if (!image.empty() && !std::filesystem::is_regular_file(image))
+        throw std::invalid_argument("flash partition " + partition + ": no such image file: " + image.string());
+    auto& partitions = flash_state.partitions;
+    const auto found = std::find_if(partitions.begin(), partitions.end(),
+                                    [&](const Partition& known) { return known.name == partition; });
+    if (image.empty())
+    {
+        if (found != partitions.end())
+            *found = {};
+    }
+    else if (found != partitions.end())
+        found->image = std::move(image);
+    else
+        partitions.push_back({ std::move(partition), std::move(image) });
+}
+
+namespace flash
+{
+
+void power_on(const Description& description)
+{
+    flash_state = {};
+    for (const auto& [name, image] : description.flash)
+        flash_state.partitions.push_back({ name, image });
+}
+
+Value state()
+{
+    std::vector<Value> partitions;
+    for (std::size_t id = 0; id < flash_state.partitions.size(); ++id)
+    {
+        const Partition& partition = flash_state.partitions[id];
+        if (partition.name.empty())
+            continue;
+        std::error_code error;
+        const auto size = std::filesystem::file_size(partition.image, error);
+        Value value;
+        value.add("id", Value::number(static_cast<std::int64_t>(id)));
+        value.add("name", Value::text(partition.name));
+        value.add("image", Value::text(partition.image.string()));
+        value.add("size", error ? Value::null() : Value::number(static_cast<std::int64_t>(size)));
+        value.add("reads", Value::number(partition.reads));
+        partitions.push_back(std::move(value));
+    }
+    Value value;
+    value.add("partitions", Value::list(std::move(partitions)));
+    value.add("failed_reads", Value::number(flash_state.failed_reads));
+    return value;
+}
+
+} // namespace flash
+} // namespace board
+
+extern "C" {
+
+INT32 get_part_id_by_name(const CHAR* szName)
+{
+    BOARD_CALL_R(get_part_id_by_name, text(szName));
+    for (std::size_t id = 0; szName != nullptr && id < flash_state.partitions.size(); ++id)
+    {
+        if (!flash_state.partitions[id].name.empty() && flash_state.partitions[id].name == szName)
+            return boardCall.answer(static_cast<INT32>(id));
+    }
+    return boardCall.answer(-1);
+}
+
+INT32 i4NFBPartitionRead(INT32 i4PartId, UINT32 u4Offset, void* pvDest, UINT32 u4Count)
+{
+    BOARD_CALL_R(i4NFBPartitionRead, i4PartId, u4Offset, bytes(pvDest, u4Count), u4Count);
+    auto& partitions = flash_state.partitions;
+    const auto id = static_cast<std::size_t>(i4PartId);
+    if (pvDest == nullptr)
+        board::report_misuse("i4NFBPartitionRead: the destination is a null pointer");
+    // The result has to be able to tell the number of bytes.
+    const bool readable = pvDest != nullptr && u4Count <= 0x7FFFFFFFu && i4PartId >= 0 && id < partitions.size() &&
+                          !partitions[id].name.empty();
+    std::vector<char> content;
+    if (readable && std::filesystem::is_regular_file(partitions[id].image) &&
+        u4Count <= std::filesystem::file_size(partitions[id].image))
+    {
+        content.resize(u4Count);
+        if (read_image(partitions[id].image, u4Offset, content))
+        {
+            std::copy(content.begin(), content.end(), static_cast<char*>(pvDest));
+            ++partitions[id].reads;
+            return boardCall.answer(static_cast<INT32>(u4Count));
+        }
+    }
+    ++flash_state.failed_reads;
+    return boardCall.fail(-1);
+}
+
+} // extern "C"

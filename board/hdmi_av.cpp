@@ -1,0 +1,234 @@
+// The HDMI/AV driver: the sink, the commands that it was given, what it was told of the mixed picture.
+#include "board/hdmi_av.h"
+
+#include <algorithm>
+#include <array>
+#include <string>
+
+#include "board/device_values.h"
+#include "board/devices.h"
+#include "board/trace.h"
+#include "drv_av_d.h"
+
+namespace
+{
+
+using board::CallArgument;
+using board::Value;
+using board::names::Family;
+
+/** What a command's parameter points to. */
+enum class Parameter
+{
+    Byte,
+    Word,
+    Resolution,
+    TvSystem
+};
+
+struct Command
+{
+    UINT32 number;
+    Parameter parameter;
+    Family family = Family::None;
+};
+
+constexpr std::array COMMANDS{
+    Command{ PMX_CHG_HDMI_COLOR_SPACE, Parameter::Byte, Family::HdmiColorSpace },
+    Command{ PMX_CHG_HDMI_VIDEO_ASPECT_RATIO, Parameter::Word, Family::Aspect },
+    Command{ PMX_SET_UI_TV_SYSTEM, Parameter::TvSystem },
+    Command{ PMX_SET_HDMI_BRIGHTNESS, Parameter::Byte },
+    Command{ PMX_SET_HDMI_CONTRAST, Parameter::Byte },
+    Command{ PMX_SET_HDMI_HUE, Parameter::Byte },
+    Command{ PMX_SET_HDMI_SATURATION, Parameter::Byte },
+    Command{ PMX_CHG_DEEP_COLOR_BIT, Parameter::Byte },
+    Command{ PMX_SET_VIDEO_PLL, Parameter::Resolution },
+    Command{ PMX_SET_HDMI_RES_CHG, Parameter::Resolution },
+    Command{ PMX_CHG_UI_RES_AUTO, Parameter::Byte },
+    Command{ PMX_SET_HDMI_SHARPNESS, Parameter::Byte },
+    Command{ PMX_SET_CCIR_RES_CHG, Parameter::Resolution },
+    Command{ PMX_SET_EXT_SHARPNESS, Parameter::Byte },
+    Command{ PMX_SET_EXT_BRIGHTNESS, Parameter::Byte },
+    Command{ PMX_SET_EXT_CONTRAST, Parameter::Byte },
+    Command{ PMX_SET_EXT_SATURATION, Parameter::Byte },
+    Command{ PMX_SET_EXT_COLOR_SPACE, Parameter::Byte },
+    Command{ PMX_SET_EXT_Y_C_DELAY, Parameter::Byte },
+    Command{ PMX_SET_EXT_CUE_CORRECT, Parameter::Byte },
+    Command{ PMX_SET_EXT_BORDER_LEVEL, Parameter::Byte },
+    Command{ PMX_SET_EXT_DEINTERLACE_MODE, Parameter::Byte },
+    Command{ PMX_SET_EXT_NOISE_REDUCTION, Parameter::Byte },
+    Command{ PMX_SET_EXT_EDGE_ENHANCEMENT, Parameter::Byte },
+    Command{ PMX_SET_EXT_DETAIL_ENHANCEMENT, Parameter::Byte },
+    Command{ PMX_SET_EXT_ZOOM_IMAGE, Parameter::Byte },
+    Command{ PMX_SET_EXT_GAMMA, Parameter::Byte },
+    Command{ PMX_SET_EXT_DEEP_COLOR, Parameter::Byte },
+};
+
+struct HdmiAv
+{
+    bool sink_plugged = true;
+    bool resolution_requested = false;
+    std::array<Value, COMMANDS.size()> parameters; ///< of each command's last call
+    std::optional<board::hdmi_av::Resolution> chosen_resolution;
+    std::optional<UCHAR> posted_resolution;
+    std::optional<DRV_PMX_COLOR_SPACE_T> posted_colour_space;
+    unsigned change_ok_notices = 0;
+    std::optional<bool> ccir_before_mixer;
+};
+
+HdmiAv hdmi_av_state;
+
+/** The row of a command; the end when the driver has no such command. */
+auto find_command(UINT32 u4Command)
+{
+    return std::find_if(COMMANDS.begin(), COMMANDS.end(),
+                        [u4Command](const Command& row) { return row.number == u4Command; });
+}
+
+/** What a command's parameter holds. The length of a call says nothing: it is 1 for records too. */
+Value content(const Command& command, const void* parameter)
+{
+    switch (command.parameter)
+    {
+    case Parameter::Word: return board::named(command.family, *static_cast<const UINT32*>(parameter));
+    case Parameter::Resolution: return board::to_value(*static_cast<const PMX_SET_HDMI_RES_PARAMETER_T*>(parameter));
+    case Parameter::TvSystem: return board::to_value(*static_cast<const PMX_SET_TV_SYS_PARAMETER_T*>(parameter));
+    case Parameter::Byte: break;
+    }
+    return board::named(command.family, *static_cast<const UINT8*>(parameter));
+}
+
+CallArgument command_parameter(const void* pvParameter, UINT32 u4Command)
+{
+    const auto command = find_command(u4Command);
+    if (command == COMMANDS.end() || pvParameter == nullptr)
+        return board::trace_arguments::ignored(pvParameter);
+    return { content(*command, pvParameter) };
+}
+
+CallArgument query_parameter(void* pvParameter, UINT32 u4Query)
+{
+    if (u4Query != PMX_GET_VALID_RES_AND_VFREQ)
+        return board::trace_arguments::ignored(pvParameter);
+    return board::trace_arguments::record(static_cast<PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T*>(pvParameter));
+}
+
+Value reported(const std::array<Value, COMMANDS.size()>& parameters)
+{
+    Value value = Value::record({});
+    for (std::size_t row = 0; row < COMMANDS.size(); ++row)
+    {
+        value.add(std::string(board::names::name_of(Family::AvdCommand, COMMANDS[row].number)), parameters[row]);
+    }
+    return value;
+}
+
+Value reported(const std::optional<board::hdmi_av::Resolution>& resolution)
+{
+    if (!resolution)
+        return Value::null();
+    return Value::record({ { "mode", board::named(Family::ResolutionMode, resolution->mode) },
+                           { "frequency", Value::number(resolution->frequency) } });
+}
+
+} // namespace
+
+namespace board::hdmi_av
+{
+
+void power_on(const Description& description)
+{
+    hdmi_av_state = {};
+    hdmi_av_state.sink_plugged = description.sink_plugged;
+}
+
+Value state()
+{
+    const HdmiAv& av = hdmi_av_state;
+    return Value::record({ { "sink_plugged", flag(av.sink_plugged) },
+                           { "resolution_requested", flag(av.resolution_requested) },
+                           { "commands", reported(av.parameters) },
+                           { "chosen_resolution", reported(av.chosen_resolution) },
+                           { "posted_resolution", setting(av.posted_resolution, Family::ResolutionMode) },
+                           { "posted_colour_space", setting(av.posted_colour_space, Family::ColorSpace) },
+                           { "change_ok_notices", Value::number(av.change_ok_notices) },
+                           { "ccir_before_mixer", setting(av.ccir_before_mixer) } });
+}
+
+void plug(bool plugged)
+{
+    trace::notice("plug", plugged ? "HDMI sink plugged in" : "HDMI sink unplugged");
+    hdmi_av_state.sink_plugged = plugged;
+}
+
+void request_resolution(bool wanted)
+{
+    trace::notice("plug", wanted ? "hot plug wants the resolution sent again" : "hot plug wants no resolution");
+    hdmi_av_state.resolution_requested = wanted;
+}
+
+void choose_resolution(std::optional<Resolution> resolution)
+{
+    hdmi_av_state.chosen_resolution = resolution;
+}
+
+} // namespace board::hdmi_av
+
+BOOL fgPmxDrvSetAvd(UINT32 u4Command, void* pvParameter, UINT32 u4Length)
+{
+    BOARD_CALL_R(fgPmxDrvSetAvd, u4Command, command_parameter(pvParameter, u4Command), u4Length);
+    const auto command = find_command(u4Command);
+    if (command == COMMANDS.end() || pvParameter == nullptr)
+        return boardCall.answer(FALSE);
+    const auto row = static_cast<std::size_t>(command - COMMANDS.begin());
+    hdmi_av_state.parameters[row] = content(*command, pvParameter);
+    return boardCall.answer(TRUE);
+}
+
+BOOL fgPmxDrvGetAvdInfo(UINT32 u4Query, void* pvParameter)
+{
+    BOARD_CALL_R(fgPmxDrvGetAvdInfo, u4Query, query_parameter(pvParameter, u4Query));
+    if (u4Query != PMX_GET_VALID_RES_AND_VFREQ || pvParameter == nullptr)
+        return boardCall.answer(FALSE);
+    auto* query = static_cast<PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T*>(pvParameter);
+    const auto& chosen = hdmi_av_state.chosen_resolution;
+    query->u4ValidAutoRes = chosen ? chosen->mode : query->u4ResCheck;
+    query->u2ValidAutoVfreq = chosen ? chosen->frequency : query->u2VsyncFreq;
+    return boardCall.answer(TRUE);
+}
+
+INT32 i4GetHotPlugStatus(void)
+{
+    BOARD_CALL_R(i4GetHotPlugStatus);
+    return boardCall.answer(hdmi_av_state.sink_plugged ? 1 : 0);
+}
+
+BOOL fgIsHotPlugChgRes(void)
+{
+    BOARD_CALL_R(fgIsHotPlugChgRes);
+    return boardCall.answer(hdmi_av_state.resolution_requested ? TRUE : FALSE);
+}
+
+void vPostChgRes(UCHAR ucMode)
+{
+    BOARD_CALL(vPostChgRes, ucMode);
+    hdmi_av_state.posted_resolution = ucMode;
+}
+
+void vPostChgInputCS(DRV_PMX_COLOR_SPACE_T eColorSpace)
+{
+    BOARD_CALL(vPostChgInputCS, eColorSpace);
+    hdmi_av_state.posted_colour_space = eColorSpace;
+}
+
+void vSendAvdNotifyScomResChgOK(void)
+{
+    BOARD_CALL(vSendAvdNotifyScomResChgOK);
+    ++hdmi_av_state.change_ok_notices;
+}
+
+void vSetCcirOutBeforeMixer(BOOL fgBeforeMixer)
+{
+    BOARD_CALL(vSetCcirOutBeforeMixer, fgBeforeMixer);
+    hdmi_av_state.ccir_before_mixer = fgBeforeMixer != 0;
+}

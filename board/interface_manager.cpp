@@ -1,0 +1,135 @@
+// The interface manager: a registry of tables with reference counts.
+#include <compare>
+#include <map>
+
+#include "board/device_values.h"
+#include "board/devices.h"
+
+#include "drv_if.h"
+
+namespace
+{
+
+struct Key
+{
+    UINT16 type;
+    UINT16 id;
+    UINT32 interface;
+
+    auto operator<=>(const Key&) const = default;
+};
+
+struct Interface
+{
+    const void* table;
+    void* tag;
+    unsigned held = 0; ///< queries that were not released yet
+};
+
+std::map<Key, Interface> interface_manager_state;
+
+using board::names::Family;
+
+std::string key_text(const Key& key)
+{
+    return board::named(Family::ComponentType, key.type).to_text() + " " + std::to_string(key.id) + " " +
+           board::named(Family::InterfaceId, key.interface).to_text();
+}
+
+} // namespace
+
+namespace board::interface_manager
+{
+
+void power_on(const Description&)
+{
+    interface_manager_state.clear();
+}
+
+Value state()
+{
+    std::vector<Value> interfaces;
+    for (const auto& [key, interface] : interface_manager_state)
+    {
+        Value value;
+        value.add("component_type", named(Family::ComponentType, key.type));
+        value.add("component_id", Value::number(key.id));
+        value.add("interface_id", named(Family::InterfaceId, key.interface));
+        value.add("table", trace_arguments::object_value(interface.table));
+        value.add("tag", trace_arguments::tag(interface.tag).value);
+        value.add("held", Value::number(interface.held));
+        interfaces.push_back(std::move(value));
+    }
+    return Value().add("interfaces", Value::list(std::move(interfaces)));
+}
+
+} // namespace board::interface_manager
+
+extern "C" {
+
+INT32 i4ImRegisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, const void* pvIf, void* pvTag)
+{
+    BOARD_CALL_R(i4ImRegisterInterface2, u2CompType, u2CompId, u4IfId, object(pvIf), tag(pvTag));
+    const Key key{ u2CompType, u2CompId, u4IfId };
+    if (pvIf == nullptr)
+    {
+        board::report_misuse("i4ImRegisterInterface2: the table of " + key_text(key) + " is a null pointer");
+        return boardCall.fail(-1);
+    }
+    return boardCall.answer(interface_manager_state.try_emplace(key, Interface{ pvIf, pvTag }).second ? 0 : -1);
+}
+
+INT32 i4ImUnregisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId)
+{
+    BOARD_CALL_R(i4ImUnregisterInterface2, u2CompType, u2CompId, u4IfId);
+    const Key key{ u2CompType, u2CompId, u4IfId };
+    const auto found = interface_manager_state.find(key);
+    if (found == interface_manager_state.end())
+        return boardCall.answer(-1);
+    if (found->second.held != 0)
+        board::report_misuse("i4ImUnregisterInterface2: " + key_text(key) + " is withdrawn while it is held " +
+                             std::to_string(found->second.held) + " times");
+    interface_manager_state.erase(found);
+    return boardCall.answer(0);
+}
+
+INT32 i4ImQueryInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void** ppvIf, void** ppvTag)
+{
+    BOARD_CALL_R(i4ImQueryInterface, u2CompType, u2CompId, u4IfId, object(ppvIf), tag(ppvTag));
+    const Key key{ u2CompType, u2CompId, u4IfId };
+    if (ppvIf == nullptr || ppvTag == nullptr)
+    {
+        board::report_misuse("i4ImQueryInterface: nowhere to put table and tag of " + key_text(key));
+        return boardCall.fail(-1);
+    }
+    const auto found = interface_manager_state.find(key);
+    if (found == interface_manager_state.end())
+        return boardCall.fail(-1);
+    ++found->second.held;
+    *ppvIf = const_cast<void*>(found->second.table);
+    *ppvTag = found->second.tag;
+    return boardCall.answer(0);
+}
+
+INT32 i4ImReleaseInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void* pvTag)
+{
+    BOARD_CALL_R(i4ImReleaseInterface, u2CompType, u2CompId, u4IfId, tag(pvTag));
+    const Key key{ u2CompType, u2CompId, u4IfId };
+    const auto found = interface_manager_state.find(key);
+    std::string wrong;
+    if (found == interface_manager_state.end())
+        wrong = "is not registered";
+    else if (found->second.tag != pvTag)
+        wrong = "has another tag";
+    else if (found->second.held == 0)
+        wrong = "is not held";
+    if (!wrong.empty())
+    {
+        board::report_misuse("i4ImReleaseInterface: " + key_text(key) + " " + wrong);
+        return boardCall.fail(-1);
+    }
+    --found->second.held;
+    return boardCall.answer(0);
+}
+
+} // extern "C"

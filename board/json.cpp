@@ -1,0 +1,97 @@
+// The one place of the board that knows the JSON library: it compiles slowly.
+#include <nlohmann/json.hpp>
+
+#include "board/trace.h"
+#include "board/value.h"
+
+namespace board
+{
+namespace
+{
+
+using Json = nlohmann::ordered_json;
+
+Json json_of(const Value& value)
+{
+    switch (value.kind())
+    {
+    case Value::Kind::Null: return nullptr;
+    case Value::Kind::Number:
+        if (value.string().empty())
+            return value.as_number();
+        return { { "value", value.as_number() }, { "name", value.string() } };
+    case Value::Kind::Text: return value.string();
+    case Value::Kind::Symbol: return { { "symbol", value.string() } };
+    case Value::Kind::List:
+    {
+        Json list = Json::array();
+        for (const Value& item : value.items())
+            list.push_back(json_of(item));
+        return list;
+    }
+    case Value::Kind::Record: break;
+    }
+    Json record = Json::object();
+    for (std::size_t i = 0; i < value.keys().size(); ++i)
+        record[value.keys()[i]] = json_of(value.items()[i]);
+    return record;
+}
+
+/** Bytes that are no UTF-8, which a console text may hold, become replacement characters. */
+std::string dumped(const Json& json, int indent)
+{
+    return json.dump(indent, ' ', false, Json::error_handler_t::replace);
+}
+
+const char* kind_name(TraceEntry::Kind kind)
+{
+    switch (kind)
+    {
+    case TraceEntry::Kind::Call: return "call";
+    case TraceEntry::Kind::Log: return "log";
+    case TraceEntry::Kind::Assert: return "assert";
+    case TraceEntry::Kind::Notice: break;
+    }
+    return "notice";
+}
+
+} // namespace
+
+std::string Value::to_json(int indent) const
+{
+    return dumped(json_of(*this), indent);
+}
+
+std::string TraceEntry::to_json() const
+{
+    Json json;
+    json["sequence"] = sequence;
+    json["time_us"] = time_us;
+    json["kind"] = kind_name(kind);
+    json["function"] = function;
+    json["operation"] = operation;
+    json["depth"] = depth;
+    switch (kind)
+    {
+    case Kind::Call:
+    case Kind::Assert:
+        json["arguments"] = Json::object();
+        for (const TraceArgument& argument : arguments)
+            json["arguments"][argument.name] = json_of(argument.value);
+        if (result)
+            json["result"] = json_of(*result);
+        if (kind == Kind::Call)
+            json["faulted"] = faulted;
+        break;
+    case Kind::Log:
+        if (function == "PMX_IsLog")
+            json["level"] = level;
+        json["shown"] = shown;
+        json["text"] = text;
+        break;
+    case Kind::Notice: json["text"] = text; break;
+    }
+    return dumped(json, -1);
+}
+
+} // namespace board

@@ -1,0 +1,12 @@
+/** @file
+ *  The layer's own state: kept as it was at load, so that a board that is powered on again starts the layer afresh. */
+#pragma once
+
+namespace board::layer_state
+{
+
+/** Put the layer's changeable objects back to what they were at load. Without a layer in the executable nothing is
+ *  done. Throws std::runtime_error when one of them cannot be found. */
+void restore();
+
+} // namespace board::layer_state

@@ -1,0 +1,70 @@
+#include <algorithm>
+#include <cctype>
+#include <numeric>
+
+#include "board/names.h"
+
+namespace board::names
+{
+namespace
+{
+
+bool same_letter(char a, char b)
+{
+    return std::tolower(static_cast<unsigned char>(a)) == std::tolower(static_cast<unsigned char>(b));
+}
+
+/** Whether somebody stopped typing early. */
+bool begins_with(std::string_view candidate, std::string_view beginning)
+{
+    return beginning.size() >= 3 && candidate.size() >= beginning.size() &&
+           std::equal(beginning.begin(), beginning.end(), candidate.begin(), same_letter);
+}
+
+/** Number of letters to insert, delete, replace or exchange with their neighbour; case does not count. */
+std::size_t distance(std::string_view a, std::string_view b)
+{
+    std::vector<std::size_t> before(b.size() + 1), above(b.size() + 1), row(b.size() + 1);
+    std::iota(above.begin(), above.end(), std::size_t{ 0 });
+    for (std::size_t i = 1; i <= a.size(); ++i)
+    {
+        row[0] = i;
+        for (std::size_t j = 1; j <= b.size(); ++j)
+        {
+            const bool same = same_letter(a[i - 1], b[j - 1]);
+            row[j] = std::min({ above[j] + 1, row[j - 1] + 1, above[j - 1] + (same ? 0 : 1) });
+            if (i > 1 && j > 1 && same_letter(a[i - 1], b[j - 2]) && same_letter(a[i - 2], b[j - 1]))
+                row[j] = std::min(row[j], before[j - 2] + 1);
+        }
+        before = above;
+        above = row;
+    }
+    return above[b.size()];
+}
+
+} // namespace
+
+std::vector<std::string> nearest(std::string_view wrong, const std::vector<std::string_view>& candidates,
+                                 std::size_t count)
+{
+    std::vector<std::pair<std::size_t, std::string_view>> near;
+    const std::size_t most = std::max<std::size_t>(2, wrong.size() / 3);
+    for (const std::string_view candidate : candidates)
+    {
+        const std::size_t changes = begins_with(candidate, wrong) ? 0 : distance(wrong, candidate);
+        if (changes <= most && changes < candidate.size())
+            near.emplace_back(changes, candidate);
+    }
+    std::sort(near.begin(), near.end());
+    near.erase(std::unique(near.begin(), near.end()), near.end());
+    std::vector<std::string> names;
+    for (const auto& [changes, candidate] : near)
+    {
+        // What is much further off than the best one only distracts.
+        if (names.size() < count && changes <= near.front().first + 1)
+            names.emplace_back(candidate);
+    }
+    return names;
+}
+
+} // namespace board::names

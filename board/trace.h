@@ -1,0 +1,160 @@
+/** @file
+ *  Every platform call, typed, in order. A platform function records itself and is a fault point in one line:
+ *
+ *      void TVE_SetEnable(UINT32 u4Tve, BOOL fgEnable)
+ *      {
+ *          BOARD_CALL(TVE_SetEnable, u4Tve, fgEnable);
+ *          …update the model…
+ *      }
+ *
+ *      INT32 x_timer_stop(HANDLE_T hTimer)
+ *      {
+ *          BOARD_CALL_R(x_timer_stop, hTimer);          // answers and leaves here when a fault is scripted
+ *          …
+ *          return boardCall.answer(OSR_OK);             // records the result
+ *      }
+ *
+ *  Arguments: numbers, enumerations and names of functions are recorded as they are; a pointer to a changeable number
+ *  (HANDLE_T*, INT32*) is an output and is recorded by what it points to when the call ends. Other pointers are
+ *  wrapped: BOARD_CALL(PMX_HalPlaneOrder, ucPmxId, u4Number, array(pu4PlaneOrder, 8)), text(szName), bytes(pvDest,
+ *  u4Count), record(prRecord), ignored(pvArg). */
+#pragma once
+
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <span>
+#include <string>
+#include <string_view>
+#include <type_traits>
+#include <vector>
+
+#include "board/value.h"
+
+namespace board
+{
+
+struct TraceArgument
+{
+    std::string name;
+    Value value;
+};
+
+struct TraceEntry
+{
+    enum class Kind
+    {
+        Call,   ///< a platform function
+        Log,    ///< PMX_IsLog, Printf, UTIL_Printf: `text` is what was formatted
+        Assert, ///< Assert: arguments expression, file, line
+        Notice  ///< the board itself: a misuse of the platform, an expiry, a plug
+    };
+
+    std::uint64_t sequence = 0;  ///< counted from 1 at power-on
+    std::uint64_t time_us = 0;   ///< virtual time since power-on
+    Kind kind = Kind::Call;
+    std::string function;        ///< "TVE_SetEnable", "PMX_IsLog", "Assert", or a notice's kind ("misuse", "timer", …)
+    std::vector<TraceArgument> arguments;
+    std::optional<Value> result; ///< absent for functions without one
+    bool faulted = false;        ///< a scripted fault answered
+    std::int32_t level = 0;      ///< PMX_IsLog's level
+    bool shown = true;           ///< a log line: whether the console's level admitted it
+    std::string text;            ///< formatted text of a log line; a notice's message
+    std::string operation;       ///< outermost operation of the layer that was running, empty outside of one
+    unsigned depth = 0;          ///< nesting: 1 inside a platform call that called back into the layer
+
+    /** One line, arguments by position: `TVE_SetEnable(0, 1)`, `x_sema_lock(1, X_SEMA_OPTION_WAIT) = 0`,
+     *  `LOG8 "Mute Enable\n"`, `Printf "…"`, `UTIL_Printf "…"`, `Assert("expression", "file")`, `NOTICE misuse "…"`. */
+    std::string brief() const;
+    /** The same with arguments by name: `TVE_SetEnable(u4Tve=0, fgEnable=1)`. */
+    std::string named() const;
+    /** One JSON object, keys as documented in docs/board.md. */
+    std::string to_json() const;
+    /** Whether a line written by a person in the form of brief() means this entry: numbers in any base or by name, "*"
+     *  for any argument, "= result" may be left out. Throws std::invalid_argument with the reason when the line is not
+     *  well formed. */
+    bool matches(std::string_view line) const;
+};
+
+namespace trace
+{
+
+/** Everything since power-on or the last clear. */
+const std::vector<TraceEntry>& entries();
+void clear();
+/** Called with every finished entry (a call when it returns, so that its result is there; `sequence` gives the order of
+ *  beginning). */
+void set_sink(std::function<void(const TraceEntry&)> sink);
+
+/** Names the outermost operation while it lives; nested scopes change nothing. */
+class Operation
+{
+public:
+    explicit Operation(std::string name);
+    ~Operation();
+    Operation(const Operation&) = delete;
+    Operation& operator=(const Operation&) = delete;
+
+private:
+    bool m_outermost;
+};
+
+/** Called when a platform call is about to return (after its effect and its record); for tests that make something
+ *  happen at every point of an operation. An empty function removes it. */
+void set_after_call(std::function<void(const TraceEntry&)> hook);
+
+/** Register the name of an object that crosses an interface by address, so that it is recorded by name. */
+void name_object(const void* object, std::string name);
+template <typename Function>
+    requires std::is_function_v<Function>
+void name_object(Function* function, std::string name)
+{
+    name_object(reinterpret_cast<const void*>(function), std::move(name));
+}
+
+/** Add an entry of the board itself. */
+void notice(std::string kind, std::string text);
+
+} // namespace trace
+
+/** A scripted answer of a platform function. */
+struct Fault
+{
+    enum class When
+    {
+        On,    ///< the n-th call from now alone
+        From,  ///< the n-th call from now and every later one
+        Always
+    };
+
+    std::string function;
+    std::int64_t answer = 0;
+    When when = When::On;
+    unsigned n = 1;
+};
+
+namespace faults
+{
+
+/** Script a fault; a later one for the same function replaces it. Throws std::invalid_argument when there is no such
+ *  function or it has no result; the message names the nearest valid ones. */
+void set(const Fault& fault);
+void clear(std::string_view function);
+void clear_all();
+std::vector<Fault> active();
+
+} // namespace faults
+
+/** A platform function of the headers. */
+struct PlatformFunction
+{
+    std::string_view name;
+    bool has_result;
+};
+/** All of them, generated from the headers when the board is built. */
+std::span<const PlatformFunction> platform_functions();
+
+} // namespace board
+
+#include "board/trace_call.h"

@@ -1,0 +1,83 @@
+/** @file
+ *  Runs the lines of a scenario within a test, and looks into the project's headers. */
+#pragma once
+
+#include <fstream>
+#include <iterator>
+#include <regex>
+#include <sstream>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "tools/pmxboard/runner.h"
+
+namespace tool_test
+{
+
+struct Run
+{
+    bool done = false;
+    std::string shown;
+    std::string trace; ///< when it went somewhere else
+    std::string diagnostics;
+};
+
+/** The scenario is called here.pmx, stands in the project's root and runs on the default board. */
+inline Run run(const std::string& lines, pmxboard::OutputOptions options = {}, bool trace_apart = false)
+{
+    std::istringstream in(lines);
+    std::ostringstream shown;
+    std::ostringstream trace;
+    std::ostringstream diagnostics;
+    options.to = &shown;
+    options.trace_to = trace_apart ? &trace : nullptr;
+    const pmxboard::Scenario scenario{ "here.pmx", "default", "pmxboard run here.pmx" };
+    const bool done = pmxboard::run_scenario(in, scenario, options, diagnostics);
+    return { done, shown.str(), trace.str(), diagnostics.str() };
+}
+
+/** What the diagnostics say of a scenario; empty when all went well. */
+inline std::string diagnostics(const std::string& lines)
+{
+    const Run outcome = run(lines);
+    return outcome.done ? outcome.diagnostics : outcome.diagnostics.empty() ? "failed in silence" : outcome.diagnostics;
+}
+
+inline std::string project_file(const std::string& path)
+{
+    std::ifstream file(std::string(PMX_SOURCE_DIR) + "/" + path);
+    return { std::istreambuf_iterator<char>(file), {} };
+}
+
+struct DeclaredFunction
+{
+    std::string result;
+    std::string name;
+    std::vector<std::pair<std::string, std::string>> parameters; ///< type and name
+};
+
+/** The declarations that a pattern finds: its groups are result, name and parameters. */
+inline std::vector<DeclaredFunction> declarations(const std::string& header, const std::string& pattern)
+{
+    const std::string code = std::regex_replace(header, std::regex(R"(/\*[^*]*\*+([^/*][^*]*\*+)*/)"), "");
+    const std::regex declaration(pattern);
+    const std::regex parameter(R"(\s*(.*[ *])(\w+)\s*)");
+    std::vector<DeclaredFunction> found;
+    for (std::sregex_iterator it(code.begin(), code.end(), declaration), end; it != end; ++it)
+    {
+        DeclaredFunction function{ (*it)[1], (*it)[2], {} };
+        std::istringstream list((*it)[3].str());
+        for (std::string text; std::getline(list, text, ',');)
+        {
+            std::smatch parts;
+            if (std::regex_match(text, parts, parameter))
+                function.parameters.emplace_back(parts[1], parts[2]);
+        }
+        found.push_back(std::move(function));
+    }
+    return found;
+}
+
+} // namespace tool_test

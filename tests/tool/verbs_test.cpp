@@ -1,0 +1,217 @@
+#include <gtest/gtest.h>
+
+#include <filesystem>
+
+#include "board/board.h"
+#include "drv_if_pmx.h"
+#include "scenario_run.h"
+#include "tools/pmxboard/session.h"
+
+namespace
+{
+
+using tool_test::diagnostics;
+using tool_test::run;
+
+TEST(Verbs, PowerOn_MakesTheBoardAsGoodAsNew)
+{
+    EXPECT_EQ("", diagnostics("PMX_Init\npower-on\nexpect state _PmxInitiated 0\nexpect state MutexPMX 0\n"
+                              "expect no-more\nexpect asserts 0\nexpect state ucMode 0"));
+}
+
+TEST(Verbs, PowerOn_NamesABoard)
+{
+    EXPECT_EQ("", diagnostics("power-on default\nPMX_GetHDMIDefaultRes\nexpect result RES_1080P60HZ"));
+    EXPECT_EQ("", diagnostics("power-on boards/default/board.toml\nPMX_GetHDMIDefaultRes\nexpect result 12"));
+}
+
+TEST(Verbs, WithoutPowerOn_TheScenarioHasItsOwnBoard)
+{
+    EXPECT_EQ("", diagnostics("PMX_Init"));
+    EXPECT_EQ("", diagnostics("expect state _PmxInitiated 0\nPMX_Init\nexpect state _PmxInitiated 1"))
+        << "an expectation must see the board of its own scenario, not that of the one before";
+}
+
+TEST(Verbs, Flash_ReplacesAndRemovesAPartition)
+{
+    EXPECT_EQ(
+        "",
+        diagnostics("flash fast_init_param scenarios/images/boot-576p.bin\nPMX_GetHDMIDefaultRes\n"
+                    "expect result RES_576P\nflash fast_init_param off\nPMX_GetHDMIDefaultRes\nexpect result RES_480I\n"
+                    "flash another scenarios/images/boot-576p.bin\nexpect state flash.partitions[0].name \"another\""));
+}
+
+TEST(Verbs, Fault_AnswersTheNextCall)
+{
+    EXPECT_EQ("",
+              diagnostics("fault get_part_id_by_name 7\nPMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 7\n"
+                          "PMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 0"));
+}
+
+TEST(Verbs, Fault_OnTheNthCall)
+{
+    EXPECT_EQ(
+        "",
+        diagnostics("fault get_part_id_by_name 7 on 2\nPMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 0\n"
+                    "PMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 7\n"
+                    "PMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 0"));
+}
+
+TEST(Verbs, Fault_FromTheNthCall_UntilItIsTakenBack)
+{
+    EXPECT_EQ("",
+              diagnostics(
+                  "fault get_part_id_by_name 7 from 2\nPMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 0\n"
+                  "PMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 7\n"
+                  "PMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 7\n"
+                  "fault get_part_id_by_name off\nPMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 0"));
+}
+
+TEST(Verbs, Fault_Always)
+{
+    EXPECT_EQ("", diagnostics("fault get_part_id_by_name -2 always\nPMX_GetHDMIDefaultRes\nPMX_GetHDMIDefaultRes\n"
+                              "expect call get_part_id_by_name(*) = -2"));
+}
+
+TEST(Verbs, Fault_AnswersByName)
+{
+    EXPECT_EQ("",
+              diagnostics("fault fgPmxHalSwapPlane1_2 TRUE\nPMX_EnableVideoPlane 0 0\nexpect call vPmxMixPlane(0, 1)"));
+}
+
+TEST(Verbs, Advance_LetsTimePass)
+{
+    run("advance 2s\nadvance 3ms\nadvance 4us");
+    EXPECT_EQ(2003004, board::now().count());
+}
+
+TEST(Verbs, LogLevel_DecidesWhatTheConsoleShows)
+{
+    EXPECT_EQ("", diagnostics("loglevel 0\nPMX_Stop\nexpect log 1 \"PMX_Stop\\n\"\nexpect console \"\""));
+    EXPECT_EQ("here.pmx:3: expected console \"PMX_Stop\", found \"\"\nrepeat: pmxboard run here.pmx\n",
+              diagnostics("loglevel 0\nPMX_Stop\nexpect console \"PMX_Stop\""));
+    EXPECT_EQ("", diagnostics("loglevel 1\nPMX_Stop\nexpect console \"PMX_Stop\\n\""));
+}
+
+TEST(Verbs, State_ShowsAFieldARecordOrEverything)
+{
+    EXPECT_EQ("> state _fgBootUp\n  _fgBootUp = 1\n", run("state _fgBootUp").shown);
+    EXPECT_EQ("> state status\n  hPMXTimer = 0\n  fgPmxFormatChangeFlag = 0\n  fgPmxEnabeOsdFlag = 0\n  "
+              "fgTimerAlreadySet = 0\n",
+              run("state status").shown);
+    const std::string everything = run("state").shown;
+    for (const char* const part : { "\n  os", "\n  mixer\n", "\n  tv_encoder", "\n  record\n", "\n    arPortInfo\n",
+                                    "\n  status", "\n  module" })
+        EXPECT_NE(std::string::npos, everything.find(part)) << part << " in\n" << everything;
+}
+
+TEST(Verbs, State_AsJson)
+{
+    EXPECT_EQ("> state status.hPMXTimer --json\n0\n", run("state status.hPMXTimer --json").shown);
+    EXPECT_EQ("> state --json ucMode\n{\n  \"value\": 0,\n  \"name\": \"RES_480I\"\n}\n",
+              run("state --json ucMode").shown);
+}
+
+TEST(Verbs, Poke_ChangesTheRecord)
+{
+    EXPECT_EQ(
+        "", diagnostics("poke ucMode RES_1080P24HZ\nPMX_GetMode 0\nexpect out pucMode 18\npoke PMX_debug_level 0x2\n"
+                        "expect state module.PMX_debug_level 2\npoke arOutputConf[PMX_OUTPUT_HDMI].eResMode RES_576P\n"
+                        "expect state record.arOutputConf[1].eResMode RES_576P"));
+}
+
+TEST(Verbs, Trace_HidesAndShowsCalls)
+{
+    const std::string shown = run("trace off\nPMX_SetTvType 0 3\ntrace on\nPMX_SetTvType 0 0").shown;
+    EXPECT_EQ(std::string::npos, shown.find("PMX_HalSetTvType(0, PMX_TV_TYPE_PAL)"));
+    EXPECT_NE(std::string::npos, shown.find("PMX_HalSetTvType(0, PMX_TV_TYPE_NTSC)"));
+}
+
+TEST(Verbs, SuspendAndResume_RunWhatIsRegistered)
+{
+    EXPECT_EQ("", diagnostics(
+                      "suspend\nexpect result 0\nexpect none PMX_HalClockSet\nPMX_Init\nsuspend\n"
+                      "expect next PMX_HalClockSet(0, 0)\nresume\nexpect next PMX_HalClockSet(0, 1)\nexpect result 0"));
+}
+
+TEST(Verbs, Print_ShowsTheText)
+{
+    EXPECT_EQ("> print \"a\\tb\\n\"\na\tb\n", run("print \"a\\tb\\n\"").shown);
+}
+
+TEST(Verbs, Neighbour_CallsThePlatform)
+{
+    EXPECT_EQ("",
+              diagnostics("neighbour PMX_HalSwapPlane1_2 0 1\nexpect next PMX_HalSwapPlane1_2(0, 1)\nexpect no-more\n"
+                          "PMX_EnableVideoPlane 0 0\nexpect call vPmxMixPlane(0, 1)\n"
+                          "neighbour TVE_SetAspectRatio ASPECT_RATIO_16_9_FULL_FORMAT\n"
+                          "expect next TVE_SetAspectRatio(ASPECT_RATIO_16_9_FULL_FORMAT)"));
+}
+
+TEST(Verbs, Ipmx_CallsTheRegisteredTableWithItsTag)
+{
+    EXPECT_EQ(
+        "", diagnostics("PMX_Init\nipmx pi4GetOutSize tag\nexpect result 1\nexpect out pu4Width 1920\nexpect no-more\n"
+                        "expect state interface_manager.interfaces[0].held 0"));
+    EXPECT_EQ(
+        "", diagnostics(
+                "PMX_Init\nPMX_Uninit\ni4PmxRegisterIM PMX_COMP_TYPE_PMX 0\nipmx pi4OsdDisabled tag\nexpect result 1"));
+}
+
+TEST(Verbs, Ipmx_CallsWithAnotherTag)
+{
+    EXPECT_EQ("", diagnostics("PMX_Init\nipmx pi4GetMode 1\nexpect result 0\nexpect out pucMode untouched\n"
+                              "ipmx pi4GetMode 0x100\nexpect result 1\nipmx pi4GetMode tag null\nexpect result 0"));
+}
+
+TEST(Verbs, Ipmx_WithoutATable_Fails)
+{
+    EXPECT_EQ("here.pmx:1: no IPMX table is registered: i4ImQueryInterface answers -1\nrepeat: pmxboard run here.pmx\n",
+              diagnostics("ipmx pi4GetMode tag"));
+    EXPECT_EQ("here.pmx:2: i4ImQueryInterface answered 0 without a table\nrepeat: pmxboard run here.pmx\n",
+              diagnostics("fault i4ImQueryInterface 0\nipmx pi4GetMode tag"));
+}
+
+TEST(Verbs, Ipmx_NullSlot_FailsWithItsName)
+{
+    if (_rPMXIF.pi4SetMode != nullptr)
+        GTEST_SKIP() << "every slot is live";
+    EXPECT_EQ("here.pmx:2: the slot pi4SetMode of the registered table is null\nrepeat: pmxboard run here.pmx\n",
+              diagnostics("PMX_Init\nipmx pi4SetMode tag RES_480P 60 0"));
+    EXPECT_EQ("0", board::state().find("interface_manager.interfaces[0].held")->to_text()) << "it was given back";
+}
+
+TEST(Verbs, Operation_RunsUnderItsName)
+{
+    run("PMX_SetTvType 0 3");
+    EXPECT_EQ("PMX_SetTvType", board::trace::entries().back().operation);
+    run("PMX_Init\nipmx pi4EnableVideoPlane tag 1");
+    bool seen = false;
+    for (const auto& entry : board::trace::entries())
+        seen = seen || (entry.function == "vPmxMixPlane" && entry.operation == "pi4EnableVideoPlane");
+    EXPECT_TRUE(seen);
+}
+
+TEST(Verbs, TheLanguageIsDescribedWhole)
+{
+    const std::string description = tool_test::project_file("docs/scenarios.md");
+    for (const auto& verb : pmxboard::verbs())
+    {
+        if (verb.name != "expect")
+        {
+            EXPECT_NE(std::string::npos, description.find("`" + std::string(verb.name))) << verb.name;
+        }
+    }
+    for (const char* const name :
+         { "result", "out", "call", "next", "no-more", "none", "log", "console", "state", "asserts", "misuses" })
+        EXPECT_NE(std::string::npos, description.find("| `expect " + std::string(name))) << name;
+    for (const auto& file : std::filesystem::directory_iterator(PMX_SOURCE_DIR "/scenarios"))
+    {
+        if (file.path().extension() == ".pmx")
+        {
+            EXPECT_NE(std::string::npos, description.find("`" + file.path().filename().string() + "`")) << file.path();
+        }
+    }
+}
+
+} // namespace

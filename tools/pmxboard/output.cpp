@@ -1,0 +1,210 @@
+#include "tools/pmxboard/output.h"
+
+#include <cstdio>
+#include <ostream>
+
+namespace pmxboard
+{
+namespace
+{
+
+constexpr std::size_t columns = 80;
+
+constexpr std::string_view bold = "1";
+constexpr std::string_view green = "32";
+constexpr std::string_view yellow = "33";
+constexpr std::string_view grey = "90";
+
+bool has_members(const board::Value& value)
+{
+    return !value.items().empty();
+}
+
+} // namespace
+
+Output::Output(const OutputOptions& options) : m_options(options)
+{
+}
+
+bool Output::json_to_people() const
+{
+    return m_options.trace == TraceForm::Json && m_options.trace_to == nullptr;
+}
+
+std::ostream* Output::people() const
+{
+    return m_options.quiet || json_to_people() ? nullptr : m_options.to;
+}
+
+std::string Output::painted(std::string_view text, std::string_view code) const
+{
+    return m_options.colour ? "\x1b[" + std::string(code) + "m" + std::string(text) + "\x1b[0m" : std::string(text);
+}
+
+void Output::command(std::string_view line)
+{
+    if (people() != nullptr)
+        *people() << painted("> " + std::string(line), bold) << '\n';
+}
+
+void Output::expectation(std::string_view line)
+{
+    if (people() != nullptr && m_options.verbose)
+        *people() << painted("> " + std::string(line), grey) << '\n';
+}
+
+void Output::outcome(const Outcome& outcome)
+{
+    flush();
+    if (people() == nullptr)
+        return;
+    if (outcome.result)
+        *people() << painted("  = " + outcome.result->to_text(), green) << '\n';
+    for (const OutputValue& output : outcome.outputs)
+    {
+        const std::string value = output.value ? " = " + output.value->to_text() : " untouched";
+        *people() << painted("  *" + output.name + value, green) << '\n';
+    }
+}
+
+void Output::text(std::string_view text)
+{
+    flush();
+    if (people() != nullptr)
+        *people() << text;
+}
+
+void Output::state(const std::string& path, const board::Value& value, bool json)
+{
+    flush();
+    if (json_to_people())
+    {
+        board::Value line;
+        line.add("kind", board::Value::text("state"));
+        line.add("path", board::Value::text(path));
+        line.add("value", value);
+        *m_options.to << line.to_json() << '\n';
+    }
+    else if (people() != nullptr && json)
+        *people() << value.to_json(2) << '\n';
+    else if (people() != nullptr && has_members(value))
+        *people() << tree(value, 2);
+    else if (people() != nullptr)
+        *people() << "  " << (path.empty() ? "" : path + " = ") << value.to_text() << '\n';
+}
+
+std::string Output::render(const board::TraceEntry& entry) const
+{
+    if (m_options.trace == TraceForm::Json)
+        return entry.to_json() + "\n";
+    char time[32];
+    std::snprintf(time, sizeof time, "%9llu.%03u  ", static_cast<unsigned long long>(entry.time_us / 1000),
+                  static_cast<unsigned>(entry.time_us % 1000));
+    const std::string line = time + std::string(2 * static_cast<std::size_t>(entry.depth), ' ') +
+                             (m_options.verbose ? entry.named() : entry.brief());
+    const bool remarkable =
+        entry.faulted || entry.kind == board::TraceEntry::Kind::Notice || entry.kind == board::TraceEntry::Kind::Assert;
+    const std::string mark = entry.faulted ? "  (scripted)" : "";
+    if (m_options.trace_to != nullptr)
+        return line + mark + "\n";
+    return painted(line + mark, remarkable ? yellow : grey) + "\n";
+}
+
+void Output::entry(const board::TraceEntry& entry)
+{
+    // Where people read the console, a line that it shows need not stand in the trace as well.
+    const bool on_console = entry.kind == board::TraceEntry::Kind::Log && entry.shown &&
+                            m_options.trace == TraceForm::Text && m_options.trace_to == nullptr;
+    if (m_trace_shown && m_options.trace != TraceForm::Off && !on_console)
+    {
+        if (entry.depth == 0)
+            write_trace(render(entry));
+        else
+            m_nested.push_back({ false, render(entry) });
+    }
+    if (entry.depth == 0)
+        release_nested();
+}
+
+void Output::console(std::string_view text)
+{
+    const auto& entries = board::trace::entries();
+    if (!entries.empty() && entries.back().depth > 0)
+        m_nested.push_back({ true, std::string(text) });
+    else
+        write_console(text);
+}
+
+void Output::write_trace(const std::string& line)
+{
+    if (m_options.trace_to != nullptr)
+        *m_options.trace_to << line;
+    else if (json_to_people())
+        *m_options.to << line;
+    else if (people() != nullptr)
+        *people() << line;
+}
+
+void Output::write_console(std::string_view text)
+{
+    for (const char c : text)
+    {
+        if (c != '\n')
+        {
+            m_console_line += c;
+            continue;
+        }
+        if (people() != nullptr)
+            *people() << "  | " << m_console_line << '\n';
+        m_console_line.clear();
+    }
+}
+
+void Output::release_nested()
+{
+    const std::vector<Nested> waiting = std::move(m_nested);
+    m_nested.clear();
+    for (const Nested& nested : waiting)
+    {
+        if (nested.is_console)
+            write_console(nested.text);
+        else
+            write_trace(nested.text);
+    }
+}
+
+void Output::flush()
+{
+    release_nested();
+    // A blank that the next console line begins with is no line of its own.
+    if (m_console_line.find_first_not_of(' ') != std::string::npos)
+        write_console("\n");
+    if (m_options.to != nullptr)
+        m_options.to->flush();
+    if (m_options.trace_to != nullptr)
+        m_options.trace_to->flush();
+}
+
+std::string item_step(std::size_t index)
+{
+    return std::string("[").append(std::to_string(index)).append("]");
+}
+
+std::string tree(const board::Value& value, std::size_t indent)
+{
+    std::string text;
+    const bool is_list = value.kind() == board::Value::Kind::List;
+    for (std::size_t i = 0; i < value.items().size(); ++i)
+    {
+        const board::Value& member = value.items()[i];
+        const std::string head = std::string(indent, ' ') + (is_list ? item_step(i) : value.keys()[i]);
+        const std::string line = head + " = " + member.to_text();
+        if (!has_members(member) || line.size() <= columns)
+            text += line + "\n";
+        else
+            text += head + "\n" + tree(member, indent + 2);
+    }
+    return text;
+}
+
+} // namespace pmxboard

@@ -1,0 +1,73 @@
+#include "tools/pmxboard/runner.h"
+
+#include <istream>
+#include <ostream>
+
+#include "tools/pmxboard/session.h"
+#include "tools/pmxboard/step_error.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+std::filesystem::path directory_of(const std::string& name)
+{
+    return name == "-" ? std::filesystem::path(".") : std::filesystem::path(name).parent_path();
+}
+
+/** A message that quotes a scenario, fit for a terminal: one line of bearable length, without control characters. */
+std::string presentable(std::string_view message)
+{
+    constexpr std::size_t most = 500;
+    constexpr std::string_view hex = "0123456789abcdef";
+    std::string line;
+    for (const char c : message.substr(0, most))
+    {
+        const auto byte = static_cast<unsigned char>(c);
+        if (byte >= 0x20 && byte != 0x7F)
+            line += c;
+        else
+            line.append("\\x").append(1, hex[byte >> 4]).append(1, hex[byte & 0xF]);
+    }
+    return message.size() > most ? line + "…" : line;
+}
+
+} // namespace
+
+bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOptions& options,
+                  std::ostream& diagnostics)
+{
+    Output output(options);
+    Session session(output, scenario.board, directory_of(scenario.name));
+    const std::string file = scenario.name == "-" ? "<stdin>" : scenario.name;
+    unsigned number = 0;
+    const auto location = [&] { return file + ":" + std::to_string(number) + ": "; };
+    try
+    {
+        std::string text;
+        while (std::getline(lines, text))
+        {
+            ++number;
+            session.run_line(text);
+        }
+        session.finish();
+    }
+    catch (const LineError& error)
+    {
+        output.flush();
+        diagnostics << location() << presentable(error.what()) << '\n';
+        return false;
+    }
+    catch (const std::exception& error)
+    {
+        output.flush();
+        diagnostics << location() << presentable(error.what()) << '\n' << "repeat: " << scenario.repeat << '\n';
+        return false;
+    }
+    if (session.expectations() != 0)
+        output.text(file + ": " + std::to_string(session.expectations()) + " expectations met\n");
+    return true;
+}
+
+} // namespace pmxboard

@@ -1,0 +1,276 @@
+#include <algorithm>
+#include <chrono>
+#include <limits>
+
+#include "board/board.h"
+#include "board/tokens.h"
+#include "tools/pmxboard/session.h"
+#include "tools/pmxboard/step_error.h"
+#include "tools/record_view/record_view.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+[[noreturn]] void wrong_usage(const Line& line)
+{
+    for (const Verb& verb : verbs())
+    {
+        if (verb.name == line.word(0))
+            throw LineError("write: " + std::string(verb.usage));
+    }
+    throw std::logic_error("a verb without a row");
+}
+
+void need_words(const Line& line, std::size_t least, std::size_t most)
+{
+    if (line.size() < least || line.size() > most)
+        wrong_usage(line);
+}
+
+/** A plain number in a range. */
+std::int64_t number_in(const std::string& word, const std::string& what, std::int64_t lowest, std::int64_t highest)
+{
+    const std::int64_t number = read_number(board::names::Family::None, word, what);
+    if (number < lowest || number > highest)
+        throw LineError(what + " is " + std::to_string(lowest) + " to " + std::to_string(highest) + ", not " + word);
+    return number;
+}
+
+bool read_switch(const Line& line, const std::string& word)
+{
+    if (word != "on" && word != "off")
+        wrong_usage(line);
+    return word == "on";
+}
+
+std::string read_text(const Line& line, const std::string& word)
+{
+    if (!word.starts_with('"'))
+        wrong_usage(line);
+    return read_value({ .form = Kind::Form::Text, .names = {}, .members = {} }, word, "the text").string();
+}
+
+void power_on(Session& session, const Line& line)
+{
+    need_words(line, 1, 2);
+    session.power_on(line.size() == 2 ? line.word(1) : std::string());
+}
+
+void flash(Session& session, const Line& line)
+{
+    need_words(line, 3, 3);
+    try
+    {
+        board::set_flash(line.word(1), line.word(2) == "off" ? std::filesystem::path() : session.file(line.word(2)));
+    }
+    catch (const std::invalid_argument& error)
+    {
+        throw LineError(error.what());
+    }
+}
+
+const board::PlatformFunction& platform_function(const std::string& name)
+{
+    const auto all = board::platform_functions();
+    const auto found =
+        std::find_if(all.begin(), all.end(), [&](const auto& function) { return function.name == name; });
+    if (found != all.end())
+        return *found;
+    std::vector<std::string_view> names;
+    for (const auto& function : all)
+        names.push_back(function.name);
+    throw LineError("the platform has no function " + name + did_you_mean(name, names));
+}
+
+void fault(Session&, const Line& line)
+{
+    need_words(line, 3, 5);
+    const std::string& function = line.word(1);
+    platform_function(function);
+    if (line.word(2) == "off" && line.size() == 3)
+    {
+        board::faults::clear(function);
+        return;
+    }
+    board::Fault scripted;
+    scripted.function = function;
+    const auto family = board::names::family_of(function, "result");
+    scripted.answer = read_number(family, line.word(2), "the answer");
+    if (scripted.answer < std::numeric_limits<std::int32_t>::min() ||
+        scripted.answer > std::numeric_limits<std::uint32_t>::max())
+        throw LineError("the answer has 32 bits, and " + line.word(2) + " does not fit");
+    if (line.size() > 3)
+    {
+        const bool has_number = line.word(3) == "on" || line.word(3) == "from";
+        if ((!has_number && line.word(3) != "always") || line.size() != (has_number ? 5 : 4))
+            wrong_usage(line);
+        scripted.when = line.word(3) == "on"     ? board::Fault::When::On
+                        : line.word(3) == "from" ? board::Fault::When::From
+                                                 : board::Fault::When::Always;
+        if (has_number)
+            scripted.n = static_cast<unsigned>(
+                number_in(line.word(4), "the call's number", 1, std::numeric_limits<std::int32_t>::max()));
+    }
+    try
+    {
+        board::faults::set(scripted);
+    }
+    catch (const std::invalid_argument& error)
+    {
+        throw LineError(error.what());
+    }
+}
+
+void advance(Session&, const Line& line)
+{
+    need_words(line, 2, 2);
+    const std::string& word = line.word(1);
+    const std::size_t unit_at = word.find_first_not_of("0123456789");
+    const std::string unit = unit_at == word.npos ? "" : word.substr(unit_at);
+    const std::int64_t scale = unit == "s" ? 1000000 : unit == "ms" ? 1000 : unit == "us" ? 1 : 0;
+    if (scale == 0 || unit_at == 0)
+        wrong_usage(line);
+    constexpr std::int64_t year = std::int64_t{ 366 } * 24 * 3600 * 1000000;
+    const std::int64_t count = number_in(word.substr(0, unit_at), "the time in " + unit, 0, year / scale);
+    board::advance(std::chrono::microseconds(count * scale));
+}
+
+void loglevel(Session&, const Line& line)
+{
+    need_words(line, 2, 2);
+    board::set_console_level(static_cast<int>(number_in(line.word(1), "the console's level", -1, 1000)));
+}
+
+void state(Session& session, const Line& line)
+{
+    need_words(line, 1, 3);
+    bool json = false;
+    std::string path;
+    for (std::size_t i = 1; i < line.size(); ++i)
+    {
+        if (line.word(i) == "--json")
+            json = true;
+        else if (path.empty() && !line.word(i).starts_with('-'))
+            path = line.word(i);
+        else
+            wrong_usage(line);
+    }
+    session.output().state(path, path.empty() ? whole_state() : state_at(path), json);
+}
+
+void poke(Session&, const Line& line)
+{
+    need_words(line, 3, 3);
+    try
+    {
+        const record_view::FieldType field = record_view::type_of(line.word(1));
+        const auto family = board::names::family_of(field.record, field.member);
+        record_view::set(line.word(1), read_number(family, line.word(2), field.path));
+    }
+    catch (const record_view::FieldError& error)
+    {
+        throw LineError(error.what());
+    }
+}
+
+void trace(Session& session, const Line& line)
+{
+    need_words(line, 2, 2);
+    session.output().show_trace(read_switch(line, line.word(1)));
+}
+
+void suspend(Session& session, const Line& line)
+{
+    need_words(line, 1, 1);
+    session.set_outcome("suspend", { board::Value::number(board::suspend()), {} });
+}
+
+void resume(Session& session, const Line& line)
+{
+    need_words(line, 1, 1);
+    session.set_outcome("resume", { board::Value::number(board::resume()), {} });
+}
+
+void print(Session& session, const Line& line)
+{
+    need_words(line, 2, 2);
+    session.output().text(read_text(line, line.word(1)));
+}
+
+void neighbour(Session& session, const Line& line)
+{
+    if (line.size() < 2)
+        wrong_usage(line);
+    const Operation* const operation = find(neighbours(), line.word(1));
+    if (operation == nullptr)
+        throw LineError("a neighbour cannot call " + line.word(1) + " here" +
+                        did_you_mean(line.word(1), names_of(neighbours())));
+    const Values values = read_arguments(*operation, std::span(line.words()).subspan(2));
+    session.set_outcome(operation->name, operation->run(values));
+}
+
+void expectation(Session& session, const Line& line)
+{
+    check_expectation(session, line);
+}
+
+void collect_paths(const board::Value& value, const std::string& path, std::vector<std::string>& into)
+{
+    if (!path.empty())
+        into.push_back(path);
+    for (std::size_t i = 0; i < value.items().size(); ++i)
+    {
+        const std::string step = value.kind() == board::Value::Kind::List ? item_step(i)
+                                 : path.empty()                           ? value.keys()[i]
+                                                                          : "." + value.keys()[i];
+        collect_paths(value.items()[i], path + step, into);
+    }
+}
+
+} // namespace
+
+const std::vector<Verb>& verbs()
+{
+    static const std::vector<Verb> all = {
+        { "power-on", "power-on [BOARD]", power_on },
+        { "flash", "flash PARTITION FILE, or flash PARTITION off", flash },
+        { "fault", "fault FUNCTION ANSWER [on N|from N|always], or fault FUNCTION off", fault },
+        { "advance", "advance 10s, 500ms or 2us", advance },
+        { "loglevel", "loglevel LEVEL", loglevel },
+        { "state", "state [PATH] [--json]", state },
+        { "poke", "poke FIELD VALUE", poke },
+        { "trace", "trace on, or trace off", trace },
+        { "suspend", "suspend", suspend },
+        { "resume", "resume", resume },
+        { "print", "print \"text\"", print },
+        { "neighbour", "neighbour FUNCTION [ARGUMENT…]", neighbour },
+        { "ipmx", "ipmx SLOT tag|NUMBER [ARGUMENT…]", run_ipmx },
+        { "expect", "expect result|out|call|next|no-more|none|log|console|state|asserts|misuses …", expectation },
+    };
+    return all;
+}
+
+board::Value whole_state()
+{
+    board::Value all = board::state();
+    const board::Value layer = record_view::state();
+    for (std::size_t i = 0; i < layer.keys().size(); ++i)
+        all.add(layer.keys()[i], layer.items()[i]);
+    return all;
+}
+
+board::Value state_at(const std::string& path)
+{
+    const board::Value board_state = board::state();
+    if (const board::Value* const found = board_state.find(path); found != nullptr && !path.empty())
+        return *found;
+    if (record_view::has(path))
+        return record_view::get(path);
+    std::vector<std::string> paths;
+    collect_paths(whole_state(), {}, paths);
+    throw LineError("no state " + path + did_you_mean(path, { paths.begin(), paths.end() }));
+}
+
+} // namespace pmxboard

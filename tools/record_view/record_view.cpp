@@ -1,0 +1,292 @@
+#include "tools/record_view/record_view.h"
+
+#include <bit>
+#include <cstring>
+#include <map>
+#include <optional>
+
+#include "board/executable_symbols.h"
+#include "board/names.h"
+#include "board/tokens.h"
+#include "tools/record_view/record_layout.h"
+
+namespace record_view
+{
+namespace
+{
+
+using board::Value;
+
+static_assert(std::endian::native == std::endian::little, "fields are read and written byte by byte, lowest first");
+
+/** One node of one object. */
+struct Place
+{
+    const Node* node = nullptr;
+    const Object* object = nullptr;
+    std::size_t offset = 0; ///< in the object
+    std::string path;       ///< as fields() writes it
+};
+
+/** Where an object lies; it stays there, and is looked up once. */
+unsigned char* address_of(const Object& object)
+{
+    static std::map<const Object*, unsigned char*> known;
+    unsigned char*& address = known[&object];
+    if (address != nullptr)
+        return address;
+
+    const auto symbol = board::executable_symbols::find(object.symbol);
+    if (!symbol)
+        throw std::runtime_error("the layer's object " + object.symbol + " is not in this executable");
+    if (symbol->size != object.node.size)
+        throw std::runtime_error("the layer's object " + object.symbol + " has " + std::to_string(symbol->size) +
+                                 " bytes, not " + std::to_string(object.node.size));
+    address = static_cast<unsigned char*>(symbol->address);
+    return address;
+}
+
+bool is_single(const Node& node)
+{
+    return node.form == Node::Form::Number || node.form == Node::Form::Pointer;
+}
+
+/** Words that are read bit by bit or digit by digit. */
+bool reads_best_in_hex(std::string_view name)
+{
+    return name == "u4BgColor" || name == "u4Capability" || name == "u4PlaneOrder" || name == "PMX_debug_level";
+}
+
+Value number_at(const Node& node, const unsigned char* at)
+{
+    std::uint64_t bits = 0;
+    std::memcpy(&bits, at, node.size);
+    std::int64_t number = static_cast<std::int64_t>(bits);
+    if (node.is_signed && node.size == sizeof(std::int32_t))
+        number = static_cast<std::int32_t>(bits);
+
+    if (node.form == Node::Form::Pointer)
+        return number == 0 ? Value::null() : Value::number(number, {}, Value::Base::Hex);
+    return Value::number(number, board::names::name_of(board::names::family_of(node.owner, node.name), number),
+                         reads_best_in_hex(node.name) ? Value::Base::Hex : Value::Base::Decimal);
+}
+
+Value value_at(const Node& node, const unsigned char* at)
+{
+    if (is_single(node))
+        return number_at(node, at);
+    if (node.form == Node::Form::List)
+    {
+        std::vector<Value> items;
+        for (const Node& child : node.children)
+            items.push_back(value_at(child, at + child.offset));
+        return Value::list(std::move(items));
+    }
+    std::vector<std::pair<std::string, Value>> members;
+    for (const Node& child : node.children)
+        members.emplace_back(child.name, value_at(child, at + child.offset));
+    return Value::record(std::move(members));
+}
+
+/** How fields() begins the names below an object: those of the record stand alone. */
+std::string prefix_of(const Object& object)
+{
+    return object.group == "record" ? "" : object.symbol;
+}
+
+void collect(const Node& node, const std::string& path, std::vector<std::string>& into)
+{
+    if (is_single(node))
+        into.push_back(path);
+    for (std::size_t i = 0; i < node.children.size(); ++i)
+    {
+        const std::string& name = node.children[i].name;
+        if (node.form == Node::Form::List)
+            collect(node.children[i], path + "[" + std::to_string(i) + "]", into);
+        else
+            collect(node.children[i], path.empty() ? name : path + "." + name, into);
+    }
+}
+
+/** Go from a record or array to what `step` names, "name" or "[index]"; the index may be a symbolic name. */
+bool descend(Place& place, std::string_view step)
+{
+    const Node* next = nullptr;
+    if (step.starts_with('['))
+    {
+        const std::string_view written = step.substr(1, step.size() - 2);
+        auto index = board::tokens::number(written);
+        if (!index)
+            index = board::names::number_of(written);
+        const auto& items = place.node->children;
+        if (place.node->form != Node::Form::List || !index || *index < 0 ||
+            static_cast<std::size_t>(*index) >= items.size())
+            return false;
+        next = &items[static_cast<std::size_t>(*index)];
+        place.path.append("[").append(std::to_string(*index)).append("]");
+    }
+    else
+    {
+        if (place.node->form != Node::Form::Record)
+            return false;
+        for (const Node& child : place.node->children)
+        {
+            if (child.name == step)
+                next = &child;
+        }
+        place.path.append(place.path.empty() ? "" : ".").append(step);
+    }
+    if (next == nullptr)
+        return false;
+    place.node = next;
+    place.offset += next->offset;
+    return true;
+}
+
+/** Go down along "name[index].name…"; nothing when it leads nowhere. */
+std::optional<Place> walk(Place place, std::string_view path)
+{
+    while (!path.empty())
+    {
+        std::size_t length = path.find_first_of(".[");
+        if (length == 0 && path.front() == '[')
+        {
+            length = path.find(']');
+            length = length == std::string_view::npos ? length : length + 1;
+        }
+        const std::string_view step = path.substr(0, length);
+        if (step.empty() || (step.front() == '[' && step.back() != ']') || !descend(place, step))
+            return std::nullopt;
+        path.remove_prefix(step.size());
+        if (path.starts_with('.'))
+        {
+            path.remove_prefix(1);
+            if (path.empty())
+                return std::nullopt;
+        }
+    }
+    return place;
+}
+
+std::optional<Place> find(std::string_view path)
+{
+    const Object* record = nullptr;
+    for (const Object& object : objects())
+    {
+        const Place root{ &object.node, &object, 0, prefix_of(object) };
+        if (object.group == "record")
+            record = &object;
+        if (path == object.symbol || path == object.group + "." + object.symbol)
+            return root;
+        if (object.group == "module")
+            continue;
+        if (path == object.group)
+            return root;
+        for (const std::string& lead : { object.group + ".", object.symbol + ".", object.symbol + "[0]." })
+        {
+            if (path.starts_with(lead) && path.size() > lead.size())
+                return walk(root, path.substr(lead.size()));
+        }
+    }
+    return path.empty() ? std::nullopt : walk({ &record->node, record, 0, "" }, path);
+}
+
+[[noreturn]] void no_such_field(std::string_view path)
+{
+    std::vector<std::string> known = fields();
+    for (const Object& object : objects())
+    {
+        for (const Node& child : object.node.children)
+        {
+            if (!is_single(child))
+                known.push_back(child.name);
+        }
+    }
+    std::string message = "no field " + std::string(path);
+    const auto nearest = board::names::nearest(path, { known.begin(), known.end() });
+    for (std::size_t i = 0; i < nearest.size(); ++i)
+        message += (i == 0 ? "; did you mean " : ", ") + nearest[i];
+    throw FieldError(message + (nearest.empty() ? "" : "?"));
+}
+
+Place place_of(std::string_view path)
+{
+    if (const auto place = find(path))
+        return *place;
+    no_such_field(path);
+}
+
+Place single_place_of(std::string_view path)
+{
+    const Place place = place_of(path);
+    if (is_single(*place.node))
+        return place;
+    std::vector<std::string> below;
+    collect(*place.node, place.path, below);
+    throw FieldError(std::string(path) + " is not a single field; did you mean " + below.front() + "?");
+}
+
+} // namespace
+
+Value state()
+{
+    Value all;
+    Value module;
+    for (const Object& object : objects())
+    {
+        Value value = value_at(object.node, address_of(object));
+        if (object.group == "module")
+            module.add(object.symbol, std::move(value));
+        else
+            all.add(object.group, std::move(value));
+    }
+    all.add("module", std::move(module));
+    return all;
+}
+
+Value get(std::string_view path)
+{
+    if (path == "module")
+        return *state().find(path);
+    const Place place = place_of(path);
+    return value_at(*place.node, address_of(*place.object) + place.offset);
+}
+
+bool has(std::string_view path)
+{
+    return path == "module" || find(path).has_value();
+}
+
+void set(std::string_view path, std::int64_t number)
+{
+    const Place place = single_place_of(path);
+    const Range range = type_of(path).range();
+    if (number < range.lowest || number > range.highest)
+        throw FieldError(place.path + " holds " + std::to_string(range.lowest) + " to " +
+                         std::to_string(range.highest) + ", not " + std::to_string(number));
+    std::memcpy(address_of(*place.object) + place.offset, &number, place.node->size);
+}
+
+FieldType type_of(std::string_view path)
+{
+    const Place place = single_place_of(path);
+    return { place.path, place.node->owner, place.node->name, static_cast<unsigned>(8 * place.node->size),
+             place.node->is_signed };
+}
+
+Range FieldType::range() const
+{
+    const unsigned magnitude = is_signed || bits == 64 ? bits - 1 : bits;
+    const auto highest = static_cast<std::int64_t>((std::uint64_t{ 1 } << magnitude) - 1);
+    return { is_signed ? -highest - 1 : 0, highest };
+}
+
+std::vector<std::string> fields()
+{
+    std::vector<std::string> all;
+    for (const Object& object : objects())
+        collect(object.node, prefix_of(object), all);
+    return all;
+}
+
+} // namespace record_view

@@ -118,14 +118,9 @@ TEST(Ipmx, SlotsTakeTheTagFirst)
     EXPECT_TRUE((std::is_same_v<decltype(IPMX::pi4VdpGetPlanePosition), INT32 (*)(void*, UCHAR)>));
 }
 
-// Mode setting is not there yet: a neighbour that looks finds the slot empty. Its function's arrival ends this test.
-TEST(Ipmx, SlotOfModeSettingIsEmptyYet)
-{
-    EXPECT_EQ(nullptr, _rPMXIF.pi4SetMode);
-}
-
 TEST(Ipmx, SlotsHoldTheAdaptors)
 {
+    EXPECT_EQ(&i4PmxSetMode, _rPMXIF.pi4SetMode);
     EXPECT_EQ(&i4PmxGetMode, _rPMXIF.pi4GetMode);
     EXPECT_EQ(&i4PmxGetOutSize, _rPMXIF.pi4GetOutSize);
     EXPECT_EQ(&i4PmxGetAspectRatio, _rPMXIF.pi4GetAspectRatio);

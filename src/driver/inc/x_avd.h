@@ -6,7 +6,8 @@
 #include "x_typedef.h"
 
 /** Colour format that the HDMI transmitter sends; one byte in PMX_CHG_HDMI_COLOR_SPACE. */
-typedef DRV_ENUM(HDMI_COLOR_SPACE_T) {
+typedef DRV_ENUM(HDMI_COLOR_SPACE_T)
+{
     HDMI_RGB = 0,
     HDMI_RGB_FULL = 1,
     HDMI_YCBCR_444 = 2,
@@ -17,13 +18,15 @@ typedef DRV_ENUM(HDMI_COLOR_SPACE_T) {
 } HDMI_COLOR_SPACE_T;
 
 /** Picture aspect ratio M1 M0 of the auxiliary video information frame (CEA-861). */
-typedef DRV_ENUM(HDMI_PICTURE_ASPECT_RATIO_T) {
+typedef DRV_ENUM(HDMI_PICTURE_ASPECT_RATIO_T)
+{
     HDMI_PICTURE_4_3 = 1,
     HDMI_PICTURE_16_9 = 2
 } HDMI_PICTURE_ASPECT_RATIO_T;
 
 /** Active format aspect ratio R3 to R0 of the auxiliary video information frame (CEA-861). */
-typedef DRV_ENUM(HDMI_AFD_FORMT_T) {
+typedef DRV_ENUM(HDMI_AFD_FORMT_T)
+{
     HDMI_AS_PICTURE_AR = 8 /**< same as the picture aspect ratio */
 } HDMI_AFD_FORMT_T;
 

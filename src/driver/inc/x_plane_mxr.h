@@ -6,7 +6,8 @@
 #include "x_typedef.h"
 
 /** Colour format of the digital picture (parallel port and HDMI). */
-typedef DRV_ENUM(PLA_MXR_DIGITAL_OUTPUT_FMT_T) {
+typedef DRV_ENUM(PLA_MXR_DIGITAL_OUTPUT_FMT_T)
+{
     PLA_MXR_DIGITAL_OUTPUT_FMT_YBR = 0,
     PLA_MXR_DIGITAL_OUTPUT_FMT_RGB = 1,
     PLA_MXR_DIGITAL_OUTPUT_FMT_XVYCC = 2,
@@ -15,7 +16,8 @@ typedef DRV_ENUM(PLA_MXR_DIGITAL_OUTPUT_FMT_T) {
 } PLA_MXR_DIGITAL_OUTPUT_FMT_T;
 
 /** Picture-processing setting of the external chip. The HDMI/AV driver's command is the setting plus 17. */
-typedef DRV_ENUM(PLA_MXR_EXTERNAL_CHIP_SETTING_E) {
+typedef DRV_ENUM(PLA_MXR_EXTERNAL_CHIP_SETTING_E)
+{
     PLA_MXR_EXT_SHARPNESS = 0,
     PLA_MXR_EXT_BRIGHTNESS = 1,
     PLA_MXR_EXT_CONTRAST = 2,
@@ -34,7 +36,8 @@ typedef DRV_ENUM(PLA_MXR_EXTERNAL_CHIP_SETTING_E) {
 } PLA_MXR_EXTERNAL_CHIP_SETTING_E;
 
 /** Closed-caption switch. */
-typedef DRV_ENUM(PLA_MXR_CLOSED_CAPTION_ON_OFF_T) {
+typedef DRV_ENUM(PLA_MXR_CLOSED_CAPTION_ON_OFF_T)
+{
     PLA_MXR_CLOSED_CAPTION_OFF = 0,
     PLA_MXR_CLOSED_CAPTION_ON = 1
 } PLA_MXR_CLOSED_CAPTION_ON_OFF_T;

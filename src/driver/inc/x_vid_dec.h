@@ -6,7 +6,8 @@
 #include "x_typedef.h"
 
 /** Aspect code; carried in a UINT32. */
-typedef DRV_ENUM(ASPECT_RATIO_T) {
+typedef DRV_ENUM(ASPECT_RATIO_T)
+{
     ASP_UNKNOW = 0,
     ASP_1_1 = 1,
     ASP_4_3 = 2,

@@ -1,18 +1,168 @@
-/* Aspect ratio of the output picture. */
+/* Aspect ratio of the output picture: the normal one, one that waits for the next mode change, and the digest
+ * view's. */
+#include "drv_av_d.h"
 #include "drv_pmx.h"
+#include "drv_tve.h"
+#include "drv_vdp.h"
 #include "pmx_if.h"
+#include "u_os.h"
+#include "x_avd.h"
+#include "x_vid_dec.h"
 
-UINT32 PMX_GetAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio)
+/* Signal a normal ratio; FALSE when the HDMI/AV driver refuses it. */
+static BOOL fgSignalHdmi(UINT32 u4AspectRatio)
+{
+    return fgPmxDrvSetAvd(PMX_CHG_HDMI_VIDEO_ASPECT_RATIO, &u4AspectRatio, 1);
+}
+
+UINT32 PMX_SetAspectRatio(UCHAR ucPmxId, UINT32 u4AspectRatio)
+{
+    if (ucPmxId != 0)
+        return 0;
+
+    PMX_IsLog(9, "PMX_ID(%d), Aspect Ratio(%d)\n", ucPmxId, (INT32)u4AspectRatio);
+    prPmxConf()->u4AspectRatio = u4AspectRatio; // before HDMI is asked: a refusal leaves it new
+    if (fgSignalHdmi(u4AspectRatio) == FALSE)
+        return 0;
+
+    VDP_GlobalOutputChange();
+    PMX_IsLog(9, "VDP_GlobalOutputChange\n");
+    return 1;
+}
+
+UINT32 PMX_SetAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgApplyOnNext)
+{
+    if (ucPmxId != 0)
+        return 0;
+
+    PMX_CONF_T* prConf = prPmxConf();
+    PMX_IsLog(9, "[EX] PMX_ID(%d), Aspect Ratio(%d), Apply On Next(%d)\n", ucPmxId, (INT32)u4AspectRatio,
+              fgApplyOnNext);
+    if (fgApplyOnNext != 0)
+    {
+        prConf->fgAspNext = 1;
+        prConf->u4AspNext = u4AspectRatio;
+        return 1;
+    }
+
+    prConf->u4AspectRatio = u4AspectRatio;
+    prConf->fgAspNext = 0;
+    prConf->u4AspNext = 0;
+    if (fgSignalHdmi(u4AspectRatio) == FALSE)
+        return 0;
+
+    VDP_GlobalOutputChange();
+    PMX_IsLog(9, "[EX] VDP_GlobalOutputChange\n");
+    return 1;
+}
+
+/* The result is a ratio, not a success; nothing waiting is no failure. */
+UINT32 PMX_SetAspectRatioNext(UCHAR ucPmxId)
+{
+    PMX_CONF_T* prConf = prPmxConf();
+    if (prConf->fgAspNext == 0)
+        return prConf->u4AspectRatio;
+
+    prConf->fgAspNext = 0;
+    prConf->u4AspectRatio = prConf->u4AspNext;
+    if (ucPmxId == 0 && fgSignalHdmi(prConf->u4AspectRatio) == FALSE)
+        return 0;
+
+    VDP_GlobalOutputChange();
+    return prConf->u4AspectRatio;
+}
+
+/* What an aspect code is signalled as. */
+typedef struct
+{
+    UINT8 u1Asp; // the row's own code
+    TVE_ASPECT_RATIO_T TveAsp;
+    HDMI_PICTURE_ASPECT_RATIO_T Hdmi_par;
+    HDMI_AFD_FORMT_T Hdmi_afd;
+} SIGNALLING_T;
+
+// clang-format off
+static constexpr SIGNALLING_T SIGNALLING[] = {
+    { ASP_UNKNOW,        ASPECT_RATIO_16_9_FULL_FORMAT, HDMI_PICTURE_16_9, HDMI_AS_PICTURE_AR },
+    { ASP_1_1,           ASPECT_RATIO_16_9_FULL_FORMAT, HDMI_PICTURE_16_9, HDMI_AS_PICTURE_AR },
+    { ASP_4_3,           ASPECT_RATIO_4_3,              HDMI_PICTURE_4_3,  HDMI_AS_PICTURE_AR },
+    { ASP_16_9,          ASPECT_RATIO_16_9_FULL_FORMAT, HDMI_PICTURE_16_9, HDMI_AS_PICTURE_AR },
+    { ASP_221_1,         ASPECT_RATIO_16_9_FULL_FORMAT, HDMI_PICTURE_16_9, HDMI_AS_PICTURE_AR },
+    { ASP_4_3_LB,        ASPECT_RATIO_4_3,              HDMI_PICTURE_4_3,  HDMI_AS_PICTURE_AR },
+    { ASP_16_9_NORMAL,   ASPECT_RATIO_16_9_FULL_FORMAT, HDMI_PICTURE_16_9, HDMI_AS_PICTURE_AR },
+    { ASP_UNDEFINED,     ASPECT_RATIO_16_9_FULL_FORMAT, HDMI_PICTURE_16_9, HDMI_AS_PICTURE_AR },
+    { ASP_16_9_PAN_SCAN, ASPECT_RATIO_16_9_FULL_FORMAT, HDMI_PICTURE_16_9, HDMI_AS_PICTURE_AR },
+    { ASP_4_3_FULL,      ASPECT_RATIO_4_3,              HDMI_PICTURE_4_3,  HDMI_AS_PICTURE_AR },
+    // every other code
+    { ASP_4_3_FULL + 1,  ASPECT_RATIO_16_9_FULL_FORMAT, HDMI_PICTURE_16_9, HDMI_AS_PICTURE_AR },
+};
+// clang-format on
+
+static const SIGNALLING_T* prSignallingOf(UINT32 u4AspectRatio)
+{
+    return &SIGNALLING[u4AspectRatio <= ASP_4_3_FULL ? u4AspectRatio : ASP_4_3_FULL + 1];
+}
+
+UINT32 PMX_SetDigestAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgDigestEnable)
+{
+    if (ucPmxId != 0)
+        return 0;
+
+    PMX_CONF_T* prConf = prPmxConf();
+    PMX_IsLog(0, "[EX] PMX_ID(%d), Digest Aspect Ratio(%d), Digest mode enable(%d)\n", ucPmxId, (INT32)u4AspectRatio,
+              fgDigestEnable);
+    prConf->fgDigestEnable = fgDigestEnable != 0;
+    prConf->u4DigestAsp = u4AspectRatio; // stored when the view is left, too
+    VDP_GlobalOutputChange();
+    if (fgDigestEnable != 0)
+        return 1;
+
+    const SIGNALLING_T* prSignalling = prSignallingOf(u4AspectRatio);
+    TVE_SetAspectRatio(prSignalling->TveAsp);
+    // HDMI's values are shown, not sent: the sink keeps what the normal ratio signalled.
+    PMX_IsLog(0, "[EX] TveAsp = %d Hdmi(par = %d,afd = %d)\n", (INT32)prSignalling->TveAsp,
+              (INT32)prSignalling->Hdmi_par, (INT32)prSignalling->Hdmi_afd);
+    return 1;
+}
+
+static UINT32 u4GetRatio(UCHAR ucPmxId, UINT32 u4Ratio, UINT32* pu4AspectRatio)
 {
     if (ucPmxId != 0 || pu4AspectRatio == nullptr)
         return 0;
 
-    const PMX_CONF_T* prConf = prPmxConf();
-    *pu4AspectRatio = prConf->fgDigestEnable != 0 ? prConf->u4DigestAsp : prConf->u4AspectRatio;
+    *pu4AspectRatio = u4Ratio;
     return 1;
+}
+
+UINT32 PMX_GetAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio)
+{
+    const PMX_CONF_T* prConf = prPmxConf();
+    return u4GetRatio(ucPmxId, prConf->fgDigestEnable != 0 ? prConf->u4DigestAsp : prConf->u4AspectRatio,
+                      pu4AspectRatio);
 }
 
 INT32 i4PmxGetAspectRatio(void* pvTag, UINT32* pu4AspectRatio)
 {
     return (INT32)PMX_GetAspectRatio(ucPmxIdOfTag(pvTag), pu4AspectRatio);
+}
+
+BOOL PMX_IsUnderDigestMode(UCHAR ucPmxId)
+{
+    return ucPmxId == 0 ? prPmxConf()->fgDigestEnable : FALSE;
+}
+
+UINT32 PMX_GetNormalAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio)
+{
+    return u4GetRatio(ucPmxId, prPmxConf()->u4AspectRatio, pu4AspectRatio);
+}
+
+UINT32 PMX_GetDigestAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio)
+{
+    return u4GetRatio(ucPmxId, prPmxConf()->u4DigestAsp, pu4AspectRatio);
+}
+
+UINT32 PMX_GetAspectRatioMW(UCHAR ucPmxId, UINT32* pu4AspectRatio)
+{
+    const PMX_CONF_T* prConf = prPmxConf();
+    return u4GetRatio(ucPmxId, prConf->fgAspNext != 0 ? prConf->u4AspNext : prConf->u4AspectRatio, pu4AspectRatio);
 }

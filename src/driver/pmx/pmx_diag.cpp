@@ -29,20 +29,22 @@ void PMX_Printf(INT32 level, const char* format_string, ...)
 
 /* What the report prints for each value; a value behind the end of its list has no line. */
 
-static constexpr const CHAR* COLOUR_SPACE_NAMES[] = {"DRV_PMX_CS_YCBCR_601", "DRV_PMX_CS_YCBCR_709", "DRV_PMX_CS_RGB"};
+static constexpr const CHAR* COLOUR_SPACE_NAMES[] = { "DRV_PMX_CS_YCBCR_601", "DRV_PMX_CS_YCBCR_709",
+                                                      "DRV_PMX_CS_RGB" };
 
-static constexpr const CHAR* COLOUR_MODE_NAMES[] = {"DRV_GFX_COLOR_MODE_YCBCR", "DRV_GFX_COLOR_MODE_RGB"};
+static constexpr const CHAR* COLOUR_MODE_NAMES[] = { "DRV_GFX_COLOR_MODE_YCBCR", "DRV_GFX_COLOR_MODE_RGB" };
 
 /* DRV_RX_BYPASS_TX has no line. */
-static constexpr const CHAR* EXT_CHIP_NAMES[] = {"DRV_NON_EXT_CHIP", "DRV_EXT_SCL_EXT_TX", "DRV_EXT_SCL_INT_TX"};
+static constexpr const CHAR* EXT_CHIP_NAMES[] = { "DRV_NON_EXT_CHIP", "DRV_EXT_SCL_EXT_TX", "DRV_EXT_SCL_INT_TX" };
 
 /* The report's list of modes is older than the modes: up to 38 it is szResStr, then RES_2D_640x480HZ is missing, and
  * after the panel come the two entries that ended the enumeration then. */
 #define REPORT_RES_LATE RES_2D_640x480HZ
-static constexpr const CHAR* RES_LATE_NAMES[] = {"RES_PANEL_AUO_B089AW01", "RES_MODE_NUM", "RES_AUTO"};
+static constexpr const CHAR* RES_LATE_NAMES[] = { "RES_PANEL_AUO_B089AW01", "RES_MODE_NUM", "RES_AUTO" };
 
 /* The lines of the digital port, which differ in their blanks. */
-typedef enum : UINT8 {
+typedef enum : UINT8
+{
     LINE_F1,
     LINE_F2,
     LINE_F3,
@@ -54,29 +56,30 @@ typedef enum : UINT8 {
     LINE_N2
 } CCIR_LINE_T;
 
-typedef struct {
+typedef struct
+{
     const CHAR* szName;
     CCIR_LINE_T eInputLine;
     CCIR_LINE_T eOutputLine;
 } CCIR_TEXT_T;
 
 static constexpr CCIR_TEXT_T CCIR_FORMAT_TEXTS[] = {
-    {"CCIR_NON_USED", LINE_F1, LINE_G1},
-    {"CCIR_YCMIX_8BIT", LINE_F2, LINE_G2},
-    {"CCIR_YCMIX_10BIT", LINE_F2, LINE_G2},
-    {"CCIR_YCMIX_12BIT", LINE_F2, LINE_F2}, // the output's format is labelled as the input's
-    {"CCIR_YC422_16BIT", LINE_F2, LINE_G2},
-    {"CCIR_YC422_20BIT", LINE_F3, LINE_G2},
-    {"CCIR_YC422_24BIT", LINE_F2, LINE_G1},
-    {"CCIR_YC444_24BIT", LINE_F2, LINE_G1},
-    {"CCIR_YC444_30BIT", LINE_F2, LINE_G2},
-    {"CCIR_YC444_36BIT", LINE_F1, LINE_G2},
+    { "CCIR_NON_USED", LINE_F1, LINE_G1 },
+    { "CCIR_YCMIX_8BIT", LINE_F2, LINE_G2 },
+    { "CCIR_YCMIX_10BIT", LINE_F2, LINE_G2 },
+    { "CCIR_YCMIX_12BIT", LINE_F2, LINE_F2 }, // the output's format is labelled as the input's
+    { "CCIR_YC422_16BIT", LINE_F2, LINE_G2 },
+    { "CCIR_YC422_20BIT", LINE_F3, LINE_G2 },
+    { "CCIR_YC422_24BIT", LINE_F2, LINE_G1 },
+    { "CCIR_YC444_24BIT", LINE_F2, LINE_G1 },
+    { "CCIR_YC444_30BIT", LINE_F2, LINE_G2 },
+    { "CCIR_YC444_36BIT", LINE_F1, LINE_G2 },
 };
 
 static constexpr CCIR_TEXT_T CCIR_MODE_TEXTS[] = {
-    {"CCIR_INVALID", LINE_M1, LINE_N1},
-    {"CCIR_601_MODE", LINE_M2, LINE_N1},
-    {"CCIR_656_MODE", LINE_M2, LINE_N2},
+    { "CCIR_INVALID", LINE_M1, LINE_N1 },
+    { "CCIR_601_MODE", LINE_M2, LINE_N1 },
+    { "CCIR_656_MODE", LINE_M2, LINE_N2 },
 };
 
 static void vReportCcirLine(CCIR_LINE_T eLine, INT32 i, const CHAR* szName)
@@ -84,33 +87,15 @@ static void vReportCcirLine(CCIR_LINE_T eLine, INT32 i, const CHAR* szName)
 #define CCIR_INFO "[PMX]PMX(%d,) _arPmxConf[%d].arOutputConf[%d].eCcirDrvInfo."
     switch (eLine)
     {
-    case LINE_F1:
-        PMX_IsLog(0, CCIR_INFO "eDgiFmt(%s) \n ", 0, 0, i, szName);
-        break;
-    case LINE_F2:
-        PMX_IsLog(0, CCIR_INFO "eDgiFmt(%s)  \n", 0, 0, i, szName);
-        break;
-    case LINE_F3:
-        PMX_IsLog(0, CCIR_INFO "eDgiFmt(%s) \n", 0, 0, i, szName);
-        break;
-    case LINE_G1:
-        PMX_IsLog(0, CCIR_INFO "eDgoFmt(%s) \n ", 0, 0, i, szName);
-        break;
-    case LINE_G2:
-        PMX_IsLog(0, CCIR_INFO "eDgoFmt(%s)  \n", 0, 0, i, szName);
-        break;
-    case LINE_M1:
-        PMX_IsLog(0, CCIR_INFO "eDgiMode(%s) \n ", 0, 0, i, szName);
-        break;
-    case LINE_M2:
-        PMX_IsLog(0, CCIR_INFO "eDgiMode(%s)  \n", 0, 0, i, szName);
-        break;
-    case LINE_N1:
-        PMX_IsLog(0, CCIR_INFO "eDgoMode(%s) \n ", 0, 0, i, szName);
-        break;
-    case LINE_N2:
-        PMX_IsLog(0, CCIR_INFO "eDgoMode(%s)  \n", 0, 0, i, szName);
-        break;
+    case LINE_F1: PMX_IsLog(0, CCIR_INFO "eDgiFmt(%s) \n ", 0, 0, i, szName); break;
+    case LINE_F2: PMX_IsLog(0, CCIR_INFO "eDgiFmt(%s)  \n", 0, 0, i, szName); break;
+    case LINE_F3: PMX_IsLog(0, CCIR_INFO "eDgiFmt(%s) \n", 0, 0, i, szName); break;
+    case LINE_G1: PMX_IsLog(0, CCIR_INFO "eDgoFmt(%s) \n ", 0, 0, i, szName); break;
+    case LINE_G2: PMX_IsLog(0, CCIR_INFO "eDgoFmt(%s)  \n", 0, 0, i, szName); break;
+    case LINE_M1: PMX_IsLog(0, CCIR_INFO "eDgiMode(%s) \n ", 0, 0, i, szName); break;
+    case LINE_M2: PMX_IsLog(0, CCIR_INFO "eDgiMode(%s)  \n", 0, 0, i, szName); break;
+    case LINE_N1: PMX_IsLog(0, CCIR_INFO "eDgoMode(%s) \n ", 0, 0, i, szName); break;
+    case LINE_N2: PMX_IsLog(0, CCIR_INFO "eDgoMode(%s)  \n", 0, 0, i, szName); break;
     }
 #undef CCIR_INFO
 }
@@ -129,16 +114,15 @@ static void vReportRecord(const PMX_CONF_T* prConf)
               "Hue(%d ),Saturation(%d ),\n",
               0, prConf->ucDigitalRgb, prConf->ucCAVBlackLv, prConf->ucCVBSBlackLv, prConf->ucGamma,
               prConf->ucBrightness, prConf->ucContrast, prConf->ucHue, prConf->ucSaturation);
-    PMX_IsLog(0,
-              "[PMX] PMX(%d) CBE(%d ), MuteE(%d ), AS(%d ), BgC(%d ), Cap(%d ), Sharp(%d ), fgAspNext(%d ),\n",
-              0, prConf->ucCBEnable, prConf->ucMuteEnable, (INT32)prConf->u4AspectRatio, (INT32)prConf->u4BgColor,
+    PMX_IsLog(0, "[PMX] PMX(%d) CBE(%d ), MuteE(%d ), AS(%d ), BgC(%d ), Cap(%d ), Sharp(%d ), fgAspNext(%d ),\n", 0,
+              prConf->ucCBEnable, prConf->ucMuteEnable, (INT32)prConf->u4AspectRatio, (INT32)prConf->u4BgColor,
               (INT32)prConf->u4Capability, prConf->ucSharpness, prConf->fgAspNext);
     PMX_IsLog(0,
               "[PMX] PMX(%d ),  AspN(%d ), fgSMCal(%d ), CAVIdel(%d ), CAVOdel(%d ), CvbsIdel(%d ), CvbsOdel(%d ), "
               "CavScL(%d ), CvbsScL(%d ), \n",
               0, (INT32)prConf->u4AspNext, prConf->fgSetModeCalled, prConf->ucCavYcInputDelay,
-              prConf->ucCavYcOutputDelay, prConf->ucCvbsYcInputDelay, prConf->ucCvbsYcOutputDelay,
-              prConf->ucCavSyncLvl, prConf->ucCvbsSyncLvl);
+              prConf->ucCavYcOutputDelay, prConf->ucCvbsYcInputDelay, prConf->ucCvbsYcOutputDelay, prConf->ucCavSyncLvl,
+              prConf->ucCvbsSyncLvl);
     PMX_IsLog(0,
               "[PMX] PMX(%d ), CvbsBurstLvl(%d ), CavYLvl(%d ), CvbsYLvl(%d ), fgDigestEnable(%d ), DigestAsp(%d ), "
               "fgForceMode(%d ), \n",

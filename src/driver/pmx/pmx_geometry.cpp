@@ -1,4 +1,5 @@
-/* Size of the picture in the mixer's resolution mode. */
+/* The picture of the mixer's resolution mode, and the TV-system commands to the HDMI/AV driver. */
+#include "drv_av_d.h"
 #include "drv_pmx.h"
 #include "pmx_if.h"
 
@@ -16,4 +17,63 @@ UINT32 PMX_GetOutSize(UCHAR ucPmxId, UINT32* pu4Width, UINT32* pu4Height)
 INT32 i4PmxGetOutSize(void* pvTag, UINT32* pu4Width, UINT32* pu4Height)
 {
     return (INT32)PMX_GetOutSize(ucPmxIdOfTag(pvTag), pu4Width, pu4Height);
+}
+
+UCHAR PMX_ProgressiveOut(UCHAR ucPmxId)
+{
+    if (ucPmxId != 0)
+        return 0;
+
+    return (prPmxModeRow(prPmxConf()->ucMode)->u1Flags & PMX_MODE_PROGRESSIVE) != 0;
+}
+
+BOOL fgPmxFmtHDOutput(UCHAR)
+{
+    return (prPmxModeRow(prPmxConf()->ucMode)->u1Flags & PMX_MODE_HD_OUT) != 0;
+}
+
+static bool fgIsTvSystemFreq(UINT16 u2VSyncFreq)
+{
+    return u2VSyncFreq == 50 || u2VSyncFreq == 60 || u2VSyncFreq == 24 || u2VSyncFreq == 30 || u2VSyncFreq == 25;
+}
+
+UINT32 PMX_SetTVSystem(UCHAR ucPmxId, UINT16 u2VSyncFreq, BOOL fgTvSysAuto)
+{
+    if (ucPmxId != 0 || !fgIsTvSystemFreq(u2VSyncFreq))
+        return 0;
+
+    PMX_SET_TV_SYS_PARAMETER_T rTvSys = { .u2_Vfreq = u2VSyncFreq, .fgAutoEnable = fgTvSysAuto };
+    fgPmxDrvSetAvd(PMX_SET_UI_TV_SYSTEM, &rTvSys, 1);
+    return 1;
+}
+
+UINT32 PMX_ChkSupportedRes(UCHAR ucPmxId, UCHAR ucChkRes, UINT16 u2VSyncFreq, UCHAR* ucSupportedAutoRes,
+                           UINT16* ucSupportedAutoVsyncFreg)
+{
+    if (ucPmxId != 0)
+        return 0;
+
+    PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T rValid = {
+        .u4ResCheck = ucChkRes, .u2VsyncFreq = u2VSyncFreq, .u4ValidAutoRes = 0, .u2ValidAutoVfreq = 0
+    };
+    if (fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, &rValid) == FALSE)
+        return 0;
+
+    *ucSupportedAutoRes = (UCHAR)rValid.u4ValidAutoRes;
+    *ucSupportedAutoVsyncFreg = rValid.u2ValidAutoVfreq;
+    return 1;
+}
+
+UINT32 PMX_SetHdmiDeepColor(UCHAR ucPmxId, UCHAR ucDeepColor)
+{
+    if (ucPmxId != 0) // success for an unknown mixer: the one operation of this file that answers so
+        return 1;
+
+    return fgPmxDrvSetAvd(PMX_CHG_DEEP_COLOR_BIT, &ucDeepColor, 1) != FALSE;
+}
+
+void PMX_RecordUiResAuto(BOOL fgIsAuto)
+{
+    BOOL fgUiResAuto = fgIsAuto;
+    fgPmxDrvSetAvd(PMX_CHG_UI_RES_AUTO, &fgUiResAuto, 1);
 }

@@ -18,31 +18,33 @@ constinit UINT32 PMX_debug_level = 0;
 
 /* Default record */
 
-static constexpr PMX_PORT_INFO_T VIDEO_PORT = {.u2CompType = 0,
-                                               .u2CompId = 0,
-                                               .fgConnected = 0,
-                                               .fgEnabled = 0,
-                                               .eInputColorMode = DRV_GFX_COLOR_MODE_YCBCR,
-                                               .eSrcColorSpace = DRV_PMX_CS_YCBCR_709,
-                                               .u4SrcWidth = 0,
-                                               .u4SrcHeight = 0,
-                                               .ucLumaKey = 0};
+static constexpr PMX_PORT_INFO_T VIDEO_PORT = { .u2CompType = 0,
+                                                .u2CompId = 0,
+                                                .fgConnected = 0,
+                                                .fgEnabled = 0,
+                                                .eInputColorMode = DRV_GFX_COLOR_MODE_YCBCR,
+                                                .eSrcColorSpace = DRV_PMX_CS_YCBCR_709,
+                                                .u4SrcWidth = 0,
+                                                .u4SrcHeight = 0,
+                                                .ucLumaKey = 0 };
 
-static constexpr PMX_PORT_INFO_T OSD_PORT = {.u2CompType = 0,
-                                             .u2CompId = 0,
-                                             .fgConnected = 0,
-                                             .fgEnabled = 0,
-                                             .eInputColorMode = DRV_GFX_COLOR_MODE_RGB,
-                                             .eSrcColorSpace = DRV_PMX_CS_YCBCR_709,
-                                             .u4SrcWidth = 0,
-                                             .u4SrcHeight = 0,
-                                             .ucLumaKey = 0};
+static constexpr PMX_PORT_INFO_T OSD_PORT = { .u2CompType = 0,
+                                              .u2CompId = 0,
+                                              .fgConnected = 0,
+                                              .fgEnabled = 0,
+                                              .eInputColorMode = DRV_GFX_COLOR_MODE_RGB,
+                                              .eSrcColorSpace = DRV_PMX_CS_YCBCR_709,
+                                              .u4SrcWidth = 0,
+                                              .u4SrcHeight = 0,
+                                              .ucLumaKey = 0 };
 
 static constexpr PMX_RESOLUTION_T OUTPUT_1080P = {
-    .fgOutputEnable = 1, .eResMode = RES_1080P60HZ, .u4VFreq = 60, .eCcirDrvInfo = {}};
+    .fgOutputEnable = 1, .eResMode = RES_1080P60HZ, .u4VFreq = 60, .eCcirDrvInfo = {}
+};
 
 static constexpr PMX_RESOLUTION_T OUTPUT_480I = {
-    .fgOutputEnable = 1, .eResMode = RES_480I, .u4VFreq = 60, .eCcirDrvInfo = {}};
+    .fgOutputEnable = 1, .eResMode = RES_480I, .u4VFreq = 60, .eCcirDrvInfo = {}
+};
 
 /* ucMode and the outputs' modes differ: the boot resolution replaces ucMode at once, while the outputs are what a
  * per-output mode setting is compared with. */
@@ -68,15 +70,15 @@ constexpr PMX_CONF_T _arPmxConfDefault = {
     .u4AspectRatio = 3,
     .u4BgColor = 0x108080,      // black
     .u4Capability = 0x7FFBFFFF, // all but bits 18 and 31
-    .aucPlaneOrder = {4, 3, 1, 0, 2, 5, 6, 7},
+    .aucPlaneOrder = { 4, 3, 1, 0, 2, 5, 6, 7 },
     .ucSharpness = 0,
     .piVdp1 = nullptr,
     .pvTag1 = nullptr,
     .piVdp2 = nullptr,
     .pvTag2 = nullptr,
-    .arPortInfo = {VIDEO_PORT, VIDEO_PORT, OSD_PORT, OSD_PORT, OSD_PORT, OSD_PORT, OSD_PORT, OSD_PORT},
+    .arPortInfo = { VIDEO_PORT, VIDEO_PORT, OSD_PORT, OSD_PORT, OSD_PORT, OSD_PORT, OSD_PORT, OSD_PORT },
     .eMasterColorSpace = DRV_PMX_CS_YCBCR_709,
-    .arOutputConf = {OUTPUT_1080P, OUTPUT_1080P, OUTPUT_1080P, OUTPUT_480I},
+    .arOutputConf = { OUTPUT_1080P, OUTPUT_1080P, OUTPUT_1080P, OUTPUT_480I },
     .fgAspNext = 0,
     .u4AspNext = 3,
     .fgSetModeCalled = 0,
@@ -244,16 +246,16 @@ constexpr const CHAR* const szResStr[RES_MODE_NUM] = {
 /* Gamma: output levels at nine equally spaced inputs from 0 to 255 */
 
 constexpr UCHAR aucGammaCurve[PMX_GAMMA_CURVE_NUM][PMX_GAMMA_POINT_NUM] = {
-    {0, 99, 136, 163, 186, 206, 224, 240, 255},
-    {0, 121, 155, 180, 199, 216, 230, 243, 255},
-    {0, 85, 125, 155, 180, 202, 221, 239, 255},
-    {0, 100, 137, 164, 187, 206, 224, 240, 255},
+    { 0, 99, 136, 163, 186, 206, 224, 240, 255 },
+    { 0, 121, 155, 180, 199, 216, 230, 243, 255 },
+    { 0, 85, 125, 155, 180, 202, 221, 239, 255 },
+    { 0, 100, 137, 164, 187, 206, 224, 240, 255 },
 };
 
 /* Tables of functions */
 
 constexpr IPMX _rPMXIF = {
-    .pi4SetMode = nullptr,
+    .pi4SetMode = i4PmxSetMode,
     .pi4GetMode = i4PmxGetMode,
     .pi4GetOutSize = i4PmxGetOutSize,
     .pi4GetAspectRatio = i4PmxGetAspectRatio,
@@ -266,4 +268,4 @@ constexpr IPMX _rPMXIF = {
     .pi4VdpGetPlanePosition = i4PmxGetPlanePosition,
 };
 
-constexpr PM_OPERATIONS_T pmx_pm_ops = {.suspend = i4PMX_Suspend, .resume = i4PMX_Resume};
+constexpr PM_OPERATIONS_T pmx_pm_ops = { .suspend = i4PMX_Suspend, .resume = i4PMX_Resume };

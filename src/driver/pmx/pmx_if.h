@@ -1,6 +1,6 @@
 /** @file
- * Private to the mixer layer: its one record, its tables and the helpers that its files share. Nothing outside this
- * folder includes it but the tests of the tables and the record view. */
+ *  Private to the mixer layer: its one record, its tables and the helpers that its files share. Nothing outside this
+ *  folder includes it but the tests of the tables and the record view. */
 #ifndef PMX_IF_H
 #define PMX_IF_H
 
@@ -12,7 +12,8 @@
 #define PMX_PLANE_NUM 8 /* mixer planes */
 
 /* State of one input port. */
-typedef struct {
+typedef struct
+{
     UINT16 u2CompType; /* upstream component connected to the port */
     UINT16 u2CompId;
     BOOL fgConnected;
@@ -25,28 +26,29 @@ typedef struct {
 } PMX_PORT_INFO_T;
 
 /* All that one mixer is set to and knows. The order of the fields is an interface: memory dumps are read by it. */
-typedef struct {
-    UCHAR ucEnable;      /* master enable, as given */
-    UCHAR ucMode;        /* PMX_RESOLUTION_MODE_T */
-    UCHAR ucTvType;      /* PMX_TV_TYPE_NTSC or PMX_TV_TYPE_PAL, others as given */
-    UCHAR ucVfreq;       /* Hz */
-    UCHAR ucDigitalOut;  /* parallel digital port on */
-    UCHAR u4Phase;       /* digital clock phase: 8 bits in spite of its prefix */
+typedef struct
+{
+    UCHAR ucEnable;     /* master enable, as given */
+    UCHAR ucMode;       /* PMX_RESOLUTION_MODE_T */
+    UCHAR ucTvType;     /* PMX_TV_TYPE_NTSC or PMX_TV_TYPE_PAL, others as given */
+    UCHAR ucVfreq;      /* Hz */
+    UCHAR ucDigitalOut; /* parallel digital port on */
+    UCHAR u4Phase;      /* digital clock phase: 8 bits in spite of its prefix */
     UCHAR ucProprietaryMode;
-    UCHAR ucDigitalBit;  /* bus width in bits */
-    UCHAR ucDigitalRgb;  /* PLA_MXR_DIGITAL_OUTPUT_FMT_T */
+    UCHAR ucDigitalBit; /* bus width in bits */
+    UCHAR ucDigitalRgb; /* PLA_MXR_DIGITAL_OUTPUT_FMT_T */
     UCHAR ucCAVBlackLv;
     UCHAR ucCVBSBlackLv;
-    UCHAR ucGamma;       /* 0 off, 1 to 4 curve, others as given */
-    UCHAR ucBrightness;  /* analogue adjustments, 128 = neutral */
+    UCHAR ucGamma;      /* 0 off, 1 to 4 curve, others as given */
+    UCHAR ucBrightness; /* analogue adjustments, 128 = neutral */
     UCHAR ucContrast;
     UCHAR ucHue;
     UCHAR ucSaturation;
-    UCHAR ucCBEnable;    /* colour bar, as given */
-    UCHAR ucMuteEnable;  /* output mute, as given */
-    UINT32 u4AspectRatio; /* ASP_ code */
-    UINT32 u4BgColor;     /* 0x00YYUUVV */
-    UINT32 u4Capability;  /* bits 0 to 16 groups of modes, 20 to 25, 27 and 30 features */
+    UCHAR ucCBEnable;                   /* colour bar, as given */
+    UCHAR ucMuteEnable;                 /* output mute, as given */
+    UINT32 u4AspectRatio;               /* ASP_ code */
+    UINT32 u4BgColor;                   /* 0x00YYUUVV */
+    UINT32 u4Capability;                /* bits 0 to 16 groups of modes, 20 to 25, 27 and 30 features */
     UCHAR aucPlaneOrder[PMX_PLANE_NUM]; /* plane id at each position of the stack */
     UCHAR ucSharpness;
     IVdp* piVdp1; /* never filled: a video plane's table is fetched anew for every call */
@@ -94,7 +96,8 @@ typedef struct {
 #define PMX_MODE_TVE_HD 0x20      /* an HD format for the TV encoders and for plane delays */
 
 /* Everything that is decided from the resolution mode. */
-typedef struct {
+typedef struct
+{
     UINT8 u1Mode; /* PMX_RESOLUTION_MODE_T: the row's own number */
     UINT16 u2Width;
     UINT16 u2Height;
@@ -126,10 +129,25 @@ static inline const PMX_MODE_ROW_T* prPmxModeRow(UINT32 u4Mode)
     return &_arPmxModeRow[u4Mode < PMX_MODE_ROW_NUM ? u4Mode : PMX_MODE_ROW_NUM];
 }
 
+/* Whether a mode is an HD format for the TV encoders and for plane delays. */
+static inline BOOL fgPmxTveHd(UINT32 u4Mode)
+{
+    return (prPmxModeRow(u4Mode)->u1Flags & PMX_MODE_TVE_HD) != 0;
+}
+
+/* The printable name of a mode number; null for a number without one. */
+static inline const CHAR* szPmxModeName(UINT32 u4Mode)
+{
+    return u4Mode < RES_MODE_NUM ? szResStr[u4Mode] : nullptr;
+}
+
 /* The mixer id that an IPMX tag carries. */
 static inline UCHAR ucPmxIdOfTag(void* pvTag)
 {
     return (UCHAR)(size_t)pvTag;
 }
+
+/* Hand the stacking order to the hardware, with the number that goes with the occasion: 3 at reset, 8 for a request. */
+void vPmxProgramPlaneOrder(UINT32 u4Number);
 
 #endif

@@ -33,8 +33,8 @@ void PMX_Init(void)
     register_pm_ops(&pmx_pm_ops);
 }
 
-/* Take the boot loader's mode if it is one that the mixer starts with, else 480p. Yields the TV type that goes with it.
- * */
+/* Take the boot loader's mode if it is one that the mixer starts with, else 480p. Yields the TV type that goes with
+ * it. */
 static UCHAR ucTakeBootMode(PMX_CONF_T* prConf)
 {
     prConf->ucMode = PMX_GetHDMIDefaultRes();
@@ -78,10 +78,7 @@ void PMX_Reset(UCHAR ucPmxId)
         TVE_SetSharpness(prConf->ucSharpness);
     }
 
-    UINT32 au4PlaneOrder[PMX_PLANE_NUM];
-    for (UINT32 i = 0; i < PMX_PLANE_NUM; i++)
-        au4PlaneOrder[i] = prConf->aucPlaneOrder[i];
-    PMX_HalPlaneOrder(0, 3, au4PlaneOrder);
+    vPmxProgramPlaneOrder(3);
     PMX_HalInitPlaneOrder(0);
     PMX_DisableVideoPlane(0, 1);
 
@@ -132,8 +129,8 @@ INT32 i4PMX_Uninit(UINT32 u4Case)
     return i4Ret;
 }
 
-/* Everything but vertical-sync handling stays as it is: whoever stops the mixer this way starts it again with PMX_Init.
- * */
+/* Everything but vertical-sync handling stays as it is: whoever stops the mixer this way starts it again with
+ * PMX_Init. */
 void PMX_Stop(void)
 {
     PMX_IsLog(1, "PMX_Stop\n");

@@ -1,6 +1,90 @@
-/* The mixer's resolution mode. */
+/* Capability check, one mode on all outputs, force mode. */
+#include "drv_av_d.h"
+#include "drv_osd.h"
 #include "drv_pmx.h"
+#include "drv_tve.h"
+#include "drv_vdp.h"
+#include "pmx_hal.h"
 #include "pmx_if.h"
+#include "u_os.h"
+
+UINT32 PMX_CheckCap(UCHAR, UCHAR ucMode)
+{
+    UINT8 u1CapBit = prPmxModeRow(ucMode)->u1CapBit;
+    if (u1CapBit == PMX_CAP_ALWAYS)
+        return 1;
+    if (u1CapBit == PMX_CAP_NEVER)
+        return 0;
+    return (prPmxConf()->u4Capability >> u1CapBit) & 1;
+}
+
+UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
+{
+    if (ucPmxId != 0)
+        return 0;
+
+    PMX_IsLog(9, "SetMode, %s\n", szPmxModeName(ucMode));
+    if (PMX_CheckCap(ucPmxId, ucMode) == 0)
+        return 0;
+
+    PMX_CONF_T* prConf = prPmxConf();
+    OSD_BASE_SetDisplayMode(ucMode);
+    if (ucMode == prConf->ucMode && ucVFreq == prConf->ucVfreq && prConf->fgSetModeCalled != 0)
+    {
+        VDP_SetTvFormat(ucMode, 0);
+        return 1;
+    }
+    prConf->ucMode = ucMode;
+    prConf->ucVfreq = ucVFreq;
+    prConf->fgSetModeCalled = 1;
+
+    PMX_SET_HDMI_RES_PARAMETER_T rResData = {};
+    rResData.u1ScaleMode = 0;
+    rResData.ucHdmiOutDisplayResolution = ucMode;
+    rResData.ucFmtOutResolution = ucMode;
+    rResData.ucCCIROutResolution = ucMode;
+    rResData.ucHdmiOutMode = 0;
+    rResData.fgHdmiOutEnable = 1;
+    rResData.ucCCIROutMode = 1;
+    fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, &rResData, 1);
+    fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, &rResData, 1);
+
+    // Colour set-up before the mixer is told its mode: per-output mode setting does it the other way round.
+    PMX_ColorSpaceSetup(prConf->eMasterColorSpace, ucMode);
+    PMX_HalSetMode(0, ucMode);
+    PMX_HalSetScalerMode(ucMode);
+    VDP_SetTvFormat(ucMode, 1);
+
+    bool fg60Hz = ucVFreq == 60; // 60 alone; per-output mode setting takes more frequencies for NTSC
+    if (fg60Hz)
+    {
+        if (PMX_SetTvType(ucPmxId, PMX_TV_TYPE_NTSC) != PMX_SET_OK)
+            Assert("PMX_SetTvType(ucPmxId, PMX_TV_TYPE_NTSC) == PMX_SET_OK", __FILE__, __LINE__);
+    }
+    else
+    {
+        if (PMX_SetTvType(ucPmxId, PMX_TV_TYPE_PAL) != PMX_SET_OK)
+            Assert("PMX_SetTvType(ucPmxId, PMX_TV_TYPE_PAL) == PMX_SET_OK", __FILE__, __LINE__);
+    }
+
+    BOOL fgHD = fgPmxTveHd(ucMode);
+    TVE_SetFmtEx(TVE_1, ucMode, ucVFreq, ucMode, 1, fgHD, fgOSD5);
+    TVE_SetFmtEx(TVE_2, ucMode, ucVFreq, fg60Hz ? RES_480I : RES_576I, 1, fgHD, fgOSD5);
+
+    PMX_HalReset(0);
+    PMX_HalScalerReset(0);
+    VDP_GlobalOutputChange();
+    for (UINT32 u4VdpIdx = 0; u4VdpIdx < 3; u4VdpIdx++)
+        VDP_VsyncSendCmd(u4VdpIdx, 2);
+    fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, &rResData, 1);
+    OSD_BASE_SetFlag_PMXChangeResDone();
+    return 1;
+}
+
+INT32 i4PmxSetMode(void* pvTag, UCHAR ucMode, UCHAR ucVFreq, BOOL fgOSD5)
+{
+    return (INT32)PMX_SetMode(ucPmxIdOfTag(pvTag), ucMode, ucVFreq, fgOSD5);
+}
 
 UINT32 PMX_GetMode(UCHAR ucPmxId, UCHAR* pucMode)
 {
@@ -14,4 +98,14 @@ UINT32 PMX_GetMode(UCHAR ucPmxId, UCHAR* pucMode)
 INT32 i4PmxGetMode(void* pvTag, UCHAR* pucMode)
 {
     return (INT32)PMX_GetMode(ucPmxIdOfTag(pvTag), pucMode);
+}
+
+BOOL PMX_IsForceMode(UCHAR)
+{
+    return prPmxConf()->fgForceMode != 0;
+}
+
+void PMX_SetForceMode(UCHAR, BOOL fgOn)
+{
+    prPmxConf()->fgForceMode = fgOn != 0;
 }

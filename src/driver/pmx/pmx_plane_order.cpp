@@ -1,8 +1,82 @@
-/* Where the video planes stand among the mixer planes. */
+/* Stacking order position by position, background, and where the video planes stand. The packed order of
+ * pmx_arb_order.cpp is another representation, kept apart. */
 #include "drv_pmx.h"
+#include "drv_vdp.h"
 #include "pmx_hal.h"
 #include "pmx_if.h"
 #include "u_os.h"
+
+UINT32 PMX_SetBg(UCHAR ucPmxId, UINT32 u4BgColor)
+{
+    if (ucPmxId != 0)
+        return 0;
+
+    prPmxConf()->u4BgColor = u4BgColor;
+    PMX_HalSetBg(ucPmxId, u4BgColor);
+    return 1;
+}
+
+UINT32 PMX_SetPlaneOrderArray(UCHAR ucPmxId, const UINT32* pu4PlaneOrder)
+{
+    if (ucPmxId != 0 || pu4PlaneOrder == nullptr)
+        return 0;
+
+    for (UINT32 i = 0; i < PMX_PLANE_NUM; i++)
+        prPmxConf()->aucPlaneOrder[i] = (UCHAR)pu4PlaneOrder[i];
+    PMX_HalPlaneOrder(0, 8, pu4PlaneOrder); // the caller's words, all 32 bits of them
+    return 1;
+}
+
+/* A plane is not taken from where it stood: a caller that moves one writes both positions, and in between it is named
+ * twice. */
+UINT32 PMX_SetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR ucPlaneOrder)
+{
+    if (ucPmxId != 0 || ucPlaneOrder >= PMX_PLANE_NUM)
+        return 0;
+
+    PMX_CONF_T* prConf = prPmxConf();
+    prConf->aucPlaneOrder[ucPlaneOrder] = ucVdpId;
+    vPmxProgramPlaneOrder(8);
+    return 1;
+}
+
+UINT32 PMX_GetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR* pucPlaneOrder)
+{
+    if (ucPmxId != 0 || pucPlaneOrder == nullptr)
+        return 0;
+
+    UCHAR ucPosition = 0;
+    while (ucPosition < PMX_PLANE_NUM && prPmxConf()->aucPlaneOrder[ucPosition] != ucVdpId)
+        ucPosition++;
+    *pucPlaneOrder = ucPosition; // 8: it stands nowhere
+    return 1;
+}
+
+UINT32 PMX_SetOrderVdpComp0(UCHAR ucPmxId, UINT32 u4OnTop)
+{
+    bComp0OnTop = (INT32)u4OnTop;
+    PMX_HalSwapPlane1_2(ucPmxId, u4OnTop);
+
+    UCHAR ucInSecondPlane = u4OnTop != 0 ? 0 : 1;
+    if (VDP_GetHwEnable(ucInSecondPlane) != VDP_DISABLED) // hidden counts as enabled
+        vPmxMixPlane(ucPmxId, 1);
+    else
+        vPmxNotMixPlane(ucPmxId, 1);
+    return 1;
+}
+
+UINT32 d_PMX_SetOrderVdpComp0(UCHAR ucPmxId, UINT32 u4OnTop)
+{
+    for (UINT32 u4VdpIdx = 0; u4VdpIdx < 3; u4VdpIdx++) // all three that the video plane driver has
+        VDP_VsyncSendCmd(u4VdpIdx, 17);
+    return PMX_SetOrderVdpComp0(ucPmxId, u4OnTop);
+}
+
+UINT32 d_PMX_GetOrderVdpComp0(UCHAR, UINT32* pu4OnTop)
+{
+    *pu4OnTop = (UINT32)bComp0OnTop;
+    return 1;
+}
 
 UINT32 PMX_VdpGetPlanePosition(UCHAR ucPmxId, UCHAR ucVdpHwId)
 {
@@ -21,4 +95,12 @@ UINT32 PMX_VdpGetPlanePosition(UCHAR ucPmxId, UCHAR ucVdpHwId)
 INT32 i4PmxGetPlanePosition(void* pvTag, UCHAR ucVdpHwId)
 {
     return (INT32)PMX_VdpGetPlanePosition(ucPmxIdOfTag(pvTag), ucVdpHwId);
+}
+
+void vPmxProgramPlaneOrder(UINT32 u4Number)
+{
+    UINT32 au4PlaneOrder[PMX_PLANE_NUM];
+    for (UINT32 i = 0; i < PMX_PLANE_NUM; i++)
+        au4PlaneOrder[i] = prPmxConf()->aucPlaneOrder[i];
+    PMX_HalPlaneOrder(0, u4Number, au4PlaneOrder);
 }

@@ -1,5 +1,207 @@
-/* Source events. Those that come through IPMX are inert: only the direct calls count. */
+/* Source events, and the master colour space that follows from them. Port fields are written on the sources' threads
+ * without the mutex; only informing the video planes takes it. */
+#include "drv_av_d.h"
+#include "drv_if.h"
+#include "drv_if_vdp.h"
+#include "drv_osd.h"
 #include "drv_pmx.h"
+#include "pmx_hal.h"
+#include "pmx_if.h"
+#include "u_os.h"
+
+#define VDP_SUB 1        /* second video */
+#define VDP_BACKGROUND 2 /* still-picture background, on the second video's port */
+
+/* Wider than 720 or taller than 576 is BT.709. */
+static DRV_PMX_COLOR_SPACE_T eColorSpaceOfSize(INT32 i4SrcWidth, INT32 i4SrcHeight)
+{
+    return i4SrcWidth > 720 || i4SrcHeight > 576 ? DRV_PMX_CS_YCBCR_709 : DRV_PMX_CS_YCBCR_601;
+}
+
+/* Tell everybody the master colour space. */
+static void vAnnounceMasterColorSpace(void)
+{
+    const PMX_CONF_T* prConf = prPmxConf();
+
+    OSDSetColorSpace((UCHAR)prConf->eMasterColorSpace);
+    PMX_InformVdpColorSpace(0);
+    vPostChgInputCS(prConf->eMasterColorSpace);
+    PMX_ColorSpaceSetup(prConf->eMasterColorSpace, prConf->ucMode);
+}
+
+UINT32 PMX_VdpEnabled(UCHAR ucPmxId, UCHAR ucVdpId, INT32 i4SrcWidth, INT32 i4SrcHeight, UCHAR ucLumaKey)
+{
+    UINT32 u4Port = u4PmxCompId2LocalId(PMX_COMP_TYPE_VDP, ucVdpId);
+    if (u4Port >= PMX_PORT_NUM)
+        return 0;
+    PMX_PORT_INFO_T* prPort = &prPmxConf()->arPortInfo[u4Port];
+    if (prPort->fgConnected == 0)
+        return 0;
+
+    prPort->fgEnabled = 1;
+    prPort->eInputColorMode = DRV_GFX_COLOR_MODE_YCBCR;
+    prPort->ucLumaKey = ucLumaKey;
+    PMX_IsLog(8, "VDP_%d Enabled\n", ucVdpId);
+    if (ucVdpId == VDP_BACKGROUND)
+    {
+        PMX_IsLog(8, "Turn on OSD full range conversion\n");
+        OSD_RNG_Set_Xvycc_En(1);
+    }
+    else if (ucVdpId == VDP_SUB)
+    {
+        PMX_IsLog(8, "Turn off OSD full range conversion since SUB video enable. \n");
+        OSD_RNG_Set_Xvycc_En(0);
+    }
+
+    prPort->eSrcColorSpace = eColorSpaceOfSize(i4SrcWidth, i4SrcHeight);
+    if (prPort->eSrcColorSpace == DRV_PMX_CS_YCBCR_709)
+        PMX_IsLog(8, "VDP_%d's Src Color Space = DRV_PMX_CS_YCBCR_709\n", ucVdpId);
+    else
+        PMX_IsLog(8, "VDP_%d's Src Color Space = DRV_PMX_CS_YCBCR_601\n", ucVdpId);
+    if (ucVdpId == VDP_BACKGROUND) // still pictures are BT.601 at any size
+    {
+        PMX_IsLog(8, "VDP_%d's (JPG(BACKGROUND) is force to 601.\n", ucVdpId);
+        prPort->eSrcColorSpace = DRV_PMX_CS_YCBCR_601;
+    }
+
+    PMX_DecideMasterColorSpace(ucPmxId);
+    return 1;
+}
+
+/* Unlike PMX_OsdDisabled no new decision: the master colour space stays until one is made. */
+UINT32 PMX_VdpDisabled(UCHAR, UCHAR ucVdpId)
+{
+    UINT32 u4Port = u4PmxCompId2LocalId(PMX_COMP_TYPE_VDP, ucVdpId);
+    if (u4Port >= PMX_PORT_NUM)
+        return 0;
+
+    prPmxConf()->arPortInfo[u4Port].fgEnabled = 0;
+    PMX_IsLog(8, "VDP_%d Disabled\n", ucVdpId);
+    if (ucVdpId == VDP_BACKGROUND)
+    {
+        PMX_IsLog(8, "Turn off OSD full range conversion\n");
+        OSD_RNG_Set_Xvycc_En(0);
+    }
+    return 1;
+}
+
+/* YCbCr graphics become the master at once, past the priority rule and without its message. */
+UINT32 PMX_OsdEnabled(UCHAR, UCHAR ucOsdId, INT32 i4SrcWidth, INT32 i4SrcHeight, DRV_GFX_COLOR_MODE_T eSrcColorMode)
+{
+    PMX_CONF_T* prConf = prPmxConf();
+    UINT32 u4Port = u4PmxCompId2LocalId(PMX_COMP_TYPE_OSD, ucOsdId);
+    DRV_PMX_COLOR_SPACE_T eOldCS = prConf->eMasterColorSpace;
+    if (u4Port >= PMX_PORT_NUM)
+        return 0;
+
+    PMX_PORT_INFO_T* prPort = &prConf->arPortInfo[u4Port];
+    prPort->fgEnabled = 1;
+    PMX_IsLog(8, "OSD_%d Enabled\n", ucOsdId);
+    if (eSrcColorMode != DRV_GFX_COLOR_MODE_YCBCR)
+    {
+        PMX_IsLog(8, "OSD_%d's Src Color Space = DRV_PMX_CS_RGB\n", ucOsdId);
+    }
+    else
+    {
+        prPort->eInputColorMode = DRV_GFX_COLOR_MODE_YCBCR;
+        prPort->eSrcColorSpace = eColorSpaceOfSize(i4SrcWidth, i4SrcHeight);
+        prConf->eMasterColorSpace = prPort->eSrcColorSpace;
+        if (prPort->eSrcColorSpace == DRV_PMX_CS_YCBCR_709)
+            PMX_IsLog(8, "OSD_%d's Src Color Space = DRV_PMX_CS_YCBCR_709\n", ucOsdId);
+        else
+            PMX_IsLog(8, "OSD_%d's Src Color Space = DRV_PMX_CS_YCBCR_601\n", ucOsdId);
+    }
+    if (prConf->eMasterColorSpace != eOldCS)
+        vAnnounceMasterColorSpace();
+    return 1;
+}
+
+UINT32 PMX_OsdDisabled(UCHAR, UCHAR ucOsdId)
+{
+    UINT32 u4Port = u4PmxCompId2LocalId(PMX_COMP_TYPE_OSD, ucOsdId);
+    if (u4Port >= PMX_PORT_NUM)
+        return 0;
+
+    prPmxConf()->arPortInfo[u4Port].fgEnabled = 0;
+    PMX_IsLog(8, "OSD_%d Disabled\n", ucOsdId);
+    PMX_DecideMasterColorSpace(0);
+    return 1;
+}
+
+UINT32 PMX_DecideMasterColorSpace(UCHAR ucPmxId)
+{
+    PMX_CONF_T* prConf = prPmxConf();
+    const PMX_PORT_INFO_T* prPort = prConf->arPortInfo;
+    DRV_PMX_COLOR_SPACE_T eCandidate = prConf->eMasterColorSpace;
+
+    // Each rule that applies overrules those before it.
+    if (prPort[0].fgEnabled != 0)
+    {
+        eCandidate = prPort[0].eSrcColorSpace;
+        PMX_IsLog(8, "[PMX] VDP_COMP_1 enabled and Color Space is %d.\n", (INT32)eCandidate);
+    }
+    if (prPort[1].fgEnabled != 0 && prPort[1].ucLumaKey != 0 && fgPmxHalMixPlane(ucPmxId, 1) != 0)
+    {
+        eCandidate = prPort[1].eSrcColorSpace;
+        PMX_IsLog(8, "[PMX] VDP_COMP_2 enabled and Color Space is %d.\n", (INT32)eCandidate);
+    }
+    for (UINT32 i = 2; i < PMX_PORT_NUM; i++)
+    {
+        if (prPort[i].fgEnabled != 0 && prPort[i].eInputColorMode == DRV_GFX_COLOR_MODE_YCBCR)
+        {
+            eCandidate = prPort[i].eSrcColorSpace;
+            PMX_IsLog(8, "[PMX] Gfx enabled and Color Space is %d.\n", (INT32)eCandidate);
+        }
+    }
+
+    if (eCandidate != prConf->eMasterColorSpace)
+    {
+        PMX_IsLog(8, "[PMX] Master Color Space change from %d to %d.\n", (INT32)prConf->eMasterColorSpace,
+                  (INT32)eCandidate);
+        prConf->eMasterColorSpace = eCandidate;
+        vAnnounceMasterColorSpace();
+    }
+    return 1;
+}
+
+static void vInformVdp(UINT16 u2CompType, UINT16 u2CompId)
+{
+    DRV_PMX_COLOR_SPACE_T eColorSpace = prPmxConf()->eMasterColorSpace;
+    void* pvIf = nullptr;
+    void* pvTag = nullptr;
+
+    PMX_IsLog(8, "Inform Vdp CS(%d)\n", (INT32)eColorSpace);
+    if (i4ImQueryInterface(u2CompType, u2CompId, IID_IVdp, &pvIf, &pvTag) < 0)
+    {
+        PMX_IsLog(5, "Query VDP Interface Fail!\n");
+        Assert("0", __FILE__, __LINE__);
+        return; // nothing was obtained that could be called or given back
+    }
+    const IVdp* piVdp = (const IVdp*)pvIf;
+    piVdp->pu4SetColorMode(pvTag, eColorSpace);
+    i4ImReleaseInterface(u2CompType, u2CompId, IID_IVdp, pvTag);
+}
+
+void PMX_InformVdpColorSpace(UCHAR)
+{
+    if (x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) != OSR_OK)
+        Assert("x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) == OSR_OK", __FILE__, __LINE__);
+
+    for (UINT16 u2Idx = 0; u2Idx < 2; u2Idx++)
+    {
+        UINT32 u4Port = u4PmxCompId2LocalId(PMX_COMP_TYPE_VDP, u2Idx);
+        if (u4Port >= PMX_PORT_NUM)
+            break;
+        const PMX_PORT_INFO_T* prPort = &prPmxConf()->arPortInfo[u4Port];
+        if (prPort->fgConnected != 0)
+            vInformVdp(prPort->u2CompType, prPort->u2CompId);
+    }
+
+    if (x_sema_unlock(MutexPMX) != OSR_OK)
+        Assert("x_sema_unlock(MutexPMX) == OSR_OK", __FILE__, __LINE__);
+}
+
+/* Source events through IPMX are inert: only the direct calls count. */
 
 INT32 i4PmxOsdEnabled(void*, INT32, INT32, DRV_GFX_COLOR_MODE_T)
 {

@@ -12,7 +12,8 @@ extern "C" {
 #endif
 
 /** Commands of fgPmxDrvSetAvd, with what their parameter points to. Missing numbers are not the mixer's. */
-typedef DRV_ENUM(PMX_AVD_COMMAND_T) {
+typedef DRV_ENUM(PMX_AVD_COMMAND_T)
+{
     PMX_CHG_HDMI_COLOR_SPACE = 0,        /**< one byte, a HDMI_COLOR_SPACE_T value */
     PMX_CHG_HDMI_VIDEO_ASPECT_RATIO = 1, /**< UINT32, an ASPECT_RATIO_T value or any other; may be refused */
     PMX_SET_UI_TV_SYSTEM = 2,            /**< PMX_SET_TV_SYS_PARAMETER_T */
@@ -44,7 +45,8 @@ typedef DRV_ENUM(PMX_AVD_COMMAND_T) {
 } PMX_AVD_COMMAND_T;
 
 /** Queries of fgPmxDrvGetAvdInfo, with what their parameter points to. */
-typedef DRV_ENUM(PMX_AVD_QUERY_T) {
+typedef DRV_ENUM(PMX_AVD_QUERY_T)
+{
     PMX_GET_VALID_RES_AND_VFREQ = 1 /**< PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T */
 } PMX_AVD_QUERY_T;
 
@@ -53,7 +55,8 @@ DRV_STATIC_ASSERT(sizeof(PMX_AVD_QUERY_T) == 4, "enumerations are 32 bits wide")
 
 /** Resolution, PLL and digital-port commands. Resolutions are PMX_RESOLUTION_MODE_T values. One-mode setting leaves
  *  eCcirDrvInfo, fgOsdMsg and fgCCIROutEnable 0. */
-typedef struct {
+typedef struct
+{
     UINT8 u1ScaleMode;
     UINT8 ucHdmiOutDisplayResolution; /**< what HDMI shows */
     UINT8 ucFmtOutResolution;         /**< the mixer's format */
@@ -61,20 +64,22 @@ typedef struct {
     UINT8 ucHdmiOutMode;              /**< a DRV_EXT_CHIP_USAGE_T value */
     CCIR_DRV_INFO_T eCcirDrvInfo;     /**< the digital port's set-up */
     BOOL fgOsdMsg;                    /**< the fifth OSD plane's mode: 0, 1 or 2 */
-    UINT8 ucCCIROutMode; /**< 1 from one-mode setting, 0 from per-output mode setting */
+    UINT8 ucCCIROutMode;              /**< 1 from one-mode setting, 0 from per-output mode setting */
     BOOL fgCCIROutEnable;
     BOOL fgHdmiOutEnable;
     UINT16 u2_Vfreq; /**< not filled by the mixer: 0 */
 } PMX_SET_HDMI_RES_PARAMETER_T;
 
 /** TV system command. */
-typedef struct {
+typedef struct
+{
     UINT16 u2_Vfreq;   /**< vertical frequency in Hz */
     BOOL fgAutoEnable; /**< the TV system follows the sink */
 } PMX_SET_TV_SYS_PARAMETER_T;
 
 /** Valid-resolution query. */
-typedef struct {
+typedef struct
+{
     UINT32 u4ResCheck;       /**< in: resolution to check */
     UINT16 u2VsyncFreq;      /**< in: frequency to check, in Hz */
     UINT32 u4ValidAutoRes;   /**< out: resolution that the driver would choose */

@@ -17,7 +17,8 @@ extern "C" {
 /** Output resolution mode; fits 8 bits. 2D modes are named after formats of CEA-861, 3D structures (frame packing, TB =
  *  top-and-bottom, SBS_HALF = side-by-side half) after HDMI 1.4. What the mixer makes of a mode (size, scan type, HD or
  *  not) is asked from the mixer, not read off the name. */
-typedef DRV_ENUM(PMX_RESOLUTION_MODE_T) {
+typedef DRV_ENUM(PMX_RESOLUTION_MODE_T)
+{
     RES_480I = 0,
     RES_576I = 1,
     RES_480P = 2,
@@ -74,14 +75,16 @@ typedef DRV_ENUM(PMX_RESOLUTION_MODE_T) {
 } PMX_RESOLUTION_MODE_T;
 
 /** Digital port mode (ITU-R BT.601 with separate syncs, BT.656 with embedded syncs). */
-typedef DRV_ENUM(CCIR_IN_OUT_MODE_T) {
+typedef DRV_ENUM(CCIR_IN_OUT_MODE_T)
+{
     CCIR_INVALID = 0,
     CCIR_601_MODE = 1,
     CCIR_656_MODE = 2
 } CCIR_IN_OUT_MODE_T;
 
 /** Digital port sample format: luma and chroma multiplexed, 4:2:2 or 4:4:4, and the bus width in bits. */
-typedef DRV_ENUM(CCIR_IN_OUT_FORMAT_T) {
+typedef DRV_ENUM(CCIR_IN_OUT_FORMAT_T)
+{
     CCIR_NON_USED = 0,
     CCIR_YCMIX_8BIT = 1,
     CCIR_YCMIX_10BIT = 2,
@@ -95,20 +98,23 @@ typedef DRV_ENUM(CCIR_IN_OUT_FORMAT_T) {
 } CCIR_IN_OUT_FORMAT_T;
 
 /** Colour mode of a source plane's pixels. */
-typedef DRV_ENUM(DRV_GFX_COLOR_MODE_T) {
+typedef DRV_ENUM(DRV_GFX_COLOR_MODE_T)
+{
     DRV_GFX_COLOR_MODE_YCBCR = 0,
     DRV_GFX_COLOR_MODE_RGB = 1
 } DRV_GFX_COLOR_MODE_T;
 
 /** Colour space: of what a source delivers, and of the mixing itself (ITU-R BT.601, BT.709). */
-typedef DRV_ENUM(DRV_PMX_COLOR_SPACE_T) {
+typedef DRV_ENUM(DRV_PMX_COLOR_SPACE_T)
+{
     DRV_PMX_CS_YCBCR_601 = 0,
     DRV_PMX_CS_YCBCR_709 = 1,
     DRV_PMX_CS_RGB = 2
 } DRV_PMX_COLOR_SPACE_T;
 
 /** Mixer plane: names count from 1, values from 0. */
-typedef DRV_ENUM(DRV_PMX_PLANE_T) {
+typedef DRV_ENUM(DRV_PMX_PLANE_T)
+{
     DRV_PMX_PLANE_1 = 0,
     DRV_PMX_PLANE_2 = 1,
     DRV_PMX_PLANE_3 = 2,
@@ -120,7 +126,8 @@ typedef DRV_ENUM(DRV_PMX_PLANE_T) {
 } DRV_PMX_PLANE_T;
 
 /** Index of an output. */
-DRV_ENUM_UNNAMED {
+DRV_ENUM_UNNAMED
+{
     PMX_OUTPUT_CCIR = 0, /**< parallel digital video port */
     PMX_OUTPUT_HDMI = 1,
     PMX_OUTPUT_CAV = 2,  /**< component analogue */
@@ -129,7 +136,8 @@ DRV_ENUM_UNNAMED {
 };
 
 /** How an external scaler or transmitter chip is used. */
-typedef DRV_ENUM(DRV_EXT_CHIP_USAGE_T) {
+typedef DRV_ENUM(DRV_EXT_CHIP_USAGE_T)
+{
     DRV_NON_EXT_CHIP = 0,
     DRV_EXT_SCL_EXT_TX = 1,
     DRV_EXT_SCL_INT_TX = 2,
@@ -145,7 +153,8 @@ DRV_STATIC_ASSERT(sizeof(DRV_PMX_PLANE_T) == 4, "enumerations are 32 bits wide")
 DRV_STATIC_ASSERT(sizeof(DRV_EXT_CHIP_USAGE_T) == 4, "enumerations are 32 bits wide");
 
 /** Set-up of the digital port for one output. */
-typedef struct {
+typedef struct
+{
     CCIR_IN_OUT_MODE_T eDgoMode;  /**< output mode */
     CCIR_IN_OUT_FORMAT_T eDgoFmt; /**< output format */
     CCIR_IN_OUT_MODE_T eDgiMode;  /**< input mode */
@@ -153,7 +162,8 @@ typedef struct {
 } CCIR_DRV_INFO_T;
 
 /** Configuration of one output. */
-typedef struct {
+typedef struct
+{
     BOOL fgOutputEnable;            /**< the output is on */
     PMX_RESOLUTION_MODE_T eResMode; /**< its resolution mode */
     UINT32 u4VFreq;                 /**< fields or frames a second */
@@ -161,7 +171,8 @@ typedef struct {
 } PMX_RESOLUTION_T;
 
 /** Where the handshake with the display part stands. */
-typedef struct {
+typedef struct
+{
     HANDLE_T hPMXTimer;         /**< the display timer, made by PMX_Init */
     BOOL fgPmxFormatChangeFlag; /**< the display part is switching format */
     BOOL fgPmxEnabeOsdFlag;     /**< OSD planes wait for their return to the mix; kept spelt so */
@@ -176,7 +187,8 @@ typedef struct {
 /** What the mixer offers to other drivers through the interface manager (IID_IPMX). Each function takes first the tag
  *  that came with the table: the mixer's component id carried in the pointer. It returns what the PMX_ function of the
  *  same task in drv_pmx.h returns; the four source events are inert and return 1. */
-typedef struct {
+typedef struct
+{
     INT32 (*pi4SetMode)(void* pvTag, UCHAR ucMode, UCHAR ucVFreq, BOOL fgOSD5);
     INT32 (*pi4GetMode)(void* pvTag, UCHAR* pucMode);
     INT32 (*pi4GetOutSize)(void* pvTag, UINT32* pu4Width, UINT32* pu4Height);

@@ -13,10 +13,11 @@ extern "C" {
 /** What a video plane offers. Each function takes first the tag that came with the table. The mixer calls
  *  pu4SetColorMode alone and ignores its result.
  *
- * pu4SetColorMode tells the plane the mixer's colour space. It is called with MutexPMX held: a plane that from inside
- * it called i4Pmx_Connect or i4Pmx_Disconnect, or made the mixer's colour space change once more, would wait for
- * itself. */
-typedef struct {
+ *  pu4SetColorMode tells the plane the mixer's colour space. It is called with MutexPMX held: a plane that from inside
+ *  it called i4Pmx_Connect or i4Pmx_Disconnect, or made the mixer's colour space change once more, would wait for
+ *  itself. */
+typedef struct
+{
     UINT32 (*pu4SetPlaybackMode)(void* pvTag);
     UINT32 (*pu4AssignSyncCtrl)(void* pvTag);
     UINT32 (*pu4StcIsValid)(void* pvTag);

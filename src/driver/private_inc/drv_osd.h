@@ -1,6 +1,6 @@
 /** @file
- * OSD driver and display control: what the mixer tells them. All functions run on the caller's thread, which may sleep.
- * */
+ *  OSD driver and display control: what the mixer tells them. All functions run on the caller's thread, which may
+ *  sleep. */
 #ifndef DRV_OSD_H
 #define DRV_OSD_H
 

@@ -10,6 +10,7 @@
 #define DRV_PMX_H
 
 #include "drv_if_pmx.h"
+#include "x_plane_mxr.h"
 #include "x_typedef.h"
 
 #ifdef __cplusplus
@@ -109,8 +110,8 @@ PMX_API UINT32 PMX_GetEnable(UCHAR ucPmxId, UCHAR* pucEnable);
 
 /** Put the video plane that sits in the second mixer plane into the mix. The first mixer plane is never switched here.
  *  @param ucPmxId  mixer id, handed on unchecked
- * @param ucVdpId  the plane that sits there: 1, or instead 0 while the hardware swaps the two; for any other nothing is
- * done
+ *  @param ucVdpId  the plane that sits there: 1, or instead 0 while the hardware swaps the two; for any other nothing
+ *                  is done
  *  @return 1
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_EnableVideoPlane(UCHAR ucPmxId, UCHAR ucVdpId);
@@ -118,8 +119,8 @@ PMX_API UINT32 PMX_EnableVideoPlane(UCHAR ucPmxId, UCHAR ucVdpId);
 /** Take the video plane that sits in the second mixer plane out of the mix. The first mixer plane is never switched
  *  here.
  *  @param ucPmxId  mixer id, handed on unchecked
- * @param ucVdpId  the plane that sits there: 1, or instead 0 while the hardware swaps the two; for any other nothing is
- * done
+ *  @param ucVdpId  the plane that sits there: 1, or instead 0 while the hardware swaps the two; for any other nothing
+ *                  is done
  *  @return 1
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_DisableVideoPlane(UCHAR ucPmxId, UCHAR ucVdpId);
@@ -141,8 +142,8 @@ PMX_API INT32 i4PmxDisableVideoPlane(void* pvTag, UCHAR ucVdpId);
 /* Boot resolution, video PLL, TV type */
 
 /** Read the boot resolution that the boot loader left in the partition "fast_init_param".
- * @return the low byte of the partition's first word, a PMX_RESOLUTION_MODE_T value that nobody has validated; RES_480I
- * when the partition is missing or cannot be read
+ *  @return the low byte of the partition's first word, a PMX_RESOLUTION_MODE_T value that nobody has validated;
+ *          RES_480I when the partition is missing or cannot be read
  *  @context a thread that may sleep */
 PMX_API UINT8 PMX_GetHDMIDefaultRes(void);
 
@@ -181,6 +182,49 @@ PMX_API void PMX_QueryStatus(void);
 
 /* Mode */
 
+/** Ask whether a resolution mode is admitted by the capability word.
+ *  @param ucPmxId  mixer id, unchecked
+ *  @param ucMode   a PMX_RESOLUTION_MODE_T value; some are admitted, some refused whatever the capability word says
+ *  @return 1 admitted, 0 refused
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_CheckCap(UCHAR ucPmxId, UCHAR ucMode);
+
+/** Set one resolution mode on all outputs. An unchanged mode and frequency only repeat the notices to the OSD and video
+ *  plane drivers, once a mode has been set.
+ *  @param ucPmxId  mixer id, 0
+ *  @param ucMode   a PMX_RESOLUTION_MODE_T value
+ *  @param ucVFreq  vertical frequency in Hz: exactly 60 selects NTSC and 480i on composite, any other PAL and 576i
+ *  @param fgOSD5   fifth-OSD mode 0, 1 or 2; for the TV encoders alone, not stored
+ *  @return PMX_SET_OK; 0 for a mixer id other than 0 or a mode that PMX_CheckCap refuses
+ *  @context a thread that may sleep; takes no lock: no other mode change may run */
+PMX_API UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5);
+
+/** IPMX: PMX_SetMode.
+ *  @param pvTag    the table's tag
+ *  @param ucMode   a PMX_RESOLUTION_MODE_T value
+ *  @param ucVFreq  vertical frequency in Hz
+ *  @param fgOSD5   fifth-OSD mode 0, 1 or 2; for the TV encoders alone, not stored
+ *  @return PMX_SET_OK; 0 for a tag whose low 8 bits are not 0, or a refused mode
+ *  @context a thread that may sleep; takes no lock: no other mode change may run */
+PMX_API INT32 i4PmxSetMode(void* pvTag, UCHAR ucMode, UCHAR ucVFreq, BOOL fgOSD5);
+
+/** Set the state of all four outputs. The first enabled one of digital port, HDMI, component and composite gives the
+ *  mixer's format, HDMI's when none is enabled. HDMI, component and composite run it while they are off; the record
+ *  keeps what the caller gave. Ends by deciding whether graphics wait for the display part: see
+ *  PMX_SetFormatChangeFlag. A refused format lowers the format-change flag and stores nothing.
+ *  @param ucPmxId     mixer id, 0
+ *  @param prOutConf   four outputs, indexed PMX_OUTPUT_CCIR to PMX_OUTPUT_CVBS; fgOutputEnable and eResMode of each are
+ *  used, and eCcirDrvInfo of PMX_OUTPUT_CCIR; u4VFreq is not
+ *  @param ucVFreq     vertical frequency of all outputs in Hz: 60, 30, 29, 23 and 0 select NTSC, any other PAL
+ *  @param rDrvExtScl  how the external chip is used; a change programs everything
+ *  @param fgOSD5      fifth OSD plane asked for on the analogue outputs: 0 no, 1 composite, 2 both. An HD mixer format
+ *                     shows it on composite in any case, and on both when component's mode is not HD
+ *  @return PMX_SET_OK; 0 for a mixer id other than 0, a null pointer or a mixer format that PMX_CheckCap refuses
+ *  @context a thread that may sleep; takes no lock: no other mode change may run, the display timer may expire at any
+ *  point */
+PMX_API UINT32 PMX_SetModeEx(UCHAR ucPmxId, PMX_RESOLUTION_T* prOutConf, UCHAR ucVFreq, DRV_EXT_CHIP_USAGE_T rDrvExtScl,
+                             UINT8 fgOSD5);
+
 /** Read the mixer's resolution mode.
  *  @param ucPmxId  mixer id, 0
  *  @param pucMode  receives a PMX_RESOLUTION_MODE_T value
@@ -194,6 +238,67 @@ PMX_API UINT32 PMX_GetMode(UCHAR ucPmxId, UCHAR* pucMode);
  *  @return 1; 0 for a tag whose low 8 bits are not 0, or a null pointer
  *  @context any thread; takes no lock */
 PMX_API INT32 i4PmxGetMode(void* pvTag, UCHAR* pucMode);
+
+/** Read the force-mode flag. It is kept for its readers; no mode setting looks at it.
+ *  @param ucPmxId  mixer id, unchecked
+ *  @return 1 set, 0 clear
+ *  @context any thread; takes no lock */
+PMX_API BOOL PMX_IsForceMode(UCHAR ucPmxId);
+
+/** Set or clear the force-mode flag.
+ *  @param ucPmxId  mixer id, unchecked
+ *  @param fgOn     0 clear, anything else set
+ *  @context any thread; takes no lock */
+PMX_API void PMX_SetForceMode(UCHAR ucPmxId, BOOL fgOn);
+
+/* Display-part handshake. The display part raises the format-change flag and lowers it when it is done. The layer
+ * lowers it as well (its timer, nothing to wait for, a refused format) and never raises it. Per-output mode setting
+ * takes planes 2 to 6 out of the mix when it ends with the flag raised. */
+
+/** Raise or lower the format-change flag. Raising changes nothing else. Lowering owes the OSD planes their return to
+ *  the mix: at once, or, while the video plane driver waits for its sync control, by its PMX_SetOsdEnable.
+ *  @param bIsFormatChange  TRUE when the display part starts to switch format, FALSE when it is done
+ *  @return 1
+ *  @context any thread, and the timer's; any time */
+PMX_API UINT32 PMX_SetFormatChangeFlag(BOOL bIsFormatChange);
+
+/** Note or forget that PMX_SetOsdEnable owes the OSD planes their return.
+ *  @param bIsOsdEnable  TRUE or FALSE
+ *  @return 1
+ *  @context any thread, and the timer's */
+PMX_API UINT32 PMX_SetOsdEnableFlag(BOOL bIsOsdEnable);
+
+/** Mix the OSD planes again if they are owed it; for whoever held them back, once it is ready.
+ *  @return 1
+ *  @context any thread, and the timer's; any time */
+PMX_API UINT32 PMX_SetOsdEnable(void);
+
+/** Expiry function of the display timer: the display part never answered, or has long answered; lowers the flag.
+ *  @param h      ignored
+ *  @param pvArg  ignored
+ *  @context the timer's */
+PMX_API void _PMX_TmrIsr(HANDLE_T h, void* pvArg);
+
+/** Start the display timer anew. Failures of the timer are reported by Assert.
+ *  @param u4TimeInterval  milliseconds
+ *  @return 1
+ *  @context any thread */
+PMX_API UINT32 PMX_SetFormatChangeTimer(UINT32 u4TimeInterval);
+
+/** Ask whether the display part has finished switching format.
+ *  @return 1 ready, 0 the format-change flag is raised
+ *  @context any thread, and the timer's */
+PMX_API BOOL fgPMX_DisplayModeReady(void);
+
+/* Colour conversions */
+
+/** Convert from the mixer's colour space to that of the output's standard: BT.601 for SD, BT.709 for HD. Nothing is
+ *  cached: the same call twice programs twice. A colour space other than BT.601 or BT.709 is logged, reported by
+ *  Assert, and leaves the converters alone; so do, silently, modes without a setting.
+ *  @param eMixerOutCS   the mixer's colour space
+ *  @param ucOutputMode  a PMX_RESOLUTION_MODE_T value
+ *  @context any thread; takes no lock */
+PMX_API void PMX_ColorSpaceSetup(DRV_PMX_COLOR_SPACE_T eMixerOutCS, UCHAR ucOutputMode);
 
 /* Geometry */
 
@@ -214,7 +319,108 @@ PMX_API UINT32 PMX_GetOutSize(UCHAR ucPmxId, UINT32* pu4Width, UINT32* pu4Height
  *  @context any thread; takes no lock */
 PMX_API INT32 i4PmxGetOutSize(void* pvTag, UINT32* pu4Width, UINT32* pu4Height);
 
-/* Plane composition */
+/** Ask whether the mixer's resolution mode is reported as progressive.
+ *  @param ucPmxId  mixer id, 0
+ *  @return 1 or 0; 0 for a mixer id other than 0. RES_1080P23_976HZ, RES_1080P29_97HZ, the top-and-bottom modes and
+ *          every number above them count as 0
+ *  @context any thread; takes no lock */
+PMX_API UCHAR PMX_ProgressiveOut(UCHAR ucPmxId);
+
+/** Ask whether the mixer's resolution mode is reported as an HD output. Not the HD formats of the TV encoders: 29.97
+ *  Hz, RES_2D_576I50HZ and every mode above RES_3D_1080P24HZ_TB count here.
+ *  @param ucPmxId  mixer id, unchecked
+ *  @return TRUE or FALSE
+ *  @context any thread; takes no lock */
+PMX_API BOOL fgPmxFmtHDOutput(UCHAR ucPmxId);
+
+/* TV system, handed to the HDMI/AV driver */
+
+/** Tell the HDMI/AV driver the TV system chosen by the user.
+ *  @param ucPmxId      mixer id, 0
+ *  @param u2VSyncFreq  vertical frequency in Hz: 50, 60, 24, 30 or 25
+ *  @param fgTvSysAuto  the TV system follows the sink
+ *  @return 1, whatever the driver answers; 0 for a mixer id other than 0 or another frequency
+ *  @context a thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetTVSystem(UCHAR ucPmxId, UINT16 u2VSyncFreq, BOOL fgTvSysAuto);
+
+/** Ask the HDMI/AV driver what it would choose for a resolution and frequency.
+ *  @param ucPmxId                   mixer id, 0
+ *  @param ucChkRes                  a PMX_RESOLUTION_MODE_T value
+ *  @param u2VSyncFreq               vertical frequency in Hz
+ *  @param ucSupportedAutoRes        receives the low 8 bits of the driver's resolution; not tested for null
+ *  @param ucSupportedAutoVsyncFreg  receives the frequency in Hz; not tested for null
+ *  @return 1; 0 for a mixer id other than 0 or when the driver has no answer, and then nothing is written
+ *  @context a thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_ChkSupportedRes(UCHAR ucPmxId, UCHAR ucChkRes, UINT16 u2VSyncFreq, UCHAR* ucSupportedAutoRes,
+                                   UINT16* ucSupportedAutoVsyncFreg);
+
+/** Have the HDMI/AV driver change the deep colour.
+ *  @param ucPmxId      mixer id, 0
+ *  @param ucDeepColor  the driver's code
+ *  @return 1 when the driver does it, and also for a mixer id other than 0, for which nothing is done; else 0
+ *  @context a thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetHdmiDeepColor(UCHAR ucPmxId, UCHAR ucDeepColor);
+
+/** Tell the HDMI/AV driver whether the user chose the automatic resolution.
+ *  @param fgIsAuto  TRUE or FALSE
+ *  @context a thread that may sleep; takes no lock */
+PMX_API void PMX_RecordUiResAuto(BOOL fgIsAuto);
+
+/* Plane order */
+
+/** Set the background colour.
+ *  @param ucPmxId    mixer id, 0
+ *  @param u4BgColor  0x00YYUUVV
+ *  @return 1; 0 for a mixer id other than 0
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetBg(UCHAR ucPmxId, UINT32 u4BgColor);
+
+/** Set the whole stacking order.
+ *  @param ucPmxId        mixer id, 0
+ *  @param pu4PlaneOrder  eight plane ids, position 0 first; the record keeps their low 8 bits, the hardware gets the
+ *  words as given
+ *  @return 1; 0 for a mixer id other than 0 or a null pointer
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetPlaneOrderArray(UCHAR ucPmxId, const UINT32* pu4PlaneOrder);
+
+/** Put one plane at one position. It is not removed from where it stood: a caller that moves a plane writes both
+ *  positions.
+ *  @param ucPmxId       mixer id, 0
+ *  @param ucVdpId       plane id
+ *  @param ucPlaneOrder  position 0 to 7
+ *  @return 1; 0 for a mixer id other than 0 or a position above 7
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR ucPlaneOrder);
+
+/** Find a plane's position.
+ *  @param ucPmxId        mixer id, 0
+ *  @param ucVdpId        plane id
+ *  @param pucPlaneOrder  receives the lowest position that holds the plane, or 8 when none does
+ *  @return 1; 0 for a mixer id other than 0 or a null pointer
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR* pucPlaneOrder);
+
+/** Put the first video plane above or below the second by the hardware's swap of planes 1 and 2, and mix the second
+ *  mixer plane as the video plane that now sits there is enabled. The choice outlives a reset of the record.
+ *  @param ucPmxId  mixer id, handed on unchecked
+ *  @param u4OnTop  0 below, anything else above; stored unchanged, and the colour bar looks for 1 and nothing else
+ *  @return 1
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetOrderVdpComp0(UCHAR ucPmxId, UINT32 u4OnTop);
+
+/** Queue command 17 for video planes 0, 1 and 2, then PMX_SetOrderVdpComp0.
+ *  @param ucPmxId  mixer id, handed on unchecked
+ *  @param u4OnTop  0 below, anything else above
+ *  @return 1
+ *  @context a thread that may sleep; takes no lock */
+PMX_API UINT32 d_PMX_SetOrderVdpComp0(UCHAR ucPmxId, UINT32 u4OnTop);
+
+/** Read what PMX_SetOrderVdpComp0 was last given, 0 at load.
+ *  @param ucPmxId   mixer id, unchecked
+ *  @param pu4OnTop  receives it; not tested for null
+ *  @return 1
+ *  @context any thread; takes no lock */
+PMX_API UINT32 d_PMX_GetOrderVdpComp0(UCHAR ucPmxId, UINT32* pu4OnTop);
 
 /** Ask in which mixer plane a video plane sits; the hardware's swap of planes 1 and 2 decides.
  *  @param ucPmxId    mixer id, handed on unchecked
@@ -229,6 +435,182 @@ PMX_API UINT32 PMX_VdpGetPlanePosition(UCHAR ucPmxId, UCHAR ucVdpHwId);
  *  @return a DRV_PMX_PLANE_T value
  *  @context any thread; takes no lock */
 PMX_API INT32 i4PmxGetPlanePosition(void* pvTag, UCHAR ucVdpHwId);
+
+/* Arbitrary plane order */
+
+/** Feed each mixer plane from one source, and compensate the delays that follow. Prints 17 lines whatever the console's
+ *  level.
+ *  @param ucPmxId       mixer id, unchecked; printed and handed on as given
+ *  @param u4PlaneOrder  4 bits a plane, plane 0 lowest: the low three name the source 0 to 7, the top one is kept but
+ *  not used. All sources differ
+ *  @return 1; 0 when two planes name one source, and then nothing has changed; 0 also when the hardware refuses the
+ *  order, which then stays stored
+ *  @context a thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetArbPlaneOrder(UCHAR ucPmxId, UINT32 u4PlaneOrder);
+
+/** Read the arbitrary plane order last stored; a difference from the hardware's is logged.
+ *  @param ucPmxId       mixer id, unchecked; printed and handed on as given
+ *  @param pu4PlaneOrder receives the stored order; not tested for null
+ *  @return 1; 0 when the hardware cannot report its order, and then nothing is written
+ *  @context a thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_GetArbPlaneOrder(UCHAR ucPmxId, UINT32* pu4PlaneOrder);
+
+/* Plane swap, colour bar, mute */
+
+/** Swap two mixer planes in the hardware, or undo it. The state lives in the hardware alone; swapping planes 1 and 2
+ *  here does not count as "first video on top".
+ *  @param ucPmxId     mixer id, 0
+ *  @param ucEnable    0 undo, anything else swap
+ *  @param ucSwapMode  1: planes 1,2   2: 3,4   3: 6,7   4: 4,7   5: 1,3   6: 5,8   anything else: nothing is done
+ *  @return 1, also for an unknown swap mode; 0 for a mixer id other than 0
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetSwapEnable(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucSwapMode);
+
+/** Read one swap from the hardware.
+ *  @param ucPmxId     mixer id, 0
+ *  @param pucEnable   receives TRUE or FALSE; not tested for null, not written for an unknown swap mode
+ *  @param ucSwapMode  as for PMX_SetSwapEnable
+ *  @return 1, also for an unknown swap mode; 0 for a mixer id other than 0
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetSwapEnable(UCHAR ucPmxId, UCHAR* pucEnable, UCHAR ucSwapMode);
+
+/** Switch the test colour bar. While it is shown, "first video on top" is suspended.
+ *  @param ucPmxId   mixer id, 0
+ *  @param ucEnable  0 off, anything else on; kept as given: the mute hides and restores the bar for exactly 1
+ *  @return 1, also when the value is the stored one and nothing is done; 0 for a mixer id other than 0
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetCBEnable(UCHAR ucPmxId, UCHAR ucEnable);
+
+/** Read the colour bar's switch.
+ *  @param ucPmxId    mixer id, 0
+ *  @param pucEnable  receives the value last given, also while a mute hides the bar
+ *  @return 1; 0 for a mixer id other than 0 or a null pointer
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetCBEnable(UCHAR ucPmxId, UCHAR* pucEnable);
+
+/** Mute the mixer's output; hides a colour bar while it lasts.
+ *  @param ucPmxId   mixer id, 0
+ *  @param ucEnable  0 release, anything else mute
+ *  @return 1, also when the value is the stored one and nothing is done; 0 for a mixer id other than 0
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetMuteEnable(UCHAR ucPmxId, UCHAR ucEnable);
+
+/** Read the mute.
+ *  @param ucPmxId    mixer id, 0
+ *  @param pucEnable  receives the value last given
+ *  @return 1; 0 for a mixer id other than 0 or a null pointer
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetMuteEnable(UCHAR ucPmxId, UCHAR* pucEnable);
+
+/** Set the hardware's active zone for a resolution mode.
+ *  @param ucPmxId  mixer id, handed on unchecked
+ *  @param ucMode   a PMX_RESOLUTION_MODE_T value, handed on unchecked
+ *  @return 1
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetActiveZone(UCHAR ucPmxId, UCHAR ucMode);
+
+/** Set a video path's delay in the hardware.
+ *  @param ucVdoId   video path
+ *  @param ucADJ_F   field adjustment
+ *  @param u2HDelay  horizontal delay in the hardware's unit
+ *  @param u2VDelay  vertical delay in the hardware's unit
+ *  @return 1
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetDelay(UCHAR ucVdoId, UCHAR ucADJ_F, UINT16 u2HDelay, UINT16 u2VDelay);
+
+/* Source ports */
+
+/** Results of connecting and disconnecting, as the framework numbers them. */
+#define PMX_PORT_DONE 0x71000000u
+#define PMX_NO_SUCH_PORT 0xF1000002u
+
+/** Find the input port of an upstream component. An unknown type is logged, an id out of range is not.
+ *  @param u2CompType  PMX_COMP_TYPE_VDP or PMX_COMP_TYPE_OSD
+ *  @param u2CompId    its id; the low 8 bits count: video planes 0 (port 0) and 1 to 3 (port 1), OSD planes 0 to 5
+ *  (ports 2 to 7)
+ *  @return port 0 to 7; 8: none
+ *  @context any thread; takes no lock */
+PMX_API UINT32 u4PmxCompId2LocalId(UINT16 u2CompType, UINT16 u2CompId);
+
+/** Record that an upstream component feeds the mixer. It replaces whatever the port held; whether the source is enabled
+ *  stays.
+ *  @param u2ThisCompType      ignored
+ *  @param u2ThisCompId        the mixer's component id, 0
+ *  @param u2UpstreamCompType  the component's type
+ *  @param u2UpstreamCompId    its id
+ *  @return PMX_PORT_DONE; PMX_NO_SUCH_PORT for a component without a port or a mixer id other than 0, and then nothing
+ *  is stored
+ *  @context a thread that may sleep; takes MutexPMX: never from inside pu4SetColorMode */
+PMX_API UINT32 i4Pmx_Connect(UINT16 u2ThisCompType, UINT16 u2ThisCompId, UINT16 u2UpstreamCompType,
+                             UINT16 u2UpstreamCompId);
+
+/** Clear an upstream component's port, whatever it holds; the source is not enabled any more. The master colour space
+ *  is not decided here: see PMX_DecideMasterColorSpace.
+ *  @param u2ThisCompType      ignored
+ *  @param u2ThisCompId        the mixer's component id, 0
+ *  @param u2UpstreamCompType  the component's type
+ *  @param u2UpstreamCompId    its id
+ *  @return PMX_PORT_DONE; PMX_NO_SUCH_PORT for a component without a port or a mixer id other than 0, and then nothing
+ *  is cleared
+ *  @context a thread that may sleep; takes MutexPMX: never from inside pu4SetColorMode */
+PMX_API UINT32 i4Pmx_Disconnect(UINT16 u2ThisCompType, UINT16 u2ThisCompId, UINT16 u2UpstreamCompType,
+                                UINT16 u2UpstreamCompId);
+
+/* Source events */
+
+/** A video plane starts to deliver pictures. Decides the master colour space anew. Plane 2 switches full-range
+ *  conversion of graphics on, plane 1 switches it off.
+ *  @param ucPmxId      mixer id, unchecked; asked of the hardware as given
+ *  @param ucVdpId      0 main video, 1 second video, 2 still-picture background (always BT.601), 3
+ *  @param i4SrcWidth   pixels; above 720 the source is BT.709
+ *  @param i4SrcHeight  lines; above 576 the source is BT.709
+ *  @param ucLumaKey    luma key; planes 1 to 3 count for the master colour space only with one, and while the hardware
+ *                      mixes plane 1
+ *  @return 1; 0 for a plane without a port or on a port that is not connected, and then nothing has changed
+ *  @context a thread that may sleep, outside MutexPMX, which a change of the master colour space takes */
+PMX_API UINT32 PMX_VdpEnabled(UCHAR ucPmxId, UCHAR ucVdpId, INT32 i4SrcWidth, INT32 i4SrcHeight, UCHAR ucLumaKey);
+
+/** A video plane stops. The master colour space stays until the next decision. Plane 2 switches full-range conversion
+ *  of graphics off.
+ *  @param ucPmxId  mixer id, unchecked
+ *  @param ucVdpId  video plane 0 to 3
+ *  @return 1, connected or not; 0 for a plane without a port
+ *  @context a thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_VdpDisabled(UCHAR ucPmxId, UCHAR ucVdpId);
+
+/** An OSD plane starts. YCbCr graphics take the master colour space at once; RGB graphics leave it and what the port
+ *  knew.
+ *  @param ucPmxId       mixer id, unchecked
+ *  @param ucOsdId       OSD plane 0 to 5
+ *  @param i4SrcWidth    pixels; above 720 the source is BT.709
+ *  @param i4SrcHeight   lines; above 576 the source is BT.709
+ *  @param eSrcColorMode colour mode of its pixels
+ *  @return 1, connected or not; 0 for a plane without a port
+ *  @context a thread that may sleep, outside MutexPMX, which a change of the master colour space takes */
+PMX_API UINT32 PMX_OsdEnabled(UCHAR ucPmxId, UCHAR ucOsdId, INT32 i4SrcWidth, INT32 i4SrcHeight,
+                              DRV_GFX_COLOR_MODE_T eSrcColorMode);
+
+/** An OSD plane stops. Decides the master colour space anew.
+ *  @param ucPmxId  mixer id, unchecked
+ *  @param ucOsdId  OSD plane 0 to 5
+ *  @return 1, connected or not; 0 for a plane without a port
+ *  @context a thread that may sleep, outside MutexPMX, which a change of the master colour space takes */
+PMX_API UINT32 PMX_OsdDisabled(UCHAR ucPmxId, UCHAR ucOsdId);
+
+/** Decide the master colour space over all enabled sources and announce a change: YCbCr graphics before the second
+ *  video before the main video, among graphics the highest port; with nothing enabled it stays. The second video counts
+ *  only with a luma key and while the hardware mixes it; RGB graphics never do; whether a port is connected does not
+ *  matter.
+ *  @param ucPmxId  mixer id, unchecked; asked of the hardware as given
+ *  @return 1
+ *  @context a thread that may sleep, outside MutexPMX, which a change takes */
+PMX_API UINT32 PMX_DecideMasterColorSpace(UCHAR ucPmxId);
+
+/** Tell every connected video plane the master colour space through its IVdp table. A plane whose table cannot be
+ *  fetched is logged, reported by Assert and passed over.
+ *  @param ucPmxId  mixer id, unchecked
+ *  @context a thread that may sleep; holds MutexPMX across the calls */
+PMX_API void PMX_InformVdpColorSpace(UCHAR ucPmxId);
 
 /* Source events through IPMX. They are inert: only the direct calls count. */
 
@@ -261,7 +643,233 @@ PMX_API INT32 i4PmxVdpEnabled(void* pvTag, INT32 i4SrcWidth, INT32 i4SrcHeight);
  *  @context any */
 PMX_API INT32 i4PmxVdpDisabled(void* pvTag);
 
+/* Picture adjustments */
+
+/** Set brightness, of the analogue outputs or of HDMI. The record keeps the analogue one alone. The mixer's own
+ *  brightness follows in either case.
+ *  @param ucPmxId  mixer id, 0
+ *  @param ucBrightness  128 = neutral
+ *  @param bSetTVE  0 HDMI, anything else the analogue outputs
+ *  @return 1; 0 for a mixer id other than 0 or when capability bit 21 is clear
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetBrightness(UCHAR ucPmxId, UCHAR ucBrightness, UCHAR bSetTVE);
+
+/** Read brightness of the analogue outputs.
+ *  @param ucPmxId  mixer id, 0
+ *  @param pucBrightness  receives it
+ *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 21 is clear
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetBrightness(UCHAR ucPmxId, UCHAR* pucBrightness);
+
+/** Set brightness of the analogue outputs of mixer 0.
+ *  @param ucBrightness  as for PMX_SetBrightness
+ *  @context any thread that may sleep; takes no lock */
+PMX_API void d_PMX_SetBrightness(UCHAR ucBrightness);
+
+/** Read brightness of the analogue outputs of mixer 0.
+ *  @param pucBrightness  receives it, unless PMX_GetBrightness fails
+ *  @context any thread; takes no lock */
+PMX_API void d_PMX_GetBrightness(UCHAR* pucBrightness);
+
+/** Set contrast, of the analogue outputs or of HDMI. The record keeps the analogue one alone. The mixer's own contrast
+ *  follows in either case.
+ *  @param ucPmxId  mixer id, 0
+ *  @param ucContrast  128 = neutral
+ *  @param bSetTVE  0 HDMI, anything else the analogue outputs
+ *  @return 1; 0 for a mixer id other than 0 or when capability bit 22 is clear
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetContrast(UCHAR ucPmxId, UCHAR ucContrast, UCHAR bSetTVE);
+
+/** Read contrast of the analogue outputs.
+ *  @param ucPmxId  mixer id, 0
+ *  @param pucContrast  receives it
+ *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 22 is clear
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetContrast(UCHAR ucPmxId, UCHAR* pucContrast);
+
+/** Set contrast of the analogue outputs of mixer 0.
+ *  @param ucContrast  as for PMX_SetContrast
+ *  @context any thread that may sleep; takes no lock */
+PMX_API void d_PMX_SetContrast(UCHAR ucContrast);
+
+/** Read contrast of the analogue outputs of mixer 0.
+ *  @param pucContrast  receives it, unless PMX_GetContrast fails
+ *  @context any thread; takes no lock */
+PMX_API void d_PMX_GetContrast(UCHAR* pucContrast);
+
+/** Set hue, of the analogue outputs or of HDMI. The record keeps the analogue one alone.
+ *  @param ucPmxId  mixer id, 0
+ *  @param ucHue  128 = neutral
+ *  @param bSetTVE  0 HDMI, anything else the analogue outputs
+ *  @return 1; 0 for a mixer id other than 0 or when capability bit 23 is clear
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetHue(UCHAR ucPmxId, UCHAR ucHue, UCHAR bSetTVE);
+
+/** Read hue of the analogue outputs.
+ *  @param ucPmxId  mixer id, 0
+ *  @param pucHue  receives it
+ *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 23 is clear
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetHue(UCHAR ucPmxId, UCHAR* pucHue);
+
+/** Set hue of the analogue outputs of mixer 0.
+ *  @param ucHue  as for PMX_SetHue
+ *  @context any thread that may sleep; takes no lock */
+PMX_API void d_PMX_SetHue(UCHAR ucHue);
+
+/** Read hue of the analogue outputs of mixer 0.
+ *  @param pucHue  receives it, unless PMX_GetHue fails
+ *  @context any thread; takes no lock */
+PMX_API void d_PMX_GetHue(UCHAR* pucHue);
+
+/** Set saturation, of the analogue outputs or of HDMI. The record keeps the analogue one alone.
+ *  @param ucPmxId  mixer id, 0
+ *  @param ucSaturation  128 = neutral
+ *  @param bSetTVE  0 HDMI, anything else the analogue outputs
+ *  @return 1; 0 for a mixer id other than 0 or when capability bit 24 is clear
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetSaturation(UCHAR ucPmxId, UCHAR ucSaturation, UCHAR bSetTVE);
+
+/** Read saturation of the analogue outputs.
+ *  @param ucPmxId  mixer id, 0
+ *  @param pucSaturation  receives it
+ *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 24 is clear
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetSaturation(UCHAR ucPmxId, UCHAR* pucSaturation);
+
+/** Set saturation of the analogue outputs of mixer 0.
+ *  @param ucSaturation  as for PMX_SetSaturation
+ *  @context any thread that may sleep; takes no lock */
+PMX_API void d_PMX_SetSaturation(UCHAR ucSaturation);
+
+/** Read saturation of the analogue outputs of mixer 0.
+ *  @param pucSaturation  receives it, unless PMX_GetSaturation fails
+ *  @context any thread; takes no lock */
+PMX_API void d_PMX_GetSaturation(UCHAR* pucSaturation);
+
+/** Set sharpness, of the analogue outputs or of HDMI. The record keeps the analogue one alone.
+ *  @param ucPmxId  mixer id, 0
+ *  @param ucSharpness  the encoder's unit; 0 after a reset
+ *  @param bSetTVE  0 HDMI, anything else the analogue outputs
+ *  @return 1; 0 for a mixer id other than 0 or when capability bit 27 is clear
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetSharpness(UCHAR ucPmxId, UCHAR ucSharpness, UCHAR bSetTVE);
+
+/** Read sharpness of the analogue outputs.
+ *  @param ucPmxId  mixer id, 0
+ *  @param pucSharpness  receives it
+ *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 27 is clear
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetSharpness(UCHAR ucPmxId, UCHAR* pucSharpness);
+
+/** Set sharpness of the analogue outputs of mixer 0.
+ *  @param ucSharpness  as for PMX_SetSharpness
+ *  @context any thread that may sleep; takes no lock */
+PMX_API void d_PMX_SetSharpness(UCHAR ucSharpness);
+
+/** Read sharpness of the analogue outputs of mixer 0.
+ *  @param pucSharpness  receives it, unless PMX_GetSharpness fails
+ *  @context any thread; takes no lock */
+PMX_API void d_PMX_GetSharpness(UCHAR* pucSharpness);
+
+/** Select a gamma curve.
+ *  @param ucPmxId  mixer id, 0
+ *  @param ucGamma  0 off, 1 to 4 curve; any other is stored as given and switches gamma off
+ *  @return 1; 0 for a mixer id other than 0 or when capability bit 20 is clear
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetGamma(UCHAR ucPmxId, UCHAR ucGamma);
+
+/** Read what PMX_SetGamma was last given.
+ *  @param ucPmxId   mixer id, 0
+ *  @param pucGamma  receives it
+ *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 20 is clear
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetGamma(UCHAR ucPmxId, UCHAR* pucGamma);
+
+/** Read the number of gamma curves.
+ *  @param ucPmxId     mixer id, 0
+ *  @param pucGammaNs  receives 4
+ *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 20 is clear
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetGammaNs(UCHAR ucPmxId, UCHAR* pucGammaNs);
+
+/** Set the black level of the analogue outputs.
+ *  @param ucPmxId   mixer id, 0
+ *  @param ucCAVEn   component's switch
+ *  @param ucCVBSEn  composite's switch
+ *  @return 1; 0 for a mixer id other than 0 or when capability bit 30 is clear
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetBlackLv(UCHAR ucPmxId, UCHAR ucCAVEn, UCHAR ucCVBSEn);
+
+/** Read the black level of the analogue outputs.
+ *  @param ucPmxId    mixer id, 0
+ *  @param pucCAVEn   receives component's switch
+ *  @param pucCVBSEn  receives composite's switch
+ *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 30 is clear
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetBlackLv(UCHAR ucPmxId, UCHAR* pucCAVEn, UCHAR* pucCVBSEn);
+
+/** Select where the digital port takes its picture.
+ *  @param fgBeforeMixer  0 behind the mixer, anything else before it
+ *  @return 1
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetDGOSource(BOOL fgBeforeMixer);
+
+/** Switch composite's set-up.
+ *  @param fgEnable  on
+ *  @return 1
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetCVBSSetup(BOOL fgEnable);
+
+/** Switch composite's PAL-60.
+ *  @param fgEnable  on
+ *  @return 1
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetCVBSPal60(BOOL fgEnable);
+
+/** Tell the TV encoders the kind of medium that plays; not stored.
+ *  @param ucPmxId      mixer id, 0
+ *  @param ucMediaType  the middleware's code
+ *  @return 1; 0 for a mixer id other than 0
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetMediaType(UCHAR ucPmxId, UCHAR ucMediaType);
+
+/** Ask for 2D smoothing; other drivers read _fg2DCap.
+ *  @param uc2D  0 off, anything else on
+ *  @context any thread; takes no lock */
+PMX_API void d_PMX_Set2DSmooth(UCHAR uc2D);
+
 /* Aspect ratio */
+
+/** Set the normal aspect ratio and signal it on HDMI.
+ *  @param ucPmxId        mixer id, 0
+ *  @param u4AspectRatio  an ASP_ code
+ *  @return 1; 0 for a mixer id other than 0; 0 also when the HDMI/AV driver refuses it, and then it stays stored
+ *  @context a thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetAspectRatio(UCHAR ucPmxId, UINT32 u4AspectRatio);
+
+/** Set the normal aspect ratio now, which drops one that waits, or let it wait for PMX_SetAspectRatioNext.
+ *  @param ucPmxId        mixer id, 0
+ *  @param u4AspectRatio  an ASP_ code
+ *  @param fgApplyOnNext  0 now, anything else: it waits
+ *  @return 1; 0 for a mixer id other than 0; 0 also when the HDMI/AV driver refuses it, and then it stays stored
+ *  @context a thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgApplyOnNext);
+
+/** Apply the aspect ratio that waits; callers do it at a mode change.
+ *  @param ucPmxId  mixer id; HDMI is told for 0 alone
+ *  @return the normal aspect ratio afterwards (an ASP_ code, not a success), also when none waited; 0 when the HDMI/AV
+ *          driver refuses it, and then it is stored all the same, waits no more, and the video planes are not told
+ *  @context a thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetAspectRatioNext(UCHAR ucPmxId);
+
+/** Enter or leave the digest view with its aspect ratio. Leaving sets the analogue widescreen signalling.
+ *  @param ucPmxId         mixer id, 0
+ *  @param u4AspectRatio   an ASP_ code; stored in either case
+ *  @param fgDigestEnable  0 leave, anything else enter
+ *  @return 1; 0 for a mixer id other than 0
+ *  @context a thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetDigestAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgDigestEnable);
 
 /** Read the aspect ratio in force: the digest view's while it is shown, else the normal one.
  *  @param ucPmxId         mixer id, 0
@@ -276,6 +884,101 @@ PMX_API UINT32 PMX_GetAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio);
  *  @return 1; 0 for a tag whose low 8 bits are not 0, or a null pointer
  *  @context any thread; takes no lock */
 PMX_API INT32 i4PmxGetAspectRatio(void* pvTag, UINT32* pu4AspectRatio);
+
+/** Ask whether the digest view is shown.
+ *  @param ucPmxId  mixer id, 0
+ *  @return TRUE or FALSE; FALSE for a mixer id other than 0
+ *  @context any thread; takes no lock */
+PMX_API BOOL PMX_IsUnderDigestMode(UCHAR ucPmxId);
+
+/** Read the normal aspect ratio, digest view or not.
+ *  @param ucPmxId         mixer id, 0
+ *  @param pu4AspectRatio  receives an ASP_ code
+ *  @return 1; 0 for a mixer id other than 0 or a null pointer
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetNormalAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio);
+
+/** Read the digest view's aspect ratio, shown or not.
+ *  @param ucPmxId         mixer id, 0
+ *  @param pu4AspectRatio  receives an ASP_ code
+ *  @return 1; 0 for a mixer id other than 0 or a null pointer
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetDigestAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio);
+
+/** Read the aspect ratio that the middleware asked for last: the one that waits, if any, else the normal one.
+ *  @param ucPmxId         mixer id, 0
+ *  @param pu4AspectRatio  receives an ASP_ code
+ *  @return 1; 0 for a mixer id other than 0 or a null pointer
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetAspectRatioMW(UCHAR ucPmxId, UINT32* pu4AspectRatio);
+
+/* Digital output: while the mixer is off, enable and parameters are only stored, and PMX_SetEnable applies them */
+
+/** Switch the parallel digital port.
+ *  @param ucPmxId   mixer id, 0
+ *  @param ucEnable  0 off, anything else on
+ *  @return 1; 0 for a mixer id other than 0 or when capability bit 25 is clear
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetDigitalOutEnable(UCHAR ucPmxId, UCHAR ucEnable);
+
+/** Read the parallel digital port's switch.
+ *  @param ucPmxId    mixer id, 0
+ *  @param pucEnable  receives the value last given
+ *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 25 is clear
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetDigitalOutEnable(UCHAR ucPmxId, UCHAR* pucEnable);
+
+/** Set the parallel digital port's bus.
+ *  @param ucPmxId            mixer id, 0
+ *  @param ucDigitalBit       bus width in bits
+ *  @param ucProprietaryMode  vendor mode code
+ *  @return 1; 0 for a mixer id other than 0 or when capability bit 25 is clear
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetDigitalOutPara(UCHAR ucPmxId, UCHAR ucDigitalBit, UCHAR ucProprietaryMode);
+
+/** Set the parallel digital port's clock phase, at once.
+ *  @param ucPmxId  mixer id, 0
+ *  @param u4Phase  phase in the hardware's unit; the record keeps its low 8 bits, which PMX_SetEnable applies again
+ *  @return 1; 0 for a mixer id other than 0
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetDigitalOutPhase(UCHAR ucPmxId, UINT32 u4Phase);
+
+/** Set the parallel digital port's pad drive strength, at once; not stored.
+ *  @param u4Drving  strength in the hardware's unit
+ *  @return 1
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetDigitalOutDrv(UINT32 u4Drving);
+
+/** Set the colour format of the digital picture, on the port and on HDMI, at once.
+ *  @param ucPmxId  mixer id, 0
+ *  @param ucRgb    a PLA_MXR_DIGITAL_OUTPUT_FMT_T value
+ *  @return 1; 0 for a mixer id other than 0; 0 also for a value above 4, and then it has been stored and programmed,
+ *          and HDMI is not told
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetDigitalOutRgb(UCHAR ucPmxId, UCHAR ucRgb);
+
+/** Read the colour format of the digital picture.
+ *  @param ucPmxId  mixer id, 0
+ *  @param pucRgb   receives the value last given
+ *  @return 1; 0 for a mixer id other than 0 or a null pointer
+ *  @context any thread; takes no lock */
+PMX_API UINT32 PMX_GetDigitalOutRgb(UCHAR ucPmxId, UCHAR* pucRgb);
+
+/* External chip, closed caption */
+
+/** Hand a picture-processing setting to the external chip; not stored.
+ *  @param eSetType  a PLA_MXR_EXTERNAL_CHIP_SETTING_E value
+ *  @param i4Value   its value; the chip takes the low 8 bits
+ *  @return 1, whatever the driver answers; 0 for an unknown setting
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetExternalChipSetting(PLA_MXR_EXTERNAL_CHIP_SETTING_E eSetType, INT32 i4Value);
+
+/** Switch closed captions.
+ *  @param ucPmxId              mixer id, 0; for any other nothing is done
+ *  @param eClosedCaptionOnOff  PLA_MXR_CLOSED_CAPTION_ON; any other value switches them off
+ *  @return 1, also for a mixer id other than 0
+ *  @context any thread that may sleep; takes no lock */
+PMX_API UINT32 PMX_SetClosedCaptionOnOff(UCHAR ucPmxId, PLA_MXR_CLOSED_CAPTION_ON_OFF_T eClosedCaptionOnOff);
 
 #ifdef __cplusplus
 }

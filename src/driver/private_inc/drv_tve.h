@@ -1,6 +1,6 @@
 /** @file
- * TV encoder driver. Encoder 0 (TVE_1) drives component, encoder 1 (TVE_2) composite. All functions run on the caller's
- * thread, which may sleep. */
+ *  TV encoder driver. Encoder 0 (TVE_1) drives component, encoder 1 (TVE_2) composite. All functions run on the
+ *  caller's thread, which may sleep. */
 #ifndef DRV_TVE_H
 #define DRV_TVE_H
 
@@ -15,7 +15,8 @@ extern "C" {
 #define TVE_SET_OK 1
 
 /** Widescreen signalling of the analogue outputs. */
-typedef DRV_ENUM(TVE_ASPECT_RATIO_T) {
+typedef DRV_ENUM(TVE_ASPECT_RATIO_T)
+{
     ASPECT_RATIO_4_3 = 0,
     ASPECT_RATIO_16_9_FULL_FORMAT = 1
 } TVE_ASPECT_RATIO_T;

@@ -10,7 +10,8 @@ extern "C" {
 #endif
 
 /** How far the hardware shows a video plane. */
-typedef DRV_ENUM(VDP_ENABLE_T) {
+typedef DRV_ENUM(VDP_ENABLE_T)
+{
     VDP_DISABLED = 0,
     VDP_HIDDEN = 1, /**< counts as enabled */
     VDP_ENABLED = 2
@@ -20,8 +21,8 @@ DRV_STATIC_ASSERT(sizeof(VDP_ENABLE_T) == 4, "enumerations are 32 bits wide");
 
 /** Tell the driver the output's TV format.
  *  @param ucMode     a PMX_RESOLUTION_MODE_T value
- * @param fgChanged  1 after the format has been programmed anew, be the mode the same or not; 0 when the mixer's format
- * stays
+ *  @param fgChanged  1 after the format has been programmed anew, be the mode the same or not; 0 when the mixer's
+ *                    format stays
  *  @context a thread that may sleep */
 void VDP_SetTvFormat(UCHAR ucMode, BOOL fgChanged);
 

@@ -1,9 +1,9 @@
 /** @file
  *  Mixer hardware layer: what the mixer layer asks of the plane mixer, its scaler, colour converters, digital port and
- * vertical-sync handling. No function here fails unless it says so. All run on the caller's thread; those that must
- * also be callable from the timer's context say so. The only mixer is 0; where the mixer layer hands an id on as it was
- * given (swap of planes 1 and 2 and its query, plane mixing, plane selectors, active zone), another id must do no harm.
- * */
+ *  vertical-sync handling. No function here fails unless it says so. All run on the caller's thread; those that must
+ *  also be callable from the timer's context say so. The only mixer is 0; where the mixer layer hands an id on as it
+ *  was given (swap of planes 1 and 2 and its query, plane mixing, plane selectors, active zone), another id must do no
+ *  harm. */
 #ifndef PMX_HAL_H
 #define PMX_HAL_H
 
@@ -48,8 +48,8 @@ void PMX_HalSetBg(UCHAR ucPmxId, UINT32 u4BgColor);
 /** Program the stacking order.
  *  @param ucPmxId        mixer id
  *  @param u4Number       3 at reset, 8 for an order that was asked for
- * @param pu4PlaneOrder  eight plane ids, position 0 first; a plane may be named twice, and any 32-bit word may come and
- * must do no harm */
+ *  @param pu4PlaneOrder  eight plane ids, position 0 first; a plane may be named twice, and any 32-bit word may come
+ *                        and must do no harm */
 void PMX_HalPlaneOrder(UCHAR ucPmxId, UINT32 u4Number, const UINT32* pu4PlaneOrder);
 
 /** Put the plane selectors into their initial state.

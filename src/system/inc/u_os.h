@@ -18,18 +18,21 @@ extern "C" {
 
 #define OSR_OK 0
 
-typedef DRV_ENUM(X_SEMA_TYPE_T) {
+typedef DRV_ENUM(X_SEMA_TYPE_T)
+{
     X_SEMA_TYPE_BINARY = 0,
     X_SEMA_TYPE_COUNTING = 1,
     X_SEMA_TYPE_MUTEX = 2
 } X_SEMA_TYPE_T;
 
-typedef DRV_ENUM(X_SEMA_OPTION_T) {
+typedef DRV_ENUM(X_SEMA_OPTION_T)
+{
     X_SEMA_OPTION_WAIT = 1, /**< wait for ever */
     X_SEMA_OPTION_NOWAIT = 2
 } X_SEMA_OPTION_T;
 
-typedef DRV_ENUM(X_TIMER_FLAG_T) {
+typedef DRV_ENUM(X_TIMER_FLAG_T)
+{
     X_TIMER_FLAG_ONCE = 1,
     X_TIMER_FLAG_REPEAT = 2
 } X_TIMER_FLAG_T;
@@ -118,8 +121,8 @@ INT32 x_vsnprintf(CHAR* szBuffer, size_t zSize, const CHAR* szFormat, va_list rA
 
 /** Levelled console print: prints when the console's level admits i4Level.
  *  A null string argument is printed as (null).
- * @param i4Level   0 status report, warnings, handshake; 1 life cycle and display-mode progress; 5 errors; 8 source and
- * plane events, refusals; 9 detailed trace and interface-manager failures
+ *  @param i4Level   0 status report, warnings, handshake; 1 life cycle and display-mode progress; 5 errors; 8 source
+ *                   and plane events, refusals; 9 detailed trace and interface-manager failures
  *  @param szFormat  printf format
  *  @context any, the timer's included */
 void PMX_IsLog(INT32 i4Level, const CHAR* szFormat, ...) DRV_PRINTF_FORMAT(2, 3);
@@ -169,9 +172,10 @@ UINT32 x_reg_read32(UINT32 u4Address);
  *  @context any */
 void x_reg_write32(UINT32 u4Address, UINT32 u4Value);
 
-/** Power-management operations of a driver. Both return 0 on success and run in the kernel's power-management context.
- *  */
-typedef struct {
+/** Power-management operations of a driver. Both return 0 on success and run in the kernel's power-management
+ *  context. */
+typedef struct
+{
     int (*suspend)(void* param);
     int (*resume)(void* param);
 } PM_OPERATIONS_T;

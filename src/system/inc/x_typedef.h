@@ -1,6 +1,6 @@
 /** @file
- * Basic types of the driver stack. Widths are the contract: every header of the stack builds on them, in C and in C++.
- * */
+ *  Basic types of the driver stack. Widths are the contract: every header of the stack builds on them, in C and in
+ *  C++. */
 #ifndef X_TYPEDEF_H
 #define X_TYPEDEF_H
 

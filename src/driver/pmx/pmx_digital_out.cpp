@@ -1,0 +1,100 @@
+/* The parallel digital port, and the colour format of the digital picture. While the mixer is off, enable and
+ * parameters are only stored: PMX_SetEnable applies them. Phase and colour format go out at once. */
+#include "drv_av_d.h"
+#include "drv_pmx.h"
+#include "pmx_hal.h"
+#include "pmx_if.h"
+#include "x_avd.h"
+#include "x_plane_mxr.h"
+
+#define CAP_DIGITAL_OUT 0x02000000
+
+static bool fgHasDigitalOut(void)
+{
+    return (prPmxConf()->u4Capability & CAP_DIGITAL_OUT) != 0;
+}
+
+/* HDMI's code for each PLA_MXR_DIGITAL_OUTPUT_FMT_T. */
+static constexpr UINT8 HDMI_COLOR_MODES[] = { HDMI_YCBCR_444, HDMI_RGB, HDMI_XV_YCC, HDMI_YCBCR_422, HDMI_RGB_FULL };
+static_assert(sizeof HDMI_COLOR_MODES == PLA_MXR_DIGITAL_OUTPUT_FMT_FULL_RGB + 1);
+
+UINT32 PMX_SetDigitalOutEnable(UCHAR ucPmxId, UCHAR ucEnable)
+{
+    if (ucPmxId != 0 || !fgHasDigitalOut())
+        return 0;
+
+    PMX_CONF_T* prConf = prPmxConf();
+    prConf->ucDigitalOut = ucEnable;
+    if (prConf->ucEnable != 0)
+    {
+        PMX_HalSetDigitalOut(0, ucEnable, prConf->ucProprietaryMode, prConf->ucDigitalBit);
+        PMX_HalSetDigitalOutRgb(0, prConf->ucDigitalRgb);
+    }
+    return 1;
+}
+
+UINT32 PMX_GetDigitalOutEnable(UCHAR ucPmxId, UCHAR* pucEnable)
+{
+    if (ucPmxId != 0 || pucEnable == nullptr || !fgHasDigitalOut())
+        return 0;
+
+    *pucEnable = prPmxConf()->ucDigitalOut;
+    return 1;
+}
+
+UINT32 PMX_SetDigitalOutPara(UCHAR ucPmxId, UCHAR ucDigitalBit, UCHAR ucProprietaryMode)
+{
+    if (ucPmxId != 0 || !fgHasDigitalOut())
+        return 0;
+
+    PMX_CONF_T* prConf = prPmxConf();
+    prConf->ucDigitalBit = ucDigitalBit;
+    prConf->ucProprietaryMode = ucProprietaryMode;
+    if (prConf->ucEnable != 0)
+    {
+        PMX_HalSetDigitalOut(0, prConf->ucDigitalOut, ucProprietaryMode, ucDigitalBit);
+        PMX_HalSetDigitalOutRgb(0, prConf->ucDigitalRgb);
+    }
+    return 1;
+}
+
+UINT32 PMX_SetDigitalOutPhase(UCHAR ucPmxId, UINT32 u4Phase)
+{
+    if (ucPmxId != 0)
+        return 0;
+
+    PMX_HalSetDigitalOutPhase(0, u4Phase);
+    prPmxConf()->u4Phase = (UCHAR)u4Phase; // the record keeps 8 bits, the hardware got them all
+    return 1;
+}
+
+UINT32 PMX_SetDigitalOutDrv(UINT32 u4Drving)
+{
+    PMX_HalSetDigitalOutDrv(u4Drving);
+    return 1;
+}
+
+UINT32 PMX_SetDigitalOutRgb(UCHAR ucPmxId, UCHAR ucRgb)
+{
+    if (ucPmxId != 0)
+        return 0;
+
+    // Stored and programmed before it is looked at: only HDMI has no code for a value above the last.
+    prPmxConf()->ucDigitalRgb = ucRgb;
+    PMX_HalSetDigitalOutRgb(0, ucRgb);
+    if (ucRgb >= sizeof HDMI_COLOR_MODES)
+        return 0;
+
+    UINT8 ucColorMode = HDMI_COLOR_MODES[ucRgb];
+    fgPmxDrvSetAvd(PMX_CHG_HDMI_COLOR_SPACE, &ucColorMode, 1);
+    return 1;
+}
+
+UINT32 PMX_GetDigitalOutRgb(UCHAR ucPmxId, UCHAR* pucRgb)
+{
+    if (ucPmxId != 0 || pucRgb == nullptr)
+        return 0;
+
+    *pucRgb = prPmxConf()->ucDigitalRgb;
+    return 1;
+}

@@ -1,0 +1,67 @@
+/* The display part's handshake: graphics stay out of the picture while the sink switches format. The flags are single
+ * bytes, written without a lock in the callers' threads and in the timer's context. */
+#include "drv_pmx.h"
+#include "drv_vdp.h"
+#include "pmx_hal.h"
+#include "pmx_if.h"
+#include "u_os.h"
+
+UINT32 PMX_SetFormatChangeFlag(BOOL bIsFormatChange)
+{
+    PMX_IsLog(0, "Display Format Change :%d.\n", bIsFormatChange);
+    _arPmxDispPartStatus.fgPmxFormatChangeFlag = bIsFormatChange;
+    if (bIsFormatChange == FALSE)
+    {
+        PMX_SetOsdEnableFlag(TRUE);
+        if (fgVdpIsWaitforSyncCtrl() == FALSE) // else the OSD planes wait for PMX_SetOsdEnable
+            PMX_SetOsdEnable();
+    }
+    return 1;
+}
+
+UINT32 PMX_SetOsdEnableFlag(BOOL bIsOsdEnable)
+{
+    PMX_IsLog(0, "Set Osd Enable :%d.\n", bIsOsdEnable);
+    _arPmxDispPartStatus.fgPmxEnabeOsdFlag = bIsOsdEnable;
+    return 1;
+}
+
+UINT32 PMX_SetOsdEnable(void)
+{
+    PMX_IsLog(0, "PMX_SetOsdEnable.\n");
+    if (_arPmxDispPartStatus.fgPmxEnabeOsdFlag != 0)
+    {
+        for (UCHAR ucPlane = DRV_PMX_PLANE_3; ucPlane <= DRV_PMX_PLANE_7; ucPlane++)
+            vPmxMixPlane(0, ucPlane);
+        PMX_SetOsdEnableFlag(FALSE);
+    }
+    return 1;
+}
+
+/* The timer is never stopped by an answer of the display part: it runs out later and mixes the OSD planes once more. */
+void _PMX_TmrIsr(HANDLE_T, void*)
+{
+    PMX_IsLog(0, "PMX timeout.\n");
+    _arPmxDispPartStatus.fgTimerAlreadySet = FALSE;
+    PMX_SetFormatChangeFlag(FALSE);
+}
+
+UINT32 PMX_SetFormatChangeTimer(UINT32 u4TimeInterval)
+{
+    HANDLE_T hTimer = _arPmxDispPartStatus.hPMXTimer;
+
+    PMX_IsLog(0, "Display Format Change Timer Set.\n");
+    if (x_timer_stop(hTimer) != OSR_OK)
+        Assert("x_timer_stop(_arPmxDispPartStatus.hPMXTimer) == OSR_OK", __FILE__, __LINE__);
+    if (x_timer_start(hTimer, u4TimeInterval, X_TIMER_FLAG_ONCE, _PMX_TmrIsr, nullptr) != OSR_OK)
+        Assert("x_timer_start(_arPmxDispPartStatus.hPMXTimer, u4TimeInterval, X_TIMER_FLAG_ONCE, _PMX_TmrIsr, NULL)"
+               "==OSR_OK",
+               __FILE__, __LINE__);
+    return 1;
+}
+
+BOOL fgPMX_DisplayModeReady(void)
+{
+    PMX_IsLog(9, "[PMX] fgPMX_DisplayModeReady is %d.\n", _arPmxDispPartStatus.fgPmxFormatChangeFlag);
+    return _arPmxDispPartStatus.fgPmxFormatChangeFlag == 0;
+}

@@ -42,6 +42,7 @@ constexpr Use uses[] = {
     { "", "u4ValidAutoRes", Family::ResolutionMode },
     { "", "ucChkRes", Family::ResolutionMode },
     { "", "ucSupportedAutoRes", Family::ResolutionMode },
+    { "", "ucOutputMode", Family::ResolutionMode },
 
     { "", "eDgoMode", Family::CcirMode },
     { "", "eDgiMode", Family::CcirMode },
@@ -53,6 +54,7 @@ constexpr Use uses[] = {
     { "", "eSrcColorSpace", Family::ColorSpace },
     { "", "eMasterColorSpace", Family::ColorSpace },
     { "", "eColorSpace", Family::ColorSpace },
+    { "", "eMixerOutCS", Family::ColorSpace },
 
     { "", "ucPlane", Family::Plane },
     { "", "rDrvExtScl", Family::ExtChipUsage },
@@ -68,6 +70,8 @@ constexpr Use uses[] = {
     { "", "u4AspNext", Family::Aspect },
     { "", "u4DigestAsp", Family::Aspect },
     { "", "ucDigitalRgb", Family::DigitalFormat },
+    { "", "ucRgb", Family::DigitalFormat },
+    { "", "pucRgb", Family::DigitalFormat },
     { "", "eSetType", Family::ExtChipSetting },
     { "", "eClosedCaptionOnOff", Family::ClosedCaption },
 };

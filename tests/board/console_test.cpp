@@ -88,7 +88,7 @@ TEST_F(Console, Assert_IsReportedCountedAndReturns)
 
 TEST_F(Console, NullTexts_ArePrintedInBrackets)
 {
-    const CHAR* null = nullptr;
+    const CHAR* volatile null = nullptr; // or the compiler knows better
     Printf("[%s] [%8s] [%-8s]\n", null, null, null);
     EXPECT_EQ("[(null)] [  (null)] [(null)  ]\n", board::console_text());
     const CHAR* volatile format = nullptr;

@@ -301,6 +301,8 @@ TEST(Names, FamilyOf_FunctionsAndRecords)
     EXPECT_EQ(Family::ColorSpace, family_of("PMX_PORT_INFO_T", "eSrcColorSpace"));
     EXPECT_EQ(Family::GfxColorMode, family_of("i4PmxOsdEnabled", "eSrcColorSpace"));
     EXPECT_EQ(Family::ColorSpace, family_of("OSDSetColorSpace", "ucColorSpace"));
+    EXPECT_EQ(Family::ResolutionMode, family_of("PMX_ColorSpaceSetup", "ucOutputMode"));
+    EXPECT_EQ(Family::DigitalFormat, family_of("PMX_SetDigitalOutRgb", "ucRgb"));
     EXPECT_EQ(Family::TveAspect, family_of("TVE_SetAspectRatio", "eAspect"));
     EXPECT_EQ(Family::Plane, family_of("vPmxMixPlane", "ucPlane"));
     EXPECT_EQ(Family::AvdCommand, family_of("fgPmxDrvSetAvd", "u4Command"));

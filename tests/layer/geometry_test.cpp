@@ -1,0 +1,218 @@
+/** What the current mode is reported as: progressive, HD; that nothing is remembered from an earlier mode. */
+#include "tests/layer/mode_facts.h"
+#include "tests/support/layer_fixture.h"
+
+using ProgressiveOut = LayerTest;
+using HdOutput = LayerTest;
+
+namespace
+{
+
+using mode_facts::Modes;
+using mode_facts::modes;
+
+const Modes& progressive()
+{
+    static const Modes set = modes({
+        RES_480P,        RES_576P,         RES_480P_1440,    RES_576P_1440,    RES_480P_2880,          RES_576P_2880,
+        RES_720P60HZ,    RES_720P50HZ,     RES_1080P60HZ,    RES_1080P50HZ,    RES_1080P30HZ,          RES_1080P25HZ,
+        RES_1080P24HZ,   RES_3D_1080P23HZ, RES_3D_1080P24HZ, RES_3D_720P60HZ,  RES_3D_720P50HZ,        RES_3D_720P30HZ,
+        RES_3D_720P25HZ, RES_3D_576P50HZ,  RES_3D_480P60HZ,  RES_2D_640x480HZ, RES_PANEL_AUO_B089AW01,
+    });
+    return set;
+}
+
+/** Modes that are no HD output; every other number is one. */
+const Modes& sd_output()
+{
+    static const Modes set = modes({
+        RES_480I,
+        RES_576I,
+        RES_480P,
+        RES_576P,
+        RES_480P_1440,
+        RES_576P_1440,
+        RES_480P_2880,
+        RES_576P_2880,
+        RES_480I_2880,
+        RES_576I_2880,
+        RES_3D_576P50HZ,
+        RES_3D_480P60HZ,
+        RES_3D_576I25HZ,
+        RES_3D_480I30HZ,
+        RES_3D_576I50HZ,
+        RES_3D_480I60HZ,
+        RES_2D_480I60HZ,
+        RES_2D_640x480HZ,
+    });
+    return set;
+}
+
+} // namespace
+
+TEST_F(ProgressiveOut, ProgressiveOut_EveryModeNumber)
+{
+    started();
+    unsigned number = 0;
+    for (unsigned mode = 0; mode < 256; ++mode)
+    {
+        set_record("ucMode", mode);
+        EXPECT_EQ(progressive().contains(mode) ? 1 : 0, PMX_ProgressiveOut(0)) << mode;
+        number += PMX_ProgressiveOut(0);
+    }
+    EXPECT_EQ(23u, number);
+    EXPECT_NO_TRACE();
+}
+
+TEST_F(ProgressiveOut, ProgressiveOut_480IAnd576IAndEveryModeAboveThePanel_Zero)
+{
+    started();
+    set_record("ucMode", RES_480I);
+    EXPECT_EQ(0, PMX_ProgressiveOut(0));
+    set_record("ucMode", RES_576I);
+    EXPECT_EQ(0, PMX_ProgressiveOut(0));
+    set_record("ucMode", RES_PANEL_AUO_B089AW01);
+    EXPECT_EQ(1, PMX_ProgressiveOut(0));
+    for (unsigned mode = RES_PANEL_AUO_B089AW01 + 1; mode < 256; ++mode)
+    {
+        set_record("ucMode", mode);
+        EXPECT_EQ(0, PMX_ProgressiveOut(0)) << mode;
+    }
+}
+
+TEST_F(ProgressiveOut, ProgressiveOut_23_976And29_97Hertz_AreNotThough24Is)
+{
+    started();
+    for (const auto& [mode, expected] :
+         { std::pair{ RES_1080P23_976HZ, 0 }, { RES_1080P29_97HZ, 0 }, { RES_1080P24HZ, 1 }, { RES_1080P30HZ, 1 } })
+    {
+        set_record("ucMode", mode);
+        EXPECT_EQ(expected, PMX_ProgressiveOut(0)) << mode;
+    }
+}
+
+TEST_F(ProgressiveOut, ProgressiveOut_TopAndBottomModes_AreNotThoughTheirFramePackedTwinsAre)
+{
+    started();
+    for (const auto& [mode, expected] : { std::pair{ RES_3D_720P60HZ_TB, 0 },
+                                          { RES_3D_720P50HZ_TB, 0 },
+                                          { RES_3D_1080P23HZ_TB, 0 },
+                                          { RES_3D_1080P24HZ_TB, 0 },
+                                          { RES_3D_720P60HZ, 1 },
+                                          { RES_3D_720P50HZ, 1 },
+                                          { RES_3D_1080P23HZ, 1 },
+                                          { RES_3D_1080P24HZ, 1 } })
+    {
+        set_record("ucMode", mode);
+        EXPECT_EQ(expected, PMX_ProgressiveOut(0)) << mode;
+    }
+}
+
+TEST_F(ProgressiveOut, ProgressiveOut_OtherMixerId_Zero)
+{
+    started();
+    set_record("ucMode", RES_1080P60HZ);
+    EXPECT_EQ(1, PMX_ProgressiveOut(0));
+    const RecordSnapshot before;
+    for (unsigned id = 1; id < 256; ++id)
+        EXPECT_EQ(0, PMX_ProgressiveOut(static_cast<UCHAR>(id))) << id;
+    EXPECT_NO_TRACE();
+    EXPECT_RECORD_UNCHANGED(before);
+}
+
+TEST_F(HdOutput, FmtHDOutput_EveryModeNumber)
+{
+    started();
+    unsigned number = 0;
+    for (unsigned mode = 0; mode < 256; ++mode)
+    {
+        set_record("ucMode", mode);
+        EXPECT_EQ(sd_output().contains(mode) ? 0 : 1, fgPmxFmtHDOutput(0)) << mode;
+        number += fgPmxFmtHDOutput(0);
+    }
+    EXPECT_EQ(256u - 18, number);
+    EXPECT_NO_TRACE();
+}
+
+TEST_F(HdOutput, FmtHDOutput_MoreThanTheTvEncodersHdFormats)
+{
+    started();
+    unsigned more = 0;
+    for (unsigned mode = 0; mode < 256; ++mode)
+    {
+        set_record("ucMode", mode);
+        const bool is_more = mode == RES_1080P29_97HZ || mode == RES_2D_576I50HZ || mode > RES_3D_1080P24HZ_TB;
+        EXPECT_EQ(is_more || mode_facts::tve_hd().contains(mode) ? 1 : 0, fgPmxFmtHDOutput(0)) << mode;
+        more += is_more ? 1 : 0;
+    }
+    EXPECT_EQ(2u + 256 - 47, more);
+}
+
+TEST_F(HdOutput, FmtHDOutput_2D576I_IsHdAndOf1920x1080)
+{
+    started();
+    set_record("ucMode", RES_2D_576I50HZ);
+    UINT32 width = 0;
+    UINT32 height = 0;
+    EXPECT_EQ(1u, PMX_GetOutSize(0, &width, &height));
+    EXPECT_EQ(1920u, width);
+    EXPECT_EQ(1080u, height);
+    EXPECT_EQ(TRUE, fgPmxFmtHDOutput(0));
+    EXPECT_EQ(0, PMX_ProgressiveOut(0));
+}
+
+TEST_F(HdOutput, FmtHDOutput_MixerIdIsNotChecked)
+{
+    started();
+    const RecordSnapshot before;
+    for (unsigned id = 0; id < 256; ++id)
+    {
+        set_record("ucMode", RES_720P60HZ);
+        EXPECT_EQ(TRUE, fgPmxFmtHDOutput(static_cast<UCHAR>(id))) << id;
+        set_record("ucMode", RES_480P);
+        EXPECT_EQ(FALSE, fgPmxFmtHDOutput(static_cast<UCHAR>(id))) << id;
+    }
+    set_record("ucMode", RES_1080P60HZ);
+    EXPECT_NO_TRACE();
+    EXPECT_RECORD_UNCHANGED(before);
+}
+
+TEST_F(HdOutput, Geometry_FollowsTheModeThatWasSetLast)
+{
+    started();
+    struct Expected
+    {
+        unsigned mode;
+        UINT32 width;
+        UINT32 height;
+        int progressive;
+        int hd;
+    };
+    for (const Expected& expected :
+         { Expected{ RES_720P50HZ, 1280, 720, 1, 1 }, Expected{ RES_576I, 720, 576, 0, 0 },
+           Expected{ RES_2D_640x480HZ, 640, 480, 1, 0 }, Expected{ RES_PANEL_AUO_B089AW01, 1024, 600, 1, 1 },
+           Expected{ RES_1080I50HZ, 1920, 1080, 0, 1 } })
+    {
+        EXPECT_EQ(1u, PMX_SetMode(0, static_cast<UCHAR>(expected.mode), 50, 0));
+        EXPECT_EQ(0u, PMX_SetMode(0, RES_2160P, 50, 0)); // refused: changes nothing
+        UINT32 width = 0;
+        UINT32 height = 0;
+        EXPECT_EQ(1u, PMX_GetOutSize(0, &width, &height));
+        EXPECT_EQ(expected.width, width) << expected.mode;
+        EXPECT_EQ(expected.height, height) << expected.mode;
+        EXPECT_EQ(expected.progressive, PMX_ProgressiveOut(0)) << expected.mode;
+        EXPECT_EQ(expected.hd, fgPmxFmtHDOutput(0)) << expected.mode;
+    }
+}
+
+TEST_F(HdOutput, Geometry_BeforeTheFirstReset_TheModeIs480I)
+{
+    UINT32 width = 0;
+    UINT32 height = 0;
+    EXPECT_EQ(1u, PMX_GetOutSize(0, &width, &height));
+    EXPECT_EQ(720u, width);
+    EXPECT_EQ(480u, height);
+    EXPECT_EQ(0, PMX_ProgressiveOut(0));
+    EXPECT_EQ(FALSE, fgPmxFmtHDOutput(0));
+    EXPECT_NO_TRACE();
+}

@@ -1,0 +1,241 @@
+/** The handshake with the display part in every state that it can reach: the layer is brought there on the board, and
+ *  every event is tried from each. */
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <set>
+#include <string>
+#include <vector>
+
+#include "board/board.h"
+#include "tests/support/handshake_explorer.h"
+
+using handshake::Bench;
+using handshake::Event;
+using handshake::Graph;
+using handshake::State;
+using handshake::Transition;
+
+namespace
+{
+
+Graph explore_with(std::vector<Event> others)
+{
+    std::vector<Event> events = handshake::ordinary_events();
+    events.insert(events.end(), others.begin(), others.end());
+    return handshake::explore(events);
+}
+
+struct NamedState
+{
+    std::string name;
+    bool flag;
+    bool owed;
+    bool mixed;
+    std::set<bool> timer; ///< T, and whether the timer runs
+};
+
+/** Each of them both while the video plane driver waits for its sync control and while it does not. */
+const std::vector<NamedState> reachable{
+    { "Ready", false, false, true, { false, true } },
+    { "Display part switching", true, false, true, { false, true } },
+    { "Held back", true, false, false, { true } },
+    { "Released, video plane waiting", false, true, false, { false, true } },
+    // A release that had nothing to release, kept from it by a waiting video plane driver; and the display part
+    // switching again before a release came to its end.
+    { "Ready, return owed", false, true, true, { false, true } },
+    { "Display part switching, return owed", true, true, true, { false, true } },
+    { "Held back, return owed", true, true, false, { false, true } },
+};
+
+/** What the handshake is meant to do, on the state alone. */
+void mix(State& state)
+{
+    state.mixed = handshake::osd_planes;
+    state.owed = false;
+}
+
+void lower(State& state)
+{
+    state.flag = false;
+    state.owed = true;
+    if (!state.waiting)
+        mix(state);
+}
+
+void set_mode(State& state, bool hdmi_changed, bool sink)
+{
+    const bool everything = !state.mode_set; // the first mode after a reset
+    state.mode_set = true;
+    if (!((hdmi_changed || everything || state.timer_set) && sink))
+        lower(state);
+    if (!state.flag)
+        return;
+    state.mixed = 0;
+    state.timer_set = true;
+    state.armed = state.armed || state.has_timer;
+}
+
+State meant(State state, Event event)
+{
+    switch (event)
+    {
+    case Event::FlagRaised: state.flag = true; break;
+    case Event::FlagLowered:
+    case Event::ModeRefused: lower(state); break;
+    case Event::ModeHdmiChanged: set_mode(state, true, true); break;
+    case Event::ModeHdmiUnchanged: set_mode(state, false, true); break;
+    case Event::ModeNoSink: set_mode(state, true, false); break;
+    case Event::ModeFlagClear:
+        lower(state);
+        set_mode(state, true, true);
+        break;
+    case Event::TimerRunsOut:
+        state.armed = false;
+        state.timer_set = false;
+        lower(state);
+        break;
+    case Event::WaitForSync: state.waiting = true; break;
+    case Event::SyncThere: state.waiting = false; break;
+    case Event::SetOsdEnable:
+        if (state.owed)
+            mix(state);
+        break;
+    case Event::Reset: state.flag = state.owed = state.timer_set = state.has_timer = state.mode_set = false; break;
+    case Event::OsdEnableFlagSet:
+    case Event::OsdEnableFlagCleared: state.owed = event == Event::OsdEnableFlagSet; break;
+    }
+    return state;
+}
+
+void expect_as_meant(const Graph& graph)
+{
+    for (const Transition& transition : graph.transitions)
+        EXPECT_EQ(full_name(meant(transition.from, transition.event)), full_name(transition.to))
+            << name(transition.event) << " in " << full_name(transition.from);
+}
+
+} // namespace
+
+TEST(HandshakeStates, OrdinaryEvents_ReachTheseAndNoOthers)
+{
+    std::set<State> expected;
+    for (const NamedState& named : reachable)
+    {
+        for (const bool timer : named.timer)
+        {
+            for (const bool waiting : { false, true })
+            {
+                const std::uint8_t planes = named.mixed ? handshake::osd_planes : std::uint8_t{ 0 };
+                const State state{ named.flag, named.owed, timer, timer, waiting, planes };
+                EXPECT_EQ(named.name, name(state));
+                expected.insert(state);
+            }
+        }
+    }
+    const Graph graph = handshake::explore(handshake::ordinary_events());
+    EXPECT_EQ(expected, std::set<State>(graph.states.begin(), graph.states.end()));
+    EXPECT_EQ(0u, board::asserts());
+    EXPECT_EQ(0u, board::misuses());
+}
+
+TEST(HandshakeStates, OrdinaryEvents_KeepTheRules)
+{
+    const Graph graph = handshake::explore(handshake::ordinary_events());
+    for (const State& state : graph.states)
+        EXPECT_EQ("", broken_rules(state)) << full_name(state);
+    for (const Transition& transition : graph.transitions)
+        EXPECT_EQ("", broken_rules(transition)) << name(transition.event) << " in " << full_name(transition.from);
+}
+
+TEST(HandshakeStates, OrdinaryEvents_LeadWhereTheyAreMeantTo)
+{
+    const Graph graph = handshake::explore(handshake::ordinary_events());
+    // Ten events everywhere, and the timer where it runs: in 14 of the 26 states.
+    EXPECT_EQ(10u * 26 + 14, graph.transitions.size());
+    expect_as_meant(graph);
+}
+
+TEST(HandshakeStates, OrdinaryEvents_FromStatesReachedByEventsAlone_LeadToTheSame)
+{
+    const Graph graph = handshake::explore(handshake::ordinary_events());
+    Bench bench;
+    for (const Transition& transition : graph.transitions)
+    {
+        bench.restart();
+        bench.run(graph.paths.at(transition.from));
+        ASSERT_EQ(full_name(transition.from), full_name(bench.state()));
+        bench.run(transition.event);
+        EXPECT_EQ(full_name(transition.to), full_name(bench.state()))
+            << name(transition.event) << " in " << full_name(transition.from);
+    }
+}
+
+TEST(HandshakeStates, EveryState_WithoutTheDisplayPart_GraphicsComeBack)
+{
+    const Graph graph = handshake::explore(handshake::ordinary_events());
+    Bench bench;
+    for (const State& state : graph.states)
+    {
+        bench.put(state);
+        bench.run(Event::TimerRunsOut);
+        bench.run(Event::SyncThere);
+        bench.run(Event::SetOsdEnable);
+        EXPECT_EQ(handshake::osd_planes, bench.state().mixed) << full_name(state);
+    }
+}
+
+// What follows is how it is, not how it should be: callers know it, and nobody repairs it.
+
+TEST(HandshakeStates, SetOsdEnableFlag_Set_BreaksNoRule)
+{
+    const Graph graph = explore_with({ Event::OsdEnableFlagSet });
+    EXPECT_EQ(26u, graph.states.size());
+    expect_as_meant(graph);
+    for (const char rule : std::string("abcd"))
+        EXPECT_EQ("", witness(graph, rule)) << rule;
+}
+
+TEST(HandshakeStates, SetOsdEnableFlag_Cleared_LeavesPlanesOutThatNobodyOwesAnything)
+{
+    const Graph graph = explore_with({ Event::OsdEnableFlagCleared });
+    expect_as_meant(graph);
+    const std::string released_then_cleared = "flag raised > mode: HDMI changed > video plane waits for sync > "
+                                              "flag lowered > PMX_SetOsdEnableFlag(FALSE)";
+    EXPECT_EQ(released_then_cleared, witness(graph, 'a'));
+    EXPECT_EQ(released_then_cleared, witness(graph, 'b'));
+    EXPECT_EQ("", witness(graph, 'c'));
+    EXPECT_EQ("", witness(graph, 'd'));
+}
+
+TEST(HandshakeStates, Reset_BreaksEveryRule)
+{
+    const Graph graph = explore_with({ Event::Reset });
+    expect_as_meant(graph);
+    EXPECT_EQ("flag raised > mode: HDMI changed > PMX_Reset", witness(graph, 'a'));
+    EXPECT_EQ("flag raised > mode: HDMI changed > PMX_Reset", witness(graph, 'b'));
+    EXPECT_EQ("flag raised > mode: HDMI changed > PMX_Reset", witness(graph, 'c'));
+    EXPECT_EQ("PMX_Reset", witness(graph, 'd')) << "it takes the second video plane out of the mix";
+}
+
+TEST(HandshakeStates, Reset_WhileHeldBack_OnlyTheForgottenTimerBringsGraphicsBackByItself)
+{
+    Bench bench;
+    bench.run({ { Event::FlagRaised, Event::ModeHdmiChanged, Event::Reset } });
+    EXPECT_EQ("Forgotten, timer armed, no timer, no mode set", full_name(bench.state()));
+    bench.run(Event::SetOsdEnable);
+    EXPECT_EQ("Forgotten, timer armed, no timer, no mode set", full_name(bench.state()));
+    bench.run(Event::TimerRunsOut);
+    EXPECT_EQ("Ready, no timer, no mode set", full_name(bench.state()));
+}
+
+TEST(HandshakeStates, Reset_ThenHeldBack_NoTimerEndsTheWait)
+{
+    Bench bench;
+    bench.run({ { Event::Reset, Event::FlagRaised, Event::ModeHdmiChanged } });
+    EXPECT_EQ(2u, board::asserts()) << "the timer can be neither stopped nor started";
+    board::advance(std::chrono::hours(1));
+    EXPECT_EQ("Held back, T, timer not armed, no timer", full_name(bench.state()));
+    bench.run(Event::FlagLowered);
+    EXPECT_EQ("Ready, T, timer not armed, no timer", full_name(bench.state()));
+}

@@ -1,0 +1,311 @@
+#include "tests/support/handshake_explorer.h"
+
+#include <algorithm>
+#include <chrono>
+#include <stdexcept>
+
+#include "board/board.h"
+#include "board/devices.h"
+#include "board/executable_symbols.h"
+#include "board/hdmi_av.h"
+#include "board/video_planes.h"
+#include "drv_av_d.h"
+#include "pmx_hal.h"
+#include "tools/record_view/record_view.h"
+
+namespace handshake
+{
+namespace
+{
+
+constexpr std::chrono::seconds timer_interval{ 10 };
+constexpr UINT32 timer_interval_ms = 10000;
+
+bool timer_running()
+{
+    const board::Value timers = board::timers::state();
+    return std::any_of(timers.items().begin(), timers.items().end(),
+                       [](const board::Value& timer) { return timer.find("running")->as_number() != 0; });
+}
+
+bool touches_other_planes(const board::TraceEntry& entry)
+{
+    if (entry.function != "vPmxMixPlane" && entry.function != "vPmxNotMixPlane")
+        return false;
+    const std::int64_t plane = entry.arguments.at(1).value.as_number();
+    return plane < DRV_PMX_PLANE_3 || plane > DRV_PMX_PLANE_7;
+}
+
+/** The layer's record, as raw as a debugger sees it. */
+std::span<std::byte> find_record()
+{
+    const auto symbol = board::executable_symbols::find("_arPmxConf");
+    if (!symbol)
+        throw std::runtime_error("_arPmxConf is not in the symbol table");
+    return { static_cast<std::byte*>(symbol->address), symbol->size };
+}
+
+/** The display part answers as soon as it is told of the new resolution. */
+void answer_at_once(const board::TraceEntry& entry)
+{
+    if (entry.function == "fgPmxDrvSetAvd" && entry.arguments.at(0).value.as_number() == PMX_SET_HDMI_RES_CHG)
+        PMX_SetFormatChangeFlag(FALSE);
+}
+
+} // namespace
+
+std::string name(const State& state)
+{
+    if (state.mixed != 0 && state.mixed != osd_planes)
+        return "Partly mixed";
+    if (state.mixed == 0)
+    {
+        if (state.flag)
+            return state.owed ? "Held back, return owed" : "Held back";
+        return state.owed ? "Released, video plane waiting" : "Forgotten";
+    }
+    if (state.flag)
+        return state.owed ? "Display part switching, return owed" : "Display part switching";
+    return state.owed ? "Ready, return owed" : "Ready";
+}
+
+std::string full_name(const State& state)
+{
+    std::string text = name(state);
+    if (state.timer_set)
+        text += ", T";
+    if (state.armed != state.timer_set)
+        text += state.armed ? ", timer armed" : ", timer not armed";
+    if (state.waiting)
+        text += ", waiting";
+    if (!state.has_timer)
+        text += ", no timer";
+    if (!state.mode_set)
+        text += ", no mode set";
+    return text;
+}
+
+std::string name(Event event)
+{
+    static const std::map<Event, std::string> names{
+        { Event::FlagRaised, "flag raised" },
+        { Event::FlagLowered, "flag lowered" },
+        { Event::ModeHdmiChanged, "mode: HDMI changed" },
+        { Event::ModeHdmiUnchanged, "mode: HDMI unchanged" },
+        { Event::ModeNoSink, "mode: no sink" },
+        { Event::ModeFlagClear, "mode: answered within the call" },
+        { Event::ModeRefused, "mode: refused" },
+        { Event::TimerRunsOut, "timer runs out" },
+        { Event::WaitForSync, "video plane waits for sync" },
+        { Event::SyncThere, "video plane has its sync" },
+        { Event::SetOsdEnable, "PMX_SetOsdEnable" },
+        { Event::Reset, "PMX_Reset" },
+        { Event::OsdEnableFlagSet, "PMX_SetOsdEnableFlag(TRUE)" },
+        { Event::OsdEnableFlagCleared, "PMX_SetOsdEnableFlag(FALSE)" },
+    };
+    return names.at(event);
+}
+
+std::vector<Event> ordinary_events()
+{
+    std::vector<Event> events;
+    for (int event = 0; event <= static_cast<int>(Event::SetOsdEnable); ++event)
+        events.push_back(static_cast<Event>(event));
+    return events;
+}
+
+Bench::Outputs Bench::first_outputs()
+{
+    Outputs outputs{};
+    outputs[PMX_OUTPUT_HDMI] = { TRUE, RES_480P, 60, {} };
+    outputs[PMX_OUTPUT_CAV] = { TRUE, RES_480P, 60, {} };
+    outputs[PMX_OUTPUT_CVBS] = { TRUE, RES_480I, 60, {} };
+    return outputs;
+}
+
+Bench::Bench() : m_outputs(first_outputs()), m_record(find_record())
+{
+    board::power_on({});
+    PMX_Init();
+    PMX_SetModeEx(0, m_outputs.data(), 60, DRV_NON_EXT_CHIP, 0);
+    PMX_SetOsdEnable();
+    m_timer = _arPmxDispPartStatus.hPMXTimer;
+    m_first_record.assign(m_record.begin(), m_record.end());
+    board::trace::clear();
+}
+
+Bench::~Bench()
+{
+    board::trace::set_after_call({});
+}
+
+State Bench::state() const
+{
+    const PMX_DISPLAY_PART_STATUS_T& status = _arPmxDispPartStatus;
+    State state;
+    state.flag = status.fgPmxFormatChangeFlag != 0;
+    state.owed = status.fgPmxEnabeOsdFlag != 0;
+    state.timer_set = status.fgTimerAlreadySet != 0;
+    state.armed = timer_running();
+    state.waiting = fgVdpIsWaitforSyncCtrl() != 0;
+    state.mixed = 0;
+    for (UCHAR plane = DRV_PMX_PLANE_3; plane <= DRV_PMX_PLANE_7; ++plane)
+        state.mixed |= static_cast<std::uint8_t>(fgPmxHalMixPlane(0, plane) != 0 ? 1u << plane : 0u);
+    state.has_timer = status.hPMXTimer == m_timer;
+    state.mode_set = record_view::get("fgSetModeCalled").as_number() != 0;
+    return state;
+}
+
+bool Bench::possible(Event event) const
+{
+    return event != Event::TimerRunsOut || timer_running();
+}
+
+bool Bench::run(Event event)
+{
+    board::trace::clear();
+    switch (event)
+    {
+    case Event::FlagRaised:
+    case Event::FlagLowered: PMX_SetFormatChangeFlag(event == Event::FlagRaised ? TRUE : FALSE); break;
+    case Event::ModeHdmiChanged:
+    case Event::ModeHdmiUnchanged:
+    case Event::ModeNoSink:
+    case Event::ModeFlagClear:
+    case Event::ModeRefused: set_mode(event); break;
+    case Event::TimerRunsOut: board::advance(timer_interval); break;
+    case Event::WaitForSync:
+    case Event::SyncThere: board::video_planes::set_waiting_for_sync(event == Event::WaitForSync); break;
+    case Event::SetOsdEnable: PMX_SetOsdEnable(); break;
+    case Event::Reset: PMX_Reset(0); break;
+    case Event::OsdEnableFlagSet:
+    case Event::OsdEnableFlagCleared: PMX_SetOsdEnableFlag(event == Event::OsdEnableFlagSet ? TRUE : FALSE); break;
+    }
+    const auto& entries = board::trace::entries();
+    return std::any_of(entries.begin(), entries.end(), touches_other_planes);
+}
+
+void Bench::run(std::span<const Event> events)
+{
+    for (const Event event : events)
+        run(event);
+}
+
+void Bench::set_mode(Event event)
+{
+    Outputs outputs = m_outputs;
+    PMX_RESOLUTION_MODE_T& hdmi = outputs[PMX_OUTPUT_HDMI].eResMode;
+    if (event == Event::ModeRefused)
+        hdmi = RES_2160P;
+    else if (event != Event::ModeHdmiUnchanged)
+        hdmi = hdmi == RES_480P ? RES_576P : RES_480P;
+    if (event != Event::ModeRefused)
+        m_outputs = outputs;
+    board::hdmi_av::plug(event != Event::ModeNoSink);
+    if (event == Event::ModeFlagClear)
+        board::trace::set_after_call(answer_at_once);
+    PMX_SetModeEx(0, outputs.data(), 60, DRV_NON_EXT_CHIP, 0);
+    board::trace::set_after_call({});
+    board::hdmi_av::plug(true);
+}
+
+void Bench::restart()
+{
+    _arPmxDispPartStatus = { m_timer, FALSE, FALSE, FALSE };
+    board::video_planes::set_waiting_for_sync(false);
+    if (timer_running())
+        board::advance(timer_interval);
+    for (UCHAR plane = DRV_PMX_PLANE_3; plane <= DRV_PMX_PLANE_7; ++plane)
+        vPmxMixPlane(0, plane);
+    std::copy(m_first_record.begin(), m_first_record.end(), m_record.begin());
+    m_outputs = first_outputs();
+    board::trace::clear();
+}
+
+void Bench::put(const State& state)
+{
+    restart();
+    if (state.armed)
+        PMX_SetFormatChangeTimer(timer_interval_ms);
+    for (UCHAR plane = DRV_PMX_PLANE_3; plane <= DRV_PMX_PLANE_7; ++plane)
+    {
+        if ((state.mixed & 1u << plane) == 0)
+            vPmxNotMixPlane(0, plane);
+    }
+    board::video_planes::set_waiting_for_sync(state.waiting);
+    _arPmxDispPartStatus.fgPmxFormatChangeFlag = state.flag ? TRUE : FALSE;
+    _arPmxDispPartStatus.fgPmxEnabeOsdFlag = state.owed ? TRUE : FALSE;
+    _arPmxDispPartStatus.fgTimerAlreadySet = state.timer_set ? TRUE : FALSE;
+    if (!state.has_timer)
+        _arPmxDispPartStatus.hPMXTimer = 0;
+    if (!state.mode_set)
+        record_view::set("fgSetModeCalled", 0);
+    board::trace::clear();
+    if (this->state() != state)
+        throw std::logic_error(full_name(state) + " cannot be made");
+}
+
+Graph explore(std::span<const Event> events)
+{
+    Bench bench;
+    Graph graph;
+    graph.states.push_back(bench.state());
+    graph.paths[graph.states.front()] = {};
+    for (std::size_t at = 0; at < graph.states.size(); ++at)
+    {
+        const State from = graph.states[at];
+        State now = from;
+        bench.put(from);
+        for (const Event event : events)
+        {
+            if (now != from)
+                bench.put(from);
+            if (!bench.possible(event))
+                continue;
+            const bool other_planes = bench.run(event);
+            const State to = now = bench.state();
+            graph.transitions.push_back({ from, event, to, other_planes });
+            if (graph.paths.contains(to))
+                continue;
+            std::vector<Event> path = graph.paths.at(from);
+            path.push_back(event);
+            graph.paths[to] = std::move(path);
+            graph.states.push_back(to);
+        }
+    }
+    return graph;
+}
+
+std::string broken_rules(const State& state)
+{
+    const bool out = state.mixed != osd_planes;
+    std::string broken;
+    if (out && !state.flag && !state.owed)
+        broken += 'a';
+    if (out && !state.owed && !(state.flag && state.timer_set && state.armed))
+        broken += 'b';
+    if (state.timer_set != state.armed)
+        broken += 'c';
+    return broken;
+}
+
+std::string broken_rules(const Transition& transition)
+{
+    return broken_rules(transition.to) + (transition.other_planes ? "d" : "");
+}
+
+std::string witness(const Graph& graph, char rule)
+{
+    for (const Transition& transition : graph.transitions)
+    {
+        if (broken_rules(transition).find(rule) == std::string::npos)
+            continue;
+        std::string text;
+        for (const Event event : graph.paths.at(transition.from))
+            text += name(event) + " > ";
+        return text + name(transition.event);
+    }
+    return {};
+}
+
+} // namespace handshake

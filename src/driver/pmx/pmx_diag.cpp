@@ -1,5 +1,5 @@
-/* Formatted print and status report. Field engineers' tools read the report line by line: labels, blanks and omissions
- * are kept as they are, the misleading ones too. */
+/* Formatted print and status report. Field engineers know the report line by line: labels, blanks and omissions are
+ * kept as they are, the misleading ones too. */
 #include "drv_pmx.h"
 #include "pmx_if.h"
 #include "u_os.h"
@@ -103,7 +103,7 @@ static void vReportCcirLine(CCIR_LINE_T eLine, INT32 i, const CHAR* szName)
 static void vReportRecord(const PMX_CONF_T* prConf)
 {
     PMX_IsLog(0, "Mode(%d) CS(%d)\n", prConf->ucMode, (INT32)prConf->eMasterColorSpace);
-    // E shows the bus width: it has done so for as long as there have been logs to compare with.
+    // E shows the bus width, not the master enable, which the report leaves out.
     PMX_IsLog(0,
               "[PMX] PMX(%d) E(%d ), Mode(%d) TVTP(%d ), FQ(%d ), DitalOut(%d ), u4Phase(%d ), PMode(%d ), "
               "DBit(%d ),\n",

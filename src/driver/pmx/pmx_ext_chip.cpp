@@ -16,7 +16,7 @@ UINT32 PMX_SetExternalChipSetting(PLA_MXR_EXTERNAL_CHIP_SETTING_E eSetType, INT3
 
 UINT32 PMX_SetClosedCaptionOnOff(UCHAR ucPmxId, PLA_MXR_CLOSED_CAPTION_ON_OFF_T eClosedCaptionOnOff)
 {
-    if (ucPmxId != 0) // not reported as a failure, unlike elsewhere
+    if (ucPmxId != 0) // success, as nowhere else but in PMX_SetHdmiDeepColor
         return 1;
 
     VDP_EnableCC(eClosedCaptionOnOff == PLA_MXR_CLOSED_CAPTION_ON);

@@ -1,4 +1,5 @@
-/* The module's state and tables. Whatever depends on the resolution mode stands in the mode table and nowhere else. */
+/* The module's state and tables. Whatever is decided from the resolution mode stands in the mode table and nowhere
+ * else. */
 #include "pmx_if.h"
 
 #include "drv_pmx.h"

@@ -20,7 +20,7 @@ typedef struct
     BOOL fgEnabled; /* the source has reported itself enabled */
     DRV_GFX_COLOR_MODE_T eInputColorMode;
     DRV_PMX_COLOR_SPACE_T eSrcColorSpace;
-    UINT32 u4SrcWidth;  /* pixels */
+    UINT32 u4SrcWidth;  /* pixels; never filled, like the height: a size decides the colour space and is not kept */
     UINT32 u4SrcHeight; /* lines */
     UCHAR ucLumaKey;    /* given with a video source */
 } PMX_PORT_INFO_T;
@@ -60,8 +60,8 @@ typedef struct
     PMX_RESOLUTION_T arOutputConf[PMX_OUTPUT_NUM];
     BOOL fgAspNext; /* u4AspNext waits for the next mode change */
     UINT32 u4AspNext;
-    BOOL fgSetModeCalled; /* no mode setting since reset: 0 */
-    UCHAR ucCavYcInputDelay;
+    BOOL fgSetModeCalled;    /* some mode has been set since the last reset */
+    UCHAR ucCavYcInputDelay; /* nothing here fills the delays and levels */
     UCHAR ucCavYcOutputDelay;
     UCHAR ucCvbsYcInputDelay;
     UCHAR ucCvbsYcOutputDelay;

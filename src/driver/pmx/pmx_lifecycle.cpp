@@ -103,8 +103,8 @@ void PMX_Uninit(void)
     _PmxInitiated = 0;
 }
 
-/* Not PMX_Uninit with a result: its caller keeps power management registered across it, may come when there is no
- * mutex, and reads a mutex that could not be deleted from the result and from MutexPMX. */
+/* Not PMX_Uninit with a result: power management stays registered, there need be no mutex, and one that could not be
+ * deleted is told by the result and by MutexPMX, not by Assert. */
 INT32 i4PMX_Uninit(UINT32 u4Case)
 {
     INT32 i4Ret = 0;

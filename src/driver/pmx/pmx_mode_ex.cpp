@@ -76,7 +76,8 @@ static BOOL fgDiffers(const PMX_RESOLUTION_T* prStored, const PMX_RESOLUTION_T* 
     return prStored->fgOutputEnable != prGiven->fgOutputEnable || prStored->eResMode != prGiven->eResMode;
 }
 
-/* Find what changed, against what the record holds, and store the request. */
+/* Find what changed, against what the record holds, and store the request. The video PLL is set here too, for a new
+ * frequency alone: a new format at the old frequency leaves it. */
 static void vFindChanges(MODE_EX_T* pr)
 {
     PMX_CONF_T* prConf = prPmxConf();
@@ -101,7 +102,7 @@ static void vFindChanges(MODE_EX_T* pr)
     pr->fgCvbsChange = fgDiffers(&prStored[PMX_OUTPUT_CVBS], &prGiven[PMX_OUTPUT_CVBS]);
     pr->fgOSD5Change = prConf->fgOSD5 != pr->fgOSD5;
 
-    for (UINT32 i = 0; i < PMX_OUTPUT_NUM; i++) // as given: the next call is compared with what its caller asked for
+    for (UINT32 i = 0; i < PMX_OUTPUT_NUM; i++) // as given: the next request is compared with this one
     {
         prStored[i].fgOutputEnable = prGiven[i].fgOutputEnable;
         prStored[i].eResMode = prGiven[i].eResMode;
@@ -193,7 +194,7 @@ static void vApplyFullChange(MODE_EX_T* pr)
     fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, &pr->stResData, 1);
     fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, &pr->stResData, 1);
     PMX_HalSetMode(0, pr->ucFmtMode);
-    if (pr->fgOSD5 == 0) // with the fifth OSD plane in use the scaler keeps its mode
+    if (pr->fgOSD5 == 0) // else the scaler stays in its mode
         PMX_HalSetScalerMode(prConf->ucMode);
     PMX_IsLog(9, "Adjust PMX_ColorSpaceSetup call sequence.\n");
     PMX_ColorSpaceSetup(prConf->eMasterColorSpace, prConf->ucMode); // one-mode setting does this before the modes

@@ -20,8 +20,7 @@ static bool fgHasCap(UINT32 u4Mask)
 }
 
 /* What the five setters share: id, trace, capability, refusal, and the stored value, which is the analogue outputs'
- * alone. The
- * console texts say "Seting" in all five, and stay so. */
+ * alone. The console texts say "Seting" in all five, and stay so. */
 static bool fgTakeAdjustment(UCHAR ucPmxId, UINT32 u4Mask, UCHAR ucValue, UCHAR bSetTVE, const CHAR* szTrace,
                              const CHAR* szRefusal, UCHAR* pucStored)
 {

@@ -67,7 +67,7 @@ UINT32 PMX_SetOrderVdpComp0(UCHAR ucPmxId, UINT32 u4OnTop)
 
 UINT32 d_PMX_SetOrderVdpComp0(UCHAR ucPmxId, UINT32 u4OnTop)
 {
-    for (UINT32 u4VdpIdx = 0; u4VdpIdx < 3; u4VdpIdx++) // all three that the video plane driver has
+    for (UINT32 u4VdpIdx = 0; u4VdpIdx < 3; u4VdpIdx++) // three, although two video planes reach the mixer
         VDP_VsyncSendCmd(u4VdpIdx, 17);
     return PMX_SetOrderVdpComp0(ucPmxId, u4OnTop);
 }

@@ -77,7 +77,7 @@ UINT32 PMX_SetCBEnable(UCHAR ucPmxId, UCHAR ucEnable)
         PMX_HalSetActiveZone(0, prConf->ucMode);
         PMX_HalSetCBWidth(0, prPmxModeRow(prConf->ucMode)->u1CBWidth);
         PMX_HalEnableCB(0);
-        if (bComp0OnTop == 1) // the bar is drawn for unswapped planes
+        if (bComp0OnTop == 1) // undone while the bar is shown, and still remembered
         {
             PMX_IsLog(8, "Temporarily Turn Off Plane Swap 1_2\n");
             PMX_HalSwapPlane1_2(0, 0);

@@ -54,7 +54,9 @@ DRV_STATIC_ASSERT(sizeof(PMX_AVD_COMMAND_T) == 4, "enumerations are 32 bits wide
 DRV_STATIC_ASSERT(sizeof(PMX_AVD_QUERY_T) == 4, "enumerations are 32 bits wide");
 
 /** Resolution, PLL and digital-port commands. Resolutions are PMX_RESOLUTION_MODE_T values. One-mode setting leaves
- *  eCcirDrvInfo, fgOsdMsg and fgCCIROutEnable 0. */
+ *  eCcirDrvInfo, fgOsdMsg and fgCCIROutEnable 0. Per-output mode setting checks the mixer's format alone: in the fields
+ *  of HDMI, of the external chip, of the port's set-up and of the fifth OSD plane any other value may come, which must
+ *  do no harm. */
 typedef struct
 {
     UINT8 u1ScaleMode;

@@ -33,8 +33,9 @@ extern "C" {
 PMX_API void PMX_Init(void);
 
 /** Reload the default record, take the boot resolution and program the hardware for it. Until the first per-output mode
- *  setting (_fgBootUp) scaler and TV encoder keep what the boot loader set. Clears the handshake, its timer's handle
- *  included: after a reset of a started layer nobody knows the timer any more, and starting it fails with an Assert.
+ *  setting (_fgBootUp) scaler and TV encoder keep what the boot loader set. Every input port is unconnected afterwards.
+ *  Clears the handshake, its timer's handle included: after a reset of a started layer nobody knows the timer any more,
+ *  and starting or deleting it fails with an Assert.
  *  @param ucPmxId  mixer id, 0; for any other nothing is done
  *  @context the framework's thread, with no other mixer call running; sleeps */
 PMX_API void PMX_Reset(UCHAR ucPmxId);
@@ -47,15 +48,16 @@ PMX_API void PMX_Uninit(void);
 
 /** Shut the layer down for a caller that wants a result. Unlike PMX_Uninit it leaves power management registered,
  *  deletes the mutex only if there is one, and reports its failed deletion by the result instead of Assert; MutexPMX
- *  then keeps its handle. A timer that cannot be deleted is reported by Assert. Whatever fails, the layer counts as not
- *  started afterwards.
+ *  then keeps its handle. A timer that cannot be deleted is reported by Assert, a table that cannot be withdrawn in the
+ *  log. Whatever fails, the layer counts as not started afterwards: a second call deletes nothing, and returns 0.
  *  @param u4Case  why; only logged
  *  @return 0, also when the layer had not been started; -1 when the mutex could not be deleted
  *  @context the framework's thread, with no other mixer call running; sleeps */
 PMX_API INT32 i4PMX_Uninit(UINT32 u4Case);
 
 /** Stop vertical-sync handling and mark the layer as not started. Mutex, timer, registration and power management stay
- *  as they are; a later shut-down does nothing, a later PMX_Init starts anew.
+ *  as they are; a later shut-down does nothing, a later PMX_Init creates and registers everything once more, and nobody
+ *  gives the former mutex and timer back.
  *  @context the framework's thread, with no other mixer call running */
 PMX_API void PMX_Stop(void);
 
@@ -156,7 +158,7 @@ PMX_API void vSetPLLGP_HDMIDDS(BYTE bResIndex);
  *  @param ucPmxId   mixer id, 0
  *  @param ucTvType  PMX_TV_TYPE_NTSC or PMX_TV_TYPE_PAL; any other is stored and forwarded as given
  *  @return PMX_SET_OK; 0 for a mixer id other than 0
- *  @context any thread; takes no lock */
+ *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetTvType(UCHAR ucPmxId, UCHAR ucTvType);
 
 /** Read the TV type.
@@ -169,13 +171,14 @@ PMX_API UINT32 PMX_GetTvType(UCHAR ucPmxId, UCHAR* pucTvType);
 /* Diagnostics */
 
 /** The module's own formatted print, admitted by bit `level` of PMX_debug_level. The text is cut to 511 characters and
- *  goes to the console as a format: a percent sign that the values brought in is interpreted once more.
+ *  goes to the console as a format: a percent sign in it, wherever it came from, is interpreted once more.
  *  @param level          0 to 31; any other prints nothing
  *  @param format_string  printf format
  *  @context any thread; takes no lock, needs 512 bytes of stack */
 PMX_API void PMX_Printf(INT32 level, const char* format_string, ...) DRV_PRINTF_FORMAT(2, 3);
 
-/** Print the whole record of mixer 0 to the console at level 0. Takes no lock: while a mode is being set, some lines
+/** Print the record of mixer 0 to the console at level 0. What is labelled E is the digital port's bus width: the
+ *  master enable is not shown. A value without a name has no line. Takes no lock: while a mode is being set, some lines
  *  may show what was and others what will be.
  *  @context any thread */
 PMX_API void PMX_QueryStatus(void);
@@ -211,17 +214,19 @@ PMX_API INT32 i4PmxSetMode(void* pvTag, UCHAR ucMode, UCHAR ucVFreq, BOOL fgOSD5
 /** Set the state of all four outputs. The first enabled one of digital port, HDMI, component and composite gives the
  *  mixer's format, HDMI's when none is enabled. HDMI, component and composite run it while they are off; the record
  *  keeps what the caller gave. Ends by deciding whether graphics wait for the display part: see
- *  PMX_SetFormatChangeFlag. A refused format lowers the format-change flag and stores nothing.
+ *  PMX_SetFormatChangeFlag. A refused format lowers the format-change flag and stores nothing. Only the mixer's format
+ *  is checked: what the other outputs were given goes to their drivers unchecked, cut to 8 bits.
  *  @param ucPmxId     mixer id, 0
  *  @param prOutConf   four outputs, indexed PMX_OUTPUT_CCIR to PMX_OUTPUT_CVBS; fgOutputEnable and eResMode of each are
- *  used, and eCcirDrvInfo of PMX_OUTPUT_CCIR; u4VFreq is not
+ *                     used, and eCcirDrvInfo of PMX_OUTPUT_CCIR; u4VFreq is not. Nobody changes it until the call
+ *                     returns
  *  @param ucVFreq     vertical frequency of all outputs in Hz: 60, 30, 29, 23 and 0 select NTSC, any other PAL
  *  @param rDrvExtScl  how the external chip is used; a change programs everything
  *  @param fgOSD5      fifth OSD plane asked for on the analogue outputs: 0 no, 1 composite, 2 both. An HD mixer format
  *                     shows it on composite in any case, and on both when component's mode is not HD
  *  @return PMX_SET_OK; 0 for a mixer id other than 0, a null pointer or a mixer format that PMX_CheckCap refuses
  *  @context a thread that may sleep; takes no lock: no other mode change may run, the display timer may expire at any
- *  point */
+ *           point */
 PMX_API UINT32 PMX_SetModeEx(UCHAR ucPmxId, PMX_RESOLUTION_T* prOutConf, UCHAR ucVFreq, DRV_EXT_CHIP_USAGE_T rDrvExtScl,
                              UINT8 fgOSD5);
 
@@ -280,7 +285,7 @@ PMX_API UINT32 PMX_SetOsdEnable(void);
 PMX_API void _PMX_TmrIsr(HANDLE_T h, void* pvArg);
 
 /** Start the display timer anew. Failures of the timer are reported by Assert.
- *  @param u4TimeInterval  milliseconds
+ *  @param u4TimeInterval  milliseconds; fgTimerAlreadySet is left to per-output mode setting
  *  @return 1
  *  @context any thread */
 PMX_API UINT32 PMX_SetFormatChangeTimer(UINT32 u4TimeInterval);
@@ -297,7 +302,7 @@ PMX_API BOOL fgPMX_DisplayModeReady(void);
  *  Assert, and leaves the converters alone; so do, silently, modes without a setting.
  *  @param eMixerOutCS   the mixer's colour space
  *  @param ucOutputMode  a PMX_RESOLUTION_MODE_T value
- *  @context any thread; takes no lock */
+ *  @context any thread that may sleep; takes no lock */
 PMX_API void PMX_ColorSpaceSetup(DRV_PMX_COLOR_SPACE_T eMixerOutCS, UCHAR ucOutputMode);
 
 /* Geometry */
@@ -326,8 +331,8 @@ PMX_API INT32 i4PmxGetOutSize(void* pvTag, UINT32* pu4Width, UINT32* pu4Height);
  *  @context any thread; takes no lock */
 PMX_API UCHAR PMX_ProgressiveOut(UCHAR ucPmxId);
 
-/** Ask whether the mixer's resolution mode is reported as an HD output. Not the HD formats of the TV encoders: 29.97
- *  Hz, RES_2D_576I50HZ and every mode above RES_3D_1080P24HZ_TB count here.
+/** Ask whether the mixer's resolution mode is reported as an HD output. Not the HD formats of the TV encoders:
+ *  RES_1080P29_97HZ, RES_2D_576I50HZ and every mode above RES_3D_1080P24HZ_TB count here.
  *  @param ucPmxId  mixer id, unchecked
  *  @return TRUE or FALSE
  *  @context any thread; takes no lock */
@@ -378,7 +383,7 @@ PMX_API UINT32 PMX_SetBg(UCHAR ucPmxId, UINT32 u4BgColor);
 /** Set the whole stacking order.
  *  @param ucPmxId        mixer id, 0
  *  @param pu4PlaneOrder  eight plane ids, position 0 first; the record keeps their low 8 bits, the hardware gets the
- *  words as given
+ *                        words as given
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetPlaneOrderArray(UCHAR ucPmxId, const UINT32* pu4PlaneOrder);
@@ -400,8 +405,9 @@ PMX_API UINT32 PMX_SetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR ucPlaneOrde
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR* pucPlaneOrder);
 
-/** Put the first video plane above or below the second by the hardware's swap of planes 1 and 2, and mix the second
- *  mixer plane as the video plane that now sits there is enabled. The choice outlives a reset of the record.
+/** Put the first video plane above or below the second by the hardware's swap of planes 1 and 2. The second mixer plane
+ *  is put into the mix if the video plane that now sits there is enabled or hidden, else taken out of it. The choice
+ *  outlives a reset of the record.
  *  @param ucPmxId  mixer id, handed on unchecked
  *  @param u4OnTop  0 below, anything else above; stored unchanged, and the colour bar looks for 1 and nothing else
  *  @return 1
@@ -438,19 +444,19 @@ PMX_API INT32 i4PmxGetPlanePosition(void* pvTag, UCHAR ucVdpHwId);
 
 /* Arbitrary plane order */
 
-/** Feed each mixer plane from one source, and compensate the delays that follow. Prints 17 lines whatever the console's
- *  level.
+/** Feed each mixer plane from one source, and compensate the delays that follow, by what suits the mode of the moment:
+ *  no mode setting does it again. Prints 17 lines whatever the console's level.
  *  @param ucPmxId       mixer id, unchecked; printed and handed on as given
  *  @param u4PlaneOrder  4 bits a plane, plane 0 lowest: the low three name the source 0 to 7, the top one is kept but
- *  not used. All sources differ
+ *                       not used. All sources differ
  *  @return 1; 0 when two planes name one source, and then nothing has changed; 0 also when the hardware refuses the
- *  order, which then stays stored
+ *          order, which then stays stored
  *  @context a thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetArbPlaneOrder(UCHAR ucPmxId, UINT32 u4PlaneOrder);
 
 /** Read the arbitrary plane order last stored; a difference from the hardware's is logged.
- *  @param ucPmxId       mixer id, unchecked; printed and handed on as given
- *  @param pu4PlaneOrder receives the stored order; not tested for null
+ *  @param ucPmxId        mixer id, unchecked; printed and handed on as given
+ *  @param pu4PlaneOrder  receives the stored order; not tested for null
  *  @return 1; 0 when the hardware cannot report its order, and then nothing is written
  *  @context a thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_GetArbPlaneOrder(UCHAR ucPmxId, UINT32* pu4PlaneOrder);
@@ -527,7 +533,7 @@ PMX_API UINT32 PMX_SetDelay(UCHAR ucVdoId, UCHAR ucADJ_F, UINT16 u2HDelay, UINT1
 /** Find the input port of an upstream component. An unknown type is logged, an id out of range is not.
  *  @param u2CompType  PMX_COMP_TYPE_VDP or PMX_COMP_TYPE_OSD
  *  @param u2CompId    its id; the low 8 bits count: video planes 0 (port 0) and 1 to 3 (port 1), OSD planes 0 to 5
- *  (ports 2 to 7)
+ *                     (ports 2 to 7)
  *  @return port 0 to 7; 8: none
  *  @context any thread; takes no lock */
 PMX_API UINT32 u4PmxCompId2LocalId(UINT16 u2CompType, UINT16 u2CompId);
@@ -539,7 +545,7 @@ PMX_API UINT32 u4PmxCompId2LocalId(UINT16 u2CompType, UINT16 u2CompId);
  *  @param u2UpstreamCompType  the component's type
  *  @param u2UpstreamCompId    its id
  *  @return PMX_PORT_DONE; PMX_NO_SUCH_PORT for a component without a port or a mixer id other than 0, and then nothing
- *  is stored
+ *          is stored
  *  @context a thread that may sleep; takes MutexPMX: never from inside pu4SetColorMode */
 PMX_API UINT32 i4Pmx_Connect(UINT16 u2ThisCompType, UINT16 u2ThisCompId, UINT16 u2UpstreamCompType,
                              UINT16 u2UpstreamCompId);
@@ -551,16 +557,17 @@ PMX_API UINT32 i4Pmx_Connect(UINT16 u2ThisCompType, UINT16 u2ThisCompId, UINT16 
  *  @param u2UpstreamCompType  the component's type
  *  @param u2UpstreamCompId    its id
  *  @return PMX_PORT_DONE; PMX_NO_SUCH_PORT for a component without a port or a mixer id other than 0, and then nothing
- *  is cleared
+ *          is cleared
  *  @context a thread that may sleep; takes MutexPMX: never from inside pu4SetColorMode */
 PMX_API UINT32 i4Pmx_Disconnect(UINT16 u2ThisCompType, UINT16 u2ThisCompId, UINT16 u2UpstreamCompType,
                                 UINT16 u2UpstreamCompId);
 
-/* Source events */
+/* Source events. Ports and the master colour space are written without a lock; events that come at once are not put in
+ * order here. */
 
 /** A video plane starts to deliver pictures. Decides the master colour space anew. Plane 2 switches full-range
  *  conversion of graphics on, plane 1 switches it off.
- *  @param ucPmxId      mixer id, unchecked; asked of the hardware as given
+ *  @param ucPmxId      mixer id, unchecked; the hardware is asked with it as given
  *  @param ucVdpId      0 main video, 1 second video, 2 still-picture background (always BT.601), 3
  *  @param i4SrcWidth   pixels; above 720 the source is BT.709
  *  @param i4SrcHeight  lines; above 576 the source is BT.709
@@ -578,13 +585,13 @@ PMX_API UINT32 PMX_VdpEnabled(UCHAR ucPmxId, UCHAR ucVdpId, INT32 i4SrcWidth, IN
  *  @context a thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_VdpDisabled(UCHAR ucPmxId, UCHAR ucVdpId);
 
-/** An OSD plane starts. YCbCr graphics take the master colour space at once; RGB graphics leave it and what the port
- *  knew.
- *  @param ucPmxId       mixer id, unchecked
- *  @param ucOsdId       OSD plane 0 to 5
- *  @param i4SrcWidth    pixels; above 720 the source is BT.709
- *  @param i4SrcHeight   lines; above 576 the source is BT.709
- *  @param eSrcColorMode colour mode of its pixels
+/** An OSD plane starts. The colour space of YCbCr graphics becomes the master's at once. RGB graphics change neither it
+ *  nor the colour mode and colour space of their port: one that was YCbCr goes on counting as YCbCr.
+ *  @param ucPmxId        mixer id, unchecked
+ *  @param ucOsdId        OSD plane 0 to 5
+ *  @param i4SrcWidth     pixels; above 720 the source is BT.709
+ *  @param i4SrcHeight    lines; above 576 the source is BT.709
+ *  @param eSrcColorMode  colour mode of its pixels; any but DRV_GFX_COLOR_MODE_YCBCR counts as RGB
  *  @return 1, connected or not; 0 for a plane without a port
  *  @context a thread that may sleep, outside MutexPMX, which a change of the master colour space takes */
 PMX_API UINT32 PMX_OsdEnabled(UCHAR ucPmxId, UCHAR ucOsdId, INT32 i4SrcWidth, INT32 i4SrcHeight,
@@ -601,7 +608,7 @@ PMX_API UINT32 PMX_OsdDisabled(UCHAR ucPmxId, UCHAR ucOsdId);
  *  video before the main video, among graphics the highest port; with nothing enabled it stays. The second video counts
  *  only with a luma key and while the hardware mixes it; RGB graphics never do; whether a port is connected does not
  *  matter.
- *  @param ucPmxId  mixer id, unchecked; asked of the hardware as given
+ *  @param ucPmxId  mixer id, unchecked; the hardware is asked with it as given
  *  @return 1
  *  @context a thread that may sleep, outside MutexPMX, which a change takes */
 PMX_API UINT32 PMX_DecideMasterColorSpace(UCHAR ucPmxId);
@@ -647,15 +654,15 @@ PMX_API INT32 i4PmxVdpDisabled(void* pvTag);
 
 /** Set brightness, of the analogue outputs or of HDMI. The record keeps the analogue one alone. The mixer's own
  *  brightness follows in either case.
- *  @param ucPmxId  mixer id, 0
+ *  @param ucPmxId       mixer id, 0
  *  @param ucBrightness  128 = neutral
- *  @param bSetTVE  0 HDMI, anything else the analogue outputs
+ *  @param bSetTVE       0 HDMI, anything else the analogue outputs
  *  @return 1; 0 for a mixer id other than 0 or when capability bit 21 is clear
  *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetBrightness(UCHAR ucPmxId, UCHAR ucBrightness, UCHAR bSetTVE);
 
 /** Read brightness of the analogue outputs.
- *  @param ucPmxId  mixer id, 0
+ *  @param ucPmxId        mixer id, 0
  *  @param pucBrightness  receives it
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 21 is clear
  *  @context any thread; takes no lock */
@@ -673,15 +680,15 @@ PMX_API void d_PMX_GetBrightness(UCHAR* pucBrightness);
 
 /** Set contrast, of the analogue outputs or of HDMI. The record keeps the analogue one alone. The mixer's own contrast
  *  follows in either case.
- *  @param ucPmxId  mixer id, 0
+ *  @param ucPmxId     mixer id, 0
  *  @param ucContrast  128 = neutral
- *  @param bSetTVE  0 HDMI, anything else the analogue outputs
+ *  @param bSetTVE     0 HDMI, anything else the analogue outputs
  *  @return 1; 0 for a mixer id other than 0 or when capability bit 22 is clear
  *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetContrast(UCHAR ucPmxId, UCHAR ucContrast, UCHAR bSetTVE);
 
 /** Read contrast of the analogue outputs.
- *  @param ucPmxId  mixer id, 0
+ *  @param ucPmxId      mixer id, 0
  *  @param pucContrast  receives it
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 22 is clear
  *  @context any thread; takes no lock */
@@ -699,7 +706,7 @@ PMX_API void d_PMX_GetContrast(UCHAR* pucContrast);
 
 /** Set hue, of the analogue outputs or of HDMI. The record keeps the analogue one alone.
  *  @param ucPmxId  mixer id, 0
- *  @param ucHue  128 = neutral
+ *  @param ucHue    128 = neutral
  *  @param bSetTVE  0 HDMI, anything else the analogue outputs
  *  @return 1; 0 for a mixer id other than 0 or when capability bit 23 is clear
  *  @context any thread that may sleep; takes no lock */
@@ -707,7 +714,7 @@ PMX_API UINT32 PMX_SetHue(UCHAR ucPmxId, UCHAR ucHue, UCHAR bSetTVE);
 
 /** Read hue of the analogue outputs.
  *  @param ucPmxId  mixer id, 0
- *  @param pucHue  receives it
+ *  @param pucHue   receives it
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 23 is clear
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetHue(UCHAR ucPmxId, UCHAR* pucHue);
@@ -723,15 +730,15 @@ PMX_API void d_PMX_SetHue(UCHAR ucHue);
 PMX_API void d_PMX_GetHue(UCHAR* pucHue);
 
 /** Set saturation, of the analogue outputs or of HDMI. The record keeps the analogue one alone.
- *  @param ucPmxId  mixer id, 0
+ *  @param ucPmxId       mixer id, 0
  *  @param ucSaturation  128 = neutral
- *  @param bSetTVE  0 HDMI, anything else the analogue outputs
+ *  @param bSetTVE       0 HDMI, anything else the analogue outputs
  *  @return 1; 0 for a mixer id other than 0 or when capability bit 24 is clear
  *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetSaturation(UCHAR ucPmxId, UCHAR ucSaturation, UCHAR bSetTVE);
 
 /** Read saturation of the analogue outputs.
- *  @param ucPmxId  mixer id, 0
+ *  @param ucPmxId        mixer id, 0
  *  @param pucSaturation  receives it
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 24 is clear
  *  @context any thread; takes no lock */
@@ -748,15 +755,15 @@ PMX_API void d_PMX_SetSaturation(UCHAR ucSaturation);
 PMX_API void d_PMX_GetSaturation(UCHAR* pucSaturation);
 
 /** Set sharpness, of the analogue outputs or of HDMI. The record keeps the analogue one alone.
- *  @param ucPmxId  mixer id, 0
+ *  @param ucPmxId      mixer id, 0
  *  @param ucSharpness  the encoder's unit; 0 after a reset
- *  @param bSetTVE  0 HDMI, anything else the analogue outputs
+ *  @param bSetTVE      0 HDMI, anything else the analogue outputs
  *  @return 1; 0 for a mixer id other than 0 or when capability bit 27 is clear
  *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetSharpness(UCHAR ucPmxId, UCHAR ucSharpness, UCHAR bSetTVE);
 
 /** Read sharpness of the analogue outputs.
- *  @param ucPmxId  mixer id, 0
+ *  @param ucPmxId       mixer id, 0
  *  @param pucSharpness  receives it
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 27 is clear
  *  @context any thread; takes no lock */
@@ -844,7 +851,8 @@ PMX_API void d_PMX_Set2DSmooth(UCHAR uc2D);
 /** Set the normal aspect ratio and signal it on HDMI.
  *  @param ucPmxId        mixer id, 0
  *  @param u4AspectRatio  an ASP_ code
- *  @return 1; 0 for a mixer id other than 0; 0 also when the HDMI/AV driver refuses it, and then it stays stored
+ *  @return 1; 0 for a mixer id other than 0; 0 also when the HDMI/AV driver refuses it, and then it is stored all the
+ *          same, and the video planes are not told
  *  @context a thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetAspectRatio(UCHAR ucPmxId, UINT32 u4AspectRatio);
 
@@ -852,7 +860,8 @@ PMX_API UINT32 PMX_SetAspectRatio(UCHAR ucPmxId, UINT32 u4AspectRatio);
  *  @param ucPmxId        mixer id, 0
  *  @param u4AspectRatio  an ASP_ code
  *  @param fgApplyOnNext  0 now, anything else: it waits
- *  @return 1; 0 for a mixer id other than 0; 0 also when the HDMI/AV driver refuses it, and then it stays stored
+ *  @return 1; 0 for a mixer id other than 0; 0 also when the HDMI/AV driver refuses it, and then it is stored all the
+ *          same, and the video planes are not told
  *  @context a thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgApplyOnNext);
 

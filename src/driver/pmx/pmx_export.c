@@ -1,0 +1,12 @@
+/* What other kernel modules link against by name; everybody else in the stack is linked with the layer. Compiled by the
+ * kernel's build beside pmx_if.o. */
+#include <linux/export.h>
+
+#include "drv_pmx.h"
+
+EXPORT_SYMBOL(PMX_GetMode);
+EXPORT_SYMBOL(fgPMX_DisplayModeReady);
+EXPORT_SYMBOL(i4Pmx_Connect);
+EXPORT_SYMBOL(i4Pmx_Disconnect);
+EXPORT_SYMBOL(PMX_OsdEnabled);
+EXPORT_SYMBOL(PMX_OsdDisabled);

@@ -1,0 +1,4 @@
+/* Stands in for the kernel's header: what the stack's headers take from it. */
+#pragma once
+
+typedef __SIZE_TYPE__ size_t;

@@ -99,6 +99,7 @@ class Tidy(unittest.TestCase):
                      "void* p = malloc(1);", "std::size_t z;", "#include <cstring>"):
             self.refused("src/driver/pmx/a.cpp:1: ", "src/driver/pmx/a.cpp", code + "\n")
         self.refused("decides by mode", "src/driver/pmx/a.cpp", "void f()\n{\n    switch (ucMode)\n    {\n    }\n}\n")
+        self.accepted("src/driver/pmx/a.c", "#include <linux/export.h>\n")
         self.accepted("src/driver/pmx/a.cpp", "#include <stddef.h>\n// a new class of modes\n")
 
     def test_contracts_of_the_layer(self):

@@ -26,7 +26,9 @@ constexpr Device devices[] = {
     { "tv_encoder", tv_encoder::power_on, tv_encoder::state },
     { "video_planes", video_planes::power_on, video_planes::state },
     { "osd_planes", osd_planes::power_on, osd_planes::state },
+    { "sources", sources::power_on, sources::state },
     { "hdmi_av", hdmi_av::power_on, hdmi_av::state },
+    { "display_part", display_part::power_on, display_part::state },
     { "display_control", display_control::power_on, display_control::state },
 };
 
@@ -43,6 +45,8 @@ Board board_state;
 void power_on(const Description& wanted)
 {
     const Description given = wanted; // it may be the one in force
+    for (const mixer::Arrangement& arrangement : given.arrangements)
+        mixer::check_order(arrangement.order);
     faults::power_on(given);
     layer_state::restore();
     board_state = { given, 0 };

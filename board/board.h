@@ -8,11 +8,15 @@
 #include <filesystem>
 #include <functional>
 #include <map>
+#include <optional>
 #include <stdexcept>
 #include <string>
 #include <string_view>
 #include <vector>
 
+#include "board/display_part.h"
+#include "board/hdmi_av.h"
+#include "board/mixer.h"
 #include "board/trace.h"
 #include "board/value.h"
 
@@ -23,11 +27,15 @@ namespace board
 struct Description
 {
     std::string name = "bare";
-    int console_level = 1;                              ///< PMX_IsLog prints lines of this level and below
-    std::map<std::string, std::filesystem::path> flash; ///< partition name to image file
-    bool sink_plugged = true;                           ///< an HDMI sink is plugged in at power-on
-    std::array<std::int32_t, 8> plane_delay{};          ///< delay that the hardware reports for each mixer plane
-    std::vector<Fault> faults;                          ///< in force from power-on
+    int console_level = 1;                               ///< PMX_IsLog prints lines of this level and below
+    std::map<std::string, std::filesystem::path> flash;  ///< partition name to image file
+    bool sink_plugged = true;                            ///< an HDMI sink is plugged in at power-on
+    bool resolution_requested = false;                   ///< a hot-plug event wants the HDMI resolution sent again
+    std::optional<hdmi_av::Resolution> valid_resolution; ///< what the HDMI driver would choose; nothing: what is asked
+    display_part::Behaviour display_part;                ///< what the display part does with a resolution change
+    mixer::PlaneDelays plane_delay{};                    ///< delay that the hardware reports for each mixer plane
+    std::vector<mixer::Arrangement> arrangements;        ///< arrangements of the planes that have other delays
+    std::vector<Fault> faults;                           ///< in force from power-on
 };
 
 /** A board file that cannot be used: file, line where known, what is wrong. */
@@ -76,11 +84,12 @@ int suspend();
 int resume();
 
 /** Everything that the devices hold, by device: os, console, flash, registers, interface_manager, power, mixer,
- *  tv_encoder, video_planes, osd_planes, hdmi_av, display_control. Stable keys; numbers with their names. */
+ *  tv_encoder, video_planes, osd_planes, sources, hdmi_av, display_part, display_control. Stable keys; numbers with
+ *  their names. */
 Value state();
 
 /** Number of reports since power-on. */
-unsigned asserts();  ///< through Assert
-unsigned misuses();  ///< of the platform, found by the board (a second lock by the holder, unlock without lock, …)
+unsigned asserts(); ///< through Assert
+unsigned misuses(); ///< of the platform, found by the board (a second lock by the holder, unlock without lock, …)
 
 } // namespace board

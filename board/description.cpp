@@ -104,16 +104,108 @@ void read_flash(const File& file, const toml::table& flash, Description& descrip
     }
 }
 
-void read_plane_delay(const File& file, const toml::node& node, Description& description)
+mixer::PlaneDelays plane_delays_at(const File& file, const toml::node& node, const std::string& key)
 {
-    const toml::array* const delays = node.as_array();
-    if (delays == nullptr || delays->size() != description.plane_delay.size())
-        file.wrong(node.source(), "plane_delay has to be a list of " + std::to_string(description.plane_delay.size()) +
-                                      " numbers, plane 1 first");
-    for (std::size_t plane = 0; plane < delays->size(); ++plane)
-        description.plane_delay[plane] = static_cast<std::int32_t>(number_at(file, (*delays)[plane], "a plane's delay",
-                                                                             std::numeric_limits<std::int32_t>::min(),
-                                                                             std::numeric_limits<std::int32_t>::max()));
+    mixer::PlaneDelays delays{};
+    const toml::array* const list = node.as_array();
+    if (list == nullptr || list->size() != delays.size())
+        file.wrong(node.source(),
+                   key + " has to be a list of " + std::to_string(delays.size()) + " numbers, plane 1 first");
+    for (std::size_t plane = 0; plane < delays.size(); ++plane)
+        delays[plane] = static_cast<std::int32_t>(number_at(file, (*list)[plane], "a plane's delay",
+                                                            std::numeric_limits<std::int32_t>::min(),
+                                                            std::numeric_limits<std::int32_t>::max()));
+    return delays;
+}
+
+void read_arrangement(const File& file, const toml::node& node, Description& description)
+{
+    const toml::table* const table = node.as_table();
+    if (table == nullptr)
+        file.wrong(node.source(), "an arrangement has to be a table: [[mixer.arrangement]]");
+    check_keys(file, *table, { "order", "delay" }, " in [[mixer.arrangement]]");
+    const toml::node* const order = table->get("order");
+    const toml::node* const delay = table->get("delay");
+    if (order == nullptr || delay == nullptr)
+        file.wrong(table->source(), "an arrangement needs order and delay");
+    mixer::Arrangement arrangement{};
+    arrangement.order = static_cast<std::uint32_t>(
+        number_at(file, *order, "order of an arrangement", 0, std::numeric_limits<std::uint32_t>::max()));
+    arrangement.delay = plane_delays_at(file, *delay, "delay of an arrangement");
+    try
+    {
+        mixer::check_order(arrangement.order);
+    }
+    catch (const std::invalid_argument& error)
+    {
+        file.wrong(order->source(), error.what());
+    }
+    for (const mixer::Arrangement& other : description.arrangements)
+    {
+        if (other.order == arrangement.order)
+            file.wrong(order->source(), "this arrangement stands here twice");
+    }
+    description.arrangements.push_back(arrangement);
+}
+
+void read_mixer(const File& file, const toml::table& mixer, Description& description)
+{
+    if (const toml::node* const delay = mixer.get("plane_delay"))
+        description.plane_delay = plane_delays_at(file, *delay, "plane_delay");
+    const toml::node* const node = mixer.get("arrangement");
+    if (node == nullptr)
+        return;
+    const toml::array* const list = node->as_array();
+    if (list == nullptr)
+        file.wrong(node->source(), "arrangement has to be a list of tables: [[mixer.arrangement]]");
+    for (const toml::node& item : *list)
+        read_arrangement(file, item, description);
+}
+
+std::uint32_t resolution_mode_at(const File& file, const toml::node& node, const std::string& key)
+{
+    const std::string text = text_at(file, node, key);
+    std::vector<std::string_view> modes;
+    for (const std::string_view name : names::all())
+    {
+        const std::int64_t number = names::number_of(name).value();
+        if (names::name_of(names::Family::ResolutionMode, number) != name)
+            continue;
+        if (name == text)
+            return static_cast<std::uint32_t>(number);
+        modes.push_back(name);
+    }
+    file.wrong(node.source(), "no resolution mode is called " + text + suggestion(text, modes));
+}
+
+void read_hdmi(const File& file, const toml::table& hdmi, Description& description)
+{
+    if (const toml::node* const plugged = hdmi.get("plugged"))
+        description.sink_plugged = switch_at(file, *plugged, "plugged of hdmi");
+    if (const toml::node* const wanted = hdmi.get("request_resolution"))
+        description.resolution_requested = switch_at(file, *wanted, "request_resolution of hdmi");
+    const toml::table* const valid = table_at(file, hdmi, "valid", { "resolution", "frequency" });
+    if (valid == nullptr)
+        return;
+    const toml::node* const resolution = valid->get("resolution");
+    const toml::node* const frequency = valid->get("frequency");
+    if (resolution == nullptr || frequency == nullptr)
+        file.wrong(valid->source(), "valid of hdmi needs resolution and frequency");
+    const auto mode = resolution_mode_at(file, *resolution, "resolution of valid");
+    description.valid_resolution = { mode, static_cast<std::uint16_t>(
+                                               number_at(file, *frequency, "frequency of valid", 0, 65535)) };
+}
+
+void read_display_part(const File& file, const toml::node& node, Description& description)
+{
+    try
+    {
+        description.display_part = display_part::read_behaviour(text_at(file, node, "answer of display_part"));
+    }
+    catch (const std::invalid_argument& error)
+    {
+        file.wrong(node.source(), error.what());
+    }
 }
 
 /** When a fault answers: one of on, from and always; without any of them the first call. */
@@ -178,7 +270,7 @@ void read_faults(const File& file, const toml::node& node, Description& descript
 
 Description read(const File& file, const toml::table& root)
 {
-    check_keys(file, root, { "name", "console", "flash", "hdmi", "mixer", "fault" }, "");
+    check_keys(file, root, { "name", "console", "flash", "hdmi", "display_part", "mixer", "fault" }, "");
     Description description;
     description.name = file.path.parent_path().filename().string();
     if (const toml::node* const name = root.get("name"))
@@ -190,16 +282,15 @@ Description read(const File& file, const toml::table& root)
     }
     if (const toml::table* const flash = table_at(file, root, "flash", {}))
         read_flash(file, *flash, description);
-    if (const toml::table* const hdmi = table_at(file, root, "hdmi", { "plugged" }))
+    if (const toml::table* const hdmi = table_at(file, root, "hdmi", { "plugged", "request_resolution", "valid" }))
+        read_hdmi(file, *hdmi, description);
+    if (const toml::table* const part = table_at(file, root, "display_part", { "answer" }))
     {
-        if (const toml::node* const plugged = hdmi->get("plugged"))
-            description.sink_plugged = switch_at(file, *plugged, "plugged of hdmi");
+        if (const toml::node* const answer = part->get("answer"))
+            read_display_part(file, *answer, description);
     }
-    if (const toml::table* const mixer = table_at(file, root, "mixer", { "plane_delay" }))
-    {
-        if (const toml::node* const delay = mixer->get("plane_delay"))
-            read_plane_delay(file, *delay, description);
-    }
+    if (const toml::table* const mixer = table_at(file, root, "mixer", { "plane_delay", "arrangement" }))
+        read_mixer(file, *mixer, description);
     if (const toml::node* const faults = root.get("fault"))
         read_faults(file, *faults, description);
     return description;

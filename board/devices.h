@@ -27,6 +27,10 @@ namespace timers
 {
 void power_on();
 Value state();
+/** Let the board itself do something at a moment, in a thread of its own and not in the timers' context. There is one
+ *  alarm; setting it anew replaces it. */
+void set_alarm(std::chrono::microseconds due, void (*action)());
+void clear_alarm();
 } // namespace timers
 
 namespace console
@@ -53,6 +57,11 @@ namespace interface_manager
 {
 void power_on(const Description& description);
 Value state();
+/** Whether somebody holds this interface. */
+bool held(std::uint16_t component_type, std::uint16_t component_id, std::uint32_t interface_id);
+/** An outermost operation of the layer begins, and ends: what it fetched it has to have given back by then. */
+void operation_begins();
+void operation_ends(const std::string& operation);
 } // namespace interface_manager
 
 namespace power
@@ -85,11 +94,23 @@ void power_on(const Description& description);
 Value state();
 } // namespace osd_planes
 
+namespace sources
+{
+void power_on(const Description& description);
+Value state();
+} // namespace sources
+
 namespace hdmi_av
 {
 void power_on(const Description& description);
 Value state();
 } // namespace hdmi_av
+
+namespace display_part
+{
+void power_on(const Description& description);
+Value state();
+} // namespace display_part
 
 namespace display_control
 {

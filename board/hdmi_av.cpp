@@ -7,6 +7,7 @@
 
 #include "board/device_values.h"
 #include "board/devices.h"
+#include "board/display_part.h"
 #include "board/trace.h"
 #include "drv_av_d.h"
 
@@ -140,6 +141,8 @@ void power_on(const Description& description)
 {
     hdmi_av_state = {};
     hdmi_av_state.sink_plugged = description.sink_plugged;
+    hdmi_av_state.resolution_requested = description.resolution_requested;
+    hdmi_av_state.chosen_resolution = description.valid_resolution;
 }
 
 Value state()
@@ -182,6 +185,8 @@ BOOL fgPmxDrvSetAvd(UINT32 u4Command, void* pvParameter, UINT32 u4Length)
         return boardCall.answer(FALSE);
     const auto row = static_cast<std::size_t>(command - COMMANDS.begin());
     hdmi_av_state.parameters[row] = content(*command, pvParameter);
+    if (u4Command == PMX_SET_HDMI_RES_CHG)
+        board::display_part::resolution_change();
     return boardCall.answer(TRUE);
 }
 

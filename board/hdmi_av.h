@@ -13,7 +13,8 @@ namespace board::hdmi_av
 /** Plug a sink in or pull it out. */
 void plug(bool plugged);
 
-/** Let a hot-plug event want the HDMI resolution sent again, or not any more. It stays so until it is said otherwise. */
+/** Let a hot-plug event want the HDMI resolution sent again, or not any more. It stays so until it is said
+ *  otherwise. */
 void request_resolution(bool wanted);
 
 /** A resolution mode and its vertical frequency in Hz. */

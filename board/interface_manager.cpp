@@ -23,7 +23,9 @@ struct Interface
 {
     const void* table;
     void* tag;
-    unsigned held = 0; ///< queries that were not released yet
+    unsigned held = 0;    ///< queries that were not released yet
+    unsigned before = 0;  ///< the same when the operation that runs began
+    unsigned refused = 0; ///< releases that a scripted fault has answered since
 };
 
 std::map<Key, Interface> interface_manager_state;
@@ -61,6 +63,30 @@ Value state()
         interfaces.push_back(std::move(value));
     }
     return Value().add("interfaces", Value::list(std::move(interfaces)));
+}
+
+bool held(std::uint16_t component_type, std::uint16_t component_id, std::uint32_t interface_id)
+{
+    const auto found = interface_manager_state.find({ component_type, component_id, interface_id });
+    return found != interface_manager_state.end() && found->second.held != 0;
+}
+
+void operation_begins()
+{
+    for (auto& [key, interface] : interface_manager_state)
+    {
+        interface.before = interface.held;
+        interface.refused = 0;
+    }
+}
+
+void operation_ends(const std::string& operation)
+{
+    for (const auto& [key, interface] : interface_manager_state)
+    {
+        if (interface.held > interface.before + interface.refused)
+            report_misuse("i4ImQueryInterface: " + key_text(key) + " is not given back by " + operation);
+    }
 }
 
 } // namespace board::interface_manager
@@ -113,9 +139,15 @@ INT32 i4ImQueryInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void
 
 INT32 i4ImReleaseInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void* pvTag)
 {
-    BOARD_CALL_R(i4ImReleaseInterface, u2CompType, u2CompId, u4IfId, tag(pvTag));
+    BOARD_CALL_ACTING(i4ImReleaseInterface, u2CompType, u2CompId, u4IfId, tag(pvTag));
     const Key key{ u2CompType, u2CompId, u4IfId };
     const auto found = interface_manager_state.find(key);
+    if (boardCall.fault())
+    {
+        if (found != interface_manager_state.end())
+            ++found->second.refused; // its holder cannot help it
+        return boardCall.fault_answer();
+    }
     std::string wrong;
     if (found == interface_manager_state.end())
         wrong = "is not registered";

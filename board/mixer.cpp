@@ -1,15 +1,17 @@
 // The plane mixer, its scaler, colour converters, digital port and vertical-sync handling.
-#include "pmx_hal.h"
+#include "board/mixer.h"
 
 #include <algorithm>
 #include <array>
 #include <map>
 #include <optional>
+#include <stdexcept>
 #include <string>
 
 #include "board/device_values.h"
 #include "board/devices.h"
 #include "board/trace.h"
+#include "pmx_hal.h"
 
 namespace
 {
@@ -76,7 +78,8 @@ struct Mixer
     std::optional<UINT32> background;
     std::optional<Stacking> stacking;
     std::array<UINT8, PLANES> selectors = IDENTITY;
-    std::array<INT32, PLANES> plane_delay{};
+    board::mixer::PlaneDelays plane_delay{};
+    std::map<UINT32, board::mixer::PlaneDelays> arrangements; ///< by packed order
     std::array<bool, PLANES> mixed{ true, true, true, true, true, true, true, true };
     std::array<bool, SWAPS> swapped{};
     std::optional<UCHAR> video_out_converter;
@@ -120,6 +123,29 @@ void swap(UCHAR ucPmxId, Swap pair, UINT32 u4Swap)
 BOOL is_swapped(UCHAR ucPmxId, Swap pair)
 {
     return is_mixer(ucPmxId) && mixer_state.swapped[pair] ? TRUE : FALSE;
+}
+
+UINT32 packed(const UINT8* selectors)
+{
+    UINT32 order = 0;
+    for (unsigned plane = 0; plane < PLANES; ++plane)
+        order |= static_cast<UINT32>(selectors[plane]) << (4 * plane);
+    return order;
+}
+
+const board::mixer::PlaneDelays& delays_of(UINT32 order)
+{
+    const auto found = mixer_state.arrangements.find(order);
+    return found != mixer_state.arrangements.end() ? found->second : mixer_state.plane_delay;
+}
+
+Value reported(const std::map<UINT32, board::mixer::PlaneDelays>& arrangements)
+{
+    std::vector<Value> values;
+    for (const auto& [order, delay] : arrangements)
+        values.push_back(Value::record(
+            { { "order", Value::number(order, {}, Value::Base::Hex) }, { "delay", board::numbers(delay) } }));
+    return Value::list(std::move(values));
 }
 
 Value reported(const std::optional<Stacking>& stacking)
@@ -178,6 +204,34 @@ void power_on(const Description& description)
 {
     mixer_state = {};
     mixer_state.plane_delay = description.plane_delay;
+    for (const Arrangement& arrangement : description.arrangements)
+        set_arrangement(arrangement);
+}
+
+void check_order(std::uint32_t order)
+{
+    std::array<bool, PLANES> taken{};
+    for (unsigned plane = 0; plane < PLANES; ++plane)
+    {
+        const unsigned source = (order >> (4 * plane)) & 0xF;
+        if (source >= PLANES || taken[source])
+            throw std::invalid_argument("the order of an arrangement names each source 0 to 7 once, plane 1 in the "
+                                        "lowest four bits; plane " +
+                                        std::to_string(plane + 1) + " has source " + std::to_string(source) +
+                                        (source >= PLANES ? "" : ", which another one has"));
+        taken[source] = true;
+    }
+}
+
+void set_plane_delay(const PlaneDelays& delay)
+{
+    mixer_state.plane_delay = delay;
+}
+
+void set_arrangement(const Arrangement& arrangement)
+{
+    check_order(arrangement.order);
+    mixer_state.arrangements[arrangement.order] = arrangement.delay;
 }
 
 Value state()
@@ -194,6 +248,7 @@ Value state()
     value.add("stacking", reported(m.stacking));
     value.add("selectors", numbers(m.selectors));
     value.add("plane_delay", numbers(m.plane_delay));
+    value.add("arrangements", reported(m.arrangements));
     value.add("mixed", numbers(m.mixed));
     value.add("swaps", reported(m.swapped));
     value.add("converters", Value::record({ { "video_out_select", setting(m.video_out_converter) },
@@ -289,7 +344,8 @@ INT32 PMX_HalSetPlaneOrder(UCHAR ucPmxId, const UINT8* pu1PlnSel, INT32* pi4PlnD
     if (std::any_of(pu1PlnSel, pu1PlnSel + PLANES, [](UINT8 source) { return source >= PLANES; }))
         return boardCall.fail(REFUSED);
     std::copy_n(pu1PlnSel, PLANES, mixer_state.selectors.begin());
-    std::copy(mixer_state.plane_delay.begin(), mixer_state.plane_delay.end(), pi4PlnDelay);
+    const board::mixer::PlaneDelays& delays = delays_of(packed(pu1PlnSel));
+    std::copy(delays.begin(), delays.end(), pi4PlnDelay);
     return boardCall.answer(0);
 }
 

@@ -2,6 +2,7 @@
 #include <algorithm>
 #include <map>
 #include <stdexcept>
+#include <utility>
 
 #include "board/device_values.h"
 #include "board/devices.h"
@@ -30,6 +31,9 @@ struct Timers
     std::uint64_t starts = 0;
     unsigned expiries_running = 0;
     std::map<HANDLE_T, Timer> timers;
+    microseconds alarm{};
+    std::uint64_t alarm_order = 0;
+    void (*alarm_action)() = nullptr;
 };
 
 Timers timers_state;
@@ -80,13 +84,36 @@ HANDLE_T next_expiry(microseconds until)
     return next;
 }
 
+/** Whether the board's own alarm comes up to a moment, and before that timer. */
+bool alarm_is_next(microseconds until, HANDLE_T timer)
+{
+    if (timers_state.alarm_action == nullptr || timers_state.alarm > until)
+        return false;
+    if (timer == 0)
+        return true;
+    const Timer& other = timers_state.timers.at(timer);
+    return timers_state.alarm < other.expiry ||
+           (timers_state.alarm == other.expiry && timers_state.alarm_order < other.order);
+}
+
 void pass(microseconds duration)
 {
     const microseconds until = timers_state.now + duration;
-    while (const HANDLE_T handle = next_expiry(until))
+    while (true)
     {
-        timers_state.now = std::max(timers_state.now, timers_state.timers.at(handle).expiry);
-        expire(handle);
+        const HANDLE_T handle = next_expiry(until);
+        if (alarm_is_next(until, handle))
+        {
+            timers_state.now = std::max(timers_state.now, timers_state.alarm);
+            std::exchange(timers_state.alarm_action, nullptr)();
+        }
+        else if (handle != 0)
+        {
+            timers_state.now = std::max(timers_state.now, timers_state.timers.at(handle).expiry);
+            expire(handle);
+        }
+        else
+            break;
     }
     timers_state.now = std::max(timers_state.now, until);
 }
@@ -136,6 +163,18 @@ Value state()
         timers.push_back(std::move(value));
     }
     return Value::list(std::move(timers));
+}
+
+void set_alarm(std::chrono::microseconds due, void (*action)())
+{
+    timers_state.alarm = due;
+    timers_state.alarm_order = ++timers_state.starts;
+    timers_state.alarm_action = action;
+}
+
+void clear_alarm()
+{
+    timers_state.alarm_action = nullptr;
 }
 
 } // namespace timers

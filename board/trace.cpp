@@ -281,12 +281,14 @@ Operation::Operation(std::string name) : m_outermost(!recorder().operation_runni
         return;
     recorder().operation = std::move(name);
     recorder().operation_running = true;
+    interface_manager::operation_begins();
 }
 
 Operation::~Operation()
 {
     if (!m_outermost)
         return;
+    interface_manager::operation_ends(recorder().operation);
     recorder().operation.clear();
     recorder().operation_running = false;
 }

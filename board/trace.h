@@ -51,10 +51,10 @@ struct TraceEntry
         Notice  ///< the board itself: a misuse of the platform, an expiry, a plug
     };
 
-    std::uint64_t sequence = 0;  ///< counted from 1 at power-on
-    std::uint64_t time_us = 0;   ///< virtual time since power-on
+    std::uint64_t sequence = 0; ///< counted from 1 at power-on
+    std::uint64_t time_us = 0;  ///< virtual time since power-on
     Kind kind = Kind::Call;
-    std::string function;        ///< "TVE_SetEnable", "PMX_IsLog", "Assert", or a notice's kind ("misuse", "timer", …)
+    std::string function; ///< "TVE_SetEnable", "PMX_IsLog", "Assert", or a notice's kind ("misuse", "timer", …)
     std::vector<TraceArgument> arguments;
     std::optional<Value> result; ///< absent for functions without one
     bool faulted = false;        ///< a scripted fault answered
@@ -123,8 +123,8 @@ struct Fault
 {
     enum class When
     {
-        On,    ///< the n-th call from now alone
-        From,  ///< the n-th call from now and every later one
+        On,   ///< the n-th call from now alone
+        From, ///< the n-th call from now and every later one
         Always
     };
 

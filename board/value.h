@@ -16,12 +16,12 @@ class Value
 public:
     enum class Kind
     {
-        Null,    ///< a null pointer, an absent thing
-        Number,  ///< a number, with its symbolic name where it has one
+        Null,   ///< a null pointer, an absent thing
+        Number, ///< a number, with its symbolic name where it has one
         Text,
         List,
-        Record,  ///< named members in a fixed order
-        Symbol   ///< an object known by name alone: a function, a table
+        Record, ///< named members in a fixed order
+        Symbol  ///< an object known by name alone: a function, a table
     };
 
     /** How a number is printed when it has no name. */

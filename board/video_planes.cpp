@@ -10,6 +10,7 @@
 #include "board/device_values.h"
 #include "board/devices.h"
 #include "board/trace.h"
+#include "drv_pmx.h"
 
 namespace
 {
@@ -109,6 +110,14 @@ void set_hw_enable(unsigned plane, VDP_ENABLE_T enable)
 void set_waiting_for_sync(bool waiting)
 {
     video_planes_state.waiting_for_sync = waiting;
+}
+
+void release_graphics()
+{
+    const trace::Operation scope("PMX_SetOsdEnable");
+    trace::notice("video_plane", "has its sync control");
+    video_planes_state.waiting_for_sync = false;
+    PMX_SetOsdEnable();
 }
 
 } // namespace board::video_planes

@@ -19,7 +19,8 @@ class Board : public DeviceTest
 TEST_F(Board, State_HasEveryDeviceInOrder)
 {
     EXPECT_EQ((std::vector<std::string>{ "os", "console", "flash", "registers", "interface_manager", "power", "mixer",
-                                         "tv_encoder", "video_planes", "osd_planes", "hdmi_av", "display_control" }),
+                                         "tv_encoder", "video_planes", "osd_planes", "sources", "hdmi_av",
+                                         "display_part", "display_control" }),
               board::state().keys());
 }
 

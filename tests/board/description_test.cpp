@@ -66,6 +66,9 @@ TEST_F(BoardFile, Empty_IsABareBoardOfTheDirectorysName)
     EXPECT_EQ(1, description.console_level);
     EXPECT_TRUE(description.flash.empty());
     EXPECT_TRUE(description.sink_plugged);
+    EXPECT_FALSE(description.resolution_requested);
+    EXPECT_FALSE(description.valid_resolution.has_value());
+    EXPECT_EQ("off", board::display_part::to_text(description.display_part));
     EXPECT_EQ((std::array<std::int32_t, 8>{}), description.plane_delay);
     EXPECT_TRUE(description.faults.empty());
 }
@@ -78,8 +81,18 @@ console.level = 9
 flash = { boot = "images/boot.bin", "a name with blanks" = "board.toml" }
 [hdmi]
 plugged = false
+request_resolution = true
+valid = { resolution = "RES_720P50HZ", frequency = 50 }
+[display_part]
+answer = "1500ms"
 [mixer]
 plane_delay = [1, -2, 3, 4, 5, 6, 7, 2147483647]
+[[mixer.arrangement]]
+order = 0x01234567
+delay = [8, 7, 6, 5, 4, 3, 2, -1]
+[[mixer.arrangement]]
+order = 0x76543201
+delay = [0, 0, 0, 0, 0, 0, 0, 1]
 [[fault]]
 function = "x_timer_create"
 answer = -1
@@ -99,7 +112,17 @@ always = true
     EXPECT_EQ("a player", description.name);
     EXPECT_EQ(9, description.console_level);
     EXPECT_FALSE(description.sink_plugged);
+    EXPECT_TRUE(description.resolution_requested);
+    ASSERT_TRUE(description.valid_resolution.has_value());
+    EXPECT_EQ(9u, description.valid_resolution->mode);
+    EXPECT_EQ(50u, description.valid_resolution->frequency);
+    EXPECT_EQ("1500ms", board::display_part::to_text(description.display_part));
     EXPECT_EQ((std::array<std::int32_t, 8>{ 1, -2, 3, 4, 5, 6, 7, 2147483647 }), description.plane_delay);
+    ASSERT_EQ(2u, description.arrangements.size());
+    EXPECT_EQ(0x01234567u, description.arrangements[0].order);
+    EXPECT_EQ((std::array<std::int32_t, 8>{ 8, 7, 6, 5, 4, 3, 2, -1 }), description.arrangements[0].delay);
+    EXPECT_EQ(0x76543201u, description.arrangements[1].order);
+    EXPECT_EQ((std::array<std::int32_t, 8>{ 0, 0, 0, 0, 0, 0, 0, 1 }), description.arrangements[1].delay);
     const std::map<std::string, std::filesystem::path> flash = { { "boot", m_directory / "player" / "images/boot.bin" },
                                                                  { "a name with blanks", file() } };
     EXPECT_EQ(flash, description.flash);
@@ -158,7 +181,8 @@ TEST_F(BoardFile, UnknownKeys_AreNamedWithFileLineAndTheNearestValidOne)
     EXPECT_EQ("/player/board.toml:1: no such key: nam; did you mean name?", wrong("nam = \"x\"\n"));
     EXPECT_EQ("/player/board.toml:3: no such key in [hdmi]: pluged; did you mean plugged?",
               wrong("\n[hdmi]\npluged = true\n"));
-    EXPECT_EQ("/player/board.toml:2: no such key in [mixer]: x; there are: plane_delay", wrong("[mixer]\nx = 1\n"));
+    EXPECT_EQ("/player/board.toml:2: no such key in [mixer]: x; there are: plane_delay, arrangement",
+              wrong("[mixer]\nx = 1\n"));
     EXPECT_EQ("/player/board.toml:2: no such key in [console]: lvl; did you mean level?",
               wrong("[console]\nlvl = 1\n"));
     EXPECT_EQ("/player/board.toml:2: no such key in [[fault]]: allways; did you mean always?",
@@ -177,6 +201,20 @@ TEST_F(BoardFile, WrongTypesAndRanges)
         { "flash = \"x\"\n", "flash has to be a table: [flash]" },
         { "flash.boot = 1\n", "the image of flash partition boot has to be a text, and not an empty one" },
         { "hdmi.plugged = 1\n", "plugged of hdmi has to be true or false" },
+        { "hdmi.request_resolution = 1\n", "request_resolution of hdmi has to be true or false" },
+        { "hdmi.valid = 1\n", "valid has to be a table: [valid]" },
+        { "hdmi.valid = { resolution = \"RES_480P\" }\n", "valid of hdmi needs resolution and frequency" },
+        { "hdmi.valid = { frequency = 60 }\n", "valid of hdmi needs resolution and frequency" },
+        { "hdmi.valid = { resolution = 2, frequency = 60 }\n",
+          "resolution of valid has to be a text, and not an empty one" },
+        { "hdmi.valid = { resolution = \"RES_480P\", frequency = 65536 }\n",
+          "frequency of valid has to be 0 to 65535" },
+        { "hdmi.valid = { resolution = \"RES_480PP\", frequency = 60 }\n",
+          "no resolution mode is called RES_480PP; did you mean RES_480P, RES_480I?" },
+        { "display_part.answer = 3\n", "answer of display_part has to be a text, and not an empty one" },
+        { "display_part.answer = \"3\"\n",
+          "the display part's answer is off, never, or the time it takes: 3s, 500ms or 2us" },
+        { "display_part.answer = \"31622401s\"\n", "the time in s is 0 to 31622400, not 31622401" },
         { "mixer.plane_delay = 1\n", "plane_delay has to be a list of 8 numbers, plane 1 first" },
         { "mixer.plane_delay = [1, 2]\n", "plane_delay has to be a list of 8 numbers, plane 1 first" },
         { "mixer.plane_delay = [1, 2, 3, 4, 5, 6, 7, 2147483648]\n",
@@ -189,6 +227,43 @@ TEST_F(BoardFile, WrongTypesAndRanges)
     };
     for (const auto& [text, what] : files)
         EXPECT_EQ(std::string("/player/board.toml:1: ") + what, wrong(text)) << text;
+}
+
+TEST_F(BoardFile, ValidResolution_IsAResolutionMode_NotWhateverElseHasAName)
+{
+    const std::string message = wrong("hdmi.valid = { resolution = \"IID_IVdp\", frequency = 60 }\n");
+    EXPECT_TRUE(
+        message.starts_with("/player/board.toml:1: no resolution mode is called IID_IVdp; there are: RES_480I, "))
+        << message;
+    EXPECT_EQ(std::string::npos, message.find("ASP_")) << message;
+}
+
+TEST_F(BoardFile, ArrangementsThatCannotBe)
+{
+    const auto arrangement = [this](const std::string& order) {
+        return wrong("[[mixer.arrangement]]\ndelay = [1, 2, 3, 4, 5, 6, 7, 8]\norder = " + order + "\n");
+    };
+    const std::string rule = "/player/board.toml:3: the order of an arrangement names each source 0 to 7 once, plane 1 "
+                             "in the lowest four bits; ";
+    EXPECT_EQ("nothing", arrangement("0x76543210"));
+    EXPECT_EQ(rule + "plane 2 has source 1, which another one has", arrangement("0x76543211"));
+    EXPECT_EQ(rule + "plane 8 has source 15", arrangement("0xF6543210"));
+    EXPECT_EQ("/player/board.toml:3: order of an arrangement has to be 0 to 4294967295", arrangement("0x100000000"));
+    EXPECT_EQ("/player/board.toml:3: order of an arrangement has to be a whole number", arrangement("\"0\""));
+    EXPECT_EQ("/player/board.toml:1: arrangement has to be a list of tables: [[mixer.arrangement]]",
+              wrong("mixer.arrangement = 1\n"));
+    EXPECT_EQ("/player/board.toml:1: an arrangement has to be a table: [[mixer.arrangement]]",
+              wrong("mixer.arrangement = [1]\n"));
+    EXPECT_EQ("/player/board.toml:1: an arrangement needs order and delay",
+              wrong("[[mixer.arrangement]]\norder = 0x76543210\n"));
+    EXPECT_EQ("/player/board.toml:1: an arrangement needs order and delay",
+              wrong("[[mixer.arrangement]]\ndelay = [1, 2, 3, 4, 5, 6, 7, 8]\n"));
+    EXPECT_EQ("/player/board.toml:2: no such key in [[mixer.arrangement]]: oder; did you mean order?",
+              wrong("[[mixer.arrangement]]\noder = 1\n"));
+    EXPECT_EQ("/player/board.toml:3: delay of an arrangement has to be a list of 8 numbers, plane 1 first",
+              wrong("[[mixer.arrangement]]\norder = 0x76543210\ndelay = [1]\n"));
+    const std::string one = "[[mixer.arrangement]]\norder = 0x76543210\ndelay = [1, 2, 3, 4, 5, 6, 7, 8]\n";
+    EXPECT_EQ("/player/board.toml:5: this arrangement stands here twice", wrong(one + one));
 }
 
 TEST_F(BoardFile, FaultsThatCannotBeScripted)

@@ -1,5 +1,6 @@
 /** @file
- *  What the tests of the board's devices share: a board that was just powered on, the last call's line, members of a state. */
+ *  What the tests of the board's devices share: a board that was just powered on, the last call's line, members of a
+ *  state. */
 #pragma once
 
 #include <gtest/gtest.h>

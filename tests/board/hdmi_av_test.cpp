@@ -69,6 +69,22 @@ TEST_F(HdmiAv, PowerOn_TheSinkIsAsTheBoardSays)
     EXPECT_EQ(1, i4GetHotPlugStatus());
 }
 
+TEST_F(HdmiAv, PowerOn_RequestAndChoiceAreAsTheBoardSays)
+{
+    board::Description description;
+    description.resolution_requested = true;
+    description.valid_resolution = board::hdmi_av::Resolution{ RES_720P50HZ, 50 };
+    power_on(description);
+    EXPECT_EQ(TRUE, fgIsHotPlugChgRes());
+    EXPECT_EQ("{mode=RES_720P50HZ, frequency=50}", now("chosen_resolution"));
+    PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T query{ RES_1080P60HZ, 60, 0, 0 };
+    EXPECT_EQ(TRUE, fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, &query));
+    EXPECT_EQ(UINT32{ RES_720P50HZ }, query.u4ValidAutoRes);
+    EXPECT_EQ(50u, query.u2ValidAutoVfreq);
+    power_on({});
+    EXPECT_EQ(AS_NEW, board::hdmi_av::state().to_text());
+}
+
 TEST_F(HdmiAv, PowerOn_ForgetsEverything)
 {
     UINT8 value = 1;
@@ -182,6 +198,21 @@ TEST_F(HdmiAv, SetAvd_ResolutionCommands_EachKeepTheirOwnRecordByField)
         EXPECT_EQ(expected, now("commands"));
     }
     EXPECT_EQ("CCIR_YC422_16BIT", now("commands.PMX_SET_CCIR_RES_CHG.eCcirDrvInfo.eDgiFmt"));
+}
+
+TEST_F(HdmiAv, SetAvd_TheHdmiResolutionAlone_ReachesTheDisplayPart)
+{
+    auto record = some_resolution();
+    const auto changes = [] { return member(board::display_part::state(), "resolution_changes"); };
+    fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, &record, 1);
+    fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, &record, 1);
+    fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, nullptr, 1);
+    EXPECT_EQ("0", changes());
+    fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, &record, 1);
+    EXPECT_EQ("1", changes());
+    answer_always("fgPmxDrvSetAvd", 0);
+    fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, &record, 1);
+    EXPECT_EQ("1", changes()) << "a command that the driver refuses goes nowhere";
 }
 
 TEST_F(HdmiAv, SetAvd_CommandThatDoesNotExist_IsRefused)

@@ -99,6 +99,69 @@ TEST_F(InterfaceManager, WithdrawnWhileHeld_IsReported)
     EXPECT_EQ("{interfaces=[]}", now());
 }
 
+TEST_F(InterfaceManager, NotGivenBack_IsReportedWhenTheOutermostOperationEnds)
+{
+    publish();
+    {
+        const board::trace::Operation outer("PMX_OsdEnabled");
+        {
+            const board::trace::Operation inner("PMX_InformVdpColorSpace");
+            query();
+        }
+        EXPECT_EQ(0u, board::misuses()) << "only the outermost operation counts";
+    }
+    EXPECT_EQ("NOTICE misuse \"i4ImQueryInterface: PMX_COMP_TYPE_VDP 1 IID_IVdp is not given back by PMX_OsdEnabled\"",
+              last_call());
+    EXPECT_EQ("PMX_OsdEnabled", board::trace::entries().back().operation);
+    EXPECT_EQ(1u, board::misuses());
+    {
+        const board::trace::Operation next("PMX_OsdDisabled");
+        query();
+        release(7);
+    }
+    EXPECT_EQ(1u, board::misuses()) << "it is not blamed on another operation";
+}
+
+TEST_F(InterfaceManager, GivenBack_OrHeldFromBefore_IsNotReported)
+{
+    publish();
+    query(); // its holder has it across operations
+    {
+        const board::trace::Operation scope("PMX_OsdEnabled");
+        query();
+        release(7);
+    }
+    {
+        const board::trace::Operation scope("PMX_OsdEnabled");
+        release(7);
+    }
+    {
+        const board::trace::Operation scope("PMX_OsdEnabled");
+        query();
+        board::faults::set({ "i4ImReleaseInterface", -1, board::Fault::When::On, 1 });
+        release(7); // a fault answered: that is not the holder's
+    }
+    EXPECT_EQ(0u, board::misuses());
+    EXPECT_EQ("1", member(board::interface_manager::state(), "interfaces[0].held"));
+    {
+        const board::trace::Operation scope("PMX_OsdEnabled");
+        query();
+    }
+    EXPECT_EQ(1u, board::misuses()) << "that fault excuses nobody later";
+}
+
+TEST_F(InterfaceManager, GivenBackWithAnotherTag_IsNotGivenBack)
+{
+    publish();
+    {
+        const board::trace::Operation scope("PMX_OsdEnabled");
+        query();
+        release(8);
+        EXPECT_EQ(1u, board::misuses());
+    }
+    EXPECT_EQ(2u, board::misuses());
+}
+
 TEST_F(InterfaceManager, NullPointers_AreReported)
 {
     EXPECT_EQ(-1, i4ImRegisterInterface2(1, 2, 3, nullptr, nullptr));

@@ -1,15 +1,17 @@
-#include "pmx_hal.h"
+#include "board/mixer.h"
 
+#include <stdexcept>
 #include <string>
 
 #include "device_test.h"
+#include "pmx_hal.h"
 
 namespace
 {
 
 constexpr const char* AS_NEW =
     "{mode=null, scaler_mode=null, resets=0, scaler_resets=0, tv_type=null, clocks=[1, 1, 1], background=null, "
-    "stacking=null, selectors=[0, 1, 2, 3, 4, 5, 6, 7], plane_delay=[0, 0, 0, 0, 0, 0, 0, 0], "
+    "stacking=null, selectors=[0, 1, 2, 3, 4, 5, 6, 7], plane_delay=[0, 0, 0, 0, 0, 0, 0, 0], arrangements=[], "
     "mixed=[1, 1, 1, 1, 1, 1, 1, 1], "
     "swaps={plane_1_2=0, plane_3_4=0, plane_6_7=0, plane_4_7=0, plane_1_3=0, plane_5_8=0}, "
     "converters={video_out_select=null, scaler_select=null, cc_a=null, scaler_709_601=null}, active_zone=null, "
@@ -86,7 +88,7 @@ TEST_F(Mixer, PowerOn_ForgetsEverything)
     PMX_VsyncEnable();
     EXPECT_EQ("{mode=RES_1080P60HZ, scaler_mode=RES_1080P60HZ, resets=1, scaler_resets=1, tv_type=PMX_TV_TYPE_PAL, "
               "clocks=[0, 1, 1], background=0x108080, stacking={number=8, order=[7, 6, 5, 4, 3, 2, 1, 0]}, "
-              "selectors=[1, 2, 3, 4, 5, 6, 7, 0], plane_delay=[0, 0, 0, 0, 0, 0, 0, 0], "
+              "selectors=[1, 2, 3, 4, 5, 6, 7, 0], plane_delay=[0, 0, 0, 0, 0, 0, 0, 0], arrangements=[], "
               "mixed=[1, 1, 0, 1, 1, 1, 1, 1], "
               "swaps={plane_1_2=1, plane_3_4=1, plane_6_7=1, plane_4_7=1, plane_1_3=1, plane_5_8=1}, "
               "converters={video_out_select=1, scaler_select=0, cc_a={enable=1, direction=1}, "
@@ -243,6 +245,65 @@ TEST_F(Mixer, SetPlaneOrder_StoresSelectorsAndReportsTheDelaysOfTheBoard)
     EXPECT_EQ("PMX_HalGetPlaneOrder(0, [1, 2, 3, 4, 5, 6, 7, 0]) = 0", last_call());
     for (unsigned plane = 0; plane < 8; ++plane)
         EXPECT_EQ(ROTATED[plane], selectors[plane]) << plane;
+}
+
+/** The delays that the hardware reports for an order, plane 1 first. */
+std::string delays_reported(const UINT8* selectors)
+{
+    INT32 delays[8] = {};
+    EXPECT_EQ(0, PMX_HalSetPlaneOrder(0, selectors, delays));
+    std::string text;
+    for (const INT32 delay : delays)
+        text += std::to_string(delay) + " ";
+    return text;
+}
+
+TEST_F(Mixer, SetPlaneOrder_AnArrangementOfItsOwn_HasItsOwnDelays)
+{
+    const UINT8 unchanged[8] = { 0, 1, 2, 3, 4, 5, 6, 7 };
+    board::Description description;
+    description.plane_delay = { 1, 1, 1, 1, 1, 1, 1, 1 };
+    description.arrangements = { { 0x07654321, { 8, 7, 6, 5, 4, 3, 2, -2147483647 - 1 } } };
+    power_on(description);
+    EXPECT_EQ("[{order=0x7654321, delay=[8, 7, 6, 5, 4, 3, 2, -2147483648]}]", now("arrangements"));
+    EXPECT_EQ("8 7 6 5 4 3 2 -2147483648 ", delays_reported(ROTATED));
+    EXPECT_EQ("1 1 1 1 1 1 1 1 ", delays_reported(unchanged));
+    power_on({});
+    EXPECT_EQ("0 0 0 0 0 0 0 0 ", delays_reported(ROTATED)) << "forgotten";
+}
+
+TEST_F(Mixer, Delays_CanBeChangedLater)
+{
+    const UINT8 unchanged[8] = { 0, 1, 2, 3, 4, 5, 6, 7 };
+    board::mixer::set_plane_delay({ 1, 2, 3, 4, 5, 6, 7, 8 });
+    EXPECT_EQ("1 2 3 4 5 6 7 8 ", delays_reported(ROTATED));
+    board::mixer::set_arrangement({ 0x07654321, { 9, 9, 9, 9, 9, 9, 9, 9 } });
+    EXPECT_EQ("9 9 9 9 9 9 9 9 ", delays_reported(ROTATED));
+    board::mixer::set_arrangement({ 0x07654321, { -1, 9, 9, 9, 9, 9, 9, 9 } });
+    EXPECT_EQ("-1 9 9 9 9 9 9 9 ", delays_reported(ROTATED));
+    EXPECT_EQ("1 2 3 4 5 6 7 8 ", delays_reported(unchanged));
+    EXPECT_EQ("[1, 2, 3, 4, 5, 6, 7, 8]", now("plane_delay"));
+}
+
+TEST_F(Mixer, Arrangement_ThatIsNoPermutation_IsRefused)
+{
+    for (const UINT32 order : { 0u, 0x76543211u, 0x86543210u, 0xF6543210u, 0x77654321u })
+    {
+        EXPECT_THROW(board::mixer::check_order(order), std::invalid_argument) << order;
+        EXPECT_THROW(board::mixer::set_arrangement({ order, {} }), std::invalid_argument) << order;
+    }
+    EXPECT_NO_THROW(board::mixer::check_order(0x76543210));
+    EXPECT_NO_THROW(board::mixer::check_order(0x01234567));
+    EXPECT_EQ("[]", now("arrangements"));
+}
+
+TEST_F(Mixer, PowerOn_WithAnArrangementThatCannotBe_LeavesTheBoardAsItWas)
+{
+    PMX_HalSetMode(0, 12);
+    board::Description description;
+    description.arrangements = { { 0, {} } };
+    EXPECT_THROW(board::power_on(description), std::invalid_argument);
+    EXPECT_EQ("RES_1080P60HZ", now("mode"));
 }
 
 void expect_refused(UCHAR mixer, const UINT8* selectors)

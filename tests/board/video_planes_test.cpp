@@ -3,6 +3,7 @@
 #include <stdexcept>
 
 #include "device_test.h"
+#include "drv_pmx.h"
 
 namespace
 {
@@ -148,6 +149,36 @@ TEST_F(VideoPlanes, IsWaitforSyncCtrl_AnswersWhatWasSetFromOutside)
     board::video_planes::set_waiting_for_sync(false);
     EXPECT_EQ(FALSE, fgVdpIsWaitforSyncCtrl());
     EXPECT_EQ("0", now("waiting_for_sync"));
+}
+
+std::vector<std::string> trace_lines()
+{
+    std::vector<std::string> lines;
+    for (const board::TraceEntry& entry : board::trace::entries())
+        lines.push_back(entry.brief());
+    return lines;
+}
+
+TEST_F(VideoPlanes, ReleaseGraphics_EndsTheWaitAndTellsTheMixer)
+{
+    board::video_planes::set_waiting_for_sync(true);
+    PMX_SetFormatChangeFlag(FALSE);
+    EXPECT_EQ("fgVdpIsWaitforSyncCtrl() = 1", last_call());
+    board::trace::clear();
+    board::video_planes::release_graphics();
+    EXPECT_EQ((std::vector<std::string>{ "NOTICE video_plane \"has its sync control\"", "LOG0 \"PMX_SetOsdEnable.\\n\"",
+                                         "vPmxMixPlane(0, DRV_PMX_PLANE_3)", "vPmxMixPlane(0, DRV_PMX_PLANE_4)",
+                                         "vPmxMixPlane(0, DRV_PMX_PLANE_5)", "vPmxMixPlane(0, DRV_PMX_PLANE_6)",
+                                         "vPmxMixPlane(0, DRV_PMX_PLANE_7)", "LOG0 \"Set Osd Enable :0.\\n\"" }),
+              trace_lines());
+    EXPECT_EQ("PMX_SetOsdEnable", board::trace::entries().back().operation);
+    EXPECT_EQ("0", now("waiting_for_sync"));
+}
+
+TEST_F(VideoPlanes, ReleaseGraphics_OfADriverThatDidNotWait_TellsTheMixerAllTheSame)
+{
+    board::video_planes::release_graphics();
+    EXPECT_EQ("LOG0 \"PMX_SetOsdEnable.\\n\"", last_call());
 }
 
 TEST_F(VideoPlanes, Fault_AnswersInsteadOfTheDriver)

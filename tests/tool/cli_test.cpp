@@ -181,8 +181,8 @@ TEST_F(CommandLine, TraceFile_HoldsTheJsonLines)
 
 TEST_F(CommandLine, Colour_OnATerminalAlone)
 {
-    if (std::system("command -v script >/dev/null") != 0)
-        GTEST_SKIP() << "script(1) makes the terminal";
+    if (std::system("script -qec true /dev/null >/dev/null 2>&1 </dev/null") != 0)
+        GTEST_SKIP() << "script(1) cannot make a terminal here";
     const auto on_terminal = [&](const std::string& environment) {
         const std::string command = "cd '" PMX_SOURCE_DIR "' && script -qec \"" + environment + " '" + program() +
                                     "' run scenarios/master-enable.pmx\" /dev/null >'" + file("out") +

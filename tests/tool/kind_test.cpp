@@ -122,6 +122,7 @@ TEST(Kind, Record_ByFieldOrInOrder_TheRestIsZero)
     const char* const whole = "{fgOutputEnable=1, eResMode=RES_576P, u4VFreq=0, eCcirDrvInfo={eDgoMode=CCIR_INVALID, "
                               "eDgoFmt=CCIR_NON_USED, eDgiMode=CCIR_INVALID, eDgiFmt=CCIR_NON_USED}}";
     EXPECT_EQ(whole, pmxboard::read_value(output, "{1, RES_576P}", "arg").to_text());
+    EXPECT_EQ(whole, pmxboard::read_value(output, "[1, RES_576P]", "arg").to_text());
     EXPECT_EQ(whole, pmxboard::read_value(output, "{eResMode=3, fgOutputEnable = TRUE}", "arg").to_text());
 }
 
@@ -143,7 +144,9 @@ TEST(Kind, Record_WhatDoesNotFit_IsRefused)
     EXPECT_EQ("arg.eResMode is given twice", reason(output, "{1, 2, eResMode=3}"));
     EXPECT_EQ("arg has 4 fields, and there are more values", reason(output, "{1, 2, 3, {}, 5}"));
     EXPECT_EQ("arg.fgOutputEnable takes 0 to 255, not 256", reason(output, "{256}"));
-    EXPECT_EQ("arg takes a record {field=value, …}, not [1]", reason(output, "[1]"));
+    EXPECT_EQ("arg takes a record {field=value, …} or [value, …], not 1", reason(output, "1"));
+    EXPECT_EQ("arg takes a record {field=value, …} or [value, …], not {1]", reason(output, "{1]"));
+    EXPECT_EQ("arg has 4 fields, and there are more values", reason(output, "[1, 2, 3, {}, 5]"));
 }
 
 } // namespace

@@ -27,8 +27,8 @@ std::string line_of(const DeclaredFunction& function)
     std::string line = function.name + "(";
     for (const auto& [type, name] : function.parameters)
     {
-        const bool is_output =
-            type.find('*') != type.npos && type.find("const") == type.npos && !type.starts_with("void");
+        const bool is_output = type.find('*') != type.npos && type.find("const") == type.npos &&
+                               !type.starts_with("void") && !type.starts_with("PMX_RESOLUTION_T");
         line += std::string(line.back() == '(' ? "" : ", ") + (is_output ? "out " : "") + name;
     }
     return line + ")";
@@ -47,7 +47,7 @@ TEST(Operations, EveryFunctionOfTheHeader_StandsInTheTable)
 {
     const auto declared = tool_test::declarations(tool_test::project_file("src/driver/private_inc/drv_pmx.h"),
                                                   R"(PMX_API\s+([\w ]+?)\s+(\w+)\(([^)]*)\))");
-    ASSERT_GE(declared.size(), 34u);
+    ASSERT_EQ(126u, declared.size());
     EXPECT_EQ(lines_of(declared), lines_of(pmxboard::operations()));
 }
 
@@ -177,6 +177,102 @@ TEST(Operations, Output_WrittenNull_IsANullPointer)
     EXPECT_TRUE(seen_null);
     ASSERT_EQ(1u, outcome.outputs.size());
     EXPECT_EQ("pu4Great", outcome.outputs[0].name);
+}
+
+UINT32 fill(UCHAR, UCHAR* answer, UCHAR mode)
+{
+    *answer = mode;
+    return 1;
+}
+
+TEST(Operations, OutputThatTheFunctionDoesNotTest_TakesNoNull)
+{
+    const auto operation = pmxboard::operation<fill>("fill", { "ucPmxId", pmxboard::never_null("puc"), "ucSwap" });
+    EXPECT_EQ("4", call(operation, { "0", "4" }).outputs[0].value->to_text());
+    EXPECT_EQ("puc may not be null: fill does not test it", reason(operation, { "0", "null", "4" }));
+}
+
+/** The outputs of the layer that its functions do not test for null. */
+TEST(Operations, OfTheLayer_TheseOutputsTakeNoNull)
+{
+    Lines found;
+    for (const Operation& operation : pmxboard::operations())
+    {
+        for (const auto& parameter : operation.parameters)
+        {
+            if (parameter.is_output && !parameter.may_be_null)
+                found.push_back(operation.name + " " + parameter.name);
+        }
+    }
+    EXPECT_EQ((Lines{ "PMX_ChkSupportedRes ucSupportedAutoRes", "PMX_ChkSupportedRes ucSupportedAutoVsyncFreg",
+                      "d_PMX_GetOrderVdpComp0 pu4OnTop", "PMX_GetArbPlaneOrder pu4PlaneOrder",
+                      "PMX_GetSwapEnable pucEnable" }),
+              found);
+}
+
+/** The header says of each output whether it is tested. */
+TEST(Operations, OutputsTakeNoNull_ExactlyWhereTheHeaderSaysSo)
+{
+    const std::string header = tool_test::project_file("src/driver/private_inc/drv_pmx.h");
+    const std::regex contract(R"(/\*\*((?:[^*]|\*(?!/))*)\*/\s*PMX_API\s+[\w ]+?\s+(\w+)\()");
+    unsigned contracts = 0;
+    for (std::sregex_iterator it(header.begin(), header.end(), contract), end; it != end; ++it, ++contracts)
+    {
+        const Operation* const operation = pmxboard::find(pmxboard::operations(), (*it)[2].str());
+        ASSERT_NE(nullptr, operation) << (*it)[2];
+        const std::string text = (*it)[1];
+        for (const auto& parameter : operation->parameters)
+        {
+            const std::size_t at = text.find("@param " + parameter.name + " ");
+            if (!parameter.is_output)
+                continue;
+            ASSERT_NE(std::string::npos, at) << operation->name << ' ' << parameter.name;
+            const std::string described = text.substr(at, text.find('@', at + 1) - at);
+            EXPECT_EQ(parameter.may_be_null, described.find("not tested for null") == described.npos)
+                << operation->name << ' ' << parameter.name;
+        }
+    }
+    EXPECT_EQ(126u, contracts);
+}
+
+TEST(Operations, OfTheLayer_NamesGoByArgument)
+{
+    const struct
+    {
+        const char* operation;
+        std::size_t parameter;
+        const char* name;
+    } named[] = {
+        { "PMX_SetMode", 1, "RES_1080P60HZ" },
+        { "PMX_CheckCap", 1, "RES_2160P_4096" },
+        { "PMX_ColorSpaceSetup", 0, "DRV_PMX_CS_YCBCR_709" },
+        { "PMX_ColorSpaceSetup", 1, "RES_576I" },
+        { "PMX_SetModeEx", 3, "DRV_RX_BYPASS_TX" },
+        { "PMX_ChkSupportedRes", 1, "RES_AUTO" },
+        { "PMX_SetActiveZone", 1, "RES_480P" },
+        { "PMX_OsdEnabled", 4, "DRV_GFX_COLOR_MODE_RGB" },
+        { "i4Pmx_Connect", 2, "PMX_COMP_TYPE_OSD" },
+        { "u4PmxCompId2LocalId", 0, "PMX_COMP_TYPE_VDP" },
+        { "PMX_SetAspectRatio", 1, "ASP_16_9" },
+        { "PMX_SetAspectRatioEx", 1, "ASP_4_3_LB" },
+        { "PMX_SetDigestAspectRatioEx", 1, "ASP_16_9_PAN_SCAN" },
+        { "PMX_SetDigitalOutRgb", 1, "PLA_MXR_DIGITAL_OUTPUT_FMT_FULL_RGB" },
+        { "PMX_GetDigitalOutRgb", 1, "PLA_MXR_DIGITAL_OUTPUT_FMT_XVYCC" },
+        { "PMX_SetExternalChipSetting", 0, "PLA_MXR_EXT_GAMMA" },
+        { "PMX_SetClosedCaptionOnOff", 1, "PLA_MXR_CLOSED_CAPTION_ON" },
+    };
+    for (const auto& row : named)
+    {
+        const Operation* const operation = pmxboard::find(pmxboard::operations(), row.operation);
+        ASSERT_NE(nullptr, operation) << row.operation;
+        const auto& kind = operation->parameters.at(row.parameter).kind;
+        EXPECT_EQ(row.name, pmxboard::read_value(kind, row.name, "it").to_text()) << row.operation;
+    }
+    for (const char* const name : { "PMX_GetAspectRatio", "PMX_GetNormalAspectRatio", "PMX_GetAspectRatioMW" })
+        EXPECT_EQ(board::names::Family::Aspect,
+                  pmxboard::find(pmxboard::operations(), name)->parameters[1].kind.family);
+    EXPECT_EQ(board::names::Family::Aspect,
+              pmxboard::find(pmxboard::operations(), "PMX_SetAspectRatioNext")->result_family);
 }
 
 TEST(Operations, ArgumentsTooFewOrTooMany_AreRefused)

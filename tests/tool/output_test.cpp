@@ -1,5 +1,9 @@
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <sstream>
+#include <string>
+
 #include <nlohmann/json.hpp>
 
 #include "scenario_run.h"
@@ -42,6 +46,23 @@ TEST(Output, ForPeople_CommandCallsConsoleResult)
         run("PMX_SetTvType 0 PMX_TV_TYPE_PAL   # Europe\nPMX_GetTvType 0\nPMX_GetTvType 1\nadvance 1500us\nPMX_Stop\n"
             "loglevel 0\nPMX_Stop\n")
             .shown);
+}
+
+TEST(Output, CallTooLongForTheScreen_IsBrokenBehindCommas)
+{
+    EXPECT_EQ("> PMX_ChkSupportedRes 0 RES_1080P60HZ 60\n"
+              "        0.000  fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ,\n"
+              "                   {u4ResCheck=RES_1080P60HZ, u2VsyncFreq=60,\n"
+              "                   u4ValidAutoRes=RES_1080P60HZ, u2ValidAutoVfreq=60}) = 1\n"
+              "  = 1\n"
+              "  *ucSupportedAutoRes = RES_1080P60HZ\n"
+              "  *ucSupportedAutoVsyncFreg = 60\n",
+              run("PMX_ChkSupportedRes 0 RES_1080P60HZ 60").shown);
+    const auto apart = run("PMX_ChkSupportedRes 0 RES_1080P60HZ 60", {}, true);
+    EXPECT_EQ(1, std::count(apart.trace.begin(), apart.trace.end(), '\n')) << "a file has one line a call";
+    std::istringstream lines(run("PMX_Init\nPMX_SetModeEx 0 [ [1, RES_480P], [0], [0], [0] ] 60 0 0").shown);
+    for (std::string line; std::getline(lines, line);)
+        EXPECT_GE(81u, line.size()) << line;
 }
 
 TEST(Output, Verbose_ShowsArgumentNamesAndExpectations)

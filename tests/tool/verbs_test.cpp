@@ -1,11 +1,15 @@
 #include <gtest/gtest.h>
 
+#include <cstdint>
+#include <cstring>
 #include <filesystem>
 
 #include "board/board.h"
+#include "drv_if.h"
 #include "drv_if_pmx.h"
 #include "scenario_run.h"
 #include "tools/pmxboard/session.h"
+#include "tools/pmxboard/step_error.h"
 
 namespace
 {
@@ -172,13 +176,58 @@ TEST(Verbs, Ipmx_WithoutATable_Fails)
               diagnostics("fault i4ImQueryInterface 0\nipmx pi4GetMode tag"));
 }
 
+/* A mixer of another make that left slots out. */
+
+INT32 answer_mode(void* tag, UCHAR* mode)
+{
+    *mode = static_cast<UCHAR>(reinterpret_cast<std::uintptr_t>(tag));
+    return 7;
+}
+
+constexpr IPMX partial_table = [] {
+    IPMX table{};
+    table.pi4GetMode = answer_mode;
+    return table;
+}();
+
+std::string failure(pmxboard::Session& session, const char* line)
+{
+    try
+    {
+        session.run_line(line);
+    }
+    catch (const pmxboard::StepFailed& error)
+    {
+        return error.what();
+    }
+    return "done";
+}
+
 TEST(Verbs, Ipmx_NullSlot_FailsWithItsName)
 {
-    if (_rPMXIF.pi4SetMode != nullptr)
-        GTEST_SKIP() << "every slot is live";
-    EXPECT_EQ("here.pmx:2: the slot pi4SetMode of the registered table is null\nrepeat: pmxboard run here.pmx\n",
-              diagnostics("PMX_Init\nipmx pi4SetMode tag RES_480P 60 0"));
+    pmxboard::Output output({ .quiet = true });
+    pmxboard::Session session(output, "default", ".");
+    session.run_line("power-on");
+    UINT32 number = RES_576P;
+    void* tag = nullptr;
+    std::memcpy(&tag, &number, sizeof number);
+    ASSERT_EQ(0, i4ImRegisterInterface2(PMX_COMP_TYPE_PMX, 0, IID_IPMX, &partial_table, tag));
+
+    EXPECT_EQ("done", failure(session, "ipmx pi4GetMode tag"));
+    EXPECT_EQ("7", session.last_outcome().result->to_text());
+    EXPECT_EQ("RES_576P", session.last_outcome().outputs.at(0).value->to_text());
+    EXPECT_EQ("the slot pi4SetMode of the registered table is null",
+              failure(session, "ipmx pi4SetMode tag RES_480P 60 0"));
+    EXPECT_EQ("the slot pi4VdpDisabled of the registered table is null", failure(session, "ipmx pi4VdpDisabled tag"));
     EXPECT_EQ("0", board::state().find("interface_manager.interfaces[0].held")->to_text()) << "it was given back";
+}
+
+TEST(Verbs, Ipmx_SetMode_SetsTheMode)
+{
+    EXPECT_EQ("", diagnostics("PMX_Init\nipmx pi4SetMode tag RES_576P 50 0\nexpect result 1\n"
+                              "expect next LOG9 \"SetMode, RES_576P\\n\"\nexpect call PMX_HalSetMode(0, RES_576P)\n"
+                              "ipmx pi4SetMode 1 RES_480P 60 0\nexpect result 0\nexpect no-more\n"
+                              "expect state ucMode RES_576P"));
 }
 
 TEST(Verbs, Operation_RunsUnderItsName)

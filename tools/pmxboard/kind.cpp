@@ -114,7 +114,9 @@ std::pair<std::size_t, std::string_view> field_of(const Kind& kind, std::string_
 Value read_record(const Kind& kind, std::string_view token, const std::string& what)
 {
     std::vector<std::optional<Value>> values(kind.names.size());
-    const auto parts = parts_of(token, '{', '}', what, "a record {field=value, …}");
+    const bool is_bracketed = token.starts_with('[');
+    const auto parts = parts_of(token, is_bracketed ? '[' : '{', is_bracketed ? ']' : '}', what,
+                                "a record {field=value, …} or [value, …]");
     for (std::size_t position = 0; position < parts.size(); ++position)
     {
         const auto [field, text] = field_of(kind, parts[position], position, what);

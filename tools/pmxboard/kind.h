@@ -5,7 +5,7 @@
  *      "text\n"                                         a text
  *      [7, 6, 5, 4, 3, 2, 1, 0]                         a list of so many items
  *      {fgOutputEnable=1, eResMode=RES_480P}            a record by field; fields left out are 0
- *      {1, RES_480P}                                    a record in the order of its fields */
+ *      {1, RES_480P}  [1, RES_480P]                     a record in the order of its fields */
 #pragma once
 
 #include <cstdint>

@@ -27,6 +27,8 @@ Values read_arguments(const Operation& operation, std::span<const std::string> w
             values.push_back(Value::null());
             ++next;
         }
+        else if (parameter.is_output && written && words[next] == "null")
+            throw LineError(parameter.name + " may not be null: " + operation.name + " does not test it");
         else if (parameter.is_output)
             values.push_back(Value::number(0));
         else if (written)

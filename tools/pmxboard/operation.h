@@ -66,14 +66,26 @@ struct Operation
     Operation returning(board::names::Family family) const;
 };
 
-/** How a parameter is called, and the number of items behind a pointer to a list. */
+/** How a parameter is called, and what its type does not tell: the number of items behind a pointer to a list, names
+ *  for its numbers where the name alone does not find them, and whether the function copes with a null pointer. */
 struct ParameterName
 {
     ParameterName(const char* written, std::size_t items = 1) : name(written), count(items) {}
+    ParameterName(const char* written, board::names::Family names) : name(written), family(names) {}
 
     std::string name;
-    std::size_t count;
+    std::size_t count = 1;
+    board::names::Family family = board::names::Family::None; ///< None: found from the name
+    bool may_be_null = true;
 };
+
+/** An output whose pointer the function does not test: no null may be written for it. */
+inline ParameterName never_null(const char* written)
+{
+    ParameterName name = written;
+    name.may_be_null = false;
+    return name;
+}
 
 /** Read the written arguments of an operation. Outputs are not written, but `null` may stand for one.
  *  Throws LineError. */
@@ -111,7 +123,9 @@ struct Argument
                  .kind = { .form = Kind::Form::Number,
                            .bits = 8 * sizeof(T),
                            .is_signed = std::is_signed_v<T>,
-                           .family = board::names::family_of(owner, name.name),
+                           .family = name.family != board::names::Family::None
+                                         ? name.family
+                                         : board::names::family_of(owner, name.name),
                            .count = 0,
                            .names = {},
                            .members = {} } };
@@ -167,7 +181,7 @@ struct Argument<T*>
     {
         Parameter parameter = Argument<T>::describe(owner, name);
         parameter.is_output = true;
-        parameter.may_be_null = true;
+        parameter.may_be_null = name.may_be_null;
         return parameter;
     }
 

@@ -20,6 +20,29 @@ bool has_members(const board::Value& value)
     return !value.items().empty();
 }
 
+/** A call's line broken behind commas where it is too long for the screen; texts stay whole. */
+std::string folded(const std::string& line, std::size_t indent)
+{
+    std::string lines;
+    std::size_t begin = 0;
+    std::size_t comma = 0; // behind the last one of this line
+    bool quoted = false;
+    for (std::size_t i = 0; i < line.size(); ++i)
+    {
+        if (line[i] == '"' && (i == 0 || line[i - 1] != '\\'))
+            quoted = !quoted;
+        const std::size_t column = i - begin + (begin == 0 ? 0 : indent);
+        if (column >= columns && comma > begin)
+        {
+            lines += line.substr(begin, comma - begin) + '\n' + std::string(indent, ' ');
+            begin = comma + 1;
+        }
+        if (!quoted && line[i] == ',')
+            comma = i + 1;
+    }
+    return lines + line.substr(begin);
+}
+
 } // namespace
 
 Output::Output(const OutputOptions& options) : m_options(options)
@@ -100,14 +123,15 @@ std::string Output::render(const board::TraceEntry& entry) const
     char time[32];
     std::snprintf(time, sizeof time, "%9llu.%03u  ", static_cast<unsigned long long>(entry.time_us / 1000),
                   static_cast<unsigned>(entry.time_us % 1000));
-    const std::string line = time + std::string(2 * static_cast<std::size_t>(entry.depth), ' ') +
-                             (m_options.verbose ? entry.named() : entry.brief());
+    const std::string lead = time + std::string(2 * static_cast<std::size_t>(entry.depth), ' ');
+    const std::string line = lead + (m_options.verbose ? entry.named() : entry.brief());
     const bool remarkable =
         entry.faulted || entry.kind == board::TraceEntry::Kind::Notice || entry.kind == board::TraceEntry::Kind::Assert;
     const std::string mark = entry.faulted ? "  (scripted)" : "";
     if (m_options.trace_to != nullptr)
         return line + mark + "\n";
-    return painted(line + mark, remarkable ? yellow : grey) + "\n";
+    const bool is_call = entry.kind == board::TraceEntry::Kind::Call;
+    return painted(is_call ? folded(line + mark, lead.size() + 4) : line + mark, remarkable ? yellow : grey) + "\n";
 }
 
 void Output::entry(const board::TraceEntry& entry)

@@ -100,6 +100,15 @@ void check_expectation(Session& session, const Line& line);
 /** `ipmx …`: call a function of the table that the mixer has registered, as a neighbouring driver does. */
 void run_ipmx(Session& session, const Line& line);
 
+/** `sink …`, `display-part …`, `video-plane …`: what these devices do by themselves. */
+void run_sink(Session& session, const Line& line);
+void run_display_part(Session& session, const Line& line);
+void run_video_plane(Session& session, const Line& line);
+
+/** `source …`, `plane-delay …`: the sources of pictures, and the delays of the mixer's planes. */
+void run_source(Session& session, const Line& line);
+void run_plane_delay(Session& session, const Line& line);
+
 /** Functions of that table, for checking them against the header. The tag stands first. */
 const std::vector<Operation>& ipmx_slots();
 

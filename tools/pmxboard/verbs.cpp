@@ -1,56 +1,16 @@
 #include <algorithm>
-#include <chrono>
 #include <limits>
 
 #include "board/board.h"
-#include "board/tokens.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/verb_words.h"
 #include "tools/record_view/record_view.h"
 
 namespace pmxboard
 {
 namespace
 {
-
-[[noreturn]] void wrong_usage(const Line& line)
-{
-    for (const Verb& verb : verbs())
-    {
-        if (verb.name == line.word(0))
-            throw LineError("write: " + std::string(verb.usage));
-    }
-    throw std::logic_error("a verb without a row");
-}
-
-void need_words(const Line& line, std::size_t least, std::size_t most)
-{
-    if (line.size() < least || line.size() > most)
-        wrong_usage(line);
-}
-
-/** A plain number in a range. */
-std::int64_t number_in(const std::string& word, const std::string& what, std::int64_t lowest, std::int64_t highest)
-{
-    const std::int64_t number = read_number(board::names::Family::None, word, what);
-    if (number < lowest || number > highest)
-        throw LineError(what + " is " + std::to_string(lowest) + " to " + std::to_string(highest) + ", not " + word);
-    return number;
-}
-
-bool read_switch(const Line& line, const std::string& word)
-{
-    if (word != "on" && word != "off")
-        wrong_usage(line);
-    return word == "on";
-}
-
-std::string read_text(const Line& line, const std::string& word)
-{
-    if (!word.starts_with('"'))
-        wrong_usage(line);
-    return read_value({ .form = Kind::Form::Text, .names = {}, .members = {} }, word, "the text").string();
-}
 
 void power_on(Session& session, const Line& line)
 {
@@ -126,15 +86,7 @@ void fault(Session&, const Line& line)
 void advance(Session&, const Line& line)
 {
     need_words(line, 2, 2);
-    const std::string& word = line.word(1);
-    const std::size_t unit_at = word.find_first_not_of("0123456789");
-    const std::string unit = unit_at == word.npos ? "" : word.substr(unit_at);
-    const std::int64_t scale = unit == "s" ? 1000000 : unit == "ms" ? 1000 : unit == "us" ? 1 : 0;
-    if (scale == 0 || unit_at == 0)
-        wrong_usage(line);
-    constexpr std::int64_t year = std::int64_t{ 366 } * 24 * 3600 * 1000000;
-    const std::int64_t count = number_in(word.substr(0, unit_at), "the time in " + unit, 0, year / scale);
-    board::advance(std::chrono::microseconds(count * scale));
+    board::advance(read_time(line, line.word(1)));
 }
 
 void loglevel(Session&, const Line& line)
@@ -244,6 +196,15 @@ const std::vector<Verb>& verbs()
         { "trace", "trace on, or trace off", trace },
         { "suspend", "suspend", suspend },
         { "resume", "resume", resume },
+        { "sink", "sink plug, sink unplug, sink request-resolution [on|off], sink valid MODE HZ, or sink valid asked",
+          run_sink },
+        { "display-part", "display-part off|never|answer TIME, or display-part raise|lower", run_display_part },
+        { "video-plane", "video-plane waiting on|off, or video-plane hw-enable PLANE STATE", run_video_plane },
+        { "source",
+          "source vdp0…vdp3|osd0…osd5 connect|stop|disconnect|size WxH, source VDP start WxH [luma N], "
+          "source OSD start WxH ycbcr|rgb, or source VDP connects-back on|off",
+          run_source },
+        { "plane-delay", "plane-delay [order 0x76543210] and eight delays, plane 1 first", run_plane_delay },
         { "print", "print \"text\"", print },
         { "neighbour", "neighbour FUNCTION [ARGUMENT…]", neighbour },
         { "ipmx", "ipmx SLOT tag|NUMBER [ARGUMENT…]", run_ipmx },

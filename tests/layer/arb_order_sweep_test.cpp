@@ -184,7 +184,8 @@ TEST_P(ArbOrderPermutations, SetArbPlaneOrder_EveryOne_IsAccepted)
         ASSERT_EQ(order != packed(permutation), warned);
         board::trace::clear();
         ++accepted;
-    } while (std::next_permutation(permutation.begin() + 1, permutation.end()));
+    }
+    while (std::next_permutation(permutation.begin() + 1, permutation.end()));
     EXPECT_EQ(5040u, accepted);
 }
 

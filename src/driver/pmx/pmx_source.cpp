@@ -190,10 +190,8 @@ void PMX_InformVdpColorSpace(UCHAR)
     for (UINT16 u2Idx = 0; u2Idx < 2; u2Idx++)
     {
         UINT32 u4Port = u4PmxCompId2LocalId(PMX_COMP_TYPE_VDP, u2Idx);
-        if (u4Port >= PMX_PORT_NUM)
-            break;
-        const PMX_PORT_INFO_T* prPort = &prPmxConf()->arPortInfo[u4Port];
-        if (prPort->fgConnected != 0)
+        const PMX_PORT_INFO_T* prPort = prPmxConf()->arPortInfo + u4Port;
+        if (u4Port < PMX_PORT_NUM && prPort->fgConnected != 0)
             vInformVdp(prPort->u2CompType, prPort->u2CompId);
     }
 

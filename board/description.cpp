@@ -12,7 +12,13 @@ namespace
 
 std::filesystem::path& boards_directory()
 {
-    static std::filesystem::path directory = PMX_SOURCE_DIR "/boards";
+    static std::filesystem::path directory = [] {
+        // Beside an installed tool, else the project's own.
+        std::error_code none;
+        const std::filesystem::path tool = std::filesystem::read_symlink("/proc/self/exe", none);
+        const std::filesystem::path installed = tool.parent_path() / "../share/pmx/boards";
+        return !none && std::filesystem::is_directory(installed, none) ? installed : PMX_SOURCE_DIR "/boards";
+    }();
     return directory;
 }
 

@@ -234,6 +234,11 @@ void set_arrangement(const Arrangement& arrangement)
     mixer_state.arrangements[arrangement.order] = arrangement.delay;
 }
 
+void set_selectors(const std::array<std::uint8_t, 8>& selectors)
+{
+    mixer_state.selectors = selectors;
+}
+
 Value state()
 {
     const Mixer& m = mixer_state;

@@ -27,4 +27,7 @@ void set_plane_delay(const PlaneDelays& delay);
 /** The delays of one arrangement, in place of those that it had. Throws std::invalid_argument as check_order does. */
 void set_arrangement(const Arrangement& arrangement);
 
+/** What stands in the selectors from now on, as another driver or a fault of the hardware would leave it: any byte. */
+void set_selectors(const std::array<std::uint8_t, 8>& selectors);
+
 } // namespace board::mixer

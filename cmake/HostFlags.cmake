@@ -3,7 +3,7 @@ add_library(pmx_host INTERFACE)
 target_compile_features(pmx_host INTERFACE cxx_std_20)
 target_compile_options(pmx_host INTERFACE
     -Werror -Wall -Wextra -Wpedantic -Wshadow -Wundef -Wformat=2 -Wcast-qual -Wpointer-arith -Wvla
-    -Wnon-virtual-dtor -Woverloaded-virtual -Wextra-semi -fno-pie)
+    "$<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor;-Woverloaded-virtual;-Wextra-semi>" -fno-pie)
 # The layer is position-dependent code; record_view finds its private objects by their addresses in the symbol table.
 target_link_options(pmx_host INTERFACE -no-pie)
 target_compile_definitions(pmx_host INTERFACE PMX_SOURCE_DIR="${PROJECT_SOURCE_DIR}")

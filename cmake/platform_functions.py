@@ -32,6 +32,8 @@ LOOKS_LIKE_ONE = {"typedef", "return", "DRV_STATIC_ASSERT", "static_assert", "DR
 class Function:
     name: str
     has_result: bool
+    result: str        # its type
+    declared: str      # its parameters as they are declared
     parameters: tuple  # names
     contract: str      # the comment directly above the declaration, or nothing
     line: int
@@ -50,7 +52,8 @@ def functions(path):
     text = pathlib.Path(path).read_text(encoding="utf-8")
     for match in DECLARATION.finditer(text):
         if not {match["result"], match["name"]} & LOOKS_LIKE_ONE:
-            yield Function(match["name"], match["result"] != "void", tuple(parameter_names(match["parameters"])),
+            yield Function(match["name"], match["result"] != "void", match["result"],
+                           " ".join(match["parameters"].split()), tuple(parameter_names(match["parameters"])),
                            (match["contract"] or "").strip(), text.count("\n", 0, match.start("name")) + 1)
 
 

@@ -272,6 +272,16 @@ TEST_F(Mixer, SetPlaneOrder_AnArrangementOfItsOwn_HasItsOwnDelays)
     EXPECT_EQ("0 0 0 0 0 0 0 0 ", delays_reported(ROTATED)) << "forgotten";
 }
 
+TEST_F(Mixer, Selectors_CanBeLeftByAnother)
+{
+    board::mixer::set_selectors({ 255, 1, 2, 3, 4, 5, 6, 16 });
+    UINT8 read[8] = {};
+    EXPECT_EQ(0, PMX_HalGetPlaneOrder(0, read));
+    EXPECT_EQ(255, read[0]);
+    EXPECT_EQ(16, read[7]);
+    EXPECT_EQ("[255, 1, 2, 3, 4, 5, 6, 16]", now("selectors"));
+}
+
 TEST_F(Mixer, Delays_CanBeChangedLater)
 {
     const UINT8 unchanged[8] = { 0, 1, 2, 3, 4, 5, 6, 7 };

@@ -1,4 +1,5 @@
 /** The packed plane order: reading it back, and what outlives what. */
+#include "board/mixer.h"
 #include "pmx_hal.h"
 #include "tests/layer/arb_order.h"
 
@@ -171,4 +172,18 @@ TEST_F(ArbOrder, GetArbPlaneOrder_ThePositionsPlayNoPart)
     EXPECT_EQ(0x76543210u, order);
     EXPECT_EQ(7, record("aucPlaneOrder[0]"));
     EXPECT_EQ(3, record("aucPlaneOrder[1]"));
+}
+
+TEST_F(ArbOrder, GetArbPlaneOrder_SelectorsThatAreNoSources_AreAddedUpUnmasked)
+{
+    board::mixer::set_selectors({ 0x10, 1, 2, 3, 4, 5, 6, 0xF7 });
+    UINT32 order = 0;
+    EXPECT_EQ(1u, PMX_GetArbPlaneOrder(0, &order));
+    EXPECT_EQ(0x76543210u, order);
+    EXPECT_TRACE(R"(
+        LOG9 "[PMX0] Start to Get PlaneOrder.\n"
+        PMX_HalGetPlaneOrder(0, [16, 1, 2, 3, 4, 5, 6, 247]) = 0
+        LOG8 "Warning: PlaneOrder HW = [0x76543220], but SW = [0x76543210].\n"
+        LOG9 "Get PlaneOrder = 0x[76543220],[16][1][2][3][4][5][6][247].\n"
+    )");
 }

@@ -149,8 +149,6 @@ TEST_F(ArbOrder, SetArbPlaneOrder_RandomWords_AreRefusedForTheFirstPair)
     EXPECT_EQ(0x76543210, record("u4PlaneOrder"));
 }
 
-/** The permutations x -> (ax + b) / (cx + d) of the numbers modulo 7 and a point at infinity, here 7: among them, any
- *  three planes name any three sources exactly once. All 40320 permutations take too long with every line recorded. */
 /** The permutations that feed plane 0 from one source: an eighth of all 40320. */
 class ArbOrderPermutations : public ArbOrder, public testing::WithParamInterface<unsigned>
 {

@@ -89,7 +89,7 @@ TEST_F(DisplayTimer, SetFormatChangeTimer_StopFails_AssertsAndStartsAllTheSame)
             LOG0 "Display Format Change Timer Set.\n"
             x_timer_stop(2) = )" +
                      std::to_string(answer) + R"(
-            Assert("x_timer_stop(_arPmxDispPartStatus.hPMXTimer) == OSR_OK", *)
+            Assert("x_timer_stop(_arPmxDispPartStatus.hPMXTimer) == OSR_OK", "src/driver/pmx/pmx_handshake.cpp")
             x_timer_start(2, 10000, X_TIMER_FLAG_ONCE, _PMX_TmrIsr, null) = 0
         )");
     }
@@ -112,7 +112,7 @@ TEST_F(DisplayTimer, SetFormatChangeTimer_StartFails_AssertsAndReturnsOne)
                      std::to_string(answer) +
                      R"(
             Assert("x_timer_start(_arPmxDispPartStatus.hPMXTimer, u4TimeInterval, X_TIMER_FLAG_ONCE, _PMX_TmrIsr, )"
-                     R"(NULL)==OSR_OK", *)
+                     R"(NULL)==OSR_OK", "src/driver/pmx/pmx_handshake.cpp")
         )");
     }
     EXPECT_RECORD_UNCHANGED(before);
@@ -128,10 +128,10 @@ TEST_F(DisplayTimer, SetFormatChangeTimer_AfterAnotherReset_FailsWithTheHandleTh
     EXPECT_TRACE(R"(
         LOG0 "Display Format Change Timer Set.\n"
         x_timer_stop(0) = -1
-        Assert("x_timer_stop(_arPmxDispPartStatus.hPMXTimer) == OSR_OK", *)
+        Assert("x_timer_stop(_arPmxDispPartStatus.hPMXTimer) == OSR_OK", "src/driver/pmx/pmx_handshake.cpp")
         x_timer_start(0, 10000, X_TIMER_FLAG_ONCE, _PMX_TmrIsr, null) = -1
         Assert("x_timer_start(_arPmxDispPartStatus.hPMXTimer, u4TimeInterval, X_TIMER_FLAG_ONCE, _PMX_TmrIsr, )"
-                 R"(NULL)==OSR_OK", *)
+                 R"(NULL)==OSR_OK", "src/driver/pmx/pmx_handshake.cpp")
     )");
     expect_asserts(2);
 }

@@ -57,10 +57,10 @@ const std::set<std::string> routing{ "_i4Osd5Out", "_i4Osd5Out_CVBSOnly" };
 
 constexpr const char* component_failed =
     R"(Assert("TVE_SetFmtEx(TVE_1, ucFmtMode, ucVFreq, rCAV.eResMode, rCAV.fgOutputEnable, fgHDExist, fgOSD5) == )"
-    R"(TVE_SET_OK", *))";
+    R"(TVE_SET_OK", "src/driver/pmx/pmx_mode_ex.cpp"))";
 constexpr const char* composite_failed =
     R"(Assert("TVE_SetFmtEx(TVE_2, ucFmtMode, ucVFreq, rCVBS.eResMode, rCVBS.fgOutputEnable, fgHDExist, fgOSD5) == )"
-    R"(TVE_SET_OK", *))";
+    R"(TVE_SET_OK", "src/driver/pmx/pmx_mode_ex.cpp"))";
 
 /** Leave what stands between rule R and the encoders' switches. */
 void only_formats()

@@ -156,6 +156,22 @@ TEST_F(SupportedRes, ChkSupportedRes_DriverHasNoAnswer_NothingIsWritten)
     EXPECT_EQ(0u, PMX_ChkSupportedRes(0, RES_720P60HZ, 60, nullptr, nullptr));
 }
 
+TEST_F(SupportedRes, ChkSupportedRes_NullPointers_AreNotTestedAndTheDriverIsAsked)
+{
+    started();
+    board::faults::set({ "fgPmxDrvGetAvdInfo", FALSE, board::Fault::When::Always });
+    UCHAR mode = 99;
+    UINT16 frequency = 999;
+    EXPECT_EQ(0u, PMX_ChkSupportedRes(0, RES_576P, 50, nullptr, nullptr));
+    EXPECT_TRACE(query(RES_576P, 50, 0, 0) + " = 0");
+    EXPECT_EQ(0u, PMX_ChkSupportedRes(0, RES_576P, 50, &mode, nullptr));
+    EXPECT_TRACE(query(RES_576P, 50, 0, 0) + " = 0");
+    EXPECT_EQ(0u, PMX_ChkSupportedRes(0, RES_576P, 50, nullptr, &frequency));
+    EXPECT_TRACE(query(RES_576P, 50, 0, 0) + " = 0");
+    EXPECT_EQ(99, mode);
+    EXPECT_EQ(999, frequency);
+}
+
 TEST_F(SupportedRes, ChkSupportedRes_DriverWritesNoAnswer_ItIsZero)
 {
     started();

@@ -1,0 +1,12 @@
+# What cmake --install puts in place: the layer's object and headers for a stack, the virtual board as a library, the
+# tool with its boards and scenarios, the guides and the examples.
+set(directories ${PMX_HEADER_DIRECTORIES})
+list(TRANSFORM directories APPEND /)   # what is in them, not they themselves
+install(DIRECTORY ${directories} DESTINATION include/pmx)
+install(FILES ${PROJECT_BINARY_DIR}/pmx_if.o DESTINATION lib/pmx)
+install(FILES cmake/pmxConfig.cmake DESTINATION lib/cmake/pmx)
+install(DIRECTORY board/ DESTINATION include/pmx/board FILES_MATCHING PATTERN "*.h")
+install(TARGETS pmx_board pmxboard ARCHIVE DESTINATION lib/pmx RUNTIME DESTINATION bin)
+install(DIRECTORY boards scenarios examples DESTINATION share/pmx)
+install(FILES src/driver/pmx/pmx_export.c DESTINATION share/pmx)
+install(DIRECTORY docs/ DESTINATION share/doc/pmx PATTERN Doxyfile EXCLUDE)

@@ -1,0 +1,41 @@
+#!/usr/bin/env python3
+"""Compiles the porting skeleton as C and links it with the object that ships: nothing but the kernel's own may stay
+open.
+
+usage: check_port_skeleton.py PMX_IF_OBJECT COMPILER...
+"""
+
+import pathlib
+import subprocess
+import sys
+import tempfile
+
+ROOT = pathlib.Path(__file__).resolve().parents[2]
+FLAGS = ["-std=c11", "-pedantic", "-Wall", "-Wextra", "-Werror", "-fno-short-enums", "-ffreestanding", "-fno-pie"]
+INCLUDES = ["src/system/inc", "src/driver/inc", "src/driver/private_inc"]
+OF_THE_KERNEL = {"memcpy", "memset"}
+
+
+def open_symbols(shipped, compiler, directory):
+    skeleton, linked = directory / "skeleton.o", directory / "linked.o"
+    subprocess.run([compiler, *FLAGS, *(f"-I{ROOT / include}" for include in INCLUDES), "-c",
+                    ROOT / "examples/port_skeleton.c", "-o", skeleton], check=True)
+    subprocess.run(["ld", "-r", "-o", linked, shipped, skeleton], check=True)
+    names = subprocess.run(["nm", "--undefined-only", "--format=posix", linked], check=True, capture_output=True,
+                           text=True).stdout
+    return {line.split()[0] for line in names.splitlines()}
+
+
+def main():
+    shipped, compilers = sys.argv[1], sys.argv[2:]
+    missing = set()
+    with tempfile.TemporaryDirectory() as directory:
+        for compiler in compilers:
+            missing |= open_symbols(shipped, compiler, pathlib.Path(directory)) - OF_THE_KERNEL
+    for name in sorted(missing):
+        print(f"no body in the skeleton: {name}")
+    return 1 if missing or not compilers else 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())

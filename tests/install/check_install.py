@@ -1,0 +1,39 @@
+#!/usr/bin/env python3
+"""Installs a build into a directory of its own, runs the tool there, and builds and runs the middleware example against
+it and nothing else.
+
+usage: check_install.py CMAKE BUILD_DIRECTORY LINKER_FLAGS
+"""
+
+import pathlib
+import subprocess
+import sys
+import tempfile
+
+ROOT = pathlib.Path(__file__).resolve().parents[2]
+
+
+def run(*command, **options):
+    result = subprocess.run(command, capture_output=True, text=True, check=False, **options)
+    if result.returncode != 0:
+        sys.exit(f"{' '.join(map(str, command))}\nexit code {result.returncode}\n{result.stdout}{result.stderr}")
+
+
+def main():
+    cmake, build, linker_flags = sys.argv[1:]
+    with tempfile.TemporaryDirectory() as directory:
+        prefix = pathlib.Path(directory) / "prefix"
+        elsewhere = pathlib.Path(directory) / "examples"
+        run(cmake, "--install", build, "--prefix", prefix)
+        run(prefix / "bin/pmxboard", "run", "--quiet", prefix / "share/pmx/scenarios/cold-boot.pmx", cwd=directory)
+
+        run(cmake, "-S", prefix / "share/pmx/examples", "-B", elsewhere, f"-DCMAKE_PREFIX_PATH={prefix}",
+            f"-DCMAKE_EXE_LINKER_FLAGS={linker_flags}", f"-DCMAKE_C_FLAGS=-Wall -Wextra -Werror {linker_flags}")
+        run(cmake, "--build", elsewhere)
+        run(sys.executable, ROOT / "tests/examples/check_middleware.py", elsewhere / "middleware",
+            prefix / "share/pmx/boards/default")
+    return 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())

@@ -25,13 +25,17 @@ def main():
         prefix = pathlib.Path(directory) / "prefix"
         elsewhere = pathlib.Path(directory) / "examples"
         run(cmake, "--install", build, "--prefix", prefix)
-        run(prefix / "bin/pmxboard", "run", "--quiet", prefix / "share/pmx/scenarios/cold-boot.pmx", cwd=directory)
+        # Under a name that the project itself does not have, so that only the installed boards can serve.
+        boards = prefix / "share/pmx/boards"
+        (boards / "default").rename(boards / "installed")
+        run(prefix / "bin/pmxboard", "run", "--quiet", "--board", "installed",
+            prefix / "share/pmx/scenarios/cold-boot.pmx", cwd=directory)
 
-        run(cmake, "-S", prefix / "share/pmx/examples", "-B", elsewhere, f"-DCMAKE_PREFIX_PATH={prefix}",
+        run(cmake, "-G", "Ninja", "-S", prefix / "share/pmx/examples", "-B", elsewhere, f"-DCMAKE_PREFIX_PATH={prefix}",
             f"-DCMAKE_EXE_LINKER_FLAGS={linker_flags}", f"-DCMAKE_C_FLAGS=-Wall -Wextra -Werror {linker_flags}")
         run(cmake, "--build", elsewhere)
         run(sys.executable, ROOT / "tests/examples/check_middleware.py", elsewhere / "middleware",
-            prefix / "share/pmx/boards/default")
+            boards / "installed")
     return 0
 
 

@@ -1,0 +1,84 @@
+#include "tools/pmxboard/run_command.h"
+
+#include <filesystem>
+#include <fstream>
+#include <iostream>
+
+#include "board/board.h"
+#include "tools/pmxboard/command.h"
+#include "tools/pmxboard/runner.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+/** A word as a shell takes it. */
+std::string shell_word(const std::string& word)
+{
+    constexpr std::string_view plain = "abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789._-/+,:=@%";
+    if (!word.empty() && word.find_first_not_of(plain) == word.npos)
+        return word;
+    std::string quoted = "'";
+    for (const char c : word)
+        quoted += c == '\'' ? std::string("'\\''") : std::string(1, c);
+    return quoted + "'";
+}
+
+std::string repeat_command(const RunOptions& run, const std::string& file)
+{
+    return "pmxboard run " + (run.board.empty() ? "" : "--board " + shell_word(run.board) + " ") + shell_word(file);
+}
+
+} // namespace
+
+int run_files(const RunOptions& run)
+{
+    OutputOptions output;
+    output.quiet = run.quiet;
+    output.verbose = run.verbose;
+    output.colour = wants_colour();
+    output.trace = run.trace == "json" ? TraceForm::Json : run.trace == "off" ? TraceForm::Off : TraceForm::Text;
+    output.to = &std::cout;
+
+    std::error_code ignored;
+    for (const std::string& file : run.files)
+    {
+        if (file != "-" && std::filesystem::is_directory(file, ignored))
+            return usage_error(file + " is a directory");
+        if (file != "-" && !std::ifstream(file))
+            return usage_error("cannot read " + file);
+    }
+    try
+    {
+        if (!run.board.empty())
+            board::load_description(run.board);
+    }
+    catch (const board::DescriptionError& error)
+    {
+        return usage_error(error.what());
+    }
+    std::ofstream trace_file;
+    if (!run.trace_file.empty())
+    {
+        trace_file.open(run.trace_file);
+        if (!trace_file)
+            return usage_error("cannot write " + run.trace_file);
+        output.trace_to = &trace_file;
+    }
+
+    for (const std::string& file : run.files)
+    {
+        std::ifstream opened;
+        if (file != "-")
+            opened.open(file);
+        const Scenario scenario{ file, run.board.empty() ? "default" : run.board, repeat_command(run, file) };
+        if (!run_scenario(file == "-" ? std::cin : opened, scenario, output, std::cerr))
+            return exit_failed;
+    }
+    if (!run.trace_file.empty() && !trace_file.flush())
+        return usage_error("cannot write " + run.trace_file);
+    return exit_done;
+}
+
+} // namespace pmxboard

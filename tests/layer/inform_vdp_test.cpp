@@ -13,9 +13,9 @@ namespace
 {
 
 constexpr const char* lock_failed =
-    "Assert(\"x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) == OSR_OK\", \"src/driver/pmx/pmx_source.cpp\")\n";
+    "Assert(\"x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) == OSR_OK\", \"src/driver/pmx/pmx_port.cpp\")\n";
 constexpr const char* unlock_failed =
-    "Assert(\"x_sema_unlock(MutexPMX) == OSR_OK\", \"src/driver/pmx/pmx_source.cpp\")\n";
+    "Assert(\"x_sema_unlock(MutexPMX) == OSR_OK\", \"src/driver/pmx/pmx_port.cpp\")\n";
 
 /** A plane whose table cannot be fetched. */
 std::string not_told(int colour_space, const SourceTest::Plane& plane, int answer)

@@ -9,17 +9,23 @@
 extern "C" void* memset(void* pvDest, int iValue, size_t zSize); // the kernel's
 
 /* Nominal offset of each plane, in the hardware's unit. */
-static constexpr INT32 OFFSETS_HD[PMX_PLANE_NUM] = { 12, 12, 10, 8, 6, 4, 2, 0 };
-static constexpr INT32 OFFSETS_OTHER[PMX_PLANE_NUM] = { 6, 6, 5, 4, 3, 2, 1, 0 };
+static constexpr UINT8 OFFSETS_HD[PMX_PLANE_NUM] = { 12, 12, 10, 8, 6, 4, 2, 0 };
+static constexpr UINT8 OFFSETS_OTHER[PMX_PLANE_NUM] = { 6, 6, 5, 4, 3, 2, 1, 0 };
 
-/* Each field's top bit is not part of the source number. */
-static void vUnpack(UINT32 u4PlaneOrder, UINT8* pu1PlnSel)
+/* Each field's top bit is not part of the source number. Yields the sources that are used, one bit each. */
+static UINT32 u4Unpack(UINT32 u4PlaneOrder, UINT8* pu1PlnSel)
 {
+    UINT32 u4Used = 0;
     for (UINT32 k = 0; k < PMX_PLANE_NUM; k++)
+    {
         pu1PlnSel[k] = (UINT8)((u4PlaneOrder >> (4 * k)) & 7);
+        u4Used |= 1u << pu1PlnSel[k];
+    }
+    return u4Used;
 }
 
-static bool fgSourcesDiffer(const UINT8* pu1PlnSel)
+/* Name the first two planes that have one source. */
+static void vLogConflict(const UINT8* pu1PlnSel)
 {
     for (INT32 i = 0; i < PMX_PLANE_NUM; i++)
     {
@@ -28,15 +34,14 @@ static bool fgSourcesDiffer(const UINT8* pu1PlnSel)
             if (pu1PlnSel[i] == pu1PlnSel[j])
             {
                 PMX_IsLog(9, "Plane[%d] and Plane[%d] connect to the same input source!\n", i, j);
-                return false;
+                return;
             }
         }
     }
-    return true;
 }
 
 /* Hand the compensations to display control and to the OSD driver; nobody takes those of planes 4, 5 and 7. */
-static void vCompensate(const INT32* pi4Nominal, const INT32* pi4PlnDelay)
+static void vCompensate(const UINT8* pu1Nominal, const INT32* pi4PlnDelay)
 {
     PMX_IsLog(8, "Set Video Plane dealy: %d,%d.\n", pi4PlnDelay[0], pi4PlnDelay[1]);
     PMX_IsLog(8, "Set OSD Plane delay: %d,%d,%d,%d,%d.\n", pi4PlnDelay[2], pi4PlnDelay[3], pi4PlnDelay[4],
@@ -46,8 +51,8 @@ static void vCompensate(const INT32* pi4Nominal, const INT32* pi4PlnDelay)
     INT32 i4OffSet[PMX_PLANE_NUM];
     for (INT32 i = 0; i < PMX_PLANE_NUM; i++)
     {
-        PMX_IsLog(0, "Plane %d ofst is %ld, delay is %ld\n", i, (long)pi4Nominal[i], (long)pi4PlnDelay[i]);
-        i4OffSet[i] = (INT32)((UINT32)pi4Nominal[i] - (UINT32)pi4PlnDelay[i]); // may be negative; wraps, never traps
+        PMX_IsLog(0, "Plane %d ofst is %ld, delay is %ld\n", i, (long)pu1Nominal[i], (long)pi4PlnDelay[i]);
+        i4OffSet[i] = (INT32)(pu1Nominal[i] - (UINT32)pi4PlnDelay[i]); // may be negative; wraps, never traps
     }
     DCM_SetVideoPlaneDelay(i4OffSet[0], i4OffSet[1]);
 
@@ -62,21 +67,24 @@ UINT32 PMX_SetArbPlaneOrder(UCHAR ucPmxId, UINT32 u4PlaneOrder)
     INT32 i4PlnDelay[PMX_PLANE_NUM];
 
     Printf("[PMX%d] Set PlaneOrder = [0x%8x]\n", ucPmxId, u4PlaneOrder);
-    vUnpack(u4PlaneOrder, u1PlnSel);
-    const INT32* pi4Nominal = fgPmxTveHd(prConf->ucMode) != 0 ? OFFSETS_HD : OFFSETS_OTHER;
+    UINT32 u4Used = u4Unpack(u4PlaneOrder, u1PlnSel);
+    const UINT8* pu1Nominal = fgPmxTveHd(prConf->ucMode) != 0 ? OFFSETS_HD : OFFSETS_OTHER;
     for (INT32 i = 0; i < PMX_PLANE_NUM; i++)
-        Printf("[PMX]offset[%d]=%d\n", i, pi4Nominal[i]);
+        Printf("[PMX]offset[%d]=%d\n", i, pu1Nominal[i]);
     for (INT32 i = 0; i < PMX_PLANE_NUM; i++)
         Printf("[PMX]u1PlnSel[%d]=%d\n", i, u1PlnSel[i]);
-    if (!fgSourcesDiffer(u1PlnSel))
+    if (u4Used != 0xFF)
+    {
+        vLogConflict(u1PlnSel);
         return 0;
+    }
 
     prConf->u4PlaneOrder = u4PlaneOrder; // stays if the hardware refuses: the next read-back warns of the difference
     memset(i4PlnDelay, 0, sizeof i4PlnDelay);
     if (PMX_HalSetPlaneOrder(ucPmxId, u1PlnSel, i4PlnDelay) != 0)
         return 0;
 
-    vCompensate(pi4Nominal, i4PlnDelay);
+    vCompensate(pu1Nominal, i4PlnDelay);
     return 1;
 }
 

@@ -15,6 +15,17 @@ static BOOL fgSignalHdmi(UINT32 u4AspectRatio)
     return fgPmxDrvSetAvd(PMX_CHG_HDMI_VIDEO_ASPECT_RATIO, &u4AspectRatio, 1);
 }
 
+/* Make a ratio that was stored take effect. */
+static UINT32 u4SignalNormal(UINT32 u4AspectRatio, const CHAR* szDone)
+{
+    if (fgSignalHdmi(u4AspectRatio) == FALSE)
+        return 0;
+
+    VDP_GlobalOutputChange();
+    PMX_IS_LOG_ONE_OF(9, szDone);
+    return 1;
+}
+
 UINT32 PMX_SetAspectRatio(UCHAR ucPmxId, UINT32 u4AspectRatio)
 {
     if (ucPmxId != 0)
@@ -22,12 +33,7 @@ UINT32 PMX_SetAspectRatio(UCHAR ucPmxId, UINT32 u4AspectRatio)
 
     PMX_IsLog(9, "PMX_ID(%d), Aspect Ratio(%d)\n", ucPmxId, (INT32)u4AspectRatio);
     prPmxConf()->u4AspectRatio = u4AspectRatio; // before HDMI is asked: a refusal leaves it new
-    if (fgSignalHdmi(u4AspectRatio) == FALSE)
-        return 0;
-
-    VDP_GlobalOutputChange();
-    PMX_IsLog(9, "VDP_GlobalOutputChange\n");
-    return 1;
+    return u4SignalNormal(u4AspectRatio, "VDP_GlobalOutputChange\n");
 }
 
 UINT32 PMX_SetAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgApplyOnNext)
@@ -48,12 +54,7 @@ UINT32 PMX_SetAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgApplyOnN
     prConf->u4AspectRatio = u4AspectRatio;
     prConf->fgAspNext = 0;
     prConf->u4AspNext = 0;
-    if (fgSignalHdmi(u4AspectRatio) == FALSE)
-        return 0;
-
-    VDP_GlobalOutputChange();
-    PMX_IsLog(9, "[EX] VDP_GlobalOutputChange\n");
-    return 1;
+    return u4SignalNormal(u4AspectRatio, "[EX] VDP_GlobalOutputChange\n");
 }
 
 /* The result is a ratio, not a success; nothing waiting is no failure. */
@@ -75,10 +76,10 @@ UINT32 PMX_SetAspectRatioNext(UCHAR ucPmxId)
 /* What an aspect code is signalled as. */
 typedef struct
 {
-    UINT8 u1Asp; // the row's own code
-    TVE_ASPECT_RATIO_T TveAsp;
-    HDMI_PICTURE_ASPECT_RATIO_T Hdmi_par;
-    HDMI_AFD_FORMT_T Hdmi_afd;
+    UINT8 u1Asp;      // the row's own code
+    UINT8 u1TveAsp;   // TVE_ASPECT_RATIO_T
+    UINT8 u1Hdmi_par; // HDMI_PICTURE_ASPECT_RATIO_T
+    UINT8 u1Hdmi_afd; // HDMI_AFD_FORMT_T
 } SIGNALLING_T;
 
 // clang-format off
@@ -118,27 +119,18 @@ UINT32 PMX_SetDigestAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgDi
         return 1;
 
     const SIGNALLING_T* prSignalling = prSignallingOf(u4AspectRatio);
-    TVE_SetAspectRatio(prSignalling->TveAsp);
+    TVE_SetAspectRatio((TVE_ASPECT_RATIO_T)prSignalling->u1TveAsp);
     // HDMI's values are shown, not sent: the sink keeps what the normal ratio signalled.
-    PMX_IsLog(0, "[EX] TveAsp = %d Hdmi(par = %d,afd = %d)\n", (INT32)prSignalling->TveAsp,
-              (INT32)prSignalling->Hdmi_par, (INT32)prSignalling->Hdmi_afd);
-    return 1;
-}
-
-static UINT32 u4GetRatio(UCHAR ucPmxId, UINT32 u4Ratio, UINT32* pu4AspectRatio)
-{
-    if (ucPmxId != 0 || pu4AspectRatio == nullptr)
-        return 0;
-
-    *pu4AspectRatio = u4Ratio;
+    PMX_IsLog(0, "[EX] TveAsp = %d Hdmi(par = %d,afd = %d)\n", prSignalling->u1TveAsp, prSignalling->u1Hdmi_par,
+              prSignalling->u1Hdmi_afd);
     return 1;
 }
 
 UINT32 PMX_GetAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio)
 {
     const PMX_CONF_T* prConf = prPmxConf();
-    return u4GetRatio(ucPmxId, prConf->fgDigestEnable != 0 ? prConf->u4DigestAsp : prConf->u4AspectRatio,
-                      pu4AspectRatio);
+    return u4PmxGiveWord(ucPmxId, prConf->fgDigestEnable != 0 ? prConf->u4DigestAsp : prConf->u4AspectRatio,
+                         pu4AspectRatio);
 }
 
 INT32 i4PmxGetAspectRatio(void* pvTag, UINT32* pu4AspectRatio)
@@ -153,16 +145,16 @@ BOOL PMX_IsUnderDigestMode(UCHAR ucPmxId)
 
 UINT32 PMX_GetNormalAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio)
 {
-    return u4GetRatio(ucPmxId, prPmxConf()->u4AspectRatio, pu4AspectRatio);
+    return u4PmxGiveWord(ucPmxId, prPmxConf()->u4AspectRatio, pu4AspectRatio);
 }
 
 UINT32 PMX_GetDigestAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio)
 {
-    return u4GetRatio(ucPmxId, prPmxConf()->u4DigestAsp, pu4AspectRatio);
+    return u4PmxGiveWord(ucPmxId, prPmxConf()->u4DigestAsp, pu4AspectRatio);
 }
 
 UINT32 PMX_GetAspectRatioMW(UCHAR ucPmxId, UINT32* pu4AspectRatio)
 {
     const PMX_CONF_T* prConf = prPmxConf();
-    return u4GetRatio(ucPmxId, prConf->fgAspNext != 0 ? prConf->u4AspNext : prConf->u4AspectRatio, pu4AspectRatio);
+    return u4PmxGiveWord(ucPmxId, prConf->fgAspNext != 0 ? prConf->u4AspNext : prConf->u4AspectRatio, pu4AspectRatio);
 }

@@ -67,9 +67,5 @@ UINT32 PMX_SetTvType(UCHAR ucPmxId, UCHAR ucTvType)
 
 UINT32 PMX_GetTvType(UCHAR ucPmxId, UCHAR* pucTvType)
 {
-    if (ucPmxId != 0 || pucTvType == nullptr)
-        return 0;
-
-    *pucTvType = prPmxConf()->ucTvType;
-    return 1;
+    return u4PmxGiveByte(ucPmxId, prPmxConf()->ucTvType, pucTvType);
 }

@@ -4,39 +4,26 @@
 #include "pmx_if.h"
 #include "u_os.h"
 
-static void vSetForSdOutput(DRV_PMX_COLOR_SPACE_T eMixerOutCS)
+/* How the two converters are set, and what the console says of them. */
+typedef struct
 {
-    if (eMixerOutCS == DRV_PMX_CS_YCBCR_601)
-    {
-        PMX_HalSetCC_A(0, 0, 0);
-        PMX_IsLog(9, "CC_A disable\n");
-    }
-    else
-    {
-        PMX_HalSetCC_A(0, 1, 1);
-        PMX_IsLog(9, "CC_A enable, 709->601\n");
-    }
-    PMX_HalSetScaler709601(0, 0, 0);
-    PMX_IsLog(8, "Scaler CC disable, don't care\n");
-}
+    UINT8 u1CCEnable; // converter A
+    UINT8 u1CCDir;    // 0: 601 to 709, 1: 709 to 601
+    UINT8 u1ScalerCC; // the scaler's converter, 709 to 601
+    const CHAR* szCC;
+    const CHAR* szScalerCC;
+} CONVERSION_T;
 
-static void vSetForHdOutput(DRV_PMX_COLOR_SPACE_T eMixerOutCS)
-{
-    if (eMixerOutCS == DRV_PMX_CS_YCBCR_601)
-    {
-        PMX_HalSetCC_A(0, 1, 0);
-        PMX_IsLog(9, "CC_A enable, 601->709\n");
-        PMX_HalSetScaler709601(0, 0, 0);
-        PMX_IsLog(8, "Scaler CC disable\n");
-    }
-    else
-    {
-        PMX_HalSetCC_A(0, 0, 0);
-        PMX_IsLog(9, "CC_A disable\n");
-        PMX_HalSetScaler709601(0, 1, 1);
-        PMX_IsLog(8, "Scaler CC enable, 709->601\n");
-    }
-}
+/* For each standard of the output, from PMX_COLOUR_SD on, the two colour spaces that planes are mixed in. */
+static constexpr CONVERSION_T CONVERSIONS[] = {
+    // SD: the scaler's picture is not looked at
+    { 0, 0, 0, "CC_A disable\n", "Scaler CC disable, don't care\n" },          // 601
+    { 1, 1, 0, "CC_A enable, 709->601\n", "Scaler CC disable, don't care\n" }, // 709
+    // HD
+    { 1, 0, 0, "CC_A enable, 601->709\n", "Scaler CC disable\n" }, // 601
+    { 0, 0, 1, "CC_A disable\n", "Scaler CC enable, 709->601\n" }, // 709
+};
+static_assert(PMX_COLOUR_HD == PMX_COLOUR_SD + 1 && DRV_PMX_CS_YCBCR_601 == 0 && DRV_PMX_CS_YCBCR_709 == 1);
 
 void PMX_ColorSpaceSetup(DRV_PMX_COLOR_SPACE_T eMixerOutCS, UCHAR ucOutputMode)
 {
@@ -49,15 +36,17 @@ void PMX_ColorSpaceSetup(DRV_PMX_COLOR_SPACE_T eMixerOutCS, UCHAR ucOutputMode)
         return;
 
     // The mixer is never set up for RGB, although the enumeration has it.
-    if (eMixerOutCS != DRV_PMX_CS_YCBCR_601 && eMixerOutCS != DRV_PMX_CS_YCBCR_709)
+    if (eMixerOutCS > DRV_PMX_CS_YCBCR_709)
     {
         PMX_IsLog(5, "Invalid Color Space Id\n");
         Assert("0", __FILE__, __LINE__);
         return;
     }
 
-    if (u1Colour == PMX_COLOUR_SD)
-        vSetForSdOutput(eMixerOutCS);
-    else
-        vSetForHdOutput(eMixerOutCS);
+    size_t zRow = 2 * ((size_t)u1Colour - PMX_COLOUR_SD) + eMixerOutCS;
+    const CONVERSION_T* prConversion = &CONVERSIONS[zRow];
+    PMX_HalSetCC_A(0, prConversion->u1CCEnable, prConversion->u1CCDir);
+    PMX_IS_LOG_ONE_OF(9, prConversion->szCC);
+    PMX_HalSetScaler709601(0, prConversion->u1ScalerCC, prConversion->u1ScalerCC);
+    PMX_IS_LOG_ONE_OF(8, prConversion->szScalerCC);
 }

@@ -82,22 +82,28 @@ static constexpr CCIR_TEXT_T CCIR_MODE_TEXTS[] = {
     { "CCIR_656_MODE", LINE_M2, LINE_N2 },
 };
 
-static void vReportCcirLine(CCIR_LINE_T eLine, INT32 i, const CHAR* szName)
+/* A value behind the end of its list has no line. */
+static void vReportCcir(INT32 i, const CCIR_TEXT_T* prTexts, UINT32 u4TextNum, UINT32 u4Value, bool fgInput)
 {
 #define CCIR_INFO "[PMX]PMX(%d,) _arPmxConf[%d].arOutputConf[%d].eCcirDrvInfo."
-    switch (eLine)
-    {
-    case LINE_F1: PMX_IsLog(0, CCIR_INFO "eDgiFmt(%s) \n ", 0, 0, i, szName); break;
-    case LINE_F2: PMX_IsLog(0, CCIR_INFO "eDgiFmt(%s)  \n", 0, 0, i, szName); break;
-    case LINE_F3: PMX_IsLog(0, CCIR_INFO "eDgiFmt(%s) \n", 0, 0, i, szName); break;
-    case LINE_G1: PMX_IsLog(0, CCIR_INFO "eDgoFmt(%s) \n ", 0, 0, i, szName); break;
-    case LINE_G2: PMX_IsLog(0, CCIR_INFO "eDgoFmt(%s)  \n", 0, 0, i, szName); break;
-    case LINE_M1: PMX_IsLog(0, CCIR_INFO "eDgiMode(%s) \n ", 0, 0, i, szName); break;
-    case LINE_M2: PMX_IsLog(0, CCIR_INFO "eDgiMode(%s)  \n", 0, 0, i, szName); break;
-    case LINE_N1: PMX_IsLog(0, CCIR_INFO "eDgoMode(%s) \n ", 0, 0, i, szName); break;
-    case LINE_N2: PMX_IsLog(0, CCIR_INFO "eDgoMode(%s)  \n", 0, 0, i, szName); break;
-    }
+    static constexpr const CHAR* TEXTS[] = {
+        CCIR_INFO "eDgiFmt(%s) \n ",  // LINE_F1
+        CCIR_INFO "eDgiFmt(%s)  \n",  // LINE_F2
+        CCIR_INFO "eDgiFmt(%s) \n",   // LINE_F3
+        CCIR_INFO "eDgoFmt(%s) \n ",  // LINE_G1
+        CCIR_INFO "eDgoFmt(%s)  \n",  // LINE_G2
+        CCIR_INFO "eDgiMode(%s) \n ", // LINE_M1
+        CCIR_INFO "eDgiMode(%s)  \n", // LINE_M2
+        CCIR_INFO "eDgoMode(%s) \n ", // LINE_N1
+        CCIR_INFO "eDgoMode(%s)  \n", // LINE_N2
+    };
 #undef CCIR_INFO
+    static_assert(COUNT_OF(TEXTS) == LINE_N2 + 1);
+
+    if (u4Value >= u4TextNum)
+        return;
+    const CCIR_TEXT_T* prText = &prTexts[u4Value];
+    PMX_IS_LOG_ONE_OF(0, TEXTS[fgInput ? prText->eInputLine : prText->eOutputLine], 0, 0, i, prText->szName);
 }
 
 static void vReportRecord(const PMX_CONF_T* prConf)
@@ -169,14 +175,10 @@ static void vReportOutput(INT32 i, const PMX_RESOLUTION_T* prOutput)
         PMX_IsLog(0, "[PMX] PMX(%d ), _arPmxConf[%d].arOutputConf[%d].eResMode(%s)\n", 0, 0, i, szRes);
 
     const CCIR_DRV_INFO_T* prCcir = &prOutput->eCcirDrvInfo;
-    if (prCcir->eDgiFmt < COUNT_OF(CCIR_FORMAT_TEXTS))
-        vReportCcirLine(CCIR_FORMAT_TEXTS[prCcir->eDgiFmt].eInputLine, i, CCIR_FORMAT_TEXTS[prCcir->eDgiFmt].szName);
-    if (prCcir->eDgiMode < COUNT_OF(CCIR_MODE_TEXTS))
-        vReportCcirLine(CCIR_MODE_TEXTS[prCcir->eDgiMode].eInputLine, i, CCIR_MODE_TEXTS[prCcir->eDgiMode].szName);
-    if (prCcir->eDgoFmt < COUNT_OF(CCIR_FORMAT_TEXTS))
-        vReportCcirLine(CCIR_FORMAT_TEXTS[prCcir->eDgoFmt].eOutputLine, i, CCIR_FORMAT_TEXTS[prCcir->eDgoFmt].szName);
-    if (prCcir->eDgoMode < COUNT_OF(CCIR_MODE_TEXTS))
-        vReportCcirLine(CCIR_MODE_TEXTS[prCcir->eDgoMode].eOutputLine, i, CCIR_MODE_TEXTS[prCcir->eDgoMode].szName);
+    vReportCcir(i, CCIR_FORMAT_TEXTS, COUNT_OF(CCIR_FORMAT_TEXTS), prCcir->eDgiFmt, true);
+    vReportCcir(i, CCIR_MODE_TEXTS, COUNT_OF(CCIR_MODE_TEXTS), prCcir->eDgiMode, true);
+    vReportCcir(i, CCIR_FORMAT_TEXTS, COUNT_OF(CCIR_FORMAT_TEXTS), prCcir->eDgoFmt, false);
+    vReportCcir(i, CCIR_MODE_TEXTS, COUNT_OF(CCIR_MODE_TEXTS), prCcir->eDgoMode, false);
 }
 
 void PMX_QueryStatus(void)

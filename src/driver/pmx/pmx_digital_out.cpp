@@ -7,54 +7,45 @@
 #include "x_avd.h"
 #include "x_plane_mxr.h"
 
-#define CAP_DIGITAL_OUT 0x02000000
-
-static bool fgHasDigitalOut(void)
-{
-    return (prPmxConf()->u4Capability & CAP_DIGITAL_OUT) != 0;
-}
-
 /* HDMI's code for each PLA_MXR_DIGITAL_OUTPUT_FMT_T. */
 static constexpr UINT8 HDMI_COLOR_MODES[] = { HDMI_YCBCR_444, HDMI_RGB, HDMI_XV_YCC, HDMI_YCBCR_422, HDMI_RGB_FULL };
 static_assert(sizeof HDMI_COLOR_MODES == PLA_MXR_DIGITAL_OUTPUT_FMT_FULL_RGB + 1);
 
+void vPmxProgramDigitalOut(void)
+{
+    const PMX_CONF_T* prConf = prPmxConf();
+
+    PMX_HalSetDigitalOut(0, prConf->ucDigitalOut, prConf->ucProprietaryMode, prConf->ucDigitalBit);
+    PMX_HalSetDigitalOutRgb(0, prConf->ucDigitalRgb);
+}
+
 UINT32 PMX_SetDigitalOutEnable(UCHAR ucPmxId, UCHAR ucEnable)
 {
-    if (ucPmxId != 0 || !fgHasDigitalOut())
+    if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_DIGITAL_OUT))
         return 0;
 
     PMX_CONF_T* prConf = prPmxConf();
     prConf->ucDigitalOut = ucEnable;
     if (prConf->ucEnable != 0)
-    {
-        PMX_HalSetDigitalOut(0, ucEnable, prConf->ucProprietaryMode, prConf->ucDigitalBit);
-        PMX_HalSetDigitalOutRgb(0, prConf->ucDigitalRgb);
-    }
+        vPmxProgramDigitalOut();
     return 1;
 }
 
 UINT32 PMX_GetDigitalOutEnable(UCHAR ucPmxId, UCHAR* pucEnable)
 {
-    if (ucPmxId != 0 || pucEnable == nullptr || !fgHasDigitalOut())
-        return 0;
-
-    *pucEnable = prPmxConf()->ucDigitalOut;
-    return 1;
+    return u4PmxGiveFeature(ucPmxId, PMX_CAP_DIGITAL_OUT, prPmxConf()->ucDigitalOut, pucEnable);
 }
 
 UINT32 PMX_SetDigitalOutPara(UCHAR ucPmxId, UCHAR ucDigitalBit, UCHAR ucProprietaryMode)
 {
-    if (ucPmxId != 0 || !fgHasDigitalOut())
+    if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_DIGITAL_OUT))
         return 0;
 
     PMX_CONF_T* prConf = prPmxConf();
     prConf->ucDigitalBit = ucDigitalBit;
     prConf->ucProprietaryMode = ucProprietaryMode;
     if (prConf->ucEnable != 0)
-    {
-        PMX_HalSetDigitalOut(0, prConf->ucDigitalOut, ucProprietaryMode, ucDigitalBit);
-        PMX_HalSetDigitalOutRgb(0, prConf->ucDigitalRgb);
-    }
+        vPmxProgramDigitalOut();
     return 1;
 }
 
@@ -92,9 +83,5 @@ UINT32 PMX_SetDigitalOutRgb(UCHAR ucPmxId, UCHAR ucRgb)
 
 UINT32 PMX_GetDigitalOutRgb(UCHAR ucPmxId, UCHAR* pucRgb)
 {
-    if (ucPmxId != 0 || pucRgb == nullptr)
-        return 0;
-
-    *pucRgb = prPmxConf()->ucDigitalRgb;
-    return 1;
+    return u4PmxGiveByte(ucPmxId, prPmxConf()->ucDigitalRgb, pucRgb);
 }

@@ -17,6 +17,31 @@ constinit BOOL _PmxTestOsd = 0;
 constinit BOOL _fg2DCap = 0;
 constinit UINT32 PMX_debug_level = 0;
 
+/* Answers */
+
+UINT32 u4PmxGiveByte(UCHAR ucPmxId, UCHAR ucValue, UCHAR* pucValue)
+{
+    if (ucPmxId != 0 || pucValue == nullptr)
+        return 0;
+
+    *pucValue = ucValue;
+    return 1;
+}
+
+UINT32 u4PmxGiveWord(UCHAR ucPmxId, UINT32 u4Value, UINT32* pu4Value)
+{
+    if (ucPmxId != 0 || pu4Value == nullptr)
+        return 0;
+
+    *pu4Value = u4Value;
+    return 1;
+}
+
+UINT32 u4PmxGiveFeature(UCHAR ucPmxId, UINT32 u4CapBit, UCHAR ucValue, UCHAR* pucValue)
+{
+    return fgPmxHasCap(u4CapBit) ? u4PmxGiveByte(ucPmxId, ucValue, pucValue) : 0;
+}
+
 /* Default record */
 
 static constexpr PMX_PORT_INFO_T VIDEO_PORT = { .u2CompType = 0,
@@ -123,56 +148,56 @@ static constexpr UINT8 NEVER = PMX_CAP_NEVER;
  * - RES_3D_1080P23HZ_TB hangs on the bit of 29.97 Hz, not on that of 23.976 Hz. */
 // clang-format off
 constexpr PMX_MODE_ROW_T _arPmxModeRow[PMX_MODE_ROW_NUM + 1] = {
-    // mode                    width height  flags                                     cap     colour bar
-    { RES_480I,                  720,  480,  PLL60 | BOOT60,                           0,      SD,   22 },
-    { RES_576I,                  720,  576,          BOOT50,                           1,      SD,   22 },
-    { RES_480P,                  720,  480,  PLL60 | BOOT60 | PROGR,                   2,      SD,   22 },
-    { RES_576P,                  720,  576,          BOOT50 | PROGR,                   3,      SD,   22 },
-    { RES_480P_1440,             720,  480,  PLL60          | PROGR,                   ALWAYS, SD,   30 },
-    { RES_576P_1440,             720,  576,                   PROGR,                   ALWAYS, SD,   30 },
-    { RES_480P_2880,             720,  480,  PLL60          | PROGR,                   ALWAYS, SD,   30 },
-    { RES_576P_2880,             720,  576,                   PROGR,                   ALWAYS, SD,   30 },
-    { RES_720P60HZ,             1280,  720,  PLL60 | BOOT60 | PROGR | HDOUT | TVEHD,   4,      HD,   20 },
-    { RES_720P50HZ,             1280,  720,          BOOT50 | PROGR | HDOUT | TVEHD,   5,      HD,   20 },
-    { RES_1080I60HZ,            1920, 1080,  PLL60 | BOOT60         | HDOUT | TVEHD,   6,      HD,   30 },
-    { RES_1080I50HZ,            1920, 1080,          BOOT50         | HDOUT | TVEHD,   7,      HD,   30 },
-    { RES_1080P60HZ,            1920, 1080,  PLL60 | BOOT60 | PROGR | HDOUT | TVEHD,   8,      HD,   30 },
-    { RES_1080P50HZ,            1920, 1080,          BOOT50 | PROGR | HDOUT | TVEHD,   9,      HD,   30 },
-    { RES_1080P30HZ,            1920, 1080,  PLL60          | PROGR | HDOUT | TVEHD,   10,     HD,   30 },
-    { RES_1080P25HZ,            1920, 1080,                   PROGR | HDOUT | TVEHD,   11,     HD,   30 },
-    { RES_480I_2880,             720,  480,  PLL60,                                    ALWAYS, SD,   30 },
-    { RES_576I_2880,             720,  576,  0,                                        ALWAYS, SD,   30 },
-    { RES_1080P24HZ,            1920, 1080,                   PROGR | HDOUT | TVEHD,   12,     HD,   30 },
-    { RES_1080P23_976HZ,        1920, 1080,  PLL60                  | HDOUT | TVEHD,   13,     HD,   30 },
-    { RES_1080P29_97HZ,         1920, 1080,  PLL60                  | HDOUT,           14,     HD,   30 },
-    { RES_3D_1080P23HZ,         1920, 1080,  PLL60          | PROGR | HDOUT | TVEHD,   15,     HD,   30 },
-    { RES_3D_1080P24HZ,         1920, 1080,                   PROGR | HDOUT | TVEHD,   15,     HD,   30 },
-    { RES_3D_720P60HZ,          1280,  720,  PLL60          | PROGR | HDOUT | TVEHD,   15,     HD,   30 },
-    { RES_3D_720P50HZ,          1280,  720,                   PROGR | HDOUT | TVEHD,   15,     HD,   30 },
-    { RES_3D_720P30HZ,          1280,  720,  PLL60          | PROGR | HDOUT | TVEHD,   15,     HD,   30 },
-    { RES_3D_720P25HZ,          1280,  720,                   PROGR | HDOUT | TVEHD,   15,     HD,   30 },
-    { RES_3D_576P50HZ,           720,  576,                   PROGR,                   15,     SD,   30 },
-    { RES_3D_480P60HZ,           720,  480,  PLL60          | PROGR,                   15,     SD,   30 },
-    { RES_3D_1080I60HZ,         1920, 1080,  PLL60                  | HDOUT | TVEHD,   15,     HD,   30 },
-    { RES_3D_1080I50HZ,         1920, 1080,                           HDOUT | TVEHD,   15,     HD,   30 },
-    { RES_3D_1080I30HZ,         1920, 1080,  PLL60                  | HDOUT | TVEHD,   15,     HD,   30 },
-    { RES_3D_1080I25HZ,         1920, 1080,                           HDOUT | TVEHD,   15,     HD,   30 },
-    { RES_3D_576I25HZ,           720,  576,  0,                                        15,     SD,   30 },
-    { RES_3D_480I30HZ,           720,  480,  PLL60,                                    15,     SD,   30 },
-    { RES_3D_576I50HZ,           720,  576,  0,                                        15,     SD,   30 },
-    { RES_3D_480I60HZ,           720,  480,  PLL60,                                    15,     SD,   30 },
-    { RES_2D_480I60HZ,           720,  480,  PLL60,                                    0,      SD,   30 },
-    { RES_2D_576I50HZ,          1920, 1080,                           HDOUT,           NEVER,  NONE, 30 },
-    { RES_2D_640x480HZ,          640,  480,  PLL60          | PROGR,                   16,     SD,   30 },
-    { RES_PANEL_AUO_B089AW01,   1024,  600,  PLL60          | PROGR | HDOUT | TVEHD,   ALWAYS, SD,   30 },
-    { RES_3D_720P60HZ_TB,       1280,  720,  PLL60                  | HDOUT | TVEHD,   4,      HD,   30 },
-    { RES_3D_720P50HZ_TB,       1280,  720,                           HDOUT | TVEHD,   5,      HD,   30 },
-    { RES_3D_1080I60HZ_SBS_HALF,1920, 1080,  PLL60                  | HDOUT | TVEHD,   6,      HD,   30 },
-    { RES_3D_1080I50HZ_SBS_HALF,1920, 1080,                           HDOUT | TVEHD,   7,      HD,   30 },
-    { RES_3D_1080P23HZ_TB,      1920, 1080,  PLL60                  | HDOUT | TVEHD,   14,     HD,   30 },
-    { RES_3D_1080P24HZ_TB,      1920, 1080,                           HDOUT | TVEHD,   12,     HD,   30 },
+    // mode                    cap     colour width height  flags                                          bar
+    { RES_480I,                  0,      SD,    720,  480,  PLL60 | BOOT60,                                 22 },
+    { RES_576I,                  1,      SD,    720,  576,          BOOT50,                                 22 },
+    { RES_480P,                  2,      SD,    720,  480,  PLL60 | BOOT60 | PROGR,                         22 },
+    { RES_576P,                  3,      SD,    720,  576,          BOOT50 | PROGR,                         22 },
+    { RES_480P_1440,             ALWAYS, SD,    720,  480,  PLL60          | PROGR,                         30 },
+    { RES_576P_1440,             ALWAYS, SD,    720,  576,                   PROGR,                         30 },
+    { RES_480P_2880,             ALWAYS, SD,    720,  480,  PLL60          | PROGR,                         30 },
+    { RES_576P_2880,             ALWAYS, SD,    720,  576,                   PROGR,                         30 },
+    { RES_720P60HZ,              4,      HD,   1280,  720,  PLL60 | BOOT60 | PROGR | HDOUT | TVEHD,         20 },
+    { RES_720P50HZ,              5,      HD,   1280,  720,          BOOT50 | PROGR | HDOUT | TVEHD,         20 },
+    { RES_1080I60HZ,             6,      HD,   1920, 1080,  PLL60 | BOOT60         | HDOUT | TVEHD,         30 },
+    { RES_1080I50HZ,             7,      HD,   1920, 1080,          BOOT50         | HDOUT | TVEHD,         30 },
+    { RES_1080P60HZ,             8,      HD,   1920, 1080,  PLL60 | BOOT60 | PROGR | HDOUT | TVEHD,         30 },
+    { RES_1080P50HZ,             9,      HD,   1920, 1080,          BOOT50 | PROGR | HDOUT | TVEHD,         30 },
+    { RES_1080P30HZ,             10,     HD,   1920, 1080,  PLL60          | PROGR | HDOUT | TVEHD,         30 },
+    { RES_1080P25HZ,             11,     HD,   1920, 1080,                   PROGR | HDOUT | TVEHD,         30 },
+    { RES_480I_2880,             ALWAYS, SD,    720,  480,  PLL60,                                          30 },
+    { RES_576I_2880,             ALWAYS, SD,    720,  576,  0,                                              30 },
+    { RES_1080P24HZ,             12,     HD,   1920, 1080,                   PROGR | HDOUT | TVEHD,         30 },
+    { RES_1080P23_976HZ,         13,     HD,   1920, 1080,  PLL60                  | HDOUT | TVEHD,         30 },
+    { RES_1080P29_97HZ,          14,     HD,   1920, 1080,  PLL60                  | HDOUT,                 30 },
+    { RES_3D_1080P23HZ,          15,     HD,   1920, 1080,  PLL60          | PROGR | HDOUT | TVEHD,         30 },
+    { RES_3D_1080P24HZ,          15,     HD,   1920, 1080,                   PROGR | HDOUT | TVEHD,         30 },
+    { RES_3D_720P60HZ,           15,     HD,   1280,  720,  PLL60          | PROGR | HDOUT | TVEHD,         30 },
+    { RES_3D_720P50HZ,           15,     HD,   1280,  720,                   PROGR | HDOUT | TVEHD,         30 },
+    { RES_3D_720P30HZ,           15,     HD,   1280,  720,  PLL60          | PROGR | HDOUT | TVEHD,         30 },
+    { RES_3D_720P25HZ,           15,     HD,   1280,  720,                   PROGR | HDOUT | TVEHD,         30 },
+    { RES_3D_576P50HZ,           15,     SD,    720,  576,                   PROGR,                         30 },
+    { RES_3D_480P60HZ,           15,     SD,    720,  480,  PLL60          | PROGR,                         30 },
+    { RES_3D_1080I60HZ,          15,     HD,   1920, 1080,  PLL60                  | HDOUT | TVEHD,         30 },
+    { RES_3D_1080I50HZ,          15,     HD,   1920, 1080,                           HDOUT | TVEHD,         30 },
+    { RES_3D_1080I30HZ,          15,     HD,   1920, 1080,  PLL60                  | HDOUT | TVEHD,         30 },
+    { RES_3D_1080I25HZ,          15,     HD,   1920, 1080,                           HDOUT | TVEHD,         30 },
+    { RES_3D_576I25HZ,           15,     SD,    720,  576,  0,                                              30 },
+    { RES_3D_480I30HZ,           15,     SD,    720,  480,  PLL60,                                          30 },
+    { RES_3D_576I50HZ,           15,     SD,    720,  576,  0,                                              30 },
+    { RES_3D_480I60HZ,           15,     SD,    720,  480,  PLL60,                                          30 },
+    { RES_2D_480I60HZ,           0,      SD,    720,  480,  PLL60,                                          30 },
+    { RES_2D_576I50HZ,           NEVER,  NONE, 1920, 1080,                           HDOUT,                 30 },
+    { RES_2D_640x480HZ,          16,     SD,    640,  480,  PLL60          | PROGR,                         30 },
+    { RES_PANEL_AUO_B089AW01,    ALWAYS, SD,   1024,  600,  PLL60          | PROGR | HDOUT | TVEHD,         30 },
+    { RES_3D_720P60HZ_TB,        4,      HD,   1280,  720,  PLL60                  | HDOUT | TVEHD,         30 },
+    { RES_3D_720P50HZ_TB,        5,      HD,   1280,  720,                           HDOUT | TVEHD,         30 },
+    { RES_3D_1080I60HZ_SBS_HALF, 6,      HD,   1920, 1080,  PLL60                  | HDOUT | TVEHD,         30 },
+    { RES_3D_1080I50HZ_SBS_HALF, 7,      HD,   1920, 1080,                           HDOUT | TVEHD,         30 },
+    { RES_3D_1080P23HZ_TB,       14,     HD,   1920, 1080,  PLL60                  | HDOUT | TVEHD,         30 },
+    { RES_3D_1080P24HZ_TB,       12,     HD,   1920, 1080,                           HDOUT | TVEHD,         30 },
     // unknown: the 4K modes, RES_MODE_NUM, RES_AUTO and every other number
-    { PMX_MODE_ROW_NUM,         1920, 1080,                           HDOUT,           NEVER,  NONE, 30 },
+    { PMX_MODE_ROW_NUM,          NEVER,  NONE, 1920, 1080,                           HDOUT,                 30 },
 };
 // clang-format on
 

@@ -4,6 +4,7 @@
 #ifndef PMX_IF_H
 #define PMX_IF_H
 
+#include "drv_av_d.h"
 #include "drv_if_pmx.h"
 #include "drv_if_vdp.h"
 #include "x_typedef.h"
@@ -78,9 +79,19 @@ typedef struct
     UINT8 fgOSD5; /* fifth-OSD mode as PMX_SetModeEx last got it */
 } PMX_CONF_T;
 
+/* Features' bits of the capability word; below them are the modes'. */
+#define PMX_CAP_GAMMA 20
+#define PMX_CAP_BRIGHTNESS 21
+#define PMX_CAP_CONTRAST 22
+#define PMX_CAP_HUE 23
+#define PMX_CAP_SATURATION 24
+#define PMX_CAP_DIGITAL_OUT 25
+#define PMX_CAP_SHARPNESS 27
+#define PMX_CAP_BLACK_LEVEL 30
+
 /* Capability bit of a mode's row, where it is not a bit number. */
-#define PMX_CAP_ALWAYS 0xFE /* admitted whatever the capability word says */
-#define PMX_CAP_NEVER 0xFF
+#define PMX_CAP_ALWAYS 0x3E /* admitted whatever the capability word says */
+#define PMX_CAP_NEVER 0x3F
 
 /* Colour group of a mode: which standard its outputs carry. */
 #define PMX_COLOUR_NONE 0 /* converters are left alone */
@@ -95,17 +106,18 @@ typedef struct
 #define PMX_MODE_HD_OUT 0x10      /* reported as an HD output */
 #define PMX_MODE_TVE_HD 0x20      /* an HD format for the TV encoders and for plane delays */
 
-/* Everything that is decided from the resolution mode. */
+/* Everything that is decided from the resolution mode, in eight bytes. */
 typedef struct
 {
-    UINT8 u1Mode; /* PMX_RESOLUTION_MODE_T: the row's own number */
+    UINT8 u1Mode;       /* PMX_RESOLUTION_MODE_T: the row's own number */
+    UINT8 u1CapBit : 6; /* 0 to 16, PMX_CAP_ALWAYS or PMX_CAP_NEVER */
+    UINT8 u1Colour : 2; /* PMX_COLOUR_… */
     UINT16 u2Width;
     UINT16 u2Height;
     UINT8 u1Flags;   /* PMX_MODE_… */
-    UINT8 u1CapBit;  /* 0 to 16, PMX_CAP_ALWAYS or PMX_CAP_NEVER */
-    UINT8 u1Colour;  /* PMX_COLOUR_… */
     UINT8 u1CBWidth; /* colour-bar width in the hardware's unit */
 } PMX_MODE_ROW_T;
+DRV_STATIC_ASSERT(sizeof(PMX_MODE_ROW_T) == 8, "a row of the mode table has no gaps");
 
 #define PMX_MODE_ROW_NUM (RES_3D_1080P24HZ_TB + 1)
 #define PMX_GAMMA_CURVE_NUM 4
@@ -141,11 +153,61 @@ static inline const CHAR* szPmxModeName(UINT32 u4Mode)
     return u4Mode < RES_MODE_NUM ? szResStr[u4Mode] : nullptr;
 }
 
+/* Whether the capability word has a feature's bit. */
+static inline bool fgPmxHasCap(UINT32 u4CapBit)
+{
+    return (prPmxConf()->u4Capability >> u4CapBit & 1) != 0;
+}
+
+/* The port of a video plane: the later two share that of the second. PMX_PORT_NUM when there is no such plane. */
+static inline UINT32 u4PmxVdpPort(UCHAR ucVdpId)
+{
+    if (ucVdpId > 3)
+        return PMX_PORT_NUM;
+    return ucVdpId != 0;
+}
+
+/* The port of an OSD plane; PMX_PORT_NUM when there is no such plane. */
+static inline UINT32 u4PmxOsdPort(UCHAR ucOsdId)
+{
+    return ucOsdId > 5 ? PMX_PORT_NUM : ucOsdId + 2u;
+}
+
 /* The mixer id that an IPMX tag carries. */
 static inline UCHAR ucPmxIdOfTag(void* pvTag)
 {
     return (UCHAR)(size_t)pvTag;
 }
+
+/* Log one of several texts, all of which take the values given; the compiler cannot look into them. */
+#define PMX_IS_LOG_ONE_OF(i4Level, szText, ...)                                                  \
+    do                                                                                           \
+    {                                                                                            \
+        _Pragma("GCC diagnostic push") _Pragma("GCC diagnostic ignored \"-Wformat-nonliteral\"") \
+            _Pragma("GCC diagnostic ignored \"-Wformat-security\"")                              \
+                PMX_IsLog(i4Level, szText __VA_OPT__(, ) __VA_ARGS__);                           \
+        _Pragma("GCC diagnostic pop")                                                            \
+    }                                                                                            \
+    while (0)
+
+/* Take MutexPMX, or give it back: around changes of the ports and calls into the video planes. Never nested. */
+void vPmxLock(void);
+void vPmxUnlock(void);
+
+/* Program the digital port as the record has it. */
+void vPmxProgramDigitalOut(void);
+
+/* Write a value for a caller: 0 for an unknown mixer or a null pointer, else 1. */
+UINT32 u4PmxGiveByte(UCHAR ucPmxId, UCHAR ucValue, UCHAR* pucValue);
+UINT32 u4PmxGiveWord(UCHAR ucPmxId, UINT32 u4Value, UINT32* pu4Value);
+/* The same for a feature, which the capability word must have. */
+UINT32 u4PmxGiveFeature(UCHAR ucPmxId, UINT32 u4CapBit, UCHAR ucValue, UCHAR* pucValue);
+
+/* Choose the TV system of both ways of mode setting. */
+void vPmxSetTvType(bool fgNtsc);
+
+/* How both ways of mode setting end: the video planes, HDMI and the OSD driver learn that everything is programmed. */
+void vPmxFinishModeChange(PMX_SET_HDMI_RES_PARAMETER_T* prResData);
 
 /* Hand the stacking order to the hardware, with the number that goes with the occasion: 3 at reset, 8 for a request. */
 void vPmxProgramPlaneOrder(UINT32 u4Number);

@@ -86,6 +86,15 @@ void PMX_Reset(UCHAR ucPmxId)
     VDP_SetTvFormat(prConf->ucMode, 1);
 }
 
+/* What both ways of shutting down begin with. */
+static void vLeaveStack(void)
+{
+    PMX_VsyncStop();
+    i4PmxUnregisterIM(PMX_COMP_TYPE_PMX, 0);
+    if (x_timer_delete(_arPmxDispPartStatus.hPMXTimer) != OSR_OK)
+        Assert("x_timer_delete(_arPmxDispPartStatus.hPMXTimer)==OSR_OK", __FILE__, __LINE__);
+}
+
 void PMX_Uninit(void)
 {
     PMX_IsLog(1, "PMX_Uninit\n");
@@ -93,10 +102,7 @@ void PMX_Uninit(void)
         return;
 
     unregister_pm_ops(&pmx_pm_ops);
-    PMX_VsyncStop();
-    i4PmxUnregisterIM(PMX_COMP_TYPE_PMX, 0);
-    if (x_timer_delete(_arPmxDispPartStatus.hPMXTimer) != OSR_OK)
-        Assert("x_timer_delete(_arPmxDispPartStatus.hPMXTimer)==OSR_OK", __FILE__, __LINE__);
+    vLeaveStack();
     if (x_sema_delete(MutexPMX) != OSR_OK)
         Assert("x_sema_delete (MutexPMX) == OSR_OK", __FILE__, __LINE__);
     MutexPMX = 0;
@@ -112,10 +118,7 @@ INT32 i4PMX_Uninit(UINT32 u4Case)
     PMX_IsLog(1, "i4PMX_Uninit u4Case %d\n", (INT32)u4Case);
     if (_PmxInitiated == 1)
     {
-        PMX_VsyncStop();
-        i4PmxUnregisterIM(PMX_COMP_TYPE_PMX, 0);
-        if (x_timer_delete(_arPmxDispPartStatus.hPMXTimer) != OSR_OK)
-            Assert("x_timer_delete(_arPmxDispPartStatus.hPMXTimer)==OSR_OK", __FILE__, __LINE__);
+        vLeaveStack();
         if (MutexPMX != 0)
         {
             if (x_sema_delete(MutexPMX) == OSR_OK)
@@ -174,11 +177,7 @@ INT32 i4PmxUnregisterIM(UINT16 u2CompType, UINT16 u2CompId)
 
 UINT32 PMX_GetCap(UCHAR ucPmxId, UINT32* pu4Cap)
 {
-    if (ucPmxId != 0 || pu4Cap == nullptr)
-        return 0;
-
-    *pu4Cap = prPmxConf()->u4Capability;
-    return 1;
+    return u4PmxGiveWord(ucPmxId, prPmxConf()->u4Capability, pu4Cap);
 }
 
 UINT32 PMX_SetEnable(UCHAR ucPmxId, UCHAR ucEnable)
@@ -193,8 +192,7 @@ UINT32 PMX_SetEnable(UCHAR ucPmxId, UCHAR ucEnable)
     if (ucEnable != 0)
     {
         PMX_VsyncEnable();
-        PMX_HalSetDigitalOut(0, prConf->ucDigitalOut, prConf->ucProprietaryMode, prConf->ucDigitalBit);
-        PMX_HalSetDigitalOutRgb(0, prConf->ucDigitalRgb);
+        vPmxProgramDigitalOut();
         PMX_HalSetDigitalOutPhase(0, prConf->u4Phase);
     }
     else
@@ -208,11 +206,7 @@ UINT32 PMX_SetEnable(UCHAR ucPmxId, UCHAR ucEnable)
 
 UINT32 PMX_GetEnable(UCHAR ucPmxId, UCHAR* pucEnable)
 {
-    if (ucPmxId != 0 || pucEnable == nullptr)
-        return 0;
-
-    *pucEnable = prPmxConf()->ucEnable;
-    return 1;
+    return u4PmxGiveByte(ucPmxId, prPmxConf()->ucEnable, pucEnable);
 }
 
 /* Whether a video plane sits in the second mixer plane. The hardware's swap decides: not every switch of it is in

@@ -11,11 +11,26 @@
 UINT32 PMX_CheckCap(UCHAR, UCHAR ucMode)
 {
     UINT8 u1CapBit = prPmxModeRow(ucMode)->u1CapBit;
-    if (u1CapBit == PMX_CAP_ALWAYS)
-        return 1;
-    if (u1CapBit == PMX_CAP_NEVER)
-        return 0;
-    return (prPmxConf()->u4Capability >> u1CapBit) & 1;
+    if (u1CapBit >= PMX_CAP_ALWAYS) // always or never
+        return u1CapBit == PMX_CAP_ALWAYS;
+    return fgPmxHasCap(u1CapBit);
+}
+
+void vPmxSetTvType(bool fgNtsc)
+{
+    if (PMX_SetTvType(0, fgNtsc ? PMX_TV_TYPE_NTSC : PMX_TV_TYPE_PAL) != PMX_SET_OK)
+        Assert(fgNtsc ? "PMX_SetTvType(ucPmxId, PMX_TV_TYPE_NTSC) == PMX_SET_OK"
+                      : "PMX_SetTvType(ucPmxId, PMX_TV_TYPE_PAL) == PMX_SET_OK",
+               __FILE__, __LINE__);
+}
+
+void vPmxFinishModeChange(PMX_SET_HDMI_RES_PARAMETER_T* prResData)
+{
+    VDP_GlobalOutputChange();
+    for (UINT32 u4VdpIdx = 0; u4VdpIdx < 3; u4VdpIdx++)
+        VDP_VsyncSendCmd(u4VdpIdx, 2);
+    fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, prResData, 1);
+    OSD_BASE_SetFlag_PMXChangeResDone();
 }
 
 UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
@@ -56,16 +71,7 @@ UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
     VDP_SetTvFormat(ucMode, 1);
 
     bool fg60Hz = ucVFreq == 60; // 60 alone; per-output mode setting takes more frequencies for NTSC
-    if (fg60Hz)
-    {
-        if (PMX_SetTvType(ucPmxId, PMX_TV_TYPE_NTSC) != PMX_SET_OK)
-            Assert("PMX_SetTvType(ucPmxId, PMX_TV_TYPE_NTSC) == PMX_SET_OK", __FILE__, __LINE__);
-    }
-    else
-    {
-        if (PMX_SetTvType(ucPmxId, PMX_TV_TYPE_PAL) != PMX_SET_OK)
-            Assert("PMX_SetTvType(ucPmxId, PMX_TV_TYPE_PAL) == PMX_SET_OK", __FILE__, __LINE__);
-    }
+    vPmxSetTvType(fg60Hz);
 
     BOOL fgHD = fgPmxTveHd(ucMode);
     TVE_SetFmtEx(TVE_1, ucMode, ucVFreq, ucMode, 1, fgHD, fgOSD5);
@@ -73,11 +79,7 @@ UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
 
     PMX_HalReset(0);
     PMX_HalScalerReset(0);
-    VDP_GlobalOutputChange();
-    for (UINT32 u4VdpIdx = 0; u4VdpIdx < 3; u4VdpIdx++)
-        VDP_VsyncSendCmd(u4VdpIdx, 2);
-    fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, &rResData, 1);
-    OSD_BASE_SetFlag_PMXChangeResDone();
+    vPmxFinishModeChange(&rResData);
     return 1;
 }
 
@@ -88,11 +90,7 @@ INT32 i4PmxSetMode(void* pvTag, UCHAR ucMode, UCHAR ucVFreq, BOOL fgOSD5)
 
 UINT32 PMX_GetMode(UCHAR ucPmxId, UCHAR* pucMode)
 {
-    if (ucPmxId != 0 || pucMode == nullptr)
-        return 0;
-
-    *pucMode = prPmxConf()->ucMode;
-    return 1;
+    return u4PmxGiveByte(ucPmxId, prPmxConf()->ucMode, pucMode);
 }
 
 INT32 i4PmxGetMode(void* pvTag, UCHAR* pucMode)

@@ -11,64 +11,57 @@
 
 #define DISPLAY_PART_TIMEOUT_MS 10000
 
+/* What a request says of an output. */
+typedef struct
+{
+    PMX_RESOLUTION_MODE_T eResMode; // the mixer's format while the output is off
+    BOOL fgOutputEnable;
+} OUTPUT_T;
+
 /* Working values of one call. */
 typedef struct
 {
-    const PMX_RESOLUTION_T* prOutConf; // as given
-    UCHAR ucVFreq;
-    DRV_EXT_CHIP_USAGE_T rDrvExtScl;
-    UINT8 fgOSD5;
-
-    PMX_RESOLUTION_T rCCIR; // copies; HDMI, component and composite take the mixer's format here while they are off
-    PMX_RESOLUTION_T rHDMI;
-    PMX_RESOLUTION_T rCAV;
-    PMX_RESOLUTION_T rCVBS;
     UCHAR ucFmtMode; // the mixer's format
-
+    UCHAR ucVFreq;
+    UINT8 fgOSD5;
+    BOOL fgHDExist; // the mixer's format is an HD format
     BOOL fgFmtChange;
     BOOL fgHdmiChange;
-    BOOL fgCavChange;
-    BOOL fgCvbsChange;
-    BOOL fgOSD5Change;
-    BOOL fgHDExist;   // the mixer's format is an HD format
-    BOOL fgHdmiExist; // an HDMI resolution change was sent
-    PMX_SET_HDMI_RES_PARAMETER_T stResData;
+    BOOL fgTveChange; // component, composite or the fifth OSD plane: looked at when the format is the same
+    OUTPUT_T rHDMI;
+    OUTPUT_T rCAV;
+    OUTPUT_T rCVBS;
 } MODE_EX_T;
 
-static void vLogRequest(const MODE_EX_T* pr)
+static void vLogRequest(const PMX_RESOLUTION_T* prOutConf, UINT8 fgOSD5)
 {
-    const CCIR_DRV_INFO_T* prCcir = &pr->rCCIR.eCcirDrvInfo;
+    const PMX_RESOLUTION_T* prCCIR = &prOutConf[PMX_OUTPUT_CCIR];
+    const PMX_RESOLUTION_T* prHDMI = &prOutConf[PMX_OUTPUT_HDMI];
+    const PMX_RESOLUTION_T* prCAV = &prOutConf[PMX_OUTPUT_CAV];
+    const PMX_RESOLUTION_T* prCVBS = &prOutConf[PMX_OUTPUT_CVBS];
+    const CCIR_DRV_INFO_T* prCcirInfo = &prCCIR->eCcirDrvInfo;
 
     PMX_IsLog(0, "SetModeEx\n");
-    PMX_IsLog(9, "CCIR(%d, %s)\n", pr->rCCIR.fgOutputEnable, szPmxModeName(pr->rCCIR.eResMode));
-    PMX_IsLog(9, "HDMI(%d, %s)\n", pr->rHDMI.fgOutputEnable, szPmxModeName(pr->rHDMI.eResMode));
-    PMX_IsLog(9, "CAV (%d, %s)\n", pr->rCAV.fgOutputEnable, szPmxModeName(pr->rCAV.eResMode));
-    PMX_IsLog(9, "CVBS(%d, %s)\n", pr->rCVBS.fgOutputEnable, szPmxModeName(pr->rCVBS.eResMode));
-    PMX_IsLog(9, "CCIR(%d, %d, %d, %d)\n", (INT32)prCcir->eDgoMode, (INT32)prCcir->eDgoFmt, (INT32)prCcir->eDgiMode,
-              (INT32)prCcir->eDgiFmt);
-    PMX_IsLog(9, "OSD5(%d)\n", pr->fgOSD5);
+    PMX_IsLog(9, "CCIR(%d, %s)\n", prCCIR->fgOutputEnable, szPmxModeName(prCCIR->eResMode));
+    PMX_IsLog(9, "HDMI(%d, %s)\n", prHDMI->fgOutputEnable, szPmxModeName(prHDMI->eResMode));
+    PMX_IsLog(9, "CAV (%d, %s)\n", prCAV->fgOutputEnable, szPmxModeName(prCAV->eResMode));
+    PMX_IsLog(9, "CVBS(%d, %s)\n", prCVBS->fgOutputEnable, szPmxModeName(prCVBS->eResMode));
+    PMX_IsLog(9, "CCIR(%d, %d, %d, %d)\n", (INT32)prCcirInfo->eDgoMode, (INT32)prCcirInfo->eDgoFmt,
+              (INT32)prCcirInfo->eDgiMode, (INT32)prCcirInfo->eDgiFmt);
+    PMX_IsLog(9, "OSD5(%d)\n", fgOSD5);
 }
 
 /* The first enabled output gives the mixer's format. */
-static UCHAR ucChooseFormat(const MODE_EX_T* pr)
+static UCHAR ucChooseFormat(const PMX_RESOLUTION_T* prOutConf)
 {
-    if (pr->rCCIR.fgOutputEnable != 0)
-        return (UCHAR)pr->rCCIR.eResMode;
-    if (pr->rHDMI.fgOutputEnable != 0)
-        return (UCHAR)pr->rHDMI.eResMode;
-    if (pr->rCAV.fgOutputEnable != 0)
-        return (UCHAR)pr->rCAV.eResMode;
-    if (pr->rCVBS.fgOutputEnable != 0)
-        return (UCHAR)pr->rCVBS.eResMode;
-
-    PMX_IsLog(0, "[PMX] Warning: Disable All output, set fmt as %d.\n", (INT32)pr->rHDMI.eResMode);
-    return (UCHAR)pr->rHDMI.eResMode;
-}
-
-static void vTakeFormatIfOff(PMX_RESOLUTION_T* prOutput, UCHAR ucFmtMode)
-{
-    if (prOutput->fgOutputEnable == 0)
-        prOutput->eResMode = (PMX_RESOLUTION_MODE_T)ucFmtMode;
+    for (UINT32 i = 0; i < PMX_OUTPUT_NUM; i++)
+    {
+        if (prOutConf[i].fgOutputEnable != 0)
+            return (UCHAR)prOutConf[i].eResMode;
+    }
+    PMX_RESOLUTION_MODE_T eHdmiMode = prOutConf[PMX_OUTPUT_HDMI].eResMode;
+    PMX_IsLog(0, "[PMX] Warning: Disable All output, set fmt as %d.\n", (INT32)eHdmiMode);
+    return (UCHAR)eHdmiMode;
 }
 
 static BOOL fgDiffers(const PMX_RESOLUTION_T* prStored, const PMX_RESOLUTION_T* prGiven)
@@ -78,29 +71,24 @@ static BOOL fgDiffers(const PMX_RESOLUTION_T* prStored, const PMX_RESOLUTION_T* 
 
 /* Find what changed, against what the record holds, and store the request. The video PLL is set here too, for a new
  * frequency alone: a new format at the old frequency leaves it. */
-static void vFindChanges(MODE_EX_T* pr)
+static void vFindChanges(MODE_EX_T* pr, const PMX_RESOLUTION_T* prGiven, DRV_EXT_CHIP_USAGE_T rDrvExtScl)
 {
     PMX_CONF_T* prConf = prPmxConf();
     PMX_RESOLUTION_T* prStored = prConf->arOutputConf;
-    const PMX_RESOLUTION_T* prGiven = pr->prOutConf;
 
+    pr->fgFmtChange = TRUE;
     if (prConf->ucVfreq != pr->ucVFreq)
         vSetPLLGP_HDMIDDS(pr->ucFmtMode);
-
-    pr->fgFmtChange = prConf->ucMode != pr->ucFmtMode || prConf->ucVfreq != pr->ucVFreq ||
-                      prConf->fgSetModeCalled == 0 || prConf->rDrvExtScl != pr->rDrvExtScl;
+    else if (prConf->ucMode == pr->ucFmtMode && prConf->fgSetModeCalled != 0 && prConf->rDrvExtScl == rDrvExtScl)
+        pr->fgFmtChange = FALSE;
     prConf->ucMode = pr->ucFmtMode;
     prConf->ucVfreq = pr->ucVFreq;
     prConf->fgSetModeCalled = 1;
-    prConf->rDrvExtScl = pr->rDrvExtScl;
+    prConf->rDrvExtScl = rDrvExtScl;
 
-    if (fgDiffers(&prStored[PMX_OUTPUT_HDMI], &prGiven[PMX_OUTPUT_HDMI]))
-        pr->fgHdmiChange = TRUE;
-    else
-        pr->fgHdmiChange = fgIsHotPlugChgRes() == 1;
-    pr->fgCavChange = fgDiffers(&prStored[PMX_OUTPUT_CAV], &prGiven[PMX_OUTPUT_CAV]);
-    pr->fgCvbsChange = fgDiffers(&prStored[PMX_OUTPUT_CVBS], &prGiven[PMX_OUTPUT_CVBS]);
-    pr->fgOSD5Change = prConf->fgOSD5 != pr->fgOSD5;
+    pr->fgHdmiChange = fgDiffers(&prStored[PMX_OUTPUT_HDMI], &prGiven[PMX_OUTPUT_HDMI]) || fgIsHotPlugChgRes() == 1;
+    pr->fgTveChange = fgDiffers(&prStored[PMX_OUTPUT_CAV], &prGiven[PMX_OUTPUT_CAV]) ||
+                      fgDiffers(&prStored[PMX_OUTPUT_CVBS], &prGiven[PMX_OUTPUT_CVBS]) || prConf->fgOSD5 != pr->fgOSD5;
 
     for (UINT32 i = 0; i < PMX_OUTPUT_NUM; i++) // as given: the next request is compared with this one
     {
@@ -112,24 +100,17 @@ static void vFindChanges(MODE_EX_T* pr)
     if (_fgBootUp == 1) // the record does not tell what the boot loader set: the first call leaves nothing out
     {
         pr->fgFmtChange = TRUE;
-        pr->fgHdmiChange = TRUE;
-        pr->fgCavChange = TRUE;
-        pr->fgCvbsChange = TRUE;
         _fgBootUp = 0;
     }
 }
 
-static void vFillResData(MODE_EX_T* pr)
+/* An output that is off runs the mixer's format. */
+static OUTPUT_T rInForce(const PMX_RESOLUTION_T* prGiven, UCHAR ucFmtMode)
 {
-    pr->stResData.u1ScaleMode = 0;
-    pr->stResData.ucHdmiOutDisplayResolution = (UINT8)pr->rHDMI.eResMode;
-    pr->stResData.ucFmtOutResolution = pr->ucFmtMode;
-    pr->stResData.ucCCIROutResolution = pr->ucFmtMode;
-    pr->stResData.ucHdmiOutMode = (UINT8)pr->rDrvExtScl;
-    pr->stResData.eCcirDrvInfo = pr->rCCIR.eCcirDrvInfo;
-    pr->stResData.fgOsdMsg = pr->fgOSD5;
-    pr->stResData.fgCCIROutEnable = pr->rCCIR.fgOutputEnable;
-    pr->stResData.fgHdmiOutEnable = pr->rHDMI.fgOutputEnable;
+    PMX_RESOLUTION_MODE_T eResMode = prGiven->eResMode;
+    if (prGiven->fgOutputEnable == 0)
+        eResMode = (PMX_RESOLUTION_MODE_T)ucFmtMode;
+    return { .eResMode = eResMode, .fgOutputEnable = prGiven->fgOutputEnable };
 }
 
 /* Route the fifth OSD plane to component and composite. */
@@ -145,40 +126,34 @@ static void vRouteFifthOsd(const MODE_EX_T* pr)
         _i4Osd5Out(0, ucCvbsMode);
 }
 
+static void vSetTvEncoder(UINT32 u4Tve, const OUTPUT_T* prOutput, const MODE_EX_T* pr, const CHAR* szExpected)
+{
+    if (TVE_SetFmtEx(u4Tve, pr->ucFmtMode, pr->ucVFreq, (UCHAR)prOutput->eResMode, prOutput->fgOutputEnable,
+                     pr->fgHDExist, pr->fgOSD5) != TVE_SET_OK)
+        Assert(szExpected, __FILE__, __LINE__);
+}
+
 /* Route the fifth OSD plane and set both TV encoders. */
 static void vSetTvEncoders(const MODE_EX_T* pr)
 {
     vRouteFifthOsd(pr);
-    if (TVE_SetFmtEx(TVE_1, pr->ucFmtMode, pr->ucVFreq, (UCHAR)pr->rCAV.eResMode, pr->rCAV.fgOutputEnable,
-                     pr->fgHDExist, pr->fgOSD5) != TVE_SET_OK)
-        Assert("TVE_SetFmtEx(TVE_1, ucFmtMode, ucVFreq, rCAV.eResMode, rCAV.fgOutputEnable, fgHDExist, fgOSD5) == "
-               "TVE_SET_OK",
-               __FILE__, __LINE__);
-    if (TVE_SetFmtEx(TVE_2, pr->ucFmtMode, pr->ucVFreq, (UCHAR)pr->rCVBS.eResMode, pr->rCVBS.fgOutputEnable,
-                     pr->fgHDExist, pr->fgOSD5) != TVE_SET_OK)
-        Assert("TVE_SetFmtEx(TVE_2, ucFmtMode, ucVFreq, rCVBS.eResMode, rCVBS.fgOutputEnable, fgHDExist, fgOSD5) == "
-               "TVE_SET_OK",
-               __FILE__, __LINE__);
+    vSetTvEncoder(TVE_1, &pr->rCAV, pr,
+                  "TVE_SetFmtEx(TVE_1, ucFmtMode, ucVFreq, rCAV.eResMode, rCAV.fgOutputEnable, fgHDExist, fgOSD5) == "
+                  "TVE_SET_OK");
+    vSetTvEncoder(TVE_2, &pr->rCVBS, pr,
+                  "TVE_SetFmtEx(TVE_2, ucFmtMode, ucVFreq, rCVBS.eResMode, rCVBS.fgOutputEnable, fgHDExist, fgOSD5) == "
+                  "TVE_SET_OK");
     TVE_SetEnable(TVE_1, pr->rCAV.fgOutputEnable);
     TVE_SetEnable(TVE_2, pr->rCVBS.fgOutputEnable);
 }
 
 /* More frequencies count as NTSC than in one-mode setting, where 60 alone does; 24 is PAL in both. */
-static void vSetTvType(UCHAR ucVFreq)
+static bool fgIsNtsc(UCHAR ucVFreq)
 {
-    if (ucVFreq == 60 || ucVFreq == 30 || ucVFreq == 29 || ucVFreq == 23 || ucVFreq == 0)
-    {
-        if (PMX_SetTvType(0, PMX_TV_TYPE_NTSC) != PMX_SET_OK)
-            Assert("PMX_SetTvType(ucPmxId, PMX_TV_TYPE_NTSC) == PMX_SET_OK", __FILE__, __LINE__);
-    }
-    else
-    {
-        if (PMX_SetTvType(0, PMX_TV_TYPE_PAL) != PMX_SET_OK)
-            Assert("PMX_SetTvType(ucPmxId, PMX_TV_TYPE_PAL) == PMX_SET_OK", __FILE__, __LINE__);
-    }
+    return ucVFreq == 60 || ucVFreq == 30 || ucVFreq == 29 || ucVFreq == 23 || ucVFreq == 0;
 }
 
-static void vApplyFullChange(MODE_EX_T* pr)
+static void vApplyFullChange(const MODE_EX_T* pr, PMX_SET_HDMI_RES_PARAMETER_T* prResData)
 {
     const PMX_CONF_T* prConf = prPmxConf();
 
@@ -190,46 +165,32 @@ static void vApplyFullChange(MODE_EX_T* pr)
     }
     TVE_SetBlackScreen(TVE_1, 0);
     TVE_SetBlackScreen(TVE_2, 0);
-    vFillResData(pr);
-    fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, &pr->stResData, 1);
-    fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, &pr->stResData, 1);
+    fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, prResData, 1);
+    fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, prResData, 1);
     PMX_HalSetMode(0, pr->ucFmtMode);
     if (pr->fgOSD5 == 0) // else the scaler stays in its mode
         PMX_HalSetScalerMode(prConf->ucMode);
     PMX_IsLog(9, "Adjust PMX_ColorSpaceSetup call sequence.\n");
     PMX_ColorSpaceSetup(prConf->eMasterColorSpace, prConf->ucMode); // one-mode setting does this before the modes
     VDP_SetTvFormat(pr->ucFmtMode, 1);
-    vSetTvType(pr->ucVFreq);
+    vPmxSetTvType(fgIsNtsc(pr->ucVFreq));
     vSetTvEncoders(pr);
     PMX_HalScalerReset(0);
     vPostChgRes(pr->ucFmtMode);
-    VDP_GlobalOutputChange();
-    for (UINT32 u4VdpIdx = 0; u4VdpIdx < 3; u4VdpIdx++)
-        VDP_VsyncSendCmd(u4VdpIdx, 2);
-    fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, &pr->stResData, 1);
-    OSD_BASE_SetFlag_PMXChangeResDone();
-    pr->fgHdmiExist = TRUE;
+    vPmxFinishModeChange(prResData);
 }
 
-static void vApplySameFormat(MODE_EX_T* pr)
+static void vApplySameFormat(const MODE_EX_T* pr, PMX_SET_HDMI_RES_PARAMETER_T* prResData)
 {
-    vFillResData(pr);
     if (pr->fgHdmiChange != 0)
     {
-        fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, &pr->stResData, 1);
-        fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, &pr->stResData, 1);
+        fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, prResData, 1);
+        fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, prResData, 1);
     }
-    if (pr->fgCavChange != 0 || pr->fgCvbsChange != 0 || pr->fgOSD5Change != 0)
+    if (pr->fgTveChange != 0)
         vSetTvEncoders(pr);
     if (pr->fgHdmiChange != 0)
-    {
-        fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, &pr->stResData, 1);
-        pr->fgHdmiExist = TRUE;
-    }
-    else
-    {
-        pr->fgHdmiExist = FALSE;
-    }
+        fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, prResData, 1);
     VDP_SetTvFormat(pr->ucFmtMode, 0);
     if (pr->fgHdmiChange == 0)
         vSendAvdNotifyScomResChgOK();
@@ -238,12 +199,12 @@ static void vApplySameFormat(MODE_EX_T* pr)
 
 /* Decide whether graphics wait. Nobody is waited for without a sink, or when neither this call nor one whose timer
  * still runs sent an HDMI change. */
-static void vWaitForDisplayPart(const MODE_EX_T* pr)
+static void vWaitForDisplayPart(BOOL fgHdmiExist)
 {
-    bool fgAnswers = (pr->fgHdmiExist != 0 || _arPmxDispPartStatus.fgTimerAlreadySet != 0) && i4GetHotPlugStatus() == 1;
+    bool fgAnswers = (fgHdmiExist != 0 || _arPmxDispPartStatus.fgTimerAlreadySet != 0) && i4GetHotPlugStatus() == 1;
     if (!fgAnswers)
     {
-        PMX_IsLog(0, "[PMX] fgHdmiExist:%d, Not wait display part...\n", pr->fgHdmiExist);
+        PMX_IsLog(0, "[PMX] fgHdmiExist:%d, Not wait display part...\n", fgHdmiExist);
         PMX_SetFormatChangeFlag(FALSE);
     }
     if (fgPMX_DisplayModeReady() != 0)
@@ -263,39 +224,48 @@ UINT32 PMX_SetModeEx(UCHAR ucPmxId, PMX_RESOLUTION_T* prOutConf, UCHAR ucVFreq, 
     if (ucPmxId != 0 || prOutConf == nullptr)
         return 0;
 
-    MODE_EX_T rCall = {};
-    rCall.prOutConf = prOutConf;
-    rCall.ucVFreq = ucVFreq;
-    rCall.rDrvExtScl = rDrvExtScl;
-    rCall.fgOSD5 = fgOSD5;
-    rCall.rCCIR = prOutConf[PMX_OUTPUT_CCIR];
-    rCall.rHDMI = prOutConf[PMX_OUTPUT_HDMI];
-    rCall.rCAV = prOutConf[PMX_OUTPUT_CAV];
-    rCall.rCVBS = prOutConf[PMX_OUTPUT_CVBS];
-    vLogRequest(&rCall);
-
-    rCall.ucFmtMode = ucChooseFormat(&rCall);
-    if (PMX_CheckCap(0, rCall.ucFmtMode) == 0)
+    vLogRequest(prOutConf, fgOSD5);
+    UCHAR ucFmtMode = ucChooseFormat(prOutConf);
+    if (PMX_CheckCap(0, ucFmtMode) == 0)
     {
         // The text speaks of setting the flag; it is lowered: a refused request starts nothing to wait for.
         PMX_IsLog(0, "[PMX] PMX_SetModeEx, PMX_CheckCap error, set format change flag, wait display part...\n");
         PMX_SetFormatChangeFlag(FALSE);
         return 0;
     }
-    vTakeFormatIfOff(&rCall.rHDMI, rCall.ucFmtMode);
-    vTakeFormatIfOff(&rCall.rCAV, rCall.ucFmtMode);
-    vTakeFormatIfOff(&rCall.rCVBS, rCall.ucFmtMode);
 
-    vFindChanges(&rCall);
-    rCall.fgHDExist = fgPmxTveHd(rCall.ucFmtMode);
+    MODE_EX_T rCall;
+    rCall.ucFmtMode = ucFmtMode;
+    rCall.ucVFreq = ucVFreq;
+    rCall.fgOSD5 = fgOSD5;
+    rCall.fgHDExist = fgPmxTveHd(ucFmtMode);
+    rCall.rHDMI = rInForce(&prOutConf[PMX_OUTPUT_HDMI], ucFmtMode);
+    rCall.rCAV = rInForce(&prOutConf[PMX_OUTPUT_CAV], ucFmtMode);
+    rCall.rCVBS = rInForce(&prOutConf[PMX_OUTPUT_CVBS], ucFmtMode);
+    vFindChanges(&rCall, prOutConf, rDrvExtScl);
     PMX_IsLog(9, "HD Exist(%d)\n", rCall.fgHDExist);
     TVE_SetMuteCtrol(rCall.fgFmtChange, (UCHAR)rCall.rCAV.eResMode, (UCHAR)rCall.rCVBS.eResMode, rCall.fgHDExist,
                      fgOSD5);
 
+    PMX_SET_HDMI_RES_PARAMETER_T stResData = {
+        .u1ScaleMode = 0,
+        .ucHdmiOutDisplayResolution = (UINT8)rCall.rHDMI.eResMode,
+        .ucFmtOutResolution = ucFmtMode,
+        .ucCCIROutResolution = ucFmtMode,
+        .ucHdmiOutMode = (UINT8)rDrvExtScl,
+        .eCcirDrvInfo = prOutConf[PMX_OUTPUT_CCIR].eCcirDrvInfo,
+        .fgOsdMsg = fgOSD5,
+        .ucCCIROutMode = 0,
+        .fgCCIROutEnable = prOutConf[PMX_OUTPUT_CCIR].fgOutputEnable,
+        .fgHdmiOutEnable = rCall.rHDMI.fgOutputEnable,
+        .u2_Vfreq = 0,
+    };
     if (rCall.fgFmtChange != 0)
-        vApplyFullChange(&rCall);
+        vApplyFullChange(&rCall, &stResData);
     else
-        vApplySameFormat(&rCall);
-    vWaitForDisplayPart(&rCall);
+        vApplySameFormat(&rCall, &stResData);
+
+    BOOL fgHdmiExist = rCall.fgFmtChange | rCall.fgHdmiChange; // an HDMI resolution change was sent
+    vWaitForDisplayPart(fgHdmiExist);
     return 1;
 }

@@ -6,68 +6,82 @@
 #include "pmx_if.h"
 #include "u_os.h"
 
-#define CAP_GAMMA 0x00100000
-#define CAP_BRIGHTNESS 0x00200000
-#define CAP_CONTRAST 0x00400000
-#define CAP_HUE 0x00800000
-#define CAP_SATURATION 0x01000000
-#define CAP_SHARPNESS 0x08000000
-#define CAP_BLACK_LEVEL 0x40000000
-
-static bool fgHasCap(UINT32 u4Mask)
+/* What the five adjustments differ in. The console texts say "Seting" in all five, and stay so. */
+typedef struct
 {
-    return (prPmxConf()->u4Capability & u4Mask) != 0;
+    const CHAR* szTrace;
+    const CHAR* szRefusal;
+    UINT8 u1Stored; // where the record keeps it
+    UINT8 u1CapBit;
+    UINT8 u1HdmiCommand;
+} ADJUSTMENT_T;
+
+static constexpr ADJUSTMENT_T BRIGHTNESS = { "[PMX] Seting Brightness: %d,%d.\n",
+                                             "[PMX] Seting Brightness fail: %d,%d.\n",
+                                             offsetof(PMX_CONF_T, ucBrightness), PMX_CAP_BRIGHTNESS,
+                                             PMX_SET_HDMI_BRIGHTNESS };
+static constexpr ADJUSTMENT_T CONTRAST = { "[PMX] Seting Contrast: %d,%d.\n", "[PMX] Seting Contrast fail: %d,%d.\n",
+                                           offsetof(PMX_CONF_T, ucContrast), PMX_CAP_CONTRAST, PMX_SET_HDMI_CONTRAST };
+static constexpr ADJUSTMENT_T HUE = { "[PMX] Seting Hue: %d,%d.\n", "[PMX] Seting Hue fail: %d,%d.\n",
+                                      offsetof(PMX_CONF_T, ucHue), PMX_CAP_HUE, PMX_SET_HDMI_HUE };
+static constexpr ADJUSTMENT_T SATURATION = { "[PMX] Seting Saturation: %d,%d.\n",
+                                             "[PMX] Seting Saturation fail: %d,%d.\n",
+                                             offsetof(PMX_CONF_T, ucSaturation), PMX_CAP_SATURATION,
+                                             PMX_SET_HDMI_SATURATION };
+static constexpr ADJUSTMENT_T SHARPNESS = { "[PMX] Seting Sharpness: %d,%d.\n", "[PMX] Seting Sharpness fail: %d,%d.\n",
+                                            offsetof(PMX_CONF_T, ucSharpness), PMX_CAP_SHARPNESS,
+                                            PMX_SET_HDMI_SHARPNESS };
+
+static UCHAR* pucStored(const ADJUSTMENT_T* prAdjustment)
+{
+    return (UCHAR*)prPmxConf() + prAdjustment->u1Stored;
 }
 
 /* What the five setters share: id, trace, capability, refusal, and the stored value, which is the analogue outputs'
- * alone. The console texts say "Seting" in all five, and stay so. */
-static bool fgTakeAdjustment(UCHAR ucPmxId, UINT32 u4Mask, UCHAR ucValue, UCHAR bSetTVE, const CHAR* szTrace,
-                             const CHAR* szRefusal, UCHAR* pucStored)
+ * alone. */
+static bool fgTakeAdjustment(const ADJUSTMENT_T* prAdjustment, UCHAR ucPmxId, UCHAR ucValue, UCHAR bSetTVE)
 {
     if (ucPmxId != 0)
         return false;
 
-#pragma GCC diagnostic push
-#pragma GCC diagnostic ignored "-Wformat-nonliteral" // each caller's texts take these two values
-    PMX_IsLog(8, szTrace, bSetTVE, ucValue);
-    if (!fgHasCap(u4Mask))
+    PMX_IS_LOG_ONE_OF(8, prAdjustment->szTrace, bSetTVE, ucValue);
+    if (!fgPmxHasCap(prAdjustment->u1CapBit))
     {
-        PMX_IsLog(8, szRefusal, bSetTVE, ucValue);
+        PMX_IS_LOG_ONE_OF(8, prAdjustment->szRefusal, bSetTVE, ucValue);
         return false;
     }
-#pragma GCC diagnostic pop
-
     if (bSetTVE != 0)
-        *pucStored = ucValue;
+        *pucStored(prAdjustment) = ucValue;
     return true;
 }
 
-static UINT32 u4GetAdjustment(UCHAR ucPmxId, UINT32 u4Mask, UCHAR ucStored, UCHAR* pucValue)
+/* HDMI's value goes by, unstored. */
+static void vAdjustHdmi(const ADJUSTMENT_T* prAdjustment, UCHAR ucValue)
 {
-    if (ucPmxId != 0 || pucValue == nullptr || !fgHasCap(u4Mask))
-        return 0;
+    fgPmxDrvSetAvd(prAdjustment->u1HdmiCommand, &ucValue, 1);
+}
 
-    *pucValue = ucStored;
-    return 1;
+static UINT32 u4GetAdjustment(const ADJUSTMENT_T* prAdjustment, UCHAR ucPmxId, UCHAR* pucValue)
+{
+    return u4PmxGiveFeature(ucPmxId, prAdjustment->u1CapBit, *pucStored(prAdjustment), pucValue);
 }
 
 UINT32 PMX_SetBrightness(UCHAR ucPmxId, UCHAR ucBrightness, UCHAR bSetTVE)
 {
-    if (!fgTakeAdjustment(ucPmxId, CAP_BRIGHTNESS, ucBrightness, bSetTVE, "[PMX] Seting Brightness: %d,%d.\n",
-                          "[PMX] Seting Brightness fail: %d,%d.\n", &prPmxConf()->ucBrightness))
+    if (!fgTakeAdjustment(&BRIGHTNESS, ucPmxId, ucBrightness, bSetTVE))
         return 0;
 
     PMX_HalSetBrightness(0, ucBrightness); // whatever the target
     if (bSetTVE != 0)
         TVE_SetBrightness(ucBrightness);
     else
-        fgPmxDrvSetAvd(PMX_SET_HDMI_BRIGHTNESS, &ucBrightness, 1);
+        vAdjustHdmi(&BRIGHTNESS, ucBrightness);
     return 1;
 }
 
 UINT32 PMX_GetBrightness(UCHAR ucPmxId, UCHAR* pucBrightness)
 {
-    return u4GetAdjustment(ucPmxId, CAP_BRIGHTNESS, prPmxConf()->ucBrightness, pucBrightness);
+    return u4GetAdjustment(&BRIGHTNESS, ucPmxId, pucBrightness);
 }
 
 void d_PMX_SetBrightness(UCHAR ucBrightness)
@@ -82,21 +96,20 @@ void d_PMX_GetBrightness(UCHAR* pucBrightness)
 
 UINT32 PMX_SetContrast(UCHAR ucPmxId, UCHAR ucContrast, UCHAR bSetTVE)
 {
-    if (!fgTakeAdjustment(ucPmxId, CAP_CONTRAST, ucContrast, bSetTVE, "[PMX] Seting Contrast: %d,%d.\n",
-                          "[PMX] Seting Contrast fail: %d,%d.\n", &prPmxConf()->ucContrast))
+    if (!fgTakeAdjustment(&CONTRAST, ucPmxId, ucContrast, bSetTVE))
         return 0;
 
     PMX_HalSetContrast(0, ucContrast); // whatever the target
     if (bSetTVE != 0)
         TVE_SetContrast(ucContrast);
     else
-        fgPmxDrvSetAvd(PMX_SET_HDMI_CONTRAST, &ucContrast, 1);
+        vAdjustHdmi(&CONTRAST, ucContrast);
     return 1;
 }
 
 UINT32 PMX_GetContrast(UCHAR ucPmxId, UCHAR* pucContrast)
 {
-    return u4GetAdjustment(ucPmxId, CAP_CONTRAST, prPmxConf()->ucContrast, pucContrast);
+    return u4GetAdjustment(&CONTRAST, ucPmxId, pucContrast);
 }
 
 void d_PMX_SetContrast(UCHAR ucContrast)
@@ -111,20 +124,19 @@ void d_PMX_GetContrast(UCHAR* pucContrast)
 
 UINT32 PMX_SetHue(UCHAR ucPmxId, UCHAR ucHue, UCHAR bSetTVE)
 {
-    if (!fgTakeAdjustment(ucPmxId, CAP_HUE, ucHue, bSetTVE, "[PMX] Seting Hue: %d,%d.\n",
-                          "[PMX] Seting Hue fail: %d,%d.\n", &prPmxConf()->ucHue))
+    if (!fgTakeAdjustment(&HUE, ucPmxId, ucHue, bSetTVE))
         return 0;
 
     if (bSetTVE != 0)
         TVE_SetHue(ucHue);
     else
-        fgPmxDrvSetAvd(PMX_SET_HDMI_HUE, &ucHue, 1);
+        vAdjustHdmi(&HUE, ucHue);
     return 1;
 }
 
 UINT32 PMX_GetHue(UCHAR ucPmxId, UCHAR* pucHue)
 {
-    return u4GetAdjustment(ucPmxId, CAP_HUE, prPmxConf()->ucHue, pucHue);
+    return u4GetAdjustment(&HUE, ucPmxId, pucHue);
 }
 
 void d_PMX_SetHue(UCHAR ucHue)
@@ -139,20 +151,19 @@ void d_PMX_GetHue(UCHAR* pucHue)
 
 UINT32 PMX_SetSaturation(UCHAR ucPmxId, UCHAR ucSaturation, UCHAR bSetTVE)
 {
-    if (!fgTakeAdjustment(ucPmxId, CAP_SATURATION, ucSaturation, bSetTVE, "[PMX] Seting Saturation: %d,%d.\n",
-                          "[PMX] Seting Saturation fail: %d,%d.\n", &prPmxConf()->ucSaturation))
+    if (!fgTakeAdjustment(&SATURATION, ucPmxId, ucSaturation, bSetTVE))
         return 0;
 
     if (bSetTVE != 0)
         TVE_SetSaturation(ucSaturation);
     else
-        fgPmxDrvSetAvd(PMX_SET_HDMI_SATURATION, &ucSaturation, 1);
+        vAdjustHdmi(&SATURATION, ucSaturation);
     return 1;
 }
 
 UINT32 PMX_GetSaturation(UCHAR ucPmxId, UCHAR* pucSaturation)
 {
-    return u4GetAdjustment(ucPmxId, CAP_SATURATION, prPmxConf()->ucSaturation, pucSaturation);
+    return u4GetAdjustment(&SATURATION, ucPmxId, pucSaturation);
 }
 
 void d_PMX_SetSaturation(UCHAR ucSaturation)
@@ -167,20 +178,19 @@ void d_PMX_GetSaturation(UCHAR* pucSaturation)
 
 UINT32 PMX_SetSharpness(UCHAR ucPmxId, UCHAR ucSharpness, UCHAR bSetTVE)
 {
-    if (!fgTakeAdjustment(ucPmxId, CAP_SHARPNESS, ucSharpness, bSetTVE, "[PMX] Seting Sharpness: %d,%d.\n",
-                          "[PMX] Seting Sharpness fail: %d,%d.\n", &prPmxConf()->ucSharpness))
+    if (!fgTakeAdjustment(&SHARPNESS, ucPmxId, ucSharpness, bSetTVE))
         return 0;
 
     if (bSetTVE != 0)
         TVE_SetSharpness(ucSharpness);
     else
-        fgPmxDrvSetAvd(PMX_SET_HDMI_SHARPNESS, &ucSharpness, 1);
+        vAdjustHdmi(&SHARPNESS, ucSharpness);
     return 1;
 }
 
 UINT32 PMX_GetSharpness(UCHAR ucPmxId, UCHAR* pucSharpness)
 {
-    return u4GetAdjustment(ucPmxId, CAP_SHARPNESS, prPmxConf()->ucSharpness, pucSharpness);
+    return u4GetAdjustment(&SHARPNESS, ucPmxId, pucSharpness);
 }
 
 void d_PMX_SetSharpness(UCHAR ucSharpness)
@@ -195,30 +205,28 @@ void d_PMX_GetSharpness(UCHAR* pucSharpness)
 
 UINT32 PMX_SetGamma(UCHAR ucPmxId, UCHAR ucGamma)
 {
-    if (ucPmxId != 0 || !fgHasCap(CAP_GAMMA))
+    if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_GAMMA))
         return 0;
 
     prPmxConf()->ucGamma = ucGamma; // as given, also when no curve has this number and gamma is off
-    if (ucGamma >= 1 && ucGamma <= PMX_GAMMA_CURVE_NUM)
-        PMX_HalSetGamma(0, 1, aucGammaCurve[ucGamma - 1]);
-    else
-        PMX_HalSetGamma(0, 0, nullptr);
+    const UCHAR* pucCurve = ucGamma >= 1 && ucGamma <= PMX_GAMMA_CURVE_NUM ? aucGammaCurve[ucGamma - 1] : nullptr;
+    PMX_HalSetGamma(0, pucCurve != nullptr, pucCurve);
     return 1;
 }
 
 UINT32 PMX_GetGamma(UCHAR ucPmxId, UCHAR* pucGamma)
 {
-    return u4GetAdjustment(ucPmxId, CAP_GAMMA, prPmxConf()->ucGamma, pucGamma);
+    return u4PmxGiveFeature(ucPmxId, PMX_CAP_GAMMA, prPmxConf()->ucGamma, pucGamma);
 }
 
 UINT32 PMX_GetGammaNs(UCHAR ucPmxId, UCHAR* pucGammaNs)
 {
-    return u4GetAdjustment(ucPmxId, CAP_GAMMA, PMX_GAMMA_CURVE_NUM, pucGammaNs);
+    return u4PmxGiveFeature(ucPmxId, PMX_CAP_GAMMA, PMX_GAMMA_CURVE_NUM, pucGammaNs);
 }
 
 UINT32 PMX_SetBlackLv(UCHAR ucPmxId, UCHAR ucCAVEn, UCHAR ucCVBSEn)
 {
-    if (ucPmxId != 0 || !fgHasCap(CAP_BLACK_LEVEL))
+    if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_BLACK_LEVEL))
         return 0;
 
     PMX_IsLog(8, "TVE Set Black Lv, CAV(%d), CVBS(%d)\n", ucCAVEn, ucCVBSEn);
@@ -230,7 +238,7 @@ UINT32 PMX_SetBlackLv(UCHAR ucPmxId, UCHAR ucCAVEn, UCHAR ucCVBSEn)
 
 UINT32 PMX_GetBlackLv(UCHAR ucPmxId, UCHAR* pucCAVEn, UCHAR* pucCVBSEn)
 {
-    if (ucPmxId != 0 || pucCAVEn == nullptr || pucCVBSEn == nullptr || !fgHasCap(CAP_BLACK_LEVEL))
+    if (ucPmxId != 0 || pucCAVEn == nullptr || pucCVBSEn == nullptr || !fgPmxHasCap(PMX_CAP_BLACK_LEVEL))
         return 0;
 
     const PMX_CONF_T* prConf = prPmxConf();

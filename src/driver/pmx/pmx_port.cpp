@@ -1,24 +1,28 @@
-/* Input ports: which upstream component feeds which. */
+/* Input ports: which upstream component feeds which, and the lock that guards them. */
 #include "drv_pmx.h"
 #include "pmx_if.h"
 #include "u_os.h"
 
+/* Without the lock the operation goes on all the same: the stack decides what a failed assertion means. */
+void vPmxLock(void)
+{
+    if (x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) != OSR_OK)
+        Assert("x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) == OSR_OK", __FILE__, __LINE__);
+}
+
+void vPmxUnlock(void)
+{
+    if (x_sema_unlock(MutexPMX) != OSR_OK)
+        Assert("x_sema_unlock(MutexPMX) == OSR_OK", __FILE__, __LINE__);
+}
+
 UINT32 u4PmxCompId2LocalId(UINT16 u2CompType, UINT16 u2CompId)
 {
     if (u2CompType == PMX_COMP_TYPE_VDP)
-    {
-        UCHAR ucVdpId = (UCHAR)u2CompId;
-        if (ucVdpId > 3) // no message: only an unknown type is worth one
-            return PMX_PORT_NUM;
-        return ucVdpId == 0 ? 0 : 1; // ids 2 and 3 share the second video plane's port
-    }
+        return u4PmxVdpPort((UCHAR)u2CompId);
     if (u2CompType == PMX_COMP_TYPE_OSD)
-    {
-        UCHAR ucOsdId = (UCHAR)u2CompId;
-        if (ucOsdId > 5)
-            return PMX_PORT_NUM;
-        return ucOsdId + 2u;
-    }
+        return u4PmxOsdPort((UCHAR)u2CompId);
+    // An unknown number of a known type is not worth a message.
     PMX_IsLog(8, "COMP ID to LOCAL ID Fail, CompType = %d, CompId = %d\n", u2CompType, u2CompId);
     return PMX_PORT_NUM;
 }
@@ -27,15 +31,10 @@ UINT32 u4PmxCompId2LocalId(UINT16 u2CompType, UINT16 u2CompId)
  * call counts, and the master colour space waits for the next decision. */
 static UINT32 u4ChangePort(UINT16 u2ThisCompId, UINT16 u2CompType, UINT16 u2CompId, bool fgConnect)
 {
-    if (x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) != OSR_OK)
-        Assert("x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) == OSR_OK", __FILE__, __LINE__);
-
+    vPmxLock();
     UINT32 u4LocalId = u4PmxCompId2LocalId(u2CompType, u2CompId);
     PMX_IsLog(8, "Tp,Id=%d,%d\n", u2CompType, u2CompId);
-    if (fgConnect)
-        PMX_IsLog(8, "Comp(%d) connect\n", (INT32)u4LocalId);
-    else
-        PMX_IsLog(8, "Comp(%d) disconnect\n", (INT32)u4LocalId);
+    PMX_IsLog(8, fgConnect ? "Comp(%d) connect\n" : "Comp(%d) disconnect\n", (INT32)u4LocalId);
 
     UINT32 u4Result = PMX_NO_SUCH_PORT;
     if (u4LocalId < PMX_PORT_NUM && u2ThisCompId == 0)
@@ -49,8 +48,7 @@ static UINT32 u4ChangePort(UINT16 u2ThisCompId, UINT16 u2CompType, UINT16 u2Comp
         u4Result = PMX_PORT_DONE;
     }
 
-    if (x_sema_unlock(MutexPMX) != OSR_OK)
-        Assert("x_sema_unlock(MutexPMX) == OSR_OK", __FILE__, __LINE__);
+    vPmxUnlock();
     return u4Result;
 }
 

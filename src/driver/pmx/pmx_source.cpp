@@ -31,7 +31,7 @@ static void vAnnounceMasterColorSpace(void)
 
 UINT32 PMX_VdpEnabled(UCHAR ucPmxId, UCHAR ucVdpId, INT32 i4SrcWidth, INT32 i4SrcHeight, UCHAR ucLumaKey)
 {
-    UINT32 u4Port = u4PmxCompId2LocalId(PMX_COMP_TYPE_VDP, ucVdpId);
+    UINT32 u4Port = u4PmxVdpPort(ucVdpId);
     if (u4Port >= PMX_PORT_NUM)
         return 0;
     PMX_PORT_INFO_T* prPort = &prPmxConf()->arPortInfo[u4Port];
@@ -54,10 +54,10 @@ UINT32 PMX_VdpEnabled(UCHAR ucPmxId, UCHAR ucVdpId, INT32 i4SrcWidth, INT32 i4Sr
     }
 
     prPort->eSrcColorSpace = eColorSpaceOfSize(i4SrcWidth, i4SrcHeight);
-    if (prPort->eSrcColorSpace == DRV_PMX_CS_YCBCR_709)
-        PMX_IsLog(8, "VDP_%d's Src Color Space = DRV_PMX_CS_YCBCR_709\n", ucVdpId);
-    else
-        PMX_IsLog(8, "VDP_%d's Src Color Space = DRV_PMX_CS_YCBCR_601\n", ucVdpId);
+    PMX_IsLog(8,
+              prPort->eSrcColorSpace == DRV_PMX_CS_YCBCR_709 ? "VDP_%d's Src Color Space = DRV_PMX_CS_YCBCR_709\n"
+                                                             : "VDP_%d's Src Color Space = DRV_PMX_CS_YCBCR_601\n",
+              ucVdpId);
     if (ucVdpId == VDP_BACKGROUND) // still pictures are BT.601 at any size
     {
         PMX_IsLog(8, "VDP_%d's (JPG(BACKGROUND) is force to 601.\n", ucVdpId);
@@ -71,7 +71,7 @@ UINT32 PMX_VdpEnabled(UCHAR ucPmxId, UCHAR ucVdpId, INT32 i4SrcWidth, INT32 i4Sr
 /* Unlike PMX_OsdDisabled no new decision: the master colour space stays until one is made. */
 UINT32 PMX_VdpDisabled(UCHAR, UCHAR ucVdpId)
 {
-    UINT32 u4Port = u4PmxCompId2LocalId(PMX_COMP_TYPE_VDP, ucVdpId);
+    UINT32 u4Port = u4PmxVdpPort(ucVdpId);
     if (u4Port >= PMX_PORT_NUM)
         return 0;
 
@@ -89,7 +89,7 @@ UINT32 PMX_VdpDisabled(UCHAR, UCHAR ucVdpId)
 UINT32 PMX_OsdEnabled(UCHAR, UCHAR ucOsdId, INT32 i4SrcWidth, INT32 i4SrcHeight, DRV_GFX_COLOR_MODE_T eSrcColorMode)
 {
     PMX_CONF_T* prConf = prPmxConf();
-    UINT32 u4Port = u4PmxCompId2LocalId(PMX_COMP_TYPE_OSD, ucOsdId);
+    UINT32 u4Port = u4PmxOsdPort(ucOsdId);
     DRV_PMX_COLOR_SPACE_T eOldCS = prConf->eMasterColorSpace;
     if (u4Port >= PMX_PORT_NUM)
         return 0;
@@ -106,10 +106,10 @@ UINT32 PMX_OsdEnabled(UCHAR, UCHAR ucOsdId, INT32 i4SrcWidth, INT32 i4SrcHeight,
         prPort->eInputColorMode = DRV_GFX_COLOR_MODE_YCBCR;
         prPort->eSrcColorSpace = eColorSpaceOfSize(i4SrcWidth, i4SrcHeight);
         prConf->eMasterColorSpace = prPort->eSrcColorSpace;
-        if (prPort->eSrcColorSpace == DRV_PMX_CS_YCBCR_709)
-            PMX_IsLog(8, "OSD_%d's Src Color Space = DRV_PMX_CS_YCBCR_709\n", ucOsdId);
-        else
-            PMX_IsLog(8, "OSD_%d's Src Color Space = DRV_PMX_CS_YCBCR_601\n", ucOsdId);
+        PMX_IsLog(8,
+                  prPort->eSrcColorSpace == DRV_PMX_CS_YCBCR_709 ? "OSD_%d's Src Color Space = DRV_PMX_CS_YCBCR_709\n"
+                                                                 : "OSD_%d's Src Color Space = DRV_PMX_CS_YCBCR_601\n",
+                  ucOsdId);
     }
     if (prConf->eMasterColorSpace != eOldCS)
         vAnnounceMasterColorSpace();
@@ -118,7 +118,7 @@ UINT32 PMX_OsdEnabled(UCHAR, UCHAR ucOsdId, INT32 i4SrcWidth, INT32 i4SrcHeight,
 
 UINT32 PMX_OsdDisabled(UCHAR, UCHAR ucOsdId)
 {
-    UINT32 u4Port = u4PmxCompId2LocalId(PMX_COMP_TYPE_OSD, ucOsdId);
+    UINT32 u4Port = u4PmxOsdPort(ucOsdId);
     if (u4Port >= PMX_PORT_NUM)
         return 0;
 
@@ -184,19 +184,14 @@ static void vInformVdp(UINT16 u2CompType, UINT16 u2CompId)
 
 void PMX_InformVdpColorSpace(UCHAR)
 {
-    if (x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) != OSR_OK)
-        Assert("x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) == OSR_OK", __FILE__, __LINE__);
-
-    for (UINT16 u2Idx = 0; u2Idx < 2; u2Idx++)
+    vPmxLock();
+    for (UINT32 u4Port = 0; u4Port < 2; u4Port++) // the video planes'
     {
-        UINT32 u4Port = u4PmxCompId2LocalId(PMX_COMP_TYPE_VDP, u2Idx);
-        const PMX_PORT_INFO_T* prPort = prPmxConf()->arPortInfo + u4Port;
-        if (u4Port < PMX_PORT_NUM && prPort->fgConnected != 0)
+        const PMX_PORT_INFO_T* prPort = &prPmxConf()->arPortInfo[u4Port];
+        if (prPort->fgConnected != 0)
             vInformVdp(prPort->u2CompType, prPort->u2CompId);
     }
-
-    if (x_sema_unlock(MutexPMX) != OSR_OK)
-        Assert("x_sema_unlock(MutexPMX) == OSR_OK", __FILE__, __LINE__);
+    vPmxUnlock();
 }
 
 /* Source events through IPMX are inert: only the direct calls count. */

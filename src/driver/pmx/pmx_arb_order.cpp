@@ -24,7 +24,7 @@ static UINT32 u4Unpack(UINT32 u4PlaneOrder, UINT8* pu1PlnSel)
     return u4Used;
 }
 
-/* Name the first two planes that have one source. */
+/* Name the first two planes that have the same source. */
 static void vLogConflict(const UINT8* pu1PlnSel)
 {
     for (INT32 i = 0; i < PMX_PLANE_NUM; i++)
@@ -73,7 +73,7 @@ UINT32 PMX_SetArbPlaneOrder(UCHAR ucPmxId, UINT32 u4PlaneOrder)
         Printf("[PMX]offset[%d]=%d\n", i, pu1Nominal[i]);
     for (INT32 i = 0; i < PMX_PLANE_NUM; i++)
         Printf("[PMX]u1PlnSel[%d]=%d\n", i, u1PlnSel[i]);
-    if (u4Used != 0xFF)
+    if (u4Used != 0xFF) // each of the eight once; compared in pairs only when two planes have the same
     {
         vLogConflict(u1PlnSel);
         return 0;

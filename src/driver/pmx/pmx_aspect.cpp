@@ -15,14 +15,14 @@ static BOOL fgSignalHdmi(UINT32 u4AspectRatio)
     return fgPmxDrvSetAvd(PMX_CHG_HDMI_VIDEO_ASPECT_RATIO, &u4AspectRatio, 1);
 }
 
-/* Make a ratio that was stored take effect. */
-static UINT32 u4SignalNormal(UINT32 u4AspectRatio, const CHAR* szDone)
+/* Signal a stored ratio and have the picture recomputed. 0 when HDMI refuses: then the video planes are not told. */
+static UINT32 u4ApplyNormal(UINT32 u4AspectRatio, const CHAR* szDone)
 {
     if (fgSignalHdmi(u4AspectRatio) == FALSE)
         return 0;
 
     VDP_GlobalOutputChange();
-    PMX_IS_LOG_ONE_OF(9, szDone);
+    PMX_IS_LOG_TEXT(9, szDone);
     return 1;
 }
 
@@ -33,7 +33,7 @@ UINT32 PMX_SetAspectRatio(UCHAR ucPmxId, UINT32 u4AspectRatio)
 
     PMX_IsLog(9, "PMX_ID(%d), Aspect Ratio(%d)\n", ucPmxId, (INT32)u4AspectRatio);
     prPmxConf()->u4AspectRatio = u4AspectRatio; // before HDMI is asked: a refusal leaves it new
-    return u4SignalNormal(u4AspectRatio, "VDP_GlobalOutputChange\n");
+    return u4ApplyNormal(u4AspectRatio, "VDP_GlobalOutputChange\n");
 }
 
 UINT32 PMX_SetAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgApplyOnNext)
@@ -54,7 +54,7 @@ UINT32 PMX_SetAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgApplyOnN
     prConf->u4AspectRatio = u4AspectRatio;
     prConf->fgAspNext = 0;
     prConf->u4AspNext = 0;
-    return u4SignalNormal(u4AspectRatio, "[EX] VDP_GlobalOutputChange\n");
+    return u4ApplyNormal(u4AspectRatio, "[EX] VDP_GlobalOutputChange\n");
 }
 
 /* The result is a ratio, not a success; nothing waiting is no failure. */
@@ -98,6 +98,17 @@ static constexpr SIGNALLING_T SIGNALLING[] = {
     { ASP_4_3_FULL + 1,  ASPECT_RATIO_16_9_FULL_FORMAT, HDMI_PICTURE_16_9, HDMI_AS_PICTURE_AR },
 };
 // clang-format on
+
+static consteval bool fgEveryRowIsItsCode()
+{
+    for (UINT32 i = 0; i < COUNT_OF(SIGNALLING); i++)
+    {
+        if (SIGNALLING[i].u1Asp != i)
+            return false;
+    }
+    return true;
+}
+static_assert(fgEveryRowIsItsCode());
 
 static const SIGNALLING_T* prSignallingOf(UINT32 u4AspectRatio)
 {

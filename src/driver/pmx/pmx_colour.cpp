@@ -7,11 +7,11 @@
 /* How the two converters are set, and what the console says of them. */
 typedef struct
 {
-    UINT8 u1CCEnable; // converter A
-    UINT8 u1CCDir;    // 0: 601 to 709, 1: 709 to 601
-    UINT8 u1ScalerCC; // the scaler's converter, 709 to 601
-    const CHAR* szCC;
-    const CHAR* szScalerCC;
+    UINT8 u1CCAEnable;  // converter A
+    UINT8 u1CCADir;     // 0: 601 to 709, 1: 709 to 601
+    UINT8 u1ScalerConv; // the scaler's converter, 709 to 601
+    const CHAR* szCCA;
+    const CHAR* szScalerConv;
 } CONVERSION_T;
 
 /* For each standard of the output, from PMX_COLOUR_SD on, the two colour spaces that planes are mixed in. */
@@ -23,7 +23,8 @@ static constexpr CONVERSION_T CONVERSIONS[] = {
     { 1, 0, 0, "CC_A enable, 601->709\n", "Scaler CC disable\n" }, // 601
     { 0, 0, 1, "CC_A disable\n", "Scaler CC enable, 709->601\n" }, // 709
 };
-static_assert(PMX_COLOUR_HD == PMX_COLOUR_SD + 1 && DRV_PMX_CS_YCBCR_601 == 0 && DRV_PMX_CS_YCBCR_709 == 1);
+static_assert(COUNT_OF(CONVERSIONS) == 2 * PMX_COLOUR_HD && PMX_COLOUR_SD == 1 && DRV_PMX_CS_YCBCR_601 == 0 &&
+              DRV_PMX_CS_YCBCR_709 == 1);
 
 void PMX_ColorSpaceSetup(DRV_PMX_COLOR_SPACE_T eMixerOutCS, UCHAR ucOutputMode)
 {
@@ -45,8 +46,8 @@ void PMX_ColorSpaceSetup(DRV_PMX_COLOR_SPACE_T eMixerOutCS, UCHAR ucOutputMode)
 
     size_t zRow = 2 * ((size_t)u1Colour - PMX_COLOUR_SD) + eMixerOutCS;
     const CONVERSION_T* prConversion = &CONVERSIONS[zRow];
-    PMX_HalSetCC_A(0, prConversion->u1CCEnable, prConversion->u1CCDir);
-    PMX_IS_LOG_ONE_OF(9, prConversion->szCC);
-    PMX_HalSetScaler709601(0, prConversion->u1ScalerCC, prConversion->u1ScalerCC);
-    PMX_IS_LOG_ONE_OF(8, prConversion->szScalerCC);
+    PMX_HalSetCC_A(0, prConversion->u1CCAEnable, prConversion->u1CCADir);
+    PMX_IS_LOG_TEXT(9, prConversion->szCCA);
+    PMX_HalSetScaler709601(0, prConversion->u1ScalerConv, prConversion->u1ScalerConv);
+    PMX_IS_LOG_TEXT(8, prConversion->szScalerConv);
 }

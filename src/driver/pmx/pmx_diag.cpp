@@ -5,7 +5,6 @@
 #include "u_os.h"
 
 #define PRINT_BUFFER_SIZE 512
-#define COUNT_OF(Table) (sizeof(Table) / sizeof((Table)[0]))
 
 void PMX_Printf(INT32 level, const char* format_string, ...)
 {
@@ -42,68 +41,44 @@ static constexpr const CHAR* EXT_CHIP_NAMES[] = { "DRV_NON_EXT_CHIP", "DRV_EXT_S
 #define REPORT_RES_LATE RES_2D_640x480HZ
 static constexpr const CHAR* RES_LATE_NAMES[] = { "RES_PANEL_AUO_B089AW01", "RES_MODE_NUM", "RES_AUTO" };
 
-/* The lines of the digital port, which differ in their blanks. */
-typedef enum : UINT8
-{
-    LINE_F1,
-    LINE_F2,
-    LINE_F3,
-    LINE_G1,
-    LINE_G2,
-    LINE_M1,
-    LINE_M2,
-    LINE_N1,
-    LINE_N2
-} CCIR_LINE_T;
+/* The lines of the digital port differ in their blanks from value to value. */
+#define CCIR_INFO "[PMX]PMX(%d,) _arPmxConf[%d].arOutputConf[%d].eCcirDrvInfo."
+static constexpr const CHAR* F1 = CCIR_INFO "eDgiFmt(%s) \n ";
+static constexpr const CHAR* F2 = CCIR_INFO "eDgiFmt(%s)  \n";
+static constexpr const CHAR* F3 = CCIR_INFO "eDgiFmt(%s) \n";
+static constexpr const CHAR* G1 = CCIR_INFO "eDgoFmt(%s) \n ";
+static constexpr const CHAR* G2 = CCIR_INFO "eDgoFmt(%s)  \n";
+static constexpr const CHAR* M1 = CCIR_INFO "eDgiMode(%s) \n ";
+static constexpr const CHAR* M2 = CCIR_INFO "eDgiMode(%s)  \n";
+static constexpr const CHAR* N1 = CCIR_INFO "eDgoMode(%s) \n ";
+static constexpr const CHAR* N2 = CCIR_INFO "eDgoMode(%s)  \n";
+#undef CCIR_INFO
 
 typedef struct
 {
     const CHAR* szName;
-    CCIR_LINE_T eInputLine;
-    CCIR_LINE_T eOutputLine;
+    const CHAR* szInput;  // the line that shows it as the port's input
+    const CHAR* szOutput; // and as its output
 } CCIR_TEXT_T;
 
 static constexpr CCIR_TEXT_T CCIR_FORMAT_TEXTS[] = {
-    { "CCIR_NON_USED", LINE_F1, LINE_G1 },
-    { "CCIR_YCMIX_8BIT", LINE_F2, LINE_G2 },
-    { "CCIR_YCMIX_10BIT", LINE_F2, LINE_G2 },
-    { "CCIR_YCMIX_12BIT", LINE_F2, LINE_F2 }, // the output's format is labelled as the input's
-    { "CCIR_YC422_16BIT", LINE_F2, LINE_G2 },
-    { "CCIR_YC422_20BIT", LINE_F3, LINE_G2 },
-    { "CCIR_YC422_24BIT", LINE_F2, LINE_G1 },
-    { "CCIR_YC444_24BIT", LINE_F2, LINE_G1 },
-    { "CCIR_YC444_30BIT", LINE_F2, LINE_G2 },
-    { "CCIR_YC444_36BIT", LINE_F1, LINE_G2 },
+    { "CCIR_NON_USED", F1, G1 },    { "CCIR_YCMIX_8BIT", F2, G2 },  { "CCIR_YCMIX_10BIT", F2, G2 },
+    { "CCIR_YCMIX_12BIT", F2, F2 }, // the output's format is labelled as the input's
+    { "CCIR_YC422_16BIT", F2, G2 }, { "CCIR_YC422_20BIT", F3, G2 }, { "CCIR_YC422_24BIT", F2, G1 },
+    { "CCIR_YC444_24BIT", F2, G1 }, { "CCIR_YC444_30BIT", F2, G2 }, { "CCIR_YC444_36BIT", F1, G2 },
 };
 
 static constexpr CCIR_TEXT_T CCIR_MODE_TEXTS[] = {
-    { "CCIR_INVALID", LINE_M1, LINE_N1 },
-    { "CCIR_601_MODE", LINE_M2, LINE_N1 },
-    { "CCIR_656_MODE", LINE_M2, LINE_N2 },
+    { "CCIR_INVALID", M1, N1 },
+    { "CCIR_601_MODE", M2, N1 },
+    { "CCIR_656_MODE", M2, N2 },
 };
 
-/* A value behind the end of its list has no line. */
-static void vReportCcir(INT32 i, const CCIR_TEXT_T* prTexts, UINT32 u4TextNum, UINT32 u4Value, bool fgInput)
+static void vReportCcir(INT32 i, const CCIR_TEXT_T* prTexts, UINT32 u4TextNum, UINT32 u4Value,
+                        const CHAR* CCIR_TEXT_T::*szLine)
 {
-#define CCIR_INFO "[PMX]PMX(%d,) _arPmxConf[%d].arOutputConf[%d].eCcirDrvInfo."
-    static constexpr const CHAR* TEXTS[] = {
-        CCIR_INFO "eDgiFmt(%s) \n ",  // LINE_F1
-        CCIR_INFO "eDgiFmt(%s)  \n",  // LINE_F2
-        CCIR_INFO "eDgiFmt(%s) \n",   // LINE_F3
-        CCIR_INFO "eDgoFmt(%s) \n ",  // LINE_G1
-        CCIR_INFO "eDgoFmt(%s)  \n",  // LINE_G2
-        CCIR_INFO "eDgiMode(%s) \n ", // LINE_M1
-        CCIR_INFO "eDgiMode(%s)  \n", // LINE_M2
-        CCIR_INFO "eDgoMode(%s) \n ", // LINE_N1
-        CCIR_INFO "eDgoMode(%s)  \n", // LINE_N2
-    };
-#undef CCIR_INFO
-    static_assert(COUNT_OF(TEXTS) == LINE_N2 + 1);
-
-    if (u4Value >= u4TextNum)
-        return;
-    const CCIR_TEXT_T* prText = &prTexts[u4Value];
-    PMX_IS_LOG_ONE_OF(0, TEXTS[fgInput ? prText->eInputLine : prText->eOutputLine], 0, 0, i, prText->szName);
+    if (u4Value < u4TextNum)
+        PMX_IS_LOG_TEXT(0, prTexts[u4Value].*szLine, 0, 0, i, prTexts[u4Value].szName);
 }
 
 static void vReportRecord(const PMX_CONF_T* prConf)
@@ -175,10 +150,10 @@ static void vReportOutput(INT32 i, const PMX_RESOLUTION_T* prOutput)
         PMX_IsLog(0, "[PMX] PMX(%d ), _arPmxConf[%d].arOutputConf[%d].eResMode(%s)\n", 0, 0, i, szRes);
 
     const CCIR_DRV_INFO_T* prCcir = &prOutput->eCcirDrvInfo;
-    vReportCcir(i, CCIR_FORMAT_TEXTS, COUNT_OF(CCIR_FORMAT_TEXTS), prCcir->eDgiFmt, true);
-    vReportCcir(i, CCIR_MODE_TEXTS, COUNT_OF(CCIR_MODE_TEXTS), prCcir->eDgiMode, true);
-    vReportCcir(i, CCIR_FORMAT_TEXTS, COUNT_OF(CCIR_FORMAT_TEXTS), prCcir->eDgoFmt, false);
-    vReportCcir(i, CCIR_MODE_TEXTS, COUNT_OF(CCIR_MODE_TEXTS), prCcir->eDgoMode, false);
+    vReportCcir(i, CCIR_FORMAT_TEXTS, COUNT_OF(CCIR_FORMAT_TEXTS), prCcir->eDgiFmt, &CCIR_TEXT_T::szInput);
+    vReportCcir(i, CCIR_MODE_TEXTS, COUNT_OF(CCIR_MODE_TEXTS), prCcir->eDgiMode, &CCIR_TEXT_T::szInput);
+    vReportCcir(i, CCIR_FORMAT_TEXTS, COUNT_OF(CCIR_FORMAT_TEXTS), prCcir->eDgoFmt, &CCIR_TEXT_T::szOutput);
+    vReportCcir(i, CCIR_MODE_TEXTS, COUNT_OF(CCIR_MODE_TEXTS), prCcir->eDgoMode, &CCIR_TEXT_T::szOutput);
 }
 
 void PMX_QueryStatus(void)

@@ -21,7 +21,7 @@ void vPmxProgramDigitalOut(void)
 
 UINT32 PMX_SetDigitalOutEnable(UCHAR ucPmxId, UCHAR ucEnable)
 {
-    if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_DIGITAL_OUT))
+    if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_BIT_DIGITAL_OUT))
         return 0;
 
     PMX_CONF_T* prConf = prPmxConf();
@@ -33,12 +33,12 @@ UINT32 PMX_SetDigitalOutEnable(UCHAR ucPmxId, UCHAR ucEnable)
 
 UINT32 PMX_GetDigitalOutEnable(UCHAR ucPmxId, UCHAR* pucEnable)
 {
-    return u4PmxGiveFeature(ucPmxId, PMX_CAP_DIGITAL_OUT, prPmxConf()->ucDigitalOut, pucEnable);
+    return u4PmxGiveFeatureByte(ucPmxId, PMX_CAP_BIT_DIGITAL_OUT, prPmxConf()->ucDigitalOut, pucEnable);
 }
 
 UINT32 PMX_SetDigitalOutPara(UCHAR ucPmxId, UCHAR ucDigitalBit, UCHAR ucProprietaryMode)
 {
-    if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_DIGITAL_OUT))
+    if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_BIT_DIGITAL_OUT))
         return 0;
 
     PMX_CONF_T* prConf = prPmxConf();

@@ -1,4 +1,4 @@
-/* The module's state and tables. Whatever is decided from the resolution mode stands in the mode table and nowhere
+/* The module's state and tables, and the answers of its getters. Whatever is decided from the resolution mode stands in the mode table and nowhere
  * else. */
 #include "pmx_if.h"
 
@@ -37,7 +37,7 @@ UINT32 u4PmxGiveWord(UCHAR ucPmxId, UINT32 u4Value, UINT32* pu4Value)
     return 1;
 }
 
-UINT32 u4PmxGiveFeature(UCHAR ucPmxId, UINT32 u4CapBit, UCHAR ucValue, UCHAR* pucValue)
+UINT32 u4PmxGiveFeatureByte(UCHAR ucPmxId, UINT32 u4CapBit, UCHAR ucValue, UCHAR* pucValue)
 {
     return fgPmxHasCap(u4CapBit) ? u4PmxGiveByte(ucPmxId, ucValue, pucValue) : 0;
 }
@@ -205,7 +205,7 @@ static consteval bool fgEveryRowIsItsMode()
 {
     for (UINT32 i = 0; i <= PMX_MODE_ROW_NUM; i++)
     {
-        if (_arPmxModeRow[i].u1Mode != i)
+        if (_arPmxModeRow[i].u1Mode != i || _arPmxModeRow[i].u1Colour > PMX_COLOUR_HD)
             return false;
     }
     return true;

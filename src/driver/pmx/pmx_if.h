@@ -12,6 +12,8 @@
 #define PMX_PORT_NUM 8  /* input ports: 0 and 1 video planes, 2 to 7 OSD planes */
 #define PMX_PLANE_NUM 8 /* mixer planes */
 
+#define COUNT_OF(Table) (sizeof(Table) / sizeof((Table)[0]))
+
 /* State of one input port. */
 typedef struct
 {
@@ -79,17 +81,17 @@ typedef struct
     UINT8 fgOSD5; /* fifth-OSD mode as PMX_SetModeEx last got it */
 } PMX_CONF_T;
 
-/* Features' bits of the capability word; below them are the modes'. */
-#define PMX_CAP_GAMMA 20
-#define PMX_CAP_BRIGHTNESS 21
-#define PMX_CAP_CONTRAST 22
-#define PMX_CAP_HUE 23
-#define PMX_CAP_SATURATION 24
-#define PMX_CAP_DIGITAL_OUT 25
-#define PMX_CAP_SHARPNESS 27
-#define PMX_CAP_BLACK_LEVEL 30
+/* Bit numbers of features in the capability word, for fgPmxHasCap; bits 0 to 16 are the modes'. */
+#define PMX_CAP_BIT_GAMMA 20
+#define PMX_CAP_BIT_BRIGHTNESS 21
+#define PMX_CAP_BIT_CONTRAST 22
+#define PMX_CAP_BIT_HUE 23
+#define PMX_CAP_BIT_SATURATION 24
+#define PMX_CAP_BIT_DIGITAL_OUT 25
+#define PMX_CAP_BIT_SHARPNESS 27
+#define PMX_CAP_BIT_BLACK_LEVEL 30
 
-/* Capability bit of a mode's row, where it is not a bit number. */
+/* Capability bit of a mode's row, where it is not a bit number: the two largest that its field holds. */
 #define PMX_CAP_ALWAYS 0x3E /* admitted whatever the capability word says */
 #define PMX_CAP_NEVER 0x3F
 
@@ -106,7 +108,7 @@ typedef struct
 #define PMX_MODE_HD_OUT 0x10      /* reported as an HD output */
 #define PMX_MODE_TVE_HD 0x20      /* an HD format for the TV encoders and for plane delays */
 
-/* Everything that is decided from the resolution mode, in eight bytes. */
+/* Everything that is decided from the resolution mode; ordered so that there are no gaps. */
 typedef struct
 {
     UINT8 u1Mode;       /* PMX_RESOLUTION_MODE_T: the row's own number */
@@ -117,7 +119,7 @@ typedef struct
     UINT8 u1Flags;   /* PMX_MODE_… */
     UINT8 u1CBWidth; /* colour-bar width in the hardware's unit */
 } PMX_MODE_ROW_T;
-DRV_STATIC_ASSERT(sizeof(PMX_MODE_ROW_T) == 8, "a row of the mode table has no gaps");
+static_assert(sizeof(PMX_MODE_ROW_T) == 8);
 
 #define PMX_MODE_ROW_NUM (RES_3D_1080P24HZ_TB + 1)
 #define PMX_GAMMA_CURVE_NUM 4
@@ -153,13 +155,13 @@ static inline const CHAR* szPmxModeName(UINT32 u4Mode)
     return u4Mode < RES_MODE_NUM ? szResStr[u4Mode] : nullptr;
 }
 
-/* Whether the capability word has a feature's bit. */
+/* Whether the capability word has a bit, 0 to 31: a mode's or a feature's. */
 static inline bool fgPmxHasCap(UINT32 u4CapBit)
 {
-    return (prPmxConf()->u4Capability >> u4CapBit & 1) != 0;
+    return ((prPmxConf()->u4Capability >> u4CapBit) & 1) != 0;
 }
 
-/* The port of a video plane: the later two share that of the second. PMX_PORT_NUM when there is no such plane. */
+/* The port of a video plane: ids 2 and 3 share that of id 1. PMX_PORT_NUM when there is no such plane. */
 static inline UINT32 u4PmxVdpPort(UCHAR ucVdpId)
 {
     if (ucVdpId > 3)
@@ -179,8 +181,9 @@ static inline UCHAR ucPmxIdOfTag(void* pvTag)
     return (UCHAR)(size_t)pvTag;
 }
 
-/* Log one of several texts, all of which take the values given; the compiler cannot look into them. */
-#define PMX_IS_LOG_ONE_OF(i4Level, szText, ...)                                                  \
+/* Log a text that comes out of a table or an argument, and takes the values given. Between literals PMX_IsLog itself
+ * chooses, for the compiler checks those. */
+#define PMX_IS_LOG_TEXT(i4Level, szText, ...)                                                    \
     do                                                                                           \
     {                                                                                            \
         _Pragma("GCC diagnostic push") _Pragma("GCC diagnostic ignored \"-Wformat-nonliteral\"") \
@@ -190,23 +193,27 @@ static inline UCHAR ucPmxIdOfTag(void* pvTag)
     }                                                                                            \
     while (0)
 
-/* Take MutexPMX, or give it back: around changes of the ports and calls into the video planes. Never nested. */
+/* Take MutexPMX, waiting for ever, or give it back: around connecting and disconnecting a port, and around calls into
+ * the video planes. A failure is asserted and the caller goes on. Never nested. */
 void vPmxLock(void);
 void vPmxUnlock(void);
 
-/* Program the digital port as the record has it. */
+/* Program switch, mode, width and colour format of the digital port from the record, whether the mixer is on or not.
+ * The phase is the caller's. */
 void vPmxProgramDigitalOut(void);
 
-/* Write a value for a caller: 0 for an unknown mixer or a null pointer, else 1. */
+/* Answer a getter: store the value where the caller wants it and return 1; return 0, and store nothing, for a mixer id
+ * other than 0 or a null pointer. */
 UINT32 u4PmxGiveByte(UCHAR ucPmxId, UCHAR ucValue, UCHAR* pucValue);
 UINT32 u4PmxGiveWord(UCHAR ucPmxId, UINT32 u4Value, UINT32* pu4Value);
-/* The same for a feature, which the capability word must have. */
-UINT32 u4PmxGiveFeature(UCHAR ucPmxId, UINT32 u4CapBit, UCHAR ucValue, UCHAR* pucValue);
+/* The same, but 0 as well when the capability word lacks the bit. */
+UINT32 u4PmxGiveFeatureByte(UCHAR ucPmxId, UINT32 u4CapBit, UCHAR ucValue, UCHAR* pucValue);
 
-/* Choose the TV system of both ways of mode setting. */
-void vPmxSetTvType(bool fgNtsc);
+/* Set the TV type of a mode change, NTSC or else PAL. A refusal is asserted and the change goes on. */
+void vPmxChooseTvType(bool fgNtsc);
 
-/* How both ways of mode setting end: the video planes, HDMI and the OSD driver learn that everything is programmed. */
+/* What follows when a new format has been programmed: the video planes, HDMI and the OSD driver learn of it. The record
+ * is the one that the PLL and digital-port commands carried. */
 void vPmxFinishModeChange(PMX_SET_HDMI_RES_PARAMETER_T* prResData);
 
 /* Hand the stacking order to the hardware, with the number that goes with the occasion: 3 at reset, 8 for a request. */

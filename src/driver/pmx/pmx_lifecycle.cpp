@@ -86,8 +86,8 @@ void PMX_Reset(UCHAR ucPmxId)
     VDP_SetTvFormat(prConf->ucMode, 1);
 }
 
-/* What both ways of shutting down begin with. */
-static void vLeaveStack(void)
+/* What both ways of shutting down share: vertical sync, registration, timer. */
+static void vStopAndUnregister(void)
 {
     PMX_VsyncStop();
     i4PmxUnregisterIM(PMX_COMP_TYPE_PMX, 0);
@@ -102,7 +102,7 @@ void PMX_Uninit(void)
         return;
 
     unregister_pm_ops(&pmx_pm_ops);
-    vLeaveStack();
+    vStopAndUnregister();
     if (x_sema_delete(MutexPMX) != OSR_OK)
         Assert("x_sema_delete (MutexPMX) == OSR_OK", __FILE__, __LINE__);
     MutexPMX = 0;
@@ -118,14 +118,11 @@ INT32 i4PMX_Uninit(UINT32 u4Case)
     PMX_IsLog(1, "i4PMX_Uninit u4Case %d\n", (INT32)u4Case);
     if (_PmxInitiated == 1)
     {
-        vLeaveStack();
-        if (MutexPMX != 0)
-        {
-            if (x_sema_delete(MutexPMX) == OSR_OK)
-                MutexPMX = 0;
-            else
-                i4Ret = -1;
-        }
+        vStopAndUnregister();
+        if (MutexPMX != 0 && x_sema_delete(MutexPMX) != OSR_OK)
+            i4Ret = -1;
+        else
+            MutexPMX = 0;
         _PmxInitiated = 0;
     }
     PMX_IsLog(1, "i4PMX_Uninit return %d\n", i4Ret);

@@ -11,12 +11,12 @@
 UINT32 PMX_CheckCap(UCHAR, UCHAR ucMode)
 {
     UINT8 u1CapBit = prPmxModeRow(ucMode)->u1CapBit;
-    if (u1CapBit >= PMX_CAP_ALWAYS) // always or never
+    if (u1CapBit >= PMX_CAP_ALWAYS)
         return u1CapBit == PMX_CAP_ALWAYS;
     return fgPmxHasCap(u1CapBit);
 }
 
-void vPmxSetTvType(bool fgNtsc)
+void vPmxChooseTvType(bool fgNtsc)
 {
     if (PMX_SetTvType(0, fgNtsc ? PMX_TV_TYPE_NTSC : PMX_TV_TYPE_PAL) != PMX_SET_OK)
         Assert(fgNtsc ? "PMX_SetTvType(ucPmxId, PMX_TV_TYPE_NTSC) == PMX_SET_OK"
@@ -53,14 +53,17 @@ UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
     prConf->ucVfreq = ucVFreq;
     prConf->fgSetModeCalled = 1;
 
-    PMX_SET_HDMI_RES_PARAMETER_T rResData = {};
-    rResData.u1ScaleMode = 0;
-    rResData.ucHdmiOutDisplayResolution = ucMode;
-    rResData.ucFmtOutResolution = ucMode;
-    rResData.ucCCIROutResolution = ucMode;
-    rResData.ucHdmiOutMode = 0;
-    rResData.fgHdmiOutEnable = 1;
-    rResData.ucCCIROutMode = 1;
+    PMX_SET_HDMI_RES_PARAMETER_T rResData = { .u1ScaleMode = 0,
+                                              .ucHdmiOutDisplayResolution = ucMode,
+                                              .ucFmtOutResolution = ucMode,
+                                              .ucCCIROutResolution = ucMode,
+                                              .ucHdmiOutMode = 0,
+                                              .eCcirDrvInfo = {},
+                                              .fgOsdMsg = 0,
+                                              .ucCCIROutMode = 1,
+                                              .fgCCIROutEnable = 0,
+                                              .fgHdmiOutEnable = 1,
+                                              .u2_Vfreq = 0 };
     fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, &rResData, 1);
     fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, &rResData, 1);
 
@@ -71,7 +74,7 @@ UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
     VDP_SetTvFormat(ucMode, 1);
 
     bool fg60Hz = ucVFreq == 60; // 60 alone; per-output mode setting takes more frequencies for NTSC
-    vPmxSetTvType(fg60Hz);
+    vPmxChooseTvType(fg60Hz);
 
     BOOL fgHD = fgPmxTveHd(ucMode);
     TVE_SetFmtEx(TVE_1, ucMode, ucVFreq, ucMode, 1, fgHD, fgOSD5);

@@ -11,7 +11,7 @@
 
 #define DISPLAY_PART_TIMEOUT_MS 10000
 
-/* What a request says of an output. */
+/* What an output will run. */
 typedef struct
 {
     PMX_RESOLUTION_MODE_T eResMode; // the mixer's format while the output is off
@@ -51,7 +51,7 @@ static void vLogRequest(const PMX_RESOLUTION_T* prOutConf, UINT8 fgOSD5)
     PMX_IsLog(9, "OSD5(%d)\n", fgOSD5);
 }
 
-/* The first enabled output gives the mixer's format. */
+/* The first enabled output, in the order of their indices, gives the mixer's format. */
 static UCHAR ucChooseFormat(const PMX_RESOLUTION_T* prOutConf)
 {
     for (UINT32 i = 0; i < PMX_OUTPUT_NUM; i++)
@@ -105,7 +105,7 @@ static void vFindChanges(MODE_EX_T* pr, const PMX_RESOLUTION_T* prGiven, DRV_EXT
 }
 
 /* An output that is off runs the mixer's format. */
-static OUTPUT_T rInForce(const PMX_RESOLUTION_T* prGiven, UCHAR ucFmtMode)
+static OUTPUT_T rAsRun(const PMX_RESOLUTION_T* prGiven, UCHAR ucFmtMode)
 {
     PMX_RESOLUTION_MODE_T eResMode = prGiven->eResMode;
     if (prGiven->fgOutputEnable == 0)
@@ -126,7 +126,7 @@ static void vRouteFifthOsd(const MODE_EX_T* pr)
         _i4Osd5Out(0, ucCvbsMode);
 }
 
-static void vSetTvEncoder(UINT32 u4Tve, const OUTPUT_T* prOutput, const MODE_EX_T* pr, const CHAR* szExpected)
+static void vSetTvEncoderFormat(UINT32 u4Tve, const OUTPUT_T* prOutput, const MODE_EX_T* pr, const CHAR* szExpected)
 {
     if (TVE_SetFmtEx(u4Tve, pr->ucFmtMode, pr->ucVFreq, (UCHAR)prOutput->eResMode, prOutput->fgOutputEnable,
                      pr->fgHDExist, pr->fgOSD5) != TVE_SET_OK)
@@ -137,12 +137,14 @@ static void vSetTvEncoder(UINT32 u4Tve, const OUTPUT_T* prOutput, const MODE_EX_
 static void vSetTvEncoders(const MODE_EX_T* pr)
 {
     vRouteFifthOsd(pr);
-    vSetTvEncoder(TVE_1, &pr->rCAV, pr,
-                  "TVE_SetFmtEx(TVE_1, ucFmtMode, ucVFreq, rCAV.eResMode, rCAV.fgOutputEnable, fgHDExist, fgOSD5) == "
-                  "TVE_SET_OK");
-    vSetTvEncoder(TVE_2, &pr->rCVBS, pr,
-                  "TVE_SetFmtEx(TVE_2, ucFmtMode, ucVFreq, rCVBS.eResMode, rCVBS.fgOutputEnable, fgHDExist, fgOSD5) == "
-                  "TVE_SET_OK");
+    vSetTvEncoderFormat(
+        TVE_1, &pr->rCAV, pr,
+        "TVE_SetFmtEx(TVE_1, ucFmtMode, ucVFreq, rCAV.eResMode, rCAV.fgOutputEnable, fgHDExist, fgOSD5) == "
+        "TVE_SET_OK");
+    vSetTvEncoderFormat(
+        TVE_2, &pr->rCVBS, pr,
+        "TVE_SetFmtEx(TVE_2, ucFmtMode, ucVFreq, rCVBS.eResMode, rCVBS.fgOutputEnable, fgHDExist, fgOSD5) == "
+        "TVE_SET_OK");
     TVE_SetEnable(TVE_1, pr->rCAV.fgOutputEnable);
     TVE_SetEnable(TVE_2, pr->rCVBS.fgOutputEnable);
 }
@@ -173,7 +175,7 @@ static void vApplyFullChange(const MODE_EX_T* pr, PMX_SET_HDMI_RES_PARAMETER_T* 
     PMX_IsLog(9, "Adjust PMX_ColorSpaceSetup call sequence.\n");
     PMX_ColorSpaceSetup(prConf->eMasterColorSpace, prConf->ucMode); // one-mode setting does this before the modes
     VDP_SetTvFormat(pr->ucFmtMode, 1);
-    vPmxSetTvType(fgIsNtsc(pr->ucVFreq));
+    vPmxChooseTvType(fgIsNtsc(pr->ucVFreq));
     vSetTvEncoders(pr);
     PMX_HalScalerReset(0);
     vPostChgRes(pr->ucFmtMode);
@@ -239,14 +241,9 @@ UINT32 PMX_SetModeEx(UCHAR ucPmxId, PMX_RESOLUTION_T* prOutConf, UCHAR ucVFreq, 
     rCall.ucVFreq = ucVFreq;
     rCall.fgOSD5 = fgOSD5;
     rCall.fgHDExist = fgPmxTveHd(ucFmtMode);
-    rCall.rHDMI = rInForce(&prOutConf[PMX_OUTPUT_HDMI], ucFmtMode);
-    rCall.rCAV = rInForce(&prOutConf[PMX_OUTPUT_CAV], ucFmtMode);
-    rCall.rCVBS = rInForce(&prOutConf[PMX_OUTPUT_CVBS], ucFmtMode);
-    vFindChanges(&rCall, prOutConf, rDrvExtScl);
-    PMX_IsLog(9, "HD Exist(%d)\n", rCall.fgHDExist);
-    TVE_SetMuteCtrol(rCall.fgFmtChange, (UCHAR)rCall.rCAV.eResMode, (UCHAR)rCall.rCVBS.eResMode, rCall.fgHDExist,
-                     fgOSD5);
-
+    rCall.rHDMI = rAsRun(&prOutConf[PMX_OUTPUT_HDMI], ucFmtMode);
+    rCall.rCAV = rAsRun(&prOutConf[PMX_OUTPUT_CAV], ucFmtMode);
+    rCall.rCVBS = rAsRun(&prOutConf[PMX_OUTPUT_CVBS], ucFmtMode);
     PMX_SET_HDMI_RES_PARAMETER_T stResData = {
         .u1ScaleMode = 0,
         .ucHdmiOutDisplayResolution = (UINT8)rCall.rHDMI.eResMode,
@@ -260,12 +257,17 @@ UINT32 PMX_SetModeEx(UCHAR ucPmxId, PMX_RESOLUTION_T* prOutConf, UCHAR ucVFreq, 
         .fgHdmiOutEnable = rCall.rHDMI.fgOutputEnable,
         .u2_Vfreq = 0,
     };
+
+    vFindChanges(&rCall, prOutConf, rDrvExtScl);
+    PMX_IsLog(9, "HD Exist(%d)\n", rCall.fgHDExist);
+    TVE_SetMuteCtrol(rCall.fgFmtChange, (UCHAR)rCall.rCAV.eResMode, (UCHAR)rCall.rCVBS.eResMode, rCall.fgHDExist,
+                     fgOSD5);
     if (rCall.fgFmtChange != 0)
         vApplyFullChange(&rCall, &stResData);
     else
         vApplySameFormat(&rCall, &stResData);
 
-    BOOL fgHdmiExist = rCall.fgFmtChange | rCall.fgHdmiChange; // an HDMI resolution change was sent
-    vWaitForDisplayPart(fgHdmiExist);
+    // Both ways of applying send HDMI a resolution change exactly then.
+    vWaitForDisplayPart(rCall.fgFmtChange != 0 || rCall.fgHdmiChange != 0);
     return 1;
 }

@@ -11,31 +11,36 @@ typedef struct
 {
     const CHAR* szTrace;
     const CHAR* szRefusal;
-    UINT8 u1Stored; // where the record keeps it
+    UCHAR PMX_CONF_T::*pucStored;
     UINT8 u1CapBit;
     UINT8 u1HdmiCommand;
 } ADJUSTMENT_T;
 
-static constexpr ADJUSTMENT_T BRIGHTNESS = { "[PMX] Seting Brightness: %d,%d.\n",
-                                             "[PMX] Seting Brightness fail: %d,%d.\n",
-                                             offsetof(PMX_CONF_T, ucBrightness), PMX_CAP_BRIGHTNESS,
-                                             PMX_SET_HDMI_BRIGHTNESS };
-static constexpr ADJUSTMENT_T CONTRAST = { "[PMX] Seting Contrast: %d,%d.\n", "[PMX] Seting Contrast fail: %d,%d.\n",
-                                           offsetof(PMX_CONF_T, ucContrast), PMX_CAP_CONTRAST, PMX_SET_HDMI_CONTRAST };
-static constexpr ADJUSTMENT_T HUE = { "[PMX] Seting Hue: %d,%d.\n", "[PMX] Seting Hue fail: %d,%d.\n",
-                                      offsetof(PMX_CONF_T, ucHue), PMX_CAP_HUE, PMX_SET_HDMI_HUE };
-static constexpr ADJUSTMENT_T SATURATION = { "[PMX] Seting Saturation: %d,%d.\n",
-                                             "[PMX] Seting Saturation fail: %d,%d.\n",
-                                             offsetof(PMX_CONF_T, ucSaturation), PMX_CAP_SATURATION,
-                                             PMX_SET_HDMI_SATURATION };
-static constexpr ADJUSTMENT_T SHARPNESS = { "[PMX] Seting Sharpness: %d,%d.\n", "[PMX] Seting Sharpness fail: %d,%d.\n",
-                                            offsetof(PMX_CONF_T, ucSharpness), PMX_CAP_SHARPNESS,
-                                            PMX_SET_HDMI_SHARPNESS };
-
-static UCHAR* pucStored(const ADJUSTMENT_T* prAdjustment)
-{
-    return (UCHAR*)prPmxConf() + prAdjustment->u1Stored;
-}
+static constexpr ADJUSTMENT_T BRIGHTNESS = { .szTrace = "[PMX] Seting Brightness: %d,%d.\n",
+                                             .szRefusal = "[PMX] Seting Brightness fail: %d,%d.\n",
+                                             .pucStored = &PMX_CONF_T::ucBrightness,
+                                             .u1CapBit = PMX_CAP_BIT_BRIGHTNESS,
+                                             .u1HdmiCommand = PMX_SET_HDMI_BRIGHTNESS };
+static constexpr ADJUSTMENT_T CONTRAST = { .szTrace = "[PMX] Seting Contrast: %d,%d.\n",
+                                           .szRefusal = "[PMX] Seting Contrast fail: %d,%d.\n",
+                                           .pucStored = &PMX_CONF_T::ucContrast,
+                                           .u1CapBit = PMX_CAP_BIT_CONTRAST,
+                                           .u1HdmiCommand = PMX_SET_HDMI_CONTRAST };
+static constexpr ADJUSTMENT_T HUE = { .szTrace = "[PMX] Seting Hue: %d,%d.\n",
+                                      .szRefusal = "[PMX] Seting Hue fail: %d,%d.\n",
+                                      .pucStored = &PMX_CONF_T::ucHue,
+                                      .u1CapBit = PMX_CAP_BIT_HUE,
+                                      .u1HdmiCommand = PMX_SET_HDMI_HUE };
+static constexpr ADJUSTMENT_T SATURATION = { .szTrace = "[PMX] Seting Saturation: %d,%d.\n",
+                                             .szRefusal = "[PMX] Seting Saturation fail: %d,%d.\n",
+                                             .pucStored = &PMX_CONF_T::ucSaturation,
+                                             .u1CapBit = PMX_CAP_BIT_SATURATION,
+                                             .u1HdmiCommand = PMX_SET_HDMI_SATURATION };
+static constexpr ADJUSTMENT_T SHARPNESS = { .szTrace = "[PMX] Seting Sharpness: %d,%d.\n",
+                                            .szRefusal = "[PMX] Seting Sharpness fail: %d,%d.\n",
+                                            .pucStored = &PMX_CONF_T::ucSharpness,
+                                            .u1CapBit = PMX_CAP_BIT_SHARPNESS,
+                                            .u1HdmiCommand = PMX_SET_HDMI_SHARPNESS };
 
 /* What the five setters share: id, trace, capability, refusal, and the stored value, which is the analogue outputs'
  * alone. */
@@ -44,18 +49,18 @@ static bool fgTakeAdjustment(const ADJUSTMENT_T* prAdjustment, UCHAR ucPmxId, UC
     if (ucPmxId != 0)
         return false;
 
-    PMX_IS_LOG_ONE_OF(8, prAdjustment->szTrace, bSetTVE, ucValue);
+    PMX_IS_LOG_TEXT(8, prAdjustment->szTrace, bSetTVE, ucValue);
     if (!fgPmxHasCap(prAdjustment->u1CapBit))
     {
-        PMX_IS_LOG_ONE_OF(8, prAdjustment->szRefusal, bSetTVE, ucValue);
+        PMX_IS_LOG_TEXT(8, prAdjustment->szRefusal, bSetTVE, ucValue);
         return false;
     }
     if (bSetTVE != 0)
-        *pucStored(prAdjustment) = ucValue;
+        prPmxConf()->*prAdjustment->pucStored = ucValue;
     return true;
 }
 
-/* HDMI's value goes by, unstored. */
+/* A value for HDMI is sent and not kept. */
 static void vAdjustHdmi(const ADJUSTMENT_T* prAdjustment, UCHAR ucValue)
 {
     fgPmxDrvSetAvd(prAdjustment->u1HdmiCommand, &ucValue, 1);
@@ -63,7 +68,7 @@ static void vAdjustHdmi(const ADJUSTMENT_T* prAdjustment, UCHAR ucValue)
 
 static UINT32 u4GetAdjustment(const ADJUSTMENT_T* prAdjustment, UCHAR ucPmxId, UCHAR* pucValue)
 {
-    return u4PmxGiveFeature(ucPmxId, prAdjustment->u1CapBit, *pucStored(prAdjustment), pucValue);
+    return u4PmxGiveFeatureByte(ucPmxId, prAdjustment->u1CapBit, prPmxConf()->*prAdjustment->pucStored, pucValue);
 }
 
 UINT32 PMX_SetBrightness(UCHAR ucPmxId, UCHAR ucBrightness, UCHAR bSetTVE)
@@ -205,7 +210,7 @@ void d_PMX_GetSharpness(UCHAR* pucSharpness)
 
 UINT32 PMX_SetGamma(UCHAR ucPmxId, UCHAR ucGamma)
 {
-    if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_GAMMA))
+    if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_BIT_GAMMA))
         return 0;
 
     prPmxConf()->ucGamma = ucGamma; // as given, also when no curve has this number and gamma is off
@@ -216,17 +221,17 @@ UINT32 PMX_SetGamma(UCHAR ucPmxId, UCHAR ucGamma)
 
 UINT32 PMX_GetGamma(UCHAR ucPmxId, UCHAR* pucGamma)
 {
-    return u4PmxGiveFeature(ucPmxId, PMX_CAP_GAMMA, prPmxConf()->ucGamma, pucGamma);
+    return u4PmxGiveFeatureByte(ucPmxId, PMX_CAP_BIT_GAMMA, prPmxConf()->ucGamma, pucGamma);
 }
 
 UINT32 PMX_GetGammaNs(UCHAR ucPmxId, UCHAR* pucGammaNs)
 {
-    return u4PmxGiveFeature(ucPmxId, PMX_CAP_GAMMA, PMX_GAMMA_CURVE_NUM, pucGammaNs);
+    return u4PmxGiveFeatureByte(ucPmxId, PMX_CAP_BIT_GAMMA, PMX_GAMMA_CURVE_NUM, pucGammaNs);
 }
 
 UINT32 PMX_SetBlackLv(UCHAR ucPmxId, UCHAR ucCAVEn, UCHAR ucCVBSEn)
 {
-    if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_BLACK_LEVEL))
+    if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_BIT_BLACK_LEVEL))
         return 0;
 
     PMX_IsLog(8, "TVE Set Black Lv, CAV(%d), CVBS(%d)\n", ucCAVEn, ucCVBSEn);
@@ -238,7 +243,7 @@ UINT32 PMX_SetBlackLv(UCHAR ucPmxId, UCHAR ucCAVEn, UCHAR ucCVBSEn)
 
 UINT32 PMX_GetBlackLv(UCHAR ucPmxId, UCHAR* pucCAVEn, UCHAR* pucCVBSEn)
 {
-    if (ucPmxId != 0 || pucCAVEn == nullptr || pucCVBSEn == nullptr || !fgPmxHasCap(PMX_CAP_BLACK_LEVEL))
+    if (ucPmxId != 0 || pucCAVEn == nullptr || pucCVBSEn == nullptr || !fgPmxHasCap(PMX_CAP_BIT_BLACK_LEVEL))
         return 0;
 
     const PMX_CONF_T* prConf = prPmxConf();

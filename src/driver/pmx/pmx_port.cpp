@@ -1,9 +1,8 @@
-/* Input ports: which upstream component feeds which, and the lock that guards them. */
+/* Input ports: which upstream component feeds which, and the lock over connecting them. */
 #include "drv_pmx.h"
 #include "pmx_if.h"
 #include "u_os.h"
 
-/* Without the lock the operation goes on all the same: the stack decides what a failed assertion means. */
 void vPmxLock(void)
 {
     if (x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) != OSR_OK)
@@ -22,7 +21,7 @@ UINT32 u4PmxCompId2LocalId(UINT16 u2CompType, UINT16 u2CompId)
         return u4PmxVdpPort((UCHAR)u2CompId);
     if (u2CompType == PMX_COMP_TYPE_OSD)
         return u4PmxOsdPort((UCHAR)u2CompId);
-    // An unknown number of a known type is not worth a message.
+    // Only an unknown type is worth a message, not an unknown number of a known one.
     PMX_IsLog(8, "COMP ID to LOCAL ID Fail, CompType = %d, CompId = %d\n", u2CompType, u2CompId);
     return PMX_PORT_NUM;
 }

@@ -12,21 +12,34 @@ UINT32 PMX_SetSwapEnable(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucSwapMode)
     if (ucPmxId != 0)
         return 0;
 
-    static constexpr const CHAR* TEXTS[] = { "Plane 1_2 Swap\n", "Plane 3_4 Swap\n", "Plane 6_7 Swap\n",
-                                             "Plane 4_7 Swap\n", "Plane 1_3 Swap\n", "Plane 5_8 Swap\n" };
-    if (ucSwapMode < 1 || ucSwapMode > sizeof TEXTS / sizeof TEXTS[0])
-        return 1;
-
     UINT32 u4Swap = ucEnable != 0;
-    PMX_IS_LOG_ONE_OF(8, TEXTS[ucSwapMode - 1]);
     switch (ucSwapMode)
     {
-    case 1: PMX_HalSwapPlane1_2(0, u4Swap); break;
-    case 2: PMX_HalSwapPlane3_4(0, u4Swap); break;
-    case 3: PMX_HalSwapPlane6_7(0, u4Swap); break;
-    case 4: PMX_HalSwapPlane4_7(0, u4Swap); break;
-    case 5: PMX_HalSwapPlane1_3(0, u4Swap); break;
-    default: PMX_HalSwapPlane5_8(0, u4Swap); break;
+    case 1:
+        PMX_IsLog(8, "Plane 1_2 Swap\n");
+        PMX_HalSwapPlane1_2(0, u4Swap);
+        break;
+    case 2:
+        PMX_IsLog(8, "Plane 3_4 Swap\n");
+        PMX_HalSwapPlane3_4(0, u4Swap);
+        break;
+    case 3:
+        PMX_IsLog(8, "Plane 6_7 Swap\n");
+        PMX_HalSwapPlane6_7(0, u4Swap);
+        break;
+    case 4:
+        PMX_IsLog(8, "Plane 4_7 Swap\n");
+        PMX_HalSwapPlane4_7(0, u4Swap);
+        break;
+    case 5:
+        PMX_IsLog(8, "Plane 1_3 Swap\n");
+        PMX_HalSwapPlane1_3(0, u4Swap);
+        break;
+    case 6:
+        PMX_IsLog(8, "Plane 5_8 Swap\n");
+        PMX_HalSwapPlane5_8(0, u4Swap);
+        break;
+    default: break;
     }
     return 1;
 }
@@ -64,16 +77,21 @@ UINT32 PMX_SetCBEnable(UCHAR ucPmxId, UCHAR ucEnable)
         PMX_HalSetActiveZone(0, prConf->ucMode);
         PMX_HalSetCBWidth(0, prPmxModeRow(prConf->ucMode)->u1CBWidth);
         PMX_HalEnableCB(0);
+        if (bComp0OnTop == 1) // undone while the bar is shown, and still remembered
+        {
+            PMX_IsLog(8, "Temporarily Turn Off Plane Swap 1_2\n");
+            PMX_HalSwapPlane1_2(0, 0);
+        }
     }
     else
     {
         PMX_IsLog(8, "ColorBar Disable\n");
         PMX_HalDisableCB(0);
-    }
-    if (bComp0OnTop == 1) // undone while the bar is shown, and still remembered
-    {
-        PMX_IsLog(8, ucEnable != 0 ? "Temporarily Turn Off Plane Swap 1_2\n" : "Resume Plane Swap 1_2\n");
-        PMX_HalSwapPlane1_2(0, ucEnable == 0);
+        if (bComp0OnTop == 1)
+        {
+            PMX_IsLog(8, "Resume Plane Swap 1_2\n");
+            PMX_HalSwapPlane1_2(0, 1);
+        }
     }
     prConf->ucCBEnable = ucEnable; // as given: the mute looks for exactly 1
     return 1;

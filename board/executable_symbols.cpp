@@ -94,11 +94,11 @@ const Table& table()
     return instance;
 }
 
-/** Whether a symbol is an object or function of the executable itself. */
+/** Whether a symbol is an object or function of the executable itself; start-up code has some without a name. */
 bool is_defined(const ElfW(Sym) & symbol)
 {
     const unsigned type = symbol.st_info & 0xF;
-    return symbol.st_shndx != SHN_UNDEF && (type == STT_OBJECT || type == STT_FUNC);
+    return symbol.st_shndx != SHN_UNDEF && symbol.st_name != 0 && (type == STT_OBJECT || type == STT_FUNC);
 }
 
 bool is_global(const ElfW(Sym) & symbol)

@@ -8,9 +8,23 @@ set(PMX_PRODUCT_LANGUAGE
 # What keeps the objects free of symbols and sections that a stack does not provide for.
 set(PMX_PRODUCT_CODE
     -fno-stack-protector -fno-asynchronous-unwind-tables -fno-unwind-tables -U_FORTIFY_SOURCE
-    -ffile-prefix-map=${PROJECT_SOURCE_DIR}/= -O2 -g)
+    -ffile-prefix-map=${PROJECT_SOURCE_DIR}/= -g)
 
-set(PMX_PRODUCT_FLAGS ${PMX_PRODUCT_LANGUAGE} ${PMX_PRODUCT_CODE} -fcf-protection=none)
+# The 32-bit target. Nothing is said about the width of enumerations: the headers hold it, whatever a compiler thinks.
+set(PMX_TARGET_ARM -march=armv7-a -mfloat-abi=soft)
+set(PMX_TARGET_ARM_MODES thumb arm)
+set(PMX_TARGET_ARM_OPTIMISATIONS Os O2)
+
+# What the target of this build asks for. A PC that runs ARM programs passes floating-point numbers in registers; the
+# layer has none, and must not touch those registers.
+set(PMX_PRODUCT_TARGET "")
+if(CMAKE_SYSTEM_PROCESSOR MATCHES "^(x86_64|AMD64|i.86)$")
+    set(PMX_PRODUCT_TARGET -fcf-protection=none)
+elseif(CMAKE_SYSTEM_PROCESSOR STREQUAL arm)
+    set(PMX_PRODUCT_TARGET -march=armv7-a+fp -mfloat-abi=hard -mgeneral-regs-only -mthumb)
+endif()
+
+set(PMX_PRODUCT_FLAGS ${PMX_PRODUCT_LANGUAGE} ${PMX_PRODUCT_CODE} -O2 ${PMX_PRODUCT_TARGET})
 
 set(PMX_PRODUCT_WARNINGS_GNU
     -Werror -Wall -Wextra -Wpedantic

@@ -108,10 +108,11 @@ TEST_F(Console, Conversions_AsInTheCLibrary)
     Printf("%*d|%-*d|%.*s\n", 5, 1, 5, 2, 2, "xyz");
     Printf("%.2f %c %p\n", 1.5, 'x', static_cast<void*>(nullptr));
     EXPECT_EQ("-1 2 3 beef BEEF 10 %\n"
-              "00000abc 42    | +42  42 0xff 007    ab|\n"
-              "-9223372036854775808 18446744073709551615 -5 fedcba9876543210 4\n"
-              "    1|2    |xy\n"
-              "1.50 x (nil)\n",
+              "00000abc 42    | +42  42 0xff 007    ab|\n" +
+                  std::to_string(LONG_MIN) + " " + std::to_string(ULONG_MAX) +
+                  " -5 fedcba9876543210 4\n"
+                  "    1|2    |xy\n"
+                  "1.50 x (nil)\n",
               board::console_text());
     EXPECT_EQ(0u, board::misuses());
 }

@@ -5,6 +5,10 @@
 #define HOLDS_OFFSET(Type, Field, Offset) static_assert(offsetof(Type, Field) == (Offset))
 #define HOLDS_SIZE(Type, Size) static_assert(sizeof(Type) == (Size))
 
+/* Whoever reads a record out of a memory dump counts on the byte order, and so does the boot partition's first word,
+ * whose low byte is the HDMI resolution. */
+static_assert(__BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__);
+
 /* Records without pointers: the same on every target. */
 
 HOLDS_OFFSET(PMX_PORT_INFO_T, u2CompType, 0);

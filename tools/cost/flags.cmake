@@ -1,0 +1,8 @@
+# Prints the product's flags, one list a line: cmake -DROOT=... -P flags.cmake
+set(PROJECT_SOURCE_DIR ${ROOT})
+cmake_host_system_information(RESULT CMAKE_SYSTEM_PROCESSOR QUERY OS_PLATFORM)
+include(${ROOT}/cmake/ProductFlags.cmake)
+foreach(name PMX_PRODUCT_LANGUAGE PMX_PRODUCT_CODE PMX_PRODUCT_FLAGS PMX_TARGET_ARM)
+    string(JOIN " " joined ${${name}})
+    execute_process(COMMAND ${CMAKE_COMMAND} -E echo "${name} ${joined}")
+endforeach()

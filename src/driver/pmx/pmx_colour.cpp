@@ -23,7 +23,7 @@ static constexpr CONVERSION_T CONVERSIONS[] = {
     { 1, 0, 0, "CC_A enable, 601->709\n", "Scaler CC disable\n" }, // 601
     { 0, 0, 1, "CC_A disable\n", "Scaler CC enable, 709->601\n" }, // 709
 };
-static_assert(COUNT_OF(CONVERSIONS) == 2 * PMX_COLOUR_HD && PMX_COLOUR_SD == 1 && DRV_PMX_CS_YCBCR_601 == 0 &&
+static_assert(COUNT_OF(CONVERSIONS) / 2 == PMX_COLOUR_HD && PMX_COLOUR_SD == 1 && DRV_PMX_CS_YCBCR_601 == 0 &&
               DRV_PMX_CS_YCBCR_709 == 1);
 
 void PMX_ColorSpaceSetup(DRV_PMX_COLOR_SPACE_T eMixerOutCS, UCHAR ucOutputMode)

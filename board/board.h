@@ -45,6 +45,9 @@ public:
     using std::runtime_error::runtime_error;
 };
 
+/** Names of the boards in the boards directory, sorted. */
+std::vector<std::string> boards_by_name();
+
 /** Read a board description: a .toml file, or a directory that holds board.toml, or the name of one under the boards
  *  directory. Relative paths in it are relative to the file. Unknown keys are errors. Throws DescriptionError. */
 Description load_description(const std::filesystem::path& board);

@@ -302,19 +302,6 @@ Description read(const File& file, const toml::table& root)
     return description;
 }
 
-std::vector<std::string> boards_by_name()
-{
-    std::vector<std::string> names;
-    std::error_code error;
-    for (const auto& entry : std::filesystem::directory_iterator(boards_directory(), error))
-    {
-        if (std::filesystem::is_regular_file(entry.path() / "board.toml"))
-            names.push_back(entry.path().filename().string());
-    }
-    std::sort(names.begin(), names.end());
-    return names;
-}
-
 std::filesystem::path find_file(const std::filesystem::path& board)
 {
     for (const auto& candidate : { board, board / "board.toml", boards_directory() / board / "board.toml" })
@@ -328,6 +315,19 @@ std::filesystem::path find_file(const std::filesystem::path& board)
 }
 
 } // namespace
+
+std::vector<std::string> boards_by_name()
+{
+    std::vector<std::string> names;
+    std::error_code error;
+    for (const auto& entry : std::filesystem::directory_iterator(boards_directory(), error))
+    {
+        if (std::filesystem::is_regular_file(entry.path() / "board.toml"))
+            names.push_back(entry.path().filename().string());
+    }
+    std::sort(names.begin(), names.end());
+    return names;
+}
 
 void set_boards_directory(std::filesystem::path directory)
 {

@@ -9,4 +9,6 @@ install(DIRECTORY board/ DESTINATION include/pmx/board FILES_MATCHING PATTERN "*
 install(TARGETS pmx_board pmxboard ARCHIVE DESTINATION lib/pmx RUNTIME DESTINATION bin)
 install(DIRECTORY boards scenarios examples DESTINATION share/pmx)
 install(FILES src/driver/pmx/pmx_export.c DESTINATION share/pmx)
-install(DIRECTORY docs/ DESTINATION share/doc/pmx PATTERN Doxyfile EXCLUDE)
+install(DIRECTORY docs/ DESTINATION share/doc/pmx PATTERN Doxyfile EXCLUDE PATTERN pmxboard.1 EXCLUDE)
+install(FILES docs/pmxboard.1 DESTINATION share/man/man1)
+install(FILES tools/pmxboard/pmxboard.bash DESTINATION share/bash-completion/completions RENAME pmxboard)

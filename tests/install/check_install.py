@@ -31,6 +31,10 @@ def main():
         run(prefix / "bin/pmxboard", "run", "--quiet", "--board", "installed",
             prefix / "share/pmx/scenarios/cold-boot.pmx", cwd=directory)
 
+        for part in ("share/man/man1/pmxboard.1", "share/bash-completion/completions/pmxboard"):
+            if not (prefix / part).is_file():
+                sys.exit(f"{part} is not installed")
+
         run(cmake, "-G", "Ninja", "-S", prefix / "share/pmx/examples", "-B", elsewhere, f"-DCMAKE_PREFIX_PATH={prefix}",
             f"-DCMAKE_EXE_LINKER_FLAGS={linker_flags}", f"-DCMAKE_C_FLAGS=-Wall -Wextra -Werror {linker_flags}")
         run(cmake, "--build", elsewhere)

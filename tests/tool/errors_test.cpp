@@ -84,8 +84,9 @@ TEST(ScenarioErrors, Verbs_ShowHowTheyAreWritten)
     for (const char* const wrong : { "advance", "advance 10", "advance s", "advance 1h", "advance -1s", "advance 1 s" })
         EXPECT_EQ("here.pmx:1: write: advance 10s, 500ms or 2us\n", diagnostics(wrong)) << wrong;
     EXPECT_EQ("here.pmx:1: write: loglevel LEVEL\n", diagnostics("loglevel"));
-    for (const char* const wrong : { "state a b", "state --jsn", "state os --json more" })
-        EXPECT_EQ("here.pmx:1: write: state [PATH] [--json]\n", diagnostics(wrong)) << wrong;
+    EXPECT_EQ("here.pmx:1: write: state [PATH…] [--json]\n", diagnostics("state --jsn"));
+    for (const char* const wrong : { "save", "save one.json two.json" })
+        EXPECT_EQ("here.pmx:1: write: save FILE\n", diagnostics(wrong)) << wrong;
     EXPECT_EQ("here.pmx:1: write: poke FIELD VALUE\n", diagnostics("poke ucMode"));
     for (const char* const wrong : { "trace", "trace maybe" })
         EXPECT_EQ("here.pmx:1: write: trace on, or trace off\n", diagnostics(wrong)) << wrong;
@@ -108,6 +109,7 @@ TEST(ScenarioErrors, VerbsWithUnknownNames)
                      "poke ucMode RES_480PP");
     EXPECT_EQ("here.pmx:1: ucMode holds 0 to 255, not 256\n", diagnostics("poke ucMode 256"));
     EXPECT_BEGINNING("here.pmx:1: no state mixr; did you mean mixer", "state mixr");
+    EXPECT_BEGINNING("here.pmx:1: no state mixr; did you mean mixer", "state ucMode mixr");
 }
 
 TEST(ScenarioErrors, Fault_OnFunctionWithoutResult)

@@ -100,6 +100,18 @@ TEST(Output, Colour_OnlyWhenAskedFor)
     EXPECT_EQ("\x1b[1m> PMX_GetMode 0\x1b[0m\n\x1b[32m  = 1\x1b[0m\n\x1b[32m  *pucMode = RES_480I\x1b[0m\n", shown);
 }
 
+TEST(Output, Colour_EndsWithEachLine)
+{
+    std::istringstream lines(run("PMX_ChkSupportedRes 0 RES_1080P60HZ 60", { .colour = true }).shown);
+    unsigned count = 0;
+    for (std::string line; std::getline(lines, line); ++count)
+    {
+        EXPECT_TRUE(line.starts_with("\x1b[")) << line;
+        EXPECT_TRUE(line.ends_with("\x1b[0m")) << line;
+    }
+    EXPECT_EQ(7u, count);
+}
+
 TEST(Output, TraceOff_LeavesTheConsole)
 {
     const std::string shown = run("PMX_Init", { .trace = TraceForm::Off }).shown;
@@ -144,12 +156,13 @@ TEST(Output, Json_OneObjectALine)
 
 TEST(Output, Json_StateIsALineToo)
 {
-    const auto lines = parsed_lines(run("state _fgBootUp\nstate --json", { .trace = TraceForm::Json }).shown);
-    ASSERT_EQ(2u, lines.size());
-    EXPECT_EQ((Json{ { "kind", "state" }, { "path", "_fgBootUp" }, { "value", 1 } }), lines[0]);
-    EXPECT_EQ("", lines[1].at("path"));
-    EXPECT_EQ(48u, lines[1].at("value").at("record").size());
-    EXPECT_TRUE(lines[1].at("value").contains("mixer"));
+    const auto lines = parsed_lines(run("state _fgBootUp ucHue\nstate --json", { .trace = TraceForm::Json }).shown);
+    ASSERT_EQ(3u, lines.size());
+    EXPECT_EQ((Json{ { "kind", "state" }, { "version", 1 }, { "path", "_fgBootUp" }, { "value", 1 } }), lines[0]);
+    EXPECT_EQ("ucHue", lines[1].at("path"));
+    EXPECT_EQ("", lines[2].at("path"));
+    EXPECT_EQ(48u, lines[2].at("value").at("record").size());
+    EXPECT_TRUE(lines[2].at("value").contains("mixer"));
 }
 
 TEST(Output, Json_ToItsOwnPlace)

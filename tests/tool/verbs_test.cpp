@@ -109,13 +109,6 @@ TEST(Verbs, State_ShowsAFieldARecordOrEverything)
         EXPECT_NE(std::string::npos, everything.find(part)) << part << " in\n" << everything;
 }
 
-TEST(Verbs, State_AsJson)
-{
-    EXPECT_EQ("> state status.hPMXTimer --json\n0\n", run("state status.hPMXTimer --json").shown);
-    EXPECT_EQ("> state --json ucMode\n{\n  \"value\": 0,\n  \"name\": \"RES_480I\"\n}\n",
-              run("state --json ucMode").shown);
-}
-
 TEST(Verbs, Poke_ChangesTheRecord)
 {
     EXPECT_EQ(

@@ -14,10 +14,14 @@ int usage_error(const std::string& message)
     return exit_usage;
 }
 
-bool wants_colour()
+bool wants_colour(std::string_view when)
 {
+    if (when != "auto")
+        return when == "always";
     const char* const refused = std::getenv("NO_COLOR");
-    return (refused == nullptr || *refused == '\0') && isatty(STDOUT_FILENO) == 1;
+    const char* const terminal = std::getenv("TERM");
+    const bool can = terminal == nullptr || std::string_view(terminal) != "dumb";
+    return can && (refused == nullptr || *refused == '\0') && isatty(STDOUT_FILENO) == 1;
 }
 
 } // namespace pmxboard

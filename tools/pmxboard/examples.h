@@ -5,6 +5,14 @@
 namespace pmxboard
 {
 
+/** Of the tool as a whole. */
+extern const char* const overview_examples;
+
 extern const char* const run_examples;
+extern const char* const state_examples;
+extern const char* const shell_examples;
+extern const char* const ops_examples;
+extern const char* const modes_examples;
+extern const char* const decode_examples;
 
 } // namespace pmxboard

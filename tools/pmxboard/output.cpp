@@ -3,6 +3,8 @@
 #include <cstdio>
 #include <ostream>
 
+#include "tools/pmxboard/state_dump.h"
+
 namespace pmxboard
 {
 namespace
@@ -15,58 +17,62 @@ constexpr std::string_view green = "32";
 constexpr std::string_view yellow = "33";
 constexpr std::string_view grey = "90";
 
-bool has_members(const board::Value& value)
-{
-    return !value.items().empty();
-}
-
-/** A call's line broken behind commas where it is too long for the screen; texts stay whole. */
-std::string folded(const std::string& line, std::size_t indent)
-{
-    std::string lines;
-    std::size_t begin = 0;
-    std::size_t comma = 0; // behind the last one of this line
-    bool quoted = false;
-    for (std::size_t i = 0; i < line.size(); ++i)
-    {
-        if (line[i] == '"' && (i == 0 || line[i - 1] != '\\'))
-            quoted = !quoted;
-        const std::size_t column = i - begin + (begin == 0 ? 0 : indent);
-        if (column >= columns && comma > begin)
-        {
-            lines += line.substr(begin, comma - begin) + '\n' + std::string(indent, ' ');
-            begin = comma + 1;
-        }
-        if (!quoted && line[i] == ',')
-            comma = i + 1;
-    }
-    return lines + line.substr(begin);
-}
-
 } // namespace
 
 Output::Output(const OutputOptions& options) : m_options(options)
 {
 }
 
-bool Output::json_to_people() const
+bool Output::is_machine_read() const
 {
-    return m_options.trace == TraceForm::Json && m_options.trace_to == nullptr;
+    return (m_options.trace == TraceForm::Json || m_options.trace == TraceForm::Chrome) &&
+           m_options.trace_to == nullptr;
 }
 
 std::ostream* Output::people() const
 {
-    return m_options.quiet || json_to_people() ? nullptr : m_options.to;
+    return m_options.quiet || is_machine_read() ? nullptr : m_options.to;
 }
 
 std::string Output::painted(std::string_view text, std::string_view code) const
 {
-    return m_options.colour ? "\x1b[" + std::string(code) + "m" + std::string(text) + "\x1b[0m" : std::string(text);
+    if (!m_options.colour)
+        return std::string(text);
+    // Each line by itself: a pager may show the second one without the first.
+    const std::string begin = "\x1b[" + std::string(code) + "m";
+    const std::string end = "\x1b[0m";
+    std::string lines = begin;
+    for (const char c : text)
+        lines += c == '\n' ? end + "\n" + begin : std::string(1, c);
+    return lines + end;
+}
+
+void Output::imagine(std::ostream& to)
+{
+    m_options.trace = for_programs() ? TraceForm::Json : TraceForm::Text;
+    m_options.to = &to;
+    m_options.trace_to = nullptr;
+    m_options.chrome = nullptr;
+    m_trace_shown = true;
+}
+
+void Output::powered_on()
+{
+    if (m_options.chrome != nullptr)
+        m_options.chrome->powered_on();
+}
+
+void Output::operation_begins(const std::string& name)
+{
+    if (m_options.chrome != nullptr)
+        m_options.chrome->operation_begins(name);
 }
 
 void Output::command(std::string_view line)
 {
-    if (people() != nullptr)
+    if (m_options.chrome != nullptr)
+        m_options.chrome->command(line);
+    if (people() != nullptr && m_options.echo)
         *people() << painted("> " + std::string(line), bold) << '\n';
 }
 
@@ -78,6 +84,8 @@ void Output::expectation(std::string_view line)
 
 void Output::outcome(const Outcome& outcome)
 {
+    if (m_options.chrome != nullptr)
+        m_options.chrome->operation_ends(outcome);
     flush();
     if (people() == nullptr)
         return;
@@ -97,23 +105,35 @@ void Output::text(std::string_view text)
         *people() << text;
 }
 
-void Output::state(const std::string& path, const board::Value& value, bool json)
+void Output::remark(std::string_view text)
 {
     flush();
-    if (json_to_people())
-    {
-        board::Value line;
-        line.add("kind", board::Value::text("state"));
-        line.add("path", board::Value::text(path));
-        line.add("value", value);
-        *m_options.to << line.to_json() << '\n';
-    }
-    else if (people() != nullptr && json)
-        *people() << value.to_json(2) << '\n';
-    else if (people() != nullptr && has_members(value))
-        *people() << tree(value, 2);
+    if (people() != nullptr)
+        *people() << painted(text, yellow) << '\n';
+}
+
+void Output::shown(const std::string& json_line, std::string_view text)
+{
+    flush();
+    if (for_programs())
+        *m_options.to << json_line << '\n';
     else if (people() != nullptr)
-        *people() << "  " << (path.empty() ? "" : path + " = ") << value.to_text() << '\n';
+        *people() << text;
+}
+
+void Output::imagined(std::string_view line, const std::string& written, const std::string& outcome)
+{
+    if (!for_programs())
+    {
+        text(written);
+        return;
+    }
+    std::string calls = written.substr(0, written.find_last_not_of('\n') + 1);
+    for (std::size_t end = calls.find('\n'); end != calls.npos; end = calls.find('\n', end))
+        calls[end] = ',';
+    shown("{\"kind\":\"what-if\",\"command\":" + to_json(board::Value::text(std::string(line))) + ",\"calls\":[" +
+              calls + "],\"outcome\":" + outcome + "}",
+          {});
 }
 
 std::string Output::render(const board::TraceEntry& entry) const
@@ -139,7 +159,11 @@ void Output::entry(const board::TraceEntry& entry)
     // Where people read the console, a line that it shows need not stand in the trace as well.
     const bool on_console = entry.kind == board::TraceEntry::Kind::Log && entry.shown &&
                             m_options.trace == TraceForm::Text && m_options.trace_to == nullptr;
-    if (m_trace_shown && m_options.trace != TraceForm::Off && !on_console)
+    const bool is_shown = m_trace_shown && m_options.filter.shows(entry);
+    const bool as_lines = m_options.trace == TraceForm::Text || m_options.trace == TraceForm::Json;
+    if (m_options.chrome != nullptr)
+        m_options.chrome->entry(entry, is_shown);
+    if (is_shown && as_lines && !on_console)
     {
         if (entry.depth == 0)
             write_trace(render(entry));
@@ -163,7 +187,7 @@ void Output::write_trace(const std::string& line)
 {
     if (m_options.trace_to != nullptr)
         *m_options.trace_to << line;
-    else if (json_to_people())
+    else if (for_programs())
         *m_options.to << line;
     else if (people() != nullptr)
         *people() << line;
@@ -199,6 +223,8 @@ void Output::release_nested()
 
 void Output::flush()
 {
+    if (m_options.chrome != nullptr)
+        m_options.chrome->settle();
     release_nested();
     // A blank that the next console line begins with is no line of its own.
     if (m_console_line.find_first_not_of(' ') != std::string::npos)
@@ -209,9 +235,44 @@ void Output::flush()
         m_options.trace_to->flush();
 }
 
+std::string folded(const std::string& line, std::size_t indent)
+{
+    std::string lines;
+    std::size_t begin = 0;
+    std::size_t comma = 0; // behind the last one of this line
+    bool quoted = false;
+    for (std::size_t i = 0; i < line.size(); ++i)
+    {
+        if (line[i] == '"' && (i == 0 || line[i - 1] != '\\'))
+            quoted = !quoted;
+        const std::size_t column = i - begin + (begin == 0 ? 0 : indent);
+        if (column >= columns && comma > begin)
+        {
+            lines += line.substr(begin, comma - begin) + '\n' + std::string(indent, ' ');
+            begin = comma + 1;
+        }
+        if (!quoted && line[i] == ',')
+            comma = i + 1;
+    }
+    return lines + line.substr(begin);
+}
+
 std::string item_step(std::size_t index)
 {
     return std::string("[").append(std::to_string(index)).append("]");
+}
+
+std::string to_json(const Outcome& outcome)
+{
+    const std::string result = outcome.result ? "\"result\":" + to_json(*outcome.result) : std::string();
+    std::string outputs;
+    for (const OutputValue& output : outcome.outputs)
+    {
+        outputs += (outputs.empty() ? "" : ",") + to_json(board::Value::text(output.name)) + ":" +
+                   (output.value ? to_json(*output.value) : "\"untouched\"");
+    }
+    return "{" + result + (result.empty() || outputs.empty() ? "" : ",") +
+           (outputs.empty() ? "" : "\"outputs\":{" + outputs + "}") + "}";
 }
 
 std::string tree(const board::Value& value, std::size_t indent)
@@ -223,7 +284,7 @@ std::string tree(const board::Value& value, std::size_t indent)
         const board::Value& member = value.items()[i];
         const std::string head = std::string(indent, ' ') + (is_list ? item_step(i) : value.keys()[i]);
         const std::string line = head + " = " + member.to_text();
-        if (!has_members(member) || line.size() <= columns)
+        if (member.items().empty() || line.size() <= columns)
             text += line + "\n";
         else
             text += head + "\n" + tree(member, indent + 2);

@@ -11,7 +11,9 @@
 
 #include "board/trace.h"
 #include "board/value.h"
+#include "tools/pmxboard/chrome_trace.h"
 #include "tools/pmxboard/operation.h"
+#include "tools/pmxboard/trace_filter.h"
 
 namespace pmxboard
 {
@@ -19,7 +21,8 @@ namespace pmxboard
 enum class TraceForm
 {
     Text,
-    Json,
+    Json, ///< one object a line
+    Chrome,
     Off
 };
 
@@ -28,9 +31,12 @@ struct OutputOptions
     bool quiet = false;   ///< people see failures only
     bool verbose = false; ///< arguments by name; expectations too
     bool colour = false;
+    bool echo = true; ///< commands are shown before what they do; not where the user has just typed them
     TraceForm trace = TraceForm::Text;
     std::ostream* to = nullptr;       ///< where people read
     std::ostream* trace_to = nullptr; ///< where the trace goes when that is somewhere else
+    ChromeTrace* chrome = nullptr;    ///< for TraceForm::Chrome
+    TraceFilter filter = {};
 };
 
 class Output
@@ -41,11 +47,23 @@ public:
     /** Show or hide the trace from now on. */
     void show_trace(bool on) { m_trace_shown = on; }
 
+    /** From now on nothing is real: what would be done is shown there, whatever becomes of the trace otherwise. */
+    void imagine(std::ostream& to);
+    /** Whether a program reads the standard output, as JSON lines. */
+    bool for_programs() const { return is_machine_read() && m_options.trace == TraceForm::Json; }
+
+    void powered_on();
+    void operation_begins(const std::string& name);
     void command(std::string_view line);
     void expectation(std::string_view line);
     void outcome(const Outcome& outcome);
     void text(std::string_view text);
-    void state(const std::string& path, const board::Value& value, bool json);
+    /** A text for people, painted as what deserves a look. */
+    void remark(std::string_view text);
+    /** What a verb shows of the state: a line for programs, or a text for people. */
+    void shown(const std::string& json_line, std::string_view text);
+    /** What `line` would do, as imagine() wrote it down. */
+    void imagined(std::string_view line, const std::string& written, const std::string& outcome);
 
     /** Sinks of the board. */
     void entry(const board::TraceEntry& entry);
@@ -61,7 +79,7 @@ private:
         std::string text;
     };
 
-    bool json_to_people() const;
+    bool is_machine_read() const;
     std::ostream* people() const;
     std::string render(const board::TraceEntry& entry) const;
     void write_trace(const std::string& line);
@@ -75,8 +93,15 @@ private:
     std::vector<Nested> m_nested;
 };
 
+/** A call's or a value's line broken behind commas where it is too long for the screen; texts stay whole. What follows
+ *  is indented. */
+std::string folded(const std::string& line, std::size_t indent);
+
 /** How a path names an item of a list: "[3]". */
 std::string item_step(std::size_t index);
+
+/** An outcome as one JSON object: result, and outputs by name. */
+std::string to_json(const Outcome& outcome);
 
 /** A value as an indented tree, members that fit into a line on one. */
 std::string tree(const board::Value& value, std::size_t indent = 0);

@@ -3,6 +3,7 @@
 #include <filesystem>
 #include <fstream>
 #include <iostream>
+#include <optional>
 
 #include "board/board.h"
 #include "tools/pmxboard/command.h"
@@ -30,24 +31,24 @@ std::string repeat_command(const RunOptions& run, const std::string& file)
     return "pmxboard run " + (run.board.empty() ? "" : "--board " + shell_word(run.board) + " ") + shell_word(file);
 }
 
-} // namespace
-
-int run_files(const RunOptions& run)
+TraceForm trace_form(const std::string& name)
 {
-    OutputOptions output;
-    output.quiet = run.quiet;
-    output.verbose = run.verbose;
-    output.colour = wants_colour();
-    output.trace = run.trace == "json" ? TraceForm::Json : run.trace == "off" ? TraceForm::Off : TraceForm::Text;
-    output.to = &std::cout;
+    return name == "jsonl"    ? TraceForm::Json
+           : name == "chrome" ? TraceForm::Chrome
+           : name == "off"    ? TraceForm::Off
+                              : TraceForm::Text;
+}
 
+/** What is wrong with the command line; empty when nothing is. */
+std::string complaint(const RunOptions& run, const OutputOptions& output)
+{
     std::error_code ignored;
     for (const std::string& file : run.files)
     {
         if (file != "-" && std::filesystem::is_directory(file, ignored))
-            return usage_error(file + " is a directory");
+            return file + " is a directory";
         if (file != "-" && !std::ifstream(file))
-            return usage_error("cannot read " + file);
+            return "cannot read " + file;
     }
     try
     {
@@ -56,17 +57,14 @@ int run_files(const RunOptions& run)
     }
     catch (const board::DescriptionError& error)
     {
-        return usage_error(error.what());
+        return error.what();
     }
-    std::ofstream trace_file;
-    if (!run.trace_file.empty())
-    {
-        trace_file.open(run.trace_file);
-        if (!trace_file)
-            return usage_error("cannot write " + run.trace_file);
-        output.trace_to = &trace_file;
-    }
+    return output.filter.complaint();
+}
 
+/** Each scenario on a board of its own; the exit code. */
+int run_each(const RunOptions& run, const OutputOptions& output)
+{
     for (const std::string& file : run.files)
     {
         std::ifstream opened;
@@ -76,9 +74,42 @@ int run_files(const RunOptions& run)
         if (!run_scenario(file == "-" ? std::cin : opened, scenario, output, std::cerr))
             return exit_failed;
     }
+    return exit_done;
+}
+
+} // namespace
+
+int run_files(const RunOptions& run)
+{
+    OutputOptions output;
+    output.quiet = run.quiet;
+    output.verbose = run.verbose;
+    output.colour = wants_colour(run.colour);
+    output.trace = trace_form(run.trace_format);
+    output.to = &std::cout;
+    output.filter = { run.only, run.operations };
+    if (const std::string wrong = complaint(run, output); !wrong.empty())
+        return usage_error(wrong);
+    std::ofstream trace_file;
+    if (!run.trace_file.empty())
+    {
+        trace_file.open(run.trace_file);
+        if (!trace_file)
+            return usage_error("cannot write " + run.trace_file);
+        output.trace_to = &trace_file;
+    }
+    int code = exit_done;
+    {
+        std::optional<ChromeTrace> chrome;
+        if (output.trace == TraceForm::Chrome)
+            output.chrome = &chrome.emplace(run.trace_file.empty() ? std::cout : trace_file);
+        code = run_each(run, output);
+    }
     if (!run.trace_file.empty() && !trace_file.flush())
         return usage_error("cannot write " + run.trace_file);
-    return exit_done;
+    if (!std::cout.flush())
+        return usage_error("cannot write to the standard output");
+    return code;
 }
 
 } // namespace pmxboard

@@ -12,8 +12,11 @@ struct RunOptions
 {
     std::vector<std::string> files;
     std::string board;
-    std::string trace = "text";
+    std::string trace_format = "text";
     std::string trace_file;
+    std::string colour = "auto";
+    std::vector<std::string> only;
+    std::vector<std::string> operations;
     bool quiet = false;
     bool verbose = false;
 };

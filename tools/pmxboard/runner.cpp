@@ -16,7 +16,29 @@ std::filesystem::path directory_of(const std::string& name)
     return name == "-" ? std::filesystem::path(".") : std::filesystem::path(name).parent_path();
 }
 
-/** A message that quotes a scenario, fit for a terminal: one line of bearable length, without control characters. */
+/** Whether a line of a file begins with `diff`. Keeping the state before each command costs more than most commands.
+ *  What comes through a pipe is not read ahead: somebody may be typing it. */
+bool asks_for_changes(std::istream& lines)
+{
+    const auto begin = lines.tellg();
+    if (begin < 0)
+    {
+        lines.clear();
+        return true;
+    }
+    bool found = false;
+    for (std::string text; !found && std::getline(lines, text);)
+    {
+        const std::size_t word = text.find_first_not_of(" \t");
+        found = word != text.npos && text.compare(word, 4, "diff") == 0;
+    }
+    lines.clear();
+    lines.seekg(begin);
+    return found;
+}
+
+} // namespace
+
 std::string presentable(std::string_view message)
 {
     constexpr std::size_t most = 500;
@@ -33,14 +55,15 @@ std::string presentable(std::string_view message)
     return message.size() > most ? line + "…" : line;
 }
 
-} // namespace
-
 bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOptions& options,
                   std::ostream& diagnostics)
 {
     Output output(options);
     Session session(output, scenario.board, directory_of(scenario.name));
+    session.watch_changes(scenario.name == "-" || asks_for_changes(lines));
     const std::string file = scenario.name == "-" ? "<stdin>" : scenario.name;
+    if (options.chrome != nullptr)
+        options.chrome->scenario(file);
     unsigned number = 0;
     const auto location = [&] { return file + ":" + std::to_string(number) + ": "; };
     try

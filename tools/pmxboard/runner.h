@@ -4,6 +4,7 @@
 
 #include <iosfwd>
 #include <string>
+#include <string_view>
 
 #include "tools/pmxboard/output.h"
 
@@ -21,5 +22,8 @@ struct Scenario
  *  line. */
 bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOptions& options,
                   std::ostream& diagnostics);
+
+/** A message that quotes a scenario, fit for a terminal: one line of bearable length, without control characters. */
+std::string presentable(std::string_view message);
 
 } // namespace pmxboard

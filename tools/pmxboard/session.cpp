@@ -82,6 +82,8 @@ void Session::run_command(const Line& line)
     if (verb == nullptr && operation == nullptr)
         unknown_command(name);
     need_power(name);
+    if (verb == nullptr || !verb->only_looks)
+        remember(line);
     begin_window();
     if (verb != nullptr)
         verb->run(*this, line);
@@ -89,6 +91,27 @@ void Session::run_command(const Line& line)
         run(*operation, read_arguments(*operation, std::span(line.words()).subspan(1)));
     if (m_window_end == std::string::npos)
         end_window();
+}
+
+void Session::remember(const Line& line)
+{
+    m_last_command = line.from(0);
+    m_before.reset();
+    if (m_watches && m_powered)
+        m_before = whole_state();
+}
+
+std::vector<Change> Session::changes() const
+{
+    return m_before ? pmxboard::changes(*m_before, whole_state()) : std::vector<Change>();
+}
+
+void Session::imagine(std::string_view text, std::ostream& shown)
+{
+    m_imagines = true;
+    m_output.imagine(shown);
+    run_command(Line(text));
+    m_output.flush();
 }
 
 void Session::need_power(std::string_view command)
@@ -102,6 +125,7 @@ void Session::run(const Operation& operation, const Values& values)
     Outcome outcome;
     {
         const board::trace::Operation scope(operation.name);
+        m_output.operation_begins(operation.name);
         outcome = operation.run(values);
     }
     set_outcome(operation.name, std::move(outcome));
@@ -132,6 +156,8 @@ void Session::power_on(const std::string& board)
         throw StepFailed(std::string("the board cannot be powered on: ") + error.what());
     }
     m_powered = true;
+    m_before.reset();
+    m_output.powered_on();
     m_misuses_expected = 0;
     m_last_operation.clear();
     m_last_outcome = {};

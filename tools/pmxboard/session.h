@@ -12,6 +12,7 @@
 
 #include "board/trace.h"
 #include "board/value.h"
+#include "tools/pmxboard/diff.h"
 #include "tools/pmxboard/line.h"
 #include "tools/pmxboard/operation.h"
 #include "tools/pmxboard/output.h"
@@ -36,6 +37,10 @@ public:
 
     unsigned expectations() const { return m_expectations; }
 
+    /** Whether the state is kept before each command, for `diff`. It is, unless a scenario that never asks for the
+     *  differences turns it off. */
+    void watch_changes(bool on) { m_watches = on; }
+
     /* For verbs */
 
     Output& output() { return m_output; }
@@ -50,6 +55,13 @@ public:
     /** What the command does from here on, or did until here, is what expectations look at. */
     void begin_window();
     void end_window();
+
+    /** What the last command changed that did not only look. */
+    std::vector<Change> changes() const;
+    const std::string& last_command() const { return m_last_command; }
+    /** Carry a line out in a process that is about to end: its effects are nobody's. */
+    void imagine(std::string_view text, std::ostream& shown);
+    bool imagines() const { return m_imagines; }
 
     /* For expectations */
 
@@ -68,6 +80,7 @@ private:
     /** A scenario that does not begin with power-on has a board all the same. */
     void need_power(std::string_view command);
     void check_misuses() const;
+    void remember(const Line& line);
 
     Output& m_output;
     std::string m_board;
@@ -75,6 +88,10 @@ private:
     bool m_powered = false;
     unsigned m_expectations = 0;
     unsigned m_misuses_expected = 0;
+    bool m_watches = true;
+    bool m_imagines = false;
+    std::string m_last_command;
+    std::optional<board::Value> m_before; ///< the state that the last command found; not for power-on
     std::string m_last_operation;
     Outcome m_last_outcome;
     std::size_t m_window_begin = 0;
@@ -90,6 +107,7 @@ struct Verb
     std::string_view name;
     std::string_view usage;
     void (*run)(Session& session, const Line& line);
+    bool only_looks = false; ///< `diff` goes on showing what the command before it changed
 };
 
 const std::vector<Verb>& verbs();
@@ -99,6 +117,14 @@ void check_expectation(Session& session, const Line& line);
 
 /** `ipmx …`: call a function of the table that the mixer has registered, as a neighbouring driver does. */
 void run_ipmx(Session& session, const Line& line);
+
+/** `state …`, `save …`, `diff …`: what board and layer hold, and what a command changed. */
+void run_state(Session& session, const Line& line);
+void run_save(Session& session, const Line& line);
+void run_diff(Session& session, const Line& line);
+
+/** `what-if …`: what a command would do. */
+void run_what_if(Session& session, const Line& line);
 
 /** `sink …`, `display-part …`, `video-plane …`: what these devices do by themselves. */
 void run_sink(Session& session, const Line& line);

@@ -3,6 +3,7 @@
 
 #include "board/board.h"
 #include "tools/pmxboard/session.h"
+#include "tools/pmxboard/state_paths.h"
 #include "tools/pmxboard/step_error.h"
 #include "tools/pmxboard/verb_words.h"
 #include "tools/record_view/record_view.h"
@@ -18,9 +19,22 @@ void power_on(Session& session, const Line& line)
     session.power_on(line.size() == 2 ? line.word(1) : std::string());
 }
 
+/** Only a partition that is there can be removed. */
+void need_partition(const std::string& name)
+{
+    const board::Value state = board::state();
+    std::vector<std::string_view> known;
+    for (const board::Value& partition : state.find("flash.partitions")->items())
+        known.push_back(partition.find("name")->string());
+    if (std::find(known.begin(), known.end(), name) == known.end())
+        throw LineError("there is no flash partition " + name + did_you_mean(name, known));
+}
+
 void flash(Session& session, const Line& line)
 {
     need_words(line, 3, 3);
+    if (line.word(2) == "off")
+        need_partition(line.word(1));
     try
     {
         board::set_flash(line.word(1), line.word(2) == "off" ? std::filesystem::path() : session.file(line.word(2)));
@@ -95,23 +109,6 @@ void loglevel(Session&, const Line& line)
     board::set_console_level(static_cast<int>(number_in(line.word(1), "the console's level", -1, 1000)));
 }
 
-void state(Session& session, const Line& line)
-{
-    need_words(line, 1, 3);
-    bool json = false;
-    std::string path;
-    for (std::size_t i = 1; i < line.size(); ++i)
-    {
-        if (line.word(i) == "--json")
-            json = true;
-        else if (path.empty() && !line.word(i).starts_with('-'))
-            path = line.word(i);
-        else
-            wrong_usage(line);
-    }
-    session.output().state(path, path.empty() ? whole_state() : state_at(path), json);
-}
-
 void poke(Session&, const Line& line)
 {
     need_words(line, 3, 3);
@@ -168,19 +165,6 @@ void expectation(Session& session, const Line& line)
     check_expectation(session, line);
 }
 
-void collect_paths(const board::Value& value, const std::string& path, std::vector<std::string>& into)
-{
-    if (!path.empty())
-        into.push_back(path);
-    for (std::size_t i = 0; i < value.items().size(); ++i)
-    {
-        const std::string step = value.kind() == board::Value::Kind::List ? item_step(i)
-                                 : path.empty()                           ? value.keys()[i]
-                                                                          : "." + value.keys()[i];
-        collect_paths(value.items()[i], path + step, into);
-    }
-}
-
 } // namespace
 
 const std::vector<Verb>& verbs()
@@ -191,9 +175,12 @@ const std::vector<Verb>& verbs()
         { "fault", "fault FUNCTION ANSWER [on N|from N|always], or fault FUNCTION off", fault },
         { "advance", "advance 10s, 500ms or 2us", advance },
         { "loglevel", "loglevel LEVEL", loglevel },
-        { "state", "state [PATH] [--json]", state },
+        { "state", "state [PATH…] [--json]", run_state, true },
+        { "save", "save FILE", run_save, true },
+        { "diff", "diff [PATH…] [--json]", run_diff, true },
+        { "what-if", "what-if COMMAND", run_what_if, true },
         { "poke", "poke FIELD VALUE", poke },
-        { "trace", "trace on, or trace off", trace },
+        { "trace", "trace on, or trace off", trace, true },
         { "suspend", "suspend", suspend },
         { "resume", "resume", resume },
         { "sink", "sink plug, sink unplug, sink request-resolution [on|off], sink valid MODE HZ, or sink valid asked",
@@ -205,10 +192,10 @@ const std::vector<Verb>& verbs()
           "source OSD start WxH ycbcr|rgb, or source VDP connects-back on|off",
           run_source },
         { "plane-delay", "plane-delay [order 0x76543210] and eight delays, plane 1 first", run_plane_delay },
-        { "print", "print \"text\"", print },
+        { "print", "print \"text\"", print, true },
         { "neighbour", "neighbour FUNCTION [ARGUMENT…]", neighbour },
         { "ipmx", "ipmx SLOT tag|NUMBER [ARGUMENT…]", run_ipmx },
-        { "expect", "expect result|out|call|next|no-more|none|log|console|state|asserts|misuses …", expectation },
+        { "expect", "expect result|out|call|next|no-more|none|log|console|state|asserts|misuses …", expectation, true },
     };
     return all;
 }
@@ -229,9 +216,7 @@ board::Value state_at(const std::string& path)
         return *found;
     if (record_view::has(path))
         return record_view::get(path);
-    std::vector<std::string> paths;
-    collect_paths(whole_state(), {}, paths);
-    throw LineError("no state " + path + did_you_mean(path, { paths.begin(), paths.end() }));
+    return part_of(whole_state(), path);
 }
 
 } // namespace pmxboard

@@ -1,0 +1,114 @@
+#!/usr/bin/env python3
+"""Writes what the headers promise about each function, and what the guide to scenarios says about each verb, as tables
+that the tool is built with: its help is the text that a reader of the headers sees.
+
+usage: contracts.py OUTPUT GUIDE
+"""
+
+import json
+import pathlib
+import re
+import sys
+
+sys.dont_write_bytecode = True
+
+from platform_functions import LAYER_HEADER, PLATFORM_HEADERS, ROOT, functions  # noqa: E402
+
+TAG = re.compile(r"^@(param|return|context)\b(?:\[\w+\])?\s*", re.MULTILINE)
+SECTION = re.compile(r"^/\* ((?:(?!\*/).)*)\*/", re.DOTALL | re.MULTILINE)
+CODE = r"`[a-z][a-z-]*(?: [^`]*)?`"
+ROW = re.compile(rf"^\| ({CODE}(?:, {CODE})*) \| (.*) \|$", re.MULTILINE)
+PARAGRAPH = re.compile(rf"^({CODE}) ((?:.+\n)+)", re.MULTILINE)
+
+
+def without_stars(comment):
+    return "\n".join(re.sub(r"^\s*\* ?", "", line).strip() for line in comment.split("\n"))
+
+
+def joined(text):
+    """One line of several; runs of blanks within a line stay, for they set columns apart."""
+    return re.sub(r"\s*\n\s*", " ", text).strip()
+
+
+def parts(comment):
+    """(brief, [(parameter, text)], result, context) of a contract."""
+    text = without_stars(comment)
+    tags = list(TAG.finditer(text))
+    ends = [tag.start() for tag in tags[1:]] + [len(text)]
+    parameters, single = [], {"return": "", "context": ""}
+    for tag, end in zip(tags, ends):
+        body = joined(text[tag.end():end])
+        if tag[1] == "param":
+            name, _, meaning = body.partition(" ")
+            parameters.append((name, meaning.strip()))
+        else:
+            single[tag[1]] = body
+    return joined(text[:tags[0].start()] if tags else text), parameters, single["return"], single["context"]
+
+
+def sections(path):
+    """(line, title) of the comments that head the groups of a header: their first sentence."""
+    text = pathlib.Path(path).read_text(encoding="utf-8")
+    for match in SECTION.finditer(text):
+        yield text.count("\n", 0, match.start()) + 1, re.split(r"[.:](?:\s|$)", joined(match[1]))[0]
+
+
+def c_text(text):
+    return json.dumps(text, ensure_ascii=False)
+
+
+def rows(header):
+    heads = list(sections(ROOT / header))
+    for function in functions(ROOT / header):
+        brief, parameters, result, context = parts(function.contract)
+        section = [title for line, title in heads if line < function.line][-1:] or [""]
+        listed = ", ".join(f"{{ {c_text(name)}, {c_text(text)} }}" for name, text in parameters)
+        declaration = f"{function.result} {function.name}({function.declared})"
+        texts = [function.name, declaration, pathlib.Path(header).name, section[0], brief, result, context]
+        yield f"        {{ {', '.join(map(c_text, texts))}, {{ {listed} }} }},"
+
+
+def plain(cell):
+    return joined(cell.replace(r"\|", "|").replace("`", ""))
+
+
+def verb_rows(guide):
+    """Rows of the guide's tables and paragraphs that begin with a verb as it is written."""
+    text = pathlib.Path(guide).read_text(encoding="utf-8")
+    found = [(match.start(), match[1], match[2]) for pattern in (ROW, PARAGRAPH) for match in pattern.finditer(text)]
+    for _, form, meaning in sorted(found):
+        yield f"        {{ {c_text(form.replace('`', '').replace(chr(92) + '|', '|'))}, {c_text(plain(meaning))} }},"
+
+
+def main():
+    output, guide = sys.argv[1:]
+    functions_text = "\n".join(row for header in (LAYER_HEADER, *PLATFORM_HEADERS) for row in rows(header))
+    verbs_text = "\n".join(verb_rows(guide))
+    pathlib.Path(output).write_text(f"""// Written from the headers and the guide to scenarios when the tool is built.
+#include "tools/pmxboard/contracts.h"
+
+namespace pmxboard
+{{
+
+const std::vector<Contract>& contracts()
+{{
+    static const std::vector<Contract> all = {{
+{functions_text}
+    }};
+    return all;
+}}
+
+const std::vector<VerbText>& verb_texts()
+{{
+    static const std::vector<VerbText> all = {{
+{verbs_text}
+    }};
+    return all;
+}}
+
+}} // namespace pmxboard
+""", encoding="utf-8")
+
+
+if __name__ == "__main__":
+    main()

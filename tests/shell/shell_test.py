@@ -1,0 +1,320 @@
+#!/usr/bin/env python3
+"""`pmxboard shell` on a terminal, as somebody uses it who types.
+
+usage: shell_test.py PMXBOARD
+
+Where the machine gives out no terminals the tests are skipped, exit code 77.
+"""
+
+import fcntl
+import os
+import pathlib
+import pty
+import re
+import select
+import struct
+import sys
+import tempfile
+import termios
+import time
+import unittest
+
+SKIPPED = 77
+PATIENCE = 60  # seconds; reached only when something is wrong
+PROGRAM = ""
+TAB, UP, DOWN, RIGHT, ENTER = "\t", "\x1b[A", "\x1b[B", "\x1b[C", "\r"
+CTRL_A, CTRL_C, CTRL_D, CTRL_E, CTRL_R, CTRL_U = "\x01", "\x03", "\x04", "\x05", "\x12", "\x15"
+PROMPT = "pmx> "
+
+
+class Terminal:
+    """A shell on a terminal of its own."""
+
+    def __init__(self, home, *arguments, columns=80, rows=24, **environment):
+        variables = {name: value for name, value in os.environ.items()
+                     if name not in ("XDG_STATE_HOME", "PMXBOARD_HISTORY", "EDITRC")}
+        variables |= {"TERM": "xterm", "HOME": str(home), "NO_COLOR": "1"}
+        for name, value in environment.items():
+            if value is None:
+                variables.pop(name, None)
+            else:
+                variables[name] = value
+        self.seen = ""    # all that the terminal got
+        self.behind = 0   # what has been waited for lies before this
+        self.process, self.terminal = pty.fork()
+        if self.process == 0:
+            try:
+                # The size has to be there before the first look at it.
+                fcntl.ioctl(1, termios.TIOCSWINSZ, struct.pack("HHHH", rows, columns, 0, 0))
+                os.execve(PROGRAM, [PROGRAM, "shell", *arguments], variables)
+            finally:
+                os._exit(127)
+
+    def type(self, *keys):
+        os.write(self.terminal, "".join(keys).encode())
+
+    def read_on(self):
+        """More of what the shell writes; false when it has ended."""
+        if not select.select([self.terminal], [], [], PATIENCE)[0]:
+            raise AssertionError(f"nothing came in {PATIENCE} s; all of it:\n{self.seen!r}")
+        try:
+            data = os.read(self.terminal, 65536)
+        except OSError:  # the other end is closed
+            return False
+        self.seen += data.decode(errors="replace")
+        return bool(data)
+
+    def wait_for(self, text):
+        """Wait until the text appears behind what was waited for before; what came until then, the text included."""
+        limit = time.monotonic() + PATIENCE
+        while (found := self.seen.find(text, self.behind)) < 0:
+            if time.monotonic() > limit or not self.read_on():
+                raise AssertionError(f"no {text!r} in {self.seen[self.behind:]!r}")
+        until = self.seen[self.behind:found + len(text)]
+        self.behind = found + len(text)
+        # The prompt is there a moment before the editor has the keys; until then Ctrl-D is the terminal's own.
+        while text.endswith(PROMPT) and termios.tcgetattr(self.terminal)[3] & termios.ICANON:
+            if time.monotonic() > limit:
+                raise AssertionError("the editor does not begin")
+            time.sleep(0.001)
+        return until
+
+    def command(self, *keys):
+        """Type a line and wait for the next prompt; what came in between."""
+        self.type(*keys, ENTER)
+        self.wait_for("\n")
+        return self.wait_for(PROMPT).replace("\r\n", "\n")
+
+    def end(self):
+        """Read the rest; the exit code."""
+        while self.read_on():
+            pass
+        os.close(self.terminal)
+        return os.waitstatus_to_exitcode(os.waitpid(self.process, 0)[1])
+
+
+class Shell(unittest.TestCase):
+    def setUp(self):
+        directory = tempfile.TemporaryDirectory()
+        self.addCleanup(directory.cleanup)
+        self.home = pathlib.Path(directory.name)
+        self.history = self.home / ".local/state/pmxboard/history"
+
+    def start(self, *arguments, **environment):
+        terminal = Terminal(self.home, *arguments, **environment)
+        terminal.wait_for(PROMPT)
+        return terminal
+
+    def leave(self, terminal, code=0):
+        terminal.type(CTRL_D)
+        self.assertEqual(code, terminal.end(), terminal.seen)
+
+    def test_tab_completes_and_lists(self):
+        shell = self.start()
+        shell.type("PMX_SetTv", TAB)
+        shell.wait_for("ype ")
+        shell.type("0 ", TAB)               # what both names begin with
+        shell.wait_for("PMX_TV_TYPE_")
+        shell.type(TAB)
+        shell.wait_for("PMX_TV_TYPE_NTSC  PMX_TV_TYPE_PAL\r\n")
+        shell.wait_for("PMX_SetTvType 0 PMX_TV_TYPE_")
+        shell.type("P", TAB)
+        shell.wait_for("AL")
+        self.assertIn("  = 1\n", shell.command())
+        self.assertIn("ucTvType = PMX_TV_TYPE_PAL", shell.command("state ucTvT", TAB))
+        self.leave(shell)
+
+    def test_tab_in_the_middle_of_a_line(self):
+        shell = self.start()
+        self.assertIn("  = 1\n", shell.command("SetTvType 0 3", CTRL_A, "PMX_"))
+        shell.type(" 0 PMX_TV_TYPE_PAL", CTRL_A, "PMX_SetTv", TAB)
+        self.assertIn("  = 1\n", shell.command())
+        self.leave(shell)
+
+    def test_nothing_to_complete_leaves_the_line(self):
+        shell = self.start()
+        shell.command("poke ucMode 0")
+        self.assertIn("ucMode = RES_480I", shell.command("state ucMode # PMX", TAB, TAB))
+        self.leave(shell)
+
+    def test_many_candidates_are_shown_when_asked_for(self):
+        shell = self.start()
+        shell.type("PMX_", TAB)
+        shell.wait_for("candidates; show them all? (y or n) ")
+        shell.type("n")
+        self.assertNotIn("PMX_QueryStatus", shell.wait_for(PROMPT + "PMX_"))
+        shell.type(TAB)
+        shell.wait_for("(y or n) ")
+        shell.type("y")
+        self.assertIn("PMX_QueryStatus", shell.wait_for(PROMPT + "PMX_"))
+        shell.type(CTRL_C)
+        shell.wait_for(PROMPT)
+        self.leave(shell)
+
+    def test_candidates_fit_the_window(self):
+        shell = self.start(columns=44)
+        shell.type("sink valid RES_3D_1080", TAB)
+        listed = shell.wait_for(PROMPT)
+        self.assertIn("RES_3D_1080I60HZ_SBS_HALF", listed)
+        lines = [line for line in listed.split("\r\n")[1:-1]]
+        self.assertGreater(len(lines), 3)
+        for line in lines:
+            self.assertLessEqual(len(line.rstrip()), 44, line)
+        shell.type(CTRL_U)
+        self.leave(shell)
+
+    def test_cursor_keys_and_control_keys_edit(self):
+        shell = self.start()
+        shell.command("poke ucMode 2")
+        self.assertIn('"name": "RES_480P"', shell.command("ucMode", CTRL_A, "state ", CTRL_E, " --json"))
+        self.assertIn("ucMode = RES_480P", shell.command("sate ucMode", CTRL_A, RIGHT, "t"))
+        self.leave(shell)
+
+    def test_arrow_up_brings_history_back(self):
+        shell = self.start()
+        shell.command("PMX_SetTvType 0 3")
+        shell.command("state ucTvType")
+        shell.type(UP, UP, DOWN, UP)
+        self.assertIn("PMX_HalSetTvType(0, PMX_TV_TYPE_PAL)", shell.command())
+        self.leave(shell)
+
+    def test_history_is_kept_from_shell_to_shell(self):
+        first = self.start()
+        first.command("PMX_SetTvType 0 3")
+        self.leave(first)
+        self.assertTrue(self.history.is_file())
+        self.assertEqual(0, self.history.stat().st_mode & 0o077)
+        second = self.start()
+        second.type(UP)
+        self.assertIn("PMX_HalSetTvType(0, PMX_TV_TYPE_PAL)", second.command())
+        self.leave(second)
+
+    def test_history_stands_where_it_is_wanted(self):
+        elsewhere = self.home / "elsewhere"
+        shell = self.start(PMXBOARD_HISTORY=str(elsewhere))
+        shell.command("state ucMode")
+        self.leave(shell)
+        self.assertIn("ucMode", elsewhere.read_text())
+        shell = self.start(XDG_STATE_HOME=str(self.home / "state"))
+        shell.command("state ucMode")
+        self.leave(shell)
+        self.assertTrue((self.home / "state/pmxboard/history").is_file())
+        self.assertFalse(self.history.exists())
+
+    def test_history_can_be_off_or_impossible(self):
+        for variables in ({"PMXBOARD_HISTORY": ""}, {"HOME": "/dev/null"}, {"HOME": None}):
+            with self.subTest(variables=variables):
+                shell = self.start(**variables)
+                shell.command("state ucTvType")
+                shell.type(UP)              # within a shell there is one all the same
+                self.assertIn("ucTvType = ", shell.command())
+                self.leave(shell)
+                self.assertEqual([], list(self.home.iterdir()))
+
+    def test_control_r_searches_the_history(self):
+        shell = self.start()
+        shell.command("PMX_SetTvType 0 3")
+        shell.command("state ucMode")
+        shell.type(CTRL_R, "SetTv")
+        shell.wait_for("PMX_SetTvType")
+        self.assertIn("PMX_HalSetTvType(0, PMX_TV_TYPE_PAL)", shell.command() + shell.command())
+        self.leave(shell)
+
+    def test_control_c_drops_the_line_and_nothing_else(self):
+        shell = self.start()
+        shell.type("PMX_Nonsense", CTRL_C)
+        shell.wait_for("^C\r\n" + PROMPT)
+        self.assertIn("ucMode = ", shell.command("state ucMode"))
+        self.assertNotIn("no command", shell.seen)
+        self.leave(shell)
+        self.assertNotIn("Nonsense", self.history.read_text())
+
+    def test_errors_are_shown_and_the_shell_goes_on(self):
+        shell = self.start()
+        self.assertIn("no command PMX_Int; did you mean PMX_Init?\n", shell.command("PMX_Int"))
+        self.assertIn("expected asserts 1, found 0\n", shell.command("expect asserts 1"))
+        self.assertIn("a '[' does not close", shell.command("PMX_SetPlaneOrderArray 0 [1"))
+        self.assertIn("ucMode = ", shell.command("state ucMode"))
+        self.leave(shell)
+
+    def test_a_misuse_is_told_at_the_end(self):
+        shell = self.start()
+        shell.command("neighbour x_reg_write32 3 0")
+        self.leave(shell, code=1)
+        self.assertIn("misused", shell.seen)
+
+    def test_what_was_typed_is_not_echoed_again(self):
+        shell = self.start()
+        self.assertNotIn("> PMX_SetTvType", shell.command("PMX_SetTvType 0 3").removesuffix(PROMPT))
+        self.leave(shell)
+
+    def test_help_is_the_contract(self):
+        shell = self.start()
+        text = shell.command("help PMX_SetTvType")
+        self.assertTrue(text.startswith("PMX_SetTvType ucPmxId ucTvType\n"), text)
+        self.assertIn("Store and program the TV type.\n", text)
+        self.assertIn("Ctrl-D ends", shell.command("help"))
+        self.leave(shell)
+
+    def test_quit_and_exit_end_it(self):
+        for word in ("quit", "exit"):
+            shell = self.start()
+            shell.type(word, ENTER)
+            self.assertEqual(0, shell.end())
+
+    def test_colour_is_for_terminals_whose_users_want_it(self):
+        colour = re.compile("\x1b\\[[0-9;]+m")
+        for arguments, variables, wanted in (((), {"NO_COLOR": None}, True), ((), {"NO_COLOR": "1"}, False),
+                                             ((), {"NO_COLOR": None, "TERM": "dumb"}, False),
+                                             (("--color", "never"), {"NO_COLOR": None}, False),
+                                             (("--color", "always"), {"NO_COLOR": "1"}, True)):
+            with self.subTest(arguments=arguments, variables=variables):
+                shell = self.start(*arguments, **variables)
+                shown = shell.command("PMX_SetTvType 0 3")
+                self.assertEqual(wanted, bool(colour.search(shown)), shown)
+                self.leave(shell)
+
+    def test_simple_terminals_do(self):
+        for name in ("dumb", "vt100", "linux", None):
+            with self.subTest(terminal=name):
+                shell = self.start(TERM=name)
+                shell.type("PMX_SetTv", TAB)
+                shell.wait_for("PMX_SetTvType" if name in ("dumb", None) else "ype")
+                self.assertIn("  = 1\n", shell.command("0 3"))
+                shell.type(UP)
+                self.assertIn("  = 1\n", shell.command())
+                self.leave(shell)
+
+    def test_a_long_line_is_edited_beyond_the_window(self):
+        shell = self.start(columns=40)
+        shell.command("PMX_Init")
+        line = "PMX_SetModeEx 0 [[0], [1, RES_720P50HZ], [0], [0]] 50 DRV_NON_EXT_CHIP 0"
+        shell.type(line, CTRL_A, CTRL_E)
+        self.assertIn("  = 1\n", shell.command())
+        self.leave(shell)
+
+
+def no_terminals():
+    """Why there can be no terminal here; nothing when there can."""
+    try:
+        for end in pty.openpty():
+            os.close(end)
+    except OSError as error:
+        return str(error)
+    return None
+
+
+def main():
+    global PROGRAM
+    if len(sys.argv) < 2:
+        sys.exit(__doc__)
+    PROGRAM = os.path.abspath(sys.argv.pop(1))
+    why = no_terminals()
+    if why:
+        print(f"skipped: this machine gives out no terminals ({why})")
+        sys.exit(SKIPPED)
+    unittest.main()
+
+
+if __name__ == "__main__":
+    main()

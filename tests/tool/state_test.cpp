@@ -1,0 +1,207 @@
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <fstream>
+
+#include <nlohmann/json.hpp>
+
+#include "board/board.h"
+#include "scenario_run.h"
+#include "tools/pmxboard/session.h"
+#include "tools/pmxboard/state_dump.h"
+#include "tools/pmxboard/state_paths.h"
+#include "tools/pmxboard/step_error.h"
+
+namespace
+{
+
+using board::Value;
+using pmxboard::DumpError;
+using pmxboard::read_dump;
+using pmxboard::StateDump;
+using tool_test::run;
+using Json = nlohmann::json;
+
+std::string behind_last(const std::string& shown)
+{
+    const std::size_t last = shown.rfind("> ");
+    return shown.substr(shown.find('\n', last) + 1);
+}
+
+/** Why a text is no dump. */
+std::string refused(const std::string& text)
+{
+    try
+    {
+        read_dump(text);
+    }
+    catch (const DumpError& error)
+    {
+        return error.what();
+    }
+    return "taken";
+}
+
+std::string with_state(const std::string& state)
+{
+    return R"({"schema": "pmxboard-state", "version": 1, "board": "b", "state": )" + state + "}";
+}
+
+TEST(StateVerb, SeveralPaths)
+{
+    EXPECT_EQ("  ucHue = 128\n  status\n    hPMXTimer = 2\n    fgPmxFormatChangeFlag = 0\n    fgPmxEnabeOsdFlag = 0\n"
+              "    fgTimerAlreadySet = 0\n  arOutputConf[PMX_OUTPUT_HDMI].u4VFreq = 60\n",
+              behind_last(run("PMX_Init\nstate ucHue status arOutputConf[PMX_OUTPUT_HDMI].u4VFreq").shown));
+}
+
+TEST(StateVerb, AsJson_HasASchema)
+{
+    const Json some = Json::parse(behind_last(run("PMX_Init\nstate status.hPMXTimer --json ucMode").shown));
+    EXPECT_EQ(
+        (Json{ { "schema", "pmxboard-state" },
+               { "version", 1 },
+               { "board", "default" },
+               { "values",
+                 { { "status.hPMXTimer", 2 }, { "ucMode", { { "value", 12 }, { "name", "RES_1080P60HZ" } } } } } }),
+        some);
+    const Json all = Json::parse(behind_last(run("PMX_Init\nstate --json").shown));
+    EXPECT_EQ("pmxboard-state", all.at("schema"));
+    EXPECT_EQ(1, all.at("version"));
+    EXPECT_EQ("default", all.at("board"));
+    EXPECT_EQ(17u, all.at("state").size());
+    EXPECT_EQ((Json{ { "value", 12 }, { "name", "RES_1080P60HZ" } }), all.at("state").at("record").at("ucMode"));
+    EXPECT_EQ((Json{ { "value", 0x108080 }, { "hex", "0x108080" } }), all.at("state").at("record").at("u4BgColor"));
+    EXPECT_EQ((Json{ { "symbol", "_rPMXIF" } }),
+              all.at("state").at("interface_manager").at("interfaces").at(0).at("table"));
+}
+
+TEST(Save, WritesWhatStateShows)
+{
+    const std::string file = (std::filesystem::temp_directory_path() / "pmxboard-saved-state.json").string();
+    const auto outcome = run("PMX_Init\nsave " + file + "\nstate --json");
+    ASSERT_TRUE(outcome.done) << outcome.diagnostics;
+    std::ifstream in(file);
+    const std::string saved{ std::istreambuf_iterator<char>(in), {} };
+    EXPECT_EQ(behind_last(outcome.shown), saved);
+    EXPECT_NE(std::string::npos, outcome.shown.find("  saved to " + file + "\n"));
+    std::filesystem::remove(file);
+}
+
+TEST(Save, FailsWithTheReason)
+{
+    EXPECT_EQ("here.pmx:1: cannot write no/such/directory/file.json: No such file or directory\n"
+              "repeat: pmxboard run here.pmx\n",
+              run("save no/such/directory/file.json").diagnostics);
+}
+
+TEST(Dump, ReadsBackWhatItWrote_InEverySituation)
+{
+    unsigned dumps = 0;
+    for (const auto& file : std::filesystem::directory_iterator(PMX_SOURCE_DIR "/scenarios"))
+    {
+        if (file.path().extension() != ".pmx")
+            continue;
+        std::ifstream lines(file.path());
+        std::ostringstream shown;
+        std::ostringstream diagnostics;
+        pmxboard::run_scenario(lines, { file.path().string(), "default", "" }, { .to = &shown }, diagnostics);
+        const StateDump dump{ board::description().name, pmxboard::whole_state() };
+        const StateDump read = read_dump(to_json(dump));
+        EXPECT_EQ(dump.board, read.board);
+        EXPECT_TRUE(dump.state == read.state) << file.path() << to_text(pmxboard::changes(dump.state, read.state));
+        EXPECT_EQ(pmxboard::tree(dump.state), pmxboard::tree(read.state)) << file.path();
+        ++dumps;
+    }
+    EXPECT_LT(40u, dumps);
+}
+
+TEST(Dump, OfAnotherSchemaOrVersion_IsRefused)
+{
+    const std::string what = "; a dump is written by \"save FILE\" or \"state --json\"";
+    const std::string no_schema = "it has no \"schema\": \"pmxboard-state\"" + what;
+    for (const char* const wrong : { "{}", "[]", "7", "null", R"({"schema": "pmxboard-diff", "version": 1})",
+                                     R"({"schema": ["pmxboard-state"], "version": 1})" })
+        EXPECT_EQ(no_schema, refused(wrong)) << wrong;
+    EXPECT_EQ("it has version 2 of its schema, and this pmxboard reads 1",
+              refused(R"({"schema": "pmxboard-state", "version": 2, "state": {}})"));
+    EXPECT_EQ("it has version \"1\" of its schema, and this pmxboard reads 1",
+              refused(R"({"schema": "pmxboard-state", "version": "1", "state": {}})"));
+    EXPECT_EQ("it has version no number of its schema, and this pmxboard reads 1",
+              refused(R"({"schema": "pmxboard-state", "state": {}})"));
+    EXPECT_EQ("it has no record \"state\"" + what, refused(R"({"schema": "pmxboard-state", "version": 1})"));
+    EXPECT_EQ("it has no record \"state\"" + what, refused(with_state("[]")));
+    EXPECT_EQ("it holds a few values, and no whole state" + what,
+              refused(R"({"schema": "pmxboard-state", "version": 1, "values": {}})"));
+}
+
+TEST(Dump, Broken_IsRefused_WithThePlace)
+{
+    EXPECT_EQ("it ends in the middle, at line 1, column 1", refused(""));
+    EXPECT_EQ("it ends in the middle, at line 2, column 12", refused("{\n\"schema\": \""));
+    EXPECT_EQ("it is no JSON from line 2, column 1 on", refused("{\n, }"));
+    EXPECT_EQ("it is no JSON from line 1, column 1 on", refused("PMX_Init\n"));
+    EXPECT_EQ("state.a.b: true is no value of a state", refused(with_state(R"({"a": {"b": true}})")));
+    EXPECT_EQ("state.a[1]: 1.5 is no value of a state", refused(with_state(R"({"a": [0, 1.5]})")));
+    EXPECT_EQ("state.a: 18446744073709551615 is no value of a state",
+              refused(with_state(R"({"a": 18446744073709551615})")));
+    std::string deep;
+    for (int i = 0; i < 5000; ++i)
+        deep += "[";
+    EXPECT_NE(
+        std::string::npos,
+        refused(with_state(R"({"a": )" + deep + std::string(5000, ']') + "}")).find("a state is not nested so deeply"));
+}
+
+TEST(Dump, CutShortAnywhere_IsRefused)
+{
+    run("PMX_Init");
+    const std::string whole = to_json(StateDump{ "default", pmxboard::whole_state() });
+    ASSERT_EQ("taken", refused(whole));
+    for (std::size_t length = 0; length < whole.size(); length += 211)
+        EXPECT_TRUE(refused(whole.substr(0, length)).starts_with("it ends in the middle, at line ")) << length;
+}
+
+TEST(Dump, WithAnyByteChanged_IsReadOrRefused)
+{
+    run("PMX_Init");
+    const std::string whole = to_json(StateDump{ "default", pmxboard::whole_state() });
+    unsigned taken = 0;
+    for (std::size_t at = 0; at < whole.size(); at += 307)
+    {
+        for (const char byte : { '\0', '"', '{', '7', '\xFF' })
+        {
+            std::string changed = whole;
+            changed[at] = byte;
+            taken += refused(changed) == "taken";
+        }
+    }
+    EXPECT_LT(0u, taken);
+}
+
+TEST(Dump, WhatLooksLikeANumber_IsOneOnlyAsAWhole)
+{
+    const Value state = read_dump(with_state(R"({"n": {"value": 3, "name": "THREE"}, "h": {"value": 16, "hex": "0x10"},
+        "both": {"value": 16, "name": "SIXTEEN", "hex": "0x10"}, "r": {"value": 3}, "s": {"value": 3, "name": 4},
+        "m": {"value": 3, "name": "x", "more": 1}, "e": {}})"))
+                            .state;
+    EXPECT_EQ(
+        "{n=THREE, h=0x10, both=SIXTEEN, r={value=3}, s={value=3, name=4}, m={value=3, name=\"x\", more=1}, e={}}",
+        state.to_text());
+}
+
+TEST(Paths, OfASavedState)
+{
+    run("PMX_Init\npoke arOutputConf[1].eResMode RES_576P");
+    const Value state = pmxboard::whole_state();
+    const auto part = [&](const char* path) { return pmxboard::part_of(state, path).to_text(); };
+    EXPECT_EQ("RES_576P", part("arOutputConf[PMX_OUTPUT_HDMI].eResMode"));
+    EXPECT_EQ("RES_576P", part("record.arOutputConf[1].eResMode"));
+    EXPECT_EQ("2", part("status.hPMXTimer"));
+    EXPECT_EQ("2", part("hPMXTimer"));
+    EXPECT_EQ("1", part("MutexPMX"));
+    EXPECT_EQ("RES_1080P60HZ", part("mixer.mode"));
+    for (const char* const wrong : { "mixr", "", "ucMode.", "arOutputConf[9]", "arOutputConf[PMX_OUTPUT_HDM]", "[" })
+        EXPECT_THROW(part(wrong), pmxboard::LineError) << wrong;
+}
+
+} // namespace

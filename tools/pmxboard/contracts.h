@@ -1,0 +1,48 @@
+/** @file
+ *  What the headers promise about the functions of the layer and of the platform, and what the guide to scenarios says
+ *  about verbs. The tables are written when the tool is built. */
+#pragma once
+
+#include <string_view>
+#include <vector>
+
+namespace pmxboard
+{
+
+struct ContractParameter
+{
+    std::string_view name;
+    std::string_view text;
+};
+
+struct Contract
+{
+    std::string_view name;
+    std::string_view declaration; ///< without the semicolon
+    std::string_view header;
+    std::string_view section; ///< the group of the header that it stands in; may be empty
+    std::string_view brief;
+    std::string_view result;  ///< empty for a function without one
+    std::string_view context; ///< from where it may be called; empty where the header says it for all
+    std::vector<ContractParameter> parameters;
+};
+
+/** The layer's functions, then those of the platform, each in the order of their headers. */
+const std::vector<Contract>& contracts();
+
+/** Null pointer when no header declares it. */
+const Contract* contract_of(std::string_view function);
+
+struct VerbText
+{
+    std::string_view form; ///< how it is written; several forms are separated by commas
+    std::string_view meaning;
+};
+
+/** Whatever the guide explains that begins with a word in lower case, verbs among it. */
+const std::vector<VerbText>& verb_texts();
+
+/** The first sentence of a text, without its full stop. */
+std::string_view first_sentence(std::string_view text);
+
+} // namespace pmxboard

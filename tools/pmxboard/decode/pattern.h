@@ -1,0 +1,66 @@
+/** @file
+ *  The layer's texts as patterns: a format's literal pieces, with numbers and names between them. */
+#pragma once
+
+#include <array>
+#include <span>
+#include <string_view>
+#include <vector>
+
+#include "tools/pmxboard/decode/texts.h"
+
+namespace pmxboard::decode
+{
+
+struct Piece
+{
+    enum class Kind
+    {
+        Literal,
+        Decimal,
+        Hex,
+        Name
+    };
+    Kind kind;
+    std::string_view literal;
+};
+
+struct Pattern
+{
+    const Text* text;
+    std::vector<Piece> pieces;
+    bool weak; ///< so short or plain that a foreign line may hold it by chance
+};
+
+/** How far a pattern leads into a line. */
+struct Match
+{
+    enum class State
+    {
+        No,
+        RanOut, ///< the line ended within the text
+        Whole
+    };
+    static constexpr std::size_t most_values = 12;
+
+    State state = State::No;
+    std::size_t end = 0;     ///< behind what matched
+    std::size_t literal = 0; ///< characters of the format's own that matched
+    std::size_t count = 0;   ///< values
+    std::array<std::string_view, most_values> values;
+};
+
+/** Every pattern of the table; texts that look alike on a console have one, of the first of them. */
+const std::vector<Pattern>& patterns();
+/** Those that begin with a character. */
+std::span<const Pattern* const> patterns_of(char first);
+
+/** Match from the beginning of `line`. The work is bounded by the text's length. */
+Match match(const Pattern& pattern, std::string_view line);
+/** Match from within the text: what is left of it behind `skip` characters of its piece number `piece`. */
+Match match_rest(const Pattern& pattern, std::size_t piece, std::size_t skip, std::string_view line);
+
+/** Whether a character can stand within an identifier. */
+bool is_word(char c);
+
+} // namespace pmxboard::decode

@@ -1,0 +1,37 @@
+/** @file
+ *  What happened, told from the texts in a log: operations, what they decided, and how graphics came and went. */
+#pragma once
+
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "tools/pmxboard/decode/log.h"
+#include "tools/pmxboard/decode/report.h"
+
+namespace pmxboard::decode
+{
+
+struct Event
+{
+    std::string operation; ///< where more than one is possible, the first of them
+    std::size_t first_line = 0;
+    std::size_t last_line = 0;
+    std::string time; ///< of its first line
+    std::string title;
+    std::vector<std::string> details;
+    bool problem = false;
+    std::optional<StatusReport> report;
+};
+
+struct Story
+{
+    std::vector<Event> events;
+    std::vector<std::string_view>
+        operations; ///< of each item of the log, as far as the story tells; else its candidates
+};
+
+Story tell(const Log& log);
+
+} // namespace pmxboard::decode

@@ -1,0 +1,252 @@
+#include "tools/pmxboard/help.h"
+
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include <algorithm>
+
+#include "board/board.h"
+#include "tools/pmxboard/contracts.h"
+#include "tools/pmxboard/modes_command.h"
+#include "tools/pmxboard/ops_command.h"
+#include "tools/pmxboard/session.h"
+#include "tools/pmxboard/step_error.h"
+#include "tools/record_view/record_view.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+using board::names::Family;
+
+struct FamilyTitle
+{
+    Family family;
+    const char* title;
+};
+
+constexpr FamilyTitle family_titles[] = {
+    { Family::ResolutionMode, "resolution modes" },
+    { Family::CcirMode, "modes of the digital port" },
+    { Family::CcirFormat, "formats of the digital port" },
+    { Family::GfxColorMode, "colour modes of graphics" },
+    { Family::ColorSpace, "colour spaces of the mixer" },
+    { Family::Plane, "planes of the mixer" },
+    { Family::Output, "outputs" },
+    { Family::ExtChipUsage, "uses of the external chip" },
+    { Family::TvType, "TV types" },
+    { Family::ComponentType, "component types" },
+    { Family::InterfaceId, "interfaces" },
+    { Family::SemaType, "types of semaphores" },
+    { Family::SemaOption, "options of a lock" },
+    { Family::TimerFlag, "kinds of timers" },
+    { Family::VdpEnable, "enable states of a video plane" },
+    { Family::TveAspect, "aspect ratios of the TV encoder" },
+    { Family::Aspect, "aspect ratios" },
+    { Family::HdmiColorSpace, "colour spaces of HDMI" },
+    { Family::HdmiPictureAspect, "picture aspect ratios of HDMI" },
+    { Family::HdmiAfd, "active formats of HDMI" },
+    { Family::AvdCommand, "commands to the HDMI/AV driver" },
+    { Family::AvdQuery, "queries of the HDMI/AV driver" },
+    { Family::DigitalFormat, "formats of the digital picture" },
+    { Family::ExtChipSetting, "settings of the external chip" },
+    { Family::ClosedCaption, "closed-caption switch" },
+};
+
+std::string constant_text(const std::string& name, std::int64_t number, const Look& look)
+{
+    for (const auto& [family, title] : family_titles)
+    {
+        if (board::names::name_of(family, number) != name)
+            continue;
+        if (family == Family::ResolutionMode)
+            return mode_text(record_view::mode_row(static_cast<unsigned>(number)), look);
+        std::string text = look.bold(name) + " = " + std::to_string(number) + ", one of the " + title + ":\n";
+        for (const std::string_view other : names_in(family))
+            text +=
+                "  " + std::to_string(board::names::number_of(other).value_or(0)) + "  " + std::string(other) + "\n";
+        return text;
+    }
+    return look.bold(name) + " = " + std::to_string(number) + ", and goes with any number\n";
+}
+
+/** The first word of each form that a text is about: "sink plug, sink unplug" is about sink. */
+bool is_about(std::string_view form, std::string_view verb)
+{
+    return form.starts_with(verb) &&
+           (form.size() == verb.size() || form[verb.size()] == ' ' || form[verb.size()] == ',');
+}
+
+std::string verb_text(const Verb& verb, const Look& look)
+{
+    std::string text;
+    for (const VerbText& entry : verb_texts())
+    {
+        const std::string_view form = entry.form;
+        bool about = is_about(form, verb.name);
+        for (std::size_t comma = form.find(", "); !about && comma != form.npos; comma = form.find(", ", comma + 1))
+            about = is_about(form.substr(comma + 2), verb.name);
+        if (about)
+            text += wrapped(entry.form, look.width, 2, 4) + wrapped(entry.meaning, look.width, 6, 6);
+    }
+    return look.bold(verb.name) + "\n" + (text.empty() ? wrapped(verb.usage, look.width, 2, 4) : text);
+}
+
+std::string field_text(const std::string& path, const Look& look)
+{
+    const board::Value value = record_view::get(path);
+    std::string text = look.bold(path) + ", a field of the layer";
+    if (value.kind() == board::Value::Kind::List || value.kind() == board::Value::Kind::Record)
+        return text + "; state " + path + " shows it\n";
+    const record_view::FieldType type = record_view::type_of(path);
+    text += ": " + std::to_string(type.range().lowest) + " to " + std::to_string(type.range().highest) + "\n";
+    std::string names;
+    for (const std::string_view name : names_in(board::names::family_of(type.record, type.member)))
+        names.append(names.empty() ? "" : ", ").append(name);
+    return names.empty() ? text : text + wrapped(names, look.width, 2, 2);
+}
+
+const Verb* find_verb(std::string_view name)
+{
+    const auto found =
+        std::find_if(verbs().begin(), verbs().end(), [name](const Verb& verb) { return verb.name == name; });
+    return found == verbs().end() ? nullptr : &*found;
+}
+
+std::string slot_text(const Operation& slot, const Look& look)
+{
+    std::string text =
+        look.bold(slot.name) + ", a slot of the table that the mixer registers\n  ipmx " + slot.name + " tag";
+    for (std::size_t i = 1; i < slot.parameters.size(); ++i)
+        text += slot.parameters[i].is_output ? "" : " " + slot.parameters[i].name;
+    return text + "\n";
+}
+
+} // namespace
+
+std::string Look::bold(std::string_view text) const
+{
+    return colour ? "\x1b[1m" + std::string(text) + "\x1b[0m" : std::string(text);
+}
+
+unsigned text_width()
+{
+    winsize window{};
+    if (isatty(STDOUT_FILENO) != 1 || ioctl(STDOUT_FILENO, TIOCGWINSZ, &window) != 0 || window.ws_col == 0)
+        return 80;
+    return std::clamp(static_cast<unsigned>(window.ws_col), 40u, 100u);
+}
+
+std::size_t columns_of(std::string_view text)
+{
+    return static_cast<std::size_t>(
+        std::count_if(text.begin(), text.end(), [](char c) { return (static_cast<unsigned char>(c) & 0xC0) != 0x80; }));
+}
+
+std::string wrapped(std::string_view text, unsigned width, unsigned indent, unsigned hanging)
+{
+    std::string all;
+    std::string line(indent, ' ');
+    bool is_empty = true;
+    for (std::size_t at = 0; at < text.size();)
+    {
+        const std::size_t word = std::min(text.find_first_not_of(' ', at), text.size());
+        const std::size_t end = std::min(text.find(' ', word), text.size());
+        const std::string_view next = text.substr(word, end - word);
+        if (!is_empty && columns_of(line) + (word - at) + columns_of(next) > width)
+        {
+            all += line + "\n";
+            line.assign(hanging, ' ').append(next);
+        }
+        else
+            line.append(word - at, ' ').append(next);
+        is_empty = false;
+        at = end;
+    }
+    return is_empty ? all : all + line + "\n";
+}
+
+std::string in_columns(const std::vector<std::string>& words, unsigned width)
+{
+    std::size_t longest = 0;
+    for (const std::string& word : words)
+        longest = std::max(longest, columns_of(word));
+    const std::size_t columns = std::max<std::size_t>(1, (width + 2) / (longest + 2));
+    const std::size_t rows = (words.size() + columns - 1) / columns;
+    std::string text;
+    for (std::size_t row = 0; row < rows; ++row)
+    {
+        for (std::size_t i = row; i < words.size(); i += rows)
+            text += words[i] + (i + rows < words.size() ? std::string(longest + 2 - columns_of(words[i]), ' ') : "\n");
+    }
+    return text;
+}
+
+std::vector<std::string_view> names_in(Family family)
+{
+    std::vector<std::pair<std::int64_t, std::string_view>> found;
+    for (const std::string_view name : board::names::all())
+    {
+        const auto number = board::names::number_of(name);
+        if (family != Family::None && number && board::names::name_of(family, *number) == name)
+            found.emplace_back(*number, name);
+    }
+    std::stable_sort(found.begin(), found.end(), [](const auto& a, const auto& b) { return a.first < b.first; });
+    std::vector<std::string_view> names;
+    for (const auto& [number, name] : found)
+        names.push_back(name);
+    return names;
+}
+
+std::vector<std::string_view> help_words()
+{
+    std::vector<std::string_view> words = names_of(operations());
+    for (const Verb& verb : verbs())
+        words.push_back(verb.name);
+    for (const auto& function : board::platform_functions())
+        words.push_back(function.name);
+    for (const Operation& slot : ipmx_slots())
+        words.push_back(slot.name);
+    const auto& constants = board::names::all();
+    words.insert(words.end(), constants.begin(), constants.end());
+    return words;
+}
+
+std::string help_on(const std::string& word, const Look& look)
+{
+    if (const Operation* const operation = find(operations(), word))
+        return operation_text(*operation, look);
+    if (const Verb* const verb = find_verb(word))
+        return verb_text(*verb, look);
+    if (contract_of(word) != nullptr)
+        return platform_text(word, look);
+    if (const Operation* const slot = find(ipmx_slots(), word))
+        return slot_text(*slot, look);
+    if (const auto number = board::names::number_of(word))
+        return constant_text(word, *number, look);
+    if (record_view::has(word))
+        return field_text(word, look);
+    std::vector<std::string_view> words = help_words();
+    const std::vector<std::string> fields = record_view::fields();
+    words.insert(words.end(), fields.begin(), fields.end());
+    throw LineError("no help on " + word + did_you_mean(word, words));
+}
+
+std::string shell_help(const Look& look)
+{
+    std::vector<std::string> names;
+    for (const Verb& verb : verbs())
+        names.emplace_back(verb.name);
+    return wrapped("A line is a command of the scenario language: an operation of the layer with its arguments, or a "
+                   "verb. What it does is shown at once; an error leaves everything as it is.",
+                   look.width, 0, 0) +
+           "\n" + look.bold("For example") +
+           "\n  PMX_SetTvType 0 PMX_TV_TYPE_PAL\n  state ucTvType\n  expect state ucTvType PMX_TV_TYPE_PAL\n\n" +
+           look.bold("Verbs") + "\n" + in_columns(names, look.width) + "\n" + look.bold("Help") +
+           "\n  help WORD   on an operation, a verb, a constant, a function of the platform\n"
+           "              or a field; Tab completes all of them\n"
+           "  quit        or Ctrl-D ends; Ctrl-C drops the line; Ctrl-R looks into the history\n";
+}
+
+} // namespace pmxboard

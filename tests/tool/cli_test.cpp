@@ -1,65 +1,20 @@
 // The built program, as a shell sees it.
 #include <gtest/gtest.h>
 
-#include <sys/wait.h>
-
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
 
+#include "program_run.h"
 #include "scenario_run.h"
 
 namespace
 {
 
-std::string program()
-{
-    if (const char* const named = std::getenv("PMXBOARD"))
-        return named;
-#ifdef PMXBOARD_PATH
-    return PMXBOARD_PATH;
-#else
-    return std::filesystem::read_symlink("/proc/self/exe")
-        .replace_filename("pmxboard")
-        .string(); // built beside the tests
-#endif
-}
-
-struct Ended
-{
-    int code = -1;
-    std::string out;
-    std::string err;
-};
-
-std::string content(const std::filesystem::path& file)
-{
-    std::ifstream in(file, std::ios::binary);
-    return { std::istreambuf_iterator<char>(in), {} };
-}
-
-class CommandLine : public testing::Test
+class CommandLine : public ProgramRun
 {
 protected:
-    void SetUp() override
-    {
-        ASSERT_TRUE(std::filesystem::exists(program())) << "no program " << program() << "; PMXBOARD may name it";
-        std::string name = (std::filesystem::temp_directory_path() / "pmxboard-XXXXXX").string();
-        ASSERT_NE(nullptr, mkdtemp(name.data()));
-        m_directory = name;
-    }
-    void TearDown() override { std::filesystem::remove_all(m_directory); }
-
-    /** Run the program in the project's root; the shell sees `arguments` as they stand. */
-    Ended run(const std::string& arguments, const std::string& input = "", const std::string& environment = "")
-    {
-        std::ofstream(file("in")) << input;
-        const std::string command = "cd '" PMX_SOURCE_DIR "' && " + environment + " '" + program() + "' " + arguments +
-                                    " <'" + file("in") + "' >'" + file("out") + "' 2>'" + file("err") + "'";
-        const int status = std::system(command.c_str());
-        return { WIFEXITED(status) ? WEXITSTATUS(status) : -1, content(file("out")), content(file("err")) };
-    }
     /** The same with its output sent through a filter. */
     Ended run_through(const std::string& filter, const std::string& arguments)
     {
@@ -68,14 +23,11 @@ protected:
         const int status = std::system(command.c_str());
         return { WIFEXITED(status) ? WEXITSTATUS(status) : -1, content(file("out")), content(file("err")) };
     }
-    std::string file(const std::string& name) const { return (m_directory / name).string(); }
     std::string scenario(const std::string& name, const std::string& lines) const
     {
         std::ofstream(file(name)) << lines;
         return file(name);
     }
-
-    std::filesystem::path m_directory;
 };
 
 TEST_F(CommandLine, Done_Is0_AndSaysNothingOnTheDiagnosticStream)

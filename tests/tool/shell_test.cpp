@@ -1,13 +1,12 @@
 // The shell from a pipe, and where it keeps its history. On a terminal: tests/shell.
 #include <gmock/gmock.h>
 
-#include <sys/wait.h>
-
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
 
+#include "program_run.h"
 #include "tools/pmxboard/shell_command.h"
 
 namespace
@@ -16,48 +15,14 @@ namespace
 using testing::HasSubstr;
 using testing::Not;
 
-struct Ended
-{
-    int code = -1;
-    std::string out;
-    std::string err;
-};
-
-std::string content(const std::filesystem::path& file)
-{
-    std::ifstream in(file, std::ios::binary);
-    return { std::istreambuf_iterator<char>(in), {} };
-}
-
-class Shell : public testing::Test
+class Shell : public ProgramRun
 {
 protected:
-    void SetUp() override
-    {
-        const char* const named = std::getenv("PMXBOARD");
-        m_program = named != nullptr ? std::filesystem::path(named)
-                                     : std::filesystem::read_symlink("/proc/self/exe").replace_filename("pmxboard");
-        ASSERT_TRUE(std::filesystem::exists(m_program)) << "no program " << m_program << "; PMXBOARD may name it";
-        std::string name = (std::filesystem::temp_directory_path() / "pmxboard-XXXXXX").string();
-        ASSERT_NE(nullptr, mkdtemp(name.data()));
-        m_directory = name;
-    }
-    void TearDown() override { std::filesystem::remove_all(m_directory); }
-
-    /** Run the program in the project's root, its home a directory of the test. */
+    /** The program's home is a directory of the test. */
     Ended run(const std::string& arguments, const std::string& input) const
     {
-        std::ofstream(m_directory / "in") << input;
-        const std::string place = "'" + m_directory.string() + "/";
-        const std::string command = "cd '" PMX_SOURCE_DIR "' && HOME=" + place + "' '" + m_program.string() + "' " +
-                                    arguments + " <" + place + "in' >" + place + "out' 2>" + place + "err'";
-        const int status = std::system(command.c_str());
-        return { WIFEXITED(status) ? WEXITSTATUS(status) : -1, content(m_directory / "out"),
-                 content(m_directory / "err") };
+        return ProgramRun::run(arguments, input, "HOME='" + m_directory.string() + "'");
     }
-
-    std::filesystem::path m_program;
-    std::filesystem::path m_directory;
 };
 
 TEST_F(Shell, FromAPipe_ShowsWhatARunShows)
@@ -250,7 +215,7 @@ TEST_F(Shell, HelpExamples_Work)
             if (!behind || !line.starts_with("  ") || line.starts_with("   ") || at == line.npos)
                 continue;
             ++examples;
-            line.replace(at, 8, "'" + m_program.string() + "'");
+            line.replace(at, 8, "'" + program() + "'");
             const std::string command = "cd '" PMX_SOURCE_DIR "' && (" + line + ") </dev/null >'" +
                                         (m_directory / "out").string() + "' 2>'" + (m_directory / "err").string() + "'";
             EXPECT_EQ(0, std::system(command.c_str())) << line << "\n" << content(m_directory / "err");

@@ -106,7 +106,8 @@ def card():
     function = {"label": "PMX_A", "code": 200, "texts": 20, "frame": 16, "stack": 100, "through": ["PMX_A"]}
     return {"compilers": {"host": "g++ 12", "target": "arm 12"},
             "totals": {"code": 1000, "texts": 500, "tables": 100, "ram": 50, "heap": 0},
-            "files": {"pmx_a": {"code": 1000, "texts": 500, "tables": 100, "ram": 50}}, "functions": {"PMX_A": function},
+            "files": {"pmx_a": {"code": 1000, "texts": 500, "tables": 100, "ram": 50}},
+            "functions": {"PMX_A": function},
             "tables": {"T": 100}, "ram": {"_arPmxConf": 40, "x": 10}, "repeated": [], "indirect": [], "paths": [path]}
 
 

@@ -195,8 +195,8 @@ operations.
   platform's functions, `memcpy` and `memset` are not counted.
 - **Floor**: what the cheapest possible layer would execute for the same path, one that knows beforehand what will be
   asked and answered: a straight line of the same calls with the same arguments, all of them constants, and the same
-  result. It is written from the path's recording, compiled with the product's flags and counted in the same run; the run compares
-  every call of both, argument by argument.
+  result. It is written from the path's recording, compiled with the product's flags and counted in the same run;
+  the run compares every call of both, argument by argument.
 - **Price**, layer less floor, is what deciding costs: looking at arguments and at the record, remembering, looping.
 
 Each operation has a cheapest and a dearest path, `/` between their numbers; `tools/cost/paths.txt` has them whole, with

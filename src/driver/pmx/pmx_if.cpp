@@ -1,5 +1,5 @@
-/* The module's state and tables, and the answers of its getters. Whatever is decided from the resolution mode stands in the mode table and nowhere
- * else. */
+/* The module's state and tables, and the answers of its getters. Whatever is decided from the resolution mode stands in
+ * the mode table and nowhere else. */
 #include "pmx_if.h"
 
 #include "drv_pmx.h"

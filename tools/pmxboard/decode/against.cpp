@@ -10,8 +10,12 @@ namespace pmxboard::decode
 namespace
 {
 
-// An alignment's cost: a line of another value, a missing or an additional one.
+// An alignment's cost. A line of the log that goes unused weighs more than one that the log may not have begun with, or
+// else a gap would make what stands before it look foreign to the scenario.
 using Cost = std::uint32_t;
+constexpr Cost cost_missing = 1;
+constexpr Cost cost_extra = 2;
+constexpr Cost cost_value = 2;
 
 // Enough for any scenario; what stands behind in a longer log is not needed to find the first departure.
 constexpr std::size_t most_lines = 3000;
@@ -53,7 +57,8 @@ private:
     Cost& at(std::size_t i, std::size_t j) { return m_cost[i * (m_expected.size() + 1) + j]; }
     Cost at(std::size_t i, std::size_t j) const { return m_cost[i * (m_expected.size() + 1) + j]; }
     Cost pair(std::size_t i, std::size_t j) const;
-    Cost extra(std::size_t i) const { return is_cut(*m_found[i]) ? 0 : 1; }
+    Cost extra(std::size_t i) const { return is_cut(*m_found[i]) ? 0 : cost_extra; }
+    bool comes_later(std::size_t i, std::size_t j) const;
     Departure departure(std::size_t i, std::size_t j) const;
 
     static constexpr Cost impossible = 1u << 30;
@@ -70,7 +75,7 @@ Alignment::Alignment(std::vector<const Item*> found, std::vector<const Expected*
     {
         at(i, m_expected.size()) = at(i + 1, m_expected.size()) + extra(i);
         for (std::size_t j = m_expected.size(); j-- > 0;)
-            at(i, j) = std::min({ pair(i, j), at(i, j + 1) + 1, at(i + 1, j) + extra(i) });
+            at(i, j) = std::min({ pair(i, j), at(i, j + 1) + cost_missing, at(i + 1, j) + extra(i) });
     }
 }
 
@@ -79,7 +84,7 @@ Cost Alignment::pair(std::size_t i, std::size_t j) const
     const Item& expected = m_expected[j]->item;
     if (same(expected, *m_found[i]))
         return at(i + 1, j + 1);
-    return same_text(expected, *m_found[i]) ? at(i + 1, j + 1) + 1 : impossible;
+    return same_text(expected, *m_found[i]) ? at(i + 1, j + 1) + cost_value : impossible;
 }
 
 std::vector<ValueDifference> differences(const Item& expected, const Item& found)
@@ -100,6 +105,20 @@ std::vector<ValueDifference> differences(const Item& expected, const Item& found
     return all;
 }
 
+/** Whether the scenario prints later what the log has here, and the log nowhere what the scenario prints here: then too
+ *  much is missing for the alignment, not a line too many. */
+bool Alignment::comes_later(std::size_t i, std::size_t j) const
+{
+    if (i >= m_found.size())
+        return true;
+    const auto is_found = [&](const Expected* one) { return same(one->item, *m_found[i]); };
+    const auto is_expected = [&](const Item* one) { return same(m_expected[j]->item, *one); };
+    const auto next_expected = m_expected.begin() + static_cast<std::ptrdiff_t>(j);
+    const auto next_found = m_found.begin() + static_cast<std::ptrdiff_t>(i);
+    return std::any_of(next_expected, m_expected.end(), is_found) &&
+           std::none_of(next_found, m_found.end(), is_expected);
+}
+
 Departure Alignment::departure(std::size_t i, std::size_t j) const
 {
     Departure found;
@@ -114,7 +133,7 @@ Departure Alignment::departure(std::size_t i, std::size_t j) const
     const auto agree = [&](std::size_t one, std::size_t other) {
         return one < m_found.size() && other < m_expected.size() && same(m_expected[other]->item, *m_found[one]);
     };
-    const bool is_missing = at(i, j) == at(i, j + 1) + 1;
+    const bool is_missing = at(i, j) == at(i, j + 1) + cost_missing;
     const bool is_extra = at(i, j) == at(i + 1, j) + extra(i);
     if (at(i, j) == pair(i, j))
     {
@@ -126,13 +145,13 @@ Departure Alignment::departure(std::size_t i, std::size_t j) const
         found.kind = Departure::Kind::Swapped;
     }
     else if ((is_missing && at(i, j + 1) == at(i + 1, j + 1) + extra(i)) ||
-             (is_extra && at(i + 1, j) == at(i + 1, j + 1) + 1))
+             (is_extra && at(i + 1, j) == at(i + 1, j + 1) + cost_missing))
     {
         found.kind = Departure::Kind::Different;
     }
     else
     {
-        found.kind = is_missing ? Departure::Kind::Missing : Departure::Kind::Extra;
+        found.kind = is_missing || comes_later(i, j) ? Departure::Kind::Missing : Departure::Kind::Extra;
     }
     return found;
 }
@@ -167,6 +186,14 @@ Comparison Alignment::walk() const
 }
 
 } // namespace
+
+std::string operation_of(const Departure& departure)
+{
+    const Text* const text = departure.expected ? departure.expected->item.text : departure.found->text;
+    if (departure.expected && has(text->operations, departure.expected->operation))
+        return departure.expected->operation;
+    return std::string(split(text->operations).front());
+}
 
 Comparison compare(const Log& log, const std::vector<Expected>& expected, int level)
 {

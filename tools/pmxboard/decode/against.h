@@ -45,6 +45,9 @@ struct Departure
     std::vector<ValueDifference> values;
 };
 
+/** The operation that it lies in: the one that ran in the scenario, or the one that prints such a text. */
+std::string operation_of(const Departure& departure);
+
 struct Comparison
 {
     std::string scenario;

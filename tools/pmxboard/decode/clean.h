@@ -21,8 +21,8 @@ struct Stamp
 /** The time stamp at the beginning of a line: `[   12.345678]`, `12:34:56.789`, `12.345`. */
 Stamp stamp_of(std::string_view line);
 
-/** Whether what stands before a text looks like what a console or a capturing program writes there: nothing that ends in
- *  a word. */
+/** Whether what stands before a text looks like what a console or a capturing program writes there: nothing that ends
+ *  in a word. */
 bool is_prefix(std::string_view before);
 
 } // namespace pmxboard::decode

@@ -149,7 +149,9 @@ const Pattern* Reader::find_at(std::string_view line, std::size_t from, std::siz
     std::size_t next = at + found.end;
     while (next < line.size() && next < at + longest_text && line[next] == ' ')
         ++next;
-    const bool ends = next >= line.size() || begins_text(line.substr(next, longest_text));
+    const bool names_line = best->text->role == Role::SourceFile && next + 1 < line.size() && line[next] == ':' &&
+                            line[next + 1] >= '0' && line[next + 1] <= '9';
+    const bool ends = next >= line.size() || names_line || begins_text(line.substr(next, longest_text));
     return ends && is_prefix(before(line, from, at)) ? best : nullptr;
 }
 
@@ -246,7 +248,10 @@ void Reader::take_assertion(std::string_view line, std::size_t at, const Match& 
         }
         add(*meant, meant->format);
     }
-    m_log.items.back().values = { std::string(name), std::string(number.substr(0, std::min<std::size_t>(digits, 9))) };
+    Item& item = m_log.items.back();
+    item.values = { std::string(name), std::string(number.substr(0, std::min<std::size_t>(digits, 9))) };
+    if (item.text->role == Role::Assertion)
+        item.shown = std::string(item.text->format) + ", " + item.values.front();
 }
 
 /** A text whose end is missing. */

@@ -214,14 +214,11 @@ void show_comparison(std::ostream& out, const Comparison& comparison, const Show
                                   : "nothing more: the scenario is "
                                     "over");
     if (departure.found)
-        show_field(out, departure.kind == Departure::Kind::Missing ? "there stands" : "found", departure.found->shown);
+        show_field(out, departure.kind == Departure::Kind::Missing ? "instead" : "found", departure.found->shown);
     for (const ValueDifference& value : departure.values)
         show_field(out, "differs", value.name + ": " + value.expected + " expected, " + value.found + " found");
     const Text* const text = departure.expected ? departure.expected->item.text : departure.found->text;
-    std::string operation(split(text->operations).front());
-    if (departure.expected && has(text->operations, departure.expected->operation))
-        operation = departure.expected->operation;
-    show_field(out, "operation", operation + ": " + std::string(text->step));
+    show_field(out, "operation", operation_of(departure) + ": " + std::string(text->step));
     if (departure.expected)
         show_field(out, "scenario",
                    comparison.scenario + ":" + std::to_string(departure.expected->line) + ": " +

@@ -102,7 +102,7 @@ Value value_of(const Departure& departure)
     value.add("line", departure.found ? number(departure.found->line) : Value::null());
     value.add("found", departure.found ? Value::text(departure.found->shown) : Value::null());
     value.add("expected", departure.expected ? Value::text(departure.expected->item.shown) : Value::null());
-    value.add("operation", departure.expected ? Value::text(departure.expected->operation) : Value::null());
+    value.add("operation", Value::text(operation_of(departure)));
     value.add("scenario_line", departure.expected ? number(departure.expected->line) : Value::null());
     std::vector<Value> values;
     for (const ValueDifference& one : departure.values)

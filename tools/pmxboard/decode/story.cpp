@@ -13,7 +13,8 @@ namespace
 constexpr std::string_view mode_ex = "PMX_SetModeEx";
 constexpr std::string_view status_report = "PMX_QueryStatus";
 constexpr std::string_view ready_query = "fgPMX_DisplayModeReady";
-constexpr int detailed = 9; ///< the level at which a mode setting logs what was asked for
+constexpr double one_call = 0.1; ///< seconds that a slow console may take between two lines of one call
+constexpr int detailed = 9;      ///< the level at which a mode setting logs what was asked for
 
 /** Takes the items one after the other, and folds them into events. */
 class Teller
@@ -53,6 +54,8 @@ private:
     void join_or_open(const Item& item, std::string detail);
     void close();
     std::string held_for(const Item& item) const;
+    bool is_next(Role role) const;
+    bool is_later(const Item& item) const;
     Event& event() { return m_story.events.back(); }
 
     const Log& m_log;
@@ -136,7 +139,7 @@ void Teller::close()
         if (!m_request.fifth.empty())
             closed.title += "; fifth OSD " + m_request.fifth;
     }
-    else if (closed.operation == "PMX_SetMode" && closed.details.empty() && m_index + 1 < m_log.items.size())
+    else if (closed.operation == "PMX_SetMode" && closed.details.empty() && m_index < m_log.items.size())
     {
         closed.details.push_back("no set-up follows: refused by the capability word, or set already");
     }
@@ -151,6 +154,19 @@ std::string Teller::held_for(const Item& item) const
     char text[32];
     std::snprintf(text, sizeof text, " after %.1f s", *item.seconds - *m_held->seconds);
     return text;
+}
+
+/** Whether the item behind this one has a role. */
+bool Teller::is_next(Role role) const
+{
+    return m_index + 1 < m_log.items.size() && m_log.items[m_index + 1].text->role == role;
+}
+
+/** Whether so much time lies before an item that it was another call. */
+bool Teller::is_later(const Item& item) const
+{
+    const std::optional<double> last = m_index == 0 ? std::nullopt : m_log.items[m_index - 1].seconds;
+    return last && item.seconds && *item.seconds - *last > one_call;
 }
 
 void Teller::take_request(const Item& item)
@@ -217,7 +233,7 @@ void Teller::take_handshake(const Item& item)
         m_return_asked = item.value("fgPmxEnabeOsdFlag") != "0";
         break;
     case Role::OsdBack:
-        if (joins(item))
+        if (joins(item) && !is_later(item))
             join(item, m_held ? "graphics are back" : "");
         else
             open(item, { "PMX_SetOsdEnable" },
@@ -246,6 +262,11 @@ void Teller::take_ready(const Item& item)
     }
     const std::string title = std::string("somebody asks whether graphics may be shown: ") +
                               (ready ? "yes" : "no, the display part switches");
+    if (!ready && is_next(Role::HeldBack)) // nobody but a mode change goes on so
+    {
+        open(item, { mode_ex }, "a mode change, of which the log has the end");
+        return;
+    }
     if (is_open(ready_query) && event().title.starts_with(title))
     {
         join(item, {});
@@ -282,11 +303,11 @@ void Teller::take_part(const Item& item)
     const auto within = [&](std::string_view one) {
         return std::find(m_candidates.begin(), m_candidates.end(), one) != m_candidates.end();
     };
-    if (item.text->role == Role::Opens && operations.size() > 1 && has(item.text->operations, "i4Pmx_Connect"))
-        open(item, operations, tale_of(item));
-    else if (item.text->role == Role::Opens)
+    const bool connects = has(item.text->operations, "i4Pmx_Connect");
+    if (item.text->role == Role::Opens && !connects)
         open(item, { operations.front() }, tale_of(item));
-    else if (item.text->role == Role::Head && (!joins(item) || within(operations.front())))
+    else if (item.text->role == Role::Opens ||
+             (item.text->role == Role::Head && (!joins(item) || within(operations.front()))))
         open(item, operations, tale_of(item));
     else
         join_or_open(item, tale_of(item));

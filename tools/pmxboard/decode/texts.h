@@ -52,8 +52,8 @@ struct Text
 /** The table. Texts that differ in blanks at their end alone stand one after the other. */
 std::span<const Text> texts();
 
-/** What %s prints in these texts, and a name that the layer looks up in flash: with the formats all texts of the layer's
- *  object. */
+/** What %s prints in these texts, and a name that the layer looks up in flash: with the formats all texts of the
+ *  layer's object. */
 std::span<const std::string_view> value_texts();
 std::span<const std::string_view> other_texts();
 

@@ -1,0 +1,300 @@
+#include <gtest/gtest.h>
+
+#include "program_run.h"
+#include "tools/pmxboard/decode/against.h"
+
+namespace
+{
+
+using namespace pmxboard::decode;
+using Kind = Departure::Kind;
+
+const std::string scenario = PMX_SOURCE_DIR "/scenarios/first-mode-after-boot.pmx";
+
+/** A log with foreign lines, captured while what the scenario tells happened. */
+std::string captured()
+{
+    return content(PMX_SOURCE_DIR "/tests/decode/first-mode.log");
+}
+
+/** Where a line begins; lines count from 1. */
+std::size_t begin_of(const std::string& log, std::size_t line)
+{
+    std::size_t at = 0;
+    for (; line > 1; --line)
+        at = log.find('\n', at) + 1;
+    return at;
+}
+
+std::string line_of(const std::string& log, std::size_t line)
+{
+    return log.substr(begin_of(log, line), begin_of(log, line + 1) - begin_of(log, line));
+}
+
+std::string with_line(std::string log, std::size_t line, const std::string& text)
+{
+    return log.replace(begin_of(log, line), line_of(log, line).size(), text);
+}
+
+std::string with(std::string log, const std::string& old, const std::string& now)
+{
+    EXPECT_NE(std::string::npos, log.find(old)) << old;
+    return log.replace(log.find(old), old.size(), now);
+}
+
+Comparison against(const std::string& bytes, std::optional<int> level = {})
+{
+    const Log log = read_log(bytes);
+    return compare(log, run_for_texts(scenario, ""), level.value_or(log.level.value_or(level_plain)));
+}
+
+TEST(DecodeAgainst, SameRun_AgreesWhole)
+{
+    const Comparison found = against(captured());
+    EXPECT_FALSE(found.departure);
+    EXPECT_EQ(20u, found.agreeing);
+    EXPECT_EQ(3u, found.first_line);
+    EXPECT_EQ(27u, found.last_line);
+    EXPECT_EQ(0u, found.skipped);
+    EXPECT_EQ(0u, found.left);
+}
+
+TEST(DecodeAgainst, ChangedValue_IsFoundByName)
+{
+    const Comparison found = against(with(captured(), "HDMI(1, RES_1080P60HZ)", "HDMI(1, RES_1080P50HZ)"));
+    ASSERT_TRUE(found.departure);
+    EXPECT_EQ(Kind::Value, found.departure->kind);
+    EXPECT_EQ(11u, found.departure->found->line);
+    EXPECT_EQ("HDMI(1, RES_1080P50HZ)", found.departure->found->shown);
+    EXPECT_EQ("HDMI(1, RES_1080P60HZ)", found.departure->expected->item.shown);
+    EXPECT_EQ(14u, found.departure->expected->line);
+    EXPECT_EQ("PMX_SetModeEx", operation_of(*found.departure));
+    ASSERT_EQ(1u, found.departure->values.size());
+    EXPECT_EQ("eResMode", found.departure->values[0].name);
+    EXPECT_EQ("RES_1080P60HZ (1080p 60 Hz)", found.departure->values[0].expected);
+    EXPECT_EQ("RES_1080P50HZ (1080p 50 Hz)", found.departure->values[0].found);
+}
+
+TEST(DecodeAgainst, MissingLine_IsNamedWithWhatStandsInItsPlace)
+{
+    const Comparison found = against(with_line(captured(), 22, ""));
+    ASSERT_TRUE(found.departure);
+    EXPECT_EQ(Kind::Missing, found.departure->kind);
+    EXPECT_EQ("Mode(12), eMixerOutCS(1)", found.departure->expected->item.shown);
+    EXPECT_EQ("CC_A disable", found.departure->found->shown);
+    EXPECT_EQ(23u, found.departure->found->line);
+    EXPECT_EQ(16u, found.agreeing);
+}
+
+TEST(DecodeAgainst, LineTooMany_IsFound)
+{
+    const Comparison found = against(with_line(captured(), 24, line_of(captured(), 24) + "CC_A enable, 601->709\n"));
+    ASSERT_TRUE(found.departure);
+    EXPECT_EQ(Kind::Extra, found.departure->kind);
+    EXPECT_EQ(25u, found.departure->found->line);
+    EXPECT_EQ("CC_A enable, 601->709", found.departure->found->shown);
+    EXPECT_EQ("Scaler CC enable, 709->601", found.departure->expected->item.shown);
+}
+
+TEST(DecodeAgainst, SwappedLines_AreFound)
+{
+    const std::string log = captured();
+    const Comparison found = against(with_line(with_line(log, 12, line_of(log, 13)), 13, line_of(log, 12)));
+    ASSERT_TRUE(found.departure);
+    EXPECT_EQ(Kind::Swapped, found.departure->kind);
+    EXPECT_EQ(12u, found.departure->found->line);
+    EXPECT_EQ("CVBS(1, RES_480I)", found.departure->found->shown);
+    EXPECT_EQ("CAV (1, RES_480P)", found.departure->expected->item.shown);
+}
+
+TEST(DecodeAgainst, AnotherLine_IsFound)
+{
+    const Comparison found = against(with(captured(), "CC_A disable", "CC_A enable, 601->709"));
+    ASSERT_TRUE(found.departure);
+    EXPECT_EQ(Kind::Different, found.departure->kind);
+    EXPECT_EQ(24u, found.departure->found->line);
+}
+
+TEST(DecodeAgainst, LogFromTheMiddle_IsAligned)
+{
+    const std::string log = captured();
+    const Comparison found = against(log.substr(begin_of(log, 13)));
+    EXPECT_FALSE(found.departure);
+    EXPECT_EQ(9u, found.skipped);
+    EXPECT_EQ(11u, found.agreeing);
+}
+
+TEST(DecodeAgainst, LogFromTheMiddleWithADeparture_IsAlignedAndFound)
+{
+    const std::string log = captured();
+    const Comparison found = against(with(log.substr(begin_of(log, 13)), "HD Exist(1)", "HD Exist(0)"));
+    ASSERT_TRUE(found.departure);
+    EXPECT_EQ(Kind::Value, found.departure->kind);
+    EXPECT_EQ(5u, found.departure->found->line);
+    EXPECT_EQ(9u, found.skipped);
+    EXPECT_EQ(3u, found.agreeing);
+}
+
+TEST(DecodeAgainst, LogThatEndsEarly_IsNoDeparture)
+{
+    const std::string log = captured();
+    const Comparison found = against(log.substr(0, begin_of(log, 25)));
+    EXPECT_FALSE(found.departure);
+    EXPECT_EQ(2u, found.left);
+}
+
+TEST(DecodeAgainst, LogOfALowerLevel_OnlyWhatItShowsIsCompared)
+{
+    std::string log;
+    for (const std::size_t line : { 3, 4, 5, 6, 7, 8, 18, 19 })
+        log += line_of(captured(), line);
+    const Comparison found = against(log);
+    EXPECT_FALSE(found.departure);
+    EXPECT_EQ(1, found.level);
+    EXPECT_EQ(8u, found.agreeing);
+    const Comparison detailed = against(log, 9);
+    ASSERT_TRUE(detailed.departure);
+    EXPECT_EQ(Kind::Missing, detailed.departure->kind);
+    EXPECT_EQ("CCIR(0, RES_480I)", detailed.departure->expected->item.shown);
+}
+
+TEST(DecodeAgainst, LogGoesOnBehindTheScenario_ThatIsTooMany)
+{
+    const Comparison found = against(captured() + "\nPMX_Stop\n");
+    ASSERT_TRUE(found.departure);
+    EXPECT_EQ(Kind::Extra, found.departure->kind);
+    EXPECT_FALSE(found.departure->expected);
+    EXPECT_EQ("PMX_Stop", operation_of(*found.departure));
+}
+
+using DecodeProgram = ProgramRun;
+
+constexpr const char* compare_input = "decode --against scenarios/first-mode-after-boot.pmx -";
+
+TEST_F(DecodeProgram, NoDeparture_ExitsZero)
+{
+    const Ended ended = run(compare_input, captured());
+    EXPECT_EQ(0, ended.code) << ended.err;
+    EXPECT_NE(std::string::npos, ended.out.find("20 lines agree, from line 3 of the log to line 27")) << ended.out;
+    EXPECT_EQ("", run(std::string(compare_input) + " -q", captured()).out);
+}
+
+TEST_F(DecodeProgram, Departure_ExitsOneAndNamesEverything)
+{
+    const Ended ended = run(compare_input, with(captured(), "HDMI(1, RES_1080P60HZ)", "HDMI(1, RES_1080P50HZ)"));
+    EXPECT_EQ(1, ended.code) << ended.err;
+    for (const char* const part :
+         { "departs at line 11", "expected   HDMI(1, RES_1080P60HZ)", "found      HDMI(1, RES_1080P50HZ)",
+           "eResMode: RES_1080P60HZ (1080p 60 Hz) expected", "operation  PMX_SetModeEx",
+           "first-mode-after-boot.pmx:14: PMX_SetModeEx 0" })
+        EXPECT_NE(std::string::npos, ended.out.find(part)) << part << "\n" << ended.out;
+}
+
+TEST_F(DecodeProgram, Level_LeavesOutDetailedLines)
+{
+    const std::string log = with(captured(), "HDMI(1, RES_1080P60HZ)", "HDMI(1, RES_1080P50HZ)");
+    EXPECT_EQ(0, run(std::string(compare_input) + " --level 1", log).code);
+    EXPECT_EQ(1, run(std::string(compare_input) + " --level 9", log).code);
+}
+
+TEST_F(DecodeProgram, MissingLine_ShowsWhatStandsThere)
+{
+    const Ended ended = run(compare_input, with_line(captured(), 22, ""));
+    EXPECT_EQ(1, ended.code) << ended.err;
+    EXPECT_NE(std::string::npos, ended.out.find("line is missing")) << ended.out;
+    EXPECT_NE(std::string::npos, ended.out.find("instead    CC_A disable")) << ended.out;
+}
+
+TEST_F(DecodeProgram, WhatScenariosPrint_DoesNotDepartFromThem)
+{
+    for (const char* const name : { "failed-interface-query", "os-failures-at-start", "cold-boot",
+                                    "second-change-while-held-back", "video-plane-waits-for-sync" })
+    {
+        const std::string file = "scenarios/" + std::string(name) + ".pmx";
+        const Ended ended = run("decode --against " + file + " -", run("run " + file).out);
+        EXPECT_EQ(0, ended.code) << name << "\n" << ended.out << ended.err;
+    }
+}
+
+TEST_F(DecodeProgram, WrongUse_ExitsTwoWithAReason)
+{
+    for (const char* const arguments :
+         { "decode", "decode no-such.log", "decode scenarios", "decode --level 9 -", "decode --color mauve -",
+           "decode --against scenarios/first-mode-after-boot.pmx -",
+           "decode --against no-such.pmx tests/decode/player.log" })
+    {
+        const Ended ended = run(arguments, "nothing of the layer\n");
+        EXPECT_EQ(2, ended.code) << arguments;
+        EXPECT_EQ("", ended.out) << arguments;
+        EXPECT_NE("", ended.err) << arguments;
+    }
+}
+
+TEST_F(DecodeProgram, ScenarioThatFails_ExitsTwo)
+{
+    std::ofstream(file("bad.pmx")) << "power-on\nno-such-command\n";
+    const Ended ended = run("decode --against '" + file("bad.pmx") + "' tests/decode/player.log");
+    EXPECT_EQ(2, ended.code);
+    EXPECT_NE(std::string::npos, ended.err.find("bad.pmx:2")) << ended.err;
+}
+
+TEST_F(DecodeProgram, Output_FitsEightyColumnsAndHasColourOnlyWhenAsked)
+{
+    const std::string shown = run("decode -v tests/decode/player.log").out;
+    EXPECT_EQ(std::string::npos, shown.find('\x1b'));
+    std::size_t width = 0;
+    for (const char c : shown)
+    {
+        width = c == '\n' ? 0 : width + ((c & 0xC0) != 0x80);
+        ASSERT_LE(width, 80u);
+    }
+    EXPECT_NE(std::string::npos, run("decode --color always tests/decode/player.log").out.find("\x1b["));
+    EXPECT_EQ(std::string::npos, run("decode --color never tests/decode/player.log").out.find('\x1b'));
+    EXPECT_EQ(std::string::npos, run("decode tests/decode/player.log", "", "NO_COLOR=1").out.find('\x1b'));
+}
+
+TEST_F(DecodeProgram, Quiet_ShowsProblemsAlone)
+{
+    const std::string shown = run("decode -q tests/decode/player.log").out;
+    EXPECT_NE(std::string::npos, shown.find("! _PMX_TmrIsr"));
+    EXPECT_EQ(std::string::npos, shown.find("PMX_SetBrightness"));
+    EXPECT_NE(std::string::npos, run("decode -q -", "PMX_Stop\n").out.find("No problems in it."));
+}
+
+TEST_F(DecodeProgram, Verbose_ShowsForeignLinesAndOperationWithStep)
+{
+    const std::string shown = run("decode -v -", "eth0: up\nPMX_Stop\n").out;
+    EXPECT_NE(std::string::npos, shown.find("     1  eth0: up\n")) << shown;
+    EXPECT_NE(std::string::npos, shown.find("     2  PMX_Stop\n          PMX_Stop: light stop [level 1]\n")) << shown;
+}
+
+TEST_F(DecodeProgram, Json_KeepsItsKeys)
+{
+    const Ended ended = run("decode --json -", "[ 1.5] PMX_Stop\nforeign\n");
+    EXPECT_EQ(0, ended.code);
+    EXPECT_EQ(R"({"log":"standard input","lines":2,"foreign":1,"cut":0,"level":1,
+"events":[
+{"operation":"PMX_Stop","first_line":1,"last_line":1,"time":"1.5","title":)"
+              R"("stopped: mutex, timer and registrations stay","details":[],"problem":0}],
+"texts":[
+{"line":1,"last_line":1,"time":"1.5","text":"PMX_Stop","cut":"no","source":"log",)"
+              R"("level":1,"operations":["PMX_Stop"],"step":"light stop","values":{}}],
+"against":null}
+)",
+              ended.out);
+}
+
+TEST_F(DecodeProgram, JsonOfADeparture_KeepsItsKeys)
+{
+    const Ended ended = run(std::string(compare_input) + " --json", with(captured(), "HD Exist(1)", "HD Exist(0)"));
+    EXPECT_EQ(1, ended.code);
+    for (const char* const part :
+         { R"~("against":{"scenario":"scenarios/first-mode-after-boot.pmx","level":9,)~"
+           R"~("agreeing":12,"skipped":0,"left":0)~",
+           R"~("departure":{"kind":"value","line":17,"found":"HD Exist(0)","expected":"HD Exist(1)")~",
+           R"~("operation":"PMX_SetModeEx","scenario_line":14)~",
+           R"~("values":[{"name":"fgHDExist","expected":"1","found":"0"}])~" })
+        EXPECT_NE(std::string::npos, ended.out.find(part)) << part << "\n" << ended.out;
+}
+
+} // namespace

@@ -1,0 +1,36 @@
+#include "tools/pmxboard/decode/clean.h"
+
+#include <gtest/gtest.h>
+
+namespace
+{
+
+using namespace pmxboard::decode;
+
+TEST(DecodeClean, TerminalSequencesAndControlCharactersGo)
+{
+    EXPECT_EQ("PMX_Init", clean("\x1b[1;32mPMX_\x1b[0mInit"));
+    EXPECT_EQ("PMX_Init", clean("\x1b]0;title\aPMX_Init"));
+    EXPECT_EQ("a b", clean("a\tb"));
+    EXPECT_EQ("ab", clean(std::string_view("a\0b\x7f\b", 5)));
+    EXPECT_EQ("ü", clean("ü"));
+}
+
+TEST(DecodeClean, TimeStampsAreReadWhateverTheirForm)
+{
+    EXPECT_DOUBLE_EQ(41.20523, stamp_of("[   41.205230] PMX_Init").seconds.value_or(0));
+    EXPECT_EQ("12:34:56.789", stamp_of("12:34:56.789 PMX_Init").text);
+    EXPECT_DOUBLE_EQ(45296.789, stamp_of("12:34:56,789 PMX_Init").seconds.value_or(0));
+    EXPECT_EQ("", stamp_of("PMX_Init").text);
+    EXPECT_EQ("", stamp_of("HDMI(1, RES_480I)").text);
+}
+
+TEST(DecodeClean, APrefixDoesNotEndInAWord)
+{
+    for (const char* prefix : { "", "   ", "[ 1.5] ", "PMX: ", "10:00:00 AM ", "12.5 " })
+        EXPECT_TRUE(is_prefix(prefix)) << prefix;
+    for (const char* words : { "the ", "x", "12" })
+        EXPECT_FALSE(is_prefix(words)) << words;
+}
+
+} // namespace

@@ -1,0 +1,83 @@
+#include <gtest/gtest.h>
+
+#include "tools/pmxboard/decode/log.h"
+
+namespace
+{
+
+using namespace pmxboard::decode;
+
+TEST(DecodeLog, PrefixesOfEveryKind_DoNotMatter)
+{
+    for (const char* const prefix : { "", "[   12.345678] ", "12:34:56.789 ", "\x1b[31m", "  | ", "<6>[    1.5] " })
+    {
+        const Log log = read_log(std::string(prefix) + "HDMI(1, RES_720P60HZ)\r\n");
+        ASSERT_EQ(1u, log.items.size()) << prefix;
+        EXPECT_EQ("HDMI(1, RES_720P60HZ)", log.items[0].shown) << prefix;
+        EXPECT_EQ("RES_720P60HZ", log.items[0].value("eResMode")) << prefix;
+        EXPECT_EQ(1, log.items[0].number("fgOutputEnable")) << prefix;
+    }
+}
+
+TEST(DecodeLog, TextsOnOneLine_AreSeveral)
+{
+    const Log log = read_log("PMX_Uninit CC_A disableScaler CC disable\n");
+    ASSERT_GE(log.items.size(), 2u);
+    EXPECT_EQ("PMX_Uninit", log.items[0].shown);
+    EXPECT_EQ(1u, log.items[1].line);
+}
+
+TEST(DecodeLog, TextBrokenByAForeignLine_IsPutTogether)
+{
+    const Log log = read_log("PMX Finished to s\nusb 1-1: new device\net OSD Display mode.\n");
+    ASSERT_EQ(1u, log.items.size());
+    EXPECT_EQ("PMX Finished to set OSD Display mode.", log.items[0].shown);
+    EXPECT_EQ(1u, log.items[0].line);
+    EXPECT_EQ(3u, log.items[0].last_line);
+    EXPECT_EQ(Item::Cut::None, log.items[0].cut);
+    EXPECT_EQ(0u, log.cut);
+    EXPECT_EQ(1u, log.foreign);
+}
+
+TEST(DecodeLog, CutAtBothEnds_IsMarked)
+{
+    const Log log = read_log("hed to set OSD Display mode.\nPMX_Stop\nAdjust PMX_ColorSpaceSe");
+    ASSERT_EQ(3u, log.items.size());
+    EXPECT_EQ(Item::Cut::Begin, log.items[0].cut);
+    EXPECT_EQ(Item::Cut::None, log.items[1].cut);
+    EXPECT_EQ(Item::Cut::End, log.items[2].cut);
+    EXPECT_EQ(2u, log.cut);
+}
+
+TEST(DecodeLog, Level_IsTheHighestThatShows)
+{
+    EXPECT_EQ(std::nullopt, read_log("foreign\n").level);
+    EXPECT_EQ(1, read_log("SetModeEx\nPMX_Stop\n").level);
+    EXPECT_EQ(9, read_log("OSD5(0)\nPMX_Stop\n").level);
+}
+
+TEST(DecodeLog, ForeignLines_AreNotTaken)
+{
+    for (const char* const line : { "player: calling SetModeEx again", "my_PMX_Initialise", "mode 0", "" })
+        EXPECT_TRUE(read_log(line).items.empty()) << line;
+}
+
+TEST(DecodeLog, Assertion_IsKnownByExpressionAndFile)
+{
+    const auto one = read_text("ASSERT x_sema_delete (MutexPMX) == OSR_OK, src/driver/pmx/pmx_lifecycle.cpp:88");
+    ASSERT_TRUE(one);
+    EXPECT_EQ(Role::Assertion, one->text->role);
+    EXPECT_EQ((std::vector<std::string>{ "pmx_lifecycle.cpp", "88" }), one->values);
+    const auto nought = read_text("ASSERT 0, src/driver/pmx/pmx_colour.cpp:12");
+    ASSERT_TRUE(nought);
+    EXPECT_EQ("0", nought->text->format);
+    EXPECT_EQ("0, pmx_colour.cpp", nought->shown);
+}
+
+TEST(DecodeLog, Printable_HasNoControlCharactersAndIsShortened)
+{
+    EXPECT_EQ("a\\x07b\\xFF", printable("a\ab\xff", 80));
+    EXPECT_EQ("abc…", printable("abcdef", 4));
+}
+
+} // namespace

@@ -1,0 +1,96 @@
+#include "tools/pmxboard/decode/pattern.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <regex>
+#include <string>
+
+namespace
+{
+
+using namespace pmxboard::decode;
+
+const Pattern* pattern_of(std::string_view format)
+{
+    for (const Pattern& pattern : patterns())
+    {
+        if (pattern.text->format == format)
+            return &pattern;
+    }
+    return nullptr;
+}
+
+TEST(DecodePattern, ValuesAreTakenAsPrinted)
+{
+    const Pattern* const pattern = pattern_of("HDMI(%d, %s)\n");
+    ASSERT_NE(nullptr, pattern);
+    const Match found = match(*pattern, "HDMI(1, RES_1080I60HZ) and more");
+    EXPECT_EQ(Match::State::Whole, found.state);
+    EXPECT_EQ(22u, found.end);
+    ASSERT_EQ(2u, found.count);
+    EXPECT_EQ("1", found.values[0]);
+    EXPECT_EQ("RES_1080I60HZ", found.values[1]);
+    EXPECT_EQ("(null)", match(*pattern, "HDMI(1, (null))").values[1]);
+}
+
+TEST(DecodePattern, PaddingIsNoPartOfAHexNumber)
+{
+    const Pattern* const pattern = pattern_of("[PMX%d] Set PlaneOrder = [0x%8x]\n");
+    ASSERT_NE(nullptr, pattern);
+    const Match found = match(*pattern, "[PMX0] Set PlaneOrder = [0x  543210]");
+    EXPECT_EQ(Match::State::Whole, found.state);
+    EXPECT_EQ("543210", found.values[1]);
+}
+
+TEST(DecodePattern, ALineThatEndsWithinATextRanOut)
+{
+    const Pattern* const pattern = pattern_of("HDMI(%d, %s)\n");
+    ASSERT_NE(nullptr, pattern);
+    for (const char* cut : { "HD", "HDMI(", "HDMI(1", "HDMI(1, ", "HDMI(1, RES_10" })
+        EXPECT_EQ(Match::State::RanOut, match(*pattern, cut).state) << cut;
+    for (const char* other : { "HDCP", "HDMI(x", "HDMI(1; ", "HDMI(1, RES_10]" })
+        EXPECT_EQ(Match::State::No, match(*pattern, other).state) << other;
+}
+
+TEST(DecodePattern, EveryTextHasAsManyNamesAsValues)
+{
+    for (const Pattern& pattern : patterns())
+    {
+        const auto values = std::count_if(pattern.pieces.begin(), pattern.pieces.end(),
+                                          [](const Piece& piece) { return piece.kind != Piece::Kind::Literal; });
+        const std::size_t names = pattern.text->role == Role::Assertion ? 0 : split(pattern.text->values).size();
+        EXPECT_EQ(names, static_cast<std::size_t>(values)) << pattern.text->format;
+    }
+}
+
+/** The layer's sources, adjacent literals joined. */
+std::string source(const std::filesystem::path& path)
+{
+    std::ifstream in(path);
+    const std::string text(std::istreambuf_iterator<char>(in), {});
+    return std::regex_replace(text, std::regex(R"("\s*\n\s*")"), "");
+}
+
+TEST(DecodePattern, AnAssertionNamesTheFilesThatHoldIt)
+{
+    for (const Text& text : texts())
+    {
+        if (text.role != Role::Assertion || text.format == "0")
+            continue;
+        for (const auto& entry : std::filesystem::directory_iterator("src/driver/pmx"))
+        {
+            const std::string name = entry.path().filename();
+            if (name.ends_with(".cpp"))
+            {
+                const bool holds = source(entry.path()).find('"' + std::string(text.format) + '"') != std::string::npos;
+                EXPECT_EQ(holds, has(text.values, name)) << text.format << ' ' << name;
+            }
+        }
+    }
+}
+
+} // namespace

@@ -1,0 +1,136 @@
+#include <gtest/gtest.h>
+
+#include <algorithm>
+
+#include "tools/pmxboard/decode/report.h"
+#include "tools/pmxboard/decode/story.h"
+
+namespace
+{
+
+using namespace pmxboard::decode;
+
+std::vector<std::string> words_of(const std::string& log)
+{
+    StatusReport report;
+    for (const Item& item : read_log(log).items)
+        report.add(item);
+    return report.words();
+}
+
+void expect_line(const std::vector<std::string>& lines, const std::string& line)
+{
+    std::string all;
+    for (const std::string& one : lines)
+        all += one + "\n";
+    EXPECT_NE(lines.end(), std::find(lines.begin(), lines.end(), line)) << line << "\nnot in\n" << all;
+}
+
+std::string output_line(int output, const std::string& rest)
+{
+    return "[PMX] PMX(0 ), _arPmxConf[0].arOutputConf[" + std::to_string(output) + "]." + rest + "\n";
+}
+
+std::string ccir_line(const std::string& rest)
+{
+    return "[PMX]PMX(0,) _arPmxConf[0].arOutputConf[0].eCcirDrvInfo." + rest + " \n";
+}
+
+TEST(DecodeReport, E_IsTheBusWidth)
+{
+    const auto words = words_of("[PMX] PMX(0) E(24 ), Mode(12) TVTP(0 ), FQ(60 ), DitalOut(1 ), u4Phase(2 ), "
+                                "PMode(0 ), DBit(24 ),\n");
+    expect_line(words, "mixer format 1080p 60 Hz at 60 Hz, TV type NTSC");
+    expect_line(words, "E(24) is the digital port's bus width; the report does not show the master enable");
+    expect_line(words, "digital port: switch on, 24 bits, phase 2, proprietary mode 0");
+}
+
+TEST(DecodeReport, Capability_SignedDecimalBecomesBits)
+{
+    const auto cap = [](const std::string& word) {
+        return words_of("[PMX] PMX(0) CBE(0 ), MuteE(0 ), AS(3 ), BgC(1081472 ), Cap(" + word +
+                        " ), Sharp(0 ), fgAspNext(0 ),\n");
+    };
+    expect_line(cap("2147221503"), "capability 0x7FFBFFFF: admits every mode that has a bit");
+    expect_line(cap("-1"), "capability 0xFFFFFFFF: admits every mode that has a bit");
+    expect_line(cap("-2097153"), "of the features it admits gamma, contrast, hue, saturation, digital port, "
+                                 "sharpness, black level; refuses brightness");
+    expect_line(cap("-2"), "capability 0xFFFFFFFE: admits 576i, 480p, 576p, 720p 60 Hz (and its top-and-bottom mode), "
+                           "720p 50 Hz (and its top-and-bottom mode), 1080i 60 Hz (and its side-by-side mode), "
+                           "1080i 50 Hz (and its side-by-side mode), 1080p 60 Hz, 1080p 50 Hz, 1080p 30 Hz, "
+                           "1080p 25 Hz, 1080p 24 Hz (and its top-and-bottom mode), 1080p 23.976 Hz, 1080p 29.97 Hz "
+                           "(and the top-and-bottom mode of 23 Hz), all frame-packed 3D modes, 640x480; refuses 480i "
+                           "(and 2D 480i 60 Hz)");
+}
+
+TEST(DecodeReport, MasterColorSpaceOfAPort_IsItsSources)
+{
+    const auto words =
+        words_of("[PMX] PMX(0 ), eMasterColorSpace(DRV_PMX_CS_YCBCR_709)\n"
+                 "[PMX] PMX(0 ), _arPmxConf[0], arPortInfo[0]'s CompT(65 ), CompId(0 ),  Connected(1 ) \n"
+                 "[PMX] PMX(0 ), _arPmxConf[0], arPortInfo[0]'s fgE(1 ), SrcW(0 ),u4SrcH(0 ), LumaK(0,) \n"
+                 "[PMX] PMX(0 ),_arPmxConf[0].arPortInfo[0].eInputColorMode(DRV_GFX_COLOR_MODE_YCBCR)\n"
+                 "[PMX] PMX(0 ), _arPmxConf[0].arPortInfo[0].eMasterColorSpace(DRV_PMX_CS_YCBCR_601)\n");
+    ASSERT_EQ(2u, words.size());
+    EXPECT_NE(std::string::npos, words[1].find("source "));
+    EXPECT_NE(std::string::npos, words[1].find("(labelled eMasterColorSpace)"));
+    EXPECT_NE(std::string::npos, words[0].find("709")) << words[0];
+    EXPECT_NE(std::string::npos, words[1].find("601")) << words[1];
+}
+
+TEST(DecodeReport, ModesFrom39_AreNamedAsTheyAreMeant)
+{
+    const auto mode = [](const std::string& name) {
+        return words_of(output_line(1, "fgOutputEnable(1)") + output_line(1, "eResMode(" + name + ")")).front();
+    };
+    EXPECT_EQ("output HDMI: on, 1080p 60 Hz", mode("RES_1080P60HZ"));
+    EXPECT_EQ("output HDMI: on, 2D 576i 50 Hz", mode("RES_2D_576I50HZ"));
+    EXPECT_EQ("output HDMI: on, 2D 640x480 (reported as RES_PANEL_AUO_B089AW01)", mode("RES_PANEL_AUO_B089AW01"));
+    EXPECT_EQ("output HDMI: on, panel 1024x600 (reported as RES_MODE_NUM)", mode("RES_MODE_NUM"));
+    EXPECT_EQ("output HDMI: on, 3D 720p 60 Hz, top and bottom (reported as RES_AUTO)", mode("RES_AUTO"));
+}
+
+TEST(DecodeReport, ModeAbove41_HasNoLine)
+{
+    const auto words = words_of(output_line(0, "fgOutputEnable(1)") + output_line(0, "u4VFreq(50)") +
+                                ccir_line("eDgiFmt(CCIR_NON_USED)"));
+    expect_line(words, "output digital port: on, mode above 41, which has no line, 50 Hz");
+}
+
+TEST(DecodeReport, TwelveBitOutputFormat_IsNotTheInputs)
+{
+    const auto words = words_of(output_line(0, "fgOutputEnable(1)") + ccir_line("eDgiFmt(CCIR_YC422_16BIT)") +
+                                ccir_line("eDgiMode(CCIR_601_MODE)") + ccir_line("eDgiFmt(CCIR_YCMIX_12BIT)") +
+                                ccir_line("eDgoMode(CCIR_656_MODE)"));
+    expect_line(words, "output digital port: on, mode not in the log, digital input CCIR_601_MODE CCIR_YC422_16BIT, "
+                       "digital output CCIR_656_MODE CCIR_YCMIX_12BIT (the output's format, labelled as the input's)");
+}
+
+TEST(DecodeReport, TwelveBitInputFormat_StaysTheInputs)
+{
+    const auto words = words_of(ccir_line("eDgiFmt(CCIR_YCMIX_12BIT)") + ccir_line("eDgiMode(CCIR_656_MODE)") +
+                                ccir_line("eDgoFmt(CCIR_NON_USED)") + ccir_line("eDgoMode(CCIR_INVALID)"));
+    ASSERT_EQ(1u, words.size());
+    EXPECT_TRUE(words[0].ends_with("digital input CCIR_656_MODE CCIR_YCMIX_12BIT")) << words[0];
+}
+
+TEST(DecodeReport, TwoReports_AreTwoEvents)
+{
+    const std::string one = "Mode(12) CS(1)\n[PMX] PMX(0 ), fgOSD5(1 ), \n";
+    const Story story = tell(read_log(one + one));
+    ASSERT_EQ(2u, story.events.size());
+    EXPECT_EQ(2u, story.events[0].last_line);
+    EXPECT_EQ(3u, story.events[1].first_line);
+    expect_line(story.events[1].report->words(), "fifth OSD plane 1");
+}
+
+TEST(DecodeReport, Value_HasTheFieldsOfTheRecordPutRight)
+{
+    StatusReport report;
+    for (const Item& item : read_log(output_line(1, "eResMode(RES_AUTO)")).items)
+        report.add(item);
+    EXPECT_NE(std::string::npos, report.value().to_json().find("\"eResMode\":\"RES_3D_720P60HZ_TB\""))
+        << report.value().to_json();
+}
+
+} // namespace

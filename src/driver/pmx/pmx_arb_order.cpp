@@ -68,7 +68,7 @@ UINT32 PMX_SetArbPlaneOrder(UCHAR ucPmxId, UINT32 u4PlaneOrder)
 
     Printf("[PMX%d] Set PlaneOrder = [0x%8x]\n", ucPmxId, u4PlaneOrder);
     UINT32 u4Used = u4Unpack(u4PlaneOrder, u1PlnSel);
-    const UINT8* pu1Nominal = fgPmxTveHd(prConf->ucMode) != 0 ? OFFSETS_HD : OFFSETS_OTHER;
+    const UINT8* pu1Nominal = fgPmxTveHd(prConf->ucMode) ? OFFSETS_HD : OFFSETS_OTHER;
     for (INT32 i = 0; i < PMX_PLANE_NUM; i++)
         Printf("[PMX]offset[%d]=%d\n", i, pu1Nominal[i]);
     for (INT32 i = 0; i < PMX_PLANE_NUM; i++)

@@ -44,15 +44,15 @@ UINT32 PMX_SetAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgApplyOnN
     PMX_CONF_T* prConf = prPmxConf();
     PMX_IsLog(9, "[EX] PMX_ID(%d), Aspect Ratio(%d), Apply On Next(%d)\n", ucPmxId, (INT32)u4AspectRatio,
               fgApplyOnNext);
-    if (fgApplyOnNext != 0)
+    if (fgApplyOnNext != FALSE)
     {
-        prConf->fgAspNext = 1;
+        prConf->fgAspNext = TRUE;
         prConf->u4AspNext = u4AspectRatio;
         return 1;
     }
 
     prConf->u4AspectRatio = u4AspectRatio;
-    prConf->fgAspNext = 0;
+    prConf->fgAspNext = FALSE;
     prConf->u4AspNext = 0;
     return u4ApplyNormal(u4AspectRatio, "[EX] VDP_GlobalOutputChange\n");
 }
@@ -61,10 +61,10 @@ UINT32 PMX_SetAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgApplyOnN
 UINT32 PMX_SetAspectRatioNext(UCHAR ucPmxId)
 {
     PMX_CONF_T* prConf = prPmxConf();
-    if (prConf->fgAspNext == 0)
+    if (prConf->fgAspNext == FALSE)
         return prConf->u4AspectRatio;
 
-    prConf->fgAspNext = 0;
+    prConf->fgAspNext = FALSE;
     prConf->u4AspectRatio = prConf->u4AspNext;
     if (ucPmxId == 0 && fgSignalHdmi(prConf->u4AspectRatio) == FALSE)
         return 0;
@@ -123,10 +123,10 @@ UINT32 PMX_SetDigestAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgDi
     PMX_CONF_T* prConf = prPmxConf();
     PMX_IsLog(0, "[EX] PMX_ID(%d), Digest Aspect Ratio(%d), Digest mode enable(%d)\n", ucPmxId, (INT32)u4AspectRatio,
               fgDigestEnable);
-    prConf->fgDigestEnable = fgDigestEnable != 0;
+    prConf->fgDigestEnable = fgDigestEnable != FALSE;
     prConf->u4DigestAsp = u4AspectRatio; // stored when the view is left, too
     VDP_GlobalOutputChange();
-    if (fgDigestEnable != 0)
+    if (fgDigestEnable != FALSE)
         return 1;
 
     const SIGNALLING_T* prSignalling = prSignallingOf(u4AspectRatio);
@@ -140,7 +140,7 @@ UINT32 PMX_SetDigestAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgDi
 UINT32 PMX_GetAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio)
 {
     const PMX_CONF_T* prConf = prPmxConf();
-    return u4PmxGiveWord(ucPmxId, prConf->fgDigestEnable != 0 ? prConf->u4DigestAsp : prConf->u4AspectRatio,
+    return u4PmxGiveWord(ucPmxId, prConf->fgDigestEnable != FALSE ? prConf->u4DigestAsp : prConf->u4AspectRatio,
                          pu4AspectRatio);
 }
 
@@ -167,5 +167,6 @@ UINT32 PMX_GetDigestAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio)
 UINT32 PMX_GetAspectRatioMW(UCHAR ucPmxId, UINT32* pu4AspectRatio)
 {
     const PMX_CONF_T* prConf = prPmxConf();
-    return u4PmxGiveWord(ucPmxId, prConf->fgAspNext != 0 ? prConf->u4AspNext : prConf->u4AspectRatio, pu4AspectRatio);
+    return u4PmxGiveWord(ucPmxId, prConf->fgAspNext != FALSE ? prConf->u4AspNext : prConf->u4AspectRatio,
+                         pu4AspectRatio);
 }

@@ -29,9 +29,9 @@ UINT32 PMX_SetOsdEnableFlag(BOOL bIsOsdEnable)
 UINT32 PMX_SetOsdEnable(void)
 {
     PMX_IsLog(0, "PMX_SetOsdEnable.\n");
-    if (_arPmxDispPartStatus.fgPmxEnabeOsdFlag != 0)
+    if (_arPmxDispPartStatus.fgPmxEnabeOsdFlag != FALSE)
     {
-        for (UCHAR ucPlane = DRV_PMX_PLANE_3; ucPlane <= DRV_PMX_PLANE_7; ucPlane++)
+        for (UCHAR ucPlane = PMX_OSD_PLANE_FIRST; ucPlane <= PMX_OSD_PLANE_LAST; ucPlane++)
             vPmxMixPlane(0, ucPlane);
         PMX_SetOsdEnableFlag(FALSE);
     }
@@ -63,5 +63,5 @@ UINT32 PMX_SetFormatChangeTimer(UINT32 u4TimeInterval)
 BOOL fgPMX_DisplayModeReady(void)
 {
     PMX_IsLog(9, "[PMX] fgPMX_DisplayModeReady is %d.\n", _arPmxDispPartStatus.fgPmxFormatChangeFlag);
-    return _arPmxDispPartStatus.fgPmxFormatChangeFlag == 0;
+    return _arPmxDispPartStatus.fgPmxFormatChangeFlag == FALSE;
 }

@@ -12,9 +12,9 @@ constinit INT32 bComp0OnTop = 0;
 constinit PMX_DISPLAY_PART_STATUS_T _arPmxDispPartStatus = {};
 constinit HANDLE_T MutexPMX = 0;
 constinit UCHAR _PmxInitiated = 0;
-constinit BOOL _fgBootUp = 1;
-constinit BOOL _PmxTestOsd = 0;
-constinit BOOL _fg2DCap = 0;
+constinit BOOL _fgBootUp = TRUE;
+constinit BOOL _PmxTestOsd = FALSE;
+constinit BOOL _fg2DCap = FALSE;
 constinit UINT32 PMX_debug_level = 0;
 
 /* Answers */
@@ -46,8 +46,8 @@ UINT32 u4PmxGiveFeatureByte(UCHAR ucPmxId, UINT32 u4CapBit, UCHAR ucValue, UCHAR
 
 static constexpr PMX_PORT_INFO_T VIDEO_PORT = { .u2CompType = 0,
                                                 .u2CompId = 0,
-                                                .fgConnected = 0,
-                                                .fgEnabled = 0,
+                                                .fgConnected = FALSE,
+                                                .fgEnabled = FALSE,
                                                 .eInputColorMode = DRV_GFX_COLOR_MODE_YCBCR,
                                                 .eSrcColorSpace = DRV_PMX_CS_YCBCR_709,
                                                 .u4SrcWidth = 0,
@@ -56,8 +56,8 @@ static constexpr PMX_PORT_INFO_T VIDEO_PORT = { .u2CompType = 0,
 
 static constexpr PMX_PORT_INFO_T OSD_PORT = { .u2CompType = 0,
                                               .u2CompId = 0,
-                                              .fgConnected = 0,
-                                              .fgEnabled = 0,
+                                              .fgConnected = FALSE,
+                                              .fgEnabled = FALSE,
                                               .eInputColorMode = DRV_GFX_COLOR_MODE_RGB,
                                               .eSrcColorSpace = DRV_PMX_CS_YCBCR_709,
                                               .u4SrcWidth = 0,
@@ -65,11 +65,11 @@ static constexpr PMX_PORT_INFO_T OSD_PORT = { .u2CompType = 0,
                                               .ucLumaKey = 0 };
 
 static constexpr PMX_RESOLUTION_T OUTPUT_1080P = {
-    .fgOutputEnable = 1, .eResMode = RES_1080P60HZ, .u4VFreq = 60, .eCcirDrvInfo = {}
+    .fgOutputEnable = TRUE, .eResMode = RES_1080P60HZ, .u4VFreq = 60, .eCcirDrvInfo = {}
 };
 
 static constexpr PMX_RESOLUTION_T OUTPUT_480I = {
-    .fgOutputEnable = 1, .eResMode = RES_480I, .u4VFreq = 60, .eCcirDrvInfo = {}
+    .fgOutputEnable = TRUE, .eResMode = RES_480I, .u4VFreq = 60, .eCcirDrvInfo = {}
 };
 
 /* ucMode and the outputs' modes differ: the boot resolution replaces ucMode at once, while the outputs are what a
@@ -105,9 +105,9 @@ constexpr PMX_CONF_T _arPmxConfDefault = {
     .arPortInfo = { VIDEO_PORT, VIDEO_PORT, OSD_PORT, OSD_PORT, OSD_PORT, OSD_PORT, OSD_PORT, OSD_PORT },
     .eMasterColorSpace = DRV_PMX_CS_YCBCR_709,
     .arOutputConf = { OUTPUT_1080P, OUTPUT_1080P, OUTPUT_1080P, OUTPUT_480I },
-    .fgAspNext = 0,
+    .fgAspNext = FALSE,
     .u4AspNext = 3,
-    .fgSetModeCalled = 0,
+    .fgSetModeCalled = FALSE,
     .ucCavYcInputDelay = 0,
     .ucCavYcOutputDelay = 0,
     .ucCvbsYcInputDelay = 0,
@@ -117,11 +117,11 @@ constexpr PMX_CONF_T _arPmxConfDefault = {
     .ucCvbsBurstLvl = 0,
     .ucCavYLvl = 0,
     .ucCvbsYLvl = 0,
-    .fgDigestEnable = 0,
+    .fgDigestEnable = FALSE,
     .u4DigestAsp = 0,
     .rDrvExtScl = DRV_NON_EXT_CHIP,
     .u4PlaneOrder = 0x76543210, // each plane fed by the source of its number
-    .fgForceMode = 0,
+    .fgForceMode = FALSE,
     .fgOSD5 = 0,
 };
 

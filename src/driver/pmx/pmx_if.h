@@ -9,8 +9,22 @@
 #include "drv_if_vdp.h"
 #include "x_typedef.h"
 
-#define PMX_PORT_NUM 8  /* input ports: 0 and 1 video planes, 2 to 7 OSD planes */
+#define PMX_PORT_NUM 8  /* input ports */
 #define PMX_PLANE_NUM 8 /* mixer planes */
+
+#define PMX_PORT_VDP_MAIN 0   /* main video */
+#define PMX_PORT_VDP_SUB 1    /* second video, and the background that takes its place */
+#define PMX_PORT_OSD_FIRST 2u /* OSD planes, to the last port */
+
+/* The mixer planes with graphics that wait while the display part switches; the eighth is never touched. */
+#define PMX_OSD_PLANE_FIRST DRV_PMX_PLANE_3
+#define PMX_OSD_PLANE_LAST DRV_PMX_PLANE_7
+
+#define PMX_VDP_COMMANDED_NUM 3 /* video planes that take commands, although two reach the mixer */
+
+/* What goes with the stacking order: which occasion it is. */
+#define PMX_PLANE_ORDER_AT_RESET 3
+#define PMX_PLANE_ORDER_WANTED 8
 
 #define COUNT_OF(Table) (sizeof(Table) / sizeof((Table)[0]))
 
@@ -144,7 +158,7 @@ static inline const PMX_MODE_ROW_T* prPmxModeRow(UINT32 u4Mode)
 }
 
 /* Whether a mode is an HD format for the TV encoders and for plane delays. */
-static inline BOOL fgPmxTveHd(UINT32 u4Mode)
+static inline bool fgPmxTveHd(UINT32 u4Mode)
 {
     return (prPmxModeRow(u4Mode)->u1Flags & PMX_MODE_TVE_HD) != 0;
 }
@@ -166,13 +180,13 @@ static inline UINT32 u4PmxVdpPort(UCHAR ucVdpId)
 {
     if (ucVdpId > 3)
         return PMX_PORT_NUM;
-    return ucVdpId != 0;
+    return ucVdpId == 0 ? PMX_PORT_VDP_MAIN : PMX_PORT_VDP_SUB;
 }
 
 /* The port of an OSD plane; PMX_PORT_NUM when there is no such plane. */
 static inline UINT32 u4PmxOsdPort(UCHAR ucOsdId)
 {
-    return ucOsdId > 5 ? PMX_PORT_NUM : ucOsdId + 2u;
+    return ucOsdId > 5 ? PMX_PORT_NUM : PMX_PORT_OSD_FIRST + ucOsdId;
 }
 
 /* The mixer id that an IPMX tag carries. */
@@ -216,7 +230,7 @@ void vPmxChooseTvType(bool fgNtsc);
  * is the one that the PLL and digital-port commands carried. */
 void vPmxFinishModeChange(PMX_SET_HDMI_RES_PARAMETER_T* prResData);
 
-/* Hand the stacking order to the hardware, with the number that goes with the occasion: 3 at reset, 8 for a request. */
+/* Hand the stacking order to the hardware: PMX_PLANE_ORDER_AT_RESET or PMX_PLANE_ORDER_WANTED. */
 void vPmxProgramPlaneOrder(UINT32 u4Number);
 
 #endif

@@ -7,6 +7,8 @@
 #include "pmx_if.h"
 #include "u_os.h"
 
+#define DRIVE_STRENGTH_AT_START 3
+
 extern "C" void* memcpy(void* pvDest, const void* pvSource, size_t zSize); // the kernel's
 
 void PMX_Init(void)
@@ -29,7 +31,7 @@ void PMX_Init(void)
     PMX_IsLog(0, "[PMX] create a timer \n");
 
     PMX_VsyncInit();
-    PMX_HalSetDigitalOutDrv(3);
+    PMX_HalSetDigitalOutDrv(DRIVE_STRENGTH_AT_START);
     register_pm_ops(&pmx_pm_ops);
 }
 
@@ -53,9 +55,9 @@ void PMX_Reset(UCHAR ucPmxId)
     if (ucPmxId != 0)
         return;
 
-    _arPmxDispPartStatus.fgPmxEnabeOsdFlag = 0;
-    _arPmxDispPartStatus.fgPmxFormatChangeFlag = 0;
-    _arPmxDispPartStatus.fgTimerAlreadySet = 0;
+    _arPmxDispPartStatus.fgPmxEnabeOsdFlag = FALSE;
+    _arPmxDispPartStatus.fgPmxFormatChangeFlag = FALSE;
+    _arPmxDispPartStatus.fgTimerAlreadySet = FALSE;
     _arPmxDispPartStatus.hPMXTimer = 0;
 
     PMX_CONF_T* prConf = prPmxConf();
@@ -65,11 +67,11 @@ void PMX_Reset(UCHAR ucPmxId)
     vSetPLLGP_HDMIDDS(prConf->ucMode);
     PMX_HalSetDigitalOut(0, 0, 0, 0);
     PMX_HalSetMode(0, prConf->ucMode);
-    if (_fgBootUp == 0) // at boot the scaler keeps what the boot loader set
+    if (_fgBootUp == FALSE) // at boot the scaler keeps what the boot loader set
         PMX_HalSetScalerMode(prConf->ucMode);
     PMX_SetTvType(0, ucTvType);
     PMX_HalSetBg(0, prConf->u4BgColor);
-    if (_fgBootUp == 0) // and so does the TV encoder
+    if (_fgBootUp == FALSE) // and so does the TV encoder
     {
         TVE_SetBrightness(prConf->ucBrightness);
         TVE_SetContrast(prConf->ucContrast);
@@ -78,12 +80,12 @@ void PMX_Reset(UCHAR ucPmxId)
         TVE_SetSharpness(prConf->ucSharpness);
     }
 
-    vPmxProgramPlaneOrder(3);
+    vPmxProgramPlaneOrder(PMX_PLANE_ORDER_AT_RESET);
     PMX_HalInitPlaneOrder(0);
     PMX_DisableVideoPlane(0, 1);
 
     VDP_GlobalOutputChange();
-    VDP_SetTvFormat(prConf->ucMode, 1);
+    VDP_SetTvFormat(prConf->ucMode, TRUE);
 }
 
 /* What both ways of shutting down share: vertical sync, registration, timer. */
@@ -210,7 +212,7 @@ UINT32 PMX_GetEnable(UCHAR ucPmxId, UCHAR* pucEnable)
  * bComp0OnTop. */
 static bool fgInSecondPlane(UCHAR ucPmxId, UCHAR ucVdpId)
 {
-    UCHAR ucSecond = fgPmxHalSwapPlane1_2(ucPmxId) != 0 ? 0 : 1;
+    UCHAR ucSecond = fgPmxHalSwapPlane1_2(ucPmxId) != FALSE ? 0 : 1;
     return ucVdpId == ucSecond;
 }
 
@@ -218,14 +220,14 @@ static bool fgInSecondPlane(UCHAR ucPmxId, UCHAR ucVdpId)
 UINT32 PMX_EnableVideoPlane(UCHAR ucPmxId, UCHAR ucVdpId)
 {
     if (fgInSecondPlane(ucPmxId, ucVdpId))
-        vPmxMixPlane(ucPmxId, 1);
+        vPmxMixPlane(ucPmxId, DRV_PMX_PLANE_2);
     return 1;
 }
 
 UINT32 PMX_DisableVideoPlane(UCHAR ucPmxId, UCHAR ucVdpId)
 {
     if (fgInSecondPlane(ucPmxId, ucVdpId))
-        vPmxNotMixPlane(ucPmxId, 1);
+        vPmxNotMixPlane(ucPmxId, DRV_PMX_PLANE_2);
     return 1;
 }
 

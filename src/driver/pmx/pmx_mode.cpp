@@ -27,8 +27,8 @@ void vPmxChooseTvType(bool fgNtsc)
 void vPmxFinishModeChange(PMX_SET_HDMI_RES_PARAMETER_T* prResData)
 {
     VDP_GlobalOutputChange();
-    for (UINT32 u4VdpIdx = 0; u4VdpIdx < 3; u4VdpIdx++)
-        VDP_VsyncSendCmd(u4VdpIdx, 2);
+    for (UINT32 u4VdpIdx = 0; u4VdpIdx < PMX_VDP_COMMANDED_NUM; u4VdpIdx++)
+        VDP_VsyncSendCmd(u4VdpIdx, VDP_CMD_OUTPUT_CHANGED);
     fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, prResData, 1);
     OSD_BASE_SetFlag_PMXChangeResDone();
 }
@@ -44,14 +44,14 @@ UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
 
     PMX_CONF_T* prConf = prPmxConf();
     OSD_BASE_SetDisplayMode(ucMode);
-    if (ucMode == prConf->ucMode && ucVFreq == prConf->ucVfreq && prConf->fgSetModeCalled != 0)
+    if (ucMode == prConf->ucMode && ucVFreq == prConf->ucVfreq && prConf->fgSetModeCalled != FALSE)
     {
-        VDP_SetTvFormat(ucMode, 0);
+        VDP_SetTvFormat(ucMode, FALSE);
         return 1;
     }
     prConf->ucMode = ucMode;
     prConf->ucVfreq = ucVFreq;
-    prConf->fgSetModeCalled = 1;
+    prConf->fgSetModeCalled = TRUE;
 
     PMX_SET_HDMI_RES_PARAMETER_T rResData = { .u1ScaleMode = 0,
                                               .ucHdmiOutDisplayResolution = ucMode,
@@ -71,14 +71,14 @@ UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
     PMX_ColorSpaceSetup(prConf->eMasterColorSpace, ucMode);
     PMX_HalSetMode(0, ucMode);
     PMX_HalSetScalerMode(ucMode);
-    VDP_SetTvFormat(ucMode, 1);
+    VDP_SetTvFormat(ucMode, TRUE);
 
     bool fg60Hz = ucVFreq == 60; // 60 alone; per-output mode setting takes more frequencies for NTSC
     vPmxChooseTvType(fg60Hz);
 
-    BOOL fgHD = fgPmxTveHd(ucMode);
-    TVE_SetFmtEx(TVE_1, ucMode, ucVFreq, ucMode, 1, fgHD, fgOSD5);
-    TVE_SetFmtEx(TVE_2, ucMode, ucVFreq, fg60Hz ? RES_480I : RES_576I, 1, fgHD, fgOSD5);
+    bool fgHD = fgPmxTveHd(ucMode);
+    TVE_SetFmtEx(TVE_1, ucMode, ucVFreq, ucMode, TRUE, fgHD, fgOSD5);
+    TVE_SetFmtEx(TVE_2, ucMode, ucVFreq, fg60Hz ? RES_480I : RES_576I, TRUE, fgHD, fgOSD5);
 
     PMX_HalReset(0);
     PMX_HalScalerReset(0);
@@ -103,10 +103,10 @@ INT32 i4PmxGetMode(void* pvTag, UCHAR* pucMode)
 
 BOOL PMX_IsForceMode(UCHAR)
 {
-    return prPmxConf()->fgForceMode != 0;
+    return prPmxConf()->fgForceMode != FALSE;
 }
 
 void PMX_SetForceMode(UCHAR, BOOL fgOn)
 {
-    prPmxConf()->fgForceMode = fgOn != 0;
+    prPmxConf()->fgForceMode = fgOn != FALSE;
 }

@@ -23,7 +23,7 @@ UINT32 PMX_SetPlaneOrderArray(UCHAR ucPmxId, const UINT32* pu4PlaneOrder)
 
     for (UINT32 i = 0; i < PMX_PLANE_NUM; i++)
         prPmxConf()->aucPlaneOrder[i] = (UCHAR)pu4PlaneOrder[i];
-    PMX_HalPlaneOrder(0, 8, pu4PlaneOrder); // the caller's words, all 32 bits of them
+    PMX_HalPlaneOrder(0, PMX_PLANE_ORDER_WANTED, pu4PlaneOrder); // the caller's words, all 32 bits of them
     return 1;
 }
 
@@ -36,7 +36,7 @@ UINT32 PMX_SetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR ucPlaneOrder)
 
     PMX_CONF_T* prConf = prPmxConf();
     prConf->aucPlaneOrder[ucPlaneOrder] = ucVdpId;
-    vPmxProgramPlaneOrder(8);
+    vPmxProgramPlaneOrder(PMX_PLANE_ORDER_WANTED);
     return 1;
 }
 
@@ -59,16 +59,16 @@ UINT32 PMX_SetOrderVdpComp0(UCHAR ucPmxId, UINT32 u4OnTop)
 
     UCHAR ucInSecondPlane = u4OnTop != 0 ? 0 : 1;
     if (VDP_GetHwEnable(ucInSecondPlane) != VDP_DISABLED) // hidden counts as enabled
-        vPmxMixPlane(ucPmxId, 1);
+        vPmxMixPlane(ucPmxId, DRV_PMX_PLANE_2);
     else
-        vPmxNotMixPlane(ucPmxId, 1);
+        vPmxNotMixPlane(ucPmxId, DRV_PMX_PLANE_2);
     return 1;
 }
 
 UINT32 d_PMX_SetOrderVdpComp0(UCHAR ucPmxId, UINT32 u4OnTop)
 {
-    for (UINT32 u4VdpIdx = 0; u4VdpIdx < 3; u4VdpIdx++) // three, although two video planes reach the mixer
-        VDP_VsyncSendCmd(u4VdpIdx, 17);
+    for (UINT32 u4VdpIdx = 0; u4VdpIdx < PMX_VDP_COMMANDED_NUM; u4VdpIdx++)
+        VDP_VsyncSendCmd(u4VdpIdx, VDP_CMD_ORDER_CHANGES);
     return PMX_SetOrderVdpComp0(ucPmxId, u4OnTop);
 }
 
@@ -80,7 +80,7 @@ UINT32 d_PMX_GetOrderVdpComp0(UCHAR, UINT32* pu4OnTop)
 
 UINT32 PMX_VdpGetPlanePosition(UCHAR ucPmxId, UCHAR ucVdpHwId)
 {
-    bool fgSwapped = fgPmxHalSwapPlane1_2(ucPmxId) != 0;
+    bool fgSwapped = fgPmxHalSwapPlane1_2(ucPmxId) != FALSE;
 
     if (ucVdpHwId == 0)
         return fgSwapped ? DRV_PMX_PLANE_2 : DRV_PMX_PLANE_1;

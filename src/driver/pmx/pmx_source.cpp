@@ -35,22 +35,22 @@ UINT32 PMX_VdpEnabled(UCHAR ucPmxId, UCHAR ucVdpId, INT32 i4SrcWidth, INT32 i4Sr
     if (u4Port >= PMX_PORT_NUM)
         return 0;
     PMX_PORT_INFO_T* prPort = &prPmxConf()->arPortInfo[u4Port];
-    if (prPort->fgConnected == 0)
+    if (prPort->fgConnected == FALSE)
         return 0;
 
-    prPort->fgEnabled = 1;
+    prPort->fgEnabled = TRUE;
     prPort->eInputColorMode = DRV_GFX_COLOR_MODE_YCBCR;
     prPort->ucLumaKey = ucLumaKey;
     PMX_IsLog(8, "VDP_%d Enabled\n", ucVdpId);
     if (ucVdpId == VDP_BACKGROUND)
     {
         PMX_IsLog(8, "Turn on OSD full range conversion\n");
-        OSD_RNG_Set_Xvycc_En(1);
+        OSD_RNG_Set_Xvycc_En(TRUE);
     }
     else if (ucVdpId == VDP_SUB)
     {
         PMX_IsLog(8, "Turn off OSD full range conversion since SUB video enable. \n");
-        OSD_RNG_Set_Xvycc_En(0);
+        OSD_RNG_Set_Xvycc_En(FALSE);
     }
 
     prPort->eSrcColorSpace = eColorSpaceOfSize(i4SrcWidth, i4SrcHeight);
@@ -75,12 +75,12 @@ UINT32 PMX_VdpDisabled(UCHAR, UCHAR ucVdpId)
     if (u4Port >= PMX_PORT_NUM)
         return 0;
 
-    prPmxConf()->arPortInfo[u4Port].fgEnabled = 0;
+    prPmxConf()->arPortInfo[u4Port].fgEnabled = FALSE;
     PMX_IsLog(8, "VDP_%d Disabled\n", ucVdpId);
     if (ucVdpId == VDP_BACKGROUND)
     {
         PMX_IsLog(8, "Turn off OSD full range conversion\n");
-        OSD_RNG_Set_Xvycc_En(0);
+        OSD_RNG_Set_Xvycc_En(FALSE);
     }
     return 1;
 }
@@ -88,28 +88,29 @@ UINT32 PMX_VdpDisabled(UCHAR, UCHAR ucVdpId)
 /* YCbCr graphics become the master at once, past the priority rule and without its message. */
 UINT32 PMX_OsdEnabled(UCHAR, UCHAR ucOsdId, INT32 i4SrcWidth, INT32 i4SrcHeight, DRV_GFX_COLOR_MODE_T eSrcColorMode)
 {
-    PMX_CONF_T* prConf = prPmxConf();
     UINT32 u4Port = u4PmxOsdPort(ucOsdId);
-    DRV_PMX_COLOR_SPACE_T eOldCS = prConf->eMasterColorSpace;
     if (u4Port >= PMX_PORT_NUM)
         return 0;
 
+    PMX_CONF_T* prConf = prPmxConf();
     PMX_PORT_INFO_T* prPort = &prConf->arPortInfo[u4Port];
-    prPort->fgEnabled = 1;
+    DRV_PMX_COLOR_SPACE_T eOldCS = prConf->eMasterColorSpace;
+    prPort->fgEnabled = TRUE;
     PMX_IsLog(8, "OSD_%d Enabled\n", ucOsdId);
-    if (eSrcColorMode != DRV_GFX_COLOR_MODE_YCBCR)
+    if (eSrcColorMode == DRV_GFX_COLOR_MODE_YCBCR)
+    {
+        DRV_PMX_COLOR_SPACE_T eSrcCS = eColorSpaceOfSize(i4SrcWidth, i4SrcHeight);
+        prPort->eInputColorMode = DRV_GFX_COLOR_MODE_YCBCR;
+        prPort->eSrcColorSpace = eSrcCS;
+        prConf->eMasterColorSpace = eSrcCS;
+        PMX_IsLog(8,
+                  eSrcCS == DRV_PMX_CS_YCBCR_709 ? "OSD_%d's Src Color Space = DRV_PMX_CS_YCBCR_709\n"
+                                                 : "OSD_%d's Src Color Space = DRV_PMX_CS_YCBCR_601\n",
+                  ucOsdId);
+    }
+    else // a port that had YCbCr graphics goes on counting as such
     {
         PMX_IsLog(8, "OSD_%d's Src Color Space = DRV_PMX_CS_RGB\n", ucOsdId);
-    }
-    else
-    {
-        prPort->eInputColorMode = DRV_GFX_COLOR_MODE_YCBCR;
-        prPort->eSrcColorSpace = eColorSpaceOfSize(i4SrcWidth, i4SrcHeight);
-        prConf->eMasterColorSpace = prPort->eSrcColorSpace;
-        PMX_IsLog(8,
-                  prPort->eSrcColorSpace == DRV_PMX_CS_YCBCR_709 ? "OSD_%d's Src Color Space = DRV_PMX_CS_YCBCR_709\n"
-                                                                 : "OSD_%d's Src Color Space = DRV_PMX_CS_YCBCR_601\n",
-                  ucOsdId);
     }
     if (prConf->eMasterColorSpace != eOldCS)
         vAnnounceMasterColorSpace();
@@ -122,7 +123,7 @@ UINT32 PMX_OsdDisabled(UCHAR, UCHAR ucOsdId)
     if (u4Port >= PMX_PORT_NUM)
         return 0;
 
-    prPmxConf()->arPortInfo[u4Port].fgEnabled = 0;
+    prPmxConf()->arPortInfo[u4Port].fgEnabled = FALSE;
     PMX_IsLog(8, "OSD_%d Disabled\n", ucOsdId);
     PMX_DecideMasterColorSpace(0);
     return 1;
@@ -135,19 +136,20 @@ UINT32 PMX_DecideMasterColorSpace(UCHAR ucPmxId)
     DRV_PMX_COLOR_SPACE_T eCandidate = prConf->eMasterColorSpace;
 
     // Each rule that applies overrules those before it.
-    if (prPort[0].fgEnabled != 0)
+    if (prPort[PMX_PORT_VDP_MAIN].fgEnabled != FALSE)
     {
-        eCandidate = prPort[0].eSrcColorSpace;
+        eCandidate = prPort[PMX_PORT_VDP_MAIN].eSrcColorSpace;
         PMX_IsLog(8, "[PMX] VDP_COMP_1 enabled and Color Space is %d.\n", (INT32)eCandidate);
     }
-    if (prPort[1].fgEnabled != 0 && prPort[1].ucLumaKey != 0 && fgPmxHalMixPlane(ucPmxId, 1) != 0)
+    if (prPort[PMX_PORT_VDP_SUB].fgEnabled != FALSE && prPort[PMX_PORT_VDP_SUB].ucLumaKey != 0 &&
+        fgPmxHalMixPlane(ucPmxId, DRV_PMX_PLANE_2) != FALSE)
     {
-        eCandidate = prPort[1].eSrcColorSpace;
+        eCandidate = prPort[PMX_PORT_VDP_SUB].eSrcColorSpace;
         PMX_IsLog(8, "[PMX] VDP_COMP_2 enabled and Color Space is %d.\n", (INT32)eCandidate);
     }
-    for (UINT32 i = 2; i < PMX_PORT_NUM; i++)
+    for (UINT32 i = PMX_PORT_OSD_FIRST; i < PMX_PORT_NUM; i++)
     {
-        if (prPort[i].fgEnabled != 0 && prPort[i].eInputColorMode == DRV_GFX_COLOR_MODE_YCBCR)
+        if (prPort[i].fgEnabled != FALSE && prPort[i].eInputColorMode == DRV_GFX_COLOR_MODE_YCBCR)
         {
             eCandidate = prPort[i].eSrcColorSpace;
             PMX_IsLog(8, "[PMX] Gfx enabled and Color Space is %d.\n", (INT32)eCandidate);
@@ -185,10 +187,10 @@ static void vInformVdp(UINT16 u2CompType, UINT16 u2CompId)
 void PMX_InformVdpColorSpace(UCHAR)
 {
     vPmxLock();
-    for (UINT32 u4Port = 0; u4Port < 2; u4Port++) // the video planes'
+    for (UINT32 u4Port = PMX_PORT_VDP_MAIN; u4Port <= PMX_PORT_VDP_SUB; u4Port++)
     {
         const PMX_PORT_INFO_T* prPort = &prPmxConf()->arPortInfo[u4Port];
-        if (prPort->fgConnected != 0)
+        if (prPort->fgConnected != FALSE)
             vInformVdp(prPort->u2CompType, prPort->u2CompId);
     }
     vPmxUnlock();

@@ -30,10 +30,13 @@ void VDP_SetTvFormat(UCHAR ucMode, BOOL fgChanged);
  *  @context a thread that may sleep */
 void VDP_GlobalOutputChange(void);
 
+/** Commands that the mixer gives; what the driver does with them is the driver's own. */
+#define VDP_CMD_OUTPUT_CHANGED 2 /**< the mixer has a new format */
+#define VDP_CMD_ORDER_CHANGES 17 /**< the first video plane is about to go above or below the second */
+
 /** Give a video plane a command that it carries out at its next vertical sync.
  *  @param u4VdpIdx  video plane 0, 1 or 2
- *  @param u4Cmd     the driver's own code: 2 after a format change, 17 before the first video plane goes above or below
- *                   the second
+ *  @param u4Cmd     VDP_CMD_OUTPUT_CHANGED or VDP_CMD_ORDER_CHANGES
  *  @context a thread that may sleep */
 void VDP_VsyncSendCmd(UINT32 u4VdpIdx, UINT32 u4Cmd);
 

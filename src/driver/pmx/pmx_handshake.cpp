@@ -1,5 +1,13 @@
-/* The display part's handshake: graphics stay out of the picture while the sink switches format. The flags are single
- * bytes, written without a lock in the callers' threads and in the timer's context. */
+/* The display part's handshake: graphics stay out of the picture while the sink switches format.
+ *
+ *  format-change  OSD-enable  timer     OSD planes
+ *       0             0       whatever  mixed      ready
+ *       1             0       whatever  mixed      the display part switches
+ *       1             0       runs      out        held back by PMX_SetModeEx, until an answer or the timer
+ *       0             1       whatever  out        answered, but the video plane waits: until PMX_SetOsdEnable
+ *
+ * The display part alone raises the first flag. Every state that can be reached, with resets and timers that come late,
+ * is drawn in docs/handshake.svg. */
 #include "drv_pmx.h"
 #include "drv_vdp.h"
 #include "pmx_hal.h"
@@ -9,7 +17,7 @@
 UINT32 PMX_SetFormatChangeFlag(BOOL bIsFormatChange)
 {
     PMX_IsLog(0, "Display Format Change :%d.\n", bIsFormatChange);
-    _arPmxDispPartStatus.fgPmxFormatChangeFlag = bIsFormatChange;
+    prPmxStatus()->fgPmxFormatChangeFlag = bIsFormatChange;
     if (bIsFormatChange == FALSE)
     {
         PMX_SetOsdEnableFlag(TRUE);
@@ -22,14 +30,14 @@ UINT32 PMX_SetFormatChangeFlag(BOOL bIsFormatChange)
 UINT32 PMX_SetOsdEnableFlag(BOOL bIsOsdEnable)
 {
     PMX_IsLog(0, "Set Osd Enable :%d.\n", bIsOsdEnable);
-    _arPmxDispPartStatus.fgPmxEnabeOsdFlag = bIsOsdEnable;
+    prPmxStatus()->fgPmxEnabeOsdFlag = bIsOsdEnable;
     return 1;
 }
 
 UINT32 PMX_SetOsdEnable(void)
 {
     PMX_IsLog(0, "PMX_SetOsdEnable.\n");
-    if (_arPmxDispPartStatus.fgPmxEnabeOsdFlag != FALSE)
+    if (prPmxStatus()->fgPmxEnabeOsdFlag != FALSE)
     {
         for (UCHAR ucPlane = PMX_OSD_PLANE_FIRST; ucPlane <= PMX_OSD_PLANE_LAST; ucPlane++)
             vPmxMixPlane(0, ucPlane);
@@ -42,18 +50,16 @@ UINT32 PMX_SetOsdEnable(void)
 void _PMX_TmrIsr(HANDLE_T, void*)
 {
     PMX_IsLog(0, "PMX timeout.\n");
-    _arPmxDispPartStatus.fgTimerAlreadySet = FALSE;
+    prPmxStatus()->fgTimerAlreadySet = FALSE;
     PMX_SetFormatChangeFlag(FALSE);
 }
 
 UINT32 PMX_SetFormatChangeTimer(UINT32 u4TimeInterval)
 {
-    HANDLE_T hTimer = _arPmxDispPartStatus.hPMXTimer;
-
     PMX_IsLog(0, "Display Format Change Timer Set.\n");
-    if (x_timer_stop(hTimer) != OSR_OK)
+    if (x_timer_stop(prPmxStatus()->hPMXTimer) != OSR_OK)
         Assert("x_timer_stop(_arPmxDispPartStatus.hPMXTimer) == OSR_OK", __FILE__, __LINE__);
-    if (x_timer_start(hTimer, u4TimeInterval, X_TIMER_FLAG_ONCE, _PMX_TmrIsr, nullptr) != OSR_OK)
+    if (x_timer_start(prPmxStatus()->hPMXTimer, u4TimeInterval, X_TIMER_FLAG_ONCE, _PMX_TmrIsr, nullptr) != OSR_OK)
         Assert("x_timer_start(_arPmxDispPartStatus.hPMXTimer, u4TimeInterval, X_TIMER_FLAG_ONCE, _PMX_TmrIsr, NULL)"
                "==OSR_OK",
                __FILE__, __LINE__);
@@ -62,6 +68,6 @@ UINT32 PMX_SetFormatChangeTimer(UINT32 u4TimeInterval)
 
 BOOL fgPMX_DisplayModeReady(void)
 {
-    PMX_IsLog(9, "[PMX] fgPMX_DisplayModeReady is %d.\n", _arPmxDispPartStatus.fgPmxFormatChangeFlag);
-    return _arPmxDispPartStatus.fgPmxFormatChangeFlag == FALSE;
+    PMX_IsLog(9, "[PMX] fgPMX_DisplayModeReady is %d.\n", prPmxStatus()->fgPmxFormatChangeFlag);
+    return prPmxStatus()->fgPmxFormatChangeFlag == FALSE;
 }

@@ -151,6 +151,13 @@ static inline PMX_CONF_T* prPmxConf(void)
     return &_arPmxConf[0];
 }
 
+/* Where the handshake stands. The timer's context shares it and neighbours read it, without a lock: each access is one
+ * load or store of the field's width, where it is written. What is volatile no compiler merges, moves or repeats. */
+static inline volatile PMX_DISPLAY_PART_STATUS_T* prPmxStatus(void)
+{
+    return &_arPmxDispPartStatus;
+}
+
 /* The row of a mode number; never leaves the table. */
 static inline const PMX_MODE_ROW_T* prPmxModeRow(UINT32 u4Mode)
 {

@@ -55,10 +55,11 @@ void PMX_Reset(UCHAR ucPmxId)
     if (ucPmxId != 0)
         return;
 
-    _arPmxDispPartStatus.fgPmxEnabeOsdFlag = FALSE;
-    _arPmxDispPartStatus.fgPmxFormatChangeFlag = FALSE;
-    _arPmxDispPartStatus.fgTimerAlreadySet = FALSE;
-    _arPmxDispPartStatus.hPMXTimer = 0;
+    volatile PMX_DISPLAY_PART_STATUS_T* prStatus = prPmxStatus();
+    prStatus->fgPmxEnabeOsdFlag = FALSE;
+    prStatus->fgPmxFormatChangeFlag = FALSE;
+    prStatus->fgTimerAlreadySet = FALSE;
+    prStatus->hPMXTimer = 0; // a timer that runs goes on running, and nobody here knows it any more
 
     PMX_CONF_T* prConf = prPmxConf();
     memcpy(prConf, &_arPmxConfDefault, sizeof *prConf);
@@ -93,7 +94,7 @@ static void vStopAndUnregister(void)
 {
     PMX_VsyncStop();
     i4PmxUnregisterIM(PMX_COMP_TYPE_PMX, 0);
-    if (x_timer_delete(_arPmxDispPartStatus.hPMXTimer) != OSR_OK)
+    if (x_timer_delete(prPmxStatus()->hPMXTimer) != OSR_OK)
         Assert("x_timer_delete(_arPmxDispPartStatus.hPMXTimer)==OSR_OK", __FILE__, __LINE__);
 }
 

@@ -203,7 +203,7 @@ static void vApplySameFormat(const MODE_EX_T* pr, PMX_SET_HDMI_RES_PARAMETER_T* 
  * still runs sent an HDMI change. */
 static void vWaitForDisplayPart(BOOL fgHdmiExist)
 {
-    bool fgAnswers = (fgHdmiExist != 0 || _arPmxDispPartStatus.fgTimerAlreadySet != 0) && i4GetHotPlugStatus() == 1;
+    bool fgAnswers = (fgHdmiExist != 0 || prPmxStatus()->fgTimerAlreadySet != FALSE) && i4GetHotPlugStatus() == 1;
     if (!fgAnswers)
     {
         PMX_IsLog(0, "[PMX] fgHdmiExist:%d, Not wait display part...\n", fgHdmiExist);
@@ -217,7 +217,7 @@ static void vWaitForDisplayPart(BOOL fgHdmiExist)
     for (UCHAR ucPlane = DRV_PMX_PLANE_3; ucPlane <= DRV_PMX_PLANE_7; ucPlane++)
         vPmxNotMixPlane(0, ucPlane);
     PMX_SetFormatChangeTimer(DISPLAY_PART_TIMEOUT_MS);
-    _arPmxDispPartStatus.fgTimerAlreadySet = TRUE;
+    prPmxStatus()->fgTimerAlreadySet = TRUE;
 }
 
 UINT32 PMX_SetModeEx(UCHAR ucPmxId, PMX_RESOLUTION_T* prOutConf, UCHAR ucVFreq, DRV_EXT_CHIP_USAGE_T rDrvExtScl,

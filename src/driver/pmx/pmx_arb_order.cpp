@@ -6,8 +6,6 @@
 #include "pmx_if.h"
 #include "u_os.h"
 
-extern "C" void* memset(void* pvDest, int iValue, size_t zSize); // the kernel's
-
 /* Nominal offset of each plane, in the hardware's unit. */
 static constexpr UINT8 OFFSETS_HD[PMX_PLANE_NUM] = { 12, 12, 10, 8, 6, 4, 2, 0 };
 static constexpr UINT8 OFFSETS_OTHER[PMX_PLANE_NUM] = { 6, 6, 5, 4, 3, 2, 1, 0 };

@@ -42,7 +42,10 @@ UINT32 PMX_SetTVSystem(UCHAR ucPmxId, UINT16 u2VSyncFreq, BOOL fgTvSysAuto)
     if (ucPmxId != 0 || !fgIsTvSystemFreq(u2VSyncFreq))
         return 0;
 
-    PMX_SET_TV_SYS_PARAMETER_T rTvSys = { .u2_Vfreq = u2VSyncFreq, .fgAutoEnable = fgTvSysAuto };
+    PMX_SET_TV_SYS_PARAMETER_T rTvSys;
+    memset(&rTvSys, 0, sizeof rTvSys); // the driver gets every byte, the one without a name too
+    rTvSys.u2_Vfreq = u2VSyncFreq;
+    rTvSys.fgAutoEnable = fgTvSysAuto;
     fgPmxDrvSetAvd(PMX_SET_UI_TV_SYSTEM, &rTvSys, 1);
     return 1;
 }
@@ -53,9 +56,10 @@ UINT32 PMX_ChkSupportedRes(UCHAR ucPmxId, UCHAR ucChkRes, UINT16 u2VSyncFreq, UC
     if (ucPmxId != 0)
         return 0;
 
-    PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T rValid = {
-        .u4ResCheck = ucChkRes, .u2VsyncFreq = u2VSyncFreq, .u4ValidAutoRes = 0, .u2ValidAutoVfreq = 0
-    };
+    PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T rValid;
+    memset(&rValid, 0, sizeof rValid); // the answers, and the bytes without a name
+    rValid.u4ResCheck = ucChkRes;
+    rValid.u2VsyncFreq = u2VSyncFreq;
     if (fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, &rValid) == FALSE)
         return 0;
 

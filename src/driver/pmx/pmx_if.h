@@ -26,6 +26,9 @@
 #define PMX_PLANE_ORDER_AT_RESET 3
 #define PMX_PLANE_ORDER_WANTED 8
 
+extern "C" void* memcpy(void* pvDest, const void* pvSource, size_t zSize); /* the kernel's */
+extern "C" void* memset(void* pvDest, int iValue, size_t zSize);
+
 #define COUNT_OF(Table) (sizeof(Table) / sizeof((Table)[0]))
 
 /* State of one input port. */

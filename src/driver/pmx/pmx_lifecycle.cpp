@@ -9,8 +9,6 @@
 
 #define DRIVE_STRENGTH_AT_START 3
 
-extern "C" void* memcpy(void* pvDest, const void* pvSource, size_t zSize); // the kernel's
-
 void PMX_Init(void)
 {
     PMX_IsLog(1, "PMX_Init\n");

@@ -53,17 +53,13 @@ UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
     prConf->ucVfreq = ucVFreq;
     prConf->fgSetModeCalled = TRUE;
 
-    PMX_SET_HDMI_RES_PARAMETER_T rResData = { .u1ScaleMode = 0,
-                                              .ucHdmiOutDisplayResolution = ucMode,
-                                              .ucFmtOutResolution = ucMode,
-                                              .ucCCIROutResolution = ucMode,
-                                              .ucHdmiOutMode = 0,
-                                              .eCcirDrvInfo = {},
-                                              .fgOsdMsg = 0,
-                                              .ucCCIROutMode = 1,
-                                              .fgCCIROutEnable = 0,
-                                              .fgHdmiOutEnable = 1,
-                                              .u2_Vfreq = 0 };
+    PMX_SET_HDMI_RES_PARAMETER_T rResData;
+    memset(&rResData, 0, sizeof rResData); // the driver gets every byte, those without a name too
+    rResData.ucHdmiOutDisplayResolution = ucMode;
+    rResData.ucFmtOutResolution = ucMode;
+    rResData.ucCCIROutResolution = ucMode;
+    rResData.ucCCIROutMode = 1;
+    rResData.fgHdmiOutEnable = TRUE;
     fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, &rResData, 1);
     fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, &rResData, 1);
 

@@ -18,20 +18,27 @@ typedef struct
     BOOL fgOutputEnable;
 } OUTPUT_T;
 
-/* Working values of one call. */
+/* What one call was asked for, and what follows from that alone. */
 typedef struct
 {
-    UCHAR ucFmtMode; // the mixer's format
+    const PMX_RESOLUTION_T* prOutConf; // the outputs as given: the layer's copy of them
+    DRV_EXT_CHIP_USAGE_T rDrvExtScl;
     UCHAR ucVFreq;
     UINT8 fgOSD5;
-    BOOL fgHDExist; // the mixer's format is an HD format
-    BOOL fgFmtChange;
-    BOOL fgHdmiChange;
-    BOOL fgTveChange; // component, composite or the fifth OSD plane: looked at when the format is the same
+    UCHAR ucFmtMode; // the mixer's format
+    bool fgHDExist;  // which is an HD format
     OUTPUT_T rHDMI;
     OUTPUT_T rCAV;
     OUTPUT_T rCVBS;
-} MODE_EX_T;
+} REQUEST_T;
+
+/* What it changes, against what the record held. */
+typedef struct
+{
+    bool fgFmtChange;
+    bool fgHdmiChange;
+    bool fgTveChange; // component, composite or the fifth OSD plane: looked at when the format is the same
+} CHANGES_T;
 
 static void vLogRequest(const PMX_RESOLUTION_T* prOutConf, UINT8 fgOSD5)
 {
@@ -56,7 +63,7 @@ static UCHAR ucChooseFormat(const PMX_RESOLUTION_T* prOutConf)
 {
     for (UINT32 i = 0; i < PMX_OUTPUT_NUM; i++)
     {
-        if (prOutConf[i].fgOutputEnable != 0)
+        if (prOutConf[i].fgOutputEnable != FALSE)
             return (UCHAR)prOutConf[i].eResMode;
     }
     PMX_RESOLUTION_MODE_T eHdmiMode = prOutConf[PMX_OUTPUT_HDMI].eResMode;
@@ -64,69 +71,83 @@ static UCHAR ucChooseFormat(const PMX_RESOLUTION_T* prOutConf)
     return (UCHAR)eHdmiMode;
 }
 
-static BOOL fgDiffers(const PMX_RESOLUTION_T* prStored, const PMX_RESOLUTION_T* prGiven)
-{
-    return prStored->fgOutputEnable != prGiven->fgOutputEnable || prStored->eResMode != prGiven->eResMode;
-}
-
-/* Find what changed, against what the record holds, and store the request. The video PLL is set here too, for a new
- * frequency alone: a new format at the old frequency leaves it. */
-static void vFindChanges(MODE_EX_T* pr, const PMX_RESOLUTION_T* prGiven, DRV_EXT_CHIP_USAGE_T rDrvExtScl)
-{
-    PMX_CONF_T* prConf = prPmxConf();
-    PMX_RESOLUTION_T* prStored = prConf->arOutputConf;
-
-    pr->fgFmtChange = TRUE;
-    if (prConf->ucVfreq != pr->ucVFreq)
-        vSetPLLGP_HDMIDDS(pr->ucFmtMode);
-    else if (prConf->ucMode == pr->ucFmtMode && prConf->fgSetModeCalled != 0 && prConf->rDrvExtScl == rDrvExtScl)
-        pr->fgFmtChange = FALSE;
-    prConf->ucMode = pr->ucFmtMode;
-    prConf->ucVfreq = pr->ucVFreq;
-    prConf->fgSetModeCalled = 1;
-    prConf->rDrvExtScl = rDrvExtScl;
-
-    pr->fgHdmiChange = fgDiffers(&prStored[PMX_OUTPUT_HDMI], &prGiven[PMX_OUTPUT_HDMI]) || fgIsHotPlugChgRes() == 1;
-    pr->fgTveChange = fgDiffers(&prStored[PMX_OUTPUT_CAV], &prGiven[PMX_OUTPUT_CAV]) ||
-                      fgDiffers(&prStored[PMX_OUTPUT_CVBS], &prGiven[PMX_OUTPUT_CVBS]) || prConf->fgOSD5 != pr->fgOSD5;
-
-    for (UINT32 i = 0; i < PMX_OUTPUT_NUM; i++) // as given: the next request is compared with this one
-    {
-        prStored[i].fgOutputEnable = prGiven[i].fgOutputEnable;
-        prStored[i].eResMode = prGiven[i].eResMode;
-    }
-    prConf->fgOSD5 = pr->fgOSD5;
-
-    if (_fgBootUp == 1) // the record does not tell what the boot loader set: the first call leaves nothing out
-    {
-        pr->fgFmtChange = TRUE;
-        _fgBootUp = 0;
-    }
-}
-
 /* An output that is off runs the mixer's format. */
 static OUTPUT_T rAsRun(const PMX_RESOLUTION_T* prGiven, UCHAR ucFmtMode)
 {
     PMX_RESOLUTION_MODE_T eResMode = prGiven->eResMode;
-    if (prGiven->fgOutputEnable == 0)
+    if (prGiven->fgOutputEnable == FALSE)
         eResMode = (PMX_RESOLUTION_MODE_T)ucFmtMode;
     return { .eResMode = eResMode, .fgOutputEnable = prGiven->fgOutputEnable };
 }
 
+static bool fgFormatDiffers(const REQUEST_T* pr)
+{
+    const PMX_CONF_T* prConf = prPmxConf();
+    return prConf->ucMode != pr->ucFmtMode || prConf->ucVfreq != pr->ucVFreq || prConf->fgSetModeCalled == FALSE ||
+           prConf->rDrvExtScl != pr->rDrvExtScl;
+}
+
+static void vStoreFormat(const REQUEST_T* pr)
+{
+    PMX_CONF_T* prConf = prPmxConf();
+    prConf->ucMode = pr->ucFmtMode;
+    prConf->ucVfreq = pr->ucVFreq;
+    prConf->fgSetModeCalled = TRUE;
+    prConf->rDrvExtScl = pr->rDrvExtScl;
+}
+
+static bool fgOutputDiffers(const REQUEST_T* pr, UINT32 u4Output)
+{
+    const PMX_RESOLUTION_T* prStored = &prPmxConf()->arOutputConf[u4Output];
+    const PMX_RESOLUTION_T* prGiven = &pr->prOutConf[u4Output];
+    return prStored->fgOutputEnable != prGiven->fgOutputEnable || prStored->eResMode != prGiven->eResMode;
+}
+
+/* As given, not as run: the next request is compared with this one. */
+static void vStoreOutputs(const REQUEST_T* pr)
+{
+    PMX_CONF_T* prConf = prPmxConf();
+    for (UINT32 i = 0; i < PMX_OUTPUT_NUM; i++)
+    {
+        prConf->arOutputConf[i].fgOutputEnable = pr->prOutConf[i].fgOutputEnable;
+        prConf->arOutputConf[i].eResMode = pr->prOutConf[i].eResMode;
+    }
+    prConf->fgOSD5 = pr->fgOSD5;
+}
+
+/* Find what changed, bit by bit in front of what overwrites it, and store the request. HDMI is asked in between. */
+static CHANGES_T rFindChangesAndStore(const REQUEST_T* pr)
+{
+    bool fgFmtChange = fgFormatDiffers(pr);
+    vStoreFormat(pr);
+
+    bool fgHdmiChange = fgOutputDiffers(pr, PMX_OUTPUT_HDMI) || fgIsHotPlugChgRes() == TRUE;
+    bool fgTveChange = fgOutputDiffers(pr, PMX_OUTPUT_CAV) || fgOutputDiffers(pr, PMX_OUTPUT_CVBS) ||
+                       prPmxConf()->fgOSD5 != pr->fgOSD5;
+    vStoreOutputs(pr);
+
+    if (_fgBootUp == TRUE) // the record does not tell what the boot loader set: the first call leaves nothing out
+    {
+        fgFmtChange = true;
+        _fgBootUp = FALSE;
+    }
+    return { .fgFmtChange = fgFmtChange, .fgHdmiChange = fgHdmiChange, .fgTveChange = fgTveChange };
+}
+
 /* Route the fifth OSD plane to component and composite. */
-static void vRouteFifthOsd(const MODE_EX_T* pr)
+static void vRouteFifthOsd(const REQUEST_T* pr)
 {
     UCHAR ucCvbsMode = (UCHAR)pr->rCVBS.eResMode;
 
-    if ((pr->fgHDExist != 0 && fgPmxTveHd(pr->rCAV.eResMode) == 0) || pr->fgOSD5 == 2)
-        _i4Osd5Out(1, ucCvbsMode);
-    else if (pr->fgOSD5 == 1 || pr->fgHDExist != 0)
-        _i4Osd5Out_CVBSOnly(1, ucCvbsMode);
+    if ((pr->fgHDExist && !fgPmxTveHd(pr->rCAV.eResMode)) || pr->fgOSD5 == 2)
+        _i4Osd5Out(TRUE, ucCvbsMode);
+    else if (pr->fgOSD5 == 1 || pr->fgHDExist)
+        _i4Osd5Out_CVBSOnly(TRUE, ucCvbsMode);
     else
-        _i4Osd5Out(0, ucCvbsMode);
+        _i4Osd5Out(FALSE, ucCvbsMode);
 }
 
-static void vSetTvEncoderFormat(UINT32 u4Tve, const OUTPUT_T* prOutput, const MODE_EX_T* pr, const CHAR* szExpected)
+static void vSetTvEncoderFormat(UINT32 u4Tve, const OUTPUT_T* prOutput, const REQUEST_T* pr, const CHAR* szExpected)
 {
     if (TVE_SetFmtEx(u4Tve, pr->ucFmtMode, pr->ucVFreq, (UCHAR)prOutput->eResMode, prOutput->fgOutputEnable,
                      pr->fgHDExist, pr->fgOSD5) != TVE_SET_OK)
@@ -134,7 +155,7 @@ static void vSetTvEncoderFormat(UINT32 u4Tve, const OUTPUT_T* prOutput, const MO
 }
 
 /* Route the fifth OSD plane and set both TV encoders. */
-static void vSetTvEncoders(const MODE_EX_T* pr)
+static void vSetTvEncoders(const REQUEST_T* pr)
 {
     vRouteFifthOsd(pr);
     vSetTvEncoderFormat(
@@ -155,66 +176,83 @@ static bool fgIsNtsc(UCHAR ucVFreq)
     return ucVFreq == 60 || ucVFreq == 30 || ucVFreq == 29 || ucVFreq == 23 || ucVFreq == 0;
 }
 
-static void vApplyFullChange(const MODE_EX_T* pr, PMX_SET_HDMI_RES_PARAMETER_T* prResData)
+/* What HDMI is told. The driver gets every byte of the record: those without a name, and the two fields that are not
+ * this operation's, are 0. */
+static void vFillResData(PMX_SET_HDMI_RES_PARAMETER_T* prResData, const REQUEST_T* pr)
+{
+    const PMX_RESOLUTION_T* prCCIR = &pr->prOutConf[PMX_OUTPUT_CCIR];
+
+    memset(prResData, 0, sizeof *prResData);
+    prResData->ucHdmiOutDisplayResolution = (UINT8)pr->rHDMI.eResMode;
+    prResData->ucFmtOutResolution = pr->ucFmtMode;
+    prResData->ucCCIROutResolution = pr->ucFmtMode;
+    prResData->ucHdmiOutMode = (UINT8)pr->rDrvExtScl;
+    prResData->eCcirDrvInfo = prCCIR->eCcirDrvInfo;
+    prResData->fgOsdMsg = pr->fgOSD5;
+    prResData->fgCCIROutEnable = prCCIR->fgOutputEnable;
+    prResData->fgHdmiOutEnable = pr->rHDMI.fgOutputEnable;
+}
+
+static void vApplyFullChange(const REQUEST_T* pr)
 {
     const PMX_CONF_T* prConf = prPmxConf();
 
-    if (_PmxTestOsd == 0)
+    if (_PmxTestOsd == FALSE)
     {
         PMX_IsLog(1, "PMX Start to set OSD Display mode:%d.\n", pr->ucFmtMode);
         OSD_BASE_SetDisplayMode(pr->ucFmtMode);
         PMX_IsLog(1, "PMX Finished to set OSD Display mode.\n");
     }
-    TVE_SetBlackScreen(TVE_1, 0);
-    TVE_SetBlackScreen(TVE_2, 0);
-    fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, prResData, 1);
-    fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, prResData, 1);
+    TVE_SetBlackScreen(TVE_1, FALSE);
+    TVE_SetBlackScreen(TVE_2, FALSE);
+    PMX_SET_HDMI_RES_PARAMETER_T stResData;
+    vFillResData(&stResData, pr);
+    fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, &stResData, 1);
+    fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, &stResData, 1);
     PMX_HalSetMode(0, pr->ucFmtMode);
     if (pr->fgOSD5 == 0) // else the scaler stays in its mode
         PMX_HalSetScalerMode(prConf->ucMode);
     PMX_IsLog(9, "Adjust PMX_ColorSpaceSetup call sequence.\n");
     PMX_ColorSpaceSetup(prConf->eMasterColorSpace, prConf->ucMode); // one-mode setting does this before the modes
-    VDP_SetTvFormat(pr->ucFmtMode, 1);
+    VDP_SetTvFormat(pr->ucFmtMode, TRUE);
     vPmxChooseTvType(fgIsNtsc(pr->ucVFreq));
     vSetTvEncoders(pr);
     PMX_HalScalerReset(0);
     vPostChgRes(pr->ucFmtMode);
-    vPmxFinishModeChange(prResData);
+    vPmxFinishModeChange(&stResData);
 }
 
-static void vApplySameFormat(const MODE_EX_T* pr, PMX_SET_HDMI_RES_PARAMETER_T* prResData)
+static void vApplySameFormat(const REQUEST_T* pr, bool fgHdmiChange, bool fgTveChange)
 {
-    if (pr->fgHdmiChange != 0)
+    PMX_SET_HDMI_RES_PARAMETER_T stResData;
+    vFillResData(&stResData, pr);
+    if (fgHdmiChange)
     {
-        fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, prResData, 1);
-        fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, prResData, 1);
+        fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, &stResData, 1);
+        fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, &stResData, 1);
     }
-    if (pr->fgTveChange != 0)
+    if (fgTveChange)
         vSetTvEncoders(pr);
-    if (pr->fgHdmiChange != 0)
-        fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, prResData, 1);
-    VDP_SetTvFormat(pr->ucFmtMode, 0);
-    if (pr->fgHdmiChange == 0)
+    if (fgHdmiChange)
+        fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, &stResData, 1);
+    VDP_SetTvFormat(pr->ucFmtMode, FALSE);
+    if (!fgHdmiChange)
         vSendAvdNotifyScomResChgOK();
     PMX_HalScalerReset(0);
 }
 
-/* Decide whether graphics wait. Nobody is waited for without a sink, or when neither this call nor one whose timer
- * still runs sent an HDMI change. */
-static void vWaitForDisplayPart(BOOL fgHdmiExist)
+/* Nobody is waited for without a sink, or when neither this call nor one whose timer still runs sent an HDMI change. */
+static bool fgDisplayPartAnswers(bool fgHdmiExist)
 {
-    bool fgAnswers = (fgHdmiExist != 0 || prPmxStatus()->fgTimerAlreadySet != FALSE) && i4GetHotPlugStatus() == 1;
-    if (!fgAnswers)
-    {
-        PMX_IsLog(0, "[PMX] fgHdmiExist:%d, Not wait display part...\n", fgHdmiExist);
-        PMX_SetFormatChangeFlag(FALSE);
-    }
-    if (fgPMX_DisplayModeReady() != 0)
-        return;
+    return (fgHdmiExist || prPmxStatus()->fgTimerAlreadySet != FALSE) && i4GetHotPlugStatus() == 1;
+}
 
+/* Take graphics out of the picture until the display part, or the timer, brings them back. */
+static void vHoldGraphicsBack(void)
+{
     PMX_IsLog(0, "[PMX] VDP_SetClearVideo & Not Mix OSD..\n");
-    VDP_SetClearVideo(0, 0, 0x80, 0x80);
-    for (UCHAR ucPlane = DRV_PMX_PLANE_3; ucPlane <= DRV_PMX_PLANE_7; ucPlane++)
+    VDP_SetClearVideo(0, 0, 0x80, 0x80); // black
+    for (UCHAR ucPlane = PMX_OSD_PLANE_FIRST; ucPlane <= PMX_OSD_PLANE_LAST; ucPlane++)
         vPmxNotMixPlane(0, ucPlane);
     PMX_SetFormatChangeTimer(DISPLAY_PART_TIMEOUT_MS);
     prPmxStatus()->fgTimerAlreadySet = TRUE;
@@ -226,8 +264,12 @@ UINT32 PMX_SetModeEx(UCHAR ucPmxId, PMX_RESOLUTION_T* prOutConf, UCHAR ucVFreq, 
     if (ucPmxId != 0 || prOutConf == nullptr)
         return 0;
 
-    vLogRequest(prOutConf, fgOSD5);
-    UCHAR ucFmtMode = ucChooseFormat(prOutConf);
+    // Read once: the video PLL sleeps further down, and the caller may have other plans by then.
+    PMX_RESOLUTION_T arOutConf[PMX_OUTPUT_NUM];
+    memcpy(arOutConf, prOutConf, sizeof arOutConf);
+
+    vLogRequest(arOutConf, fgOSD5);
+    UCHAR ucFmtMode = ucChooseFormat(arOutConf);
     if (PMX_CheckCap(0, ucFmtMode) == 0)
     {
         // The text speaks of setting the flag; it is lowered: a refused request starts nothing to wait for.
@@ -236,38 +278,36 @@ UINT32 PMX_SetModeEx(UCHAR ucPmxId, PMX_RESOLUTION_T* prOutConf, UCHAR ucVFreq, 
         return 0;
     }
 
-    MODE_EX_T rCall;
-    rCall.ucFmtMode = ucFmtMode;
-    rCall.ucVFreq = ucVFreq;
-    rCall.fgOSD5 = fgOSD5;
-    rCall.fgHDExist = fgPmxTveHd(ucFmtMode);
-    rCall.rHDMI = rAsRun(&prOutConf[PMX_OUTPUT_HDMI], ucFmtMode);
-    rCall.rCAV = rAsRun(&prOutConf[PMX_OUTPUT_CAV], ucFmtMode);
-    rCall.rCVBS = rAsRun(&prOutConf[PMX_OUTPUT_CVBS], ucFmtMode);
-    PMX_SET_HDMI_RES_PARAMETER_T stResData = {
-        .u1ScaleMode = 0,
-        .ucHdmiOutDisplayResolution = (UINT8)rCall.rHDMI.eResMode,
-        .ucFmtOutResolution = ucFmtMode,
-        .ucCCIROutResolution = ucFmtMode,
-        .ucHdmiOutMode = (UINT8)rDrvExtScl,
-        .eCcirDrvInfo = prOutConf[PMX_OUTPUT_CCIR].eCcirDrvInfo,
-        .fgOsdMsg = fgOSD5,
-        .ucCCIROutMode = 0,
-        .fgCCIROutEnable = prOutConf[PMX_OUTPUT_CCIR].fgOutputEnable,
-        .fgHdmiOutEnable = rCall.rHDMI.fgOutputEnable,
-        .u2_Vfreq = 0,
+    const REQUEST_T rRequest = {
+        .prOutConf = arOutConf,
+        .rDrvExtScl = rDrvExtScl,
+        .ucVFreq = ucVFreq,
+        .fgOSD5 = fgOSD5,
+        .ucFmtMode = ucFmtMode,
+        .fgHDExist = fgPmxTveHd(ucFmtMode),
+        .rHDMI = rAsRun(&arOutConf[PMX_OUTPUT_HDMI], ucFmtMode),
+        .rCAV = rAsRun(&arOutConf[PMX_OUTPUT_CAV], ucFmtMode),
+        .rCVBS = rAsRun(&arOutConf[PMX_OUTPUT_CVBS], ucFmtMode),
     };
+    if (prPmxConf()->ucVfreq != ucVFreq) // a new format at the old frequency leaves the video PLL
+        vSetPLLGP_HDMIDDS(ucFmtMode);
+    const CHANGES_T rChanges = rFindChangesAndStore(&rRequest);
 
-    vFindChanges(&rCall, prOutConf, rDrvExtScl);
-    PMX_IsLog(9, "HD Exist(%d)\n", rCall.fgHDExist);
-    TVE_SetMuteCtrol(rCall.fgFmtChange, (UCHAR)rCall.rCAV.eResMode, (UCHAR)rCall.rCVBS.eResMode, rCall.fgHDExist,
-                     fgOSD5);
-    if (rCall.fgFmtChange != 0)
-        vApplyFullChange(&rCall, &stResData);
+    PMX_IsLog(9, "HD Exist(%d)\n", rRequest.fgHDExist);
+    TVE_SetMuteCtrol(rChanges.fgFmtChange, (UCHAR)rRequest.rCAV.eResMode, (UCHAR)rRequest.rCVBS.eResMode,
+                     rRequest.fgHDExist, fgOSD5);
+    if (rChanges.fgFmtChange)
+        vApplyFullChange(&rRequest);
     else
-        vApplySameFormat(&rCall, &stResData);
+        vApplySameFormat(&rRequest, rChanges.fgHdmiChange, rChanges.fgTveChange);
 
-    // Both ways of applying send HDMI a resolution change exactly then.
-    vWaitForDisplayPart(rCall.fgFmtChange != 0 || rCall.fgHdmiChange != 0);
+    bool fgHdmiExist = rChanges.fgFmtChange || rChanges.fgHdmiChange; // HDMI was sent a resolution change
+    if (!fgDisplayPartAnswers(fgHdmiExist))
+    {
+        PMX_IsLog(0, "[PMX] fgHdmiExist:%d, Not wait display part...\n", fgHdmiExist);
+        PMX_SetFormatChangeFlag(FALSE);
+    }
+    if (fgPMX_DisplayModeReady() == FALSE)
+        vHoldGraphicsBack();
     return 1;
 }

@@ -218,8 +218,8 @@ PMX_API INT32 i4PmxSetMode(void* pvTag, UCHAR ucMode, UCHAR ucVFreq, BOOL fgOSD5
  *  is checked: what the other outputs were given goes to their drivers unchecked, cut to 8 bits.
  *  @param ucPmxId     mixer id, 0
  *  @param prOutConf   four outputs, indexed PMX_OUTPUT_CCIR to PMX_OUTPUT_CVBS; fgOutputEnable and eResMode of each are
- *                     used, and eCcirDrvInfo of PMX_OUTPUT_CCIR; u4VFreq is not. Nobody changes it until the call
- *                     returns
+ *                     used, and eCcirDrvInfo of PMX_OUTPUT_CCIR; u4VFreq is not. Read once, before the first log line:
+ *                     what becomes of it afterwards changes nothing
  *  @param ucVFreq     vertical frequency of all outputs in Hz: 60, 30, 29, 23 and 0 select NTSC, any other PAL
  *  @param rDrvExtScl  how the external chip is used; a change programs everything
  *  @param fgOSD5      fifth OSD plane asked for on the analogue outputs: 0 no, 1 composite, 2 both. An HD mixer format

@@ -166,13 +166,14 @@ UINT32 PMX_DecideMasterColorSpace(UCHAR ucPmxId)
     return 1;
 }
 
+/* The plane is told what the master colour space is when it is called: a source may have changed it since the line. */
 static void vInformVdp(UINT16 u2CompType, UINT16 u2CompId)
 {
-    DRV_PMX_COLOR_SPACE_T eColorSpace = prPmxConf()->eMasterColorSpace;
+    const PMX_CONF_T* prConf = prPmxConf();
     void* pvIf = nullptr;
     void* pvTag = nullptr;
 
-    PMX_IsLog(8, "Inform Vdp CS(%d)\n", (INT32)eColorSpace);
+    PMX_IsLog(8, "Inform Vdp CS(%d)\n", (INT32)prConf->eMasterColorSpace);
     if (i4ImQueryInterface(u2CompType, u2CompId, IID_IVdp, &pvIf, &pvTag) < 0)
     {
         PMX_IsLog(5, "Query VDP Interface Fail!\n");
@@ -180,7 +181,7 @@ static void vInformVdp(UINT16 u2CompType, UINT16 u2CompId)
         return; // nothing was obtained that could be called or given back
     }
     const IVdp* piVdp = (const IVdp*)pvIf;
-    piVdp->pu4SetColorMode(pvTag, eColorSpace);
+    piVdp->pu4SetColorMode(pvTag, prConf->eMasterColorSpace);
     i4ImReleaseInterface(u2CompType, u2CompId, IID_IVdp, pvTag);
 }
 

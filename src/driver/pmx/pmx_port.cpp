@@ -26,37 +26,50 @@ UINT32 u4PmxCompId2LocalId(UINT16 u2CompType, UINT16 u2CompId)
     return PMX_PORT_NUM;
 }
 
-/* Connecting and disconnecting differ in one trace and in what they store. Neither asks what the port holds: the last
- * call counts, and the master colour space waits for the next decision. */
-static UINT32 u4ChangePort(UINT16 u2ThisCompId, UINT16 u2CompType, UINT16 u2CompId, bool fgConnect)
+/* The port that a component changes; null when there is no such port, or no such mixer. The source events look at it
+ * without the mutex: whoever changes it writes field by field, in the order that stands there. */
+static volatile PMX_PORT_INFO_T* prPortToChange(UINT16 u2ThisCompId, UINT32 u4LocalId)
 {
-    vPmxLock();
-    UINT32 u4LocalId = u4PmxCompId2LocalId(u2CompType, u2CompId);
-    PMX_IsLog(8, "Tp,Id=%d,%d\n", u2CompType, u2CompId);
-    PMX_IsLog(8, fgConnect ? "Comp(%d) connect\n" : "Comp(%d) disconnect\n", (INT32)u4LocalId);
-
-    UINT32 u4Result = PMX_NO_SUCH_PORT;
-    if (u4LocalId < PMX_PORT_NUM && u2ThisCompId == 0)
-    {
-        PMX_PORT_INFO_T* prPort = &prPmxConf()->arPortInfo[u4LocalId];
-        prPort->fgConnected = fgConnect;
-        prPort->u2CompType = fgConnect ? u2CompType : 0;
-        prPort->u2CompId = fgConnect ? u2CompId : 0;
-        if (!fgConnect) // a source that is connected anew is as enabled as it was
-            prPort->fgEnabled = 0;
-        u4Result = PMX_PORT_DONE;
-    }
-
-    vPmxUnlock();
-    return u4Result;
+    if (u2ThisCompId != 0 || u4LocalId >= PMX_PORT_NUM)
+        return nullptr;
+    return &prPmxConf()->arPortInfo[u4LocalId];
 }
 
+/* Whoever is connected already is replaced. A source that comes back is as enabled as it was. */
 UINT32 i4Pmx_Connect(UINT16, UINT16 u2ThisCompId, UINT16 u2UpstreamCompType, UINT16 u2UpstreamCompId)
 {
-    return u4ChangePort(u2ThisCompId, u2UpstreamCompType, u2UpstreamCompId, true);
+    vPmxLock();
+    UINT32 u4LocalId = u4PmxCompId2LocalId(u2UpstreamCompType, u2UpstreamCompId);
+    PMX_IsLog(8, "Tp,Id=%d,%d\n", u2UpstreamCompType, u2UpstreamCompId);
+    PMX_IsLog(8, "Comp(%d) connect\n", (INT32)u4LocalId);
+
+    volatile PMX_PORT_INFO_T* prPort = prPortToChange(u2ThisCompId, u4LocalId);
+    if (prPort != nullptr)
+    {
+        prPort->fgConnected = TRUE;
+        prPort->u2CompType = u2UpstreamCompType;
+        prPort->u2CompId = u2UpstreamCompId;
+    }
+    vPmxUnlock();
+    return prPort != nullptr ? PMX_PORT_DONE : PMX_NO_SUCH_PORT;
 }
 
+/* Whoever is connected there is cleared, named or not. The master colour space waits for the next decision. */
 UINT32 i4Pmx_Disconnect(UINT16, UINT16 u2ThisCompId, UINT16 u2UpstreamCompType, UINT16 u2UpstreamCompId)
 {
-    return u4ChangePort(u2ThisCompId, u2UpstreamCompType, u2UpstreamCompId, false);
+    vPmxLock();
+    UINT32 u4LocalId = u4PmxCompId2LocalId(u2UpstreamCompType, u2UpstreamCompId);
+    PMX_IsLog(8, "Tp,Id=%d,%d\n", u2UpstreamCompType, u2UpstreamCompId);
+    PMX_IsLog(8, "Comp(%d) disconnect\n", (INT32)u4LocalId);
+
+    volatile PMX_PORT_INFO_T* prPort = prPortToChange(u2ThisCompId, u4LocalId);
+    if (prPort != nullptr)
+    {
+        prPort->fgConnected = FALSE;
+        prPort->u2CompType = 0;
+        prPort->u2CompId = 0;
+        prPort->fgEnabled = FALSE;
+    }
+    vPmxUnlock();
+    return prPort != nullptr ? PMX_PORT_DONE : PMX_NO_SUCH_PORT;
 }

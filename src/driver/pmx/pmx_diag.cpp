@@ -41,44 +41,41 @@ static constexpr const CHAR* EXT_CHIP_NAMES[] = { "DRV_NON_EXT_CHIP", "DRV_EXT_S
 #define REPORT_RES_LATE RES_2D_640x480HZ
 static constexpr const CHAR* RES_LATE_NAMES[] = { "RES_PANEL_AUO_B089AW01", "RES_MODE_NUM", "RES_AUTO" };
 
-/* The lines of the digital port differ in their blanks from value to value. */
-#define CCIR_INFO "[PMX]PMX(%d,) _arPmxConf[%d].arOutputConf[%d].eCcirDrvInfo."
-static constexpr const CHAR* F1 = CCIR_INFO "eDgiFmt(%s) \n ";
-static constexpr const CHAR* F2 = CCIR_INFO "eDgiFmt(%s)  \n";
-static constexpr const CHAR* F3 = CCIR_INFO "eDgiFmt(%s) \n";
-static constexpr const CHAR* G1 = CCIR_INFO "eDgoFmt(%s) \n ";
-static constexpr const CHAR* G2 = CCIR_INFO "eDgoFmt(%s)  \n";
-static constexpr const CHAR* M1 = CCIR_INFO "eDgiMode(%s) \n ";
-static constexpr const CHAR* M2 = CCIR_INFO "eDgiMode(%s)  \n";
-static constexpr const CHAR* N1 = CCIR_INFO "eDgoMode(%s) \n ";
-static constexpr const CHAR* N2 = CCIR_INFO "eDgoMode(%s)  \n";
-#undef CCIR_INFO
+/* The lines of the digital port's set-up, from value to value with other blanks at their ends. */
+#define CCIR_LINE(szField, szEnd) "[PMX]PMX(%d,) _arPmxConf[%d].arOutputConf[%d].eCcirDrvInfo." szField "(%s)" szEnd
 
 typedef struct
 {
     const CHAR* szName;
-    const CHAR* szInput;  // the line that shows it as the port's input
+    const CHAR* szInput;  // the line that shows the value as the port's input
     const CHAR* szOutput; // and as its output
 } CCIR_TEXT_T;
 
+// clang-format off
 static constexpr CCIR_TEXT_T CCIR_FORMAT_TEXTS[] = {
-    { "CCIR_NON_USED", F1, G1 },    { "CCIR_YCMIX_8BIT", F2, G2 },  { "CCIR_YCMIX_10BIT", F2, G2 },
-    { "CCIR_YCMIX_12BIT", F2, F2 }, // the output's format is labelled as the input's
-    { "CCIR_YC422_16BIT", F2, G2 }, { "CCIR_YC422_20BIT", F3, G2 }, { "CCIR_YC422_24BIT", F2, G1 },
-    { "CCIR_YC444_24BIT", F2, G1 }, { "CCIR_YC444_30BIT", F2, G2 }, { "CCIR_YC444_36BIT", F1, G2 },
+    { "CCIR_NON_USED",    CCIR_LINE("eDgiFmt", " \n "), CCIR_LINE("eDgoFmt", " \n ") },
+    { "CCIR_YCMIX_8BIT",  CCIR_LINE("eDgiFmt", "  \n"), CCIR_LINE("eDgoFmt", "  \n") },
+    { "CCIR_YCMIX_10BIT", CCIR_LINE("eDgiFmt", "  \n"), CCIR_LINE("eDgoFmt", "  \n") },
+    { "CCIR_YCMIX_12BIT", CCIR_LINE("eDgiFmt", "  \n"), CCIR_LINE("eDgiFmt", "  \n") }, // labelled as the input twice
+    { "CCIR_YC422_16BIT", CCIR_LINE("eDgiFmt", "  \n"), CCIR_LINE("eDgoFmt", "  \n") },
+    { "CCIR_YC422_20BIT", CCIR_LINE("eDgiFmt", " \n"),  CCIR_LINE("eDgoFmt", "  \n") },
+    { "CCIR_YC422_24BIT", CCIR_LINE("eDgiFmt", "  \n"), CCIR_LINE("eDgoFmt", " \n ") },
+    { "CCIR_YC444_24BIT", CCIR_LINE("eDgiFmt", "  \n"), CCIR_LINE("eDgoFmt", " \n ") },
+    { "CCIR_YC444_30BIT", CCIR_LINE("eDgiFmt", "  \n"), CCIR_LINE("eDgoFmt", "  \n") },
+    { "CCIR_YC444_36BIT", CCIR_LINE("eDgiFmt", " \n "), CCIR_LINE("eDgoFmt", "  \n") },
 };
 
 static constexpr CCIR_TEXT_T CCIR_MODE_TEXTS[] = {
-    { "CCIR_INVALID", M1, N1 },
-    { "CCIR_601_MODE", M2, N1 },
-    { "CCIR_656_MODE", M2, N2 },
+    { "CCIR_INVALID",  CCIR_LINE("eDgiMode", " \n "), CCIR_LINE("eDgoMode", " \n ") },
+    { "CCIR_601_MODE", CCIR_LINE("eDgiMode", "  \n"), CCIR_LINE("eDgoMode", " \n ") },
+    { "CCIR_656_MODE", CCIR_LINE("eDgiMode", "  \n"), CCIR_LINE("eDgoMode", "  \n") },
 };
+// clang-format on
 
-static void vReportCcir(INT32 i, const CCIR_TEXT_T* prTexts, UINT32 u4TextNum, UINT32 u4Value,
-                        const CHAR* CCIR_TEXT_T::*szLine)
+/* The texts of a value; null for one behind the end of its list. */
+static const CCIR_TEXT_T* prCcirText(const CCIR_TEXT_T* prTexts, UINT32 u4TextNum, UINT32 u4Value)
 {
-    if (u4Value < u4TextNum)
-        PMX_IS_LOG_TEXT(0, prTexts[u4Value].*szLine, 0, 0, i, prTexts[u4Value].szName);
+    return u4Value < u4TextNum ? &prTexts[u4Value] : nullptr;
 }
 
 static void vReportRecord(const PMX_CONF_T* prConf)
@@ -150,10 +147,18 @@ static void vReportOutput(INT32 i, const PMX_RESOLUTION_T* prOutput)
         PMX_IsLog(0, "[PMX] PMX(%d ), _arPmxConf[%d].arOutputConf[%d].eResMode(%s)\n", 0, 0, i, szRes);
 
     const CCIR_DRV_INFO_T* prCcir = &prOutput->eCcirDrvInfo;
-    vReportCcir(i, CCIR_FORMAT_TEXTS, COUNT_OF(CCIR_FORMAT_TEXTS), prCcir->eDgiFmt, &CCIR_TEXT_T::szInput);
-    vReportCcir(i, CCIR_MODE_TEXTS, COUNT_OF(CCIR_MODE_TEXTS), prCcir->eDgiMode, &CCIR_TEXT_T::szInput);
-    vReportCcir(i, CCIR_FORMAT_TEXTS, COUNT_OF(CCIR_FORMAT_TEXTS), prCcir->eDgoFmt, &CCIR_TEXT_T::szOutput);
-    vReportCcir(i, CCIR_MODE_TEXTS, COUNT_OF(CCIR_MODE_TEXTS), prCcir->eDgoMode, &CCIR_TEXT_T::szOutput);
+    const CCIR_TEXT_T* prText = prCcirText(CCIR_FORMAT_TEXTS, COUNT_OF(CCIR_FORMAT_TEXTS), prCcir->eDgiFmt);
+    if (prText != nullptr)
+        PMX_IS_LOG_TEXT(0, prText->szInput, 0, 0, i, prText->szName);
+    prText = prCcirText(CCIR_MODE_TEXTS, COUNT_OF(CCIR_MODE_TEXTS), prCcir->eDgiMode);
+    if (prText != nullptr)
+        PMX_IS_LOG_TEXT(0, prText->szInput, 0, 0, i, prText->szName);
+    prText = prCcirText(CCIR_FORMAT_TEXTS, COUNT_OF(CCIR_FORMAT_TEXTS), prCcir->eDgoFmt);
+    if (prText != nullptr)
+        PMX_IS_LOG_TEXT(0, prText->szOutput, 0, 0, i, prText->szName);
+    prText = prCcirText(CCIR_MODE_TEXTS, COUNT_OF(CCIR_MODE_TEXTS), prCcir->eDgoMode);
+    if (prText != nullptr)
+        PMX_IS_LOG_TEXT(0, prText->szOutput, 0, 0, i, prText->szName);
 }
 
 void PMX_QueryStatus(void)

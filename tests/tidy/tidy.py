@@ -36,6 +36,8 @@ NOT_IN_THE_LAYER = [
     (re.compile(r"\b(malloc|calloc|realloc|free)\s*\("), "allocates"),
     (re.compile(r"\bstd::"), "is the hosted library"),
     (re.compile(r"\bswitch\s*\([^)]*(?<!Swap)Mode[^)]*\)"), "decides by mode: facts of modes stand in the mode table"),
+    (re.compile(r"(?<!&)\b_arPmxDispPartStatus\s*\."),
+     "is read or stored: the timer's context shares it, so that goes through prPmxStatus"),
     (re.compile(r"^[ \t]*#\s*include\s*<(?!stddef\.h>|stdarg\.h>|linux/)[^>]*>", re.M),
      "is a header of neither the compiler nor the kernel"),
 ]

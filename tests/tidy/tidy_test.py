@@ -96,7 +96,8 @@ class Tidy(unittest.TestCase):
 
     def test_what_the_layer_does_without(self):
         for code in ("class A;", "int* p = new int;", "throw 1;", "virtual void f();", "template <int N> int f();",
-                     "void* p = malloc(1);", "std::size_t z;", "#include <cstring>"):
+                     "void* p = malloc(1);", "std::size_t z;", "#include <cstring>",
+                     "BOOL fg = _arPmxDispPartStatus.fgTimerAlreadySet;"):
             self.refused("src/driver/pmx/a.cpp:1: ", "src/driver/pmx/a.cpp", code + "\n")
         self.refused("decides by mode", "src/driver/pmx/a.cpp", "void f()\n{\n    switch (ucMode)\n    {\n    }\n}\n")
         self.accepted("src/driver/pmx/a.c", "#include <linux/export.h>\n")

@@ -1,0 +1,162 @@
+/* Where everything stands in an image: the state's objects in the order of the record's layout, the caller's memory
+ * behind them. */
+#include <cstdlib>
+#include <cstring>
+#include <iostream>
+#include <string>
+
+#include "tests/lockstep/lockstep.h"
+
+#include "drv_if_pmx.h"
+#include "tools/record_view/record_layout.h"
+
+namespace lockstep
+{
+namespace
+{
+
+using record_view::Node;
+
+void add_fields(const Node& node, const std::string& name, std::size_t offset, std::vector<Field>& fields)
+{
+    if (node.form == Node::Form::Number || node.form == Node::Form::Pointer)
+    {
+        fields.push_back({ name, offset, node.size });
+        return;
+    }
+    for (std::size_t i = 0; i < node.children.size(); ++i)
+    {
+        const Node& child = node.children[i];
+        const std::string below = node.form == Node::Form::List ? name + "[" + std::to_string(i) + "]"
+                                  : name.empty()                ? child.name
+                                                                : name + "." + child.name;
+        add_fields(child, below, offset + child.offset, fields);
+    }
+}
+
+struct Layout
+{
+    std::vector<Field> fields;
+    std::size_t caller = 0;
+};
+
+const Layout& layout()
+{
+    static const Layout made = [] {
+        Layout layout;
+        for (const record_view::Object& object : record_view::objects())
+        {
+            const bool is_variable = object.group == "module";
+            const std::string name = is_variable ? object.symbol : object.group == "record" ? "" : object.symbol;
+            add_fields(object.node, name, layout.caller, layout.fields);
+            layout.caller = (layout.caller + object.node.size + 7) / 8 * 8;
+        }
+        return layout;
+    }();
+    return made;
+}
+
+std::vector<Field> outputs_array()
+{
+    std::vector<Field> fields;
+    const auto add = [&](std::size_t i, const char* field, std::size_t offset, std::size_t size) {
+        fields.push_back({ "prOutConf[" + std::to_string(i) + "]." + field,
+                           caller_offset() + i * sizeof(PMX_RESOLUTION_T) + offset, size });
+    };
+    for (std::size_t i = 0; i < PMX_OUTPUT_NUM; ++i)
+    {
+        const std::size_t info = offsetof(PMX_RESOLUTION_T, eCcirDrvInfo);
+        add(i, "fgOutputEnable", offsetof(PMX_RESOLUTION_T, fgOutputEnable), sizeof(BOOL));
+        add(i, "eResMode", offsetof(PMX_RESOLUTION_T, eResMode), 4);
+        add(i, "u4VFreq", offsetof(PMX_RESOLUTION_T, u4VFreq), 4);
+        add(i, "eCcirDrvInfo.eDgoMode", info + offsetof(CCIR_DRV_INFO_T, eDgoMode), 4);
+        add(i, "eCcirDrvInfo.eDgoFmt", info + offsetof(CCIR_DRV_INFO_T, eDgoFmt), 4);
+        add(i, "eCcirDrvInfo.eDgiMode", info + offsetof(CCIR_DRV_INFO_T, eDgiMode), 4);
+        add(i, "eCcirDrvInfo.eDgiFmt", info + offsetof(CCIR_DRV_INFO_T, eDgiFmt), 4);
+    }
+    return fields;
+}
+
+std::vector<Field> words_array()
+{
+    std::vector<Field> fields;
+    for (std::size_t i = 0; i < 8; ++i)
+        fields.push_back({ "pu4PlaneOrder[" + std::to_string(i) + "]", caller_offset() + 4 * i, 4 });
+    return fields;
+}
+
+static_assert(PMX_OUTPUT_NUM * sizeof(PMX_RESOLUTION_T) <= array_size);
+
+} // namespace
+
+const std::vector<Field>& state_fields()
+{
+    return layout().fields;
+}
+
+std::size_t caller_offset()
+{
+    return layout().caller;
+}
+
+std::size_t image_size()
+{
+    return layout().caller + caller_size;
+}
+
+const std::vector<Field>& array_fields(const Operation& operation)
+{
+    static const std::vector<Field> none;
+    static const std::vector<Field> outputs = outputs_array();
+    static const std::vector<Field> words = words_array();
+    for (unsigned i = 0; i < operation.function.count; ++i)
+    {
+        const Parameter& parameter = operation.function.parameters[i];
+        if (std::strcmp(parameter.kind, "data") == 0)
+            return std::strcmp(parameter.type, "PMX_RESOLUTION_T*") == 0 ? outputs : words;
+    }
+    return none;
+}
+
+std::string field_at(const Operation& operation, std::size_t offset)
+{
+    const std::string* before = nullptr;
+    for (const std::vector<Field>* fields : { &state_fields(), &array_fields(operation) })
+    {
+        for (const Field& field : *fields)
+        {
+            if (offset >= field.offset && offset < field.offset + field.size)
+                return field.name;
+            if (field.offset <= offset)
+                before = &field.name;
+        }
+    }
+    if (offset >= caller_offset() + array_size)
+        return offset < caller_offset() + array_size + place_size ? "the first result" : "the second result";
+    return "padding behind " + (before == nullptr ? std::string("nothing") : *before);
+}
+
+std::uint64_t get(const Image& image, const Field& field)
+{
+    std::uint64_t value = 0;
+    std::memcpy(&value, &image.at(field.offset), field.size);
+    return value;
+}
+
+void set(Image& image, const Field& field, std::uint64_t value)
+{
+    std::memcpy(&image.at(field.offset), &value, field.size);
+}
+
+unsigned operation_number(const std::string& name)
+{
+    for (unsigned i = 0; i < operation_count; ++i)
+    {
+        if (operations[i].function.name == name)
+            return i;
+    }
+    std::cerr << "there is no operation " << name << '\n';
+    std::exit(2);
+}
+
+} // namespace lockstep

@@ -21,29 +21,27 @@ RUN_BEFORE_MAIN = re.compile(r"^\.(preinit_array|init_array|fini_array|ctors|dto
 
 
 class List:
-    """One of the two lists: names that stand plain, are marked "- " (still to come) or "? " (may be there or not)."""
+    """One of the two lists: names that stand plain, or are marked "? " (may be there or not)."""
 
     def __init__(self, path):
         self.path = path
-        self.plain, self.to_come, self.optional = set(), set(), set()
+        self.plain, self.optional = set(), set()
         for number, line in enumerate(open(path, encoding="utf-8"), start=1):
             line = line.strip()
             if not line or line.startswith("#"):
                 continue
-            match = re.fullmatch(r"([-?] )?(\w+)", line)
+            match = re.fullmatch(r"(\? )?(\w+)", line)
             if not match:
                 sys.exit(f"{path}:{number}: neither a name nor a comment: {line}")
             mark, name = match.groups()
-            if name in self.plain | self.to_come | self.optional:
+            if name in self.plain | self.optional:
                 sys.exit(f"{path}:{number}: listed twice: {name}")
-            {None: self.plain, "- ": self.to_come, "? ": self.optional}[mark].add(name)
+            (self.optional if mark else self.plain).add(name)
 
     def compare(self, names, is_there, is_missing):
         """The complaints about the names of an object; the two texts say what "there" and "missing" mean."""
-        for name in sorted(names - self.plain - self.to_come - self.optional):
+        for name in sorted(names - self.plain - self.optional):
             yield f"{name}: {is_there}, but not listed in {self.path}"
-        for name in sorted(names & self.to_come):
-            yield f"{name}: {is_there}, but marked as still to come in {self.path}: take the mark away"
         for name in sorted(self.plain - names):
             yield f"{name}: {is_missing}, but listed in {self.path}"
 
@@ -128,8 +126,8 @@ def main():
     for complaint in found:
         print(f"{arguments.object}: {complaint}")
     if not found:
-        print(f"{arguments.object}: defines {len(defined_list.plain)} symbols, {len(defined_list.to_come)} still to "
-              f"come; needs {len(needed_list.plain)} platform functions, {len(needed_list.to_come)} not called yet")
+        print(f"{arguments.object}: defines {len(defined_list.plain)} symbols, "
+              f"needs {len(needed_list.plain)} platform functions")
     return 1 if found else 0
 
 

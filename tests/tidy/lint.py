@@ -19,11 +19,32 @@ ROOT = pathlib.Path(__file__).resolve().parents[2]
 RULES = [ROOT / ".clang-tidy", ROOT / "tests/.clang-tidy", pathlib.Path(__file__)]
 
 
-def compiled_sources(build):
-    """{source: object} of every file of the project that is compiled; a generated file is nobody's to clean up."""
+# How the build has a source include what it precompiled; clang-tidy reads the header itself.
+PRECOMPILED = re.compile(r" -Winvalid-pch| -fpch-preprocess| -include (\S+/cmake_pch\.hxx)\b")
+
+
+def commands_of(build):
+    """How the build compiles every file of the project; a generated file is nobody's to clean up."""
     commands = json.loads((build / "compile_commands.json").read_text(encoding="utf-8"))
-    return {pathlib.Path(command["file"]): re.search(r" -o (\S+)", command["command"]).group(1) for command in commands
-            if not pathlib.Path(command["file"]).is_relative_to(build)}
+    return [command for command in commands if not pathlib.Path(command["file"]).is_relative_to(build)]
+
+
+def sources_of(commands, build):
+    """{source: the project's files that it was last made from, itself not among them}."""
+    made_from, sources = dependencies(build), {}
+    for command in commands:
+        read = set(made_from.get(re.search(r" -o (\S+)", command["command"])[1], ()))
+        for match in PRECOMPILED.finditer(command["command"]):
+            if match[1]:
+                read |= made_from.get(f"{pathlib.Path(match[1]).relative_to(build)}.gch", set())
+        sources[pathlib.Path(command["file"])] = read
+    return sources
+
+
+def write_commands(commands, directory):
+    directory.mkdir(exist_ok=True)
+    written = [{**command, "command": PRECOMPILED.sub("", command["command"])} for command in commands]
+    (directory / "compile_commands.json").write_text(json.dumps(written, indent=1), encoding="utf-8")
 
 
 def dependencies(build):
@@ -47,7 +68,7 @@ def fingerprint(files):
 
 
 def lint(build, source):
-    result = subprocess.run(["clang-tidy", "--quiet", "-p", build, source], capture_output=True, text=True, check=False)
+    result = subprocess.run(["clang-tidy", "--quiet", "-p", build / "lint", source], capture_output=True, text=True, check=False)
     noise = re.compile(r"^\d+ warnings? (generated|treated).*\n", re.M)
     return result.returncode == 0, result.stdout + noise.sub("", result.stderr)
 
@@ -56,13 +77,14 @@ def main():
     build = pathlib.Path(sys.argv[1]).resolve()
     jobs = int(sys.argv[2]) if len(sys.argv) > 2 else os.cpu_count()
 
-    sources, made_from = compiled_sources(build), dependencies(build)
-    if not sources:
+    commands = commands_of(build)
+    if not commands:
         sys.exit(f"{build}: compiles no files of the project")
+    sources = sources_of(commands, build)
+    write_commands(commands, build / "lint")
     passed_file = build / "lint-passed.json"
     passed = json.loads(passed_file.read_text(encoding="utf-8")) if passed_file.exists() else {}
-    marks = {str(source): fingerprint({source, *made_from.get(output, ()), *RULES})
-             for source, output in sources.items()}
+    marks = {str(source): fingerprint({source, *read, *RULES}) for source, read in sources.items()}
     to_do = [source for source in sources if passed.get(str(source)) != marks[str(source)]]
 
     failures = 0

@@ -23,9 +23,9 @@ class ListSuites(unittest.TestCase):
                 list_suites.suites(listing)
 
     def test_registration(self):
-        text = list_suites.registration("/b/tests", "layer", "/s", "60", ["A=1", "B=x y"], LISTING)
+        text = list_suites.registration("/b/tests", "layer", "/s", "60", "*/1", ["A=1", "B=x y"], LISTING)
         self.assertIn("add_test([==[layer.Modes]==] [==[/b/tests]==] --gtest_brief=1 "
-                      "[==[--gtest_filter=Modes.*:*/Modes.*]==])", text)
+                      "[==[--gtest_filter=Modes.*:*/Modes.*-*/1]==])", text)
         self.assertIn("ENVIRONMENT [==[A=1;B=x y]==]", text)
         self.assertEqual(2, text.count("add_test("))
 

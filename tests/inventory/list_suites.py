@@ -2,7 +2,9 @@
 """Writes a ctest file that registers each suite of a test program as one test: a process for each case takes several
 times as long as the cases.
 
-usage: list_suites.py PROGRAM PREFIX DIRECTORY TIMEOUT OUTPUT [ENVIRONMENT...]
+usage: list_suites.py PROGRAM PREFIX DIRECTORY TIMEOUT OUTPUT EXCEPT [ENVIRONMENT...]
+
+EXCEPT are patterns of cases that are not run, as GoogleTest's filter has them; it may be empty.
 """
 
 import pathlib
@@ -36,11 +38,11 @@ def quoted(text):
     return f"[==[{text}]==]"
 
 
-def registration(program, prefix, directory, timeout, environment, listing):
+def registration(program, prefix, directory, timeout, left_out, environment, listing):
     lines = []
     for suite, cases in suites(listing).items():
         name = quoted(f"{prefix}.{suite}")
-        pattern = f"--gtest_filter={suite}.*:*/{suite}.*"
+        pattern = f"--gtest_filter={suite}.*:*/{suite}.*" + (f"-{left_out}" if left_out else "")
         lines += [f"add_test({name} {quoted(program)} --gtest_brief=1 {quoted(pattern)})",
                   f"set_tests_properties({name} PROPERTIES WORKING_DIRECTORY {quoted(directory)} TIMEOUT {timeout} "
                   f"ENVIRONMENT {quoted(';'.join(environment))})"]
@@ -48,12 +50,12 @@ def registration(program, prefix, directory, timeout, environment, listing):
 
 
 def main():
-    program, prefix, directory, timeout, output, *environment = sys.argv[1:]
+    program, prefix, directory, timeout, output, left_out, *environment = sys.argv[1:]
     listed = subprocess.run([program, "--gtest_list_tests"], capture_output=True, text=True, check=False)
     if listed.returncode != 0:
         sys.exit(f"{program} cannot list its cases: {listed.stderr}")
     try:
-        text = registration(program, prefix, directory, timeout, environment, listed.stdout)
+        text = registration(program, prefix, directory, timeout, left_out, environment, listed.stdout)
     except Unreadable as error:
         sys.exit(f"{program}: {error}")
     pathlib.Path(output).write_text(text, encoding="utf-8")

@@ -1,4 +1,5 @@
-// The display part of the stack: raises and lowers the mixer's format-change flag, after a set time or never.
+// The display part, which switches the sink: raises and lowers the mixer's format-change flag, after a set time or
+// never.
 #include "board/display_part.h"
 
 #include <stdexcept>

@@ -350,7 +350,7 @@ TEST_F(Mixer, GetPlaneOrder_ThatCannotBe_WritesNothing)
     EXPECT_EQ("PMX_HalGetPlaneOrder(0, <unchanged>) = -1", last_call());
 }
 
-/** Planes carry their names in the trace: the numbers in the names count from 1. */
+/** Planes carry their names in the trace, in which plane 0 is called 1. */
 std::string plane_name(unsigned plane)
 {
     return "DRV_PMX_PLANE_" + std::to_string(plane + 1);

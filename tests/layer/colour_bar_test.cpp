@@ -1,4 +1,4 @@
-/** The test colour bar, and the swap of planes 1 and 2 that it suspends. */
+/** The colour bar, and what it does to planes 1 and 2 while they are swapped. */
 #include "tests/support/layer_fixture.h"
 
 class ColourBar : public LayerTest

@@ -1,4 +1,4 @@
-/** The colour conversions behind the mixer and on the path through the scaler. */
+/** The two colour converters: the mixer's and the scaler's. */
 #include "pmx_hal.h"
 #include "tests/layer/one_mode.h"
 #include "tests/support/layer_fixture.h"

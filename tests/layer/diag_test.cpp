@@ -1,4 +1,4 @@
-// PMX_Printf: the module's own formatted print, gated by the bits of PMX_debug_level.
+// PMX_Printf prints what a bit of PMX_debug_level lets through.
 
 #include <climits>
 #include <string>

@@ -1,4 +1,4 @@
-/** The video planes are told the master colour space. */
+/** Telling the video planes the master colour space. */
 #include "drv_if.h"
 #include "tests/layer/source_events.h"
 #include "u_os.h"
@@ -93,7 +93,7 @@ TEST_F(InformVdp, InformVdpColorSpace_Port1_TheComponentThatIsConnectedThere)
 
 TEST_F(InformVdp, InformVdpColorSpace_TheWholeStoredComponentIsTheKey)
 {
-    // The port was found by the low 8 bits of the id; the table is fetched by the id as connected.
+    // The port was found by 8 bits of the id; the table is fetched by the id as connected.
     constexpr Plane wide{ PMX_COMP_TYPE_VDP, 0x0100, 0x6100 };
     connect(wide);
     PMX_InformVdpColorSpace(0);

@@ -1,4 +1,4 @@
-/** The decision of the master colour space, over all that it may depend on. */
+/** How the master colour space is chosen, over all that it may depend on. */
 #include <array>
 #include <optional>
 

@@ -1,4 +1,4 @@
-/** The decision of the master colour space: rule by rule, and its announcement. */
+/** How the master colour space is chosen: rule by rule, and its announcement. */
 #include "tests/layer/source_events.h"
 
 using source_events::announce;

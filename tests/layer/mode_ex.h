@@ -85,7 +85,7 @@ inline std::string hdmi_change(const Sent& sent)
     return avd("PMX_SET_HDMI_RES_CHG", sent);
 }
 
-/** The format-change flag is lowered while the video plane driver waits for nothing. */
+/** What lowering the flag does while the video plane driver waits for nothing. */
 inline constexpr const char* lowered = R"(
     LOG0 "Display Format Change :0.\n"
     LOG0 "Set Osd Enable :1.\n"

@@ -21,7 +21,7 @@ struct OutputState
     bool operator==(const OutputState&) const = default;
 };
 
-/** What the operation is asked for; outputs in the order digital port, HDMI, component, composite. */
+/** What the operation is asked for; outputs by PMX_OUTPUT_CCIR to PMX_OUTPUT_CVBS. */
 struct Wanted
 {
     std::array<OutputState, 4> outputs;

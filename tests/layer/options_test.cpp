@@ -1,4 +1,4 @@
-/** Switches that are passed straight on: digital port's source, composite's set-up and PAL-60, media type; and the 2D
+/** Switches that others act on: digital port's source, composite's set-up and PAL-60, media type; and the 2D
  *  smoothing flag. */
 #include <string>
 

@@ -1,4 +1,4 @@
-/** The first video plane above or below the second. */
+/** Which of the two video planes lies above the other. */
 #include "board/video_planes.h"
 #include "pmx_hal.h"
 #include "tests/support/layer_fixture.h"

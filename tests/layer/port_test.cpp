@@ -13,7 +13,7 @@ constexpr UINT32 no_such_port = 0xF1000002;
 constexpr UINT16 vdp = 0x41;
 constexpr UINT16 osd = 0xB0;
 
-/** The ports by component type and the low 8 bits of the id; 8: none. */
+/** The ports by component type and id, of which 8 bits count; 8: none. */
 unsigned port_of(unsigned type, unsigned id)
 {
     const unsigned low = id & 0xFF;

@@ -22,7 +22,7 @@ inline constexpr std::uint8_t osd_planes = 0x7C;
 /** What of layer and board decides how the handshake goes on. */
 struct State
 {
-    bool flag = false;      ///< F: the display part is switching format
+    bool flag = false;      ///< F: raised by the display part and not lowered yet
     bool owed = false;      ///< E: the OSD planes are owed their return to the mix
     bool timer_set = false; ///< T: the layer takes its timer for armed
     bool armed = false;     ///< the display timer is running

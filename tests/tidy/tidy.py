@@ -22,7 +22,8 @@ NOT_OURS = {".git", "build", "__pycache__", ".cache"}
 # The brackets keep these patterns from finding themselves.
 UNFINISHED = re.compile(r"\b(T[O]DO|F[I]XME|X[X]X|H[A]CK)\b")
 OUT_OF_PLACE = re.compile(
-    r"\bsp[e]c(ification)?s?\b|\bP[a]rts? \d|\bissue[s]? #?\d|/w[o]rk/|/t[m]p/|\bsh[a]red/|/h[o]me/", re.I)
+    r"\bsp[e]c(ification)?s?\b|\br[e]quirements?\b|\bP[a]rts? \d|\bissue[s]? #?\d"
+    r"|/w[o]rk/|/t[m]p/|\bsh[a]red/|/h[o]me/", re.I)
 
 # A line that ends in a semicolon is code when it has an operator or a bracket and no four words of prose in a row.
 COMMENTED_OUT = re.compile(

@@ -64,10 +64,11 @@ class Tidy(unittest.TestCase):
     def test_wording(self):
         for word in ("TO" "DO", "FIX" "ME"):
             self.refused("unfinished", "a.txt", f"a {word} here\n")
-        for word in ("the sp" "ec says", "Sp" "ecification", "Part" " 1.2", "issue" " 2", "/tm" "p/x", "share" "d/x"):
+        for word in ("the sp" "ec says", "Sp" "ecification", "a req" "uirement", "Req" "uirements", "Part" " 1.2",
+                     "issue" " 2", "/tm" "p/x", "share" "d/x"):
             self.refused("out of place here", "a.txt", f"a {word}\n")
         self.refused("the file's name", "sp" "ec.txt", "word\n")
-        self.accepted("a.txt", "a special specifier, a part of it, an issue with it\n")
+        self.accepted("a.txt", "a special specifier, a part of it, an issue with it, it requires and is required\n")
 
     def test_commented_out_code(self):
         for comment in ("// x = 1;", "// return;", "// if (x)", "// }", "/* x(); */", "//#include <x>",

@@ -136,7 +136,8 @@ INT32 x_vsnprintf(CHAR* szBuffer, size_t zSize, const CHAR* szFormat, va_list rA
 /** Levelled console print: prints when the console's level admits i4Level.
  *  A null string argument is printed as (null).
  *  @param i4Level   0 status report, warnings, handshake; 1 life cycle and display-mode progress; 5 errors; 8 source
- *                   and plane events, refusals; 9 detailed trace and interface-manager failures
+ *                   and plane events, refusals; 9 whatever else helps to follow the layer, and what the interface
+ *                   manager refuses
  *  @param szFormat  printf format
  *  @context any, the timer's included */
 void PMX_IsLog(INT32 i4Level, const CHAR* szFormat, ...)
@@ -351,7 +352,7 @@ void PMX_HalSetTvType(UCHAR ucPmxId, UCHAR ucTvType)
     (void)ucTvType;
 }
 
-/** Switch a clock of the mixer. Must be callable in the kernel's power-management context.
+/** Switch a clock of the mixer. Power management calls it too, on suspend and resume.
  *  @param u4ClockId  0 or 2
  *  @param u4On       1 on, 0 off */
 void PMX_HalClockSet(UINT32 u4ClockId, UINT32 u4On)
@@ -442,7 +443,7 @@ BOOL fgPmxHalMixPlane(UCHAR ucPmxId, UCHAR ucPlane)
     return 0;
 }
 
-/** Let the two video planes trade mixer planes 1 and 2, or undo it.
+/** Swap planes 1 and 2, and with them the two video planes, or undo it.
  *  @param ucPmxId  mixer id
  *  @param u4Swap   0 undo, anything else swap */
 void PMX_HalSwapPlane1_2(UCHAR ucPmxId, UINT32 u4Swap)
@@ -590,7 +591,7 @@ void PMX_HalSetScaler709601(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucDirection)
     (void)ucDirection;
 }
 
-/** Set the active zone for a resolution mode.
+/** Fit the active zone to a resolution mode.
  *  @param ucPmxId  mixer id
  *  @param ucMode   a PMX_RESOLUTION_MODE_T value; any other may come and must do no harm */
 void PMX_HalSetActiveZone(UCHAR ucPmxId, UCHAR ucMode)
@@ -744,7 +745,7 @@ void PMX_VsyncDisable(void)
  *  @param ucVFreq      vertical frequency in Hz
  *  @param ucTargetFmt  the output's resolution mode; any other value may come and must do no harm
  *  @param fgEnable     the output is on
- *  @param fgHD         the mixer runs an HD format
+ *  @param fgHD         the mixer's format is an HD one
  *  @param fgOSD5       routing of the fifth OSD plane: 0, 1 or 2; any other value may come and must do no harm
  *  @return TVE_SET_OK, anything else is a failure */
 UINT32 TVE_SetFmtEx(UINT32 u4Tve, UCHAR ucMainFmt, UCHAR ucVFreq, UCHAR ucTargetFmt, BOOL fgEnable, BOOL fgHD,
@@ -773,7 +774,7 @@ void TVE_SetEnable(UINT32 u4Tve, BOOL fgEnable)
  *  @param fgFmtChange  the mixer's format changes
  *  @param ucCavFmt     component's resolution mode; any other value may come and must do no harm
  *  @param ucCvbsFmt    composite's resolution mode; any other value may come and must do no harm
- *  @param fgHD         the mixer runs an HD format
+ *  @param fgHD         the mixer's format is an HD one
  *  @param fgOSD5       routing of the fifth OSD plane: 0, 1 or 2; any other value may come and must do no harm */
 void TVE_SetMuteCtrol(BOOL fgFmtChange, UCHAR ucCavFmt, UCHAR ucCvbsFmt, BOOL fgHD, UINT8 fgOSD5)
 {
@@ -927,8 +928,8 @@ void VDP_EnableCC(BOOL fgEnable)
     (void)fgEnable;
 }
 
-/** Ask whether the driver still waits for its sync control after a change. Asked in the timer's context too. After
- *  TRUE, somebody in the stack calls PMX_SetOsdEnable once it turns FALSE: until then graphics stay out of the mix.
+/** Ask whether a change still waits for the planes' sync control. Asked in the timer's context too. After TRUE,
+ *  somebody in the stack calls PMX_SetOsdEnable once it turns FALSE: until then graphics stay out of the mix.
  *  @return TRUE or FALSE
  *  @context any thread, and the timer's */
 BOOL fgVdpIsWaitforSyncCtrl(void)
@@ -946,7 +947,7 @@ void OSD_BASE_SetDisplayMode(UCHAR ucMode)
     (void)ucMode;
 }
 
-/** Tell the OSD driver that the resolution change is complete. */
+/** Tell the OSD driver that a mode setting has come to its end. */
 void OSD_BASE_SetFlag_PMXChangeResDone(void)
 {
 }

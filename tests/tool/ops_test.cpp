@@ -100,9 +100,9 @@ TEST(Ops, OneText_InFull)
 Store and program the TV type.
 
   ucPmxId   mixer id, 0 [0 to 255]
-  ucTvType  PMX_TV_TYPE_NTSC or PMX_TV_TYPE_PAL; any other is stored and
-            forwarded as given [0 to 255, or a name: PMX_TV_TYPE_NTSC,
-            PMX_TV_TYPE_PAL]
+  ucTvType  PMX_TV_TYPE_NTSC or PMX_TV_TYPE_PAL; any other goes into the record
+            and to the hardware unchanged [0 to 255, or a name:
+            PMX_TV_TYPE_NTSC, PMX_TV_TYPE_PAL]
 
 Returns  PMX_SET_OK; 0 for a mixer id other than 0
 Called   from any thread that may sleep; takes no lock
@@ -119,7 +119,7 @@ TEST(Ops, List_HasEveryOperationIn80Columns)
     const std::string list = show({}).out;
     for (const Operation& operation : operations())
         EXPECT_THAT(list, HasSubstr("\n  " + operation.name + " "));
-    EXPECT_TRUE(list.starts_with("Start-up, reset, shut-down, power\n  PMX_Init ")) << list.substr(0, 80);
+    EXPECT_TRUE(list.starts_with("Life cycle and power\n  PMX_Init ")) << list.substr(0, 80);
     EXPECT_EQ(std::string::npos, list.find("TVE_SetEnable "));
     std::istringstream lines(list);
     for (std::string line; std::getline(lines, line);)

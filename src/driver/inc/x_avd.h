@@ -5,7 +5,7 @@
 
 #include "x_typedef.h"
 
-/** Colour format that the HDMI transmitter sends; one byte in PMX_CHG_HDMI_COLOR_SPACE. */
+/** Colour formats of the HDMI signal; one byte in PMX_CHG_HDMI_COLOR_SPACE. */
 typedef DRV_ENUM(HDMI_COLOR_SPACE_T)
 {
     HDMI_RGB = 0,

@@ -5,7 +5,7 @@
 
 #include "x_typedef.h"
 
-/** Colour format of the digital picture (parallel port and HDMI). */
+/** Colour formats of digital port and HDMI (parallel port and HDMI). */
 typedef DRV_ENUM(PLA_MXR_DIGITAL_OUTPUT_FMT_T)
 {
     PLA_MXR_DIGITAL_OUTPUT_FMT_YBR = 0,

@@ -53,10 +53,10 @@ typedef DRV_ENUM(PMX_AVD_QUERY_T)
 DRV_STATIC_ASSERT(sizeof(PMX_AVD_COMMAND_T) == 4, "enumerations are 32 bits wide");
 DRV_STATIC_ASSERT(sizeof(PMX_AVD_QUERY_T) == 4, "enumerations are 32 bits wide");
 
-/** Resolution, PLL and digital-port commands. Resolutions are PMX_RESOLUTION_MODE_T values. One-mode setting leaves
- *  eCcirDrvInfo, fgOsdMsg and fgCCIROutEnable 0. Per-output mode setting checks the mixer's format alone: in the fields
- *  of HDMI, of the external chip, of the port's set-up and of the fifth OSD plane any other value may come, which must
- *  do no harm. */
+/** What goes with the commands for resolution, PLL and digital port. Resolutions are PMX_RESOLUTION_MODE_T values.
+ *  One-mode setting leaves eCcirDrvInfo, fgOsdMsg and fgCCIROutEnable 0. Per-output mode setting checks the mixer's
+ *  format alone: in the fields of HDMI, of the external chip, of the port's set-up and of the fifth OSD plane any other
+ *  value may come, which must do no harm. */
 typedef struct
 {
     UINT8 u1ScaleMode;
@@ -76,7 +76,7 @@ typedef struct
 typedef struct
 {
     UINT16 u2_Vfreq;   /**< vertical frequency in Hz */
-    BOOL fgAutoEnable; /**< the TV system follows the sink */
+    BOOL fgAutoEnable; /**< the sink decides, not the user */
 } PMX_SET_TV_SYS_PARAMETER_T;
 
 /** Valid-resolution query. */

@@ -174,19 +174,19 @@ typedef struct
 typedef struct
 {
     HANDLE_T hPMXTimer;         /**< the display timer, made by PMX_Init */
-    BOOL fgPmxFormatChangeFlag; /**< the display part is switching format */
+    BOOL fgPmxFormatChangeFlag; /**< raised and lowered by the display part: it changes the output's format */
     BOOL fgPmxEnabeOsdFlag;     /**< OSD planes wait for their return to the mix; kept spelt so */
     BOOL fgTimerAlreadySet;     /**< per-output mode setting armed the timer, which has not expired */
 } PMX_DISPLAY_PART_STATUS_T;
 
 /** Component types at the interface manager and of the components that feed the mixer. */
-#define PMX_COMP_TYPE_VDP 0x41 /**< video plane of the video plane driver */
+#define PMX_COMP_TYPE_VDP 0x41 /**< a plane of the video plane driver */
 #define PMX_COMP_TYPE_PMX 66   /**< the mixer itself, id 0 */
-#define PMX_COMP_TYPE_OSD 0xB0 /**< OSD plane of the OSD driver */
+#define PMX_COMP_TYPE_OSD 0xB0 /**< a plane of the OSD driver */
 
-/** What the mixer offers to other drivers through the interface manager (IID_IPMX). Each function takes first the tag
- *  that came with the table: the mixer's component id carried in the pointer. It returns what the PMX_ function of the
- *  same task in drv_pmx.h returns; the four source events are inert and return 1. */
+/** The mixer's own table at the interface manager (IID_IPMX). Each function takes first the tag that came with the
+ *  table: the mixer's component id carried in the pointer. It returns what the PMX_ function of the same task in
+ *  drv_pmx.h returns; the four source events are inert and return 1. */
 typedef struct
 {
     INT32 (*pi4SetMode)(void* pvTag, UCHAR ucMode, UCHAR ucVFreq, BOOL fgOSD5);

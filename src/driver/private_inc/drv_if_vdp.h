@@ -1,5 +1,5 @@
 /** @file
- *  A video plane's interface table, fetched from the interface manager under IID_IVdp. */
+ *  What a video plane can be told through the interface manager (IID_IVdp). */
 #ifndef DRV_IF_VDP_H
 #define DRV_IF_VDP_H
 

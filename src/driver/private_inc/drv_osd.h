@@ -1,6 +1,5 @@
 /** @file
- *  OSD driver and display control: what the mixer tells them. All functions run on the caller's thread, which may
- *  sleep. */
+ *  OSD driver and display control: what the mixer tells them. Called on threads that may sleep. */
 #ifndef DRV_OSD_H
 #define DRV_OSD_H
 
@@ -15,7 +14,7 @@ extern "C" {
  *  @param ucMode  a PMX_RESOLUTION_MODE_T value */
 void OSD_BASE_SetDisplayMode(UCHAR ucMode);
 
-/** Tell the OSD driver that the resolution change is complete. */
+/** Tell the OSD driver that a mode setting has come to its end. */
 void OSD_BASE_SetFlag_PMXChangeResDone(void);
 
 /** Tell the OSD driver the mixer's colour space.

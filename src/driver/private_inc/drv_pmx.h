@@ -1,11 +1,11 @@
 /** @file
  *  The mixer layer: every function that it offers, with its contract. This is the header that a caller includes.
  *
- *  One mixer exists, id 0. Unless its contract says otherwise a function returns 1 on success and 0 on failure, and a
- *  function that failed has changed nothing. An id that goes unchecked is taken for mixer 0.
+ *  One mixer exists, id 0. Unless its contract says otherwise a function answers 1 when it has done its work, and 0
+ *  when it has refused to and changed nothing. An id that goes unchecked is taken for mixer 0.
  *  Pointers are tested for null where the contract says so, and only there.
  *
- *  Functions i4Pmx… behind the IPMX table take a tag whose low 8 bits are the mixer id. */
+ *  Functions i4Pmx… behind the IPMX table find the mixer id in the low 8 bits of their tag. */
 #ifndef DRV_PMX_H
 #define DRV_PMX_H
 
@@ -24,9 +24,9 @@ extern "C" {
 #define PMX_TV_TYPE_NTSC 0
 #define PMX_TV_TYPE_PAL 3
 
-/* Start-up, reset, shut-down, power */
+/* Life cycle and power */
 
-/** Start the layer: create its mutex and timer, reset record and hardware to the defaults, register the IPMX table and
+/** Start the layer: create its mutex and timer, load record and hardware with the defaults, register the IPMX table and
  *  the power-management operations. Only logs when it has been started already. A failing operating-system call is
  *  reported by Assert and start-up goes on.
  *  @context the framework's thread, with no other mixer call running; sleeps */
@@ -46,7 +46,7 @@ PMX_API void PMX_Reset(UCHAR ucPmxId);
  *  @context the framework's thread, with no other mixer call running; sleeps */
 PMX_API void PMX_Uninit(void);
 
-/** Shut the layer down for a caller that wants a result. Unlike PMX_Uninit it leaves power management registered,
+/** Shut the layer down, and tell how that went. Unlike PMX_Uninit it leaves power management registered,
  *  deletes the mutex only if there is one, and reports its failed deletion by the result instead of Assert; MutexPMX
  *  then keeps its handle. A timer that cannot be deleted is reported by Assert, a table that cannot be withdrawn in the
  *  log. Whatever fails, the layer counts as not started afterwards: a second call deletes nothing, and returns 0.
@@ -55,9 +55,9 @@ PMX_API void PMX_Uninit(void);
  *  @context the framework's thread, with no other mixer call running; sleeps */
 PMX_API INT32 i4PMX_Uninit(UINT32 u4Case);
 
-/** Stop vertical-sync handling and mark the layer as not started. Mutex, timer, registration and power management stay
- *  as they are; a later shut-down does nothing, a later PMX_Init creates and registers everything once more, and nobody
- *  gives the former mutex and timer back.
+/** Stop vertical-sync handling and mark the layer as not started. Nothing else is undone: shutting down finds nothing
+ *  to do from then on, and another PMX_Init makes a second mutex and timer beside the first, which nobody gives back,
+ *  and registers table and power management again.
  *  @context the framework's thread, with no other mixer call running */
 PMX_API void PMX_Stop(void);
 
@@ -143,7 +143,7 @@ PMX_API INT32 i4PmxDisableVideoPlane(void* pvTag, UCHAR ucVdpId);
 
 /* Boot resolution, video PLL, TV type */
 
-/** Read the boot resolution that the boot loader left in the partition "fast_init_param".
+/** Read the boot resolution from the partition "fast_init_param", where a boot loader leaves it.
  *  @return the low byte of the partition's first word, a PMX_RESOLUTION_MODE_T value that nobody has validated;
  *          RES_480I when the partition is missing or cannot be read
  *  @context a thread that may sleep */
@@ -156,7 +156,7 @@ PMX_API void vSetPLLGP_HDMIDDS(BYTE bResIndex);
 
 /** Store and program the TV type.
  *  @param ucPmxId   mixer id, 0
- *  @param ucTvType  PMX_TV_TYPE_NTSC or PMX_TV_TYPE_PAL; any other is stored and forwarded as given
+ *  @param ucTvType  PMX_TV_TYPE_NTSC or PMX_TV_TYPE_PAL; any other goes into the record and to the hardware unchanged
  *  @return PMX_SET_OK; 0 for a mixer id other than 0
  *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetTvType(UCHAR ucPmxId, UCHAR ucTvType);
@@ -343,7 +343,7 @@ PMX_API BOOL fgPmxFmtHDOutput(UCHAR ucPmxId);
 /** Tell the HDMI/AV driver the TV system chosen by the user.
  *  @param ucPmxId      mixer id, 0
  *  @param u2VSyncFreq  vertical frequency in Hz: 50, 60, 24, 30 or 25
- *  @param fgTvSysAuto  the TV system follows the sink
+ *  @param fgTvSysAuto  the sink decides, not the user
  *  @return 1, whatever the driver answers; 0 for a mixer id other than 0 or another frequency
  *  @context a thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetTVSystem(UCHAR ucPmxId, UINT16 u2VSyncFreq, BOOL fgTvSysAuto);
@@ -388,8 +388,8 @@ PMX_API UINT32 PMX_SetBg(UCHAR ucPmxId, UINT32 u4BgColor);
  *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetPlaneOrderArray(UCHAR ucPmxId, const UINT32* pu4PlaneOrder);
 
-/** Put one plane at one position. It is not removed from where it stood: a caller that moves a plane writes both
- *  positions.
+/** Put one plane at one position. It is not removed from where it stood: moving a plane takes two calls, one for each
+ *  position.
  *  @param ucPmxId       mixer id, 0
  *  @param ucVdpId       plane id
  *  @param ucPlaneOrder  position 0 to 7
@@ -405,9 +405,9 @@ PMX_API UINT32 PMX_SetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR ucPlaneOrde
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR* pucPlaneOrder);
 
-/** Put the first video plane above or below the second by the hardware's swap of planes 1 and 2. The second mixer plane
- *  is put into the mix if the video plane that now sits there is enabled or hidden, else taken out of it. The choice
- *  outlives a reset of the record.
+/** Choose which of the two video planes is on top, by the hardware's swap of planes 1 and 2. The second mixer plane is
+ *  then mixed exactly if the video plane that has come there is enabled or hidden. The choice outlives a reset of the
+ *  record.
  *  @param ucPmxId  mixer id, handed on unchecked
  *  @param u4OnTop  0 below, anything else above; stored unchanged, and the colour bar looks for 1 and nothing else
  *  @return 1
@@ -472,7 +472,7 @@ PMX_API UINT32 PMX_GetArbPlaneOrder(UCHAR ucPmxId, UINT32* pu4PlaneOrder);
  *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetSwapEnable(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucSwapMode);
 
-/** Read one swap from the hardware.
+/** Ask the hardware whether two planes are swapped.
  *  @param ucPmxId     mixer id, 0
  *  @param pucEnable   receives TRUE or FALSE; not tested for null, not written for an unknown swap mode
  *  @param ucSwapMode  as for PMX_SetSwapEnable
@@ -508,7 +508,7 @@ PMX_API UINT32 PMX_SetMuteEnable(UCHAR ucPmxId, UCHAR ucEnable);
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetMuteEnable(UCHAR ucPmxId, UCHAR* pucEnable);
 
-/** Set the hardware's active zone for a resolution mode.
+/** Fit the hardware's active zone to a resolution mode.
  *  @param ucPmxId  mixer id, handed on unchecked
  *  @param ucMode   a PMX_RESOLUTION_MODE_T value, handed on unchecked
  *  @return 1
@@ -530,7 +530,7 @@ PMX_API UINT32 PMX_SetDelay(UCHAR ucVdoId, UCHAR ucADJ_F, UINT16 u2HDelay, UINT1
 #define PMX_PORT_DONE 0x71000000u
 #define PMX_NO_SUCH_PORT 0xF1000002u
 
-/** Find the input port of an upstream component. An unknown type is logged, an id out of range is not.
+/** Find the input port of an upstream component. A type that has no ports is logged, an id beyond them is not.
  *  @param u2CompType  PMX_COMP_TYPE_VDP or PMX_COMP_TYPE_OSD
  *  @param u2CompId    its id; the low 8 bits count: video planes 0 (port 0) and 1 to 3 (port 1), OSD planes 0 to 5
  *                     (ports 2 to 7)
@@ -571,9 +571,9 @@ PMX_API UINT32 i4Pmx_Disconnect(UINT16 u2ThisCompType, UINT16 u2ThisCompId, UINT
  *  @param ucVdpId      0 main video, 1 second video, 2 still-picture background (always BT.601), 3
  *  @param i4SrcWidth   pixels; above 720 the source is BT.709
  *  @param i4SrcHeight  lines; above 576 the source is BT.709
- *  @param ucLumaKey    luma key; planes 1 to 3 count for the master colour space only with one, and while the hardware
- *                      mixes plane 1
- *  @return 1; 0 for a plane without a port or on a port that is not connected, and then nothing has changed
+ *  @param ucLumaKey    luma key; planes 1 to 3 have a say in the master colour space only with one, and while the
+ *                      hardware mixes plane 1
+ *  @return 1; 0 for a plane without a port or with one that nobody connected, and then nothing has changed
  *  @context a thread that may sleep, outside MutexPMX, which a change of the master colour space takes */
 PMX_API UINT32 PMX_VdpEnabled(UCHAR ucPmxId, UCHAR ucVdpId, INT32 i4SrcWidth, INT32 i4SrcHeight, UCHAR ucLumaKey);
 
@@ -604,7 +604,7 @@ PMX_API UINT32 PMX_OsdEnabled(UCHAR ucPmxId, UCHAR ucOsdId, INT32 i4SrcWidth, IN
  *  @context a thread that may sleep, outside MutexPMX, which a change of the master colour space takes */
 PMX_API UINT32 PMX_OsdDisabled(UCHAR ucPmxId, UCHAR ucOsdId);
 
-/** Decide the master colour space over all enabled sources and announce a change: YCbCr graphics before the second
+/** Choose the master colour space anew from what is enabled, and announce a change: YCbCr graphics before the second
  *  video before the main video, among graphics the highest port; with nothing enabled it stays. The second video counts
  *  only with a luma key and while the hardware mixes it; RGB graphics never do; whether a port is connected does not
  *  matter.
@@ -958,7 +958,7 @@ PMX_API UINT32 PMX_SetDigitalOutPhase(UCHAR ucPmxId, UINT32 u4Phase);
  *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetDigitalOutDrv(UINT32 u4Drving);
 
-/** Set the colour format of the digital picture, on the port and on HDMI, at once.
+/** Choose between RGB and YCbCr for the digital picture, on the port and on HDMI, at once.
  *  @param ucPmxId  mixer id, 0
  *  @param ucRgb    a PLA_MXR_DIGITAL_OUTPUT_FMT_T value
  *  @return 1; 0 for a mixer id other than 0; 0 also for a value above 4, and then it has been stored and programmed,
@@ -966,7 +966,7 @@ PMX_API UINT32 PMX_SetDigitalOutDrv(UINT32 u4Drving);
  *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetDigitalOutRgb(UCHAR ucPmxId, UCHAR ucRgb);
 
-/** Read the colour format of the digital picture.
+/** Read the digital picture's colour format.
  *  @param ucPmxId  mixer id, 0
  *  @param pucRgb   receives the value last given
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
@@ -975,7 +975,7 @@ PMX_API UINT32 PMX_GetDigitalOutRgb(UCHAR ucPmxId, UCHAR* pucRgb);
 
 /* External chip, closed caption */
 
-/** Hand a picture-processing setting to the external chip; not stored.
+/** Set one of the external chip's picture controls; not stored.
  *  @param eSetType  a PLA_MXR_EXTERNAL_CHIP_SETTING_E value
  *  @param i4Value   its value; the chip takes the low 8 bits
  *  @return 1, whatever the driver answers; 0 for an unknown setting

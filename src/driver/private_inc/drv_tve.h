@@ -1,6 +1,6 @@
 /** @file
- *  TV encoder driver. Encoder 0 (TVE_1) drives component, encoder 1 (TVE_2) composite. All functions run on the
- *  caller's thread, which may sleep. */
+ *  TV encoder driver. Encoder 0 (TVE_1) drives component, encoder 1 (TVE_2) composite. Called on threads that may
+ *  sleep. */
 #ifndef DRV_TVE_H
 #define DRV_TVE_H
 
@@ -29,7 +29,7 @@ DRV_STATIC_ASSERT(sizeof(TVE_ASPECT_RATIO_T) == 4, "enumerations are 32 bits wid
  *  @param ucVFreq      vertical frequency in Hz
  *  @param ucTargetFmt  the output's resolution mode; any other value may come and must do no harm
  *  @param fgEnable     the output is on
- *  @param fgHD         the mixer runs an HD format
+ *  @param fgHD         the mixer's format is an HD one
  *  @param fgOSD5       routing of the fifth OSD plane: 0, 1 or 2; any other value may come and must do no harm
  *  @return TVE_SET_OK, anything else is a failure */
 UINT32 TVE_SetFmtEx(UINT32 u4Tve, UCHAR ucMainFmt, UCHAR ucVFreq, UCHAR ucTargetFmt, BOOL fgEnable, BOOL fgHD,
@@ -44,7 +44,7 @@ void TVE_SetEnable(UINT32 u4Tve, BOOL fgEnable);
  *  @param fgFmtChange  the mixer's format changes
  *  @param ucCavFmt     component's resolution mode; any other value may come and must do no harm
  *  @param ucCvbsFmt    composite's resolution mode; any other value may come and must do no harm
- *  @param fgHD         the mixer runs an HD format
+ *  @param fgHD         the mixer's format is an HD one
  *  @param fgOSD5       routing of the fifth OSD plane: 0, 1 or 2; any other value may come and must do no harm */
 void TVE_SetMuteCtrol(BOOL fgFmtChange, UCHAR ucCavFmt, UCHAR ucCvbsFmt, BOOL fgHD, UINT8 fgOSD5);
 

@@ -59,8 +59,8 @@ VDP_ENABLE_T VDP_GetHwEnable(UCHAR ucVdpId);
  *  @context a thread that may sleep */
 void VDP_EnableCC(BOOL fgEnable);
 
-/** Ask whether the driver still waits for its sync control after a change. Asked in the timer's context too. After
- *  TRUE, somebody in the stack calls PMX_SetOsdEnable once it turns FALSE: until then graphics stay out of the mix.
+/** Ask whether a change still waits for the planes' sync control. Asked in the timer's context too. After TRUE,
+ *  somebody in the stack calls PMX_SetOsdEnable once it turns FALSE: until then graphics stay out of the mix.
  *  @return TRUE or FALSE
  *  @context any thread, and the timer's */
 BOOL fgVdpIsWaitforSyncCtrl(void);

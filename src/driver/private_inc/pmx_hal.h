@@ -1,7 +1,7 @@
 /** @file
  *  Mixer hardware layer: what the mixer layer asks of the plane mixer, its scaler, colour converters, digital port and
- *  vertical-sync handling. No function here fails unless it says so. All run on the caller's thread; those that must
- *  also be callable from the timer's context say so. The only mixer is 0; where the mixer layer hands an id on as it
+ *  vertical-sync handling. No function here fails unless it says so. Called on threads; those that the timer's context
+ *  reaches as well say so. The only mixer is 0; where the mixer layer hands an id on as it
  *  was given (swap of planes 1 and 2 and its query, plane mixing, plane selectors, active zone), another id must do no
  *  harm. */
 #ifndef PMX_HAL_H
@@ -35,7 +35,7 @@ void PMX_HalScalerReset(UCHAR ucPmxId);
  *  @param ucTvType  0 60 Hz systems, 3 50 Hz systems; any other value may come and must do no harm */
 void PMX_HalSetTvType(UCHAR ucPmxId, UCHAR ucTvType);
 
-/** Switch a clock of the mixer. Must be callable in the kernel's power-management context.
+/** Switch a clock of the mixer. Power management calls it too, on suspend and resume.
  *  @param u4ClockId  0 or 2
  *  @param u4On       1 on, 0 off */
 void PMX_HalClockSet(UINT32 u4ClockId, UINT32 u4On);
@@ -86,7 +86,7 @@ void vPmxNotMixPlane(UCHAR ucPmxId, UCHAR ucPlane);
  *  @return TRUE or FALSE */
 BOOL fgPmxHalMixPlane(UCHAR ucPmxId, UCHAR ucPlane);
 
-/** Let the two video planes trade mixer planes 1 and 2, or undo it.
+/** Swap planes 1 and 2, and with them the two video planes, or undo it.
  *  @param ucPmxId  mixer id
  *  @param u4Swap   0 undo, anything else swap */
 void PMX_HalSwapPlane1_2(UCHAR ucPmxId, UINT32 u4Swap);
@@ -168,7 +168,7 @@ void PMX_HalSetCC_A(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucDirection);
  *  @param ucDirection  1 BT.709 to BT.601; 0 when off */
 void PMX_HalSetScaler709601(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucDirection);
 
-/** Set the active zone for a resolution mode.
+/** Fit the active zone to a resolution mode.
  *  @param ucPmxId  mixer id
  *  @param ucMode   a PMX_RESOLUTION_MODE_T value; any other may come and must do no harm */
 void PMX_HalSetActiveZone(UCHAR ucPmxId, UCHAR ucMode);

@@ -1,6 +1,6 @@
 /** @file
  *  Operating-system layer, console, flash partitions, register access and power management of the stack.
- *  Operating-system calls succeed with OSR_OK; any other value is a failure. */
+ *  OSR_OK is the one success of an operating-system call. */
 #ifndef U_OS_H
 #define U_OS_H
 
@@ -41,7 +41,7 @@ DRV_STATIC_ASSERT(sizeof(X_SEMA_TYPE_T) == 4, "enumerations are 32 bits wide");
 DRV_STATIC_ASSERT(sizeof(X_SEMA_OPTION_T) == 4, "enumerations are 32 bits wide");
 DRV_STATIC_ASSERT(sizeof(X_TIMER_FLAG_T) == 4, "enumerations are 32 bits wide");
 
-/** Expiry function of a timer; runs in the timer's context and must not sleep.
+/** Expiry function of a timer; called where nobody may sleep.
  *  @param hTimer  the timer that ran out
  *  @param pvArg   the argument given to x_timer_start */
 typedef void (*x_timer_cb_fct)(HANDLE_T hTimer, void* pvArg);
@@ -122,7 +122,8 @@ INT32 x_vsnprintf(CHAR* szBuffer, size_t zSize, const CHAR* szFormat, va_list rA
 /** Levelled console print: prints when the console's level admits i4Level.
  *  A null string argument is printed as (null).
  *  @param i4Level   0 status report, warnings, handshake; 1 life cycle and display-mode progress; 5 errors; 8 source
- *                   and plane events, refusals; 9 detailed trace and interface-manager failures
+ *                   and plane events, refusals; 9 whatever else helps to follow the layer, and what the interface
+ *                   manager refuses
  *  @param szFormat  printf format
  *  @context any, the timer's included */
 void PMX_IsLog(INT32 i4Level, const CHAR* szFormat, ...) DRV_PRINTF_FORMAT(2, 3);
@@ -172,8 +173,7 @@ UINT32 x_reg_read32(UINT32 u4Address);
  *  @context any */
 void x_reg_write32(UINT32 u4Address, UINT32 u4Value);
 
-/** Power-management operations of a driver. Both return 0 on success and run in the kernel's power-management
- *  context. */
+/** What the kernel calls when the system goes to sleep and wakes up; 0 is success. */
 typedef struct
 {
     int (*suspend)(void* param);

@@ -38,7 +38,7 @@ typedef signed char INT8;
 typedef unsigned short UINT16;
 typedef int INT32;
 typedef unsigned int UINT32;
-typedef unsigned int HANDLE_T; /**< object of the operating-system layer, 0 = none */
+typedef unsigned int HANDLE_T; /**< names an object of the operating-system layer; 0 names none */
 
 #ifndef TRUE
 #define TRUE 1

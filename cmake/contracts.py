@@ -14,7 +14,8 @@ sys.dont_write_bytecode = True
 
 from platform_functions import LAYER_HEADER, PLATFORM_HEADERS, ROOT, functions  # noqa: E402
 
-TAG = re.compile(r"^@(param|return|context)\b(?:\[\w+\])?\s*", re.MULTILINE)
+TAG = re.compile(r"^@(param|return|context)\b(?:\[([^\]]*)\])?\s*", re.MULTILINE)
+BEHIND = re.compile(r"\[([^\]]*)\]\s*")  # see pointers.py
 SECTION = re.compile(r"^/\* ((?:(?!\*/).)*)\*/", re.DOTALL | re.MULTILINE)
 CODE = r"`[a-z][a-z-]*(?: [^`]*)?`"
 ROW = re.compile(rf"^\| ({CODE}(?:, {CODE})*) \| (.*) \|$", re.MULTILINE)
@@ -31,7 +32,7 @@ def joined(text):
 
 
 def parts(comment):
-    """(brief, [(parameter, text)], result, context) of a contract."""
+    """(brief, [(parameter, text, direction, what stands behind it)], result, context) of a contract."""
     text = without_stars(comment)
     tags = list(TAG.finditer(text))
     ends = [tag.start() for tag in tags[1:]] + [len(text)]
@@ -40,7 +41,10 @@ def parts(comment):
         body = joined(text[tag.end():end])
         if tag[1] == "param":
             name, _, meaning = body.partition(" ")
-            parameters.append((name, meaning.strip()))
+            meaning = meaning.strip()
+            behind = BEHIND.match(meaning)
+            parameters.append((name, meaning[behind.end():] if behind else meaning, tag[2] or "",
+                               behind[1] if behind else ""))
         else:
             single[tag[1]] = body
     return joined(text[:tags[0].start()] if tags else text), parameters, single["return"], single["context"]
@@ -62,7 +66,7 @@ def rows(header):
     for function in functions(ROOT / header):
         brief, parameters, result, context = parts(function.contract)
         section = [title for line, title in heads if line < function.line][-1:] or [""]
-        listed = ", ".join(f"{{ {c_text(name)}, {c_text(text)} }}" for name, text in parameters)
+        listed = ", ".join(f"{{ {', '.join(map(c_text, parameter))} }}" for parameter in parameters)
         declaration = f"{function.result} {function.name}({function.declared})"
         texts = [function.name, declaration, pathlib.Path(header).name, section[0], brief, result, context]
         yield f"        {{ {', '.join(map(c_text, texts))}, {{ {listed} }} }},"

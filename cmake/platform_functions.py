@@ -4,7 +4,8 @@ with.
 
 usage: platform_functions.py OUTPUT     the table behind board::platform_functions()
 
-As a module: functions(path) yields what one header declares.
+As a module: functions(path) yields what one header declares, function_pointers(path) the types of functions that are
+called through a pointer.
 """
 
 import dataclasses
@@ -18,12 +19,21 @@ PLATFORM_HEADERS = ["src/system/inc/u_os.h"] + [f"src/driver/private_inc/{name}.
     "drv_if", "pmx_hal", "drv_tve", "drv_vdp", "drv_osd", "drv_av_d")]
 LAYER_HEADER = "src/driver/private_inc/drv_pmx.h"
 
+CONTRACT = r"(?:/\*\*(?!<)(?P<contract>(?:(?!\*/).)*)\*/\s*)?"  # right before it
+RESULT = r"(?P<result>(?:const\s+)?\w+(?:\s*\*+)?)"
 DECLARATION = re.compile(
-    r"""(?:/\*\*(?P<contract>(?:(?!\*/).)*)\*/\s*)?              # right before it
+    rf"""{CONTRACT}
         ^(?:PMX_API\s+)?
-        (?P<result>(?:const\s+)?\w+(?:\s*\*+)?)\s*\b(?P<name>\w+)
+        {RESULT}\s*\b(?P<name>\w+)
         \((?P<parameters>[^()]*)\)
         (?:\s*DRV_PRINTF_FORMAT\(\d+,\s*\d+\))?\s*;""",
+    re.DOTALL | re.MULTILINE | re.VERBOSE)
+FUNCTION_POINTER = re.compile(
+    rf"""{CONTRACT}
+        ^\s*(?P<typedef>typedef\s+)?
+        {RESULT}\s*\(\*(?P<name>\w+)\)
+        \((?P<parameters>[^()]*)\)\s*;
+        (?:[ ]*/\*\*<\s*as\s+(?P<model>\w+)\s*\*/)?""",
     re.DOTALL | re.MULTILINE | re.VERBOSE)
 LOOKS_LIKE_ONE = {"typedef", "return", "DRV_STATIC_ASSERT", "static_assert", "DRV_ENUM"}
 
@@ -39,6 +49,13 @@ class Function:
     line: int
 
 
+@dataclasses.dataclass(frozen=True)
+class FunctionPointer:
+    function: Function
+    is_type: bool  # a typedef; else a member of a table
+    model: str     # the function whose contract a member has, where the header names one
+
+
 def parameter_names(text):
     """The names of all parameters but the variable ones."""
     for parameter in text.split(","):
@@ -47,14 +64,25 @@ def parameter_names(text):
             yield match.group(1)
 
 
+def _function(match, text):
+    return Function(match["name"], match["result"] != "void", match["result"], " ".join(match["parameters"].split()),
+                    tuple(parameter_names(match["parameters"])), (match["contract"] or "").strip(),
+                    text.count("\n", 0, match.start("name")) + 1)
+
+
 def functions(path):
     """Every function that a header declares, in its order."""
     text = pathlib.Path(path).read_text(encoding="utf-8")
     for match in DECLARATION.finditer(text):
         if not {match["result"], match["name"]} & LOOKS_LIKE_ONE:
-            yield Function(match["name"], match["result"] != "void", match["result"],
-                           " ".join(match["parameters"].split()), tuple(parameter_names(match["parameters"])),
-                           (match["contract"] or "").strip(), text.count("\n", 0, match.start("name")) + 1)
+            yield _function(match, text)
+
+
+def function_pointers(path):
+    """Every typedef of a pointer to a function, and every such member of a table, in the header's order."""
+    text = pathlib.Path(path).read_text(encoding="utf-8")
+    for match in FUNCTION_POINTER.finditer(text):
+        yield FunctionPointer(_function(match, text), match["typedef"] is not None, match["model"] or "")
 
 
 def table(listed):

@@ -13,9 +13,9 @@
 
 /** Create a semaphore.
  *  The stack guarantees that a failed creation leaves *phSema as it was.
- *  @param phSema       receives the handle, never 0 on success
- *  @param eType        binary, counting, or mutex (owned by the thread that locked it)
- *  @param u4InitValue  1: free, 0: taken; a count for a counting semaphore
+ *  @param[out] phSema       receives the handle, never 0 on success
+ *  @param      eType        binary, counting, or mutex (owned by the thread that locked it)
+ *  @param      u4InitValue  1: free, 0: taken; a count for a counting semaphore
  *  @return OSR_OK or a failure
  *  @context a thread that may sleep */
 INT32 x_sema_create(HANDLE_T* phSema, X_SEMA_TYPE_T eType, UINT32 u4InitValue)
@@ -61,7 +61,7 @@ INT32 x_sema_delete(HANDLE_T hSema)
 
 /** Create a timer, stopped.
  *  The stack guarantees that a failed creation leaves *phTimer as it was.
- *  @param phTimer  receives the handle, never 0 on success
+ *  @param[out] phTimer  receives the handle, never 0 on success
  *  @return OSR_OK or a failure
  *  @context a thread that may sleep */
 INT32 x_timer_create(HANDLE_T* phTimer)
@@ -71,11 +71,11 @@ INT32 x_timer_create(HANDLE_T* phTimer)
 }
 
 /** Start a timer, from its full interval when it is running.
- *  @param hTimer      handle from x_timer_create
- *  @param u4DelayMs   interval in milliseconds
- *  @param eFlag       once or repeatedly
- *  @param pfCallback  expiry function, called in the timer's context
- *  @param pvArg       handed to the expiry function
+ *  @param     hTimer      handle from x_timer_create
+ *  @param     u4DelayMs   interval in milliseconds
+ *  @param     eFlag       once or repeatedly
+ *  @param[in] pfCallback  [symbol] expiry function, called in the timer's context
+ *  @param[in] pvArg       [tag] handed to the expiry function
  *  @return OSR_OK or a failure (a bad handle, for instance 0)
  *  @context any thread */
 INT32 x_timer_start(HANDLE_T hTimer, UINT32 u4DelayMs, X_TIMER_FLAG_T eFlag, x_timer_cb_fct pfCallback, void* pvArg)
@@ -118,10 +118,10 @@ void x_thread_delay(UINT32 u4DelayMs)
 }
 
 /** Format text; always terminates it.
- *  @param szBuffer  receives the text
- *  @param zSize     its size in characters, terminator included
- *  @param szFormat  printf format
- *  @param rArgs     its values
+ *  @param[out] szBuffer  [text of zSize] receives the text
+ *  @param      zSize     its size in characters, terminator included
+ *  @param[in]  szFormat  [text] printf format
+ *  @param      rArgs     its values
  *  @return length that the whole text has, without the terminator; negative on a failure
  *  @context any */
 INT32 x_vsnprintf(CHAR* szBuffer, size_t zSize, const CHAR* szFormat, va_list rArgs)
@@ -135,10 +135,10 @@ INT32 x_vsnprintf(CHAR* szBuffer, size_t zSize, const CHAR* szFormat, va_list rA
 
 /** Levelled console print: prints when the console's level admits i4Level.
  *  A null string argument is printed as (null).
- *  @param i4Level   0 status report, warnings, handshake; 1 life cycle and display-mode progress; 5 errors; 8 source
- *                   and plane events, refusals; 9 whatever else helps to follow the layer, and what the interface
- *                   manager refuses
- *  @param szFormat  printf format
+ *  @param     i4Level   0 status report, warnings, handshake; 1 life cycle and display-mode progress; 5 errors; 8
+ *                       source and plane events, refusals; 9 whatever else helps to follow the layer, and what the
+ *                       interface manager refuses
+ *  @param[in] szFormat  [text] printf format
  *  @context any, the timer's included */
 void PMX_IsLog(INT32 i4Level, const CHAR* szFormat, ...)
 {
@@ -147,7 +147,7 @@ void PMX_IsLog(INT32 i4Level, const CHAR* szFormat, ...)
 }
 
 /** Unconditional console print. A null string argument is printed as (null).
- *  @param szFormat  printf format
+ *  @param[in] szFormat  [text] printf format
  *  @context any */
 void Printf(const CHAR* szFormat, ...)
 {
@@ -155,7 +155,7 @@ void Printf(const CHAR* szFormat, ...)
 }
 
 /** Unconditional console print of the utility layer. A null string argument is printed as (null).
- *  @param szFormat  printf format
+ *  @param[in] szFormat  [text] printf format
  *  @context any */
 void UTIL_Printf(const CHAR* szFormat, ...)
 {
@@ -163,9 +163,9 @@ void UTIL_Printf(const CHAR* szFormat, ...)
 }
 
 /** Report a broken invariant and return: the caller goes on.
- *  @param szExpression  the invariant, or "0"
- *  @param szFile        source path relative to the project's root
- *  @param i4Line        line in it
+ *  @param[in] szExpression  [text] the invariant, or "0"
+ *  @param[in] szFile        [text] source path relative to the project's root
+ *  @param     i4Line        line in it
  *  @context any, the timer's included */
 void Assert(const CHAR* szExpression, const CHAR* szFile, INT32 i4Line)
 {
@@ -175,7 +175,7 @@ void Assert(const CHAR* szExpression, const CHAR* szFile, INT32 i4Line)
 }
 
 /** Find a flash partition.
- *  @param szName  its name
+ *  @param[in] szName  [text] its name
  *  @return its id; negative: no such partition
  *  @context a thread that may sleep */
 INT32 get_part_id_by_name(const CHAR* szName)
@@ -186,10 +186,10 @@ INT32 get_part_id_by_name(const CHAR* szName)
 
 /** Read from a flash partition.
  *  The stack guarantees that a negative id or a read past the end is answered by a failure; the caller does not look.
- *  @param i4PartId  id from get_part_id_by_name
- *  @param u4Offset  first byte
- *  @param pvDest    receives u4Count bytes; left as it was by a failed read
- *  @param u4Count   number of bytes
+ *  @param      i4PartId  id from get_part_id_by_name
+ *  @param      u4Offset  first byte
+ *  @param[out] pvDest    [u4Count bytes] receives u4Count bytes; left as it was by a failed read
+ *  @param      u4Count   number of bytes
  *  @return bytes read, negative on a failure
  *  @context a thread that may sleep */
 INT32 i4NFBPartitionRead(INT32 i4PartId, UINT32 u4Offset, void* pvDest, UINT32 u4Count)
@@ -222,7 +222,7 @@ void x_reg_write32(UINT32 u4Address, UINT32 u4Value)
 }
 
 /** Register power-management operations.
- *  @param prOps  the operations; the object stays where it is until it is unregistered
+ *  @param[in] prOps  [symbol] the operations; the object stays where it is until it is unregistered
  *  @return 0, negative on a failure
  *  @context a thread that may sleep */
 int register_pm_ops(const PM_OPERATIONS_T* prOps)
@@ -232,7 +232,7 @@ int register_pm_ops(const PM_OPERATIONS_T* prOps)
 }
 
 /** Withdraw power-management operations.
- *  @param prOps  the object that was registered
+ *  @param[in] prOps  [symbol] the object that was registered
  *  @return 0, negative on a failure
  *  @context a thread that may sleep */
 int unregister_pm_ops(const PM_OPERATIONS_T* prOps)
@@ -244,11 +244,11 @@ int unregister_pm_ops(const PM_OPERATIONS_T* prOps)
 /* drv_if.h */
 
 /** Publish an interface.
- *  @param u2CompType  component type
- *  @param u2CompId    component id
- *  @param u4IfId      interface id
- *  @param pvIf        the table; stays where it is until it is unregistered
- *  @param pvTag       handed to every function of the table as its first argument
+ *  @param     u2CompType  component type
+ *  @param     u2CompId    component id
+ *  @param     u4IfId      interface id
+ *  @param[in] pvIf        [symbol] the table; stays where it is until it is unregistered
+ *  @param[in] pvTag       [tag] handed to every function of the table as its first argument
  *  @return 0 or above; negative on a failure
  *  @context a thread that may sleep */
 INT32 i4ImRegisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, const void* pvIf, void* pvTag)
@@ -278,11 +278,11 @@ INT32 i4ImUnregisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId
 /** Fetch an interface and hold it until it is released.
  *  The stack guarantees that a successful query yields a complete table, no function of it null; a failed one
  *  yields nothing that may be called.
- *  @param u2CompType  component type
- *  @param u2CompId    component id
- *  @param u4IfId      interface id
- *  @param ppvIf       receives the table
- *  @param ppvTag      receives its tag
+ *  @param      u2CompType  component type
+ *  @param      u2CompId    component id
+ *  @param      u4IfId      interface id
+ *  @param[out] ppvIf       [symbol] receives the table
+ *  @param[out] ppvTag      [tag] receives its tag
  *  @return 0 or above; negative on a failure
  *  @context a thread that may sleep; the mixer holds MutexPMX */
 INT32 i4ImQueryInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void** ppvIf, void** ppvTag)
@@ -296,10 +296,10 @@ INT32 i4ImQueryInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void
 }
 
 /** Give a fetched interface back, once for each successful query.
- *  @param u2CompType  component type
- *  @param u2CompId    component id
- *  @param u4IfId      interface id
- *  @param pvTag       the tag that the query yielded
+ *  @param     u2CompType  component type
+ *  @param     u2CompId    component id
+ *  @param     u4IfId      interface id
+ *  @param[in] pvTag       [tag] the tag that the query yielded
  *  @return 0 or above; negative on a failure
  *  @context a thread that may sleep; the mixer holds MutexPMX */
 INT32 i4ImReleaseInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void* pvTag)
@@ -371,10 +371,10 @@ void PMX_HalSetBg(UCHAR ucPmxId, UINT32 u4BgColor)
 }
 
 /** Program the stacking order.
- *  @param ucPmxId        mixer id
- *  @param u4Number       3 at reset, 8 for an order that was asked for
- *  @param pu4PlaneOrder  eight plane ids, position 0 first; a plane may be named twice, and any 32-bit word may come
- *                        and must do no harm */
+ *  @param     ucPmxId        mixer id
+ *  @param     u4Number       3 at reset, 8 for an order that was asked for
+ *  @param[in] pu4PlaneOrder  [8] eight plane ids, position 0 first; a plane may be named twice, and any 32-bit word may
+ *                            come and must do no harm */
 void PMX_HalPlaneOrder(UCHAR ucPmxId, UINT32 u4Number, const UINT32* pu4PlaneOrder)
 {
     (void)ucPmxId;
@@ -391,9 +391,9 @@ void PMX_HalInitPlaneOrder(UCHAR ucPmxId)
 
 /** Program the eight plane selectors.
  *  The layer below guarantees that on success it has written all eight delays.
- *  @param ucPmxId      mixer id
- *  @param pu1PlnSel    eight source numbers 0 to 7, plane 0 first
- *  @param pi4PlnDelay  receives eight delays of the new arrangement, plane 0 first, in the hardware's unit
+ *  @param      ucPmxId      mixer id
+ *  @param[in]  pu1PlnSel    [8] eight source numbers 0 to 7, plane 0 first
+ *  @param[out] pi4PlnDelay  [8] receives eight delays of the new arrangement, plane 0 first, in the hardware's unit
  *  @return 0; anything else when the order is refused */
 INT32 PMX_HalSetPlaneOrder(UCHAR ucPmxId, const UINT8* pu1PlnSel, INT32* pi4PlnDelay)
 {
@@ -404,8 +404,8 @@ INT32 PMX_HalSetPlaneOrder(UCHAR ucPmxId, const UINT8* pu1PlnSel, INT32* pi4PlnD
 }
 
 /** Read the eight plane selectors.
- *  @param ucPmxId    mixer id
- *  @param pu1PlnSel  receives eight source numbers, plane 0 first
+ *  @param      ucPmxId    mixer id
+ *  @param[out] pu1PlnSel  [8] receives eight source numbers, plane 0 first
  *  @return 0; anything else when they cannot be read */
 INT32 PMX_HalGetPlaneOrder(UCHAR ucPmxId, UINT8* pu1PlnSel)
 {
@@ -669,9 +669,9 @@ void PMX_HalSetContrast(UCHAR ucPmxId, UCHAR ucContrast)
 }
 
 /** Set the gamma curve.
- *  @param ucPmxId   mixer id
- *  @param ucEnable  1 on, 0 off
- *  @param pucCurve  nine output levels at equally spaced inputs from 0 to 255; null when off */
+ *  @param     ucPmxId   mixer id
+ *  @param     ucEnable  1 on, 0 off
+ *  @param[in] pucCurve  [9] nine output levels at equally spaced inputs from 0 to 255; null when off */
 void PMX_HalSetGamma(UCHAR ucPmxId, UCHAR ucEnable, const UCHAR* pucCurve)
 {
     (void)ucPmxId;
@@ -967,7 +967,8 @@ void OSD_RNG_Set_Xvycc_En(BOOL fgEnable)
 }
 
 /** Set the position offsets of the OSD planes.
- *  @param pi4Offset  five offsets in the hardware's unit, negative ones included; the driver must not keep the pointer
+ *  @param[in] pi4Offset  [5] five offsets in the hardware's unit, negative ones included; the driver must not keep the
+ *                        pointer
  *  @return the driver's result, which the mixer ignores */
 INT32 _i4OSD_SetPosOffset(INT32* pi4Offset)
 {
@@ -1009,9 +1010,9 @@ void DCM_SetVideoPlaneDelay(INT32 i4Delay1, INT32 i4Delay2)
 /* drv_av_d.h */
 
 /** Command the driver. It takes a copy of what it needs before it returns.
- *  @param u4Command    a PMX_AVD_COMMAND_T value
- *  @param pvParameter  the command's parameter
- *  @param u4Length     always 1; the driver's own convention
+ *  @param     u4Command    a PMX_AVD_COMMAND_T value
+ *  @param[in] pvParameter  [by u4Command] the command's parameter
+ *  @param     u4Length     always 1; the driver's own convention
  *  @return FALSE when it refuses
  *  @context a thread that may sleep */
 BOOL fgPmxDrvSetAvd(UINT32 u4Command, void* pvParameter, UINT32 u4Length)
@@ -1023,8 +1024,8 @@ BOOL fgPmxDrvSetAvd(UINT32 u4Command, void* pvParameter, UINT32 u4Length)
 }
 
 /** Query the driver.
- *  @param u4Query      a PMX_AVD_QUERY_T value
- *  @param pvParameter  the query's record; the driver fills its outputs when it answers TRUE
+ *  @param         u4Query      a PMX_AVD_QUERY_T value
+ *  @param[in,out] pvParameter  [by u4Query] the query's record; the driver fills its outputs when it answers TRUE
  *  @return FALSE when it has no answer
  *  @context a thread that may sleep */
 BOOL fgPmxDrvGetAvdInfo(UINT32 u4Query, void* pvParameter)

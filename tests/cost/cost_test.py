@@ -3,6 +3,7 @@
 
 import copy
 import pathlib
+import re
 import sys
 import unittest
 
@@ -16,6 +17,7 @@ import goals  # noqa: E402
 import instructions  # noqa: E402
 import paths  # noqa: E402
 import program  # noqa: E402
+import signatures  # noqa: E402
 
 
 def node(title, frame, kind="static"):
@@ -90,6 +92,59 @@ class Floor(unittest.TestCase):
 
     def test_texts_are_written_byte_by_byte(self):
         self.assertEqual(r'"a\"\\\n\001\?"', program.c_text(b'a"\\\n\x01?'))
+
+
+class Signatures(unittest.TestCase):
+    """What the headers say is what stands between layer and platform has to know: kind, bytes read, bytes written."""
+
+    def known(self, function, parameter):
+        found = {**signatures.operations(), **signatures.platform()}[function]
+        [known] = [(each.kind, each.read, each.written) for each in found.parameters if each.name == parameter]
+        return known
+
+    def test_of_the_platform(self):
+        for function, parameter, expected in (
+                ("x_sema_create", "phSema", ("place", "", "sizeof *phSema")),
+                ("x_sema_create", "u4InitValue", ("number", "", "")),
+                ("x_timer_start", "pfCallback", ("symbol", "", "")),
+                ("x_timer_start", "pvArg", ("tag", "", "")),
+                ("x_vsnprintf", "szBuffer", ("place", "", "strlen(szBuffer) + 1")),
+                ("x_vsnprintf", "szFormat", ("text", "", "")),
+                ("x_vsnprintf", "rArgs", ("list", "", "")),
+                ("PMX_IsLog", "", ("values", "", "")),
+                ("i4NFBPartitionRead", "pvDest", ("place", "", "u4Count")),
+                ("register_pm_ops", "prOps", ("symbol", "", "")),
+                ("i4ImQueryInterface", "ppvTag", ("table", "", "")),
+                ("PMX_HalPlaneOrder", "pu4PlaneOrder", ("data", "8 * sizeof(UINT32)", "")),
+                ("PMX_HalSetPlaneOrder", "pi4PlnDelay", ("place", "", "8 * sizeof(INT32)")),
+                ("PMX_HalSetGamma", "pucCurve", ("data", "9 * sizeof(UCHAR)", "")),
+                ("_i4OSD_SetPosOffset", "pi4Offset", ("data", "5 * sizeof(INT32)", "")),
+                ("pu4SetColorMode", "pvTag", ("tag", "", ""))):
+            self.assertEqual(expected, self.known(function, parameter), f"{function} {parameter}")
+
+    def test_of_the_layer(self):
+        for function, parameter, expected in (
+                ("PMX_SetModeEx", "prOutConf", ("data", "PMX_OUTPUT_NUM * sizeof(PMX_RESOLUTION_T)", "")),
+                ("PMX_SetPlaneOrderArray", "pu4PlaneOrder", ("data", "8 * sizeof(UINT32)", "")),
+                ("PMX_ChkSupportedRes", "ucSupportedAutoVsyncFreg", ("place", "", "sizeof *ucSupportedAutoVsyncFreg")),
+                ("i4PmxGetMode", "pvTag", ("tag", "", "")),
+                ("PMX_Printf", "format_string", ("text", "", ""))):
+            self.assertEqual(expected, self.known(function, parameter), f"{function} {parameter}")
+
+    def test_of_what_a_command_says(self):
+        kind, read, written = self.known("fgPmxDrvSetAvd", "pvParameter")
+        self.assertEqual(("data", ""), (kind, written))
+        cases = dict(re.findall(r"([^?:]+) \? (sizeof\(\w+\)) :", read.strip("()")))
+        sizes = {name: size for names, size in cases.items() for name in re.findall(r"== (\w+)", names)}
+        self.assertEqual(32 - 4, len(sizes))  # 0 to 31 without 3, 11, 12, 14
+        self.assertEqual("sizeof(UINT32)", sizes["PMX_CHG_HDMI_VIDEO_ASPECT_RATIO"])
+        self.assertEqual("sizeof(PMX_SET_TV_SYS_PARAMETER_T)", sizes["PMX_SET_UI_TV_SYSTEM"])
+        for name in ("PMX_SET_VIDEO_PLL", "PMX_SET_HDMI_RES_CHG", "PMX_SET_CCIR_RES_CHG"):
+            self.assertEqual("sizeof(PMX_SET_HDMI_RES_PARAMETER_T)", sizes[name])
+        self.assertEqual(23, list(sizes.values()).count("sizeof(UINT8)") + list(sizes.values()).count("sizeof(BOOL)"))
+        self.assertTrue(read.endswith(": 0)"))
+        query = "(u4Query == PMX_GET_VALID_RES_AND_VFREQ ? sizeof(PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T) : 0)"
+        self.assertEqual(("data", query, query), self.known("fgPmxDrvGetAvdInfo", "pvParameter"))
 
 
 class SelfCosts(unittest.TestCase):

@@ -11,17 +11,15 @@ import sys
 sys.dont_write_bytecode = True
 sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))
 
-from platform_functions import DECLARATION, PLATFORM_HEADERS, ROOT, functions  # noqa: E402
+from platform_functions import PLATFORM_HEADERS, ROOT, functions  # noqa: E402
 
 
 def bodies(path):
     """The definitions of what one header declares."""
-    declarations = {match["name"]: match for match in DECLARATION.finditer(path.read_text(encoding="utf-8"))}
     for function in functions(path):
-        match = declarations[function.name]
-        parameters = " ".join(match["parameters"].split())
         statement = "return {};" if function.has_result else ""
-        yield f"__attribute__((weak)) {match['result']} {function.name}({parameters})\n{{\n    {statement}\n}}\n"
+        yield (f"__attribute__((weak)) {function.result} {function.name}({function.declared})\n"
+               f"{{\n    {statement}\n}}\n")
 
 
 def main():

@@ -6,11 +6,14 @@ import sys
 
 sys.path.insert(0, str(pathlib.Path(__file__).parents[2] / "cmake"))
 
+import pointers  # noqa: E402
 from cpp import Source  # noqa: E402
-from platform_functions import LAYER_HEADER, PLATFORM_HEADERS, functions as declared  # noqa: E402
+from platform_functions import LAYER_HEADER, PLATFORM_HEADERS, function_pointers  # noqa: E402
+from platform_functions import functions as declared  # noqa: E402
 
 DEFINED = "tests/symbols/defined.txt"
 NEEDED = "tests/symbols/needed.txt"
+HEADER_DIRECTORIES = ("src/system/inc", "src/driver/inc", "src/driver/private_inc")
 COMPILERS_OWN = {"memcpy", "memset"}
 
 
@@ -24,7 +27,7 @@ def check_contract(declaration, needs_context):
     if not comment:
         yield f"{declaration.name}: no contract (/** … */ directly above)"
         return
-    named = re.findall(r"@param(?:\[\w+\])?\s+(\w+)", comment)
+    named = list(pointers.described(declaration))
     for parameter in declaration.parameters:
         if parameter not in named:
             yield f"{declaration.name}: no @param {parameter}"
@@ -44,6 +47,52 @@ def check_headers(root):
         for declaration in read_declarations(root, header):
             for message in check_contract(declaration, header == LAYER_HEADER):
                 yield header, declaration.line, message
+
+
+def check_pointers(declaration, callbacks, enumerations):
+    """Every pointer tells which way it goes and what stands behind it; what is no pointer says nothing of it."""
+    described = pointers.described(declaration)
+    for type_name, name in pointers.declared_parameters(declaration):
+        try:
+            if pointers.is_pointer(type_name, callbacks):
+                pointer = pointers.pointer_of(declaration, type_name, name, callbacks)
+                if pointer.kind == "by":
+                    pointers.types_by_value(declaration, pointer, enumerations)
+            elif described.get(name, (None, None)) != (None, None):
+                yield f"{declaration.name}: {name} is no pointer, and needs neither a direction nor brackets"
+        except pointers.Unclear as reason:
+            yield str(reason)
+
+
+def check_member(pointer, offered, callbacks, enumerations):
+    """A table's member: a tag in front needs no words; other pointers need a contract, or that of a function."""
+    function = pointer.function
+    if pointer.model:
+        if offered.get(pointer.model) != function.declared:
+            yield f"{function.name}: as {pointer.model}, which the layer does not offer with the same parameters"
+    elif pointers.described(function):
+        yield from check_pointers(function, callbacks, enumerations)
+    elif any(pointers.is_pointer(type_name, callbacks) and (place > 0 or type_name != "void*")
+             for place, (type_name, _) in enumerate(pointers.declared_parameters(function))):
+        yield f"{function.name}: its pointers need a contract, or /**< as FUNCTION */"
+
+
+def check_all_pointers(root):
+    headers = sorted(path for directory in HEADER_DIRECTORIES for path in (root / directory).glob("*.h"))
+    called = {header: list(function_pointers(header)) for header in headers}
+    callbacks = {pointer.function.name for found in called.values() for pointer in found if pointer.is_type}
+    enumerations = pointers.enumerations("\n".join(header.read_text(encoding="utf-8") for header in headers))
+    offered = {declaration.name: declaration.declared for declaration in read_declarations(root, LAYER_HEADER)}
+    for header in headers:
+        name = header.relative_to(root).as_posix()
+        for declaration in declared(header):
+            for message in check_pointers(declaration, callbacks, enumerations):
+                yield name, declaration.line, message
+        for pointer in called[header]:
+            check = (check_pointers(pointer.function, callbacks, enumerations) if pointer.is_type
+                     else check_member(pointer, offered, callbacks, enumerations))
+            for message in check:
+                yield name, pointer.function.line, message
 
 
 def read_list(root, path):
@@ -99,4 +148,4 @@ def check_board(root):
 
 
 def complaints(root):
-    return [*check_headers(root), *check_lists(root), *check_board(root)]
+    return [*check_headers(root), *check_all_pointers(root), *check_lists(root), *check_board(root)]

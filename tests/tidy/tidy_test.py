@@ -14,6 +14,7 @@ from cpp import Source  # noqa: E402
 
 PLATFORM = "src/driver/private_inc/drv_tve.h"
 LAYER = "src/driver/private_inc/drv_pmx.h"
+HEADER = "src/driver/private_inc/drv_other.h"  # of neither, so that no list of symbols speaks of it
 
 CLEAN = {
     PLATFORM: '#ifdef __cplusplus\nextern "C" {\n#endif\n'
@@ -119,6 +120,87 @@ class Tidy(unittest.TestCase):
     def test_contracts_of_the_platform(self):
         self.refused("no contract", PLATFORM, "UINT32 TVE_Black(UINT32 u4Tve);\n")
         self.refused("no @param u4Tve", PLATFORM, "/** Black. @return 1 */\nUINT32 TVE_Black(UINT32 u4Tve);\n")
+
+    def test_pointers_tell_what_they_mean(self):
+        def header(param, type_name="UINT8*", other="UINT32 u4Number", before=""):
+            return (f"{before}/** Take.\n *  @param u4Number  a A_T value\n *  {param} */\n"
+                    f"void TVE_Take({other}, {type_name} p);\n")
+
+        def refused(text, *arguments, **named):
+            self.refused(text, HEADER, header(*arguments, **named))
+
+        for type_name, param in (
+                ("UINT8*", "@param[out] p  receives it"), ("const UINT8*", "@param[in] p  [8] eight"),
+                ("UINT8*", "@param[in,out] p  [COUNT] all"), ("void*", "@param[out] p  [u4Number bytes] some"),
+                ("const CHAR*", "@param[in] p  [text] a name"), ("CHAR*", "@param[out] p  [text of u4Number] a name"),
+                ("void*", "@param[in] p  [tag] any"), ("const void*", "@param[in] p  [symbol] a table"),
+                ("void**", "@param[out] p  [symbol] a table"), ("void**", "@param[out] p  [tag] its tag"),
+                ("UINT32", "@param p  a number")):
+            self.accepted(HEADER, header(param, type_name))
+
+        refused("TVE_Take: p is a pointer: @param[in], @param[out] or @param[in,out]", "@param p  receives it")
+        refused("TVE_Take: p is a pointer", "@param[inout] p  [8] eight")
+        refused("TVE_Take: p is a pointer", "@param[in] q  [8] eight")
+        refused("[eight] is none of", "@param[out] p  [eight] items")
+        refused("[0] is none of", "@param[out] p  [0] items")
+        refused("[bytes of u4Number] is none of", "@param[out] p  [bytes of u4Number] items")
+        refused("u4Other is no number that the function is given", "@param[out] p  [u4Other bytes] some")
+        refused("[p bytes]: p is no number", "@param[out] p  [p bytes] some", "void*")
+        refused("p is const, and not written", "@param[out] p  receives it", "const UINT8*")
+        refused("tells no type", "@param[in] p  something", "void*")
+        refused("tells no type", "@param[in] p  [8] something", "void*")
+        refused("points to UINT32, not to bytes", "@param[in] p  [u4Number bytes] some", "UINT32*")
+        refused("p is a text: [text]", "@param[in] p  a name", "const CHAR*")
+        refused("is a text: [text] when it is read", "@param[out] p  [text] a name", "CHAR*")
+        refused("is a text: [text] when it is read", "@param[in] p  [text of u4Number] a name", "const CHAR*")
+        refused("p is no [text]", "@param[in] p  [text] a name", "const UINT8*")
+        refused("is no [tag]: that is a void*", "@param[in] p  [tag] any", "UINT8*")
+        refused("nobody writes behind a [tag]", "@param[out] p  [tag] any", "void*")
+        refused("receives a [tag] or a [symbol]", "@param[out] p  receives it", "void**")
+        refused("p is not @param[in]", "@param[in] p  [tag] any", "void**")
+        refused("p is no pointer, and needs neither", "@param[in] p  a number", "UINT32")
+        refused("p is no pointer, and needs neither", "@param p  [8] numbers", "UINT32")
+
+    def test_pointers_to_what_a_command_says(self):
+        def header(enumerators, text="a A_T value", behind="by u4Number"):
+            return (f"typedef DRV_ENUM(A_T)\n{{\n{enumerators}\n}} A_T;\n\n/** Take.\n *  @param u4Number  {text}\n"
+                    f" *  @param[in] pv  [{behind}] what goes with it */\nvoid TVE_Take(UINT32 u4Number, void* pv);\n")
+
+        good = "    A_ONE = 1, /**< [UINT8] a byte */\n    A_TWO = 2 /**< [UINT32] */"
+        self.accepted(HEADER, header(good))
+        self.refused("A_ONE does not tell the type", HEADER, header(good.replace("[UINT8] ", "")))
+        self.refused("A_TWO does not tell the type", HEADER, header(good.replace(" /**< [UINT32] */", "")))
+        self.refused("u4Number does not say of which enumeration", HEADER, header(good, text="a number"))
+        self.refused("u4Number does not say of which enumeration", HEADER, header(good, text="a B_T value"))
+        self.refused("u4Other is no number", HEADER, header(good, behind="by u4Other"))
+
+    def test_pointers_of_functions_that_are_called_through_a_pointer(self):
+        callback = "/** Called.\n *  @param[in] pvArg  [tag] any */\ntypedef void (*callback_fct)(void* pvArg);\n"
+        take = "/** Take.\n *  @param[in] pf  [symbol] called */\nvoid TVE_Take(callback_fct pf);\n"
+        self.accepted(HEADER, callback + take)
+        self.refused("callback_fct: pvArg is a pointer", HEADER, callback.replace("[in]", "") + take)
+        self.refused("TVE_Take: pf is a pointer", HEADER, callback + take.replace("[in]", ""))
+        self.refused("pf is the address of a function: [symbol]", HEADER, callback + take.replace("[symbol] ", ""))
+
+        def table(member):
+            return f"typedef struct\n{{\n    UINT32 u4Size; /**< of it */\n{member}\n}} ITable;\n"
+
+        self.accepted(HEADER, table("    INT32 (*pi4Stop)(void* pvTag, UINT32 u4Case);"))
+        for parameters in ("void* pvTag, UINT8* pu1", "UINT8* pu1"):
+            self.refused("pi4Get: its pointers need a contract", HEADER, table(f"    INT32 (*pi4Get)({parameters});"))
+        contract = "    /** Get.\n     *  @param[in] pvTag  [tag] any\n     *  @param[out] pu1  receives it */\n"
+        member = "    INT32 (*pi4Get)(void* pvTag, UINT8* pu1);"
+        self.accepted(HEADER, table(contract + member))
+        self.refused("pi4Get: pu1 is a pointer", HEADER, table(contract.replace("[out]", "") + member))
+        self.refused("pi4Get: as i4PmxGet, which the layer does not offer", HEADER,
+                     table(member + " /**< as i4PmxGet */"))
+        layer = ("/** Get.\n *  @param[in] pvTag  [tag] any\n *  @param[out] pu1  receives it\n *  @return 1\n"
+                 " *  @context any */\nPMX_API INT32 i4PmxGet(void* pvTag, UINT8* pu1);\n")
+        files = {LAYER: CLEAN[LAYER] + layer, HEADER: table(member + " /**< as i4PmxGet */"),
+                 "tests/symbols/defined.txt": "PMX_Init\ni4PmxGet\n"}
+        self.assertEqual([], self.found(files=files))
+        files[HEADER] = files[HEADER].replace("UINT8* pu1", "UINT16* pu2")
+        self.assertIn("with the same parameters", "".join(self.found(files=files)))
 
     def test_lists_follow_the_headers(self):
         self.refused("TVE_Black: declared in a platform header, but not listed", "tests/symbols/needed.txt", "")

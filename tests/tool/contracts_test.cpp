@@ -40,6 +40,41 @@ TEST(Contracts, EachOperation_HasItsText)
     }
 }
 
+// What the operations' table takes from types and names is what the header says of each pointer.
+TEST(Contracts, Pointers_AreWhatTheOperationsTakeThemFor)
+{
+    using Form = pmxboard::Kind::Form;
+    for (const pmxboard::Operation& operation : pmxboard::operations())
+    {
+        const Contract& contract = *contract_of(operation.name);
+        for (std::size_t i = 0; i < operation.parameters.size(); ++i)
+        {
+            const pmxboard::Parameter& parameter = operation.parameters[i];
+            const pmxboard::ContractParameter& told = contract.parameters[i];
+            const std::string where = operation.name + " " + parameter.name;
+            EXPECT_EQ(parameter.is_output, told.direction == "out") << where;
+            EXPECT_EQ(parameter.kind.form == Form::Text, told.behind == "text") << where;
+            if (parameter.kind.form == Form::List)
+            {
+                const bool outputs = told.behind == "PMX_OUTPUT_NUM";
+                EXPECT_EQ(std::to_string(parameter.kind.count), outputs ? "4" : told.behind) << where;
+            }
+        }
+    }
+}
+
+TEST(Contracts, WhatAPointerLeadsTo_IsNoPartOfItsText)
+{
+    const pmxboard::ContractParameter& selectors = contract_of("PMX_HalSetPlaneOrder")->parameters[1];
+    EXPECT_EQ("in", selectors.direction);
+    EXPECT_EQ("8", selectors.behind);
+    EXPECT_EQ("eight source numbers 0 to 7, plane 0 first", selectors.text);
+    const pmxboard::ContractParameter& query = contract_of("fgPmxDrvGetAvdInfo")->parameters[1];
+    EXPECT_EQ("in,out", query.direction);
+    EXPECT_EQ("by u4Query", query.behind);
+    EXPECT_EQ("", contract_of("PMX_SetMode")->parameters[0].direction);
+}
+
 TEST(Contracts, Texts_AreThoseOfTheHeader)
 {
     const Contract& contract = *contract_of("PMX_SetSwapEnable");

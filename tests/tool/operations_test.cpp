@@ -223,7 +223,7 @@ TEST(Operations, OutputsTakeNoNull_ExactlyWhereTheHeaderSaysSo)
         const std::string text = (*it)[1];
         for (const auto& parameter : operation->parameters)
         {
-            const std::size_t at = text.find("@param " + parameter.name + " ");
+            const std::size_t at = text.find("@param[out] " + parameter.name + " ");
             if (!parameter.is_output)
                 continue;
             ASSERT_NE(std::string::npos, at) << operation->name << ' ' << parameter.name;

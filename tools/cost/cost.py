@@ -144,7 +144,7 @@ def main():
 if __name__ == "__main__":
     try:
         found = main()
-    except (ToolError, path_list.PathError, callgraph.CallGraphError, signatures.Unknown) as error:
+    except (ToolError, path_list.PathError, callgraph.CallGraphError, signatures.Unclear) as error:
         sys.exit(f"cost: {error}")
     for complaint in found:
         print(f"cost: {complaint}", file=sys.stderr)

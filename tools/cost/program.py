@@ -277,10 +277,6 @@ def harness(paths, names, objects):
 #include <valgrind/callgrind.h>
 
 {_includes()}
-namespace cost
-{{
-static size_t avd_parameter_size(unsigned command);
-}}
 {HARNESS}
 extern "C" UINT32 {signatures.PLANE_CALL}(void* pvTag, DRV_PMX_COLOR_SPACE_T eColorSpace);
 static const IVdp plane = {{ .pu4SetColorMode = {signatures.PLANE_CALL} }};
@@ -288,7 +284,6 @@ extern "C"
 {{
 {stand_ins}
 }}
-{AVD_PARAMETER_SIZE}
 {declared}
 """], (_answers(i, path, order) for i, path in enumerate(paths)), [f"""
 {state}
@@ -299,19 +294,3 @@ static const Path PATHS[] = {{
 {rows}
 }};
 """, MAIN]))
-
-
-AVD_PARAMETER_SIZE = """
-static size_t cost::avd_parameter_size(unsigned command)
-{
-    switch (command)
-    {
-    case PMX_CHG_HDMI_VIDEO_ASPECT_RATIO: return sizeof(UINT32);
-    case PMX_SET_UI_TV_SYSTEM: return sizeof(PMX_SET_TV_SYS_PARAMETER_T);
-    case PMX_SET_VIDEO_PLL:
-    case PMX_SET_HDMI_RES_CHG:
-    case PMX_SET_CCIR_RES_CHG: return sizeof(PMX_SET_HDMI_RES_PARAMETER_T);
-    default: return 1;
-    }
-}
-"""

@@ -10,7 +10,6 @@
 #include <stdexcept>
 #include <vector>
 
-#include "drv_av_d.h"
 #include "drv_if.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
@@ -57,19 +56,6 @@ std::string state()
 }
 
 } // namespace
-
-std::size_t avd_parameter_size(unsigned command)
-{
-    switch (command)
-    {
-    case PMX_CHG_HDMI_VIDEO_ASPECT_RATIO: return sizeof(UINT32);
-    case PMX_SET_UI_TV_SYSTEM: return sizeof(PMX_SET_TV_SYS_PARAMETER_T);
-    case PMX_SET_VIDEO_PLL:
-    case PMX_SET_HDMI_RES_CHG:
-    case PMX_SET_CCIR_RES_CHG: return sizeof(PMX_SET_HDMI_RES_PARAMETER_T);
-    default: return 1;
-    }
-}
 
 Call::Call(Kind kind, const char* name)
     : m_recorded(listening && in_platform == 0 && in_operation == (kind == Kind::Platform)), m_kind(kind), m_name(name)

@@ -14,9 +14,6 @@
 namespace cost
 {
 
-/** Bytes behind the parameter of a command of the HDMI/AV driver. */
-std::size_t avd_parameter_size(unsigned command);
-
 /** One call, from its arguments to its result. What it does not record (a call that the layer did not make) it lets
  *  pass. */
 class Call

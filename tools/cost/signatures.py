@@ -1,16 +1,17 @@
-"""What the headers tell of the layer's operations and the platform's functions, and what they do not tell: how much
-stands behind a pointer, and which way it goes."""
+"""What the headers tell of the layer's operations and the platform's functions, as those need it who stand between
+them: for each parameter how it is recorded, and how many bytes are read or written behind it."""
 
 import dataclasses
 import functools
 import pathlib
-import re
 import sys
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 sys.path.insert(0, str(ROOT / "cmake"))
 
 import platform_functions  # noqa: E402
+import pointers  # noqa: E402
+from pointers import Unclear  # noqa: E402
 
 HEADERS = ("drv_pmx.h", "drv_if_vdp.h", "u_os.h", "drv_if.h", "pmx_hal.h", "drv_tve.h", "drv_vdp.h", "drv_osd.h",
            "drv_av_d.h")
@@ -18,34 +19,9 @@ HEADER_DIRECTORIES = ("src/system/inc", "src/driver/inc", "src/driver/private_in
 
 # A video plane's table is the one thing that the layer calls through a pointer.
 PLANE_CALL = "pu4SetColorMode"
+PLANE_TABLE = "src/driver/private_inc/drv_if_vdp.h"
 REGISTERS = ("x_reg_read32", "x_reg_write32")
 LOGS = ("PMX_IsLog", "Printf", "UTIL_Printf")
-
-# Bytes behind a pointer, as a C++ expression over the function's parameters. Read by the function ...
-READ = {
-    ("PMX_HalPlaneOrder", "pu4PlaneOrder"): "8 * sizeof(UINT32)",
-    ("PMX_HalSetPlaneOrder", "pu1PlnSel"): "8",
-    ("PMX_HalSetGamma", "pucCurve"): "9",
-    ("_i4OSD_SetPosOffset", "pi4Offset"): "5 * sizeof(INT32)",
-    ("fgPmxDrvSetAvd", "pvParameter"): "cost::avd_parameter_size(u4Command)",
-    ("fgPmxDrvGetAvdInfo", "pvParameter"): "sizeof(PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T)",
-    ("PMX_SetModeEx", "prOutConf"): "PMX_OUTPUT_NUM * sizeof(PMX_RESOLUTION_T)",
-    ("PMX_SetPlaneOrderArray", "pu4PlaneOrder"): "8 * sizeof(UINT32)",
-}
-# ... and written by it.
-WRITTEN = {
-    ("x_sema_create", "phSema"): "sizeof(HANDLE_T)",
-    ("x_timer_create", "phTimer"): "sizeof(HANDLE_T)",
-    ("x_vsnprintf", "szBuffer"): "strlen(szBuffer) + 1",
-    ("i4NFBPartitionRead", "pvDest"): "u4Count",
-    ("PMX_HalSetPlaneOrder", "pi4PlnDelay"): "8 * sizeof(INT32)",
-    ("PMX_HalGetPlaneOrder", "pu1PlnSel"): "8",
-    ("fgPmxDrvGetAvdInfo", "pvParameter"): "sizeof(PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T)",
-}
-TAGS = {"pvTag", "pvArg", "param"}
-# The address of an object or function that both sides know by name.
-SYMBOLS = {("register_pm_ops", "prOps"), ("unregister_pm_ops", "prOps"), ("i4ImRegisterInterface2", "pvIf"),
-           ("x_timer_start", "pfCallback")}
 
 
 @dataclasses.dataclass(frozen=True)
@@ -53,7 +29,7 @@ class Parameter:
     type: str
     name: str
     kind: str     # number, tag, text, symbol, values, list (va_list), data, table, place
-    read: str     # bytes that are read behind the pointer, or nothing
+    read: str     # bytes that are read behind the pointer, as a C++ expression over the parameters, or nothing
     written: str  # bytes that are written there, or nothing
 
 
@@ -82,44 +58,58 @@ def _declared(parameter, named):
     return f"{parameter.type} {parameter.name}" if named else parameter.type
 
 
-class Unknown(Exception):
-    """A header declares something of which this file does not know what stands behind it."""
+@functools.cache
+def _known():
+    """The function types that are handed over, and the enumerations, of all headers."""
+    paths = [path for directory in HEADER_DIRECTORIES for path in sorted((ROOT / directory).glob("*.h"))]
+    callbacks = {found.function.name for path in paths for found in platform_functions.function_pointers(path)
+                 if found.is_type}
+    texts = "\n".join(path.read_text(encoding="utf-8") for path in paths)
+    return callbacks, pointers.enumerations(texts)
 
 
-def parameter_of(function, declared):
-    if declared == "...":
-        return Parameter("", "", "values", "", "")
-    match = re.fullmatch(r"(.*?[\s*])(\w+)", declared)
-    if not match:
-        raise Unknown(f"{function}: a parameter without a name: {declared}")
-    type_name, name = match[1].strip(), match[2]
-    key = function, name
-    read, written = READ.get(key, ""), WRITTEN.get(key, "")
-    if type_name == "va_list":
-        kind = "list"
-    elif key in SYMBOLS:
-        kind = "symbol"
-    elif type_name == "void*" and name in TAGS:
-        kind = "tag"
-    elif type_name == "void**":
-        kind = "table"
-    elif read or written:
-        kind = "data" if read else "place"
-    elif type_name in ("const CHAR*", "const char*"):
-        kind = "text"
-    elif "*" in type_name:
-        kind, written = "place", f"sizeof *{name}"
-        if type_name.startswith("const") or type_name in ("void*", "CHAR*"):
-            raise Unknown(f"{function}: tools/cost/signatures.py does not tell how much stands behind {name}")
-    else:
-        kind = "number"
-    return Parameter(type_name, name, kind, read, written)
+def _bytes_by_value(function, pointer):
+    """As many as the type has that goes with a command."""
+    enumerators = {}
+    for enumerator, type_name in pointers.types_by_value(function, pointer, _known()[1]).items():
+        enumerators.setdefault(type_name, []).append(f"{pointer.size} == {enumerator}")
+    cases = "".join(f"{' || '.join(listed)} ? sizeof({type_name}) : " for type_name, listed in enumerators.items())
+    return f"({cases}0)"
+
+
+def _bytes(function, name, pointer):
+    if pointer.kind == "by":
+        return _bytes_by_value(function, pointer)
+    if pointer.kind == "bytes":
+        return pointer.size
+    if pointer.kind == "text":
+        return f"strlen({name}) + 1"
+    return f"{pointer.size} * sizeof({pointer.target})" if pointer.size else f"sizeof *{name}"
+
+
+def _pointer(function, type_name, name):
+    pointer = pointers.pointer_of(function, type_name, name, _known()[0])
+    if type_name == "void**":
+        return Parameter(type_name, name, "table", "", "")
+    if pointer.kind in ("tag", "symbol"):
+        return Parameter(type_name, name, pointer.kind, "", "")
+    if pointer.kind == "text" and not pointer.is_written:
+        return Parameter(type_name, name, "text", "", "")
+    size = _bytes(function, name, pointer)
+    return Parameter(type_name, name, "data" if pointer.is_read else "place", size if pointer.is_read else "",
+                     size if pointer.is_written else "")
 
 
 def _function(declared):
-    parameters = tuple(parameter_of(declared.name, text.strip())
-                       for text in declared.declared.split(",") if text.strip() not in ("", "void"))
-    return Function(declared.name, declared.result, parameters)
+    parameters = []
+    for type_name, name in pointers.declared_parameters(declared):
+        if pointers.is_pointer(type_name, _known()[0]):
+            parameters.append(_pointer(declared, type_name, name))
+        else:
+            parameters.append(Parameter(type_name, name, "list" if type_name == "va_list" else "number", "", ""))
+    if declared.declared.endswith("..."):
+        parameters.append(Parameter("", "", "values", "", ""))
+    return Function(declared.name, declared.result, tuple(parameters))
 
 
 @functools.cache
@@ -134,7 +124,7 @@ def platform():
     """What the layer needs, by name, and the one function of a video plane's table."""
     listed = {declared.name: _function(declared) for header in platform_functions.PLATFORM_HEADERS
               for declared in platform_functions.functions(ROOT / header)}
-    listed[PLANE_CALL] = Function(PLANE_CALL, "UINT32", (
-        Parameter("void*", "pvTag", "tag", "", ""),
-        Parameter("DRV_PMX_COLOR_SPACE_T", "eColorSpace", "number", "", "")))
+    [plane_call] = [found.function for found in platform_functions.function_pointers(ROOT / PLANE_TABLE)
+                    if found.function.name == PLANE_CALL]
+    listed[PLANE_CALL] = _function(plane_call)
     return listed

@@ -13,6 +13,8 @@ struct ContractParameter
 {
     std::string_view name;
     std::string_view text;
+    std::string_view direction; ///< of a pointer: "in", "out" or "in,out"
+    std::string_view behind;    ///< what the pointer leads to, as the header writes it; empty: one object of its type
 };
 
 struct Contract

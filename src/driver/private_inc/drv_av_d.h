@@ -11,43 +11,44 @@
 extern "C" {
 #endif
 
-/** Commands of fgPmxDrvSetAvd, with what their parameter points to. Missing numbers are not the mixer's. */
+/** Commands of fgPmxDrvSetAvd; in brackets the type that their parameter points to. Missing numbers are not the
+ *  mixer's. Of the commands 17 to 31 the first byte in memory is the value, and no more is read. */
 typedef DRV_ENUM(PMX_AVD_COMMAND_T)
 {
-    PMX_CHG_HDMI_COLOR_SPACE = 0,        /**< one byte, a HDMI_COLOR_SPACE_T value */
-    PMX_CHG_HDMI_VIDEO_ASPECT_RATIO = 1, /**< UINT32, an ASPECT_RATIO_T value or any other; may be refused */
-    PMX_SET_UI_TV_SYSTEM = 2,            /**< PMX_SET_TV_SYS_PARAMETER_T */
-    PMX_SET_HDMI_BRIGHTNESS = 4,         /**< one byte */
-    PMX_SET_HDMI_CONTRAST = 5,           /**< one byte */
-    PMX_SET_HDMI_HUE = 6,                /**< one byte */
-    PMX_SET_HDMI_SATURATION = 7,         /**< one byte */
-    PMX_CHG_DEEP_COLOR_BIT = 8,          /**< one byte; may be refused */
-    PMX_SET_VIDEO_PLL = 9,               /**< PMX_SET_HDMI_RES_PARAMETER_T */
-    PMX_SET_HDMI_RES_CHG = 10,           /**< PMX_SET_HDMI_RES_PARAMETER_T */
-    PMX_CHG_UI_RES_AUTO = 13,            /**< one byte, FALSE or anything else */
-    PMX_SET_HDMI_SHARPNESS = 15,         /**< one byte */
-    PMX_SET_CCIR_RES_CHG = 16,           /**< PMX_SET_HDMI_RES_PARAMETER_T */
-    PMX_SET_EXT_SHARPNESS = 17,          /**< 17 to 31: the first byte in memory, and no more */
-    PMX_SET_EXT_BRIGHTNESS = 18,
-    PMX_SET_EXT_CONTRAST = 19,
-    PMX_SET_EXT_SATURATION = 20,
-    PMX_SET_EXT_COLOR_SPACE = 21,
-    PMX_SET_EXT_Y_C_DELAY = 22,
-    PMX_SET_EXT_CUE_CORRECT = 23,
-    PMX_SET_EXT_BORDER_LEVEL = 24,
-    PMX_SET_EXT_DEINTERLACE_MODE = 25,
-    PMX_SET_EXT_NOISE_REDUCTION = 26,
-    PMX_SET_EXT_EDGE_ENHANCEMENT = 27,
-    PMX_SET_EXT_DETAIL_ENHANCEMENT = 28,
-    PMX_SET_EXT_ZOOM_IMAGE = 29,
-    PMX_SET_EXT_GAMMA = 30,
-    PMX_SET_EXT_DEEP_COLOR = 31
+    PMX_CHG_HDMI_COLOR_SPACE = 0,        /**< [UINT8] a HDMI_COLOR_SPACE_T value */
+    PMX_CHG_HDMI_VIDEO_ASPECT_RATIO = 1, /**< [UINT32] an ASPECT_RATIO_T value or any other; may be refused */
+    PMX_SET_UI_TV_SYSTEM = 2,            /**< [PMX_SET_TV_SYS_PARAMETER_T] */
+    PMX_SET_HDMI_BRIGHTNESS = 4,         /**< [UINT8] */
+    PMX_SET_HDMI_CONTRAST = 5,           /**< [UINT8] */
+    PMX_SET_HDMI_HUE = 6,                /**< [UINT8] */
+    PMX_SET_HDMI_SATURATION = 7,         /**< [UINT8] */
+    PMX_CHG_DEEP_COLOR_BIT = 8,          /**< [UINT8] may be refused */
+    PMX_SET_VIDEO_PLL = 9,               /**< [PMX_SET_HDMI_RES_PARAMETER_T] */
+    PMX_SET_HDMI_RES_CHG = 10,           /**< [PMX_SET_HDMI_RES_PARAMETER_T] */
+    PMX_CHG_UI_RES_AUTO = 13,            /**< [BOOL] FALSE or anything else */
+    PMX_SET_HDMI_SHARPNESS = 15,         /**< [UINT8] */
+    PMX_SET_CCIR_RES_CHG = 16,           /**< [PMX_SET_HDMI_RES_PARAMETER_T] */
+    PMX_SET_EXT_SHARPNESS = 17,          /**< [UINT8] */
+    PMX_SET_EXT_BRIGHTNESS = 18,         /**< [UINT8] */
+    PMX_SET_EXT_CONTRAST = 19,           /**< [UINT8] */
+    PMX_SET_EXT_SATURATION = 20,         /**< [UINT8] */
+    PMX_SET_EXT_COLOR_SPACE = 21,        /**< [UINT8] */
+    PMX_SET_EXT_Y_C_DELAY = 22,          /**< [UINT8] */
+    PMX_SET_EXT_CUE_CORRECT = 23,        /**< [UINT8] */
+    PMX_SET_EXT_BORDER_LEVEL = 24,       /**< [UINT8] */
+    PMX_SET_EXT_DEINTERLACE_MODE = 25,   /**< [UINT8] */
+    PMX_SET_EXT_NOISE_REDUCTION = 26,    /**< [UINT8] */
+    PMX_SET_EXT_EDGE_ENHANCEMENT = 27,   /**< [UINT8] */
+    PMX_SET_EXT_DETAIL_ENHANCEMENT = 28, /**< [UINT8] */
+    PMX_SET_EXT_ZOOM_IMAGE = 29,         /**< [UINT8] */
+    PMX_SET_EXT_GAMMA = 30,              /**< [UINT8] */
+    PMX_SET_EXT_DEEP_COLOR = 31          /**< [UINT8] */
 } PMX_AVD_COMMAND_T;
 
-/** Queries of fgPmxDrvGetAvdInfo, with what their parameter points to. */
+/** Queries of fgPmxDrvGetAvdInfo; in brackets the type that their parameter points to. */
 typedef DRV_ENUM(PMX_AVD_QUERY_T)
 {
-    PMX_GET_VALID_RES_AND_VFREQ = 1 /**< PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T */
+    PMX_GET_VALID_RES_AND_VFREQ = 1 /**< [PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T] */
 } PMX_AVD_QUERY_T;
 
 DRV_STATIC_ASSERT(sizeof(PMX_AVD_COMMAND_T) == 4, "enumerations are 32 bits wide");
@@ -89,16 +90,16 @@ typedef struct
 } PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T;
 
 /** Command the driver. It takes a copy of what it needs before it returns.
- *  @param u4Command    a PMX_AVD_COMMAND_T value
- *  @param pvParameter  the command's parameter
- *  @param u4Length     always 1; the driver's own convention
+ *  @param     u4Command    a PMX_AVD_COMMAND_T value
+ *  @param[in] pvParameter  [by u4Command] the command's parameter
+ *  @param     u4Length     always 1; the driver's own convention
  *  @return FALSE when it refuses
  *  @context a thread that may sleep */
 BOOL fgPmxDrvSetAvd(UINT32 u4Command, void* pvParameter, UINT32 u4Length);
 
 /** Query the driver.
- *  @param u4Query      a PMX_AVD_QUERY_T value
- *  @param pvParameter  the query's record; the driver fills its outputs when it answers TRUE
+ *  @param         u4Query      a PMX_AVD_QUERY_T value
+ *  @param[in,out] pvParameter  [by u4Query] the query's record; the driver fills its outputs when it answers TRUE
  *  @return FALSE when it has no answer
  *  @context a thread that may sleep */
 BOOL fgPmxDrvGetAvdInfo(UINT32 u4Query, void* pvParameter);

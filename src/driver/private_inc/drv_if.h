@@ -14,11 +14,11 @@ extern "C" {
 #define IID_IPMX 9 /**< the mixer's IPMX table */
 
 /** Publish an interface.
- *  @param u2CompType  component type
- *  @param u2CompId    component id
- *  @param u4IfId      interface id
- *  @param pvIf        the table; stays where it is until it is unregistered
- *  @param pvTag       handed to every function of the table as its first argument
+ *  @param     u2CompType  component type
+ *  @param     u2CompId    component id
+ *  @param     u4IfId      interface id
+ *  @param[in] pvIf        [symbol] the table; stays where it is until it is unregistered
+ *  @param[in] pvTag       [tag] handed to every function of the table as its first argument
  *  @return 0 or above; negative on a failure
  *  @context a thread that may sleep */
 INT32 i4ImRegisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, const void* pvIf, void* pvTag);
@@ -34,20 +34,20 @@ INT32 i4ImUnregisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId
 /** Fetch an interface and hold it until it is released.
  *  The stack guarantees that a successful query yields a complete table, no function of it null; a failed one
  *  yields nothing that may be called.
- *  @param u2CompType  component type
- *  @param u2CompId    component id
- *  @param u4IfId      interface id
- *  @param ppvIf       receives the table
- *  @param ppvTag      receives its tag
+ *  @param      u2CompType  component type
+ *  @param      u2CompId    component id
+ *  @param      u4IfId      interface id
+ *  @param[out] ppvIf       [symbol] receives the table
+ *  @param[out] ppvTag      [tag] receives its tag
  *  @return 0 or above; negative on a failure
  *  @context a thread that may sleep; the mixer holds MutexPMX */
 INT32 i4ImQueryInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void** ppvIf, void** ppvTag);
 
 /** Give a fetched interface back, once for each successful query.
- *  @param u2CompType  component type
- *  @param u2CompId    component id
- *  @param u4IfId      interface id
- *  @param pvTag       the tag that the query yielded
+ *  @param     u2CompType  component type
+ *  @param     u2CompId    component id
+ *  @param     u4IfId      interface id
+ *  @param[in] pvTag       [tag] the tag that the query yielded
  *  @return 0 or above; negative on a failure
  *  @context a thread that may sleep; the mixer holds MutexPMX */
 INT32 i4ImReleaseInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void* pvTag);

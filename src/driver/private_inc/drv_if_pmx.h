@@ -190,9 +190,9 @@ typedef struct
 typedef struct
 {
     INT32 (*pi4SetMode)(void* pvTag, UCHAR ucMode, UCHAR ucVFreq, BOOL fgOSD5);
-    INT32 (*pi4GetMode)(void* pvTag, UCHAR* pucMode);
-    INT32 (*pi4GetOutSize)(void* pvTag, UINT32* pu4Width, UINT32* pu4Height);
-    INT32 (*pi4GetAspectRatio)(void* pvTag, UINT32* pu4AspectRatio);
+    INT32 (*pi4GetMode)(void* pvTag, UCHAR* pucMode);                         /**< as i4PmxGetMode */
+    INT32 (*pi4GetOutSize)(void* pvTag, UINT32* pu4Width, UINT32* pu4Height); /**< as i4PmxGetOutSize */
+    INT32 (*pi4GetAspectRatio)(void* pvTag, UINT32* pu4AspectRatio);          /**< as i4PmxGetAspectRatio */
     INT32 (*pi4DisableVideoPlane)(void* pvTag, UCHAR ucVdpId);
     INT32 (*pi4EnableVideoPlane)(void* pvTag, UCHAR ucVdpId);
     INT32 (*pi4OsdEnabled)(void* pvTag, INT32 i4SrcWidth, INT32 i4SrcHeight, DRV_GFX_COLOR_MODE_T eSrcColorSpace);

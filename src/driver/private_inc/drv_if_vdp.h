@@ -13,9 +13,8 @@ extern "C" {
 /** What a video plane offers. Each function takes first the tag that came with the table. The mixer calls
  *  pu4SetColorMode alone and ignores its result.
  *
- *  pu4SetColorMode tells the plane the mixer's colour space. It is called with MutexPMX held: a plane that from inside
- *  it called i4Pmx_Connect or i4Pmx_Disconnect, or made the mixer's colour space change once more, would wait for
- *  itself. */
+ *  pu4SetColorMode is called with MutexPMX held: a plane that from inside it called i4Pmx_Connect or i4Pmx_Disconnect,
+ *  or made the mixer's colour space change once more, would wait for itself. */
 typedef struct
 {
     UINT32 (*pu4SetPlaybackMode)(void* pvTag);
@@ -26,6 +25,10 @@ typedef struct
     UINT32 (*pu4Flush)(void* pvTag);
     UINT32 (*pu4AssignVdecCallback)(void* pvTag);
     UINT32 (*pu4DesiredResolution)(void* pvTag);
+    /** Tell the plane the mixer's colour space.
+     *  @param[in] pvTag        [tag] the tag that came with the table
+     *  @param     eColorSpace  a DRV_PMX_COLOR_SPACE_T value
+     *  @return the plane's result, which the mixer ignores */
     UINT32 (*pu4SetColorMode)(void* pvTag, DRV_PMX_COLOR_SPACE_T eColorSpace);
     UINT32 (*pu4GetCurrPictureInfo)(void* pvTag);
     UINT32 (*pu4PictureSent)(void* pvTag);

@@ -26,7 +26,8 @@ void OSDSetColorSpace(UCHAR ucColorSpace);
 void OSD_RNG_Set_Xvycc_En(BOOL fgEnable);
 
 /** Set the position offsets of the OSD planes.
- *  @param pi4Offset  five offsets in the hardware's unit, negative ones included; the driver must not keep the pointer
+ *  @param[in] pi4Offset  [5] five offsets in the hardware's unit, negative ones included; the driver must not keep the
+ *                        pointer
  *  @return the driver's result, which the mixer ignores */
 INT32 _i4OSD_SetPosOffset(INT32* pi4Offset);
 

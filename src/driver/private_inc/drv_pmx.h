@@ -62,13 +62,13 @@ PMX_API INT32 i4PMX_Uninit(UINT32 u4Case);
 PMX_API void PMX_Stop(void);
 
 /** Gate the mixer's clocks; the suspend member of pmx_pm_ops. The record is left alone.
- *  @param param  ignored
+ *  @param[in] param  [tag] ignored
  *  @return 0
  *  @context the kernel's power management */
 PMX_API int i4PMX_Suspend(void* param);
 
 /** Run the mixer's clocks again; the resume member of pmx_pm_ops. The record is left alone.
- *  @param param  ignored
+ *  @param[in] param  [tag] ignored
  *  @return 0
  *  @context the kernel's power management */
 PMX_API int i4PMX_Resume(void* param);
@@ -90,8 +90,8 @@ PMX_API INT32 i4PmxUnregisterIM(UINT16 u2CompType, UINT16 u2CompId);
 /* Master enable, capability, second video plane */
 
 /** Read the capability word.
- *  @param ucPmxId  mixer id, 0
- *  @param pu4Cap   receives it: bits 0 to 16 admit groups of resolution modes, 20 to 25, 27 and 30 features
+ *  @param      ucPmxId  mixer id, 0
+ *  @param[out] pu4Cap   receives it: bits 0 to 16 admit groups of resolution modes, 20 to 25, 27 and 30 features
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetCap(UCHAR ucPmxId, UINT32* pu4Cap);
@@ -104,8 +104,8 @@ PMX_API UINT32 PMX_GetCap(UCHAR ucPmxId, UINT32* pu4Cap);
 PMX_API UINT32 PMX_SetEnable(UCHAR ucPmxId, UCHAR ucEnable);
 
 /** Read the master enable.
- *  @param ucPmxId    mixer id, 0
- *  @param pucEnable  receives the value last given to PMX_SetEnable, 0 after a reset
+ *  @param      ucPmxId    mixer id, 0
+ *  @param[out] pucEnable  receives the value last given to PMX_SetEnable, 0 after a reset
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetEnable(UCHAR ucPmxId, UCHAR* pucEnable);
@@ -128,15 +128,15 @@ PMX_API UINT32 PMX_EnableVideoPlane(UCHAR ucPmxId, UCHAR ucVdpId);
 PMX_API UINT32 PMX_DisableVideoPlane(UCHAR ucPmxId, UCHAR ucVdpId);
 
 /** IPMX: PMX_EnableVideoPlane.
- *  @param pvTag    the table's tag
- *  @param ucVdpId  video plane
+ *  @param[in] pvTag    [tag] the table's tag
+ *  @param     ucVdpId  video plane
  *  @return 1
  *  @context any thread; takes no lock */
 PMX_API INT32 i4PmxEnableVideoPlane(void* pvTag, UCHAR ucVdpId);
 
 /** IPMX: PMX_DisableVideoPlane.
- *  @param pvTag    the table's tag
- *  @param ucVdpId  video plane
+ *  @param[in] pvTag    [tag] the table's tag
+ *  @param     ucVdpId  video plane
  *  @return 1
  *  @context any thread; takes no lock */
 PMX_API INT32 i4PmxDisableVideoPlane(void* pvTag, UCHAR ucVdpId);
@@ -162,8 +162,8 @@ PMX_API void vSetPLLGP_HDMIDDS(BYTE bResIndex);
 PMX_API UINT32 PMX_SetTvType(UCHAR ucPmxId, UCHAR ucTvType);
 
 /** Read the TV type.
- *  @param ucPmxId    mixer id, 0
- *  @param pucTvType  receives it
+ *  @param      ucPmxId    mixer id, 0
+ *  @param[out] pucTvType  receives it
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetTvType(UCHAR ucPmxId, UCHAR* pucTvType);
@@ -172,8 +172,8 @@ PMX_API UINT32 PMX_GetTvType(UCHAR ucPmxId, UCHAR* pucTvType);
 
 /** The module's own formatted print, admitted by bit `level` of PMX_debug_level. The text is cut to 511 characters and
  *  goes to the console as a format: a percent sign in it, wherever it came from, is interpreted once more.
- *  @param level          0 to 31; any other prints nothing
- *  @param format_string  printf format
+ *  @param     level          0 to 31; any other prints nothing
+ *  @param[in] format_string  [text] printf format
  *  @context any thread; takes no lock, needs 512 bytes of stack */
 PMX_API void PMX_Printf(INT32 level, const char* format_string, ...) DRV_PRINTF_FORMAT(2, 3);
 
@@ -203,10 +203,10 @@ PMX_API UINT32 PMX_CheckCap(UCHAR ucPmxId, UCHAR ucMode);
 PMX_API UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5);
 
 /** IPMX: PMX_SetMode.
- *  @param pvTag    the table's tag
- *  @param ucMode   a PMX_RESOLUTION_MODE_T value
- *  @param ucVFreq  vertical frequency in Hz
- *  @param fgOSD5   fifth-OSD mode 0, 1 or 2; for the TV encoders alone, not stored
+ *  @param[in] pvTag    [tag] the table's tag
+ *  @param     ucMode   a PMX_RESOLUTION_MODE_T value
+ *  @param     ucVFreq  vertical frequency in Hz
+ *  @param     fgOSD5   fifth-OSD mode 0, 1 or 2; for the TV encoders alone, not stored
  *  @return PMX_SET_OK; 0 for a tag whose low 8 bits are not 0, or a refused mode
  *  @context a thread that may sleep; takes no lock: no other mode change may run */
 PMX_API INT32 i4PmxSetMode(void* pvTag, UCHAR ucMode, UCHAR ucVFreq, BOOL fgOSD5);
@@ -216,14 +216,14 @@ PMX_API INT32 i4PmxSetMode(void* pvTag, UCHAR ucMode, UCHAR ucVFreq, BOOL fgOSD5
  *  keeps what the caller gave. Ends by deciding whether graphics wait for the display part: see
  *  PMX_SetFormatChangeFlag. A refused format lowers the format-change flag and stores nothing. Only the mixer's format
  *  is checked: what the other outputs were given goes to their drivers unchecked, cut to 8 bits.
- *  @param ucPmxId     mixer id, 0
- *  @param prOutConf   four outputs, indexed PMX_OUTPUT_CCIR to PMX_OUTPUT_CVBS; fgOutputEnable and eResMode of each are
- *                     used, and eCcirDrvInfo of PMX_OUTPUT_CCIR; u4VFreq is not. Read once, before the first log line:
- *                     what becomes of it afterwards changes nothing
- *  @param ucVFreq     vertical frequency of all outputs in Hz: 60, 30, 29, 23 and 0 select NTSC, any other PAL
- *  @param rDrvExtScl  how the external chip is used; a change programs everything
- *  @param fgOSD5      fifth OSD plane asked for on the analogue outputs: 0 no, 1 composite, 2 both. An HD mixer format
- *                     shows it on composite in any case, and on both when component's mode is not HD
+ *  @param     ucPmxId     mixer id, 0
+ *  @param[in] prOutConf   [PMX_OUTPUT_NUM] four outputs, indexed PMX_OUTPUT_CCIR to PMX_OUTPUT_CVBS; fgOutputEnable and
+ *                         eResMode of each are used, and eCcirDrvInfo of PMX_OUTPUT_CCIR; u4VFreq is not. Read once,
+ *                         before the first log line: what becomes of it afterwards changes nothing
+ *  @param     ucVFreq     vertical frequency of all outputs in Hz: 60, 30, 29, 23 and 0 select NTSC, any other PAL
+ *  @param     rDrvExtScl  how the external chip is used; a change programs everything
+ *  @param     fgOSD5      fifth OSD plane asked for on the analogue outputs: 0 no, 1 composite, 2 both. An HD mixer
+ *                         format shows it on composite in any case, and on both when component's mode is not HD
  *  @return PMX_SET_OK; 0 for a mixer id other than 0, a null pointer or a mixer format that PMX_CheckCap refuses
  *  @context a thread that may sleep; takes no lock: no other mode change may run, the display timer may expire at any
  *           point */
@@ -231,15 +231,15 @@ PMX_API UINT32 PMX_SetModeEx(UCHAR ucPmxId, PMX_RESOLUTION_T* prOutConf, UCHAR u
                              UINT8 fgOSD5);
 
 /** Read the mixer's resolution mode.
- *  @param ucPmxId  mixer id, 0
- *  @param pucMode  receives a PMX_RESOLUTION_MODE_T value
+ *  @param      ucPmxId  mixer id, 0
+ *  @param[out] pucMode  receives a PMX_RESOLUTION_MODE_T value
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetMode(UCHAR ucPmxId, UCHAR* pucMode);
 
 /** IPMX: PMX_GetMode.
- *  @param pvTag    the table's tag
- *  @param pucMode  receives a PMX_RESOLUTION_MODE_T value
+ *  @param[in]  pvTag    [tag] the table's tag
+ *  @param[out] pucMode  receives a PMX_RESOLUTION_MODE_T value
  *  @return 1; 0 for a tag whose low 8 bits are not 0, or a null pointer
  *  @context any thread; takes no lock */
 PMX_API INT32 i4PmxGetMode(void* pvTag, UCHAR* pucMode);
@@ -279,8 +279,8 @@ PMX_API UINT32 PMX_SetOsdEnableFlag(BOOL bIsOsdEnable);
 PMX_API UINT32 PMX_SetOsdEnable(void);
 
 /** Expiry function of the display timer: the display part never answered, or has long answered; lowers the flag.
- *  @param h      ignored
- *  @param pvArg  ignored
+ *  @param     h      ignored
+ *  @param[in] pvArg  [tag] ignored
  *  @context the timer's */
 PMX_API void _PMX_TmrIsr(HANDLE_T h, void* pvArg);
 
@@ -309,17 +309,17 @@ PMX_API void PMX_ColorSpaceSetup(DRV_PMX_COLOR_SPACE_T eMixerOutCS, UCHAR ucOutp
 
 /** Read the size of the mixer's picture in its resolution mode. The 1440 and 2880 modes count 720 pixels;
  *  RES_2D_576I50HZ, the 4K modes and all other numbers count 1920 x 1080.
- *  @param ucPmxId    mixer id, 0
- *  @param pu4Width   receives the width in pixels
- *  @param pu4Height  receives the height in lines of a frame
+ *  @param      ucPmxId    mixer id, 0
+ *  @param[out] pu4Width   receives the width in pixels
+ *  @param[out] pu4Height  receives the height in lines of a frame
  *  @return 1; 0 for a mixer id other than 0 or if either pointer is null, and then neither is written
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetOutSize(UCHAR ucPmxId, UINT32* pu4Width, UINT32* pu4Height);
 
 /** IPMX: PMX_GetOutSize.
- *  @param pvTag      the table's tag
- *  @param pu4Width   receives the width in pixels
- *  @param pu4Height  receives the height in lines of a frame
+ *  @param[in]  pvTag      [tag] the table's tag
+ *  @param[out] pu4Width   receives the width in pixels
+ *  @param[out] pu4Height  receives the height in lines of a frame
  *  @return 1; 0 for a tag whose low 8 bits are not 0, or if either pointer is null, and then neither is written
  *  @context any thread; takes no lock */
 PMX_API INT32 i4PmxGetOutSize(void* pvTag, UINT32* pu4Width, UINT32* pu4Height);
@@ -349,11 +349,11 @@ PMX_API BOOL fgPmxFmtHDOutput(UCHAR ucPmxId);
 PMX_API UINT32 PMX_SetTVSystem(UCHAR ucPmxId, UINT16 u2VSyncFreq, BOOL fgTvSysAuto);
 
 /** Ask the HDMI/AV driver what it would choose for a resolution and frequency.
- *  @param ucPmxId                   mixer id, 0
- *  @param ucChkRes                  a PMX_RESOLUTION_MODE_T value
- *  @param u2VSyncFreq               vertical frequency in Hz
- *  @param ucSupportedAutoRes        receives the low 8 bits of the driver's resolution; not tested for null
- *  @param ucSupportedAutoVsyncFreg  receives the frequency in Hz; not tested for null
+ *  @param      ucPmxId                   mixer id, 0
+ *  @param      ucChkRes                  a PMX_RESOLUTION_MODE_T value
+ *  @param      u2VSyncFreq               vertical frequency in Hz
+ *  @param[out] ucSupportedAutoRes        receives the low 8 bits of the driver's resolution; not tested for null
+ *  @param[out] ucSupportedAutoVsyncFreg  receives the frequency in Hz; not tested for null
  *  @return 1; 0 for a mixer id other than 0 or when the driver has no answer, and then nothing is written
  *  @context a thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_ChkSupportedRes(UCHAR ucPmxId, UCHAR ucChkRes, UINT16 u2VSyncFreq, UCHAR* ucSupportedAutoRes,
@@ -381,9 +381,9 @@ PMX_API void PMX_RecordUiResAuto(BOOL fgIsAuto);
 PMX_API UINT32 PMX_SetBg(UCHAR ucPmxId, UINT32 u4BgColor);
 
 /** Set the whole stacking order.
- *  @param ucPmxId        mixer id, 0
- *  @param pu4PlaneOrder  eight plane ids, position 0 first; the record keeps their low 8 bits, the hardware gets the
- *                        words as given
+ *  @param     ucPmxId        mixer id, 0
+ *  @param[in] pu4PlaneOrder  [8] eight plane ids, position 0 first; the record keeps their low 8 bits, the hardware
+ *                            gets the words as given
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetPlaneOrderArray(UCHAR ucPmxId, const UINT32* pu4PlaneOrder);
@@ -398,9 +398,9 @@ PMX_API UINT32 PMX_SetPlaneOrderArray(UCHAR ucPmxId, const UINT32* pu4PlaneOrder
 PMX_API UINT32 PMX_SetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR ucPlaneOrder);
 
 /** Find a plane's position.
- *  @param ucPmxId        mixer id, 0
- *  @param ucVdpId        plane id
- *  @param pucPlaneOrder  receives the lowest position that holds the plane, or 8 when none does
+ *  @param      ucPmxId        mixer id, 0
+ *  @param      ucVdpId        plane id
+ *  @param[out] pucPlaneOrder  receives the lowest position that holds the plane, or 8 when none does
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR* pucPlaneOrder);
@@ -422,8 +422,8 @@ PMX_API UINT32 PMX_SetOrderVdpComp0(UCHAR ucPmxId, UINT32 u4OnTop);
 PMX_API UINT32 d_PMX_SetOrderVdpComp0(UCHAR ucPmxId, UINT32 u4OnTop);
 
 /** Read what PMX_SetOrderVdpComp0 was last given, 0 at load.
- *  @param ucPmxId   mixer id, unchecked
- *  @param pu4OnTop  receives it; not tested for null
+ *  @param      ucPmxId   mixer id, unchecked
+ *  @param[out] pu4OnTop  receives it; not tested for null
  *  @return 1
  *  @context any thread; takes no lock */
 PMX_API UINT32 d_PMX_GetOrderVdpComp0(UCHAR ucPmxId, UINT32* pu4OnTop);
@@ -436,8 +436,8 @@ PMX_API UINT32 d_PMX_GetOrderVdpComp0(UCHAR ucPmxId, UINT32* pu4OnTop);
 PMX_API UINT32 PMX_VdpGetPlanePosition(UCHAR ucPmxId, UCHAR ucVdpHwId);
 
 /** IPMX: PMX_VdpGetPlanePosition.
- *  @param pvTag      the table's tag
- *  @param ucVdpHwId  video plane 0 or 1
+ *  @param[in] pvTag      [tag] the table's tag
+ *  @param     ucVdpHwId  video plane 0 or 1
  *  @return a DRV_PMX_PLANE_T value
  *  @context any thread; takes no lock */
 PMX_API INT32 i4PmxGetPlanePosition(void* pvTag, UCHAR ucVdpHwId);
@@ -455,8 +455,8 @@ PMX_API INT32 i4PmxGetPlanePosition(void* pvTag, UCHAR ucVdpHwId);
 PMX_API UINT32 PMX_SetArbPlaneOrder(UCHAR ucPmxId, UINT32 u4PlaneOrder);
 
 /** Read the arbitrary plane order last stored; a difference from the hardware's is logged.
- *  @param ucPmxId        mixer id, unchecked; printed and handed on as given
- *  @param pu4PlaneOrder  receives the stored order; not tested for null
+ *  @param      ucPmxId        mixer id, unchecked; printed and handed on as given
+ *  @param[out] pu4PlaneOrder  receives the stored order; not tested for null
  *  @return 1; 0 when the hardware cannot report its order, and then nothing is written
  *  @context a thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_GetArbPlaneOrder(UCHAR ucPmxId, UINT32* pu4PlaneOrder);
@@ -473,9 +473,9 @@ PMX_API UINT32 PMX_GetArbPlaneOrder(UCHAR ucPmxId, UINT32* pu4PlaneOrder);
 PMX_API UINT32 PMX_SetSwapEnable(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucSwapMode);
 
 /** Ask the hardware whether two planes are swapped.
- *  @param ucPmxId     mixer id, 0
- *  @param pucEnable   receives TRUE or FALSE; not tested for null, not written for an unknown swap mode
- *  @param ucSwapMode  as for PMX_SetSwapEnable
+ *  @param      ucPmxId     mixer id, 0
+ *  @param[out] pucEnable   receives TRUE or FALSE; not tested for null, not written for an unknown swap mode
+ *  @param      ucSwapMode  as for PMX_SetSwapEnable
  *  @return 1, also for an unknown swap mode; 0 for a mixer id other than 0
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetSwapEnable(UCHAR ucPmxId, UCHAR* pucEnable, UCHAR ucSwapMode);
@@ -488,8 +488,8 @@ PMX_API UINT32 PMX_GetSwapEnable(UCHAR ucPmxId, UCHAR* pucEnable, UCHAR ucSwapMo
 PMX_API UINT32 PMX_SetCBEnable(UCHAR ucPmxId, UCHAR ucEnable);
 
 /** Read the colour bar's switch.
- *  @param ucPmxId    mixer id, 0
- *  @param pucEnable  receives the value last given, also while a mute hides the bar
+ *  @param      ucPmxId    mixer id, 0
+ *  @param[out] pucEnable  receives the value last given, also while a mute hides the bar
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetCBEnable(UCHAR ucPmxId, UCHAR* pucEnable);
@@ -502,8 +502,8 @@ PMX_API UINT32 PMX_GetCBEnable(UCHAR ucPmxId, UCHAR* pucEnable);
 PMX_API UINT32 PMX_SetMuteEnable(UCHAR ucPmxId, UCHAR ucEnable);
 
 /** Read the mute.
- *  @param ucPmxId    mixer id, 0
- *  @param pucEnable  receives the value last given
+ *  @param      ucPmxId    mixer id, 0
+ *  @param[out] pucEnable  receives the value last given
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetMuteEnable(UCHAR ucPmxId, UCHAR* pucEnable);
@@ -622,30 +622,30 @@ PMX_API void PMX_InformVdpColorSpace(UCHAR ucPmxId);
 /* Source events through IPMX. They are inert: only the direct calls count. */
 
 /** IPMX: graphics plane enabled; does nothing.
- *  @param pvTag           ignored
- *  @param i4SrcWidth      ignored
- *  @param i4SrcHeight     ignored
- *  @param eSrcColorSpace  ignored
+ *  @param[in] pvTag           [tag] ignored
+ *  @param     i4SrcWidth      ignored
+ *  @param     i4SrcHeight     ignored
+ *  @param     eSrcColorSpace  ignored
  *  @return 1
  *  @context any */
 PMX_API INT32 i4PmxOsdEnabled(void* pvTag, INT32 i4SrcWidth, INT32 i4SrcHeight, DRV_GFX_COLOR_MODE_T eSrcColorSpace);
 
 /** IPMX: graphics plane disabled; does nothing.
- *  @param pvTag  ignored
+ *  @param[in] pvTag  [tag] ignored
  *  @return 1
  *  @context any */
 PMX_API INT32 i4PmxOsdDisabled(void* pvTag);
 
 /** IPMX: video plane enabled; does nothing.
- *  @param pvTag        ignored
- *  @param i4SrcWidth   ignored
- *  @param i4SrcHeight  ignored
+ *  @param[in] pvTag        [tag] ignored
+ *  @param     i4SrcWidth   ignored
+ *  @param     i4SrcHeight  ignored
  *  @return 1
  *  @context any */
 PMX_API INT32 i4PmxVdpEnabled(void* pvTag, INT32 i4SrcWidth, INT32 i4SrcHeight);
 
 /** IPMX: video plane disabled; does nothing.
- *  @param pvTag  ignored
+ *  @param[in] pvTag  [tag] ignored
  *  @return 1
  *  @context any */
 PMX_API INT32 i4PmxVdpDisabled(void* pvTag);
@@ -662,8 +662,8 @@ PMX_API INT32 i4PmxVdpDisabled(void* pvTag);
 PMX_API UINT32 PMX_SetBrightness(UCHAR ucPmxId, UCHAR ucBrightness, UCHAR bSetTVE);
 
 /** Read brightness of the analogue outputs.
- *  @param ucPmxId        mixer id, 0
- *  @param pucBrightness  receives it
+ *  @param      ucPmxId        mixer id, 0
+ *  @param[out] pucBrightness  receives it
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 21 is clear
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetBrightness(UCHAR ucPmxId, UCHAR* pucBrightness);
@@ -674,7 +674,7 @@ PMX_API UINT32 PMX_GetBrightness(UCHAR ucPmxId, UCHAR* pucBrightness);
 PMX_API void d_PMX_SetBrightness(UCHAR ucBrightness);
 
 /** Read brightness of the analogue outputs of mixer 0.
- *  @param pucBrightness  receives it, unless PMX_GetBrightness fails
+ *  @param[out] pucBrightness  receives it, unless PMX_GetBrightness fails
  *  @context any thread; takes no lock */
 PMX_API void d_PMX_GetBrightness(UCHAR* pucBrightness);
 
@@ -688,8 +688,8 @@ PMX_API void d_PMX_GetBrightness(UCHAR* pucBrightness);
 PMX_API UINT32 PMX_SetContrast(UCHAR ucPmxId, UCHAR ucContrast, UCHAR bSetTVE);
 
 /** Read contrast of the analogue outputs.
- *  @param ucPmxId      mixer id, 0
- *  @param pucContrast  receives it
+ *  @param      ucPmxId      mixer id, 0
+ *  @param[out] pucContrast  receives it
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 22 is clear
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetContrast(UCHAR ucPmxId, UCHAR* pucContrast);
@@ -700,7 +700,7 @@ PMX_API UINT32 PMX_GetContrast(UCHAR ucPmxId, UCHAR* pucContrast);
 PMX_API void d_PMX_SetContrast(UCHAR ucContrast);
 
 /** Read contrast of the analogue outputs of mixer 0.
- *  @param pucContrast  receives it, unless PMX_GetContrast fails
+ *  @param[out] pucContrast  receives it, unless PMX_GetContrast fails
  *  @context any thread; takes no lock */
 PMX_API void d_PMX_GetContrast(UCHAR* pucContrast);
 
@@ -713,8 +713,8 @@ PMX_API void d_PMX_GetContrast(UCHAR* pucContrast);
 PMX_API UINT32 PMX_SetHue(UCHAR ucPmxId, UCHAR ucHue, UCHAR bSetTVE);
 
 /** Read hue of the analogue outputs.
- *  @param ucPmxId  mixer id, 0
- *  @param pucHue   receives it
+ *  @param      ucPmxId  mixer id, 0
+ *  @param[out] pucHue   receives it
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 23 is clear
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetHue(UCHAR ucPmxId, UCHAR* pucHue);
@@ -725,7 +725,7 @@ PMX_API UINT32 PMX_GetHue(UCHAR ucPmxId, UCHAR* pucHue);
 PMX_API void d_PMX_SetHue(UCHAR ucHue);
 
 /** Read hue of the analogue outputs of mixer 0.
- *  @param pucHue  receives it, unless PMX_GetHue fails
+ *  @param[out] pucHue  receives it, unless PMX_GetHue fails
  *  @context any thread; takes no lock */
 PMX_API void d_PMX_GetHue(UCHAR* pucHue);
 
@@ -738,8 +738,8 @@ PMX_API void d_PMX_GetHue(UCHAR* pucHue);
 PMX_API UINT32 PMX_SetSaturation(UCHAR ucPmxId, UCHAR ucSaturation, UCHAR bSetTVE);
 
 /** Read saturation of the analogue outputs.
- *  @param ucPmxId        mixer id, 0
- *  @param pucSaturation  receives it
+ *  @param      ucPmxId        mixer id, 0
+ *  @param[out] pucSaturation  receives it
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 24 is clear
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetSaturation(UCHAR ucPmxId, UCHAR* pucSaturation);
@@ -750,7 +750,7 @@ PMX_API UINT32 PMX_GetSaturation(UCHAR ucPmxId, UCHAR* pucSaturation);
 PMX_API void d_PMX_SetSaturation(UCHAR ucSaturation);
 
 /** Read saturation of the analogue outputs of mixer 0.
- *  @param pucSaturation  receives it, unless PMX_GetSaturation fails
+ *  @param[out] pucSaturation  receives it, unless PMX_GetSaturation fails
  *  @context any thread; takes no lock */
 PMX_API void d_PMX_GetSaturation(UCHAR* pucSaturation);
 
@@ -763,8 +763,8 @@ PMX_API void d_PMX_GetSaturation(UCHAR* pucSaturation);
 PMX_API UINT32 PMX_SetSharpness(UCHAR ucPmxId, UCHAR ucSharpness, UCHAR bSetTVE);
 
 /** Read sharpness of the analogue outputs.
- *  @param ucPmxId       mixer id, 0
- *  @param pucSharpness  receives it
+ *  @param      ucPmxId       mixer id, 0
+ *  @param[out] pucSharpness  receives it
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 27 is clear
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetSharpness(UCHAR ucPmxId, UCHAR* pucSharpness);
@@ -775,7 +775,7 @@ PMX_API UINT32 PMX_GetSharpness(UCHAR ucPmxId, UCHAR* pucSharpness);
 PMX_API void d_PMX_SetSharpness(UCHAR ucSharpness);
 
 /** Read sharpness of the analogue outputs of mixer 0.
- *  @param pucSharpness  receives it, unless PMX_GetSharpness fails
+ *  @param[out] pucSharpness  receives it, unless PMX_GetSharpness fails
  *  @context any thread; takes no lock */
 PMX_API void d_PMX_GetSharpness(UCHAR* pucSharpness);
 
@@ -787,15 +787,15 @@ PMX_API void d_PMX_GetSharpness(UCHAR* pucSharpness);
 PMX_API UINT32 PMX_SetGamma(UCHAR ucPmxId, UCHAR ucGamma);
 
 /** Read what PMX_SetGamma was last given.
- *  @param ucPmxId   mixer id, 0
- *  @param pucGamma  receives it
+ *  @param      ucPmxId   mixer id, 0
+ *  @param[out] pucGamma  receives it
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 20 is clear
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetGamma(UCHAR ucPmxId, UCHAR* pucGamma);
 
 /** Read the number of gamma curves.
- *  @param ucPmxId     mixer id, 0
- *  @param pucGammaNs  receives 4
+ *  @param      ucPmxId     mixer id, 0
+ *  @param[out] pucGammaNs  receives 4
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 20 is clear
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetGammaNs(UCHAR ucPmxId, UCHAR* pucGammaNs);
@@ -809,9 +809,9 @@ PMX_API UINT32 PMX_GetGammaNs(UCHAR ucPmxId, UCHAR* pucGammaNs);
 PMX_API UINT32 PMX_SetBlackLv(UCHAR ucPmxId, UCHAR ucCAVEn, UCHAR ucCVBSEn);
 
 /** Read the black level of the analogue outputs.
- *  @param ucPmxId    mixer id, 0
- *  @param pucCAVEn   receives component's switch
- *  @param pucCVBSEn  receives composite's switch
+ *  @param      ucPmxId    mixer id, 0
+ *  @param[out] pucCAVEn   receives component's switch
+ *  @param[out] pucCVBSEn  receives composite's switch
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 30 is clear
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetBlackLv(UCHAR ucPmxId, UCHAR* pucCAVEn, UCHAR* pucCVBSEn);
@@ -881,15 +881,15 @@ PMX_API UINT32 PMX_SetAspectRatioNext(UCHAR ucPmxId);
 PMX_API UINT32 PMX_SetDigestAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgDigestEnable);
 
 /** Read the aspect ratio in force: the digest view's while it is shown, else the normal one.
- *  @param ucPmxId         mixer id, 0
- *  @param pu4AspectRatio  receives an ASP_ code
+ *  @param      ucPmxId         mixer id, 0
+ *  @param[out] pu4AspectRatio  receives an ASP_ code
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio);
 
 /** IPMX: PMX_GetAspectRatio.
- *  @param pvTag           the table's tag
- *  @param pu4AspectRatio  receives an ASP_ code
+ *  @param[in]  pvTag           [tag] the table's tag
+ *  @param[out] pu4AspectRatio  receives an ASP_ code
  *  @return 1; 0 for a tag whose low 8 bits are not 0, or a null pointer
  *  @context any thread; takes no lock */
 PMX_API INT32 i4PmxGetAspectRatio(void* pvTag, UINT32* pu4AspectRatio);
@@ -901,22 +901,22 @@ PMX_API INT32 i4PmxGetAspectRatio(void* pvTag, UINT32* pu4AspectRatio);
 PMX_API BOOL PMX_IsUnderDigestMode(UCHAR ucPmxId);
 
 /** Read the normal aspect ratio, digest view or not.
- *  @param ucPmxId         mixer id, 0
- *  @param pu4AspectRatio  receives an ASP_ code
+ *  @param      ucPmxId         mixer id, 0
+ *  @param[out] pu4AspectRatio  receives an ASP_ code
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetNormalAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio);
 
 /** Read the digest view's aspect ratio, shown or not.
- *  @param ucPmxId         mixer id, 0
- *  @param pu4AspectRatio  receives an ASP_ code
+ *  @param      ucPmxId         mixer id, 0
+ *  @param[out] pu4AspectRatio  receives an ASP_ code
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetDigestAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio);
 
 /** Read the aspect ratio that the middleware asked for last: the one that waits, if any, else the normal one.
- *  @param ucPmxId         mixer id, 0
- *  @param pu4AspectRatio  receives an ASP_ code
+ *  @param      ucPmxId         mixer id, 0
+ *  @param[out] pu4AspectRatio  receives an ASP_ code
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetAspectRatioMW(UCHAR ucPmxId, UINT32* pu4AspectRatio);
@@ -931,8 +931,8 @@ PMX_API UINT32 PMX_GetAspectRatioMW(UCHAR ucPmxId, UINT32* pu4AspectRatio);
 PMX_API UINT32 PMX_SetDigitalOutEnable(UCHAR ucPmxId, UCHAR ucEnable);
 
 /** Read the parallel digital port's switch.
- *  @param ucPmxId    mixer id, 0
- *  @param pucEnable  receives the value last given
+ *  @param      ucPmxId    mixer id, 0
+ *  @param[out] pucEnable  receives the value last given
  *  @return 1; 0 for a mixer id other than 0, a null pointer or when capability bit 25 is clear
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetDigitalOutEnable(UCHAR ucPmxId, UCHAR* pucEnable);
@@ -967,8 +967,8 @@ PMX_API UINT32 PMX_SetDigitalOutDrv(UINT32 u4Drving);
 PMX_API UINT32 PMX_SetDigitalOutRgb(UCHAR ucPmxId, UCHAR ucRgb);
 
 /** Read the digital picture's colour format.
- *  @param ucPmxId  mixer id, 0
- *  @param pucRgb   receives the value last given
+ *  @param      ucPmxId  mixer id, 0
+ *  @param[out] pucRgb   receives the value last given
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetDigitalOutRgb(UCHAR ucPmxId, UCHAR* pucRgb);

@@ -46,10 +46,10 @@ void PMX_HalClockSet(UINT32 u4ClockId, UINT32 u4On);
 void PMX_HalSetBg(UCHAR ucPmxId, UINT32 u4BgColor);
 
 /** Program the stacking order.
- *  @param ucPmxId        mixer id
- *  @param u4Number       3 at reset, 8 for an order that was asked for
- *  @param pu4PlaneOrder  eight plane ids, position 0 first; a plane may be named twice, and any 32-bit word may come
- *                        and must do no harm */
+ *  @param     ucPmxId        mixer id
+ *  @param     u4Number       3 at reset, 8 for an order that was asked for
+ *  @param[in] pu4PlaneOrder  [8] eight plane ids, position 0 first; a plane may be named twice, and any 32-bit word may
+ *                            come and must do no harm */
 void PMX_HalPlaneOrder(UCHAR ucPmxId, UINT32 u4Number, const UINT32* pu4PlaneOrder);
 
 /** Put the plane selectors into their initial state.
@@ -58,15 +58,15 @@ void PMX_HalInitPlaneOrder(UCHAR ucPmxId);
 
 /** Program the eight plane selectors.
  *  The layer below guarantees that on success it has written all eight delays.
- *  @param ucPmxId      mixer id
- *  @param pu1PlnSel    eight source numbers 0 to 7, plane 0 first
- *  @param pi4PlnDelay  receives eight delays of the new arrangement, plane 0 first, in the hardware's unit
+ *  @param      ucPmxId      mixer id
+ *  @param[in]  pu1PlnSel    [8] eight source numbers 0 to 7, plane 0 first
+ *  @param[out] pi4PlnDelay  [8] receives eight delays of the new arrangement, plane 0 first, in the hardware's unit
  *  @return 0; anything else when the order is refused */
 INT32 PMX_HalSetPlaneOrder(UCHAR ucPmxId, const UINT8* pu1PlnSel, INT32* pi4PlnDelay);
 
 /** Read the eight plane selectors.
- *  @param ucPmxId    mixer id
- *  @param pu1PlnSel  receives eight source numbers, plane 0 first
+ *  @param      ucPmxId    mixer id
+ *  @param[out] pu1PlnSel  [8] receives eight source numbers, plane 0 first
  *  @return 0; anything else when they cannot be read */
 INT32 PMX_HalGetPlaneOrder(UCHAR ucPmxId, UINT8* pu1PlnSel);
 
@@ -212,9 +212,9 @@ void PMX_HalSetBrightness(UCHAR ucPmxId, UCHAR ucBrightness);
 void PMX_HalSetContrast(UCHAR ucPmxId, UCHAR ucContrast);
 
 /** Set the gamma curve.
- *  @param ucPmxId   mixer id
- *  @param ucEnable  1 on, 0 off
- *  @param pucCurve  nine output levels at equally spaced inputs from 0 to 255; null when off */
+ *  @param     ucPmxId   mixer id
+ *  @param     ucEnable  1 on, 0 off
+ *  @param[in] pucCurve  [9] nine output levels at equally spaced inputs from 0 to 255; null when off */
 void PMX_HalSetGamma(UCHAR ucPmxId, UCHAR ucEnable, const UCHAR* pucCurve);
 
 /** Set the parallel digital port.

@@ -42,15 +42,15 @@ DRV_STATIC_ASSERT(sizeof(X_SEMA_OPTION_T) == 4, "enumerations are 32 bits wide")
 DRV_STATIC_ASSERT(sizeof(X_TIMER_FLAG_T) == 4, "enumerations are 32 bits wide");
 
 /** Expiry function of a timer; called where nobody may sleep.
- *  @param hTimer  the timer that ran out
- *  @param pvArg   the argument given to x_timer_start */
+ *  @param     hTimer  the timer that ran out
+ *  @param[in] pvArg   [tag] the argument given to x_timer_start */
 typedef void (*x_timer_cb_fct)(HANDLE_T hTimer, void* pvArg);
 
 /** Create a semaphore.
  *  The stack guarantees that a failed creation leaves *phSema as it was.
- *  @param phSema       receives the handle, never 0 on success
- *  @param eType        binary, counting, or mutex (owned by the thread that locked it)
- *  @param u4InitValue  1: free, 0: taken; a count for a counting semaphore
+ *  @param[out] phSema       receives the handle, never 0 on success
+ *  @param      eType        binary, counting, or mutex (owned by the thread that locked it)
+ *  @param      u4InitValue  1: free, 0: taken; a count for a counting semaphore
  *  @return OSR_OK or a failure
  *  @context a thread that may sleep */
 INT32 x_sema_create(HANDLE_T* phSema, X_SEMA_TYPE_T eType, UINT32 u4InitValue);
@@ -77,17 +77,17 @@ INT32 x_sema_delete(HANDLE_T hSema);
 
 /** Create a timer, stopped.
  *  The stack guarantees that a failed creation leaves *phTimer as it was.
- *  @param phTimer  receives the handle, never 0 on success
+ *  @param[out] phTimer  receives the handle, never 0 on success
  *  @return OSR_OK or a failure
  *  @context a thread that may sleep */
 INT32 x_timer_create(HANDLE_T* phTimer);
 
 /** Start a timer, from its full interval when it is running.
- *  @param hTimer      handle from x_timer_create
- *  @param u4DelayMs   interval in milliseconds
- *  @param eFlag       once or repeatedly
- *  @param pfCallback  expiry function, called in the timer's context
- *  @param pvArg       handed to the expiry function
+ *  @param     hTimer      handle from x_timer_create
+ *  @param     u4DelayMs   interval in milliseconds
+ *  @param     eFlag       once or repeatedly
+ *  @param[in] pfCallback  [symbol] expiry function, called in the timer's context
+ *  @param[in] pvArg       [tag] handed to the expiry function
  *  @return OSR_OK or a failure (a bad handle, for instance 0)
  *  @context any thread */
 INT32 x_timer_start(HANDLE_T hTimer, UINT32 u4DelayMs, X_TIMER_FLAG_T eFlag, x_timer_cb_fct pfCallback, void* pvArg);
@@ -111,52 +111,52 @@ INT32 x_timer_delete(HANDLE_T hTimer);
 void x_thread_delay(UINT32 u4DelayMs);
 
 /** Format text; always terminates it.
- *  @param szBuffer  receives the text
- *  @param zSize     its size in characters, terminator included
- *  @param szFormat  printf format
- *  @param rArgs     its values
+ *  @param[out] szBuffer  [text of zSize] receives the text
+ *  @param      zSize     its size in characters, terminator included
+ *  @param[in]  szFormat  [text] printf format
+ *  @param      rArgs     its values
  *  @return length that the whole text has, without the terminator; negative on a failure
  *  @context any */
 INT32 x_vsnprintf(CHAR* szBuffer, size_t zSize, const CHAR* szFormat, va_list rArgs) DRV_PRINTF_FORMAT(3, 0);
 
 /** Levelled console print: prints when the console's level admits i4Level.
  *  A null string argument is printed as (null).
- *  @param i4Level   0 status report, warnings, handshake; 1 life cycle and display-mode progress; 5 errors; 8 source
- *                   and plane events, refusals; 9 whatever else helps to follow the layer, and what the interface
- *                   manager refuses
- *  @param szFormat  printf format
+ *  @param     i4Level   0 status report, warnings, handshake; 1 life cycle and display-mode progress; 5 errors; 8
+ *                       source and plane events, refusals; 9 whatever else helps to follow the layer, and what the
+ *                       interface manager refuses
+ *  @param[in] szFormat  [text] printf format
  *  @context any, the timer's included */
 void PMX_IsLog(INT32 i4Level, const CHAR* szFormat, ...) DRV_PRINTF_FORMAT(2, 3);
 
 /** Unconditional console print. A null string argument is printed as (null).
- *  @param szFormat  printf format
+ *  @param[in] szFormat  [text] printf format
  *  @context any */
 void Printf(const CHAR* szFormat, ...) DRV_PRINTF_FORMAT(1, 2);
 
 /** Unconditional console print of the utility layer. A null string argument is printed as (null).
- *  @param szFormat  printf format
+ *  @param[in] szFormat  [text] printf format
  *  @context any */
 void UTIL_Printf(const CHAR* szFormat, ...) DRV_PRINTF_FORMAT(1, 2);
 
 /** Report a broken invariant and return: the caller goes on.
- *  @param szExpression  the invariant, or "0"
- *  @param szFile        source path relative to the project's root
- *  @param i4Line        line in it
+ *  @param[in] szExpression  [text] the invariant, or "0"
+ *  @param[in] szFile        [text] source path relative to the project's root
+ *  @param     i4Line        line in it
  *  @context any, the timer's included */
 void Assert(const CHAR* szExpression, const CHAR* szFile, INT32 i4Line);
 
 /** Find a flash partition.
- *  @param szName  its name
+ *  @param[in] szName  [text] its name
  *  @return its id; negative: no such partition
  *  @context a thread that may sleep */
 INT32 get_part_id_by_name(const CHAR* szName);
 
 /** Read from a flash partition.
  *  The stack guarantees that a negative id or a read past the end is answered by a failure; the caller does not look.
- *  @param i4PartId  id from get_part_id_by_name
- *  @param u4Offset  first byte
- *  @param pvDest    receives u4Count bytes; left as it was by a failed read
- *  @param u4Count   number of bytes
+ *  @param      i4PartId  id from get_part_id_by_name
+ *  @param      u4Offset  first byte
+ *  @param[out] pvDest    [u4Count bytes] receives u4Count bytes; left as it was by a failed read
+ *  @param      u4Count   number of bytes
  *  @return bytes read, negative on a failure
  *  @context a thread that may sleep */
 INT32 i4NFBPartitionRead(INT32 i4PartId, UINT32 u4Offset, void* pvDest, UINT32 u4Count);
@@ -181,13 +181,13 @@ typedef struct
 } PM_OPERATIONS_T;
 
 /** Register power-management operations.
- *  @param prOps  the operations; the object stays where it is until it is unregistered
+ *  @param[in] prOps  [symbol] the operations; the object stays where it is until it is unregistered
  *  @return 0, negative on a failure
  *  @context a thread that may sleep */
 int register_pm_ops(const PM_OPERATIONS_T* prOps);
 
 /** Withdraw power-management operations.
- *  @param prOps  the object that was registered
+ *  @param[in] prOps  [symbol] the object that was registered
  *  @return 0, negative on a failure
  *  @context a thread that may sleep */
 int unregister_pm_ops(const PM_OPERATIONS_T* prOps);

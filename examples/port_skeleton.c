@@ -1,9 +1,10 @@
 /* Every function that a stack provides, with its contract and an empty body: what a port starts from.
  * Written from the headers by port_skeleton.py; copy it and fill the bodies, group by group, console first. As it
- * stands it links with pmx_if.o, answers 0 to everything and does nothing. */
+ * stands it links with pmx_if.o, answers 0 and does nothing, but for the list of timers that every port keeps. */
 #include "drv_av_d.h"
 #include "drv_if.h"
 #include "drv_osd.h"
+#include "drv_pmx.h"
 #include "drv_tve.h"
 #include "drv_vdp.h"
 #include "pmx_hal.h"
@@ -59,15 +60,37 @@ INT32 x_sema_delete(HANDLE_T hSema)
     return 0;
 }
 
+/* The timers that exist; the first has handle 1. */
+#define PORT_TIMERS 8
+static BOOL afgTimerExists[PORT_TIMERS];
+
+static BOOL fgTimerExists(HANDLE_T hTimer)
+{
+    return hTimer >= 1 && hTimer <= PORT_TIMERS && afgTimerExists[hTimer - 1];
+}
+
 /** Create a timer, stopped.
- *  The stack guarantees that a failed creation leaves *phTimer as it was.
+ *  The stack guarantees that a failed creation leaves *phTimer as it was. It keeps a list of the timers that exist: the
+ *  mixer can lose the handle of its own, running or not (PMX_Reset, PMX_Init behind PMX_Stop), and when the stack is
+ *  unloaded it deletes, behind PMX_Uninit, what is left.
  *  @param[out] phTimer  receives the handle, never 0 on success
  *  @return OSR_OK or a failure
  *  @context a thread that may sleep */
 INT32 x_timer_create(HANDLE_T* phTimer)
 {
-    (void)phTimer;
-    return 0;
+    HANDLE_T hTimer;
+
+    for (hTimer = 1; hTimer <= PORT_TIMERS; hTimer++)
+    {
+        if (!fgTimerExists(hTimer))
+        {
+            /* here the system's timer is made */
+            afgTimerExists[hTimer - 1] = TRUE;
+            *phTimer = hTimer;
+            return OSR_OK;
+        }
+    }
+    return -1;
 }
 
 /** Start a timer, from its full interval when it is running.
@@ -80,12 +103,11 @@ INT32 x_timer_create(HANDLE_T* phTimer)
  *  @context any thread */
 INT32 x_timer_start(HANDLE_T hTimer, UINT32 u4DelayMs, X_TIMER_FLAG_T eFlag, x_timer_cb_fct pfCallback, void* pvArg)
 {
-    (void)hTimer;
     (void)u4DelayMs;
     (void)eFlag;
     (void)pfCallback;
     (void)pvArg;
-    return 0;
+    return fgTimerExists(hTimer) ? OSR_OK : -1;
 }
 
 /** Stop a timer; succeeds also when it is not running.
@@ -95,18 +117,21 @@ INT32 x_timer_start(HANDLE_T hTimer, UINT32 u4DelayMs, X_TIMER_FLAG_T eFlag, x_t
  *  @context any thread */
 INT32 x_timer_stop(HANDLE_T hTimer)
 {
-    (void)hTimer;
-    return 0;
+    return fgTimerExists(hTimer) ? OSR_OK : -1;
 }
 
-/** Stop and delete a timer.
+/** Stop and delete a timer. Lets an expiry that is under way come to its end: when it returns, the expiry function is
+ *  not running and will not run again, and what it reaches may go. The mixer holds no lock meanwhile.
  *  @param hTimer  handle from x_timer_create
  *  @return OSR_OK or a failure (a bad handle, for instance 0)
  *  @context a thread that may sleep */
 INT32 x_timer_delete(HANDLE_T hTimer)
 {
-    (void)hTimer;
-    return 0;
+    if (!fgTimerExists(hTimer))
+        return -1;
+    /* here the system's timer is stopped, and an expiry that runs may end (in Linux timer_delete_sync) */
+    afgTimerExists[hTimer - 1] = FALSE;
+    return OSR_OK;
 }
 
 /** Sleep.
@@ -1079,4 +1104,22 @@ void vSendAvdNotifyScomResChgOK(void)
 void vSetCcirOutBeforeMixer(BOOL fgBeforeMixer)
 {
     (void)fgBeforeMixer;
+}
+
+/* Unloading */
+
+void vPortUnload(void);
+
+/** Shut the layer down and leave no timer behind: an expiry after this would call code that is gone. Whatever the
+ *  expiry function reaches (console, mixing of planes, the video plane driver's answer) is still there. */
+void vPortUnload(void)
+{
+    HANDLE_T hTimer;
+
+    PMX_Uninit();
+    for (hTimer = 1; hTimer <= PORT_TIMERS; hTimer++)
+    {
+        if (fgTimerExists(hTimer))
+            x_timer_delete(hTimer);
+    }
 }

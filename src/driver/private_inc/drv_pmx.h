@@ -34,8 +34,8 @@ PMX_API void PMX_Init(void);
 
 /** Reload the default record, take the boot resolution and program the hardware for it. Until the first per-output mode
  *  setting (_fgBootUp) scaler and TV encoder keep what the boot loader set. Every input port is unconnected afterwards.
- *  Clears the handshake, its timer's handle included: after a reset of a started layer nobody knows the timer any more,
- *  and starting or deleting it fails with an Assert.
+ *  Clears the handshake, its timer's handle included: after a reset of a started layer the stack alone knows the timer,
+ *  which may be running and which PMX_Uninit cannot delete; starting or deleting it fails with an Assert.
  *  @param ucPmxId  mixer id, 0; for any other nothing is done
  *  @context the framework's thread, with no other mixer call running; sleeps */
 PMX_API void PMX_Reset(UCHAR ucPmxId);
@@ -56,7 +56,7 @@ PMX_API void PMX_Uninit(void);
 PMX_API INT32 i4PMX_Uninit(UINT32 u4Case);
 
 /** Stop vertical-sync handling and mark the layer as not started. Nothing else is undone: shutting down finds nothing
- *  to do from then on, and another PMX_Init makes a second mutex and timer beside the first, which nobody gives back,
+ *  to do from then on, and another PMX_Init makes a second mutex and timer beside the first, which stay with the stack,
  *  and registers table and power management again.
  *  @context the framework's thread, with no other mixer call running */
 PMX_API void PMX_Stop(void);

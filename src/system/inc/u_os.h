@@ -76,7 +76,9 @@ INT32 x_sema_unlock(HANDLE_T hSema);
 INT32 x_sema_delete(HANDLE_T hSema);
 
 /** Create a timer, stopped.
- *  The stack guarantees that a failed creation leaves *phTimer as it was.
+ *  The stack guarantees that a failed creation leaves *phTimer as it was. It keeps a list of the timers that exist: the
+ *  mixer can lose the handle of its own, running or not (PMX_Reset, PMX_Init behind PMX_Stop), and when the stack is
+ *  unloaded it deletes, behind PMX_Uninit, what is left.
  *  @param[out] phTimer  receives the handle, never 0 on success
  *  @return OSR_OK or a failure
  *  @context a thread that may sleep */
@@ -99,7 +101,8 @@ INT32 x_timer_start(HANDLE_T hTimer, UINT32 u4DelayMs, X_TIMER_FLAG_T eFlag, x_t
  *  @context any thread */
 INT32 x_timer_stop(HANDLE_T hTimer);
 
-/** Stop and delete a timer.
+/** Stop and delete a timer. Lets an expiry that is under way come to its end: when it returns, the expiry function is
+ *  not running and will not run again, and what it reaches may go. The mixer holds no lock meanwhile.
  *  @param hTimer  handle from x_timer_create
  *  @return OSR_OK or a failure (a bad handle, for instance 0)
  *  @context a thread that may sleep */

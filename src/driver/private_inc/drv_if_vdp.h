@@ -14,7 +14,10 @@ extern "C" {
  *  pu4SetColorMode alone and ignores its result.
  *
  *  pu4SetColorMode is called with MutexPMX held: a plane that from inside it called i4Pmx_Connect or i4Pmx_Disconnect,
- *  or made the mixer's colour space change once more, would wait for itself. */
+ *  or made the mixer's colour space change once more, would wait for itself. So would two threads for each other if a
+ *  plane driver kept a lock of its pu4SetColorMode during i4Pmx_Connect, i4Pmx_Disconnect, PMX_VdpEnabled,
+ *  PMX_OsdEnabled, PMX_OsdDisabled, PMX_DecideMasterColorSpace or PMX_InformVdpColorSpace: all of them can take
+ *  MutexPMX. */
 typedef struct
 {
     UINT32 (*pu4SetPlaybackMode)(void* pvTag);

@@ -5,6 +5,10 @@
  *  when it has refused to and changed nothing. An id that goes unchecked is taken for mixer 0.
  *  Pointers are tested for null where the contract says so, and only there.
  *
+ *  Nobody calls i4Pmx_Connect, i4Pmx_Disconnect, PMX_VdpEnabled, PMX_OsdEnabled, PMX_OsdDisabled,
+ *  PMX_DecideMasterColorSpace or PMX_InformVdpColorSpace while holding a lock that a video plane's pu4SetColorMode
+ *  takes: all of them can take MutexPMX, and pu4SetColorMode is called with it held.
+ *
  *  Functions i4Pmx… behind the IPMX table find the mixer id in the low 8 bits of their tag. */
 #ifndef DRV_PMX_H
 #define DRV_PMX_H

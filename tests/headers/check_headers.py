@@ -1,6 +1,7 @@
 #!/usr/bin/env python3
 """Compiles every header of the given directories alone, twice in one file, and all together in both orders: as C and as
-C++, with gcc and clang, hosted and freestanding, for the host, for the 32-bit target and as a kernel's C files see it.
+C++, with gcc and clang, hosted and freestanding, for the host, for the 32-bit target and as a kernel's C files see it:
+a kernel of today, and one that takes <stdarg.h> from the compiler.
 """
 
 import argparse
@@ -17,8 +18,13 @@ ARM = ["--target=arm-none-eabi", "-mthumb", "-mcpu=cortex-a9", "-mfloat-abi=soft
 
 # What a kernel's C files find in place of the compiler's own headers.
 KERNEL_HEADERS = {
-    "types.h": "typedef __SIZE_TYPE__ size_t;\n#define NULL ((void*)0)\n",
-    "stdarg.h": "typedef __builtin_va_list va_list;\n",
+    "kernel/linux/types.h": "typedef __SIZE_TYPE__ size_t;\n#define NULL ((void*)0)\n",
+    "kernel/linux/stdarg.h": "typedef __builtin_va_list va_list;\n",
+}
+# An older one has the first alone, and beside it one header of the compiler: no <stddef.h> there either.
+OLD_KERNEL_HEADERS = {
+    "old_kernel/linux/types.h": KERNEL_HEADERS["kernel/linux/types.h"],
+    "old_kernel/stdarg.h": KERNEL_HEADERS["kernel/linux/stdarg.h"],
 }
 
 
@@ -32,8 +38,9 @@ def variants(compilers, kernel_directory):
         yield [compiler, "-x", "c++", f"-std={standard}", *freestanding]
     yield [compilers.clang, "-x", "c", "-std=c11", *C_WARNINGS, *ARM]
     yield [compilers.clangxx, "-x", "c++", "-std=c++20", "-fshort-enums", *ARM]
-    for compiler in (compilers.gcc, compilers.clang):
-        yield [compiler, "-x", "c", "-std=c11", *C_WARNINGS, "-D__KERNEL__", "-nostdinc", "-I", kernel_directory]
+    for compiler, kernel in itertools.product((compilers.gcc, compilers.clang), ("kernel", "old_kernel")):
+        yield [compiler, "-x", "c", "-std=c11", *C_WARNINGS, "-D__KERNEL__", "-nostdinc",
+               "-I", f"{kernel_directory}/{kernel}"]
 
 
 def texts(headers):
@@ -65,10 +72,10 @@ def main():
     includes = [f"-I{directory}" for directory in arguments.directories]
 
     with tempfile.TemporaryDirectory() as scratch:
-        kernel = pathlib.Path(scratch, "linux")
-        kernel.mkdir()
-        for name, text in KERNEL_HEADERS.items():
-            (kernel / name).write_text(text)
+        for name, text in (KERNEL_HEADERS | OLD_KERNEL_HEADERS).items():
+            path = pathlib.Path(scratch, name)
+            path.parent.mkdir(parents=True, exist_ok=True)
+            path.write_text(text)
 
         jobs = list(itertools.product(variants(arguments, scratch), texts(headers)))
         with ThreadPoolExecutor(max_workers=2) as pool:

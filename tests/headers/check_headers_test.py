@@ -63,6 +63,15 @@ class CheckHeaders(unittest.TestCase):
     def test_needs_the_compilers_header_in_a_kernel(self):
         self.refused("a.h: ", "__KERNEL__", a="#ifndef A_H\n#define A_H\n#include <stddef.h>\n#endif\n")
 
+    def test_needs_a_header_that_older_kernels_lack(self):
+        guarded = "#ifndef A_H\n#define A_H\n#ifdef __KERNEL__\n{}\n#endif\nextern int iOne;\n#endif\n"
+        self.refused("a.h: ", "/old_kernel", a=guarded.format("#include <linux/stdarg.h>"))
+        result = self.check(a=guarded.format("#include <linux/types.h>"))
+        self.assertEqual(0, result.returncode, result.stdout + result.stderr)
+
+    def test_needs_the_compilers_variable_arguments_in_a_kernel_of_today(self):
+        self.refused("a.h: ", "/kernel", a="#ifndef A_H\n#define A_H\n#include <stdarg.h>\n#endif\n")
+
     def test_collides_with_another_header(self):
         self.refused("all together", "", a=GOOD, b="#ifndef B_H\n#define B_H\nvoid iNumber(void);\n#endif\n")
 

@@ -6,8 +6,13 @@
 
 #include "x_typedef.h"
 
-#if defined(__KERNEL__) && !defined(__cplusplus)
+/* Kernels before 5.15 have no header of their own for it, and take the compiler's. */
+#if defined(__KERNEL__) && !defined(__cplusplus) && defined(__has_include)
+#if __has_include(<linux/stdarg.h>)
 #include <linux/stdarg.h>
+#else
+#include <stdarg.h>
+#endif
 #else
 #include <stdarg.h>
 #endif

@@ -10,10 +10,18 @@ set(PMX_PRODUCT_CODE
     -fno-stack-protector -fno-asynchronous-unwind-tables -fno-unwind-tables -U_FORTIFY_SOURCE
     -ffile-prefix-map=${PROJECT_SOURCE_DIR}/= -g)
 
-# The 32-bit target. Nothing is said about the width of enumerations: the headers hold it, whatever a compiler thinks.
-set(PMX_TARGET_ARM -march=armv7-a -mfloat-abi=soft)
-set(PMX_TARGET_ARM_MODES thumb arm)
-set(PMX_TARGET_ARM_OPTIMISATIONS Os O2)
+# The 32-bit target. The headers hold the width of enumerations, whatever a compiler thinks, and the layer has no
+# wchar_t; an object's attributes name a width for both all the same, and a linker warns of any but a kernel's.
+set(PMX_TARGET_ARM -march=armv7-a -mfloat-abi=soft -fno-short-enums -fshort-wchar)
+
+# The forms in which it is built, and their flags: both instruction sets for size and for speed, and one for kernels,
+# whose backtraces walk by tables. It is in ARM state, as kernels are that do not ask for Thumb-2.
+set(PMX_TARGET_ARM_FORMS thumb-Os thumb-O2 arm-Os arm-O2 kernel)
+set(PMX_TARGET_ARM_FORM_thumb-Os -mthumb -Os)
+set(PMX_TARGET_ARM_FORM_thumb-O2 -mthumb -O2)
+set(PMX_TARGET_ARM_FORM_arm-Os -marm -Os)
+set(PMX_TARGET_ARM_FORM_arm-O2 -marm -O2)
+set(PMX_TARGET_ARM_FORM_kernel -marm -Os -funwind-tables)
 
 # What the target of this build asks for. A PC that runs ARM programs passes floating-point numbers in registers; the
 # layer has none, and must not touch those registers.

@@ -3,7 +3,8 @@
 
 As on the host: the two lists of symbols, nothing weak, no code before the first call (see ../symbols/check_symbols.py).
 Here as well: only relocations that the loader knows, no run-time helper of the compiler beyond memcpy and memset, no
-floating point in any form, no unwind tables, and stack frames within their budget.
+floating point in any form, the widths of a kernel in its attributes, stack frames within their budget, and no unwind
+tables: or, where they are asked for, an entry for each function, and the unwinder's routines that are named, no other.
 """
 
 import argparse
@@ -34,15 +35,17 @@ HELPERS = (
 )
 
 UNWIND_SECTION = re.compile(r"^\.(ARM\.exidx|ARM\.extab|eh_frame|gcc_except_table)(\.|$)")
+UNWIND_INDEX = re.compile(r"^Unwind section '\.ARM\.exidx[^']*' at offset \w+ contains (\d+) entr", re.M)
+WIDTHS = {"Tag_ABI_PCS_wchar_t": "2", "Tag_ABI_enum_size": "int"}  # what a kernel's own objects say
 ADDRESS_LINE = re.compile(r"^\s*[0-9a-f]+:\s+(?:[0-9a-f]{4,8} ?)+\s+(\S+)\s*(.*)$")
 FUNCTION_LINE = re.compile(r"^[0-9a-f]+ <(.+)>:$")
 FLOATING = re.compile(r"^(v[a-z]|f(ld|st)m|fm[rs]|mrc|mcr|ldc|stc|cdp)")
 FRAME_BUDGET = 256
 
 
-def helper_complaints(path):
+def helper_complaints(path, unwinder):
     for name, _, binding, index in check_symbols.symbols(path):
-        if binding == "LOCAL" or index != "UND":
+        if binding == "LOCAL" or index != "UND" or name in unwinder:
             continue
         for pattern, meaning in HELPERS:
             if pattern.fullmatch(name):
@@ -50,17 +53,31 @@ def helper_complaints(path):
                 break
 
 
-def section_complaints(path):
+def section_complaints(path, unwinder):
     for name, _, _ in check_symbols.sections(path):
-        if UNWIND_SECTION.match(name):
+        if UNWIND_SECTION.match(name) and not (unwinder and name.startswith(".ARM.ex")):
             yield f"{name}: unwind tables"
 
 
+def unwind_complaints(path):
+    """A backtrace ends at a function without an entry."""
+    functions = sum(kind == "FUNC" and index != "UND" for _, kind, _, index in check_symbols.symbols(path))
+    entries = sum(map(int, UNWIND_INDEX.findall("\n".join(check_symbols.readelf("--unwind", path)))))
+    if entries != functions:
+        yield f"unwind tables with {entries} entries, and {functions} functions"
+
+
 def attribute_complaints(path):
-    """Of a soft-float object: its attributes say so."""
+    """Of an object for a kernel: its attributes say that it is soft float, and the widths of a kernel."""
+    found = {}
     for line in check_symbols.readelf("--arch-specific", path):
         if re.search(r"Tag_(FP_arch|Advanced_SIMD_arch|ABI_VFP_args|ABI_HardFP_use)\b", line):
             yield f"{line.strip()}: not soft float"
+        name, _, value = line.strip().partition(": ")
+        found[name] = value
+    for name, value in WIDTHS.items():
+        if found.get(name) != value:
+            yield f"{name}: {found.get(name, 'nothing')}, and {value} in a kernel"
 
 
 def instruction_complaints(path, objdump):
@@ -126,7 +143,10 @@ def main():
     parser.add_argument("--needed", required=True, help="list of the symbols that it needs")
     parser.add_argument("--objdump", required=True, help="the target's objdump")
     parser.add_argument("--hard-float-calls", action="store_true",
-                        help="the object is for a system that passes floating-point numbers in registers")
+                        help="the object is for a system that passes floating-point numbers in registers, and has its "
+                             "own widths")
+    parser.add_argument("--unwinder", action="append", default=[], metavar="NAME",
+                        help="the object has unwind tables, and needs this routine for them")
     parser.add_argument("--frames", type=pathlib.Path, help="directory of the compiler's call graphs, *.ci")
     parser.add_argument("--budget", action="append", default=[], metavar="NAME=BYTES",
                         help=f"frame that a function may have; {FRAME_BUDGET} when not given")
@@ -136,9 +156,12 @@ def main():
         sys.exit(f"{arguments.object}: is not there; ./dev build arm-bare and ./dev build arm-linux make the objects")
 
     lists = [check_symbols.List(arguments.defined), check_symbols.List(arguments.needed)]
+    lists[1].plain.update(arguments.unwinder)
     found = list(check_symbols.complaints(arguments.object, *lists))
-    found += helper_complaints(arguments.object)
-    found += section_complaints(arguments.object)
+    found += helper_complaints(arguments.object, arguments.unwinder)
+    found += section_complaints(arguments.object, arguments.unwinder)
+    if arguments.unwinder:
+        found += unwind_complaints(arguments.object)
     found += instruction_complaints(arguments.object, arguments.objdump)
     if not arguments.hard_float_calls:
         found += attribute_complaints(arguments.object)

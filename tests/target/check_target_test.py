@@ -86,8 +86,40 @@ class CheckTarget(unittest.TestCase):
         self.refused("__aeabi_memcpy: a helper of the compiler's run-time library", needed="__aeabi_memcpy\n",
                      extra='extern "C" void __aeabi_memcpy(void); void Extra(void) { __aeabi_memcpy(); }')
 
+    def test_widths_of_a_kernel(self):
+        self.refused("Tag_ABI_enum_size: small, and int in a kernel", flags=["-fshort-enums"])
+        self.refused("Tag_ABI_PCS_wchar_t: 4, and 2 in a kernel", flags=["-fno-short-wchar"])
+        result = self.check(flags=["-fshort-enums", "-fno-short-wchar"], options=["--hard-float-calls"])
+        self.assertEqual(0, result.returncode, result.stdout + result.stderr)
+
     def test_unwind_tables(self):
-        self.refused("unwind tables", flags=["-funwind-tables"])
+        self.refused(".ARM.exidx: unwind tables", flags=["-funwind-tables"])
+        self.refused("__aeabi_unwind_cpp_pr0: needed, but not listed", flags=["-funwind-tables"])
+        self.refused("__aeabi_unwind_cpp_pr0: unwinding", flags=["-funwind-tables"],
+                     needed="__aeabi_unwind_cpp_pr0\n")
+
+    def test_unwind_tables_where_they_are_asked_for(self):
+        tables, pr0 = ["-marm", "-funwind-tables"], ["--unwinder", "__aeabi_unwind_cpp_pr0"]
+        result = self.check(flags=tables, options=pr0)
+        self.assertEqual(0, result.returncode, result.stdout + result.stderr)
+        self.refused("__aeabi_unwind_cpp_pr0: never called", options=pr0)
+        self.refused("unwind tables with 0 entries, and 2 functions", options=pr0)
+        self.refused("unwind tables with 2 entries, and 3 functions", flags=tables, options=pr0,
+                     extra='void Extra(void) {} asm(".type silent, %function\\n silent: bx lr");')
+
+    def test_no_other_routine_of_the_unwinder(self):
+        tables, pr0 = ["-marm", "-funwind-tables"], ["--unwinder", "__aeabi_unwind_cpp_pr0"]
+        pr1 = ["--unwinder", "__aeabi_unwind_cpp_pr1"]
+        large = ('extern "C" void Use(char*, ...); void Extra(void) {} extern "C" void Many(const char*, ...); '
+                 "static void Large(const char*, ...) { char ac[520]; Use(ac); } "
+                 "void Many(const char*, ...) { Large(nullptr); }")
+        options = [*pr0, "--budget", "Large=600", "--budget", "Many=600"]
+        self.refused("__aeabi_unwind_cpp_pr1: unwinding", extra=large, needed="Use\n", flags=tables, options=options)
+        self.refused("__aeabi_unwind_cpp_pr1: needed, but not listed", extra=large, needed="Use\n", flags=tables,
+                     options=options)
+        self.refused("__aeabi_unwind_cpp_pr1: never called", flags=tables, options=[*pr0, *pr1])
+        self.refused(".eh_frame: unwind tables", flags=tables, options=pr0,
+                     extra='void Extra(void) {} asm(".section .eh_frame, \\"a\\"; .word 0; .text");')
 
     def test_global_offset_table(self):
         self.refused("relocation R_ARM_GOT_BREL to Platform", flags=["-fPIC"],

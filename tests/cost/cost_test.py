@@ -161,6 +161,7 @@ def card():
     function = {"label": "PMX_A", "code": 200, "texts": 20, "frame": 16, "stack": 100, "through": ["PMX_A"]}
     return {"compilers": {"host": "g++ 12", "target": "arm 12"},
             "totals": {"code": 1000, "texts": 500, "tables": 100, "ram": 50, "heap": 0},
+            "kernel": {"code": 1300, "texts": 500, "tables": 100, "ram": 50, "unwind": 200},
             "files": {"pmx_a": {"code": 1000, "texts": 500, "tables": 100, "ram": 50}},
             "functions": {"PMX_A": function},
             "tables": {"T": 100}, "ram": {"_arPmxConf": 40, "x": 10}, "repeated": [], "indirect": [], "paths": [path]}
@@ -186,6 +187,9 @@ class Check(unittest.TestCase):
             self.assertEqual([], self.complaints(lambda now, grown={kind: bit_more}: now["totals"].update(grown)))
             self.assertEqual([f"{kind} in all: {old} has grown to {much_more}"],
                              self.complaints(lambda now, grown={kind: much_more}: now["totals"].update(grown)))
+        self.assertEqual([], self.complaints(lambda now: now["kernel"].update(unwind=204)))
+        self.assertEqual(["unwind in a kernel: 200 has grown to 208"],
+                         self.complaints(lambda now: now["kernel"].update(unwind=208)))
         self.assertEqual(1, len(self.complaints(lambda now: now["functions"]["PMX_A"].update(stack=103))))
         self.assertEqual(1, len(self.complaints(lambda now: now["files"]["pmx_a"].update(code=1030))))
 
@@ -246,10 +250,14 @@ class Difference(unittest.TestCase):
         now["functions"]["PMX_B"] = {**now["functions"]["PMX_A"], "label": "PMX_B", "code": 30}
         now["functions"]["PMX_A"]["code"] = 190
         now["paths"][0]["layer"] = 90
+        now["kernel"]["unwind"] = 208
         text = diff.text(card(), now)
         self.assertRegex(text, r"(?m)^  PMX_B +0 +30 +\+30  new$")
         self.assertRegex(text, r"(?m)^  PMX_A +200 +190 +-10$")
         self.assertRegex(text, r"(?m)^  PMX_A only +40 +30 +-10$")
+        self.assertRegex(text, r"(?m)^bytes in a kernel .*\n  unwind +200 +208 +\+8$")
+        without = diff.text({**card(), "kernel": {}}, card())  # a revision before there was that form
+        self.assertRegex(without, r"(?m)^  unwind +0 +200 +\+200  new$")
         self.assertIn("register accesses: no change", text)
 
 

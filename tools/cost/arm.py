@@ -1,5 +1,5 @@
 """The layer on the 32-bit target, compiled for size: bytes of code, texts, tables and RAM by symbol, and stack by the
-compiler's own call graph."""
+compiler's own call graph. Of the form for kernels the bytes in all, and those of its unwind tables."""
 
 import collections
 import dataclasses
@@ -36,23 +36,29 @@ class Sizes:
     texts: dict     # bytes of the texts that a function hands on; one that several use counts for each
     files: dict     # code, texts, tables, ram by file
     totals: dict    # of each, as linked
+    kernel: dict    # the same of the form for kernels, and its unwind tables; nothing of a tree without that form
     repeated: list  # texts that are stored more than once
     frames: dict    # stack frame by function
     graph: callgraph.Graph
 
 
-def compile_flags(root):
+def compile_flags(root, form):
     flags = instructions.product_flags(root)
     code = [flag for flag in flags["PMX_PRODUCT_CODE"] if not flag.startswith(("-O", "-g"))]
-    return [*flags["PMX_PRODUCT_LANGUAGE"], *code, *(flags["PMX_TARGET_ARM"] or BEFORE), *FORM, "-w"]
+    return [*flags["PMX_PRODUCT_LANGUAGE"], *code, *(flags["PMX_TARGET_ARM"] or BEFORE), *form, "-w",
+            *instructions.includes(root)]
+
+
+def _sources(root):
+    return sorted((root / "src" / "driver" / "pmx").glob("*.cpp"))
 
 
 def _compile(root, made):
-    sources = sorted((root / "src" / "driver" / "pmx").glob("*.cpp"))
+    sources = _sources(root)
     made.mkdir(parents=True, exist_ok=True)
     for old in made.glob("*.ci"):
         old.unlink()
-    flags = [*compile_flags(root), *instructions.includes(root)]
+    flags = compile_flags(root, FORM)
 
     def compile_one(source):
         run(COMPILER, *flags, "-fcallgraph-info=su,da", "-c", source, "-o", made / f"{source.stem}.o")
@@ -124,28 +130,44 @@ def _by_symbol(linked, section_names, kinds):
             if symbol.section and symbol.section.name in section_names and symbol.type in kinds and symbol.size}
 
 
+def _link(made, objects):
+    layout = write(made / "layout.ld", LAYOUT)
+    run("arm-none-eabi-ld", "-O2", "-e", "0", "--unresolved-symbols=ignore-all", "--no-warn-mismatch", "-T", layout,
+        "-o", made / "layer.elf", *objects)
+    return elf.Elf(made / "layer.elf")
+
+
+def _totals(linked):
+    sizes = {section.name: section.size for section in linked.sections}
+    return {"code": sizes.get(".code", 0), "texts": sizes.get(".texts", 0), "tables": sizes.get(".tables", 0),
+            "ram": sizes.get(".data", 0) + sizes.get(".bss", 0)}
+
+
+def _kernel(root, made):
+    """The form for kernels. A module's linker leaves the unwind tables as they are in the objects."""
+    form = instructions.product_flags(root)["PMX_TARGET_ARM_FORM_kernel"]
+    if not form:
+        return {}
+    made.mkdir(parents=True, exist_ok=True)
+    flags, sources = compile_flags(root, form), _sources(root)
+    objects = [made / f"{source.stem}.o" for source in sources]
+    in_parallel(lambda source, made_of: run(COMPILER, *flags, "-c", source, "-o", made_of), sources, objects)
+    unwind = sum(section.size for made_of in objects for section in elf.Elf(made_of).sections
+                 if section.name.startswith((".ARM.exidx", ".ARM.extab")))
+    return {**_totals(_link(made, objects)), "unwind": unwind}
+
+
 def measure(root, made):
     """The Sizes of the layer of a tree."""
     stems = _compile(root, made)
-    layout = write(made / "layout.ld", LAYOUT)
-    run("arm-none-eabi-ld", "-O2", "-e", "0", "--unresolved-symbols=ignore-all", "--no-warn-mismatch", "-T", layout,
-        "-o", made / "layer.elf", *(made / f"{stem}.o" for stem in stems))
-    linked = elf.Elf(made / "layer.elf")
-    sections = {section.name: section for section in linked.sections}
-    empty = elf.Section("", 0, 0, 0, 0, 0, 0, 0)
-
-    def size(*names):
-        return sum(sections.get(name, empty).size for name in names)
-
-    texts = sections.get(".texts", empty)
+    linked = _link(made, [made / f"{stem}.o" for stem in stems])
+    [texts] = [section for section in linked.sections if section.name == ".texts"]
     stored = collections.Counter(linked.bytes_of(texts).split(b"\0")[:-1])
     graph = callgraph.read([(made / f"{stem}.ci").read_text(encoding="utf-8") for stem in stems],
                            signatures.platform())
     return Sizes(
         code=_by_symbol(linked, {".code"}, {elf.FUNC}), tables=_by_symbol(linked, {".tables"}, {elf.OBJECT}),
         ram=_by_symbol(linked, {".data", ".bss"}, {elf.OBJECT}), texts=_texts_by_function(stems, made),
-        files=_files(stems, made),
-        totals={"code": size(".code"), "texts": size(".texts"), "tables": size(".tables"),
-                "ram": size(".data", ".bss")},
+        files=_files(stems, made), totals=_totals(linked), kernel=_kernel(root, made / "kernel"),
         repeated=sorted(text.decode() for text, times in stored.items() if times > 1 and text),
         frames=graph.frames, graph=graph)

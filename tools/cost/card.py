@@ -44,7 +44,8 @@ def make(paths, counts, sizes):
         rows.append({"operation": path.operation, "kind": path.kind, "line": path.line, "after": list(path.set_up),
                      "calls": count.calls, "registers": count.registers, "logs": count.logs, "layer": count.layer,
                      "floor": count.floor})
-    return {"compilers": compilers(), "totals": {**sizes.totals, "heap": 0}, "files": sizes.files,
+    return {"compilers": compilers(), "totals": {**sizes.totals, "heap": 0}, "kernel": sizes.kernel,
+            "files": sizes.files,
             "functions": _functions(sizes), "tables": sizes.tables, "ram": sizes.ram, "repeated": sizes.repeated,
             "indirect": [list(row) for row in sizes.graph.indirect], "paths": rows}
 
@@ -147,6 +148,10 @@ def _helper_rows(card):
             yield f"`{row['label']}`", row["code"], row["texts"], row["frame"], row["stack"]
 
 
+def _kernel_rows(card):
+    yield tuple(_thousands(card["kernel"][kind]) for kind in (*KINDS, "unwind"))
+
+
 def _objects(listed):
     plain = plain_names(listed)
     return [(f"`{plain[name]}`", _thousands(size))
@@ -225,6 +230,13 @@ A text counts for the first file that has it. The linker's alignment makes the s
 
 {_table(files, [*((f"`{stem}.cpp`", *(_thousands(row[kind]) for kind in KINDS)) for stem, row in card["files"].items()),
                 ("**as linked**", *(f"**{_thousands(card['totals'][kind])}**" for kind in KINDS))], files[1:])}
+## In a kernel
+
+The form for kernels is in ARM state, optimised for size like the other, and has tables by which a backtrace finds its
+way through the layer. They count apart: nothing of the layer looks at them.
+
+{_table(("Code", "Texts", "Tables", "RAM", "Unwind tables"), _kernel_rows(card), ("Code", "Texts", "Tables", "RAM",
+"Unwind tables"))}
 ## Tables
 
 {_table(("Table", "Bytes"), _objects(card["tables"]), ("Bytes",))}

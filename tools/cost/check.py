@@ -36,6 +36,8 @@ def instructions(old, new):
 
 
 def sizes(old, new):
+    for kind, before in old["kernel"].items():
+        yield from _grew(f"{kind} in a kernel", before, new["kernel"][kind])
     for kind in KINDS:
         yield from _grew(f"{kind} in all", old["totals"][kind], new["totals"][kind])
         for stem, row in new["files"].items():

@@ -27,7 +27,8 @@ def _by_path(card, value):
 
 def text(before, now):
     """A table for people."""
-    lines = _lines("bytes in all", before["totals"], now["totals"])
+    lines = [*_lines("bytes in all", before["totals"], now["totals"]), "",
+             *_lines("bytes in a kernel", before["kernel"], now["kernel"])]
     for kind, title in (("functions", "code, by function"), ("tables", "tables"), ("ram", "RAM")):
         of = [{name: row["code"] if kind == "functions" else row for name, row in card[kind].items()}
               for card in (before, now)]

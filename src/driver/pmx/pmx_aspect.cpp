@@ -1,5 +1,4 @@
-/* Aspect ratio of the output picture: the normal one, one that waits for the next mode change, and the digest
- * view's. */
+/* Three aspect ratios: the one in force, one on its way in with the next mode change, and one for the digest view. */
 #include "drv_av_d.h"
 #include "drv_pmx.h"
 #include "drv_tve.h"

@@ -1,5 +1,5 @@
-/* The parallel digital port, and the colour format of the digital picture. While the mixer is off, enable and
- * parameters are only stored: PMX_SetEnable applies them. Phase and colour format go out at once. */
+/* The parallel digital port, and the colour format of the digital picture. Switch, width and mode
+ * wait in the record until PMX_SetEnable has the mixer on; phase and colour format never wait. */
 #include "drv_av_d.h"
 #include "drv_pmx.h"
 #include "pmx_hal.h"

@@ -1,4 +1,4 @@
-/* The picture of the mixer's resolution mode, and the TV-system commands to the HDMI/AV driver. */
+/* How large and of what kind the mixer's picture is, and what HDMI is told or asked about resolutions. */
 #include "drv_av_d.h"
 #include "drv_pmx.h"
 #include "pmx_if.h"

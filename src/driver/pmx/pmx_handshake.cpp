@@ -46,7 +46,7 @@ UINT32 PMX_SetOsdEnable(void)
     return 1;
 }
 
-/* The timer is never stopped by an answer of the display part: it runs out later and mixes the OSD planes once more. */
+/* Nobody stops it when the display part answers in time: graphics that are back are then mixed once again. */
 void _PMX_TmrIsr(HANDLE_T, void*)
 {
     PMX_IsLog(0, "PMX timeout.\n");

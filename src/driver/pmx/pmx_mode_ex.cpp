@@ -58,7 +58,7 @@ static void vLogRequest(const PMX_RESOLUTION_T* prOutConf, UINT8 fgOSD5)
     PMX_IsLog(9, "OSD5(%d)\n", fgOSD5);
 }
 
-/* The first enabled output, in the order of their indices, gives the mixer's format. */
+/* The mixer runs what the first output runs that is on; with all of them off, HDMI's mode. */
 static UCHAR ucChooseFormat(const PMX_RESOLUTION_T* prOutConf)
 {
     for (UINT32 i = 0; i < PMX_OUTPUT_NUM; i++)
@@ -134,7 +134,7 @@ static CHANGES_T rFindChangesAndStore(const REQUEST_T* pr)
     return { .fgFmtChange = fgFmtChange, .fgHdmiChange = fgHdmiChange, .fgTveChange = fgTveChange };
 }
 
-/* Route the fifth OSD plane to component and composite. */
+/* Say on which analogue outputs the fifth OSD plane is seen. */
 static void vRouteFifthOsd(const REQUEST_T* pr)
 {
     UCHAR ucCvbsMode = (UCHAR)pr->rCVBS.eResMode;

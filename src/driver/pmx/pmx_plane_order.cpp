@@ -58,7 +58,7 @@ UINT32 PMX_SetOrderVdpComp0(UCHAR ucPmxId, UINT32 u4OnTop)
     PMX_HalSwapPlane1_2(ucPmxId, u4OnTop);
 
     UCHAR ucInSecondPlane = u4OnTop != 0 ? 0 : 1;
-    if (VDP_GetHwEnable(ucInSecondPlane) != VDP_DISABLED) // hidden counts as enabled
+    if (VDP_GetHwEnable(ucInSecondPlane) != VDP_DISABLED) // a hidden one comes back without a word to us
         vPmxMixPlane(ucPmxId, DRV_PMX_PLANE_2);
     else
         vPmxNotMixPlane(ucPmxId, DRV_PMX_PLANE_2);

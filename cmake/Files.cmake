@@ -1,5 +1,5 @@
-# pmx_files(<variable> <pattern>...): the files of each pattern, looked up again at every build. A pattern that finds none
-# is an error: a folder was moved or misspelt, and what it holds would silently be left out.
+# pmx_files(<variable> <pattern>...): the files of each pattern, looked up again at every build. A pattern that finds
+# none is an error: a folder was moved or misspelt, and what it holds would silently be left out.
 function(pmx_files variable)
     set(all "")
     foreach(pattern ${ARGN})

@@ -18,7 +18,7 @@ class Unreadable(Exception):
 
 
 def suites(listing):
-    """{suite: number of its cases}, in the program's order; the instances of a parametrised suite count as that suite."""
+    """{suite: number of its cases}, in the program's order; instances of a parametrised suite count as that suite."""
     found, current = {}, None
     for line in listing.splitlines():
         if match := re.fullmatch(r"(?:\w+/)?(\w+)\.(?:\s*#.*)?", line):

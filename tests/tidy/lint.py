@@ -68,7 +68,8 @@ def fingerprint(files):
 
 
 def lint(build, source):
-    result = subprocess.run(["clang-tidy", "--quiet", "-p", build / "lint", source], capture_output=True, text=True, check=False)
+    result = subprocess.run(["clang-tidy", "--quiet", "-p", build / "lint", source], capture_output=True, text=True,
+                            check=False)
     noise = re.compile(r"^\d+ warnings? (generated|treated).*\n", re.M)
     return result.returncode == 0, result.stdout + noise.sub("", result.stderr)
 

@@ -1,54 +1,12 @@
 /** What the current mode is reported as: progressive, HD; that nothing is remembered from an earlier mode. */
-#include "tests/layer/mode_facts.h"
+#include "tests/layer/picture_facts.h"
 #include "tests/support/layer_fixture.h"
 
 using ProgressiveOut = LayerTest;
 using HdOutput = LayerTest;
 
-namespace
-{
-
-using mode_facts::Modes;
-using mode_facts::modes;
-
-const Modes& progressive()
-{
-    static const Modes set = modes({
-        RES_480P,        RES_576P,         RES_480P_1440,    RES_576P_1440,    RES_480P_2880,          RES_576P_2880,
-        RES_720P60HZ,    RES_720P50HZ,     RES_1080P60HZ,    RES_1080P50HZ,    RES_1080P30HZ,          RES_1080P25HZ,
-        RES_1080P24HZ,   RES_3D_1080P23HZ, RES_3D_1080P24HZ, RES_3D_720P60HZ,  RES_3D_720P50HZ,        RES_3D_720P30HZ,
-        RES_3D_720P25HZ, RES_3D_576P50HZ,  RES_3D_480P60HZ,  RES_2D_640x480HZ, RES_PANEL_AUO_B089AW01,
-    });
-    return set;
-}
-
-/** Modes that are no HD output; every other number is one. */
-const Modes& sd_output()
-{
-    static const Modes set = modes({
-        RES_480I,
-        RES_576I,
-        RES_480P,
-        RES_576P,
-        RES_480P_1440,
-        RES_576P_1440,
-        RES_480P_2880,
-        RES_576P_2880,
-        RES_480I_2880,
-        RES_576I_2880,
-        RES_3D_576P50HZ,
-        RES_3D_480P60HZ,
-        RES_3D_576I25HZ,
-        RES_3D_480I30HZ,
-        RES_3D_576I50HZ,
-        RES_3D_480I60HZ,
-        RES_2D_480I60HZ,
-        RES_2D_640x480HZ,
-    });
-    return set;
-}
-
-} // namespace
+using picture_facts::progressive;
+using picture_facts::sd_output;
 
 TEST_F(ProgressiveOut, ProgressiveOut_EveryModeNumber)
 {

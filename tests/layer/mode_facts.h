@@ -14,6 +14,7 @@ namespace mode_facts
 {
 
 using mode_numbers::by_mode;
+using mode_numbers::known;
 using mode_numbers::Modes;
 using mode_numbers::modes;
 

@@ -1,6 +1,5 @@
 /** The video PLL's frequency synthesiser. */
-#include <algorithm>
-
+#include "tests/layer/picture_facts.h"
 #include "tests/layer/sequences.h"
 #include "tests/support/layer_fixture.h"
 #include "u_os.h"
@@ -9,36 +8,6 @@ using VideoPll = LayerTest;
 
 namespace
 {
-
-/** The modes that run the 60 Hz family's word: 24 Hz is not among them, 23.976 Hz is. */
-constexpr PMX_RESOLUTION_MODE_T family_60[] = {
-    RES_480I,
-    RES_480P,
-    RES_480P_1440,
-    RES_480P_2880,
-    RES_720P60HZ,
-    RES_1080I60HZ,
-    RES_1080P60HZ,
-    RES_1080P30HZ,
-    RES_480I_2880,
-    RES_1080P23_976HZ,
-    RES_1080P29_97HZ,
-    RES_3D_1080P23HZ,
-    RES_3D_720P60HZ,
-    RES_3D_720P30HZ,
-    RES_3D_480P60HZ,
-    RES_3D_1080I60HZ,
-    RES_3D_1080I30HZ,
-    RES_3D_480I30HZ,
-    RES_3D_480I60HZ,
-    RES_2D_480I60HZ,
-    RES_2D_640x480HZ,
-    RES_PANEL_AUO_B089AW01,
-    RES_3D_720P60HZ_TB,
-    RES_3D_1080I60HZ_SBS_HALF,
-    RES_3D_1080P23HZ_TB,
-};
-static_assert(std::size(family_60) == 25);
 
 constexpr std::uint32_t word_60 = 64156074;
 constexpr std::uint32_t word_other = 64058462;
@@ -94,7 +63,7 @@ TEST_F(VideoPll, SetPLLGP_EveryByte_WholeSequenceWithItsFamilysWord)
     for (unsigned mode = 0; mode < 256; ++mode)
     {
         SCOPED_TRACE(mode);
-        const bool is_60 = std::find(std::begin(family_60), std::end(family_60), mode) != std::end(family_60);
+        const bool is_60 = picture_facts::pll_60().contains(mode);
         of_the_family += is_60 ? 1 : 0;
         preset(0, 0, 0);
         vSetPLLGP_HDMIDDS(static_cast<BYTE>(mode));

@@ -1,4 +1,5 @@
 /** What others may ask: mode, output size, aspect ratio. */
+#include "tests/layer/picture_facts.h"
 #include "tests/support/layer_fixture.h"
 
 using GetMode = LayerTest;
@@ -34,49 +35,6 @@ TEST_F(GetMode, GetMode_OtherMixerIdOrNullPointer_Refused)
     EXPECT_NO_TRACE();
 }
 
-namespace
-{
-
-struct Size
-{
-    UINT32 width;
-    UINT32 height;
-    std::vector<unsigned> modes;
-};
-
-/** Every mode of another size than 1920 x 1080, which is also the size of every number without a mode. */
-const Size sizes[] = {
-    { 640, 480, { RES_2D_640x480HZ } },
-    { 720,
-      480,
-      { RES_480I, RES_480P, RES_480P_1440, RES_480P_2880, RES_480I_2880, RES_3D_480P60HZ, RES_3D_480I30HZ,
-        RES_3D_480I60HZ, RES_2D_480I60HZ } },
-    { 720,
-      576,
-      { RES_576I, RES_576P, RES_576P_1440, RES_576P_2880, RES_576I_2880, RES_3D_576P50HZ, RES_3D_576I25HZ,
-        RES_3D_576I50HZ } },
-    { 1024, 600, { RES_PANEL_AUO_B089AW01 } },
-    { 1280,
-      720,
-      { RES_720P60HZ, RES_720P50HZ, RES_3D_720P60HZ, RES_3D_720P50HZ, RES_3D_720P30HZ, RES_3D_720P25HZ,
-        RES_3D_720P60HZ_TB, RES_3D_720P50HZ_TB } },
-};
-
-Size size_of(unsigned mode)
-{
-    for (const Size& size : sizes)
-    {
-        for (const unsigned listed : size.modes)
-        {
-            if (listed == mode)
-                return size;
-        }
-    }
-    return { 1920, 1080, {} };
-}
-
-} // namespace
-
 TEST_F(GetOutSize, GetOutSize_EveryModeNumber)
 {
     started();
@@ -84,7 +42,7 @@ TEST_F(GetOutSize, GetOutSize_EveryModeNumber)
     for (unsigned mode = 0; mode < 256; ++mode)
     {
         set_record("ucMode", mode);
-        const Size expected = size_of(mode);
+        const picture_facts::Size& expected = picture_facts::size_of(mode);
         smaller += expected.width < 1920 ? 1 : 0;
         UINT32 width = 0;
         UINT32 height = 0;

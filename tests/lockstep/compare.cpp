@@ -47,6 +47,17 @@ std::string hex(const unsigned char* bytes, std::size_t size)
     return text + "]";
 }
 
+std::string shown_pointer(std::uint64_t value)
+{
+    if (value == 0)
+        return "null";
+    if (value >= to_named)
+        return named_addresses[value - to_named].name;
+    if (value >= to_elsewhere)
+        return "&...";
+    return "&" + (value >= to_state ? field_at({}, value - to_state) : "caller+" + std::to_string(value - to_caller));
+}
+
 /* Parameters of a function; those behind the last are the values of a format. */
 std::string kind_of(const Function& function, unsigned i)
 {
@@ -71,8 +82,8 @@ std::string shown(const Trace& trace, const Call& call, unsigned i)
         return given.value == 0 ? "null" : hex(bytes, given.size);
     if (kind == "text" || (kind == "values" && given.size != 0))
         return given.value == 0 ? "null" : quoted(bytes, given.size);
-    if (kind == "place")
-        return given.value == 0 ? "null" : "&" + number(given.value);
+    if (kind == "place" || kind == "table" || kind == "symbol")
+        return shown_pointer(given.value);
     return number(given.value);
 }
 
@@ -247,23 +258,25 @@ std::optional<Difference> compare_calls(const Operation& operation, const Trace&
     const std::size_t count = same_calls(first, second) ? 0 : std::max(first.calls.size(), second.calls.size());
     for (std::size_t i = 0; i < count; ++i)
     {
-        const std::string at = "  call " + std::to_string(i) + ":\n";
-        const std::string texts = at + both(comparison, call_or_end(first, i), call_or_end(second, i));
+        const auto texts = [&] {
+            return "  call " + std::to_string(i) + ":\n" +
+                   both(comparison, call_or_end(first, i), call_or_end(second, i));
+        };
         if (i == first.calls.size() || i == second.calls.size() || first.calls[i].function != second.calls[i].function)
         {
             const Trace& longer = i < first.calls.size() ? first : second;
-            return Difference{ "order", platform[longer.calls[i].function].name, texts };
+            return Difference{ "order", platform[longer.calls[i].function].name, texts() };
         }
         const Call& a = first.calls[i];
         const Call& b = second.calls[i];
         const Function& function = platform[a.function];
         if (a.count != b.count)
-            return Difference{ "text", std::string(function.name) + " values", texts };
+            return Difference{ "text", std::string(function.name) + " values", texts() };
         for (unsigned k = 0; k < a.count; ++k)
         {
             const std::string kind = argument_differs(first, second, a, b, k, comparison);
             if (!kind.empty())
-                return Difference{ kind, std::string(function.name) + " " + name_of(function, k), texts };
+                return Difference{ kind, std::string(function.name) + " " + name_of(function, k), texts() };
         }
     }
     if (first.result != second.result)

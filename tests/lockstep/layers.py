@@ -13,7 +13,7 @@ from tools import compiler, in_parallel, run, write  # noqa: E402
 
 ROOT = signatures.ROOT
 HERE = ROOT / "tests" / "lockstep"
-SOURCES = [HERE / f"{name}.cpp" for name in ("layout", "recorder", "draw", "compare", "revisions")]
+SOURCES = [HERE / f"{name}.cpp" for name in ("layout", "recorder", "draw", "compare", "findings", "options", "bases")]
 SOURCES += [ROOT / "tools" / "record_view" / "record_layout.cpp"]
 
 
@@ -72,10 +72,10 @@ def hold_state_alike(layer):
         raise Unlike(f"{layer}: these variables are in the layer or in the headers, but not in both: {names}")
 
 
-def build_harness(made):
-    """Everything but the layers."""
+def build_harness(made, program=HERE / "revisions.cpp"):
+    """Everything but the layers, with the program's own source."""
     flags = ["-std=c++20", "-O2", "-fno-pie", f"-I{ROOT}", *instructions.includes()]
-    sources = [write(made / "surroundings.cpp", generate.source()), *SOURCES]
+    sources = [write(made / "surroundings.cpp", generate.source()), *SOURCES, program]
     objects = [made / f"{source.stem}.o" for source in sources]
 
     def compile_one(source, made_object):

@@ -1,8 +1,6 @@
 /* Where everything stands in an image: the state's objects in the order of the record's layout, the caller's memory
  * behind them. */
-#include <cstdlib>
 #include <cstring>
-#include <iostream>
 #include <string>
 
 #include "tests/lockstep/lockstep.h"
@@ -146,17 +144,6 @@ std::uint64_t get(const Image& image, const Field& field)
 void set(Image& image, const Field& field, std::uint64_t value)
 {
     std::memcpy(&image.at(field.offset), &value, field.size);
-}
-
-unsigned operation_number(const std::string& name)
-{
-    for (unsigned i = 0; i < operation_count; ++i)
-    {
-        if (operations[i].function.name == name)
-            return i;
-    }
-    std::cerr << "there is no operation " << name << '\n';
-    std::exit(2);
 }
 
 } // namespace lockstep

@@ -116,6 +116,12 @@ struct Given
     std::uint32_t size;
 };
 
+/** Classes of pointers: what they point at is told by name or by offset, never by address. */
+inline constexpr std::uint64_t to_caller = 1ull << 32;
+inline constexpr std::uint64_t to_state = 2ull << 32;
+inline constexpr std::uint64_t to_elsewhere = 3ull << 32;
+inline constexpr std::uint64_t to_named = 4ull << 32;
+
 struct Call
 {
     unsigned function;

@@ -16,12 +16,6 @@ namespace
 
 alignas(8) unsigned char caller[caller_size];
 
-/* Classes of pointers: what they point at is told by name or by offset, never by address. */
-constexpr std::uint64_t to_caller = 1ull << 32;
-constexpr std::uint64_t to_state = 2ull << 32;
-constexpr std::uint64_t to_elsewhere = 3ull << 32;
-constexpr std::uint64_t to_named = 4ull << 32;
-
 struct Object
 {
     void* addresses[2];
@@ -246,6 +240,17 @@ void Recorder::write_tag(void** place)
 std::uint64_t point(std::size_t offset)
 {
     return reinterpret_cast<std::uintptr_t>(caller + offset);
+}
+
+unsigned operation_number(const std::string& name)
+{
+    for (unsigned i = 0; i < operation_count; ++i)
+    {
+        if (operations[i].function.name == name)
+            return i;
+    }
+    std::cerr << "there is no operation " << name << '\n';
+    std::exit(2);
 }
 
 void run(const Operation& operation, unsigned layer, const Arguments& arguments, const Image& before,

@@ -63,11 +63,11 @@ class Built:
     harness = None
 
     @classmethod
-    def make(cls):
+    def make(cls, program=layers.HERE / "revisions.cpp"):
         if cls.layer is None:
             cls.objects = layers.compile_layer(layers.ROOT, layers.sources_of(layers.ROOT), MADE / "layer")
             cls.layer = layers.combine(cls.objects, MADE / "layer")
-            cls.harness = layers.build_harness(MADE)
+            cls.harness = layers.build_harness(MADE, program)
 
 
 def planted_layer(source, substitutions, made):

@@ -2,6 +2,7 @@
 
 #include "board/devices.h"
 #include "board/layer_state.h"
+#include "board/threads.h"
 
 namespace board
 {
@@ -47,6 +48,8 @@ void power_on(const Description& wanted)
     const Description given = wanted; // it may be the one in force
     for (const mixer::Arrangement& arrangement : given.arrangements)
         mixer::check_order(arrangement.order);
+    threads::end_all();
+    meanwhiles::forget_all();
     faults::power_on(given);
     layer_state::restore();
     board_state = { given, 0 };

@@ -1,5 +1,6 @@
 /** @file
- *  The virtual board: what tools and tests may do to it. Single-threaded; one board in a process. */
+ *  The virtual board: what tools and tests may do to it. There is one in a process, and one thread uses it; threads of
+ *  the board's own world run by turns, see threads.h. */
 #pragma once
 
 #include <array>
@@ -16,6 +17,7 @@
 
 #include "board/display_part.h"
 #include "board/hdmi_av.h"
+#include "board/meanwhile.h"
 #include "board/mixer.h"
 #include "board/trace.h"
 #include "board/value.h"

@@ -12,9 +12,10 @@ namespace os
 {
 void power_on(const Description& description);
 Value state();
-/** Whether the mutex of this handle is held. */
+/** Whether there is a mutex of this handle, and whether it is held. */
+bool is_mutex(std::uint32_t handle);
 bool mutex_held(std::uint32_t handle);
-/** Whether a timer's expiry function is running. */
+/** Whether a timer's expiry function is running, in the thread that runs. */
 bool in_timer_context();
 /** A small number that no object of the operating-system layer has had since power-on. */
 std::uint32_t new_handle();
@@ -132,6 +133,9 @@ void check(const Fault& fault);
 /** Counts a call that begins; the answer when a scripted fault is due. */
 std::optional<std::int64_t> due(std::string_view function);
 } // namespace faults
+
+/** "; did you mean X, Y?" with the platform functions whose names are nearest, or nothing. */
+std::string nearest_functions(std::string_view wrong, bool with_result);
 
 /** Report a misuse of the platform: console line, trace notice, counted. */
 void report_misuse(std::string text);

@@ -5,7 +5,24 @@
 #include "board/devices.h"
 #include "board/names.h"
 
-namespace board::faults
+namespace board
+{
+
+std::string nearest_functions(std::string_view wrong, bool with_result)
+{
+    std::vector<std::string_view> candidates;
+    for (const PlatformFunction& function : platform_functions())
+    {
+        if (function.has_result || !with_result)
+            candidates.push_back(function.name);
+    }
+    std::string text;
+    for (const std::string& near : names::nearest(wrong, candidates))
+        text += (text.empty() ? "; did you mean " : ", ") + near;
+    return text.empty() ? text : text + "?";
+}
+
+namespace faults
 {
 namespace
 {
@@ -23,20 +40,6 @@ std::map<std::string, Script, std::less<>>& scripts()
     return instance;
 }
 
-std::string suggestion(std::string_view wrong)
-{
-    std::vector<std::string_view> candidates;
-    for (const PlatformFunction& function : platform_functions())
-    {
-        if (function.has_result)
-            candidates.push_back(function.name);
-    }
-    std::string text;
-    for (const std::string& near : names::nearest(wrong, candidates))
-        text += (text.empty() ? "; did you mean " : ", ") + near;
-    return text.empty() ? text : text + "?";
-}
-
 } // namespace
 
 void check(const Fault& fault)
@@ -45,10 +48,11 @@ void check(const Fault& fault)
     const auto found = std::find_if(functions.begin(), functions.end(),
                                     [&](const PlatformFunction& function) { return function.name == fault.function; });
     if (found == functions.end())
-        throw std::invalid_argument("no platform function is called " + fault.function + suggestion(fault.function));
+        throw std::invalid_argument("no platform function is called " + fault.function +
+                                    nearest_functions(fault.function, true));
     if (!found->has_result)
         throw std::invalid_argument(fault.function + " has no result that a fault could answer" +
-                                    suggestion(fault.function));
+                                    nearest_functions(fault.function, true));
     if (fault.when != Fault::When::Always && fault.n == 0)
         throw std::invalid_argument("calls of " + fault.function + " are counted from 1");
 }
@@ -106,4 +110,5 @@ std::optional<std::int64_t> due(std::string_view function)
     return answer;
 }
 
-} // namespace board::faults
+} // namespace faults
+} // namespace board

@@ -50,9 +50,10 @@ const char* kind_name(TraceEntry::Kind kind)
     case TraceEntry::Kind::Call: return "call";
     case TraceEntry::Kind::Log: return "log";
     case TraceEntry::Kind::Assert: return "assert";
-    case TraceEntry::Kind::Notice: break;
+    case TraceEntry::Kind::Notice: return "notice";
+    case TraceEntry::Kind::Store: break;
     }
-    return "notice";
+    return "store";
 }
 
 } // namespace
@@ -68,9 +69,12 @@ std::string TraceEntry::to_json() const
     json["sequence"] = sequence;
     json["time_us"] = time_us;
     json["kind"] = kind_name(kind);
-    json["function"] = function;
+    if (kind != Kind::Store)
+        json["function"] = function;
     json["operation"] = operation;
     json["depth"] = depth;
+    if (thread != 0)
+        json["thread"] = thread;
     switch (kind)
     {
     case Kind::Call:
@@ -90,6 +94,12 @@ std::string TraceEntry::to_json() const
         json["text"] = text;
         break;
     case Kind::Notice: json["text"] = text; break;
+    case Kind::Store:
+        json["field"] = function;
+        for (const TraceArgument& argument : arguments)
+            json[argument.name] = json_of(argument.value);
+        json["by"] = by;
+        break;
     }
     return dumped(json, -1);
 }

@@ -1,11 +1,12 @@
-// The operating-system layer: handles, semaphores, formatting. One thread runs; what would make it wait for itself is
-// reported and refused.
+// The operating-system layer: handles, semaphores, formatting. What would make a thread wait for itself is reported and
+// refused, and so is a wait of the one that tools and tests run in: nobody else would go on meanwhile.
 #include <limits>
 #include <map>
 
 #include "board/device_values.h"
 #include "board/devices.h"
 #include "board/format.h"
+#include "board/threads.h"
 
 #include "u_os.h"
 
@@ -17,7 +18,8 @@ using board::names::Family;
 struct Semaphore
 {
     X_SEMA_TYPE_T type;
-    UINT32 count; ///< a mutex or binary one: 0 taken, 1 free
+    UINT32 count;        ///< a mutex or binary one: 0 taken, 1 free
+    unsigned holder = 0; ///< of a mutex: the thread
 };
 
 struct Os
@@ -40,6 +42,22 @@ Semaphore* find_semaphore(HANDLE_T handle, const char* function)
 std::string handle_text(HANDLE_T handle)
 {
     return "handle " + std::to_string(handle);
+}
+
+/** Whether the thread that runs may wait for a semaphore that is taken. */
+bool can_wait(const Semaphore& semaphore)
+{
+    const unsigned self = board::threads::context().number;
+    return self != 0 && (semaphore.type != X_SEMA_TYPE_MUTEX || semaphore.holder != self);
+}
+
+/** Says why a lock was refused, unless its caller did not want to wait. */
+void report_refused_lock(HANDLE_T handle, const Semaphore& semaphore, X_SEMA_OPTION_T option)
+{
+    if (semaphore.type == X_SEMA_TYPE_MUTEX && semaphore.holder == board::threads::context().number)
+        board::report_misuse("x_sema_lock: a second lock by the holder, " + handle_text(handle));
+    else if (option != X_SEMA_OPTION_NOWAIT)
+        board::report_misuse("x_sema_lock: nobody is left to give the semaphore, " + handle_text(handle));
 }
 
 bool creatable(X_SEMA_TYPE_T type, UINT32 value)
@@ -76,10 +94,15 @@ void report_bad_handle(const std::string& function, const std::string& kind, std
                       (handle <= os_state.last_handle ? " any more" : ""));
 }
 
-bool mutex_held(std::uint32_t handle)
+bool is_mutex(std::uint32_t handle)
 {
     const auto found = os_state.semaphores.find(handle);
-    return found != os_state.semaphores.end() && found->second.type == X_SEMA_TYPE_MUTEX && found->second.count == 0;
+    return found != os_state.semaphores.end() && found->second.type == X_SEMA_TYPE_MUTEX;
+}
+
+bool mutex_held(std::uint32_t handle)
+{
+    return is_mutex(handle) && os_state.semaphores.at(handle).count == 0;
 }
 
 Value state()
@@ -127,19 +150,23 @@ INT32 x_sema_create(HANDLE_T* phSema, X_SEMA_TYPE_T eType, UINT32 u4InitValue)
 INT32 x_sema_lock(HANDLE_T hSema, X_SEMA_OPTION_T eOption)
 {
     BOARD_CALL_R(x_sema_lock, hSema, eOption);
-    Semaphore* const semaphore = find_semaphore(hSema, "x_sema_lock");
+    Semaphore* semaphore = find_semaphore(hSema, "x_sema_lock");
+    while (semaphore != nullptr && semaphore->count == 0 && eOption != X_SEMA_OPTION_NOWAIT && can_wait(*semaphore))
+    {
+        if (!board::threads::wait_for(hSema))
+            return boardCall.fail(-1);
+        semaphore = find_semaphore(hSema, "x_sema_lock"); // it may have been deleted
+    }
     if (semaphore == nullptr)
         return boardCall.fail(-1);
-    if (semaphore->count != 0)
+    if (semaphore->count == 0)
     {
-        --semaphore->count;
-        return boardCall.answer(OSR_OK);
+        report_refused_lock(hSema, *semaphore, eOption);
+        return boardCall.fail(-1);
     }
-    if (semaphore->type == X_SEMA_TYPE_MUTEX)
-        board::report_misuse("x_sema_lock: a second lock by the holder, " + handle_text(hSema));
-    else if (eOption != X_SEMA_OPTION_NOWAIT)
-        board::report_misuse("x_sema_lock: nobody is left to give the semaphore, " + handle_text(hSema));
-    return boardCall.fail(-1);
+    --semaphore->count;
+    semaphore->holder = board::threads::context().number;
+    return boardCall.answer(OSR_OK);
 }
 
 INT32 x_sema_unlock(HANDLE_T hSema)
@@ -161,6 +188,7 @@ INT32 x_sema_unlock(HANDLE_T hSema)
     }
     else
         semaphore->count = 1;
+    board::threads::given(hSema);
     return boardCall.answer_or_fault(OSR_OK);
 }
 

@@ -7,6 +7,7 @@
 
 #include "board/device_values.h"
 #include "board/devices.h"
+#include "board/threads.h"
 #include "board/trace.h"
 #include "board/video_planes.h"
 #include "drv_if.h"
@@ -53,6 +54,7 @@ struct Sources
     std::array<VideoPlane, VIDEO_PLANES> video;
     std::array<OsdPlane, OSD_PLANES> osd;
     std::optional<Id> being_told; ///< a video plane whose pu4SetColorMode runs
+    unsigned told_in = 0;         ///< in this thread
 };
 
 Sources sources_state;
@@ -112,7 +114,7 @@ void notice(Id id, const std::string& what)
  *  is made all the same, and what comes of it is reported where it comes. */
 void check_nobody_is_told(Id id, const char* what)
 {
-    if (sources_state.being_told)
+    if (sources_state.being_told && sources_state.told_in == board::threads::context().number)
         board::report_misuse("pu4SetColorMode of " + board::sources::name_of(*sources_state.being_told) + ": " +
                              board::sources::name_of(id) + " " + what +
                              " from inside it, and waits for MutexPMX for ever");
@@ -157,6 +159,7 @@ UINT32 set_color_mode(void* pvTag, DRV_PMX_COLOR_SPACE_T eColorSpace)
     ++plane.times_told;
     const std::optional<Id> outer = sources_state.being_told;
     sources_state.being_told = id;
+    sources_state.told_in = board::threads::context().number;
     notice(id, "is told " + board::named(Family::ColorSpace, eColorSpace).to_text());
     if (plane.connects_back)
         board::sources::connect(id);

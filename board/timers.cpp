@@ -6,6 +6,7 @@
 
 #include "board/device_values.h"
 #include "board/devices.h"
+#include "board/threads.h"
 
 #include "u_os.h"
 
@@ -29,7 +30,6 @@ struct Timers
 {
     microseconds now{};
     std::uint64_t starts = 0;
-    unsigned expiries_running = 0;
     std::map<HANDLE_T, Timer> timers;
     microseconds alarm{};
     std::uint64_t alarm_order = 0;
@@ -63,9 +63,10 @@ void expire(HANDLE_T handle)
     const std::string name = board::trace_arguments::function_value(reinterpret_cast<const void*>(callback)).string();
     const board::trace::Operation scope(name);
     board::trace::notice("expiry", "timer " + std::to_string(handle) + ": " + name);
-    const unsigned running = timers_state.expiries_running++;
+    board::threads::Context& context = board::threads::context();
+    ++context.expiry_functions;
     callback(handle, argument);
-    timers_state.expiries_running = running;
+    --context.expiry_functions;
 }
 
 /** The running timer that runs out first, up to a moment; 0 when none does. */
@@ -137,7 +138,7 @@ void advance(std::chrono::microseconds duration)
 
 bool os::in_timer_context()
 {
-    return timers_state.expiries_running != 0;
+    return threads::context().expiry_functions != 0;
 }
 
 namespace timers

@@ -1,34 +1,14 @@
 #include "board/trace.h"
 
-#include <cxxabi.h>
-
 #include <algorithm>
-#include <cstdlib>
-#include <cstring>
-#include <map>
+#include <utility>
 
 #include "board/devices.h"
-#include "board/executable_symbols.h"
-#include "board/tokens.h"
+#include "board/recorder.h"
+#include "board/threads.h"
 
 namespace board
 {
-namespace
-{
-
-struct Recorder
-{
-    std::vector<TraceEntry> entries;
-    std::uint64_t sequence = 0;
-    std::uint64_t power_on = 0; ///< calls that began before it are not recorded any more
-    unsigned depth = 0;
-    std::string operation;
-    bool operation_running = false;
-    bool in_hook = false;
-    std::function<void(const TraceEntry&)> sink;
-    std::function<void(const TraceEntry&)> after_call;
-    std::map<const void*, std::string> objects;
-};
 
 Recorder& recorder()
 {
@@ -36,7 +16,6 @@ Recorder& recorder()
     return instance;
 }
 
-/** The entry of a sequence number; none when it was cleared away. */
 TraceEntry* entry_of(std::uint64_t sequence)
 {
     auto& entries = recorder().entries;
@@ -49,198 +28,24 @@ TraceEntry* entry_of(std::uint64_t sequence)
 TraceEntry& add_entry(TraceEntry::Kind kind, std::string function)
 {
     Recorder& state = recorder();
+    const threads::Context& context = threads::context();
     TraceEntry& entry = state.entries.emplace_back();
     entry.sequence = ++state.sequence;
     entry.time_us = static_cast<std::uint64_t>(now().count());
     entry.kind = kind;
     entry.function = std::move(function);
-    entry.operation = state.operation;
-    entry.depth = state.depth;
+    entry.operation = context.operation;
+    entry.depth = context.depth;
+    entry.thread = context.number;
     return entry;
 }
 
-Value::Base base_of(std::string_view function, std::string_view argument)
+void finished(const TraceEntry& entry)
 {
-    static constexpr std::string_view hexadecimal[] = { "u4Address", "u4Value", "u4BgColor", "u4PlaneOrder",
-                                                        "u4Capability" };
-    const bool hex = std::find(std::begin(hexadecimal), std::end(hexadecimal), argument) != std::end(hexadecimal) ||
-                     (function == "x_reg_read32" && argument == "result");
-    return hex ? Value::Base::Hex : Value::Base::Decimal;
-}
-
-/** A number gets the name and the base of its parameter, a list's numbers get the names alone. */
-Value dressed(const Value& value, const CallSite::Parameter& parameter)
-{
-    if (value.kind() == Value::Kind::Number && value.string().empty())
-    {
-        const bool hex = parameter.base == Value::Base::Hex || value.base() == Value::Base::Hex;
-        return Value::number(value.as_number(), names::name_of(parameter.family, value.as_number()),
-                             hex ? Value::Base::Hex : Value::Base::Decimal);
-    }
-    if (value.kind() != Value::Kind::List)
-        return value;
-    std::vector<Value> items;
-    for (const Value& item : value.items())
-        items.push_back(dressed(item, { parameter.name, parameter.family, item.base() }));
-    return Value::list(std::move(items));
-}
-
-/** "pu4PlaneOrder" of "array(pu4PlaneOrder, 8)", "pvParameter" of "value(\"pvParameter\", …)". */
-std::string_view name_in(std::string_view token)
-{
-    for (std::size_t open = token.find('('); open != token.npos; open = token.find('('))
-        token = tokens::split(token.substr(open + 1, tokens::closing(token, open) - open - 1)).front();
-    if (token.starts_with('&'))
-        token.remove_prefix(1);
-    if (token.starts_with('"'))
-        token = token.substr(1, token.size() - 2);
-    return token;
-}
-
-CallSite::Parameter parameter(std::string_view function, std::string_view name)
-{
-    return { std::string(name), names::family_of(function, name), base_of(function, name) };
-}
-
-/** A function's plain name: without its parameters and an unnamed namespace; empty when it has none worth showing. */
-std::string plain_name(std::string_view symbol)
-{
-    int status = 0;
-    const std::string mangled(symbol);
-    char* const demangled = abi::__cxa_demangle(mangled.c_str(), nullptr, nullptr, &status);
-    std::string name = demangled != nullptr ? demangled : mangled;
-    std::free(demangled);
-    if (name.find('{') != name.npos)
-        return {};
-    static constexpr std::string_view unnamed = "(anonymous namespace)::";
-    for (std::size_t at = name.find(unnamed); at != name.npos; at = name.find(unnamed))
-        name.erase(at, unnamed.size());
-    return name.substr(0, name.find('('));
-}
-
-Value named_object(const void* object, const char* unknown)
-{
-    if (object == nullptr)
-        return Value::null();
-    const auto& objects = recorder().objects;
-    if (const auto found = objects.find(object); found != objects.end())
-        return Value::symbol(found->second);
-    const std::string name = plain_name(executable_symbols::name_at(object));
-    return Value::symbol(name.empty() ? unknown : name);
-}
-
-void finished(const TraceEntry& entry, bool is_call)
-{
-    Recorder& state = recorder();
+    if (!recorder().sink)
+        return;
     const TraceEntry copy = entry; // what is called now may make further entries
-    if (state.sink)
-        state.sink(copy);
-    if (!is_call || !state.after_call || state.in_hook)
-        return;
-    state.in_hook = true;
-    const auto hook = state.after_call;
-    hook(copy);
-    state.in_hook = false;
-}
-
-} // namespace
-
-CallSite::CallSite(std::string_view function_name, std::string_view tokens)
-    : function(function_name), result(parameter(function_name, "result"))
-{
-    for (const std::string_view token : tokens::split(tokens))
-        parameters.push_back(parameter(function_name, name_in(token)));
-}
-
-CallRecord::CallRecord(const CallSite& site, std::vector<CallArgument> arguments)
-    : m_site(site), m_arguments(std::move(arguments)), m_power_on(recorder().power_on),
-      m_fault(faults::due(site.function))
-{
-    TraceEntry& entry = add_entry(TraceEntry::Kind::Call, site.function);
-    m_sequence = entry.sequence;
-    for (std::size_t i = 0; i < m_arguments.size(); ++i)
-    {
-        if (!m_arguments[i].left_out)
-            entry.arguments.push_back({ site.parameters[i].name, dressed(m_arguments[i].value, site.parameters[i]) });
-    }
-    ++recorder().depth;
-}
-
-CallRecord::~CallRecord()
-{
-    if (m_power_on != recorder().power_on)
-        return;
-    --recorder().depth;
-    write_outputs();
-    if (const TraceEntry* entry = entry_of(m_sequence))
-        finished(*entry, true);
-}
-
-void CallRecord::write_outputs()
-{
-    TraceEntry* const entry = entry_of(m_sequence);
-    if (entry == nullptr || entry->kind != TraceEntry::Kind::Call)
-        return;
-    auto recorded = entry->arguments.begin();
-    for (std::size_t i = 0; i < m_arguments.size(); ++i)
-    {
-        const CallArgument& argument = m_arguments[i];
-        if (argument.left_out)
-            continue;
-        const bool unchanged = m_outputs_unchanged && argument.unchanged_by_failure;
-        if (argument.at_end)
-            recorded->value =
-                unchanged ? Value::symbol("<unchanged>") : dressed(argument.at_end(), m_site.parameters[i]);
-        ++recorded;
-    }
-}
-
-void CallRecord::set_result(std::int64_t result, bool faulted)
-{
-    TraceEntry* const entry = m_power_on == recorder().power_on ? entry_of(m_sequence) : nullptr;
-    if (entry == nullptr)
-        return;
-    entry->result = dressed(Value::number(result), m_site.result);
-    entry->faulted = faulted;
-}
-
-void CallRecord::log(std::int32_t level, std::string text, bool shown)
-{
-    if (TraceEntry* const entry = entry_of(m_sequence))
-    {
-        entry->kind = TraceEntry::Kind::Log;
-        entry->arguments.clear();
-        entry->level = level;
-        entry->text = std::move(text);
-        entry->shown = shown;
-    }
-}
-
-void CallRecord::assertion()
-{
-    if (TraceEntry* const entry = entry_of(m_sequence))
-        entry->kind = TraceEntry::Kind::Assert;
-}
-
-Value trace_arguments::object_value(const void* object)
-{
-    return named_object(object, "<object>");
-}
-
-Value trace_arguments::function_value(const void* function)
-{
-    return named_object(function, "<function>");
-}
-
-CallArgument trace_arguments::text(char* buffer, std::size_t size)
-{
-    return { {},
-             [buffer, size] {
-                 if (buffer == nullptr || size == 0)
-                     return Value::null();
-                 return Value::text(std::string(buffer, strnlen(buffer, size)));
-             },
-             true };
+    recorder().sink(copy);
 }
 
 namespace trace
@@ -251,8 +56,10 @@ void power_on()
     Recorder& state = recorder();
     state.entries.clear();
     state.sequence = 0;
-    state.depth = 0;
     ++state.power_on;
+    threads::context().depth = 0;
+    if (state.watch.begin_anew)
+        state.watch.begin_anew();
 }
 
 const std::vector<TraceEntry>& entries()
@@ -262,6 +69,7 @@ const std::vector<TraceEntry>& entries()
 
 void clear()
 {
+    look();
     recorder().entries.clear();
 }
 
@@ -270,27 +78,56 @@ void set_sink(std::function<void(const TraceEntry&)> sink)
     recorder().sink = std::move(sink);
 }
 
-void set_after_call(std::function<void(const TraceEntry&)> hook)
+void set_store_watch(StoreWatch watch)
 {
-    recorder().after_call = std::move(hook);
+    recorder().watch = std::move(watch);
 }
 
-Operation::Operation(std::string name) : m_outermost(!recorder().operation_running)
+void look()
+{
+    if (recorder().watch.look)
+        recorder().watch.look();
+}
+
+void store(std::string field, Value from, Value to)
+{
+    TraceEntry& entry = add_entry(TraceEntry::Kind::Store, std::move(field));
+    entry.arguments = { { "from", std::move(from) }, { "to", std::move(to) } };
+    entry.by = threads::context().by;
+    finished(entry);
+}
+
+By::By(std::string name) : m_name(std::move(name)), m_before(threads::context().by)
+{
+    look();
+    threads::context().by = m_name;
+}
+
+By::~By()
+{
+    look();
+    threads::context().by = m_before;
+}
+
+Operation::Operation(const std::string& name) : m_by(name), m_outermost(!threads::context().operation_running)
 {
     if (!m_outermost)
         return;
-    recorder().operation = std::move(name);
-    recorder().operation_running = true;
-    interface_manager::operation_begins();
+    threads::context().operation = name;
+    threads::context().operation_running = true;
+    if (recorder().operations_running++ == 0)
+        interface_manager::operation_begins();
 }
 
 Operation::~Operation()
 {
     if (!m_outermost)
         return;
-    interface_manager::operation_ends(recorder().operation);
-    recorder().operation.clear();
-    recorder().operation_running = false;
+    look();
+    if (--recorder().operations_running == 0)
+        interface_manager::operation_ends(threads::context().operation);
+    threads::context().operation.clear();
+    threads::context().operation_running = false;
 }
 
 void name_object(const void* object, std::string name)
@@ -300,9 +137,10 @@ void name_object(const void* object, std::string name)
 
 void notice(std::string kind, std::string text)
 {
+    look();
     TraceEntry& entry = add_entry(TraceEntry::Kind::Notice, std::move(kind));
     entry.text = std::move(text);
-    finished(entry, false);
+    finished(entry);
 }
 
 } // namespace trace

@@ -48,13 +48,14 @@ struct TraceEntry
         Call,   ///< a platform function
         Log,    ///< PMX_IsLog, Printf, UTIL_Printf: `text` is what was formatted
         Assert, ///< Assert: arguments expression, file, line
-        Notice  ///< the board itself: a misuse of the platform, an expiry, a plug
+        Notice, ///< the board itself: a misuse of the platform, an expiry, a plug
+        Store   ///< somebody stored into the layer's objects: arguments from, to; only while stores are watched
     };
 
     std::uint64_t sequence = 0; ///< counted from 1 at power-on
     std::uint64_t time_us = 0;  ///< virtual time since power-on
     Kind kind = Kind::Call;
-    std::string function; ///< "TVE_SetEnable", "PMX_IsLog", "Assert", or a notice's kind ("misuse", "timer", …)
+    std::string function; ///< "TVE_SetEnable", "PMX_IsLog", "Assert", a notice's kind ("misuse", …), a store's field
     std::vector<TraceArgument> arguments;
     std::optional<Value> result; ///< absent for functions without one
     bool faulted = false;        ///< a scripted fault answered
@@ -62,18 +63,21 @@ struct TraceEntry
     bool shown = true;           ///< a log line: whether the console's level admitted it
     std::string text;            ///< formatted text of a log line; a notice's message
     std::string operation;       ///< outermost operation of the layer that was running, empty outside of one
+    std::string by;              ///< of a store: the operation, platform function or neighbour that made it
     unsigned depth = 0;          ///< nesting: 1 inside a platform call that called back into the layer
+    unsigned thread = 0;         ///< 0, or the number of the thread that it happened in; see threads.h
 
     /** One line, arguments by position: `TVE_SetEnable(0, 1)`, `x_sema_lock(1, X_SEMA_OPTION_WAIT) = 0`,
-     *  `LOG8 "Mute Enable\n"`, `Printf "…"`, `UTIL_Printf "…"`, `Assert("expression", "file")`, `NOTICE misuse "…"`. */
+     *  `LOG8 "Mute Enable\n"`, `Printf "…"`, `UTIL_Printf "…"`, `Assert("expression", "file")`, `NOTICE misuse "…"`,
+     *  `SET ucMode RES_480I → RES_480P`; behind a store stands who made it, `(poke)`, unless the operation did. */
     std::string brief() const;
     /** The same with arguments by name: `TVE_SetEnable(u4Tve=0, fgEnable=1)`. */
     std::string named() const;
     /** One JSON object, keys as documented in docs/board.md. */
     std::string to_json() const;
     /** Whether a line written by a person in the form of brief() means this entry: numbers in any base or by name, "*"
-     *  for any argument, "= result" may be left out. Throws std::invalid_argument with the reason when the line is not
-     *  well formed. */
+     *  for any argument, "->" for the arrow; "= result" may be left out, and who stored. Throws std::invalid_argument
+     *  with the reason when the line is not well formed. */
     bool matches(std::string_view line) const;
 };
 
@@ -87,22 +91,59 @@ void clear();
  *  beginning). */
 void set_sink(std::function<void(const TraceEntry&)> sink);
 
-/** Names the outermost operation while it lives; nested scopes change nothing. */
+/** Somebody who knows the layer's objects and compares them. */
+struct StoreWatch
+{
+    std::function<void()> look;       ///< tell, by store(), what changed since it looked last
+    std::function<void()> begin_anew; ///< the objects are as at load: from here on
+};
+
+/** The watch is looked through whenever those who may store take turns: when a platform call, an operation of the layer
+ *  or something else begins and ends. What it finds was stored by whoever ran until then. Empty functions end it. */
+void set_store_watch(StoreWatch watch);
+/** Somebody is done who is not known here. */
+void look();
+/** A line that a person wrote for a store, taken apart: `SET FIELD OLD → NEW (WHO)`. */
+struct StoreLine
+{
+    std::string_view field;
+    std::string_view from;
+    std::string_view to;
+    std::string_view by; ///< empty when left out
+};
+/** Throws std::invalid_argument with the reason when the line is not well formed. */
+StoreLine read_store_line(std::string_view line);
+
+/** Add a store by whoever runs. */
+void store(std::string field, Value from, Value to);
+
+/** Who stores while it lives, beside operations of the layer and platform functions: "poke", "meanwhile". */
+class By
+{
+public:
+    explicit By(std::string name);
+    ~By();
+    By(const By&) = delete;
+    By& operator=(const By&) = delete;
+
+private:
+    std::string m_name;
+    std::string_view m_before;
+};
+
+/** Names the outermost operation while it lives; a nested scope only tells who stores. */
 class Operation
 {
 public:
-    explicit Operation(std::string name);
+    explicit Operation(const std::string& name);
     ~Operation();
     Operation(const Operation&) = delete;
     Operation& operator=(const Operation&) = delete;
 
 private:
+    By m_by;
     bool m_outermost;
 };
-
-/** Called when a platform call is about to return (after its effect and its record); for tests that make something
- *  happen at every point of an operation. An empty function removes it. */
-void set_after_call(std::function<void(const TraceEntry&)> hook);
 
 /** Register the name of an object that crosses an interface by address, so that it is recorded by name. */
 void name_object(const void* object, std::string name);

@@ -236,6 +236,7 @@ private:
     std::uint64_t m_sequence;
     std::uint64_t m_power_on;
     std::optional<std::int64_t> m_fault;
+    std::string_view m_by_before; ///< who stored before the call
     bool m_outputs_unchanged = false;
 };
 

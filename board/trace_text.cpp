@@ -21,6 +21,9 @@ std::string text_of(const TraceEntry& entry, bool with_names)
         return head + ' ' + quote(entry.text);
     }
     case TraceEntry::Kind::Notice: return "NOTICE " + entry.function + ' ' + quote(entry.text);
+    case TraceEntry::Kind::Store:
+        return "SET " + entry.function + ' ' + entry.arguments[0].value.to_text() + " → " +
+               entry.arguments[1].value.to_text() + (entry.by == entry.operation ? "" : "  (" + entry.by + ")");
     case TraceEntry::Kind::Call:
     case TraceEntry::Kind::Assert: break;
     }
@@ -99,6 +102,13 @@ CallLine parse_call(std::string_view line, std::string_view function, std::strin
     return call;
 }
 
+bool store_matches(const TraceEntry& entry, const trace::StoreLine& store)
+{
+    return entry.kind == TraceEntry::Kind::Store && store.field == entry.function &&
+           entry.arguments[0].value.matches(store.from) && entry.arguments[1].value.matches(store.to) &&
+           (store.by.empty() || store.by == entry.by);
+}
+
 bool call_matches(const TraceEntry& entry, const CallLine& call)
 {
     if (call.function != entry.function)
@@ -116,6 +126,38 @@ bool call_matches(const TraceEntry& entry, const CallLine& call)
 
 } // namespace
 
+trace::StoreLine trace::read_store_line(std::string_view line)
+{
+    constexpr const char* form = "a store is written SET FIELD OLD → NEW";
+    std::string_view rest = tokens::trim(line);
+    if (word(rest) != "SET")
+        malformed(line, form);
+    const std::size_t field_end = rest.find_first_of(" \t");
+    const std::size_t arrow = std::min(rest.find("→"), rest.find("->"));
+    if (arrow == rest.npos || field_end > arrow)
+        malformed(line, form);
+    const std::size_t arrow_size = rest.substr(arrow).starts_with("->") ? 2 : std::string_view("→").size();
+    StoreLine store{ rest.substr(0, field_end),
+                     tokens::trim(rest.substr(field_end, arrow - field_end)),
+                     tokens::trim(rest.substr(arrow + arrow_size)),
+                     {} };
+    if (const std::size_t bracket = store.to.find('('); bracket != store.to.npos)
+    {
+        if (tokens::closing(store.to, bracket) != store.to.size() - 1)
+            malformed(line, "behind a store only (WHO) may stand");
+        store.by = tokens::trim(store.to.substr(bracket + 1, store.to.size() - bracket - 2));
+        store.to = tokens::trim(store.to.substr(0, bracket));
+        if (store.by.empty())
+            malformed(line, "who stored is missing in the brackets");
+    }
+    const auto is_value = [](std::string_view token) {
+        return !token.empty() && token.find_first_of(" \t") == token.npos;
+    };
+    if (!is_value(store.from) || !is_value(store.to))
+        malformed(line, form);
+    return store;
+}
+
 std::string TraceEntry::brief() const
 {
     return text_of(*this, false);
@@ -132,7 +174,8 @@ bool TraceEntry::matches(std::string_view written) const
     std::string_view rest = line;
     const std::string_view head = word(rest);
     if (head.empty())
-        malformed(line, "a line begins with a function's name, LOG and a level, Printf, UTIL_Printf, Assert or NOTICE");
+        malformed(line,
+                  "a line begins with a function's name, LOG and a level, Printf, UTIL_Printf, Assert, NOTICE or SET");
 
     if (head == "NOTICE")
     {
@@ -142,6 +185,8 @@ bool TraceEntry::matches(std::string_view written) const
         const bool same = text_matches(line, rest, text);
         return same && kind == Kind::Notice && notice == function;
     }
+    if (head == "SET" && !rest.starts_with('('))
+        return store_matches(*this, trace::read_store_line(line));
     if (head == "Printf" || head == "UTIL_Printf")
     {
         const bool same = text_matches(line, rest, text);

@@ -1,6 +1,8 @@
 # find_package(pmx): pmx::layer is the object that ships, with its headers; pmx::board the virtual board under it.
 get_filename_component(PMX_PREFIX ${CMAKE_CURRENT_LIST_DIR}/../../.. ABSOLUTE)
 
+find_package(Threads REQUIRED)   # the board's
+
 if(NOT TARGET pmx::layer)
     add_library(pmx::layer OBJECT IMPORTED)
     set_target_properties(pmx::layer PROPERTIES
@@ -13,6 +15,6 @@ if(NOT TARGET pmx::layer)
     set_target_properties(pmx::board PROPERTIES
         IMPORTED_LOCATION ${PMX_PREFIX}/lib/pmx/libpmx_board.a
         IMPORTED_LINK_INTERFACE_LANGUAGES CXX
-        INTERFACE_LINK_LIBRARIES tomlplusplus   # Debian's libtomlplusplus-dev
+        INTERFACE_LINK_LIBRARIES "tomlplusplus;Threads::Threads"   # Debian's libtomlplusplus-dev
         INTERFACE_INCLUDE_DIRECTORIES ${PMX_PREFIX}/include/pmx)
 endif()

@@ -217,13 +217,13 @@ TEST_F(DisplayPart, Answer_ComesWhileAnOperationSleeps_AndIsNoTimersExpiry)
 {
     board::display_part::behave({ true, 1ms });
     change_resolution();
-    board::trace::set_after_call([](const board::TraceEntry& entry) {
+    board::at_every_call([](const board::TraceEntry& entry) {
         if (entry.function == "vPmxMixPlane")
             in_timer_context = board::os::in_timer_context();
     });
     in_timer_context = true;
     x_thread_delay(2);
-    board::trace::set_after_call({});
+    board::at_every_call({});
     EXPECT_FALSE(in_timer_context);
     EXPECT_EQ((Lines{ "0: 1", "1: 0" }), told());
     EXPECT_EQ(0u, board::misuses());

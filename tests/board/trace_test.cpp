@@ -4,6 +4,7 @@
 
 #include <chrono>
 #include <stdexcept>
+#include <utility>
 
 #include "device_test.h"
 
@@ -29,7 +30,7 @@ protected:
     void TearDown() override
     {
         board::trace::set_sink(nullptr);
-        board::trace::set_after_call(nullptr);
+        board::meanwhiles::forget_all();
         DeviceTest::TearDown();
     }
 
@@ -281,34 +282,169 @@ TEST_F(Trace, Sink_GetsEveryFinishedEntry_NestedOnesFirst)
     EXPECT_EQ(1u, board::trace::entries()[4].depth);
 }
 
-TEST_F(Trace, AfterCall_RunsBehindTheEffect_AndNotForItself)
+/* Stores: what the board has to do with them. The layer's own are in tests/tool. */
+
+/** Tells that this number has changed since it was looked at last. */
+struct NumberWatch
 {
-    Lines lines;
-    board::trace::set_after_call([&](const TraceEntry& entry) {
-        lines.push_back(entry.brief());
-        EXPECT_EQ("RES_480P", member(board::mixer::state(), "mode"));
+    int now = 0;
+    int before = 0;
+
+    void look()
+    {
+        if (now == before)
+            return;
+        const int old = std::exchange(before, now);
+        board::trace::store("number", Value::number(old), Value::number(now));
+    }
+};
+
+class Stores : public Trace
+{
+protected:
+    void SetUp() override
+    {
+        Trace::SetUp();
+        board::trace::set_store_watch({ [this] { watch.look(); }, [this] { watch = {}; } });
+    }
+    void TearDown() override
+    {
+        board::trace::set_store_watch({});
+        Trace::TearDown();
+    }
+
+    static Lines trace()
+    {
+        Lines lines;
+        for (const TraceEntry& entry : board::trace::entries())
+            lines.push_back(std::to_string(entry.depth) + " " + entry.brief());
+        return lines;
+    }
+
+    NumberWatch watch;
+};
+
+TEST_F(Stores, StandBetweenTheCallsThatTheyWereMadeBetween)
+{
+    {
+        const board::trace::Operation scope("PMX_Init");
+        watch.now = 1;
         PMX_VsyncInit();
-    });
-    PMX_HalSetMode(0, RES_480P);
-    board::trace::notice("plug", "out");
-    PMX_IsLog(1, "log");
-    EXPECT_EQ((Lines{ "PMX_HalSetMode(0, RES_480P)", "LOG1 \"log\"" }), lines);
-    board::trace::set_after_call(nullptr);
-    PMX_HalSetMode(0, RES_480P);
-    EXPECT_EQ(2u, lines.size());
+        PMX_VsyncStop();
+        watch.now = 2;
+        PMX_VsyncInit();
+        watch.now = 3;
+    }
+    EXPECT_EQ((Lines{ "0 SET number 0 → 1", "0 PMX_VsyncInit()", "0 PMX_VsyncStop()", "0 SET number 1 → 2",
+                      "0 PMX_VsyncInit()", "0 SET number 2 → 3" }),
+              trace());
+    EXPECT_EQ("PMX_Init", last().operation);
+    EXPECT_EQ("PMX_Init", last().by);
 }
 
-TEST_F(Trace, AfterCall_MayClearTheTraceAndPowerTheBoardOn)
+TEST_F(Stores, AreOfWhoeverRan)
 {
-    board::trace::set_after_call([](const TraceEntry&) { board::trace::clear(); });
-    PMX_HalSetMode(0, RES_480P);
+    watch.now = 1; // a tester
+    {
+        const board::trace::Operation scope("PMX_SetMode");
+        board::meanwhile("PMX_VsyncInit", 1, [this] {
+            watch.now = 3;
+            {
+                const board::trace::Operation nested("_PMX_TmrIsr");
+                watch.now = 4;
+            }
+            watch.now = 5;
+        });
+        watch.now = 2;
+        PMX_VsyncInit();
+        watch.now = 6;
+    }
+    {
+        const board::trace::By scope("poke");
+        watch.now = 7;
+    }
+    EXPECT_EQ((Lines{ "0 SET number 0 → 1  (outside)", "0 SET number 1 → 2", "0 PMX_VsyncInit()",
+                      "1 SET number 2 → 3  (meanwhile)", "1 SET number 3 → 4  (_PMX_TmrIsr)",
+                      "1 SET number 4 → 5  (meanwhile)", "0 SET number 5 → 6", "0 SET number 6 → 7  (poke)" }),
+              trace());
+}
+
+TEST_F(Stores, OfAThread_AreTold_WhereverItGoesOn)
+{
+    HANDLE_T mutex = 0;
+    x_sema_create(&mutex, X_SEMA_TYPE_MUTEX, 1);
+    board::meanwhile("PMX_VsyncInit", 1,
+                     [&] {
+                         const board::trace::Operation scope("i4Pmx_Connect");
+                         watch.now = 2;
+                         x_sema_lock(mutex, X_SEMA_OPTION_WAIT);
+                         watch.now = 4;
+                         x_sema_unlock(mutex);
+                     },
+                     { .thread = true });
+    {
+        const board::trace::Operation scope("PMX_SetMode");
+        x_sema_lock(mutex, X_SEMA_OPTION_WAIT);
+        watch.now = 1;
+        PMX_VsyncInit();
+        watch.now = 3;
+        x_sema_unlock(mutex);
+        watch.now = 5;
+    }
+    Lines stores;
+    for (const TraceEntry& entry : board::trace::entries())
+    {
+        if (entry.kind == TraceEntry::Kind::Store)
+            stores.push_back(entry.brief() + " in " + entry.operation + " @" + std::to_string(entry.thread));
+    }
+    EXPECT_EQ((Lines{ "SET number 0 → 1 in PMX_SetMode @0", "SET number 1 → 2 in i4Pmx_Connect @1",
+                      "SET number 2 → 3 in PMX_SetMode @0", "SET number 3 → 4 in i4Pmx_Connect @1",
+                      "SET number 4 → 5 in PMX_SetMode @0" }),
+              stores);
+}
+
+TEST_F(Stores, ClearAndPowerOn)
+{
+    watch.now = 1;
+    board::trace::clear();
+    board::trace::look();
+    EXPECT_TRUE(board::trace::entries().empty()) << "it was before the trace was cleared";
+    watch.now = 2;
+    board::power_on({});
+    board::trace::look();
     EXPECT_TRUE(board::trace::entries().empty());
-    board::trace::set_after_call([](const TraceEntry&) { board::power_on({}); });
-    EXPECT_EQ(-1, get_part_id_by_name("none"));
+    EXPECT_EQ(0, watch.now);
+    board::trace::set_store_watch({});
+    watch.now = 3;
+    board::trace::look();
     EXPECT_TRUE(board::trace::entries().empty());
-    board::trace::set_after_call(nullptr);
+}
+
+TEST_F(Stores, InJson)
+{
+    board::trace::store("ucMode", Value::number(RES_480I, "RES_480I"), Value::null());
+    EXPECT_EQ(nlohmann::json::parse(R"({"sequence":1,"time_us":0,"kind":"store","operation":"","depth":0,
+        "field":"ucMode","from":{"value":0,"name":"RES_480I"},"to":null,"by":"outside"})"),
+              parsed(last()));
+}
+
+TEST_F(Stores, Matches)
+{
+    board::trace::store("ucMode", Value::number(RES_480P, "RES_480P"), Value::number(-1));
+    for (const char* line :
+         { "SET ucMode RES_480P → -1", "SET ucMode 2 -> -1", "  SET  ucMode  0x2->*", "SET ucMode * → *",
+           "SET ucMode *→-1 (outside)", "SET ucMode RES_480P → -1  ( outside )" })
+        EXPECT_TRUE(last().matches(line)) << line;
+    for (const char* line : { "SET ucMode RES_480P → 1", "SET ucMode RES_480I → -1", "SET ucVfreq * → *",
+                              "SET ucMode * → * (poke)", "SET(1, 2)", "NOTICE misuse \"x\"" })
+        EXPECT_FALSE(last().matches(line)) << line;
+    for (const char* line : { "SET", "SET ucMode", "SET ucMode 1", "SET ucMode 1 →", "SET ucMode → 1", "SET → 1",
+                              "SET ucMode 1 2 → 3", "SET ucMode 1 → 2 3", "SET ucMode 1 → 2 (a) b",
+                              "SET ucMode 1 → 2 (", "SET ucMode 1 → 2 ()", "SET ucMode 1 = 2", "SET ucMode→1 2" })
+        EXPECT_THROW((void)last().matches(line), std::invalid_argument) << line;
+    EXPECT_TRUE(last().matches(last().brief()));
     PMX_VsyncInit();
-    EXPECT_EQ(0u, last().depth);
+    EXPECT_FALSE(last().matches("SET ucMode * → *"));
 }
 
 TEST_F(Trace, Objects_AreRecordedByName)

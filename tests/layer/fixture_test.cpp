@@ -181,3 +181,40 @@ TEST_F(Fixture, AtCall_RunsWhenTheNamedCallReturns)
     TVE_SetContrast(2);
     EXPECT_EQ(1u, seen);
 }
+
+TEST_F(Fixture, WatchStores_TheTraceShowsThem)
+{
+    started();
+    watch_stores();
+    PMX_SetTvType(0, PMX_TV_TYPE_PAL);
+    EXPECT_TRACE(R"(
+        SET ucTvType PMX_TV_TYPE_NTSC → PMX_TV_TYPE_PAL
+        PMX_HalSetTvType(0, PMX_TV_TYPE_PAL)
+    )");
+    set_record("ucMode", RES_480P);
+    EXPECT_TRACE("SET ucMode RES_1080P60HZ → RES_480P (outside)");
+    EXPECT_NO_TRACE();
+}
+
+TEST_F(Fixture, Meanwhile_HappensInsideTheCall)
+{
+    started();
+    watch_stores();
+    board::meanwhile("PMX_HalSetTvType", 1, [] { set_record("ucMode", RES_480P); });
+    PMX_SetTvType(0, PMX_TV_TYPE_PAL);
+    EXPECT_TRACE(R"(
+        SET ucTvType PMX_TV_TYPE_NTSC → PMX_TV_TYPE_PAL
+        PMX_HalSetTvType(0, PMX_TV_TYPE_PAL)
+        SET ucMode RES_1080P60HZ → RES_480P (meanwhile)
+    )");
+}
+
+TEST_F(Fixture, Meanwhile_ThatNeverHappens_Fails)
+{
+    board::meanwhile("PMX_HalSetTvType", 2, [] {});
+    PMX_HalSetTvType(0, 0);
+    EXPECT_NONFATAL_FAILURE(power_on(), "never happened: meanwhile inside PMX_HalSetTvType, after 1 calls");
+    board::meanwhile("PMX_HalSetTvType", 1, [] { throw std::runtime_error("wrong"); });
+    PMX_HalSetTvType(0, 0);
+    EXPECT_NONFATAL_FAILURE(power_on(), "wrong");
+}

@@ -184,12 +184,12 @@ protected:
     void run_out_after(const std::string& function, const Path& path, const State& from)
     {
         bench.put(from);
-        board::trace::set_after_call([&function](const board::TraceEntry& entry) {
+        board::at_every_call([&function](const board::TraceEntry& entry) {
             if (entry.function == function)
                 board::advance(timer_interval);
         });
         path.run();
-        board::trace::set_after_call({});
+        board::at_every_call({});
     }
 
 private:
@@ -198,7 +198,7 @@ private:
     {
         std::optional<std::string> point;
         std::size_t calls = 0;
-        board::trace::set_after_call([&](const board::TraceEntry& entry) {
+        board::at_every_call([&](const board::TraceEntry& entry) {
             if (path.answered && entry.function == "fgPmxDrvSetAvd" &&
                 entry.arguments.at(0).value.as_number() == PMX_SET_HDMI_RES_CHG)
                 PMX_SetFormatChangeFlag(FALSE);
@@ -211,7 +211,7 @@ private:
                 board::advance(timer_interval);
         });
         path.run();
-        board::trace::set_after_call({});
+        board::at_every_call({});
         const auto& entries = board::trace::entries();
         const auto expiries = std::count_if(entries.begin(), entries.end(), [](const board::TraceEntry& entry) {
             return entry.text == "PMX timeout.\n";

@@ -33,13 +33,13 @@ void set_flags(const Flags& flags)
 std::string lowering_with_flags()
 {
     std::string seen;
-    board::trace::set_after_call([&seen](const board::TraceEntry& entry) {
+    board::at_every_call([&seen](const board::TraceEntry& entry) {
         const Flags now = flags();
         seen += "F" + std::to_string(now.format_change) + " E" + std::to_string(now.enable_osd) + "  " + entry.brief() +
                 "\n";
     });
     PMX_SetFormatChangeFlag(FALSE);
-    board::trace::set_after_call({});
+    board::at_every_call({});
     return seen;
 }
 

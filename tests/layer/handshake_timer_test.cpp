@@ -193,7 +193,7 @@ TEST_F(DisplayTimer, TmrIsr_ClearsTheTimersFlagBeforeItLowersTheOther)
     set_record("status.fgTimerAlreadySet", 1);
     set_record("status.fgPmxFormatChangeFlag", 1);
     std::vector<std::string> seen;
-    board::trace::set_after_call([&seen](const board::TraceEntry& entry) {
+    board::at_every_call([&seen](const board::TraceEntry& entry) {
         seen.push_back(entry.brief() + " T" + std::to_string(record("status.fgTimerAlreadySet")) + " F" +
                        std::to_string(record("status.fgPmxFormatChangeFlag")));
     });

@@ -185,7 +185,7 @@ TEST_F(InformVdp, InformVdpColorSpace_MutexIsHeldAcrossQueryCallAndReleaseOfBoth
         connect(plane);
     unsigned calls = 0;
     std::vector<std::int64_t> lent; // of main and second video, while a plane is told
-    board::trace::set_after_call([&](const board::TraceEntry& entry) {
+    board::at_every_call([&](const board::TraceEntry& entry) {
         ++calls;
         EXPECT_EQ(entry.function != "x_sema_unlock", mutex_held()) << entry.brief();
         if (entry.function != "pu4SetColorMode")
@@ -194,7 +194,7 @@ TEST_F(InformVdp, InformVdpColorSpace_MutexIsHeldAcrossQueryCallAndReleaseOfBoth
         lent.push_back(held(second_video));
     });
     PMX_InformVdpColorSpace(0);
-    board::trace::set_after_call({});
+    board::at_every_call({});
     EXPECT_EQ(2u + 2 * 4, calls);
     EXPECT_EQ((std::vector<std::int64_t>{ 1, 0, 0, 1 }), lent);
     expect_balanced({ main_video, second_video });

@@ -272,12 +272,12 @@ TEST_F(MasterColourSpace, DecideMasterColorSpace_NewValueIsStoredBehindItsMessag
 {
     source(0, 0);
     std::vector<std::string> stored; // what came when, with the master of that moment
-    board::trace::set_after_call([&](const board::TraceEntry& entry) {
+    board::at_every_call([&](const board::TraceEntry& entry) {
         if (stored.size() < 3)
             stored.push_back(entry.function + " " + std::to_string(master()));
     });
     decide();
-    board::trace::set_after_call({});
+    board::at_every_call({});
     EXPECT_EQ((std::vector<std::string>{ "PMX_IsLog 1", "PMX_IsLog 1", "OSDSetColorSpace 0" }), stored);
 }
 

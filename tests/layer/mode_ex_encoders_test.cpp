@@ -65,7 +65,7 @@ constexpr const char* composite_failed =
 /** Leave what stands between rule R and the encoders' switches. */
 void only_formats()
 {
-    board::trace::set_after_call([](const board::TraceEntry& entry) {
+    board::at_every_call([](const board::TraceEntry& entry) {
         if (entry.function == "_i4Osd5Out_CVBSOnly")
             board::trace::clear();
     });

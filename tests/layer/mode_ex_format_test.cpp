@@ -17,13 +17,13 @@ constexpr const char* refused = R"(
 UINT32 format_of(const Request& request)
 {
     PMX_RESOLUTION_MODE_T format = RES_MODE_NUM;
-    board::trace::set_after_call([&format](const board::TraceEntry& entry) {
+    board::at_every_call([&format](const board::TraceEntry& entry) {
         if (entry.function == "OSD_BASE_SetDisplayMode")
             format = static_cast<PMX_RESOLUTION_MODE_T>(entry.arguments.at(0).value.as_number());
     });
     LayerTest::set_record("fgSetModeCalled", 0);
     EXPECT_EQ(1u, set_mode(request));
-    board::trace::set_after_call({});
+    board::at_every_call({});
     return format;
 }
 
@@ -217,7 +217,7 @@ TEST_F(MixerFormat, SetModeEx_RefusedFirstCall_TheNextOneStillProgramsEverything
     EXPECT_EQ(1, record("_fgBootUp"));
     board::trace::clear();
     std::string mute;
-    board::trace::set_after_call([&mute](const board::TraceEntry& entry) {
+    board::at_every_call([&mute](const board::TraceEntry& entry) {
         if (entry.function == "TVE_SetMuteCtrol")
             mute = entry.brief();
     });

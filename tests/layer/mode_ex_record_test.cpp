@@ -215,7 +215,7 @@ TEST_F(RequestFields, SetModeEx_IsStoredBetweenThePllAndTheEncoders)
 {
     running();
     std::string seen;
-    board::trace::set_after_call([&seen](const board::TraceEntry& entry) {
+    board::at_every_call([&seen](const board::TraceEntry& entry) {
         if (entry.kind != board::TraceEntry::Kind::Call)
             return;
         const std::string now = "mode " + std::to_string(record("ucMode")) + ", " + std::to_string(record("ucVfreq")) +

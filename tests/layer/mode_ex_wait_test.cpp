@@ -17,7 +17,7 @@ const Request hdmi_changed{ .hdmi = on(RES_720P60HZ) };
 /** What comes before the decision; the sequence itself is told elsewhere. */
 void forget_until(std::string_view function)
 {
-    board::trace::set_after_call([function](const board::TraceEntry& entry) {
+    board::at_every_call([function](const board::TraceEntry& entry) {
         if (entry.function == function)
             board::trace::clear();
     });
@@ -124,7 +124,7 @@ TEST_F(Wait, SetModeEx_HeldBack_TheTimerBringsGraphicsBackAfterTenSeconds)
 TEST_F(Wait, SetModeEx_FlagRaisedDuringAFullChange_IsHeldBackToo)
 {
     running();
-    board::trace::set_after_call([](const board::TraceEntry& entry) {
+    board::at_every_call([](const board::TraceEntry& entry) {
         if (entry.function == "OSD_BASE_SetFlag_PMXChangeResDone")
         {
             PMX_SetFormatChangeFlag(TRUE);
@@ -192,7 +192,7 @@ TEST_F(Wait, SetModeEx_NoSinkButTheFlagIsRaisedAgainInBetween_IsHeldBack)
 {
     raised();
     board::hdmi_av::plug(false);
-    board::trace::set_after_call([](const board::TraceEntry& entry) {
+    board::at_every_call([](const board::TraceEntry& entry) {
         if (entry.text == "Set Osd Enable :0.\n")
         {
             PMX_SetFormatChangeFlag(TRUE);

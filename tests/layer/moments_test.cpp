@@ -114,12 +114,12 @@ TEST_F(CallersArray, SetModeEx_ChangedAtAnyLaterCall_ChangesNothing)
         ask(p24);
         std::size_t call = 0;
         board::trace::clear();
-        board::trace::set_after_call([&](const board::TraceEntry&) {
+        board::at_every_call([&](const board::TraceEntry&) {
             if (call++ == n)
                 outputs.fill(off(RES_AUTO));
         });
         EXPECT_EQ(1u, set_mode(24));
-        board::trace::set_after_call({});
+        board::at_every_call({});
         EXPECT_EQ(undisturbed, calls());
         EXPECT_EQ(RES_1080P24HZ, record("arOutputConf[PMX_OUTPUT_HDMI].eResMode"));
         EXPECT_EQ(1, record("arOutputConf[PMX_OUTPUT_CVBS].fgOutputEnable"));

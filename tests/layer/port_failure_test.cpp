@@ -235,7 +235,7 @@ TEST_F(PortFailure, ConnectAndDisconnect_LookUpAndStoresAreMadeUnderTheMutex)
         prepare(operation);
         const RecordSnapshot before;
         unsigned logged = 0;
-        board::trace::set_after_call([&](const board::TraceEntry& entry) {
+        board::at_every_call([&](const board::TraceEntry& entry) {
             if (entry.function == "x_sema_unlock")
                 expect_recorded(operation); // nothing is stored behind it
             else
@@ -244,7 +244,7 @@ TEST_F(PortFailure, ConnectAndDisconnect_LookUpAndStoresAreMadeUnderTheMutex)
             logged += entry.function == "PMX_IsLog" ? 1 : 0;
         });
         EXPECT_EQ(done, operation.call(66, 0, PMX_COMP_TYPE_VDP, 2));
-        board::trace::set_after_call({});
+        board::at_every_call({});
         EXPECT_EQ(2u, logged);
         EXPECT_FALSE(mutex_held());
     }

@@ -108,14 +108,14 @@ TEST_F(SourceOsd, OsdEnabled_EachPlaneInEachColourSpaceFromEachMaster)
 TEST_F(SourceOsd, OsdEnabled_PortAndMasterAreWrittenBeforeTheMessagesThatSayIt)
 {
     std::vector<std::string> seen;
-    board::trace::set_after_call([&](const board::TraceEntry& entry) {
+    board::at_every_call([&](const board::TraceEntry& entry) {
         if (entry.function == "PMX_IsLog" && seen.size() < 2)
             seen.push_back(std::to_string(record("arPortInfo[2].fgEnabled")) +
                            std::to_string(record("arPortInfo[2].eInputColorMode")) +
                            std::to_string(record("arPortInfo[2].eSrcColorSpace")) + std::to_string(master()));
     });
     EXPECT_EQ(1u, enable(0, 720, 480));
-    board::trace::set_after_call({});
+    board::at_every_call({});
     EXPECT_EQ((std::vector<std::string>{ "1111", "1000" }), seen);
 }
 

@@ -277,14 +277,14 @@ TEST_F(SourceVdp, VdpEnabled_ThePortIsWrittenBeforeTheMessagesThatSayIt)
     set_record("arPortInfo[1].eInputColorMode", DRV_GFX_COLOR_MODE_RGB);
     set_record("arPortInfo[1].eSrcColorSpace", DRV_PMX_CS_YCBCR_601);
     std::vector<std::string> seen;
-    board::trace::set_after_call([&](const board::TraceEntry&) {
+    board::at_every_call([&](const board::TraceEntry&) {
         std::string fields;
         for (const char* name : { "fgEnabled", "eInputColorMode", "ucLumaKey", "eSrcColorSpace" })
             fields += std::to_string(record(std::string("arPortInfo[1].") + name)) + " ";
         seen.push_back(fields);
     });
     EXPECT_EQ(1u, PMX_VdpEnabled(0, 2, 1920, 1080, 7));
-    board::trace::set_after_call({});
+    board::at_every_call({});
     ASSERT_LE(4u, seen.size());
     EXPECT_EQ("1 0 7 0 ", seen[0]); // enabled
     EXPECT_EQ("1 0 7 0 ", seen[2]); // full range is switched: its size has not been looked at

@@ -136,7 +136,7 @@ Bench::Bench() : m_outputs(first_outputs()), m_record(find_record())
 
 Bench::~Bench()
 {
-    board::trace::set_after_call({});
+    board::at_every_call({});
 }
 
 State Bench::state() const
@@ -203,9 +203,9 @@ void Bench::set_mode(Event event)
         m_outputs = outputs;
     board::hdmi_av::plug(event != Event::ModeNoSink);
     if (event == Event::ModeFlagClear)
-        board::trace::set_after_call(answer_at_once);
+        board::at_every_call(answer_at_once);
     PMX_SetModeEx(0, outputs.data(), 60, DRV_NON_EXT_CHIP, 0);
-    board::trace::set_after_call({});
+    board::at_every_call({});
     board::hdmi_av::plug(true);
 }
 

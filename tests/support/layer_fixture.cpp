@@ -8,7 +8,9 @@
 #include <sstream>
 #include <stdexcept>
 
+#include "board/threads.h"
 #include "tools/record_view/record_view.h"
+#include "tools/record_view/store_watch.h"
 
 namespace
 {
@@ -76,6 +78,7 @@ testing::AssertionResult entries_are(const std::string& expected_lines,
                                      const std::function<bool(const board::TraceEntry&)>& admitted)
 {
     const std::vector<std::string> expected = lines_of(expected_lines);
+    board::trace::look();
     std::vector<board::TraceEntry> entries;
     std::copy_if(board::trace::entries().begin(), board::trace::entries().end(), std::back_inserter(entries), admitted);
     board::trace::clear();
@@ -163,14 +166,25 @@ void LayerTest::SetUp()
 
 void LayerTest::TearDown()
 {
-    board::trace::set_after_call({});
+    board::at_every_call({});
     check_reports();
+    record_view::watch_stores(false);
     if (!m_directory.empty())
         std::filesystem::remove_all(m_directory);
 }
 
+void LayerTest::watch_stores()
+{
+    record_view::watch_stores(true);
+}
+
 void LayerTest::check_reports()
 {
+    board::threads::end_all();
+    EXPECT_NO_THROW(board::meanwhiles::rethrow_failure());
+    for (const auto& armed : board::meanwhiles::armed())
+        ADD_FAILURE() << "never happened: " << armed.name << ", after " << armed.calls << " calls";
+    board::meanwhiles::forget_all();
     EXPECT_EQ(m_asserts, board::asserts()) << "failed assertions since power-on";
     EXPECT_EQ(m_misuses, board::misuses()) << "misuses of the platform since power-on";
     m_asserts = 0;
@@ -220,11 +234,10 @@ void LayerTest::no_boot_partition()
 
 void LayerTest::at_call(std::string function, std::function<void()> action)
 {
-    board::trace::set_after_call(
-        [function = std::move(function), action = std::move(action)](const board::TraceEntry& entry) {
-            if (entry.function == function)
-                action();
-        });
+    board::at_every_call([function = std::move(function), action = std::move(action)](const board::TraceEntry& entry) {
+        if (entry.function == function)
+            action();
+    });
 }
 
 testing::AssertionResult layer_test::trace_is(const char*, const std::string& lines)

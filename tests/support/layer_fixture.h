@@ -83,6 +83,9 @@ protected:
     void expect_asserts(unsigned number) { m_asserts = number; }
     void expect_misuses(unsigned number) { m_misuses = number; }
 
+    /** From now on the trace holds what is stored, so that EXPECT_TRACE shows it: `SET ucMode RES_480I → RES_480P`. */
+    static void watch_stores();
+
     /** Run an action whenever this platform function is about to return, to look at the layer in the middle of an
      *  operation. A later one replaces it. */
     static void at_call(std::string function, std::function<void()> action);

@@ -21,10 +21,11 @@ enum Lane
     lane_timer_set_flag,
     lane_timer,
     lane_osd_plane_3, ///< planes are counted from 1 here; the first two are of video
-    lane_osd_plane_8 = lane_osd_plane_3 + 5
+    lane_osd_plane_8 = lane_osd_plane_3 + 5,
+    lane_stores ///< only where there is one
 };
 
-/** What each lane is called. */
+/** What each lane is called, but for that of the stores. */
 std::map<int, std::string> lane_names();
 
 /** Lanes of states on which something holds now, and what: a raised flag, the running timer, a mixed plane. */

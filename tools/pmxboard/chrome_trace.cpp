@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstdio>
 #include <ostream>
+#include <utility>
 
 #include "board/board.h"
 #include "tools/pmxboard/chrome_lanes.h"
@@ -34,6 +35,10 @@ std::string arguments_of(const TraceEntry& entry)
     for (const board::TraceArgument& argument : entry.arguments)
         arguments.add(argument.name, argument.value);
     std::string json = "{\"sequence\":" + std::to_string(entry.sequence) + ",\"operation\":" + text(entry.operation);
+    if (entry.thread != 0)
+        json += ",\"thread\":" + std::to_string(entry.thread);
+    if (entry.kind == TraceEntry::Kind::Store)
+        json += ",\"by\":" + text(entry.by);
     if (!entry.arguments.empty())
         json += ",\"arguments\":" + to_json(arguments);
     if (entry.result)
@@ -70,6 +75,7 @@ void ChromeTrace::powered_on()
     ++m_process;
     ++m_power_ons;
     m_tick = 0;
+    m_stores_named = false;
     name_lanes();
     show(states_now());
 }
@@ -159,6 +165,11 @@ void ChromeTrace::begin(const Finished& finished)
     case TraceEntry::Kind::Notice:
         instant(lane_board, entry.function + ": " + without_line_end(entry.text), arguments_of(entry));
         break;
+    case TraceEntry::Kind::Store:
+        if (!std::exchange(m_stores_named, true))
+            name_lane(lane_stores, "stores");
+        instant(lane_stores, entry.brief().substr(std::string_view("SET ").size()), arguments_of(entry));
+        break;
     }
 }
 
@@ -242,16 +253,21 @@ void ChromeTrace::instant(int lane, const std::string& name, const std::string& 
 void ChromeTrace::name_lanes()
 {
     const std::string process = m_scenario + (m_power_ons > 1 ? ", power-on " + std::to_string(m_power_ons) : "");
-    const auto metadata = [this](int lane, const char* kind, const std::string& value) {
-        write("M", lane, std::string(",\"name\":\"") + kind + "\",\"args\":{" + value + "}");
-    };
     metadata(lane_process, "process_name", "\"name\":" + text(process));
     metadata(lane_process, "process_sort_index", "\"sort_index\":" + std::to_string(m_process));
     for (const auto& [lane, name] : lane_names())
-    {
-        metadata(lane, "thread_name", "\"name\":" + text(name));
-        metadata(lane, "thread_sort_index", "\"sort_index\":" + std::to_string(lane));
-    }
+        name_lane(lane, name);
+}
+
+void ChromeTrace::name_lane(int lane, const std::string& name)
+{
+    metadata(lane, "thread_name", "\"name\":" + text(name));
+    metadata(lane, "thread_sort_index", "\"sort_index\":" + std::to_string(lane));
+}
+
+void ChromeTrace::metadata(int lane, const std::string& kind, const std::string& value)
+{
+    write("M", lane, ",\"name\":\"" + kind + "\",\"args\":{" + value + "}");
 }
 
 void ChromeTrace::write(std::string_view phase, int lane, const std::string& rest)

@@ -66,6 +66,8 @@ private:
     void span_ends(int lane, const std::string& arguments);
     void instant(int lane, const std::string& name, const std::string& arguments);
     void name_lanes();
+    void name_lane(int lane, const std::string& name);
+    void metadata(int lane, const std::string& kind, const std::string& value);
     void write(std::string_view phase, int lane, const std::string& rest);
 
     std::ostream& m_to;
@@ -76,6 +78,7 @@ private:
     std::uint64_t m_tick = 0; ///< nanoseconds
     std::string m_command;
     std::string m_operation;
+    bool m_stores_named = false;   ///< their lane, in this process
     bool m_operation_told = false; ///< by operation_begins, not found out from an entry
     std::vector<Finished> m_waiting;
     std::vector<const Finished*> m_open; ///< while they are released

@@ -11,6 +11,9 @@ namespace pmxboard
 namespace
 {
 
+/** Stands among the beginnings for the stores. */
+constexpr std::string_view stores_name = "SET";
+
 /** Everything that an entry may say caused it. */
 std::vector<std::string_view> operation_names()
 {
@@ -41,16 +44,25 @@ std::string nearest_beginnings(std::string_view beginning, const std::vector<std
     return did_you_mean(beginning, beginnings);
 }
 
+bool is_so_called(const board::TraceEntry& entry, const std::string& beginning)
+{
+    switch (entry.kind)
+    {
+    case board::TraceEntry::Kind::Notice: return false;
+    case board::TraceEntry::Kind::Store: return beginning == stores_name;
+    default: return entry.function.starts_with(beginning);
+    }
+}
+
 } // namespace
 
 bool TraceFilter::shows(const board::TraceEntry& entry) const
 {
     const bool of_these =
         operations.empty() || std::find(operations.begin(), operations.end(), entry.operation) != operations.end();
-    const bool so_called =
-        only.empty() || std::any_of(only.begin(), only.end(), [&](const std::string& beginning) {
-            return entry.kind != board::TraceEntry::Kind::Notice && entry.function.starts_with(beginning);
-        });
+    const bool so_called = only.empty() || std::any_of(only.begin(), only.end(), [&](const std::string& beginning) {
+                               return is_so_called(entry, beginning);
+                           });
     return of_these && so_called;
 }
 
@@ -59,6 +71,8 @@ std::string TraceFilter::complaint() const
     const auto functions = platform_names();
     for (const std::string& beginning : only)
     {
+        if (beginning == stores_name)
+            continue;
         const bool is_known = !beginning.empty() && std::any_of(functions.begin(), functions.end(),
                                                                 [&](auto name) { return name.starts_with(beginning); });
         if (!is_known)

@@ -12,7 +12,7 @@ namespace pmxboard
 
 struct TraceFilter
 {
-    std::vector<std::string> only;       ///< beginnings of platform functions' names; empty: all of them
+    std::vector<std::string> only;       ///< beginnings of platform functions' names, SET for stores; empty: everything
     std::vector<std::string> operations; ///< what these caused; empty: whatever caused it
 
     bool shows(const board::TraceEntry& entry) const;

@@ -1,10 +1,13 @@
 /** @file
- *  Where the layer's private objects keep their fields: one table, made from the layer's own types. */
+ *  Where the layer's private objects keep their fields: one table, made from the layer's own types; and how they are
+ *  read there. */
 #pragma once
 
 #include <cstddef>
 #include <string>
 #include <vector>
+
+#include "board/value.h"
 
 namespace record_view
 {
@@ -37,6 +40,15 @@ struct Object
     Node node;
 };
 
+/** Whether it is a field, with nothing below it. */
+bool is_single(const Node& node);
+
 const std::vector<Object>& objects();
+
+/** Where an object lies in this executable. Throws std::runtime_error. */
+unsigned char* address_of(const Object& object);
+
+/** What stands at a node's place, also in a copy of the object; numbers carry their names. */
+board::Value value_at(const Node& node, const unsigned char* at);
 
 } // namespace record_view

@@ -1,0 +1,81 @@
+// Objects of the layer as they lie in memory, read by the table of their fields.
+#include <bit>
+#include <cstring>
+#include <map>
+#include <stdexcept>
+
+#include "board/executable_symbols.h"
+#include "board/names.h"
+#include "tools/record_view/record_layout.h"
+
+namespace record_view
+{
+namespace
+{
+
+using board::Value;
+
+static_assert(std::endian::native == std::endian::little, "fields are read and written byte by byte, lowest first");
+
+/** Words that are read bit by bit or digit by digit. */
+bool reads_best_in_hex(std::string_view name)
+{
+    return name == "u4BgColor" || name == "u4Capability" || name == "u4PlaneOrder" || name == "PMX_debug_level";
+}
+
+Value number_at(const Node& node, const unsigned char* at)
+{
+    std::uint64_t bits = 0;
+    std::memcpy(&bits, at, node.size);
+    std::int64_t number = static_cast<std::int64_t>(bits);
+    if (node.is_signed && node.size == sizeof(std::int32_t))
+        number = static_cast<std::int32_t>(bits);
+
+    if (node.form == Node::Form::Pointer)
+        return number == 0 ? Value::null() : Value::number(number, {}, Value::Base::Hex);
+    return Value::number(number, board::names::name_of(board::names::family_of(node.owner, node.name), number),
+                         reads_best_in_hex(node.name) ? Value::Base::Hex : Value::Base::Decimal);
+}
+
+} // namespace
+
+bool is_single(const Node& node)
+{
+    return node.form == Node::Form::Number || node.form == Node::Form::Pointer;
+}
+
+unsigned char* address_of(const Object& object)
+{
+    static std::map<const Object*, unsigned char*> known;
+    unsigned char*& address = known[&object];
+    if (address != nullptr)
+        return address;
+
+    const auto symbol = board::executable_symbols::find(object.symbol);
+    if (!symbol)
+        throw std::runtime_error("the layer's object " + object.symbol + " is not in this executable");
+    if (symbol->size != object.node.size)
+        throw std::runtime_error("the layer's object " + object.symbol + " has " + std::to_string(symbol->size) +
+                                 " bytes, not " + std::to_string(object.node.size));
+    address = static_cast<unsigned char*>(symbol->address);
+    return address;
+}
+
+Value value_at(const Node& node, const unsigned char* at)
+{
+    if (is_single(node))
+        return number_at(node, at);
+    if (node.form == Node::Form::List)
+    {
+        std::vector<Value> items;
+        for (const Node& child : node.children)
+            items.push_back(value_at(child, at + child.offset));
+        return Value::list(std::move(items));
+    }
+    std::vector<std::pair<std::string, Value>> members;
+    for (const Node& child : node.children)
+        members.emplace_back(child.name, value_at(child, at + child.offset));
+    return Value::record(std::move(members));
+}
+
+} // namespace record_view

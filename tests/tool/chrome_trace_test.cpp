@@ -316,4 +316,40 @@ TEST(ChromeTrace, OfAFailedRun_IsWhole)
     EXPECT_EQ(1u, spans(events, "operations").size());
 }
 
+TEST(ChromeTrace, Stores_AreInstantsInALaneOfTheirOwn_WhereThereAreAny)
+{
+    const auto lane_of_stores = [](const std::vector<Json>& events) {
+        std::vector<std::string> names;
+        std::set<Lane> lanes;
+        for (const Json& event : events)
+        {
+            if (event.at("ph") == "M" && event.at("name") == "thread_name" && event.at("args").at("name") == "stores")
+                lanes.insert(lane_of(event));
+            else if (event.at("ph") == "i" && lanes.count(lane_of(event)) != 0)
+                names.push_back(event.at("name").get<std::string>() + ", by " +
+                                event.at("args").at("by").get<std::string>());
+        }
+        names.insert(names.begin(), std::to_string(lanes.size()) + " lanes");
+        return names;
+    };
+    const auto events = traced({ "stores on\nmeanwhile PMX_HalSetTvType poke ucMode RES_480P\nPMX_SetTvType 0 3\n"
+                                 "power-on\nstores off\nPMX_SetTvType 0 3" });
+    EXPECT_EQ(std::vector<std::string>{}, faults(events));
+    EXPECT_EQ((std::vector<std::string>{ "1 lanes", "ucTvType PMX_TV_TYPE_NTSC → PMX_TV_TYPE_PAL, by PMX_SetTvType",
+                                         "ucMode RES_480I → RES_480P  (meanwhile), by meanwhile" }),
+              lane_of_stores(events));
+}
+
+TEST(ChromeTrace, AThreadThatWaits_ComesToItsCallsInOrder)
+{
+    const auto events =
+        traced({ "PMX_Init\nstores on\nsource vdp0 connect\n"
+                 "meanwhile as thread i4ImQueryInterface source osd1 connect\nPMX_InformVdpColorSpace 0" });
+    EXPECT_EQ(std::vector<std::string>{}, faults(events));
+    unsigned theirs = 0;
+    for (const Span& span : spans(events, "platform calls"))
+        theirs += span.arguments.value("thread", 0u) == 1 ? 1 : 0;
+    EXPECT_EQ(2u, theirs) << "lock and unlock";
+}
+
 } // namespace

@@ -87,7 +87,7 @@ TEST(Completion, Verbs_ByTheirUsage)
     EXPECT_THAT(candidates("sink valid a"), ElementsAre("asked"));
     EXPECT_THAT(candidates("sink valid RES_720P5"), ElementsAre("RES_720P50HZ"));
     EXPECT_THAT(candidates("sink plug "), IsEmpty());
-    EXPECT_THAT(candidates("display-part "), ElementsAre("off", "never", "answer", "raise", "lower"));
+    EXPECT_THAT(candidates("display-part "), ElementsAre("off", "never", "raise", "lower", "answer"));
     EXPECT_THAT(candidates("video-plane hw-enable 1 "), ElementsAre("VDP_DISABLED", "VDP_HIDDEN", "VDP_ENABLED"));
     EXPECT_THAT(candidates("source v"), ElementsAre("vdp0", "vdp1", "vdp2", "vdp3"));
     EXPECT_THAT(candidates("source osd1 start 10x10 "), ElementsAre("ycbcr", "rgb"));

@@ -89,7 +89,7 @@ TEST(DeviceVerbs, WrittenWrong_AreRefused)
     }
     for (const char* const wrong : { "display-part", "display-part on", "display-part answer", "display-part answer 3",
                                      "display-part answer never", "display-part raise 1", "display-part off 1s" })
-        EXPECT_EQ("here.pmx:1: write: display-part off|never|answer TIME, or display-part raise|lower\n",
+        EXPECT_EQ("here.pmx:1: write: display-part off|never|raise|lower, or display-part answer TIME\n",
                   diagnostics(wrong))
             << wrong;
     for (const char* const wrong : { "video-plane", "video-plane waiting", "video-plane waiting 1",

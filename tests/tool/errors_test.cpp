@@ -157,7 +157,7 @@ TEST(ScenarioErrors, Expectations)
                      "PMX_Init\nexpect call PMX_HalSetBgg(0, 1)");
     EXPECT_BEGINNING("here.pmx:1: the platform has no function Asser; did you mean Assert", "expect none Asser");
     EXPECT_BEGINNING("here.pmx:1: a call is written ", "expect call PMX_HalSetBg");
-    EXPECT_EQ("here.pmx:1: write: expect next LINE, such as FUNCTION(ARGUMENT, …) = RESULT\n",
+    EXPECT_EQ("here.pmx:1: write: expect next LINE, such as FUNCTION(ARGUMENT, …) = RESULT or SET FIELD OLD → NEW\n",
               diagnostics("expect next"));
     EXPECT_EQ("here.pmx:1: write: expect log LEVEL \"text\"\n", diagnostics("expect log 8"));
     EXPECT_EQ("here.pmx:1: expect log takes a text in quotes, not text\n", diagnostics("expect log 8 text"));

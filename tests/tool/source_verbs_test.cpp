@@ -9,8 +9,9 @@ namespace
 using tool_test::diagnostics;
 
 constexpr const char* SOURCE_USAGE =
-    "here.pmx:1: write: source vdp0…vdp3|osd0…osd5 connect|stop|disconnect|size WxH, source VDP start WxH [luma N], "
-    "source OSD start WxH ycbcr|rgb, or source VDP connects-back on|off\n";
+    "here.pmx:1: write: source vdp0…vdp3|osd0…osd5 connect|stop|disconnect, "
+    "source vdp0…vdp3|osd0…osd5 size WxH, source VDP start WxH [luma N], source OSD start WxH ycbcr|rgb, or "
+    "source VDP connects-back on|off\n";
 constexpr const char* DELAY_USAGE =
     "here.pmx:1: write: plane-delay [order 0x76543210] and eight delays, plane 1 first\n";
 

@@ -67,7 +67,9 @@ void add_run(CLI::App& app, Chosen& chosen)
         ->type_name("text|jsonl|chrome|off");
     sub->add_option("--trace-file", run->trace_file, "Write the trace there instead of among the rest")
         ->type_name("FILE");
-    sub->add_option("--only", run->only, "Show only platform functions whose names begin so; it may be repeated")
+    sub->add_flag("--stores", run->stores, "Show what is stored into the layer's record between two calls");
+    sub->add_option("--only", run->only,
+                    "Show only platform functions whose names begin so, and stores for SET; it may be repeated")
         ->delimiter(',')
         ->allow_extra_args(false)
         ->type_name("PREFIX[,PREFIX]");

@@ -121,7 +121,7 @@ Part of_trace_line(const std::vector<std::string>& words)
     {
         for (const auto& function : board::platform_functions())
             part.candidates.push_back(std::string(function.name) + "(");
-        add(part, std::vector<std::string>{ "LOG0", "LOG1", "LOG5", "LOG8", "LOG9", "NOTICE" });
+        add(part, std::vector<std::string>{ "LOG0", "LOG1", "LOG5", "LOG8", "LOG9", "NOTICE", "SET" });
         return part;
     }
     const std::string& word = words.back();
@@ -135,12 +135,25 @@ Part of_trace_line(const std::vector<std::string>& words)
     return part;
 }
 
+/** A store's field and values. */
+Part of_store(const std::vector<std::string>& words)
+{
+    Part part;
+    if (words.size() == 4)
+        add(part, field_candidates(words.back()));
+    else if (words.size() == 5 || words.size() == 7)
+        add(part, field_value_names(words[3]));
+    else if (words.size() == 6)
+        part.candidates.emplace_back("→");
+    return part;
+}
+
 Part of_expectation(const std::vector<std::string>& words)
 {
     Part part;
     const std::string& kind = words[1];
     if (kind == "call" || kind == "next")
-        return of_trace_line(words);
+        return words[2] == "SET" && words.size() > 3 ? of_store(words) : of_trace_line(words);
     if (kind == "none" && words.size() == 3)
         add(part, platform_names());
     else if (kind == "state" && words.size() == 3)
@@ -217,6 +230,37 @@ Part of_verb(const Verb& verb, const std::vector<std::string>& words, const Comp
     return all;
 }
 
+Part of_line(const std::vector<std::string>& words, const CompletionPlace& place);
+
+/** Where the command begins that a verb takes behind its own words; 0 while those are not complete. */
+std::size_t command_place(const std::vector<std::string>& words)
+{
+    std::size_t at = 1;
+    if (words[0] == "meanwhile")
+    {
+        at = words[1] == "as" ? 4 : 2;
+        if (words.size() > at && words[at] == "on")
+            at += 2;
+        if (words.size() > at && words[at] == "request")
+            return 0;
+    }
+    return at < words.size() ? at : 0;
+}
+
+/** A line whose verb takes a command. */
+Part of_command_taker(const Verb& verb, const std::vector<std::string>& words, const CompletionPlace& place)
+{
+    const std::size_t command = command_place(words);
+    Part part =
+        command == 0 ? Part{} : of_line({ words.begin() + static_cast<std::ptrdiff_t>(command), words.end() }, place);
+    if (command == 0 || command + 1 == words.size())
+    {
+        for (const std::string& own : of_verb(verb, words, place).candidates)
+            part.candidates.push_back(own);
+    }
+    return part;
+}
+
 Part of_line(const std::vector<std::string>& words, const CompletionPlace& place)
 {
     Part part;
@@ -238,8 +282,8 @@ Part of_line(const std::vector<std::string>& words, const CompletionPlace& place
     for (const Verb& verb : verbs())
     {
         if (verb.name == words[0])
-            return verb.usage.ends_with(" COMMAND") ? of_line({ words.begin() + 1, words.end() }, place)
-                                                    : of_verb(verb, words, place);
+            return verb.usage.find(" COMMAND") != verb.usage.npos ? of_command_taker(verb, words, place)
+                                                                  : of_verb(verb, words, place);
     }
     return part;
 }

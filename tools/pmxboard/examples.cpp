@@ -27,6 +27,10 @@ const char* const run_examples = R"(Examples:
       try something out
   pmxboard run --only TVE_,VDP_ --op PMX_SetModeEx scenarios/fifth-osd.pmx
       see what the mode change has to say to TV encoder and video plane
+  pmxboard run --stores --op PMX_SetModeEx scenarios/frequency-change.pmx
+      see what the mode change stores between its calls
+  printf 'PMX_Init\nmeanwhile PMX_HalSetTvType poke ucMode 3\nPMX_SetTvType 0 3\n' | pmxboard run --stores -
+      see what a neighbour does while the layer is inside a call
   printf 'PMX_Init\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\ndiff\n' | pmxboard run -
       see what a command changed
   printf 'PMX_Init\nwhat-if PMX_SetTvType 0 PMX_TV_TYPE_PAL\n' | pmxboard run -

@@ -4,6 +4,9 @@
 #include "board/board.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/verb_words.h"
+#include "tools/record_view/record_view.h"
+#include "tools/record_view/store_watch.h"
 
 namespace pmxboard
 {
@@ -22,7 +25,7 @@ struct Expectation
 
 const std::vector<Expectation>& expectations();
 
-[[noreturn]] void wrong_usage(const Line& line)
+[[noreturn]] void wrong_expectation(const Line& line)
 {
     for (const Expectation& expectation : expectations())
     {
@@ -35,7 +38,7 @@ const std::vector<Expectation>& expectations();
 void need_words(const Line& line, std::size_t count)
 {
     if (line.size() != count)
-        wrong_usage(line);
+        wrong_expectation(line);
 }
 
 [[noreturn]] void not_met(const std::string& expected, const std::string& found)
@@ -111,24 +114,51 @@ bool entry_matches(const TraceEntry& entry, const std::string& written)
     }
 }
 
+/** A value of a field as it may stand in a store: a name that is none is a wrong line, not another value. */
+void check_stored_value(const record_view::FieldType& field, const std::string& written)
+{
+    if (written != "*" && written != "null")
+        read_number(board::names::family_of(field.record, field.member), written, field.path);
+}
+
+/** `SET FIELD OLD → NEW`, the field by the name that it has in the trace. */
+std::string store_line(const Session& session, const Line& line)
+{
+    if (!session.watches_stores())
+        throw LineError("stores are not watched: write stores on before the command whose stores are expected");
+    const std::string written = line.from(2);
+    const board::trace::StoreLine store = board::trace::read_store_line(written);
+    try
+    {
+        const record_view::FieldType type = record_view::type_of(store.field);
+        check_stored_value(type, std::string(store.from));
+        check_stored_value(type, std::string(store.to));
+    }
+    catch (const record_view::FieldError& error)
+    {
+        throw LineError(error.what());
+    }
+    std::string named = "SET " + record_view::traced_name(store.field);
+    named.append(" ").append(store.from).append(" → ").append(store.to);
+    return store.by.empty() ? named : named.append(" (").append(store.by).append(")");
+}
+
 /** The line behind `expect call` or `expect next`, refused when no entry can ever look so. */
-std::string traced_line(const Line& line)
+std::string traced_line(const Session& session, const Line& line)
 {
     const std::string written = line.from(2);
     if (written.empty())
-        wrong_usage(line);
+        wrong_expectation(line);
     entry_matches(TraceEntry{}, written);
+    if (line.word(2) == "SET")
+        return store_line(session, line);
     const std::size_t bracket = written.find('(');
     if (bracket == written.npos || written.find('"') < bracket)
         return written;
 
     std::string function = written.substr(0, bracket);
     function.erase(function.find_last_not_of(' ') + 1);
-    std::vector<std::string_view> known;
-    for (const auto& platform : board::platform_functions())
-        known.push_back(platform.name);
-    if (std::find(known.begin(), known.end(), function) == known.end())
-        throw LineError("the platform has no function " + function + did_you_mean(function, known));
+    need_platform_function(function);
     return written;
 }
 
@@ -154,7 +184,7 @@ std::string instead_of(const std::string& written, const std::vector<TraceEntry>
 
 void expect_call(Session& session, const Line& line)
 {
-    const std::string written = traced_line(line);
+    const std::string written = traced_line(session, line);
     const auto window = session.window();
     for (std::size_t i = session.cursor(); i < window.size(); ++i)
     {
@@ -169,7 +199,7 @@ void expect_call(Session& session, const Line& line)
 
 void expect_next(Session& session, const Line& line)
 {
-    const std::string written = traced_line(line);
+    const std::string written = traced_line(session, line);
     const auto window = session.window();
     const std::size_t next = session.cursor();
     if (next >= window.size())
@@ -190,11 +220,7 @@ void expect_no_more(Session& session, const Line& line)
 void expect_none(Session& session, const Line& line)
 {
     need_words(line, 3);
-    std::vector<std::string_view> known;
-    for (const auto& platform : board::platform_functions())
-        known.push_back(platform.name);
-    if (std::find(known.begin(), known.end(), line.word(2)) == known.end())
-        throw LineError("the platform has no function " + line.word(2) + did_you_mean(line.word(2), known));
+    need_platform_function(line.word(2));
     for (const TraceEntry& entry : session.window())
     {
         if (entry.function == line.word(2))
@@ -202,7 +228,7 @@ void expect_none(Session& session, const Line& line)
     }
 }
 
-std::string read_text(const Line& line, std::size_t index)
+std::string read_quoted(const Line& line, std::size_t index)
 {
     const Kind text{ .form = Kind::Form::Text, .names = {}, .members = {} };
     return read_value(text, line.word(index), "expect " + line.word(1)).string();
@@ -212,7 +238,7 @@ void expect_log(Session& session, const Line& line)
 {
     need_words(line, 4);
     const std::int64_t level = read_number(board::names::Family::None, line.word(2), "the level");
-    const std::string text = read_text(line, 3);
+    const std::string text = read_quoted(line, 3);
     std::string of_level;
     for (const TraceEntry& entry : session.window())
     {
@@ -228,7 +254,7 @@ void expect_log(Session& session, const Line& line)
 void expect_console(Session& session, const Line& line)
 {
     need_words(line, 3);
-    const std::string text = read_text(line, 2);
+    const std::string text = read_quoted(line, 2);
     const std::string console = session.console_window();
     constexpr std::size_t most = 200;
     if (console.find(text) == console.npos)
@@ -271,8 +297,8 @@ const std::vector<Expectation>& expectations()
     static const std::vector<Expectation> all = {
         { "result", "result VALUE", expect_result },
         { "out", "out ARGUMENT VALUE|untouched", expect_out },
-        { "call", "call LINE, such as FUNCTION(ARGUMENT, …) = RESULT", expect_call },
-        { "next", "next LINE, such as FUNCTION(ARGUMENT, …) = RESULT", expect_next },
+        { "call", "call LINE, such as FUNCTION(ARGUMENT, …) = RESULT or SET FIELD OLD → NEW", expect_call },
+        { "next", "next LINE, such as FUNCTION(ARGUMENT, …) = RESULT or SET FIELD OLD → NEW", expect_next },
         { "no-more", "no-more", expect_no_more },
         { "none", "none FUNCTION", expect_none },
         { "log", "log LEVEL \"text\"", expect_log },

@@ -1,5 +1,7 @@
 #include "tools/pmxboard/operation.h"
 
+#include <algorithm>
+
 #include "tools/pmxboard/step_error.h"
 
 namespace pmxboard
@@ -75,6 +77,12 @@ std::vector<std::string_view> names_of(const std::vector<Operation>& table)
 namespace
 {
 
+std::vector<std::span<PMX_RESOLUTION_T>>& lent_outputs()
+{
+    static std::vector<std::span<PMX_RESOLUTION_T>> all;
+    return all;
+}
+
 Kind number_kind(unsigned bits, Family family)
 {
     return { Kind::Form::Number, bits, false, family, 0, {}, {} };
@@ -87,6 +95,23 @@ T field(const Value& record, std::string_view path)
 }
 
 } // namespace
+
+LentOutputs::LentOutputs(std::span<PMX_RESOLUTION_T> outputs) : m_outputs(outputs)
+{
+    if (!outputs.empty())
+        lent_outputs().push_back(outputs);
+}
+
+LentOutputs::~LentOutputs()
+{
+    // Not the last one when threads end in another order than they began.
+    std::erase_if(lent_outputs(), [this](const auto& lent) { return lent.data() == m_outputs.data(); });
+}
+
+std::span<PMX_RESOLUTION_T> LentOutputs::innermost()
+{
+    return lent_outputs().empty() ? std::span<PMX_RESOLUTION_T>() : lent_outputs().back();
+}
 
 Kind RecordKind<PMX_RESOLUTION_T>::kind()
 {

@@ -237,7 +237,23 @@ struct RecordKind<PMX_RESOLUTION_T>
     static PMX_RESOLUTION_T from(const board::Value& value);
 };
 
-/** A list of records. */
+/** A caller's array of outputs while the operation runs that it was given to. */
+class LentOutputs
+{
+public:
+    explicit LentOutputs(std::span<PMX_RESOLUTION_T> outputs);
+    ~LentOutputs();
+    LentOutputs(const LentOutputs&) = delete;
+    LentOutputs& operator=(const LentOutputs&) = delete;
+
+    /** Of the operation that began last among those that run; empty when none runs that was given one. */
+    static std::span<PMX_RESOLUTION_T> innermost();
+
+private:
+    std::span<PMX_RESOLUTION_T> m_outputs;
+};
+
+/** A list of records that the function may change, or its caller while it runs. */
 template <typename T>
     requires std::is_class_v<T>
 struct Argument<T*>
@@ -247,6 +263,7 @@ struct Argument<T*>
         for (const board::Value& item : value.items())
             records.push_back(RecordKind<std::remove_const_t<T>>::from(item));
         passed = value.kind() == board::Value::Kind::Null ? nullptr : records.data();
+        lent.emplace(records);
     }
     Argument(const Argument&) = delete;
     Argument& operator=(const Argument&) = delete;
@@ -268,6 +285,7 @@ struct Argument<T*>
 
     std::vector<std::remove_const_t<T>> records;
     T* passed;
+    std::optional<LentOutputs> lent;
 };
 
 /** Call `function` with the values, one for each of its parameters A… */

@@ -37,6 +37,7 @@ struct OutputOptions
     std::ostream* trace_to = nullptr; ///< where the trace goes when that is somewhere else
     ChromeTrace* chrome = nullptr;    ///< for TraceForm::Chrome
     TraceFilter filter = {};
+    bool stores = false; ///< what is stored into the layer's objects stands in the trace
 };
 
 class Output
@@ -49,6 +50,8 @@ public:
 
     /** From now on nothing is real: what would be done is shown there, whatever becomes of the trace otherwise. */
     void imagine(std::ostream& to);
+    /** Whether stores are shown whatever the scenario says. */
+    bool shows_stores() const { return m_options.stores; }
     /** Whether a program reads the standard output, as JSON lines. */
     bool for_programs() const { return is_machine_read() && m_options.trace == TraceForm::Json; }
 

@@ -88,6 +88,7 @@ int run_files(const RunOptions& run)
     output.trace = trace_form(run.trace_format);
     output.to = &std::cout;
     output.filter = { run.only, run.operations };
+    output.stores = run.stores;
     if (const std::string wrong = complaint(run, output); !wrong.empty())
         return usage_error(wrong);
     std::ofstream trace_file;

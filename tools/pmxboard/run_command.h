@@ -17,6 +17,7 @@ struct RunOptions
     std::string colour = "auto";
     std::vector<std::string> only;
     std::vector<std::string> operations;
+    bool stores = false;
     bool quiet = false;
     bool verbose = false;
 };

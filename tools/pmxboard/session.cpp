@@ -1,21 +1,20 @@
 #include "tools/pmxboard/session.h"
 
 #include <algorithm>
+#include <utility>
 
 #include "board/board.h"
+#include "board/threads.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/record_view/store_watch.h"
 
 namespace pmxboard
 {
 namespace
 {
 
-const Verb* find_verb(std::string_view name)
-{
-    const auto& all = verbs();
-    const auto found = std::find_if(all.begin(), all.end(), [name](const Verb& verb) { return verb.name == name; });
-    return found == all.end() ? nullptr : &*found;
-}
+/** Where the outcome of a command goes that runs inside a platform call, in each thread; null when none does. */
+thread_local Outcome* meanwhile_outcome = nullptr;
 
 [[noreturn]] void unknown_command(const std::string& word)
 {
@@ -33,19 +32,45 @@ const Verb* find_verb(std::string_view name)
     throw LineError("no command " + word + did_you_mean(word, known));
 }
 
+/** An outcome in a notice: "= 1, *pucMode = RES_480P". */
+std::string to_text(const Outcome& outcome)
+{
+    std::string text = outcome.result ? "= " + outcome.result->to_text() : std::string();
+    for (const OutputValue& output : outcome.outputs)
+    {
+        text += (text.empty() ? "*" : ", *") + output.name +
+                (output.value ? " = " + output.value->to_text() : std::string(" untouched"));
+    }
+    return text;
+}
+
 } // namespace
+
+Command find_command(const std::string& name)
+{
+    const auto& all = verbs();
+    const auto verb = std::find_if(all.begin(), all.end(), [&](const Verb& known) { return known.name == name; });
+    const Command command{ verb == all.end() ? nullptr : &*verb, find(operations(), name) };
+    if (command.verb == nullptr && command.operation == nullptr)
+        unknown_command(name);
+    return command;
+}
 
 Session::Session(Output& output, std::string board, std::filesystem::path directory)
     : m_output(output), m_board(std::move(board)), m_directory(std::move(directory))
 {
     board::set_console([this](std::string_view text) { m_output.console(text); });
     board::trace::set_sink([this](const board::TraceEntry& entry) { m_output.entry(entry); });
+    record_view::watch_stores(m_output.shows_stores());
 }
 
 Session::~Session()
 {
     board::set_console({});
     board::trace::set_sink({});
+    board::meanwhiles::forget_all();
+    board::threads::end_all();
+    record_view::watch_stores(false);
 }
 
 void Session::run_line(std::string_view text)
@@ -69,6 +94,7 @@ void Session::run_line(std::string_view text)
     catch (...)
     {
         m_output.flush();
+        board::meanwhiles::forget_failures(); // the first one that was told is enough
         throw;
     }
     m_output.flush();
@@ -77,20 +103,54 @@ void Session::run_line(std::string_view text)
 void Session::run_command(const Line& line)
 {
     const std::string& name = line.word(0);
-    const Verb* const verb = find_verb(name);
-    const Operation* const operation = find(operations(), name);
-    if (verb == nullptr && operation == nullptr)
-        unknown_command(name);
+    const Command command = find_command(name);
     need_power(name);
-    if (verb == nullptr || !verb->only_looks)
+    if (command.verb == nullptr || !command.verb->only_looks)
         remember(line);
     begin_window();
-    if (verb != nullptr)
-        verb->run(*this, line);
-    else
-        run(*operation, read_arguments(*operation, std::span(line.words()).subspan(1)));
+    carry_out(line);
+    board::trace::look();
     if (m_window_end == std::string::npos)
         end_window();
+    board::meanwhiles::rethrow_failure();
+}
+
+void Session::carry_out(const Line& line)
+{
+    const Command command = find_command(line.word(0));
+    if (command.verb != nullptr)
+        command.verb->run(*this, line);
+    else
+        run(*command.operation, read_arguments(*command.operation, std::span(line.words()).subspan(1)));
+}
+
+void Session::run_meanwhile(const Line& line)
+{
+    Outcome outcome;
+    Outcome* const outer = std::exchange(meanwhile_outcome, &outcome);
+    try
+    {
+        carry_out(line);
+    }
+    catch (...)
+    {
+        meanwhile_outcome = outer;
+        throw;
+    }
+    meanwhile_outcome = outer;
+    if (const std::string text = to_text(outcome); !text.empty())
+        board::trace::notice("meanwhile", text);
+}
+
+bool Session::is_meanwhile()
+{
+    return meanwhile_outcome != nullptr;
+}
+
+void Session::watch_stores(bool on)
+{
+    m_watches_stores = on;
+    record_view::watch_stores(on || m_output.shows_stores());
 }
 
 void Session::remember(const Line& line)
@@ -125,7 +185,8 @@ void Session::run(const Operation& operation, const Values& values)
     Outcome outcome;
     {
         const board::trace::Operation scope(operation.name);
-        m_output.operation_begins(operation.name);
+        if (!is_meanwhile())
+            m_output.operation_begins(operation.name);
         outcome = operation.run(values);
     }
     set_outcome(operation.name, std::move(outcome));
@@ -133,6 +194,11 @@ void Session::run(const Operation& operation, const Values& values)
 
 void Session::set_outcome(std::string operation, Outcome outcome)
 {
+    if (is_meanwhile())
+    {
+        *meanwhile_outcome = std::move(outcome);
+        return;
+    }
     m_last_operation = std::move(operation);
     m_last_outcome = std::move(outcome);
     m_output.outcome(m_last_outcome);
@@ -141,7 +207,11 @@ void Session::set_outcome(std::string operation, Outcome outcome)
 void Session::power_on(const std::string& board)
 {
     if (m_powered)
+    {
+        board::threads::end_all();
         check_misuses();
+        check_meanwhiles();
+    }
     const std::string& name = board.empty() ? m_board : board;
     const std::filesystem::path beside = m_directory / name;
     const bool is_file = name.find('/') != name.npos || name.ends_with(".toml");
@@ -166,6 +236,8 @@ void Session::power_on(const std::string& board)
 
 void Session::begin_window()
 {
+    if (is_meanwhile())
+        return;
     m_window_begin = board::trace::entries().size();
     m_window_end = std::string::npos;
     m_cursor = 0;
@@ -175,6 +247,8 @@ void Session::begin_window()
 
 void Session::end_window()
 {
+    if (is_meanwhile())
+        return;
     m_window_end = board::trace::entries().size();
     m_console_end = board::console_text().size();
 }
@@ -184,7 +258,12 @@ std::vector<board::TraceEntry> Session::window() const
     const auto& all = board::trace::entries();
     const std::size_t end = std::min(m_window_end, all.size());
     const std::size_t begin = std::min(m_window_begin, end);
-    return { all.begin() + static_cast<std::ptrdiff_t>(begin), all.begin() + static_cast<std::ptrdiff_t>(end) };
+    std::vector<board::TraceEntry> window(all.begin() + static_cast<std::ptrdiff_t>(begin),
+                                          all.begin() + static_cast<std::ptrdiff_t>(end));
+    // What a scenario expects does not depend on how it is shown.
+    if (!m_watches_stores)
+        std::erase_if(window, [](const auto& entry) { return entry.kind == board::TraceEntry::Kind::Store; });
+    return window;
 }
 
 std::string Session::console_window() const
@@ -213,11 +292,27 @@ void Session::check_misuses() const
                      std::to_string(m_misuses_expected) + " were expected; the last: " + last);
 }
 
+/** What was to happen and has not: the scenario's author has miscounted, or armed the wrong function. */
+void Session::check_meanwhiles() const
+{
+    const auto armed = board::meanwhiles::armed();
+    board::meanwhiles::forget_all();
+    if (armed.empty())
+        return;
+    const auto& first = armed.front();
+    throw StepFailed(first.name + ": never happened; " + first.function + " was called " + std::to_string(first.calls) +
+                     " times since");
+}
+
 void Session::finish()
 {
     m_output.flush();
-    if (m_powered)
-        check_misuses();
+    if (!m_powered)
+        return;
+    board::threads::end_all();
+    m_output.flush();
+    check_misuses();
+    check_meanwhiles();
 }
 
 } // namespace pmxboard

@@ -56,6 +56,14 @@ public:
     void begin_window();
     void end_window();
 
+    /** Have stores in the trace from now on, where expectations see them; or no more. */
+    void watch_stores(bool on);
+    bool watches_stores() const { return m_watches_stores; }
+    /** Carry a command out from inside a platform call: what it does is the running command's, its outcome a notice. */
+    void run_meanwhile(const Line& line);
+    /** Whether such a command is running. */
+    static bool is_meanwhile();
+
     /** What the last command changed that did not only look. */
     std::vector<Change> changes() const;
     const std::string& last_command() const { return m_last_command; }
@@ -77,6 +85,8 @@ public:
 
 private:
     void run_command(const Line& line);
+    void carry_out(const Line& line);
+    void check_meanwhiles() const;
     /** A scenario that does not begin with power-on has a board all the same. */
     void need_power(std::string_view command);
     void check_misuses() const;
@@ -90,6 +100,7 @@ private:
     unsigned m_misuses_expected = 0;
     bool m_watches = true;
     bool m_imagines = false;
+    bool m_watches_stores = false;
     std::string m_last_command;
     std::optional<board::Value> m_before; ///< the state that the last command found; not for power-on
     std::string m_last_operation;
@@ -112,6 +123,15 @@ struct Verb
 
 const std::vector<Verb>& verbs();
 
+/** What a line begins with: one of the two is null. */
+struct Command
+{
+    const Verb* verb = nullptr;
+    const Operation* operation = nullptr;
+};
+/** Throws LineError with the nearest names. */
+Command find_command(const std::string& name);
+
 /** `expect …`. Throws StepFailed when it is not met. */
 void check_expectation(Session& session, const Line& line);
 
@@ -122,6 +142,9 @@ void run_ipmx(Session& session, const Line& line);
 void run_state(Session& session, const Line& line);
 void run_save(Session& session, const Line& line);
 void run_diff(Session& session, const Line& line);
+
+/** `meanwhile …`: what somebody else does while the layer is inside a platform call. */
+void run_meanwhile(Session& session, const Line& line);
 
 /** `what-if …`: what a command would do. */
 void run_what_if(Session& session, const Line& line);

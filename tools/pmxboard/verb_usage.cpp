@@ -18,7 +18,11 @@ struct Place
     bool repeats = false;
 };
 
-using Form = std::vector<Place>;
+struct Form
+{
+    std::vector<Place> places;
+    bool goes_on = false; ///< with prose
+};
 
 bool is_upper(char c)
 {
@@ -66,7 +70,10 @@ Form form_of(std::string_view text)
     for (std::string_view word : split(text, " "))
     {
         if (word == "and" || word.starts_with('"'))
+        {
+            form.goes_on = true;
             break;
+        }
         if (word.starts_with('['))
         {
             group = ++groups;
@@ -75,8 +82,8 @@ Form form_of(std::string_view text)
         const bool closes = word.ends_with(']');
         if (closes)
             word.remove_suffix(1);
-        if (word == ellipsis && !form.empty())
-            form.back().repeats = true;
+        if (word == ellipsis && !form.places.empty())
+            form.places.back().repeats = true;
         else
         {
             Place place{ {}, group, word.ends_with(ellipsis) };
@@ -85,7 +92,7 @@ Form form_of(std::string_view text)
                 const auto words = expanded(choice);
                 place.choices.insert(place.choices.end(), words.begin(), words.end());
             }
-            form.push_back(std::move(place));
+            form.places.push_back(std::move(place));
         }
         if (closes)
             group = 0;
@@ -130,34 +137,37 @@ std::vector<Form> forms_of(std::string_view usage)
 bool accepts(const Place& place, std::string_view word)
 {
     return std::any_of(place.choices.begin(), place.choices.end(), [word](const UsageWord& choice) {
-        if (!choice.is_placeholder)
-            return choice.text == word;
+        if (!choice.is_placeholder) // a number is an example of one
+            return choice.text == word || std::isdigit(static_cast<unsigned char>(choice.text.front())) != 0;
         return (choice.text != "VDP" || word.starts_with("vdp")) && (choice.text != "OSD" || word.starts_with("osd"));
     });
 }
 
-/** Collect what may stand behind `before`, from a place of the form on. */
-void follow(const Form& form, std::size_t place, std::span<const std::string> before, std::vector<UsageWord>& into)
+/** Collect what may stand behind `before`, from a place of the form on; true when nothing needs to. */
+bool follow(const Form& form, std::size_t place, std::span<const std::string> before, std::vector<UsageWord>& into)
 {
-    if (place >= form.size())
-        return;
+    const std::vector<Place>& places = form.places;
+    if (place >= places.size())
+        return before.empty() || form.goes_on;
+    bool may_end = false;
     if (before.empty())
-        into.insert(into.end(), form[place].choices.begin(), form[place].choices.end());
-    else if (accepts(form[place], before.front()))
+        into.insert(into.end(), places[place].choices.begin(), places[place].choices.end());
+    else if (accepts(places[place], before.front()))
     {
-        follow(form, place + 1, before.subspan(1), into);
-        if (form[place].repeats)
-            follow(form, place, before.subspan(1), into);
+        may_end = follow(form, place + 1, before.subspan(1), into);
+        if (places[place].repeats)
+            may_end = follow(form, place, before.subspan(1), into) || may_end;
     }
     // The whole optional group may be left out, where it begins.
-    const unsigned group = form[place].group;
-    if (group != 0 && form[place - 1].group != group)
+    const unsigned group = places[place].group;
+    if (group != 0 && places[place - 1].group != group)
     {
         std::size_t behind = place;
-        while (behind < form.size() && form[behind].group == group)
+        while (behind < places.size() && places[behind].group == group)
             ++behind;
-        follow(form, behind, before, into);
+        may_end = follow(form, behind, before, into) || may_end;
     }
+    return may_end;
 }
 
 } // namespace
@@ -175,6 +185,17 @@ std::vector<UsageWord> next_words(std::string_view usage, std::span<const std::s
             once.push_back(word);
     }
     return once;
+}
+
+bool fits(std::string_view usage, std::span<const std::string> words)
+{
+    std::vector<UsageWord> more;
+    for (const Form& form : forms_of(usage))
+    {
+        if (follow(form, 0, words, more))
+            return true;
+    }
+    return false;
 }
 
 } // namespace pmxboard

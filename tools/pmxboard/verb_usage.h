@@ -20,4 +20,8 @@ struct UsageWord
  *  [words] may be left out, a|b is a choice, a…  at the end repeats. Prose ends what is understood. */
 std::vector<UsageWord> next_words(std::string_view usage, std::span<const std::string> before);
 
+/** Whether the usage has a form that these words, the verb among them, may be; a form that ends in prose takes any
+ *  words behind what is understood. */
+bool fits(std::string_view usage, std::span<const std::string> words);
+
 } // namespace pmxboard

@@ -1,8 +1,12 @@
 #include "tools/pmxboard/verb_words.h"
 
+#include <algorithm>
 #include <stdexcept>
+#include <string_view>
+#include <vector>
 
 #include "board/duration.h"
+#include "board/trace.h"
 #include "tools/pmxboard/kind.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
@@ -24,6 +28,15 @@ void need_words(const Line& line, std::size_t least, std::size_t most)
 {
     if (line.size() < least || line.size() > most)
         wrong_usage(line);
+}
+
+void need_platform_function(const std::string& name)
+{
+    std::vector<std::string_view> names;
+    for (const auto& function : board::platform_functions())
+        names.push_back(function.name);
+    if (std::find(names.begin(), names.end(), name) == names.end())
+        throw LineError("the platform has no function " + name + did_you_mean(name, names));
 }
 
 std::int64_t number_in(const std::string& word, const std::string& what, std::int64_t lowest, std::int64_t highest)

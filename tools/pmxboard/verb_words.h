@@ -18,6 +18,9 @@ namespace pmxboard
 /** The line has so many words, the verb among them. */
 void need_words(const Line& line, std::size_t least, std::size_t most);
 
+/** The platform has a function of this name. */
+void need_platform_function(const std::string& name);
+
 /** A plain number in a range. */
 std::int64_t number_in(const std::string& word, const std::string& what, std::int64_t lowest, std::int64_t highest);
 

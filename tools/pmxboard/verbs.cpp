@@ -45,24 +45,11 @@ void flash(Session& session, const Line& line)
     }
 }
 
-const board::PlatformFunction& platform_function(const std::string& name)
-{
-    const auto all = board::platform_functions();
-    const auto found =
-        std::find_if(all.begin(), all.end(), [&](const auto& function) { return function.name == name; });
-    if (found != all.end())
-        return *found;
-    std::vector<std::string_view> names;
-    for (const auto& function : all)
-        names.push_back(function.name);
-    throw LineError("the platform has no function " + name + did_you_mean(name, names));
-}
-
 void fault(Session&, const Line& line)
 {
     need_words(line, 3, 5);
     const std::string& function = line.word(1);
-    platform_function(function);
+    need_platform_function(function);
     if (line.word(2) == "off" && line.size() == 3)
     {
         board::faults::clear(function);
@@ -114,6 +101,7 @@ void poke(Session&, const Line& line)
     need_words(line, 3, 3);
     try
     {
+        const board::trace::By scope(Session::is_meanwhile() ? "meanwhile" : "poke");
         const record_view::FieldType field = record_view::type_of(line.word(1));
         const auto family = board::names::family_of(field.record, field.member);
         record_view::set(line.word(1), read_number(family, line.word(2), field.path));
@@ -128,6 +116,12 @@ void trace(Session& session, const Line& line)
 {
     need_words(line, 2, 2);
     session.output().show_trace(read_switch(line, line.word(1)));
+}
+
+void stores(Session& session, const Line& line)
+{
+    need_words(line, 2, 2);
+    session.watch_stores(read_switch(line, line.word(1)));
 }
 
 void suspend(Session& session, const Line& line)
@@ -179,16 +173,23 @@ const std::vector<Verb>& verbs()
         { "save", "save FILE", run_save, true },
         { "diff", "diff [PATH…] [--json]", run_diff, true },
         { "what-if", "what-if COMMAND", run_what_if, true },
+        { "meanwhile",
+          "meanwhile FUNCTION [on N] COMMAND, meanwhile as thread FUNCTION [on N] COMMAND, "
+          "meanwhile FUNCTION [on N] request digital|hdmi|component|composite MODE|on|off, meanwhile FUNCTION off, "
+          "or meanwhile off",
+          run_meanwhile },
         { "poke", "poke FIELD VALUE", poke },
         { "trace", "trace on, or trace off", trace, true },
+        { "stores", "stores on, or stores off", stores, true },
         { "suspend", "suspend", suspend },
         { "resume", "resume", resume },
         { "sink", "sink plug, sink unplug, sink request-resolution [on|off], sink valid MODE HZ, or sink valid asked",
           run_sink },
-        { "display-part", "display-part off|never|answer TIME, or display-part raise|lower", run_display_part },
+        { "display-part", "display-part off|never|raise|lower, or display-part answer TIME", run_display_part },
         { "video-plane", "video-plane waiting on|off, or video-plane hw-enable PLANE STATE", run_video_plane },
         { "source",
-          "source vdp0…vdp3|osd0…osd5 connect|stop|disconnect|size WxH, source VDP start WxH [luma N], "
+          "source vdp0…vdp3|osd0…osd5 connect|stop|disconnect, source vdp0…vdp3|osd0…osd5 size WxH, source VDP start "
+          "WxH [luma N], "
           "source OSD start WxH ycbcr|rgb, or source VDP connects-back on|off",
           run_source },
         { "plane-delay", "plane-delay [order 0x76543210] and eight delays, plane 1 first", run_plane_delay },

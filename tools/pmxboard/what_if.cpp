@@ -10,6 +10,7 @@
 #include <stdexcept>
 #include <streambuf>
 
+#include "board/threads.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
 #include "tools/pmxboard/verb_words.h"
@@ -150,6 +151,8 @@ void run_what_if(Session& session, const Line& line)
         wrong_usage(line);
     if (line.word(1) == "expect")
         throw LineError("what-if takes a command; an expectation looks at what a command did");
+    if (const auto waiting = board::threads::waiting(); !waiting.empty())
+        throw StepFailed("what-if copies the process, and a thread that waits cannot be copied: " + waiting.front());
     session.output().flush();
     const std::string command = line.from(1);
     const Apart apart = run_apart([&](std::ostream& shown) { return carried_out(session, command, shown); });

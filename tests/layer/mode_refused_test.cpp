@@ -201,6 +201,18 @@ TEST_F(SetMode, IpmxSetMode_ThroughTheRegisteredTable_IsSetMode)
     EXPECT_EQ(RES_1080P24HZ, mode);
 }
 
+TEST_F(SetMode, IpmxSetMode_AnyFifthOsdMode_IsHandedOnAsGiven)
+{
+    started();
+    unsigned mode = RES_1080P60HZ;
+    for (const unsigned osd5 : { 2u, 3u, 128u, 255u })
+    {
+        mode = mode == RES_1080P60HZ ? RES_480P : RES_1080P60HZ;
+        EXPECT_EQ(1, table().pi4SetMode(tag(0), static_cast<UCHAR>(mode), 60, static_cast<BOOL>(osd5)));
+        EXPECT_TRACE(one_mode::set_mode({ mode, 60, osd5 }));
+    }
+}
+
 TEST_F(SetMode, IpmxSetMode_LowEightBitsOfTheTagAreTheMixerId)
 {
     started();

@@ -107,6 +107,24 @@ TEST_F(SetMode, SetMode_SameModeAgain_TellsOnlyOsdAndVideoPlane)
     EXPECT_RECORD_UNCHANGED(before);
 }
 
+TEST_F(SetMode, SetMode_AnyNonZeroSetModeCalled_IsSet_AndAChangeMakesItOne)
+{
+    for (const int called : { 2, 255 })
+    {
+        power_on();
+        started();
+        EXPECT_EQ(1u, PMX_SetMode(0, RES_1080P50HZ, 50, 0));
+        board::trace::clear();
+        set_record("fgSetModeCalled", called);
+        EXPECT_EQ(1u, PMX_SetMode(0, RES_1080P50HZ, 50, 0));
+        EXPECT_TRACE(one_mode::unchanged(RES_1080P50HZ));
+        EXPECT_EQ(called, record("fgSetModeCalled"));
+        EXPECT_EQ(1u, PMX_SetMode(0, RES_576P, 50, 0));
+        EXPECT_TRACE(one_mode::set_mode({ RES_576P, 50 }));
+        EXPECT_EQ(1, record("fgSetModeCalled"));
+    }
+}
+
 TEST_F(SetMode, SetMode_OnlyFifthOsdDiffers_CountsAsUnchanged)
 {
     started();

@@ -149,6 +149,22 @@ TEST_F(DisplayTimer, TmrIsr_LowersTheFlag)
     EXPECT_EQ(0, record("status.fgPmxFormatChangeFlag"));
 }
 
+TEST_F(DisplayTimer, TmrIsr_AnyNonZeroFlags_BecomeZero)
+{
+    started();
+    for (const int number : { 2, 254, 255 })
+    {
+        set_record("status.fgTimerAlreadySet", number);
+        set_record("status.fgPmxFormatChangeFlag", number);
+        set_record("status.fgPmxEnabeOsdFlag", number);
+        _PMX_TmrIsr(2, nullptr);
+        EXPECT_TRACE(std::string(timeout) + mode_ex::lowered);
+        EXPECT_EQ(0, record("status.fgTimerAlreadySet"));
+        EXPECT_EQ(0, record("status.fgPmxFormatChangeFlag"));
+        EXPECT_EQ(0, record("status.fgPmxEnabeOsdFlag"));
+    }
+}
+
 TEST_F(DisplayTimer, TmrIsr_NothingRaised_MixesAllTheSame)
 {
     started();

@@ -262,6 +262,25 @@ TEST_F(Shutdown, i4Uninit_MutexCannotBeDeleted_MinusOneAndTheHandleIsKept)
     }
 }
 
+TEST_F(Shutdown, i4Uninit_AnyHandleButZero_IsAMutexToDelete)
+{
+    for (const std::int64_t handle : { 2LL, 255LL, 0x80000000LL, 0xFFFFFFFFLL })
+    {
+        power_on();
+        started();
+        fail("x_sema_delete", 0);
+        set_record("MutexPMX", handle);
+        EXPECT_EQ(0, i4PMX_Uninit(1));
+        EXPECT_CALLS(R"(
+            PMX_VsyncStop()
+            i4ImUnregisterInterface2(66, 0, 9) = 0
+            x_timer_delete(2) = 0
+            x_sema_delete()" +
+                     std::to_string(handle) + ") = 0");
+        EXPECT_EQ(0, record("MutexPMX"));
+    }
+}
+
 TEST_F(Shutdown, i4Uninit_NoMutex_DeletesNoneAndStillLeavesTheLayerUninitialised)
 {
     fail("x_sema_create", -1);

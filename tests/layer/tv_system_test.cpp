@@ -185,6 +185,21 @@ TEST_F(SupportedRes, ChkSupportedRes_DriverWritesNoAnswer_ItIsZero)
     EXPECT_TRACE(query(RES_720P60HZ, 60, 0, 0) + " = 1");
 }
 
+TEST_F(SupportedRes, ChkSupportedRes_AnyOtherAnswerThanFalse_IsAnAnswer)
+{
+    started();
+    for (const int answer : { 2, 128, 255 })
+    {
+        board::faults::set({ "fgPmxDrvGetAvdInfo", answer });
+        UCHAR mode = 99;
+        UINT16 frequency = 999;
+        EXPECT_EQ(1u, PMX_ChkSupportedRes(0, RES_720P60HZ, 60, &mode, &frequency));
+        EXPECT_TRACE(query(RES_720P60HZ, 60, 0, 0) + " = " + std::to_string(answer));
+        EXPECT_EQ(0, mode);
+        EXPECT_EQ(0, frequency);
+    }
+}
+
 TEST_F(SupportedRes, ChkSupportedRes_OtherMixerId_RefusedAndNothingIsAsked)
 {
     started();
@@ -219,6 +234,17 @@ TEST_F(DeepColour, SetHdmiDeepColor_DriverRefuses_Zero)
     EXPECT_EQ(0u, PMX_SetHdmiDeepColor(0, 2));
     EXPECT_TRACE("fgPmxDrvSetAvd(PMX_CHG_DEEP_COLOR_BIT, 2, 1) = 0");
     EXPECT_EQ(1u, PMX_SetHdmiDeepColor(0, 2));
+}
+
+TEST_F(DeepColour, SetHdmiDeepColor_AnyOtherAnswerThanFalse_One)
+{
+    started();
+    for (const int answer : { 1, 2, 128, 255 })
+    {
+        board::faults::set({ "fgPmxDrvSetAvd", answer });
+        EXPECT_EQ(1u, PMX_SetHdmiDeepColor(0, 255));
+        EXPECT_TRACE("fgPmxDrvSetAvd(PMX_CHG_DEEP_COLOR_BIT, 255, 1) = " + std::to_string(answer));
+    }
 }
 
 TEST_F(DeepColour, SetHdmiDeepColor_OtherMixerId_OneAndNothingIsSent)

@@ -144,8 +144,11 @@ TEST_F(PictureSweep, SetAdjustment_BeforeStartUp_NothingIsPossible)
     const RecordSnapshot before;
     for (const Adjustment& adjustment : adjustments)
     {
-        EXPECT_EQ(0u, adjustment.set(0, 77, 1));
-        EXPECT_TRACE(refused(adjustment, 1, 77));
+        for (const unsigned target : { 0u, 1u, 2u, 255u })
+        {
+            EXPECT_EQ(0u, adjustment.set(0, 77, static_cast<UCHAR>(target)));
+            EXPECT_TRACE(refused(adjustment, target, 77));
+        }
     }
     EXPECT_RECORD_UNCHANGED(before);
 }

@@ -13,7 +13,6 @@ sys.dont_write_bytecode = True
 sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "tools" / "cost"))
 
 import signatures  # noqa: E402
-from program import AVD_PARAMETER_SIZE  # noqa: E402
 
 LAYERS = ("first_", "second_")  # what stands before the names of either layer
 NAMED = ("_rPMXIF", "pmx_pm_ops", "_PMX_TmrIsr")
@@ -127,11 +126,6 @@ def source():
 
 {includes}
 
-namespace cost
-{{
-static std::size_t avd_parameter_size(unsigned command);
-}}
-{AVD_PARAMETER_SIZE}
 using namespace lockstep;
 
 {parameter_tables(functions, "platform")}

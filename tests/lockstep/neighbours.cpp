@@ -142,6 +142,7 @@ int main(int count, char** words)
 {
     Options options = options_of(count, words, usage);
     options.comparison.places_of_checks = false;
+    const std::vector<Trial> gathered = options.bases.empty() ? std::vector<Trial>{} : gathered_bases(options.bases);
     Findings findings(options.comparison);
     Neighbours neighbours(options, findings);
     Random random(options.part);
@@ -156,13 +157,10 @@ int main(int count, char** words)
             neighbours.run_base(base);
     }
     const std::size_t drawn = neighbours.reached().bases;
-    if (!options.bases.empty())
+    for (const Trial& base : gathered)
     {
-        for (const Trial& base : gathered_bases(options.bases))
-        {
-            if (wanted(options, *base.operation))
-                neighbours.run_base(base);
-        }
+        if (wanted(options, *base.operation))
+            neighbours.run_base(base);
     }
 
     const Reached& reached = neighbours.reached();

@@ -4,6 +4,7 @@
 #include <algorithm>
 
 #include "drv_tve.h"
+#include "pmx_hal.h"
 #include "tests/support/layer_fixture.h"
 #include "u_os.h"
 

@@ -182,6 +182,13 @@ TEST(Apart, WhatIsDoneThere_StaysThere)
     EXPECT_EQ("", apart.death);
 }
 
+TEST(WhatIfInAScenario, Diff_TellsTheSameFromAFileAsFromAPipe)
+{
+    const std::string lines = "PMX_Init\nPMX_SetTvType 0 3\nwhat-if diff";
+    const std::string shown = run(lines).shown;
+    EXPECT_NE(std::string::npos, shown.find("record.ucTvType  PMX_TV_TYPE_NTSC → PMX_TV_TYPE_PAL")) << shown;
+}
+
 TEST(Apart, Death_IsReported_WithWhatCameBefore)
 {
     const auto killed = pmxboard::run_apart([](std::ostream& shown) {

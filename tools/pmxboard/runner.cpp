@@ -1,5 +1,6 @@
 #include "tools/pmxboard/runner.h"
 
+#include <algorithm>
 #include <istream>
 #include <ostream>
 
@@ -16,8 +17,20 @@ std::filesystem::path directory_of(const std::string& name)
     return name == "-" ? std::filesystem::path(".") : std::filesystem::path(name).parent_path();
 }
 
-/** Whether a line of a file begins with `diff`. Keeping the state before each command costs more than most commands.
- *  What comes through a pipe is not read ahead: somebody may be typing it. */
+/** Whether a line is about `diff`, by itself or within another command. */
+bool mentions_changes(const std::string& text)
+try
+{
+    const Line line(text);
+    return std::find(line.words().begin(), line.words().end(), "diff") != line.words().end();
+}
+catch (const LineError&)
+{
+    return false; // told when its turn comes
+}
+
+/** Whether a line of a file is. Keeping the state before each command costs more than most commands. What comes through
+ *  a pipe is not read ahead: somebody may be typing it. */
 bool asks_for_changes(std::istream& lines)
 {
     const auto begin = lines.tellg();
@@ -28,10 +41,7 @@ bool asks_for_changes(std::istream& lines)
     }
     bool found = false;
     for (std::string text; !found && std::getline(lines, text);)
-    {
-        const std::size_t word = text.find_first_not_of(" \t");
-        found = word != text.npos && text.compare(word, 4, "diff") == 0;
-    }
+        found = mentions_changes(text);
     lines.clear();
     lines.seekg(begin);
     return found;

@@ -1,4 +1,7 @@
 // The serial console: levelled and plain prints, assertions.
+#include "board/console.h"
+
+#include <algorithm>
 #include <cstdarg>
 
 #include "board/devices.h"
@@ -21,12 +24,12 @@ Console console_state;
 std::function<void(std::string_view)> console_sink; // the viewer's, so it outlives the board's power
 
 /** Formats a print's values; what the format gets wrong is the caller's misuse. */
-std::string printed(const CHAR* format, std::va_list values)
+std::string formatted(const CHAR* format, std::va_list values)
 {
-    board::Formatted formatted = board::format(format, values);
-    if (!formatted.complaint.empty())
-        board::report_misuse(std::move(formatted.complaint));
-    return formatted.text;
+    board::Formatted made = board::format(format, values);
+    if (!made.complaint.empty())
+        board::report_misuse(std::move(made.complaint));
+    return made.text;
 }
 
 } // namespace
@@ -77,6 +80,22 @@ Value state()
     return value;
 }
 
+std::size_t printed()
+{
+    return console_state.text.size();
+}
+
+std::string printed(std::size_t begin, std::size_t end)
+{
+    begin = std::min(begin, console_state.text.size());
+    return console_state.text.substr(begin, std::max(begin, end) - begin);
+}
+
+void forget()
+{
+    console_state.text.clear();
+}
+
 void print(std::string_view text)
 {
     console_state.text += text;
@@ -94,7 +113,7 @@ void PMX_IsLog(INT32 i4Level, const CHAR* szFormat, ...)
     BOARD_CALL(PMX_IsLog, i4Level, text(szFormat));
     std::va_list values;
     va_start(values, szFormat);
-    const std::string line = printed(szFormat, values);
+    const std::string line = formatted(szFormat, values);
     va_end(values);
     const bool shown = i4Level <= console_state.level;
     boardCall.log(i4Level, line, shown);
@@ -109,7 +128,7 @@ void Printf(const CHAR* szFormat, ...)
     BOARD_CALL(Printf, text(szFormat));
     std::va_list values;
     va_start(values, szFormat);
-    const std::string line = printed(szFormat, values);
+    const std::string line = formatted(szFormat, values);
     va_end(values);
     boardCall.log(0, line, true);
     board::console::print(line);
@@ -120,7 +139,7 @@ void UTIL_Printf(const CHAR* szFormat, ...)
     BOARD_CALL(UTIL_Printf, text(szFormat));
     std::va_list values;
     va_start(values, szFormat);
-    const std::string line = printed(szFormat, values);
+    const std::string line = formatted(szFormat, values);
     va_end(values);
     boardCall.log(0, line, true);
     board::console::print(line);

@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "board/board.h"
+#include "board/console.h"
 #include "board/threads.h"
 #include "tools/pmxboard/step_error.h"
 #include "tools/record_view/store_watch.h"
@@ -60,7 +61,11 @@ Session::Session(Output& output, std::string board, std::filesystem::path direct
     : m_output(output), m_board(std::move(board)), m_directory(std::move(directory))
 {
     board::set_console([this](std::string_view text) { m_output.console(text); });
-    board::trace::set_sink([this](const board::TraceEntry& entry) { m_output.entry(entry); });
+    board::trace::set_sink([this](const board::TraceEntry& entry) {
+        if (entry.kind == board::TraceEntry::Kind::Notice && entry.function == "misuse")
+            m_last_misuse = entry.text;
+        m_output.entry(entry);
+    });
     record_view::watch_stores(m_output.shows_stores());
 }
 
@@ -106,7 +111,10 @@ void Session::run_command(const Line& line)
     const Command command = find_command(name);
     need_power(name);
     if (command.verb == nullptr || !command.verb->only_looks)
+    {
+        forget_the_past();
         remember(line);
+    }
     begin_window();
     carry_out(line);
     board::trace::look();
@@ -151,6 +159,17 @@ void Session::watch_stores(bool on)
 {
     m_watches_stores = on;
     record_view::watch_stores(on || m_output.shows_stores());
+}
+
+/** Nobody looks further back than the last command. In large pieces, so that it costs next to nothing. */
+void Session::forget_the_past()
+{
+    constexpr std::size_t many_entries = 4096;
+    constexpr std::size_t much_text = 65536;
+    if (board::trace::entries().size() > many_entries)
+        board::trace::clear();
+    if (board::console::printed() > much_text)
+        board::console::forget();
 }
 
 void Session::remember(const Line& line)
@@ -241,7 +260,7 @@ void Session::begin_window()
     m_window_begin = board::trace::entries().size();
     m_window_end = std::string::npos;
     m_cursor = 0;
-    m_console_begin = board::console_text().size();
+    m_console_begin = board::console::printed();
     m_console_end = std::string::npos;
 }
 
@@ -250,7 +269,7 @@ void Session::end_window()
     if (is_meanwhile())
         return;
     m_window_end = board::trace::entries().size();
-    m_console_end = board::console_text().size();
+    m_console_end = board::console::printed();
 }
 
 std::vector<board::TraceEntry> Session::window() const
@@ -268,9 +287,7 @@ std::vector<board::TraceEntry> Session::window() const
 
 std::string Session::console_window() const
 {
-    const std::string all = board::console_text();
-    const std::size_t begin = std::min(m_console_begin, all.size());
-    return all.substr(begin, m_console_end == std::string::npos ? m_console_end : m_console_end - begin);
+    return board::console::printed(m_console_begin, m_console_end);
 }
 
 std::filesystem::path Session::file(const std::string& name) const
@@ -282,14 +299,8 @@ void Session::check_misuses() const
 {
     if (board::misuses() <= m_misuses_expected)
         return;
-    std::string last;
-    for (const board::TraceEntry& entry : board::trace::entries())
-    {
-        if (entry.kind == board::TraceEntry::Kind::Notice && entry.function == "misuse")
-            last = entry.text;
-    }
     throw StepFailed("the platform was misused " + std::to_string(board::misuses()) + " times, and " +
-                     std::to_string(m_misuses_expected) + " were expected; the last: " + last);
+                     std::to_string(m_misuses_expected) + " were expected; the last: " + m_last_misuse);
 }
 
 /** What was to happen and has not: the scenario's author has miscounted, or armed the wrong function. */

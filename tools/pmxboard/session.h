@@ -91,6 +91,7 @@ private:
     void need_power(std::string_view command);
     void check_misuses() const;
     void remember(const Line& line);
+    static void forget_the_past();
 
     Output& m_output;
     std::string m_board;
@@ -98,6 +99,7 @@ private:
     bool m_powered = false;
     unsigned m_expectations = 0;
     unsigned m_misuses_expected = 0;
+    std::string m_last_misuse;
     bool m_watches = true;
     bool m_imagines = false;
     bool m_watches_stores = false;

@@ -85,13 +85,13 @@ std::string logged_first(const Request& request)
 {
     std::string text;
     bool called = false;
-    board::trace::set_after_call([&](const board::TraceEntry& entry) {
+    board::at_every_call([&](const board::TraceEntry& entry) {
         called = called || entry.kind == board::TraceEntry::Kind::Call;
         if (!called && entry.kind == board::TraceEntry::Kind::Log)
             text += entry.text;
     });
     EXPECT_EQ(1u, set_mode(request));
-    board::trace::set_after_call({});
+    board::at_every_call({});
     return text;
 }
 

@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "src/driver/pmx/pmx_if.h"
+#include "tests/lockstep/agreement.h"
 
 namespace lockstep
 {
@@ -117,57 +118,6 @@ std::uint64_t draw_argument(Random& random, const Parameter& parameter)
     return draw_value(random, name, size_of(parameter));
 }
 
-const Field& field(const char* name)
-{
-    for (const Field& field : state_fields())
-    {
-        if (field.name == name)
-            return field;
-    }
-    return state_fields().front();
-}
-
-/* The record already has what is asked for. */
-void agree(Random& random, const Operation& operation, const Arguments& arguments, Image& state)
-{
-    static const Field mode = field("ucMode");
-    static const Field frequency = field("ucVfreq");
-    static const Field chip = field("rDrvExtScl");
-    static const Field osd5 = field("fgOSD5");
-    static const Field called = field("fgSetModeCalled");
-    static const Field boot = field("_fgBootUp");
-    static const std::size_t outputs = field("arOutputConf[0].fgOutputEnable").offset;
-    for (unsigned i = 0; i < operation.function.count; ++i)
-    {
-        const std::string name = operation.function.parameters[i].name;
-        if (random.once_in(4))
-            continue;
-        if (name == "ucMode")
-            set(state, mode, arguments[i]);
-        else if (name == "ucVFreq")
-            set(state, frequency, arguments[i]);
-        else if (name == "rDrvExtScl")
-            set(state, chip, arguments[i]);
-        else if (name == "fgOSD5")
-            set(state, osd5, arguments[i]);
-        else if (name == "prOutConf")
-        {
-            set(state, called, 1);
-            set(state, boot, 0);
-            std::memcpy(&state[outputs], &state[caller_offset()], array_size);
-            for (unsigned output = 0; output < PMX_OUTPUT_NUM; ++output)
-            {
-                const auto* const given =
-                    reinterpret_cast<const PMX_RESOLUTION_T*>(&state[caller_offset() + output * 28]);
-                if (given->fgOutputEnable == 0)
-                    continue;
-                set(state, mode, given->eResMode);
-                break;
-            }
-        }
-    }
-}
-
 } // namespace
 
 std::uint64_t draw_value(Random& random, const std::string& name, std::size_t size)
@@ -200,7 +150,7 @@ namespace
 Image make_started_state()
 {
     Image state(image_size(), 0);
-    const auto put = [&](const std::string& name, std::uint64_t value) { set(state, field(name.c_str()), value); };
+    const auto put = [&](const std::string& name, std::uint64_t value) { set(state, state_field(name), value); };
     put("ucMode", RES_480P);
     put("ucVfreq", 60);
     put("ucDigitalOut", 1);
@@ -302,7 +252,9 @@ Arguments draw_arguments(Random& random, const Operation& operation, Image& stat
             arguments[i] = point(array_size);
     }
     if (random.once_in(2))
-        agree(random, operation, arguments, state);
+        agree(operation, arguments, state);
+    if (random.once_in(2))
+        disagree(random, state);
     return arguments;
 }
 

@@ -13,7 +13,8 @@ from tools import compiler, in_parallel, run, write  # noqa: E402
 
 ROOT = signatures.ROOT
 HERE = ROOT / "tests" / "lockstep"
-SOURCES = [HERE / f"{name}.cpp" for name in ("layout", "recorder", "draw", "compare", "findings", "options", "bases")]
+SOURCES = [HERE / f"{name}.cpp" for name in
+           ("layout", "recorder", "draw", "agreement", "compare", "findings", "options", "bases")]
 SOURCES += [ROOT / "tools" / "record_view" / "record_layout.cpp"]
 
 

@@ -1,6 +1,7 @@
 /* Where everything stands in an image: the state's objects in the order of the record's layout, the caller's memory
  * behind them. */
 #include <cstring>
+#include <stdexcept>
 #include <string>
 
 #include "tests/lockstep/lockstep.h"
@@ -90,6 +91,16 @@ static_assert(PMX_OUTPUT_NUM * sizeof(PMX_RESOLUTION_T) <= array_size);
 const std::vector<Field>& state_fields()
 {
     return layout().fields;
+}
+
+const Field& state_field(const std::string& name)
+{
+    for (const Field& field : state_fields())
+    {
+        if (field.name == name)
+            return field;
+    }
+    throw std::invalid_argument("the state has no field " + name);
 }
 
 std::size_t caller_offset()

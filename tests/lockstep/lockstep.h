@@ -75,6 +75,7 @@ struct Field
 
 /** Every single field of the state; the caller's memory stands behind the last of them. */
 const std::vector<Field>& state_fields();
+const Field& state_field(const std::string& name);
 std::size_t caller_offset();
 std::size_t image_size();
 

@@ -912,8 +912,7 @@ void VDP_GlobalOutputChange(void)
 
 /** Give a video plane a command that it carries out at its next vertical sync.
  *  @param u4VdpIdx  video plane 0, 1 or 2
- *  @param u4Cmd     the driver's own code: 2 after a format change, 17 before the first video plane goes above or below
- *                   the second
+ *  @param u4Cmd     VDP_CMD_OUTPUT_CHANGED or VDP_CMD_ORDER_CHANGES
  *  @context a thread that may sleep */
 void VDP_VsyncSendCmd(UINT32 u4VdpIdx, UINT32 u4Cmd)
 {

@@ -11,7 +11,7 @@ sys.path.insert(0, str(pathlib.Path(__file__).parent))
 import check_threads  # noqa: E402
 from check_threads import Access  # noqa: E402
 
-LOCKED_WRITE = Access("u4ChangePort", True)
+LOCKED_WRITE = Access("i4Pmx_Connect", True)
 UNLOCKED_READ = Access("PMX_VdpEnabled", False)
 
 # As ThreadSanitizer words it.
@@ -22,7 +22,7 @@ WARNING: ThreadSanitizer: data race (pid=2572)
     #1 <null> <null> (libstdc++.so.6+0xd44a2)
 
   Previous write of size 1 at 0x0000004122b1 by thread T3 (mutexes: write M9):
-    #0 u4ChangePort src/driver/pmx/pmx_port.cpp:48 (layer_threads+0x408535)
+    #0 i4Pmx_Connect src/driver/pmx/pmx_port.cpp:48 (layer_threads+0x408535)
     #1 i4Pmx_Disconnect src/driver/pmx/pmx_port.cpp:64 (layer_threads+0x40867f)
 
   Location is global '_arPmxConf' of size 480 at 0x000000412240 (layer_threads+0x4122b1)
@@ -66,7 +66,7 @@ class Races(unittest.TestCase):
 
     def test_a_lost_stack(self):
         pairs, complaints = check_threads.races(REPORT.replace(
-            "    #0 u4ChangePort src/driver/pmx/pmx_port.cpp:48 (layer_threads+0x408535)\n"
+            "    #0 i4Pmx_Connect src/driver/pmx/pmx_port.cpp:48 (layer_threads+0x408535)\n"
             "    #1 i4Pmx_Disconnect src/driver/pmx/pmx_port.cpp:64 (layer_threads+0x40867f)\n",
             "    [failed to restore the stack]\n"))
         self.assertEqual([], pairs)
@@ -99,8 +99,8 @@ class Exact(unittest.TestCase):
                                                           "PMX_GetMode")[0])
 
     def test_a_lock_that_is_forgotten_or_new(self):
-        unlocked_write = Access("u4ChangePort", False)
-        self.assertIn("u4ChangePort touches", self.judge([(UNLOCKED_READ, unlocked_write)], "PMX_VdpEnabled")[0])
+        unlocked_write = Access("i4Pmx_Connect", False)
+        self.assertIn("i4Pmx_Connect touches", self.judge([(UNLOCKED_READ, unlocked_write)], "PMX_VdpEnabled")[0])
         locked_read = Access("PMX_VdpEnabled", True)
         self.assertIn("PMX_VdpEnabled holds", self.judge([(locked_read, UNLOCKED_READ)], "PMX_VdpEnabled")[0])
 
@@ -109,7 +109,7 @@ class Exact(unittest.TestCase):
 
 
 class WithoutMutex(unittest.TestCase):
-    WRITE = Access("u4ChangePort", False)
+    WRITE = Access("i4Pmx_Connect", False)
     READ = Access("PMX_InformVdpColorSpace", False)
     INNER_READ = Access("vInformVdp", False)
 
@@ -128,7 +128,7 @@ class WithoutMutex(unittest.TestCase):
 
     def test_a_mutex_is_held_after_all(self):
         pairs = [(self.WRITE, self.WRITE), (self.WRITE, self.READ), (self.WRITE, LOCKED_WRITE)]
-        self.assertEqual(["u4ChangePort holds a mutex"], check_threads.judge_without_mutex(pairs))
+        self.assertEqual(["i4Pmx_Connect holds a mutex"], check_threads.judge_without_mutex(pairs))
 
 
 if __name__ == "__main__":

@@ -12,7 +12,7 @@
  *
  * How to read a report: "data race" is followed by two stacks, the access that was just made and the one before it. The
  * functions at #0 made them. At least one of the two touched the record without the mutex; "mutexes: write M…" behind
- * an access tells that it held it. If both functions hold the mutex by contract (u4ChangePort,
+ * an access tells that it held it. If both functions hold the mutex by contract (i4Pmx_Connect, i4Pmx_Disconnect,
  * PMX_InformVdpColorSpace), the locking is broken. If one is new and takes no lock because its contract says so, it
  * gets an entry, with the reason, in unlocked_by_design.supp. Nothing else does.
  *

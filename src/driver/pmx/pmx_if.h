@@ -37,7 +37,7 @@ typedef struct
     UINT16 u2CompType; /* whoever feeds the port */
     UINT16 u2CompId;
     BOOL fgConnected;
-    BOOL fgEnabled; /* it delivers pictures, as far as it told */
+    BOOL fgEnabled; /* its source says that it delivers pictures */
     DRV_GFX_COLOR_MODE_T eInputColorMode;
     DRV_PMX_COLOR_SPACE_T eSrcColorSpace;
     UINT32 u4SrcWidth;  /* pixels; never filled, like the height: a size decides the colour space and is not kept */
@@ -76,7 +76,7 @@ typedef struct
     IVdp* piVdp2;
     void* pvTag2;
     PMX_PORT_INFO_T arPortInfo[PMX_PORT_NUM];
-    DRV_PMX_COLOR_SPACE_T eMasterColorSpace; /* the mixing is done in it */
+    DRV_PMX_COLOR_SPACE_T eMasterColorSpace; /* what the mixer mixes in */
     PMX_RESOLUTION_T arOutputConf[PMX_OUTPUT_NUM];
     BOOL fgAspNext; /* u4AspNext waits for the next mode change */
     UINT32 u4AspNext;
@@ -144,7 +144,7 @@ static_assert(sizeof(PMX_MODE_ROW_T) == 8);
 
 extern PMX_CONF_T _arPmxConf[1];           /* only mixer 0 exists */
 extern const PMX_CONF_T _arPmxConfDefault; /* what every reset loads */
-extern INT32 bComp0OnTop;                  /* who is on top, as given; outlives a reset */
+extern INT32 bComp0OnTop;                  /* first video on top: 1, as given; outlives a reset */
 extern const UCHAR aucGammaCurve[PMX_GAMMA_CURVE_NUM][PMX_GAMMA_POINT_NUM];
 extern const PMX_MODE_ROW_T _arPmxModeRow[PMX_MODE_ROW_NUM + 1]; /* the last row: every number without one */
 

@@ -1,15 +1,9 @@
-// The one place of the board that knows the JSON library: it compiles slowly.
-#include <nlohmann/json.hpp>
+#include "board/json.h"
 
 #include "board/trace.h"
-#include "board/value.h"
 
 namespace board
 {
-namespace
-{
-
-using Json = nlohmann::ordered_json;
 
 Json json_of(const Value& value)
 {
@@ -17,9 +11,17 @@ Json json_of(const Value& value)
     {
     case Value::Kind::Null: return nullptr;
     case Value::Kind::Number:
-        if (value.string().empty())
+    {
+        const bool hex = value.base() == Value::Base::Hex;
+        if (value.string().empty() && !hex)
             return value.as_number();
-        return { { "value", value.as_number() }, { "name", value.string() } };
+        Json number = { { "value", value.as_number() } };
+        if (!value.string().empty())
+            number["name"] = value.string();
+        if (hex)
+            number["hex"] = Value::number(value.as_number(), {}, Value::Base::Hex).to_text();
+        return number;
+    }
     case Value::Kind::Text: return value.string();
     case Value::Kind::Symbol: return { { "symbol", value.string() } };
     case Value::Kind::List:
@@ -37,11 +39,13 @@ Json json_of(const Value& value)
     return record;
 }
 
-/** Bytes that are no UTF-8, which a console text may hold, become replacement characters. */
-std::string dumped(const Json& json, int indent)
+std::string written(const Json& json, int indent)
 {
     return json.dump(indent, ' ', false, Json::error_handler_t::replace);
 }
+
+namespace
+{
 
 const char* kind_name(TraceEntry::Kind kind)
 {
@@ -60,7 +64,7 @@ const char* kind_name(TraceEntry::Kind kind)
 
 std::string Value::to_json(int indent) const
 {
-    return dumped(json_of(*this), indent);
+    return written(json_of(*this), indent);
 }
 
 std::string TraceEntry::to_json() const
@@ -101,7 +105,7 @@ std::string TraceEntry::to_json() const
         json["by"] = by;
         break;
     }
-    return dumped(json, -1);
+    return written(json, -1);
 }
 
 } // namespace board

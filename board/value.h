@@ -57,7 +57,7 @@ public:
     /** Whether a token written by a person means this value: a number in any base, a symbolic name, "*", a quoted text
      *  with escapes, a list or record of such tokens. */
     bool matches(std::string_view token) const;
-    /** JSON; a named number is {"value": 2, "name": "RES_480P"}. indent < 0: on one line. */
+    /** JSON, in the form that json.h describes. indent < 0: on one line. */
     std::string to_json(int indent = -1) const;
 
     bool operator==(const Value& other) const = default;

@@ -45,9 +45,10 @@ TEST(Value, Text_OfEachKind)
 
 TEST(Value, Json_OfEachKind)
 {
-    EXPECT_EQ(R"({"mode":{"value":2,"name":"RES_480P"},"colour":1081472,"items":[-1,{"held":1}],)"
-              R"("table":{"symbol":"_rPMXIF"},"none":null,"text":"a, \"b\"\n"})",
-              sample().to_json());
+    EXPECT_EQ(
+        R"({"mode":{"value":2,"name":"RES_480P"},"colour":{"value":1081472,"hex":"0x108080"},"items":[-1,{"held":1}],)"
+        R"("table":{"symbol":"_rPMXIF"},"none":null,"text":"a, \"b\"\n"})",
+        sample().to_json());
     EXPECT_EQ("{\n  \"a\": 1\n}", Value::record({ { "a", Value::number(1) } }).to_json(2));
     EXPECT_EQ("[]", Value::list({}).to_json());
     EXPECT_EQ("{}", Value::record({}).to_json());

@@ -7,7 +7,6 @@
 
 #include "board/board.h"
 #include "tools/pmxboard/chrome_lanes.h"
-#include "tools/pmxboard/state_dump.h"
 
 namespace pmxboard
 {
@@ -19,7 +18,7 @@ using board::Value;
 
 std::string text(std::string_view content)
 {
-    return to_json(Value::text(std::string(content)));
+    return Value::text(std::string(content)).to_json();
 }
 
 std::string without_line_end(std::string message)
@@ -40,9 +39,9 @@ std::string arguments_of(const TraceEntry& entry)
     if (entry.kind == TraceEntry::Kind::Store)
         json += ",\"by\":" + text(entry.by);
     if (!entry.arguments.empty())
-        json += ",\"arguments\":" + to_json(arguments);
+        json += ",\"arguments\":" + arguments.to_json();
     if (entry.result)
-        json += ",\"result\":" + to_json(*entry.result);
+        json += ",\"result\":" + entry.result->to_json();
     if (entry.faulted)
         json += ",\"scripted\":true";
     if (entry.kind == TraceEntry::Kind::Log && entry.function == "PMX_IsLog")
@@ -95,11 +94,11 @@ void ChromeTrace::operation_ends(const Outcome& outcome)
     if (!m_operation_told)
         return;
     release();
-    std::string json = outcome.result ? "\"result\":" + to_json(*outcome.result) : std::string();
+    std::string json = outcome.result ? "\"result\":" + outcome.result->to_json() : std::string();
     for (const OutputValue& output : outcome.outputs)
     {
         json += (json.empty() ? "" : ",") + text("*" + output.name) + ":" +
-                (output.value ? to_json(*output.value) : text("untouched"));
+                (output.value ? output.value->to_json() : text("untouched"));
     }
     show(states_now());
     advance_to(static_cast<std::uint64_t>(board::now().count()));

@@ -3,8 +3,6 @@
 #include <cstdio>
 #include <ostream>
 
-#include "tools/pmxboard/state_dump.h"
-
 namespace pmxboard
 {
 namespace
@@ -131,7 +129,7 @@ void Output::imagined(std::string_view line, const std::string& written, const s
     std::string calls = written.substr(0, written.find_last_not_of('\n') + 1);
     for (std::size_t end = calls.find('\n'); end != calls.npos; end = calls.find('\n', end))
         calls[end] = ',';
-    shown("{\"kind\":\"what-if\",\"command\":" + to_json(board::Value::text(std::string(line))) + ",\"calls\":[" +
+    shown("{\"kind\":\"what-if\",\"command\":" + board::Value::text(std::string(line)).to_json() + ",\"calls\":[" +
               calls + "],\"outcome\":" + outcome + "}",
           {});
 }
@@ -264,12 +262,12 @@ std::string item_step(std::size_t index)
 
 std::string to_json(const Outcome& outcome)
 {
-    const std::string result = outcome.result ? "\"result\":" + to_json(*outcome.result) : std::string();
+    const std::string result = outcome.result ? "\"result\":" + outcome.result->to_json() : std::string();
     std::string outputs;
     for (const OutputValue& output : outcome.outputs)
     {
-        outputs += (outputs.empty() ? "" : ",") + to_json(board::Value::text(output.name)) + ":" +
-                   (output.value ? to_json(*output.value) : "\"untouched\"");
+        outputs += (outputs.empty() ? "" : ",") + board::Value::text(output.name).to_json() + ":" +
+                   (output.value ? output.value->to_json() : "\"untouched\"");
     }
     return "{" + result + (result.empty() || outputs.empty() ? "" : ",") +
            (outputs.empty() ? "" : "\"outputs\":{" + outputs + "}") + "}";

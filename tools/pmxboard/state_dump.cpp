@@ -4,53 +4,20 @@
 #include <cstdint>
 #include <limits>
 
-#include <nlohmann/json.hpp>
+#include "board/json.h"
 
 namespace pmxboard
 {
 namespace
 {
 
+using board::Json;
+using board::json_of;
 using board::Value;
-using Json = nlohmann::ordered_json;
 
 constexpr const char* state_schema = "pmxboard-state";
 constexpr const char* diff_schema = "pmxboard-diff";
 constexpr unsigned deepest = 64;
-
-Json json_of(const Value& value)
-{
-    switch (value.kind())
-    {
-    case Value::Kind::Null: return nullptr;
-    case Value::Kind::Number:
-    {
-        const bool hex = value.base() == Value::Base::Hex;
-        if (value.string().empty() && !hex)
-            return value.as_number();
-        Json number = { { "value", value.as_number() } };
-        if (!value.string().empty())
-            number["name"] = value.string();
-        if (hex)
-            number["hex"] = Value::number(value.as_number(), {}, Value::Base::Hex).to_text();
-        return number;
-    }
-    case Value::Kind::Text: return value.string();
-    case Value::Kind::Symbol: return { { "symbol", value.string() } };
-    case Value::Kind::List:
-    {
-        Json list = Json::array();
-        for (const Value& item : value.items())
-            list.push_back(json_of(item));
-        return list;
-    }
-    case Value::Kind::Record: break;
-    }
-    Json record = Json::object();
-    for (std::size_t i = 0; i < value.keys().size(); ++i)
-        record[value.keys()[i]] = json_of(value.items()[i]);
-    return record;
-}
 
 Json json_of(const std::vector<Change>& changes)
 {
@@ -67,14 +34,9 @@ Json json_of(const std::vector<Change>& changes)
     return list;
 }
 
-std::string dumped(const Json& json, int indent)
-{
-    return json.dump(indent, ' ', false, Json::error_handler_t::replace);
-}
-
 [[noreturn]] void no_value(const std::string& path, const Json& json)
 {
-    throw DumpError(path + ": " + dumped(json, -1).substr(0, 60) + " is no value of a state");
+    throw DumpError(path + ": " + board::written(json).substr(0, 60) + " is no value of a state");
 }
 
 /** {"value": 12, "name": …, "hex": …}, and nothing else in it. */
@@ -154,7 +116,7 @@ void check_schema(const Json& json)
         throw DumpError(std::string("it has no \"schema\": \"") + state_schema + "\"" + what);
     if (!json.contains("version") || json.at("version") != state_schema_version)
         throw DumpError("it has version " +
-                        (json.contains("version") ? dumped(json.at("version"), -1).substr(0, 20) : "no number") +
+                        (json.contains("version") ? board::written(json.at("version")).substr(0, 20) : "no number") +
                         " of its schema, and this pmxboard reads " + std::to_string(state_schema_version));
     if (json.contains("values"))
         throw DumpError("it holds a few values, and no whole state" + what);
@@ -174,7 +136,7 @@ std::string to_json(const StateDump& dump)
     Json json = envelope(state_schema);
     json["board"] = dump.board;
     json["state"] = json_of(dump.state);
-    return dumped(json, 2);
+    return board::written(json, 2);
 }
 
 StateDump read_dump(std::string_view json)
@@ -192,24 +154,19 @@ std::string to_json(const std::string& board, const std::vector<std::pair<std::s
     json["values"] = Json::object();
     for (const auto& [path, value] : values)
         json["values"][path] = json_of(value);
-    return dumped(json, 2);
+    return board::written(json, 2);
 }
 
 std::string to_json(const std::vector<Change>& changes)
 {
     Json json = envelope(diff_schema);
     json["changes"] = json_of(changes);
-    return dumped(json, 2);
+    return board::written(json, 2);
 }
 
 std::string to_json_list(const std::vector<Change>& changes)
 {
-    return dumped(json_of(changes), -1);
-}
-
-std::string to_json(const Value& value)
-{
-    return dumped(json_of(value), -1);
+    return board::written(json_of(changes));
 }
 
 } // namespace pmxboard

@@ -3,8 +3,7 @@
  *
  *      {"schema": "pmxboard-state", "version": 1, "board": "default", "state": {…}}
  *
- *  A number with a name is {"value": 12, "name": "RES_1080P60HZ"}, one that people read in hexadecimal has "hex" as
- *  well. */
+ *  Values are in the form of board/json.h. */
 #pragma once
 
 #include <stdexcept>
@@ -47,8 +46,5 @@ std::string to_json(const std::string& board, const std::vector<std::pair<std::s
 std::string to_json(const std::vector<Change>& changes);
 /** The list of them alone, on one line. */
 std::string to_json_list(const std::vector<Change>& changes);
-
-/** The value alone, on one line. */
-std::string to_json(const board::Value& value);
 
 } // namespace pmxboard

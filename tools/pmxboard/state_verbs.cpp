@@ -52,7 +52,7 @@ std::string line_for_programs(const NamedValues& values)
     {
         lines += lines.empty() ? "" : "\n";
         lines += R"({"kind":"state","version":)" + std::to_string(state_schema_version) + R"(,"path":)" +
-                 to_json(Value::text(path)) + R"(,"value":)" + to_json(value) + "}";
+                 Value::text(path).to_json() + R"(,"value":)" + value.to_json() + "}";
     }
     return lines;
 }
@@ -92,7 +92,7 @@ void run_diff(Session& session, const Line& line)
         state_at(path);
     const std::vector<Change> found = changes_at(session.changes(), wanted.paths);
     const std::string for_people = found.empty() ? "  nothing changed\n" : to_text(found);
-    session.output().shown(R"({"kind":"diff","command":)" + to_json(Value::text(session.last_command())) +
+    session.output().shown(R"({"kind":"diff","command":)" + Value::text(session.last_command()).to_json() +
                                R"(,"changes":)" + to_json_list(found) + "}",
                            wanted.json ? to_json(found) + "\n" : for_people);
 }

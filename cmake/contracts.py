@@ -1,8 +1,8 @@
 #!/usr/bin/env python3
-"""Writes what the headers promise about each function, and what the guide to scenarios says about each verb, as tables
-that the tool is built with: its help is the text that a reader of the headers sees.
+"""Writes what the headers promise about each function as a table that the tool is built with: its help is the text
+that a reader of the headers sees.
 
-usage: contracts.py OUTPUT GUIDE
+usage: contracts.py OUTPUT
 """
 
 import json
@@ -17,9 +17,6 @@ from platform_functions import LAYER_HEADER, PLATFORM_HEADERS, ROOT, functions  
 TAG = re.compile(r"^@(param|return|context)\b(?:\[([^\]]*)\])?\s*", re.MULTILINE)
 BEHIND = re.compile(r"\[([^\]]*)\]\s*")  # see pointers.py
 SECTION = re.compile(r"^/\* ((?:(?!\*/).)*)\*/", re.DOTALL | re.MULTILINE)
-CODE = r"`[a-z][a-z-]*(?: [^`]*)?`"
-ROW = re.compile(rf"^\| ({CODE}(?:, {CODE})*) \| (.*) \|$", re.MULTILINE)
-PARAGRAPH = re.compile(rf"^({CODE}) ((?:.+\n)+)", re.MULTILINE)
 
 
 def without_stars(comment):
@@ -72,23 +69,10 @@ def rows(header):
         yield f"        {{ {', '.join(map(c_text, texts))}, {{ {listed} }} }},"
 
 
-def plain(cell):
-    return joined(cell.replace(r"\|", "|").replace("`", ""))
-
-
-def verb_rows(guide):
-    """Rows of the guide's tables and paragraphs that begin with a verb as it is written."""
-    text = pathlib.Path(guide).read_text(encoding="utf-8")
-    found = [(match.start(), match[1], match[2]) for pattern in (ROW, PARAGRAPH) for match in pattern.finditer(text)]
-    for _, form, meaning in sorted(found):
-        yield f"        {{ {c_text(form.replace('`', '').replace(chr(92) + '|', '|'))}, {c_text(plain(meaning))} }},"
-
-
 def main():
-    output, guide = sys.argv[1:]
+    output, = sys.argv[1:]
     functions_text = "\n".join(row for header in (LAYER_HEADER, *PLATFORM_HEADERS) for row in rows(header))
-    verbs_text = "\n".join(verb_rows(guide))
-    pathlib.Path(output).write_text(f"""// Written from the headers and the guide to scenarios when the tool is built.
+    pathlib.Path(output).write_text(f"""// Written from the headers when the tool is built.
 #include "tools/pmxboard/contracts.h"
 
 namespace pmxboard
@@ -98,14 +82,6 @@ const std::vector<Contract>& contracts()
 {{
     static const std::vector<Contract> all = {{
 {functions_text}
-    }};
-    return all;
-}}
-
-const std::vector<VerbText>& verb_texts()
-{{
-    static const std::vector<VerbText> all = {{
-{verbs_text}
     }};
     return all;
 }}

@@ -8,7 +8,7 @@
 #include "tools/pmxboard/completion.h"
 #include "tools/pmxboard/help.h"
 #include "tools/pmxboard/session.h"
-#include "tools/pmxboard/verb_usage.h"
+#include "tools/pmxboard/verbs.h"
 
 namespace
 {
@@ -87,7 +87,7 @@ TEST(Completion, Verbs_ByTheirUsage)
     EXPECT_THAT(candidates("sink valid a"), ElementsAre("asked"));
     EXPECT_THAT(candidates("sink valid RES_720P5"), ElementsAre("RES_720P50HZ"));
     EXPECT_THAT(candidates("sink plug "), IsEmpty());
-    EXPECT_THAT(candidates("display-part "), ElementsAre("off", "never", "raise", "lower", "answer"));
+    EXPECT_THAT(candidates("display-part "), ElementsAre("off", "never", "answer", "raise", "lower"));
     EXPECT_THAT(candidates("video-plane hw-enable 1 "), ElementsAre("VDP_DISABLED", "VDP_HIDDEN", "VDP_ENABLED"));
     EXPECT_THAT(candidates("source v"), ElementsAre("vdp0", "vdp1", "vdp2", "vdp3"));
     EXPECT_THAT(candidates("source osd1 start 10x10 "), ElementsAre("ycbcr", "rgb"));
@@ -99,15 +99,16 @@ TEST(Completion, Verbs_ByTheirUsage)
     EXPECT_THAT(candidates("no-such-verb "), IsEmpty());
 }
 
-TEST(Completion, EachVerb_HasAUsageThatItIsCompletedFrom)
+TEST(Completion, EachForm_IsCompletedWordByWord)
 {
     for (const pmxboard::Verb& verb : pmxboard::verbs())
     {
-        const std::string name(verb.name);
-        const auto next = pmxboard::next_words(verb.usage, std::vector<std::string>{ name });
-        const bool takes_none = verb.usage == verb.name;
-        const bool is_prose = verb.usage.find('"') != verb.usage.npos;
-        EXPECT_EQ(takes_none || is_prose, next.empty()) << verb.usage;
+        for (const pmxboard::VerbForm& form : verb.forms)
+        {
+            const pmxboard::Line words(form.form.written());
+            const auto next = form.form.next(std::span(words.words()).first(1));
+            EXPECT_EQ(words.size() == 1, next.empty()) << form.form.written();
+        }
     }
 }
 

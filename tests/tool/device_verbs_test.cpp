@@ -89,7 +89,9 @@ TEST(DeviceVerbs, WrittenWrong_AreRefused)
     }
     for (const char* const wrong : { "display-part", "display-part on", "display-part answer", "display-part answer 3",
                                      "display-part answer never", "display-part raise 1", "display-part off 1s" })
-        EXPECT_EQ("here.pmx:1: write: display-part off|never|raise|lower, or display-part answer TIME\n",
+        EXPECT_EQ("here.pmx:1: write: display-part off|never, display-part answer TIME, display-part raise, or "
+                  "display-part lower; "
+                  "TIME is 10s, 500ms or 2us\n",
                   diagnostics(wrong))
             << wrong;
     for (const char* const wrong : { "video-plane", "video-plane waiting", "video-plane waiting 1",

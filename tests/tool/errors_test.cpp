@@ -82,7 +82,7 @@ TEST(ScenarioErrors, Verbs_ShowHowTheyAreWritten)
            "fault x_timer_create -1 always 3", "fault x_timer_create -1 on 3 4" })
         EXPECT_EQ(fault, diagnostics(wrong)) << wrong;
     for (const char* const wrong : { "advance", "advance 10", "advance s", "advance 1h", "advance -1s", "advance 1 s" })
-        EXPECT_EQ("here.pmx:1: write: advance 10s, 500ms or 2us\n", diagnostics(wrong)) << wrong;
+        EXPECT_EQ("here.pmx:1: write: advance TIME; TIME is 10s, 500ms or 2us\n", diagnostics(wrong)) << wrong;
     EXPECT_EQ("here.pmx:1: write: loglevel LEVEL\n", diagnostics("loglevel"));
     EXPECT_EQ("here.pmx:1: write: state [PATH…] [--json]\n", diagnostics("state --jsn"));
     for (const char* const wrong : { "save", "save one.json two.json" })
@@ -157,11 +157,12 @@ TEST(ScenarioErrors, Expectations)
                      "PMX_Init\nexpect call PMX_HalSetBgg(0, 1)");
     EXPECT_BEGINNING("here.pmx:1: the platform has no function Asser; did you mean Assert", "expect none Asser");
     EXPECT_BEGINNING("here.pmx:1: a call is written ", "expect call PMX_HalSetBg");
-    EXPECT_EQ("here.pmx:1: write: expect next LINE, such as FUNCTION(ARGUMENT, …) = RESULT or SET FIELD OLD → NEW\n",
-              diagnostics("expect next"));
+    EXPECT_EQ(
+        "here.pmx:1: write: expect next LINE; LINE is such as FUNCTION(ARGUMENT, …) = RESULT or SET FIELD OLD → NEW\n",
+        diagnostics("expect next"));
     EXPECT_EQ("here.pmx:1: write: expect log LEVEL \"text\"\n", diagnostics("expect log 8"));
-    EXPECT_EQ("here.pmx:1: expect log takes a text in quotes, not text\n", diagnostics("expect log 8 text"));
-    EXPECT_EQ("here.pmx:1: expect console takes a text in quotes, not text\n", diagnostics("expect console text"));
+    EXPECT_EQ("here.pmx:1: write: expect log LEVEL \"text\"\n", diagnostics("expect log 8 text"));
+    EXPECT_EQ("here.pmx:1: write: expect console \"text\"\n", diagnostics("expect console text"));
     EXPECT_EQ("here.pmx:1: the number of asserts takes 0 to 4294967295, not -1\n", diagnostics("expect asserts -1"));
     EXPECT_EQ("here.pmx:1: write: expect no-more\n", diagnostics("expect no-more calls"));
 }

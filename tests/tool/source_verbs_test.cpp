@@ -9,11 +9,13 @@ namespace
 using tool_test::diagnostics;
 
 constexpr const char* SOURCE_USAGE =
-    "here.pmx:1: write: source vdp0…vdp3|osd0…osd5 connect|stop|disconnect, "
-    "source vdp0…vdp3|osd0…osd5 size WxH, source VDP start WxH [luma N], source OSD start WxH ycbcr|rgb, or "
-    "source VDP connects-back on|off\n";
+    "here.pmx:1: write: source NAME connect, source NAME disconnect, source VDP start SIZE [luma N], source OSD start "
+    "SIZE ycbcr|rgb, source NAME size SIZE, source NAME stop, or source NAME connects-back on|off; SIZE is 1920x1080 "
+    "or "
+    "the like; NAME is vdp0…vdp3 or osd0…osd5; VDP is vdp0…vdp3; OSD is osd0…osd5\n";
 constexpr const char* DELAY_USAGE =
-    "here.pmx:1: write: plane-delay [order 0x76543210] and eight delays, plane 1 first\n";
+    "here.pmx:1: write: plane-delay D D D D D D D D, or plane-delay order ORDER D D D D D D D D; ORDER is an order of "
+    "planes, such as 0x76543210; D is the delay of a plane, plane 1 first\n";
 
 TEST(SourceVerbs, VideoPlane_FromConnectToDisconnect)
 {

@@ -234,19 +234,9 @@ TEST(Verbs, Operation_RunsUnderItsName)
     EXPECT_TRUE(seen);
 }
 
-TEST(Verbs, TheLanguageIsDescribedWhole)
+TEST(Verbs, EachScenario_IsToldInTheGuide)
 {
     const std::string description = tool_test::project_file("docs/scenarios.md");
-    for (const auto& verb : pmxboard::verbs())
-    {
-        if (verb.name != "expect")
-        {
-            EXPECT_NE(std::string::npos, description.find("`" + std::string(verb.name))) << verb.name;
-        }
-    }
-    for (const char* const name :
-         { "result", "out", "call", "next", "no-more", "none", "log", "console", "state", "asserts", "misuses" })
-        EXPECT_NE(std::string::npos, description.find("| `expect " + std::string(name))) << name;
     for (const auto& file : std::filesystem::directory_iterator(PMX_SOURCE_DIR "/scenarios"))
     {
         if (file.path().extension() == ".pmx")

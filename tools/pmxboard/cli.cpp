@@ -119,6 +119,18 @@ void add_shell(CLI::App& app, Chosen& chosen)
     completion->callback([line, &chosen] { chosen = [line] { return print_completions(*line, std::cout); }; });
 }
 
+void add_guide(CLI::App& app, Chosen& chosen)
+{
+    CLI::App* const sub = app.add_subcommand("guide", "The tables of the guide to scenarios.");
+    sub->group("");
+    sub->callback([&chosen] {
+        chosen = [] {
+            std::cout << guide_tables();
+            return exit_done;
+        };
+    });
+}
+
 void add_ops(CLI::App& app, Chosen& chosen)
 {
     const auto ops = std::make_shared<OpsOptions>();
@@ -182,6 +194,7 @@ int run_command_line(int count, const char* const* arguments)
     add_run(app, chosen);
     add_state(app, chosen);
     add_shell(app, chosen);
+    add_guide(app, chosen);
     add_ops(app, chosen);
     add_modes(app, chosen);
     add_decode(app, chosen);

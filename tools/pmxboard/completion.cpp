@@ -7,7 +7,7 @@
 #include "tools/pmxboard/completion_values.h"
 #include "tools/pmxboard/help.h"
 #include "tools/pmxboard/session.h"
-#include "tools/pmxboard/verb_usage.h"
+#include "tools/pmxboard/verbs.h"
 
 namespace pmxboard
 {
@@ -148,115 +148,103 @@ Part of_store(const std::vector<std::string>& words)
     return part;
 }
 
-Part of_expectation(const std::vector<std::string>& words)
+/** What may fill each place of the verbs' forms. */
+struct Filling
 {
-    Part part;
-    const std::string& kind = words[1];
-    if (kind == "call" || kind == "next")
-        return words[2] == "SET" && words.size() > 3 ? of_store(words) : of_trace_line(words);
-    if (kind == "none" && words.size() == 3)
-        add(part, platform_names());
-    else if (kind == "state" && words.size() == 3)
-        add(part, path_candidates(words.back()));
-    else if (kind == "state" && words.size() == 4)
-        add(part, field_value_names(words[2]));
-    else if (kind == "out" && words.size() == 3)
-        add(part, output_names());
-    else if (kind == "out" && words.size() == 4)
-        add(part, output_value_names(words[2]));
-    else if (kind == "result" && words.size() == 3 && !words.back().empty())
-        add(part, board::names::all());
-    return part;
+    std::string_view place;
+    void (*add)(Part& part, const std::vector<std::string>& words, const CompletionPlace& where);
+};
+
+const std::string& before_last(const std::vector<std::string>& words)
+{
+    return words[words.size() - 2];
 }
 
-/** What a word in capitals stands for in the usage of verbs. */
-Part of_placeholder(std::string_view name, const std::vector<std::string>& words, const CompletionPlace& place)
-{
-    Part part;
-    const std::string& word = words.back();
-    const std::string& before = words[words.size() - 2];
-    if (name == "BOARD")
-    {
-        add(part, board_names());
-        add(part, file_candidates(place.directory, word));
-    }
-    else if (name == "FILE")
-        add(part, file_candidates(place.directory, word));
-    else if (name == "PARTITION")
-        add(part, partition_names());
-    else if (name == "FUNCTION")
-        add(part, words[0] == "fault"       ? faultable_names()
-                  : words[0] == "neighbour" ? neighbour_names()
-                                            : platform_names());
-    else if (name == "OPERATION")
-        add(part, names_of(operations()));
-    else if (name == "ANSWER")
-        add(part, names_and_general(board::names::family_of(before, "result")));
-    else if (name == "PATH")
-        add(part, path_candidates(word));
-    else if (name == "FIELD")
-        add(part, field_candidates(word));
-    else if (name == "VALUE")
-        add(part, field_value_names(before));
-    else if (name == "MODE")
-        add(part, names_in(board::names::Family::ResolutionMode));
-    else if (name == "STATE")
-        add(part, names_in(board::names::Family::VdpEnable));
-    else if (name == "SLOT")
-        add(part, names_of(ipmx_slots()));
-    else if (name == "NAME" || name == "VDP" || name == "OSD")
-        add(part, source_names(name == "VDP" ? "vdp" : name == "OSD" ? "osd" : ""));
-    else if (name.starts_with("ARGUMENT"))
-        return of_arguments_behind_a_name(words);
-    return part;
-}
-
-Part of_verb(const Verb& verb, const std::vector<std::string>& words, const CompletionPlace& place)
-{
-    if (verb.name == "expect" && words.size() > 2)
-        return of_expectation(words);
-    Part all;
-    for (const UsageWord& next : next_words(verb.usage, std::span(words).first(words.size() - 1)))
-    {
-        if (!next.is_placeholder)
-        {
-            all.candidates.push_back(next.text);
-            continue;
-        }
-        Part part = of_placeholder(next.text, words, place);
-        all.begin = std::max(all.begin, part.begin);
-        add(all, part.candidates);
-    }
-    return all;
-}
+constexpr Filling fillings[] = {
+    { "BOARD",
+      [](Part& part, const auto& words, const auto& where) {
+          add(part, board_names());
+          add(part, file_candidates(where.directory, words.back()));
+      } },
+    { "FILE", [](Part& part, const auto& words,
+                 const auto& where) { add(part, file_candidates(where.directory, words.back())); } },
+    { "PARTITION", [](Part& part, const auto&, const auto&) { add(part, partition_names()); } },
+    { "FUNCTION",
+      [](Part& part, const auto& words, const auto&) {
+          add(part, words[0] == "fault"       ? faultable_names()
+                    : words[0] == "neighbour" ? neighbour_names()
+                                              : platform_names());
+      } },
+    { "ANSWER",
+      [](Part& part, const auto& words, const auto&) {
+          add(part, names_and_general(board::names::family_of(before_last(words), "result")));
+      } },
+    { "PATH", [](Part& part, const auto& words, const auto&) { add(part, path_candidates(words.back())); } },
+    { "FIELD", [](Part& part, const auto& words, const auto&) { add(part, field_candidates(words.back())); } },
+    { "VALUE",
+      [](Part& part, const auto& words, const auto&) {
+          if (words[1] == "out")
+              add(part, output_value_names(before_last(words)));
+          else if (words[1] != "result")
+              add(part, field_value_names(before_last(words)));
+          else if (!words.back().empty())
+              add(part, board::names::all());
+      } },
+    { "MODE", [](Part& part, const auto&, const auto&) { add(part, names_in(board::names::Family::ResolutionMode)); } },
+    { "STATE", [](Part& part, const auto&, const auto&) { add(part, names_in(board::names::Family::VdpEnable)); } },
+    { "SLOT", [](Part& part, const auto&, const auto&) { add(part, names_of(ipmx_slots())); } },
+    { "NAME", [](Part& part, const auto&, const auto&) { add(part, source_names("")); } },
+    { "VDP", [](Part& part, const auto&, const auto&) { add(part, source_names("vdp")); } },
+    { "OSD", [](Part& part, const auto&, const auto&) { add(part, source_names("osd")); } },
+    { "OUTPUT",
+      [](Part& part, const auto&, const auto&) {
+          add(part, std::vector<std::string>{ "digital", "hdmi", "component", "composite" });
+      } },
+    { "ARGUMENT",
+      [](Part& part, const auto& words, const auto&) {
+          if (words[0] == "expect")
+              add(part, output_names());
+          else
+              part = of_arguments_behind_a_name(words);
+      } },
+    { "LINE",
+      [](Part& part, const auto& words, const auto&) {
+          part = words[2] == "SET" && words.size() > 3 ? of_store(words) : of_trace_line(words);
+      } },
+};
 
 Part of_line(const std::vector<std::string>& words, const CompletionPlace& place);
 
-/** Where the command begins that a verb takes behind its own words; 0 while those are not complete. */
-std::size_t command_place(const std::vector<std::string>& words)
+void fill(Part& part, std::string_view place, const std::vector<std::string>& words, const CompletionPlace& where)
 {
-    std::size_t at = 1;
-    if (words[0] == "meanwhile")
+    for (const Filling& filling : fillings)
     {
-        at = words[1] == "as" ? 4 : 2;
-        if (words.size() > at && words[at] == "on")
-            at += 2;
-        if (words.size() > at && words[at] == "request")
-            return 0;
+        if (filling.place != place)
+            continue;
+        Part filled;
+        filling.add(filled, words, where);
+        part.begin = std::max(part.begin, filled.begin);
+        add(part, filled.candidates);
     }
-    return at < words.size() ? at : 0;
 }
 
-/** A line whose verb takes a command. */
-Part of_command_taker(const Verb& verb, const std::vector<std::string>& words, const CompletionPlace& place)
+Part of_verb(const Verb& verb, const std::vector<std::string>& words, const CompletionPlace& where)
 {
-    const std::size_t command = command_place(words);
-    Part part =
-        command == 0 ? Part{} : of_line({ words.begin() + static_cast<std::ptrdiff_t>(command), words.end() }, place);
-    if (command == 0 || command + 1 == words.size())
+    Part part;
+    std::size_t command = 0; // the words that most forms share before it
+    for (const VerbForm& form : verb.forms)
+        command = std::max(command, form.form.command_within(words).value_or(0));
+    if (command != 0)
+        part = of_line({ words.begin() + static_cast<std::ptrdiff_t>(command), words.end() }, where);
+    for (const VerbForm& form : verb.forms)
     {
-        for (const std::string& own : of_verb(verb, words, place).candidates)
-            part.candidates.push_back(own);
+        for (const FormWord& next : form.form.next(std::span(words).first(words.size() - 1)))
+        {
+            if (next.is_place)
+                fill(part, next.text, words, where);
+            else
+                part.candidates.push_back(next.text);
+        }
     }
     return part;
 }
@@ -279,12 +267,8 @@ Part of_line(const std::vector<std::string>& words, const CompletionPlace& place
     }
     if (const Operation* const operation = find(operations(), words[0]))
         return of_arguments(*operation, std::span(words).subspan(1));
-    for (const Verb& verb : verbs())
-    {
-        if (verb.name == words[0])
-            return verb.usage.find(" COMMAND") != verb.usage.npos ? of_command_taker(verb, words, place)
-                                                                  : of_verb(verb, words, place);
-    }
+    if (const Verb* const verb = find_verb(words[0]))
+        return of_verb(*verb, words, place);
     return part;
 }
 

@@ -1,6 +1,6 @@
 /** @file
- *  What the headers promise about the functions of the layer and of the platform, and what the guide to scenarios says
- *  about verbs. The tables are written when the tool is built. */
+ *  What the headers promise about the functions of the layer and of the platform.
+ *  The table is written when the tool is built. */
 #pragma once
 
 #include <string_view>
@@ -34,15 +34,6 @@ const std::vector<Contract>& contracts();
 
 /** Null pointer when no header declares it. */
 const Contract* contract_of(std::string_view function);
-
-struct VerbText
-{
-    std::string_view form; ///< how it is written; several forms are separated by commas
-    std::string_view meaning;
-};
-
-/** Whatever the guide explains that begins with a word in lower case, verbs among it. */
-const std::vector<VerbText>& verb_texts();
 
 /** The first sentence of a text, without its full stop. */
 std::string_view first_sentence(std::string_view text);

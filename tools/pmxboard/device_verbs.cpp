@@ -4,7 +4,7 @@
 #include "board/video_planes.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
-#include "tools/pmxboard/verb_words.h"
+#include "tools/pmxboard/verbs.h"
 
 namespace pmxboard
 {
@@ -13,27 +13,56 @@ namespace
 
 using board::names::Family;
 
-/** `sink valid asked`, or `sink valid RES_720P60HZ 60`. */
-void set_valid_resolution(const Line& line)
+void plug(Session&, const Words&)
 {
-    if (line.size() == 3 && line.word(2) == "asked")
-    {
-        board::hdmi_av::choose_resolution({});
-        return;
-    }
-    need_words(line, 4, 4);
-    const Kind mode{ .bits = 32, .family = Family::ResolutionMode, .names = {}, .members = {} };
-    const auto number = static_cast<UINT32>(read_value(mode, line.word(2), "the resolution").as_number());
-    const auto frequency = static_cast<UINT16>(number_in(line.word(3), "the frequency", 0, 65535));
-    board::hdmi_av::choose_resolution(board::hdmi_av::Resolution{ number, frequency });
+    board::hdmi_av::plug(true);
 }
 
-void hw_enable(const Line& line)
+void unplug(Session&, const Words&)
 {
-    need_words(line, 4, 4);
-    const auto plane = static_cast<unsigned>(number_in(line.word(2), "the video plane", 0, 255));
-    const Kind state{ .bits = 32, .family = Family::VdpEnable, .names = {}, .members = {} };
-    const auto enable = static_cast<VDP_ENABLE_T>(read_value(state, line.word(3), "the enable state").as_number());
+    board::hdmi_av::plug(false);
+}
+
+void request_resolution(Session&, const Words& words)
+{
+    board::hdmi_av::request_resolution(!words.has("off"));
+}
+
+void choose_resolution(Session&, const Words& words)
+{
+    const UINT32 mode = named_number(words.at("MODE"), "the resolution", Family::ResolutionMode);
+    const auto frequency = static_cast<UINT16>(number_in(words.at("HZ"), "the frequency", 0, 65535));
+    board::hdmi_av::choose_resolution(board::hdmi_av::Resolution{ mode, frequency });
+}
+
+void choose_asked(Session&, const Words&)
+{
+    board::hdmi_av::choose_resolution({});
+}
+
+void behave(Session&, const Words& words)
+{
+    board::display_part::behave(board::display_part::read_behaviour(words.line().word(1)));
+}
+
+void answer(Session&, const Words& words)
+{
+    board::display_part::behave({ true, read_time(words.at("TIME")) });
+}
+
+void wait_for_sync(Session&, const Words& words)
+{
+    if (words.has("on"))
+        board::video_planes::set_waiting_for_sync(true);
+    else
+        board::video_planes::release_graphics();
+}
+
+void hw_enable(Session&, const Words& words)
+{
+    const auto plane = static_cast<unsigned>(number_in(words.at("PLANE"), "the video plane", 0, 255));
+    const auto enable =
+        static_cast<VDP_ENABLE_T>(named_number(words.at("STATE"), "the enable state", Family::VdpEnable));
     try
     {
         board::video_planes::set_hw_enable(plane, enable);
@@ -46,53 +75,36 @@ void hw_enable(const Line& line)
 
 } // namespace
 
-void run_sink(Session&, const Line& line)
+std::vector<Verb> device_verbs()
 {
-    need_words(line, 2, 4);
-    const std::string& word = line.word(1);
-    if ((word == "plug" || word == "unplug") && line.size() == 2)
-        board::hdmi_av::plug(word == "plug");
-    else if (word == "request-resolution" && line.size() <= 3)
-        board::hdmi_av::request_resolution(line.size() == 2 || read_switch(line, line.word(2)));
-    else if (word == "valid")
-        set_valid_resolution(line);
-    else
-        wrong_usage(line);
-}
-
-void run_display_part(Session&, const Line& line)
-{
-    need_words(line, 2, 3);
-    const std::string& word = line.word(1);
-    if ((word == "answer") != (line.size() == 3))
-        wrong_usage(line);
-    if (word == "answer")
-        board::display_part::behave({ true, read_time(line, line.word(2)) });
-    else if (word == "off" || word == "never")
-        board::display_part::behave(board::display_part::read_behaviour(word));
-    else if (word == "raise")
-        board::display_part::raise();
-    else if (word == "lower")
-        board::display_part::lower();
-    else
-        wrong_usage(line);
-}
-
-void run_video_plane(Session&, const Line& line)
-{
-    need_words(line, 2, 4);
-    if (line.word(1) == "hw-enable")
-    {
-        hw_enable(line);
-        return;
-    }
-    if (line.word(1) != "waiting")
-        wrong_usage(line);
-    need_words(line, 3, 3);
-    if (read_switch(line, line.word(2)))
-        board::video_planes::set_waiting_for_sync(true);
-    else
-        board::video_planes::release_graphics();
+    return {
+        { "sink",
+          { { "sink plug", "plug an HDMI sink in", plug },
+            { "sink unplug", "pull it out", unplug },
+            { "sink request-resolution [on|off]",
+              "a hot plug wants the HDMI resolution sent again, until this is taken back", request_resolution },
+            { "sink valid MODE HZ",
+              "what the HDMI driver would choose whatever it is asked about (`PMX_ChkSupportedRes`)",
+              choose_resolution },
+            { "sink valid asked", "what it is asked about", choose_asked } } },
+        { "display-part",
+          { { "display-part off|never",
+              "from now on, when it is given an HDMI resolution change, the display part takes no notice; or it raises "
+              "the format-change flag for ever",
+              behave },
+            { "display-part answer TIME", "it raises the flag, and lowers it after TIME", answer },
+            { "display-part raise", "raise the flag now, as the display part",
+              [](Session&, const Words&) { board::display_part::raise(); } },
+            { "display-part lower", "lower it", [](Session&, const Words&) { board::display_part::lower(); } } } },
+        { "video-plane",
+          { { "video-plane waiting on|off",
+              "the video plane driver waits for its sync control; or it has it, and releases graphics by "
+              "`PMX_SetOsdEnable`",
+              wait_for_sync },
+            { "video-plane hw-enable PLANE STATE",
+              "what a plane reports as its hardware enable: `VDP_DISABLED`, `VDP_HIDDEN` or `VDP_ENABLED`",
+              hw_enable } } },
+    };
 }
 
 } // namespace pmxboard

@@ -4,7 +4,7 @@
 #include "board/board.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
-#include "tools/pmxboard/verb_words.h"
+#include "tools/pmxboard/verbs.h"
 #include "tools/record_view/record_view.h"
 #include "tools/record_view/store_watch.h"
 
@@ -15,31 +15,6 @@ namespace
 
 using board::TraceEntry;
 using board::Value;
-
-struct Expectation
-{
-    std::string_view name;
-    std::string_view usage;
-    void (*check)(Session& session, const Line& line);
-};
-
-const std::vector<Expectation>& expectations();
-
-[[noreturn]] void wrong_expectation(const Line& line)
-{
-    for (const Expectation& expectation : expectations())
-    {
-        if (expectation.name == line.word(1))
-            throw LineError("write: expect " + std::string(expectation.usage));
-    }
-    throw std::logic_error("an expectation without a row");
-}
-
-void need_words(const Line& line, std::size_t count)
-{
-    if (line.size() != count)
-        wrong_expectation(line);
-}
 
 [[noreturn]] void not_met(const std::string& expected, const std::string& found)
 {
@@ -70,36 +45,34 @@ bool matches(const Value& value, const std::string& written)
     return value.matches(written);
 }
 
-void expect_result(Session& session, const Line& line)
+void expect_result(Session& session, const Words& words)
 {
-    need_words(line, 3);
     if (session.last_operation().empty())
         throw LineError("no operation has run yet");
     const auto& result = session.last_outcome().result;
     if (!result)
         throw LineError(session.last_operation() + " has no result");
-    if (!matches(*result, line.word(2)))
-        not_met("result " + line.word(2), result->to_text());
+    if (!matches(*result, words.at("VALUE")))
+        not_met("result " + words.at("VALUE"), result->to_text());
 }
 
-void expect_out(Session& session, const Line& line)
+void expect_out(Session& session, const Words& words)
 {
-    need_words(line, 4);
     if (session.last_operation().empty())
         throw LineError("no operation has run yet");
+    const std::string& wanted = words.at("ARGUMENT");
+    const std::string& value = words.line().word(3);
     std::vector<std::string_view> names;
     for (const OutputValue& output : session.last_outcome().outputs)
     {
         names.push_back(output.name);
-        if (output.name != line.word(2))
+        if (output.name != wanted)
             continue;
-        const bool untouched = line.word(3) == "untouched";
-        if (untouched != !output.value || (output.value && !matches(*output.value, line.word(3))))
-            not_met("*" + output.name + " = " + line.word(3), output.value ? output.value->to_text() : "untouched");
+        if (words.has("untouched") != !output.value || (output.value && !matches(*output.value, value)))
+            not_met("*" + output.name + " = " + value, output.value ? output.value->to_text() : "untouched");
         return;
     }
-    throw LineError("the last " + session.last_operation() + " had no output " + line.word(2) +
-                    did_you_mean(line.word(2), names));
+    throw LineError("the last " + session.last_operation() + " had no output " + wanted + did_you_mean(wanted, names));
 }
 
 bool entry_matches(const TraceEntry& entry, const std::string& written)
@@ -122,11 +95,11 @@ void check_stored_value(const record_view::FieldType& field, const std::string& 
 }
 
 /** `SET FIELD OLD → NEW`, the field by the name that it has in the trace. */
-std::string store_line(const Session& session, const Line& line)
+std::string store_line(const Session& session, const Words& words)
 {
     if (!session.watches_stores())
         throw LineError("stores are not watched: write stores on before the command whose stores are expected");
-    const std::string written = line.from(2);
+    const std::string written = words.from("LINE");
     const board::trace::StoreLine store = board::trace::read_store_line(written);
     try
     {
@@ -144,14 +117,12 @@ std::string store_line(const Session& session, const Line& line)
 }
 
 /** The line behind `expect call` or `expect next`, refused when no entry can ever look so. */
-std::string traced_line(const Session& session, const Line& line)
+std::string traced_line(const Session& session, const Words& words)
 {
-    const std::string written = line.from(2);
-    if (written.empty())
-        wrong_expectation(line);
+    const std::string written = words.from("LINE");
     entry_matches(TraceEntry{}, written);
-    if (line.word(2) == "SET")
-        return store_line(session, line);
+    if (words.at("LINE") == "SET")
+        return store_line(session, words);
     const std::size_t bracket = written.find('(');
     if (bracket == written.npos || written.find('"') < bracket)
         return written;
@@ -182,9 +153,9 @@ std::string instead_of(const std::string& written, const std::vector<TraceEntry>
     return cursor == 0 ? "none" : "none after " + window[cursor - 1].brief();
 }
 
-void expect_call(Session& session, const Line& line)
+void expect_call(Session& session, const Words& words)
 {
-    const std::string written = traced_line(session, line);
+    const std::string written = traced_line(session, words);
     const auto window = session.window();
     for (std::size_t i = session.cursor(); i < window.size(); ++i)
     {
@@ -197,9 +168,9 @@ void expect_call(Session& session, const Line& line)
     not_met("call " + written, instead_of(written, window, session.cursor()));
 }
 
-void expect_next(Session& session, const Line& line)
+void expect_next(Session& session, const Words& words)
 {
-    const std::string written = traced_line(session, line);
+    const std::string written = traced_line(session, words);
     const auto window = session.window();
     const std::size_t next = session.cursor();
     if (next >= window.size())
@@ -209,36 +180,28 @@ void expect_next(Session& session, const Line& line)
     session.set_cursor(next + 1);
 }
 
-void expect_no_more(Session& session, const Line& line)
+void expect_no_more(Session& session, const Words&)
 {
-    need_words(line, 2);
     const auto window = session.window();
     if (session.cursor() < window.size())
         not_met("no more", window[session.cursor()].brief());
 }
 
-void expect_none(Session& session, const Line& line)
+void expect_none(Session& session, const Words& words)
 {
-    need_words(line, 3);
-    need_platform_function(line.word(2));
+    const std::string& function = words.at("FUNCTION");
+    need_platform_function(function);
     for (const TraceEntry& entry : session.window())
     {
-        if (entry.function == line.word(2))
-            not_met("none " + line.word(2), entry.brief());
+        if (entry.function == function)
+            not_met("none " + function, entry.brief());
     }
 }
 
-std::string read_quoted(const Line& line, std::size_t index)
+void expect_log(Session& session, const Words& words)
 {
-    const Kind text{ .form = Kind::Form::Text, .names = {}, .members = {} };
-    return read_value(text, line.word(index), "expect " + line.word(1)).string();
-}
-
-void expect_log(Session& session, const Line& line)
-{
-    need_words(line, 4);
-    const std::int64_t level = read_number(board::names::Family::None, line.word(2), "the level");
-    const std::string text = read_quoted(line, 3);
+    const std::int64_t level = read_number(board::names::Family::None, words.at("LEVEL"), "the level");
+    const std::string text = read_text(words.at("\"text\""), "expect log");
     std::string of_level;
     for (const TraceEntry& entry : session.window())
     {
@@ -248,86 +211,87 @@ void expect_log(Session& session, const Line& line)
             return;
         of_level = entry.brief();
     }
-    not_met("log " + line.from(2), of_level.empty() ? "no line of this level" : "at last " + of_level);
+    not_met("log " + words.from("LEVEL"), of_level.empty() ? "no line of this level" : "at last " + of_level);
 }
 
-void expect_console(Session& session, const Line& line)
+void expect_console(Session& session, const Words& words)
 {
-    need_words(line, 3);
-    const std::string text = read_quoted(line, 2);
+    const std::string text = read_text(words.at("\"text\""), "expect console");
     const std::string console = session.console_window();
     constexpr std::size_t most = 200;
     if (console.find(text) == console.npos)
-        not_met("console " + line.word(2),
+        not_met("console " + words.at("\"text\""),
                 console.size() <= most ? board::quote(console)
                                        : "…" + board::quote(std::string_view(console).substr(console.size() - most)));
 }
 
-void expect_state(Session&, const Line& line)
+void expect_state(Session&, const Words& words)
 {
-    need_words(line, 4);
-    const Value value = state_at(line.word(2));
-    if (!matches(value, line.word(3)))
-        not_met("state " + line.word(2) + " " + line.word(3), value.to_text());
+    const Value value = state_at(words.at("PATH"));
+    if (!matches(value, words.at("VALUE")))
+        not_met("state " + words.from("PATH"), value.to_text());
 }
 
-std::uint32_t read_count(const Line& line)
+std::uint32_t count_in(const Words& words, const std::string& what)
 {
-    const Kind count{ .form = Kind::Form::Number, .bits = 32, .names = {}, .members = {} };
-    return static_cast<std::uint32_t>(read_value(count, line.word(2), "the number of " + line.word(1)).as_number());
+    return named_number(words.at("N"), "the number of " + what, board::names::Family::None);
 }
 
-void expect_asserts(Session&, const Line& line)
+void expect_asserts(Session&, const Words& words)
 {
-    need_words(line, 3);
-    if (board::asserts() != read_count(line))
-        not_met("asserts " + line.word(2), std::to_string(board::asserts()));
+    if (board::asserts() != count_in(words, "asserts"))
+        not_met("asserts " + words.at("N"), std::to_string(board::asserts()));
 }
 
-void expect_misuses(Session& session, const Line& line)
+void expect_misuses(Session& session, const Words& words)
 {
-    need_words(line, 3);
-    if (board::misuses() != read_count(line))
-        not_met("misuses " + line.word(2), std::to_string(board::misuses()));
-    session.expect_misuses(read_count(line));
-}
-
-const std::vector<Expectation>& expectations()
-{
-    static const std::vector<Expectation> all = {
-        { "result", "result VALUE", expect_result },
-        { "out", "out ARGUMENT VALUE|untouched", expect_out },
-        { "call", "call LINE, such as FUNCTION(ARGUMENT, …) = RESULT or SET FIELD OLD → NEW", expect_call },
-        { "next", "next LINE, such as FUNCTION(ARGUMENT, …) = RESULT or SET FIELD OLD → NEW", expect_next },
-        { "no-more", "no-more", expect_no_more },
-        { "none", "none FUNCTION", expect_none },
-        { "log", "log LEVEL \"text\"", expect_log },
-        { "console", "console \"text\"", expect_console },
-        { "state", "state PATH VALUE", expect_state },
-        { "asserts", "asserts N", expect_asserts },
-        { "misuses", "misuses N", expect_misuses },
-    };
-    return all;
+    if (board::misuses() != count_in(words, "misuses"))
+        not_met("misuses " + words.at("N"), std::to_string(board::misuses()));
+    session.expect_misuses(count_in(words, "misuses"));
 }
 
 } // namespace
 
 void check_expectation(Session& session, const Line& line)
 {
-    std::vector<std::string_view> names;
-    for (const Expectation& expectation : expectations())
-        names.push_back(expectation.name);
+    const Verb& verb = *find_verb("expect");
+    std::vector<std::string> kinds;
+    for (const VerbForm& form : verb.forms)
+        kinds.push_back(Line(form.form.written()).word(1));
     if (line.size() < 2)
-        throw LineError("expect what? result, out, call, next, no-more, none, log, console, state, asserts or misuses");
-    for (const Expectation& expectation : expectations())
     {
-        if (expectation.name == line.word(1))
-        {
-            expectation.check(session, line);
-            return;
-        }
+        std::string listed;
+        for (const std::string& kind : kinds)
+            listed += (listed.empty() ? "" : kind == kinds.back() ? " or " : ", ") + kind;
+        throw LineError("expect what? " + listed);
     }
-    throw LineError("no expectation " + line.word(1) + did_you_mean(line.word(1), names));
+    if (std::find(kinds.begin(), kinds.end(), line.word(1)) == kinds.end())
+        throw LineError("no expectation " + line.word(1) + did_you_mean(line.word(1), { kinds.begin(), kinds.end() }));
+    const ReadForm read = read_form(verb, line);
+    read.form->run(session, read.words);
+}
+
+std::vector<Verb> expectation_verbs()
+{
+    return {
+        { "expect",
+          { { "expect result VALUE", "the last operation returned it", expect_result },
+            { "expect out ARGUMENT VALUE|untouched", "it wrote that to an output; or it wrote nothing there",
+              expect_out },
+            { "expect call LINE", "an entry behind the last one that was matched is this one; others may stand between",
+              expect_call },
+            { "expect next LINE", "the very next entry is this one", expect_next },
+            { "expect no-more", "nothing stands behind the last one that was matched", expect_no_more },
+            { "expect none FUNCTION", "the platform function was not called", expect_none },
+            { "expect log LEVEL \"text\"", "`PMX_IsLog` was called so, whether the console showed it or not",
+              expect_log },
+            { "expect console \"text\"", "the console printed this, among other things", expect_console },
+            { "expect state PATH VALUE", "it is so", expect_state },
+            { "expect asserts N", "so many assertions were reported since power-on", expect_asserts },
+            { "expect misuses N", "the board found so many misuses of the platform since power-on", expect_misuses } },
+          true,
+          true },
+    };
 }
 
 } // namespace pmxboard

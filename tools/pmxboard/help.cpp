@@ -11,6 +11,7 @@
 #include "tools/pmxboard/ops_command.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/verbs.h"
 #include "tools/record_view/record_view.h"
 
 namespace pmxboard
@@ -71,26 +72,20 @@ std::string constant_text(const std::string& name, std::int64_t number, const Lo
     return look.bold(name) + " = " + std::to_string(number) + ", and goes with any number\n";
 }
 
-/** The first word of each form that a text is about: "sink plug, sink unplug" is about sink. */
-bool is_about(std::string_view form, std::string_view verb)
+/** Without the marks of code. */
+std::string unmarked(std::string_view text)
 {
-    return form.starts_with(verb) &&
-           (form.size() == verb.size() || form[verb.size()] == ' ' || form[verb.size()] == ',');
+    std::string plain(text);
+    std::erase(plain, '`');
+    return plain;
 }
 
 std::string verb_text(const Verb& verb, const Look& look)
 {
-    std::string text;
-    for (const VerbText& entry : verb_texts())
-    {
-        const std::string_view form = entry.form;
-        bool about = is_about(form, verb.name);
-        for (std::size_t comma = form.find(", "); !about && comma != form.npos; comma = form.find(", ", comma + 1))
-            about = is_about(form.substr(comma + 2), verb.name);
-        if (about)
-            text += wrapped(entry.form, look.width, 2, 4) + wrapped(entry.meaning, look.width, 6, 6);
-    }
-    return look.bold(verb.name) + "\n" + (text.empty() ? wrapped(verb.usage, look.width, 2, 4) : text);
+    std::string text = look.bold(verb.name) + "\n";
+    for (const VerbForm& form : verb.forms)
+        text += wrapped(form.form.written(), look.width, 2, 4) + wrapped(unmarked(form.meaning), look.width, 6, 6);
+    return text;
 }
 
 std::string field_text(const std::string& path, const Look& look)
@@ -105,13 +100,6 @@ std::string field_text(const std::string& path, const Look& look)
     for (const std::string_view name : names_in(board::names::family_of(type.record, type.member)))
         names.append(names.empty() ? "" : ", ").append(name);
     return names.empty() ? text : text + wrapped(names, look.width, 2, 2);
-}
-
-const Verb* find_verb(std::string_view name)
-{
-    const auto found =
-        std::find_if(verbs().begin(), verbs().end(), [name](const Verb& verb) { return verb.name == name; });
-    return found == verbs().end() ? nullptr : &*found;
 }
 
 std::string slot_text(const Operation& slot, const Look& look)
@@ -231,6 +219,25 @@ std::string help_on(const std::string& word, const Look& look)
     const std::vector<std::string> fields = record_view::fields();
     words.insert(words.end(), fields.begin(), fields.end());
     throw LineError("no help on " + word + did_you_mean(word, words));
+}
+
+std::string guide_tables()
+{
+    const auto cell = [](std::string_view text) {
+        std::string escaped;
+        for (const char c : text)
+            escaped.append(c == '|' ? "\\" : "").append(1, c);
+        return escaped;
+    };
+    std::string text = "| Command | Meaning |\n|---|---|\n";
+    for (const Verb& verb : verbs())
+    {
+        if (verb.has_kinds)
+            text += "\n| Expectation | Is met when |\n|---|---|\n";
+        for (const VerbForm& form : verb.forms)
+            text += "| `" + cell(form.form.written()) + "` | " + cell(form.meaning) + " |\n";
+    }
+    return text;
 }
 
 std::string shell_help(const Look& look)

@@ -39,6 +39,8 @@ std::string platform_text(std::string_view function, const Look& look);
 std::string help_on(const std::string& word, const Look& look);
 /** What the words are that help_on() knows. */
 std::vector<std::string_view> help_words();
+/** The tables of verbs and of expectations for the guide, in Markdown. */
+std::string guide_tables();
 /** Help on the shell as a whole. */
 std::string shell_help(const Look& look);
 

@@ -3,6 +3,7 @@
 
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/verbs.h"
 
 namespace pmxboard
 {
@@ -72,14 +73,16 @@ const std::vector<Operation>& ipmx_slots()
     return all;
 }
 
-void run_ipmx(Session& session, const Line& line)
+namespace
 {
-    if (line.size() < 3)
-        throw LineError("write: ipmx SLOT tag|NUMBER [ARGUMENT…]");
-    const Operation* const slot = find(ipmx_slots(), line.word(1));
+
+void call_slot(Session& session, const Words& given)
+{
+    const Operation* const slot = find(ipmx_slots(), given.at("SLOT"));
     if (slot == nullptr)
-        throw LineError("IPMX has no slot " + line.word(1) + did_you_mean(line.word(1), names_of(ipmx_slots())));
-    std::vector<std::string> words(line.words().begin() + 2, line.words().end());
+        throw LineError("IPMX has no slot " + given.at("SLOT") +
+                        did_you_mean(given.at("SLOT"), names_of(ipmx_slots())));
+    std::vector<std::string> words(given.line().words().begin() + 2, given.line().words().end());
     const bool registered_tag = words[0] == "tag";
     if (registered_tag)
         words[0] = "0";
@@ -112,6 +115,34 @@ void run_ipmx(Session& session, const Line& line)
     if (released < 0)
         throw StepFailed("the IPMX table cannot be given back: i4ImReleaseInterface answers " +
                          std::to_string(released));
+}
+
+void call_platform(Session& session, const Words& words)
+{
+    const std::string& name = words.at("FUNCTION");
+    const Operation* const operation = find(neighbours(), name);
+    if (operation == nullptr)
+        throw LineError("a neighbour cannot call " + name + " here" + did_you_mean(name, names_of(neighbours())));
+    const Values values = read_arguments(*operation, std::span(words.line().words()).subspan(2));
+    session.set_outcome(operation->name, operation->run(values));
+}
+
+} // namespace
+
+std::vector<Verb> neighbour_verbs()
+{
+    return {
+        { "neighbour",
+          { { "neighbour FUNCTION [ARGUMENT…]",
+              "call a function of the platform, one that takes numbers and returns nothing, as a neighbouring driver "
+              "would behind the layer's back",
+              call_platform } } },
+        { "ipmx",
+          { { "ipmx SLOT tag|NUMBER [ARGUMENT…]",
+              "call through the table that the mixer has registered, with the tag that it has registered or another "
+              "one: query the interface manager as a neighbouring driver does, call the slot and give the table back",
+              call_slot } } },
+    };
 }
 
 } // namespace pmxboard

@@ -130,13 +130,15 @@ Value read_record(const Kind& kind, std::string_view token, const std::string& w
     return record;
 }
 
-Value read_text(std::string_view token, const std::string& what)
+} // namespace
+
+std::string read_text(std::string_view token, const std::string& what)
 {
     if (!token.starts_with('"'))
         throw LineError(what + " takes a text in quotes, not " + std::string(token));
     try
     {
-        return Value::text(board::unquote(token));
+        return board::unquote(token);
     }
     catch (const std::invalid_argument& error)
     {
@@ -144,14 +146,12 @@ Value read_text(std::string_view token, const std::string& what)
     }
 }
 
-} // namespace
-
 Value read_value(const Kind& kind, std::string_view token, const std::string& what)
 {
     switch (kind.form)
     {
     case Kind::Form::Number: return read_number_value(kind, token, what);
-    case Kind::Form::Text: return read_text(token, what);
+    case Kind::Form::Text: return Value::text(read_text(token, what));
     case Kind::Form::List: return read_list(kind, token, what);
     case Kind::Form::Record: break;
     }

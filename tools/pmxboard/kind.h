@@ -42,6 +42,9 @@ struct Kind
 /** Read a value; `what` is what the message calls it ("ucMode"). Throws LineError. */
 board::Value read_value(const Kind& kind, std::string_view token, const std::string& what);
 
+/** A text in quotes, without them. Throws LineError. */
+std::string read_text(std::string_view token, const std::string& what);
+
 /** The number that a token stands for, by itself or by a name of the family. A name of another family is refused:
  *  it would silently be something else. Throws LineError. */
 std::int64_t read_number(board::names::Family family, std::string_view token, const std::string& what);

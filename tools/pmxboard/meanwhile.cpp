@@ -1,5 +1,6 @@
 // `meanwhile …`: commands that run from inside a platform call, as a neighbour's thread or an interrupt would.
 #include <algorithm>
+#include <functional>
 #include <iterator>
 #include <limits>
 #include <optional>
@@ -9,8 +10,7 @@
 #include "board/meanwhile.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
-#include "tools/pmxboard/verb_usage.h"
-#include "tools/pmxboard/verb_words.h"
+#include "tools/pmxboard/verbs.h"
 
 namespace pmxboard
 {
@@ -27,29 +27,27 @@ struct Request
     PMX_RESOLUTION_MODE_T mode{}; ///< unless it is a switch
 };
 
-/** `request OUTPUT MODE|on|off` */
-Request read_request(const Line& command)
+std::size_t read_output(const std::string& name)
 {
-    if (command.size() != 3)
-        throw LineError("write: request digital|hdmi|component|composite MODE|on|off");
-    Request request;
-    const auto output = std::find(std::begin(outputs), std::end(outputs), command.word(1));
+    const auto output = std::find(std::begin(outputs), std::end(outputs), name);
     if (output == std::end(outputs))
-        throw LineError("there is no output " + command.word(1) +
-                        did_you_mean(command.word(1), { std::begin(outputs), std::end(outputs) }));
-    request.output = static_cast<std::size_t>(output - std::begin(outputs));
-    const std::string& value = command.word(2);
-    if (value == "on" || value == "off")
-    {
-        request.enable = value == "on" ? TRUE : FALSE;
-        return request;
-    }
-    const Kind mode{ .bits = 32, .family = board::names::Family::ResolutionMode, .names = {}, .members = {} };
-    request.mode = static_cast<PMX_RESOLUTION_MODE_T>(read_value(mode, value, "the request's mode").as_number());
+        throw LineError("there is no output " + name + did_you_mean(name, { std::begin(outputs), std::end(outputs) }));
+    return static_cast<std::size_t>(output - std::begin(outputs));
+}
+
+Request read_request(const Words& words)
+{
+    Request request;
+    request.output = read_output(words.at("OUTPUT"));
+    if (words.has("MODE"))
+        request.mode = static_cast<PMX_RESOLUTION_MODE_T>(
+            named_number(words.at("MODE"), "the request's mode", board::names::Family::ResolutionMode));
+    else
+        request.enable = words.line().words().back() == "on" ? TRUE : FALSE;
     return request;
 }
 
-void change_request(const Request& request)
+void change(const Request& request)
 {
     const std::span<PMX_RESOLUTION_T> lent = LentOutputs::innermost();
     if (lent.size() <= request.output)
@@ -65,11 +63,6 @@ void change_request(const Request& request)
 void check_command(const Line& command)
 {
     const std::string& name = command.word(0);
-    if (name == "request")
-    {
-        read_request(command);
-        return;
-    }
     const Command found = find_command(name);
     if (found.operation != nullptr)
     {
@@ -84,84 +77,74 @@ void check_command(const Line& command)
     if (found.verb->only_looks)
         throw LineError(name + " only looks, and meanwhile is for what somebody else does; look behind the command "
                                "that it happens in");
-    if (!fits(found.verb->usage, command.words()))
-        wrong_usage(command);
+    read_form(*found.verb, command);
 }
 
-/** The words behind `meanwhile`. */
-struct Written
+/** Has something happen inside a call. What goes wrong is told with the meanwhile that it belongs to. */
+void arm(const Words& words, const std::string& written, const std::function<void()>& happen)
 {
-    bool as_thread = false;
-    std::string function; ///< empty: `meanwhile off`
-    unsigned n = 1;
-    std::string command; ///< empty: take it back
-};
-
-Written read(const Line& line)
-{
-    Written written;
-    std::size_t at = 1;
-    if (line.size() == 2 && line.word(1) == "off")
-        return written;
-    if (line.size() > 2 && line.word(1) == "as" && line.word(2) == "thread")
-    {
-        written.as_thread = true;
-        at = 3;
-    }
-    if (line.size() < at + 2)
-        wrong_usage(line);
-    written.function = line.word(at++);
-    need_platform_function(written.function);
-    if (line.word(at) == "off" && line.size() == at + 1 && !written.as_thread)
-        return written;
-    if (line.word(at) == "on")
-    {
-        if (line.size() < at + 3)
-            wrong_usage(line);
-        written.n = static_cast<unsigned>(
-            number_in(line.word(at + 1), "the call's number", 1, std::numeric_limits<std::int32_t>::max()));
-        at += 2;
-    }
-    written.command = line.from(at);
-    return written;
+    const auto n = words.has("N") ? static_cast<unsigned>(number_in(words.at("N"), "the call's number", 1,
+                                                                    std::numeric_limits<std::int32_t>::max()))
+                                  : 1u;
+    const bool as_thread = words.has("thread");
+    const std::string meanwhile = words.line().from(0);
+    const auto carry_out = [meanwhile, written, happen, as_thread] {
+        board::trace::notice("meanwhile", (as_thread ? "as thread " : "") + written);
+        try
+        {
+            happen();
+        }
+        catch (const std::exception& error)
+        {
+            throw StepFailed(meanwhile + ": " + error.what());
+        }
+    };
+    board::meanwhile(words.at("FUNCTION"), n, carry_out, { as_thread, meanwhile });
 }
 
-/** Carried out inside the call. What goes wrong is told with the meanwhile that it belongs to. */
-void happen(Session& session, const std::string& meanwhile, const std::string& written, bool as_thread)
+void run_command(Session& session, const Words& words)
 {
-    board::trace::notice("meanwhile", (as_thread ? "as thread " : "") + written);
-    try
-    {
-        const Line command(written);
-        if (command.word(0) == "request")
-            change_request(read_request(command));
-        else
-            session.run_meanwhile(command);
-    }
-    catch (const std::exception& error)
-    {
-        throw StepFailed(meanwhile + ": " + error.what());
-    }
+    need_platform_function(words.at("FUNCTION"));
+    const Line command(words.from("COMMAND"));
+    check_command(command);
+    arm(words, command.from(0), [&session, command] { session.run_meanwhile(command); });
+}
+
+void run_request(Session&, const Words& words)
+{
+    need_platform_function(words.at("FUNCTION"));
+    const Request request = read_request(words);
+    arm(words, words.from("request"), [request] { change(request); });
+}
+
+void forget_function(Session&, const Words& words)
+{
+    need_platform_function(words.at("FUNCTION"));
+    board::meanwhiles::forget(words.at("FUNCTION"));
+}
+
+void forget_all(Session&, const Words&)
+{
+    board::meanwhiles::forget_all();
 }
 
 } // namespace
 
-void run_meanwhile(Session& session, const Line& line)
+std::vector<Verb> meanwhile_verbs()
 {
-    const Written written = read(line);
-    if (written.function.empty())
-        board::meanwhiles::forget_all();
-    else if (written.command.empty())
-        board::meanwhiles::forget(written.function);
-    if (written.command.empty())
-        return;
-    check_command(Line(written.command));
-    const std::string meanwhile = line.from(0);
-    board::meanwhile(written.function, written.n,
-                     [&session, meanwhile, command = written.command, as_thread = written.as_thread] {
-                         happen(session, meanwhile, command, as_thread);
-                     },
-                     { written.as_thread, meanwhile });
+    return {
+        { "meanwhile",
+          { { "meanwhile [as thread] FUNCTION [on N] COMMAND",
+              "when this platform function is called next, or for the n-th time from now, the command runs inside the "
+              "call; `as thread`, in a thread of its own, which can wait for the mutex",
+              run_command },
+            { "meanwhile [as thread] FUNCTION [on N] request OUTPUT MODE|on|off",
+              "the caller of the running `PMX_SetModeEx` changes what it asked for: OUTPUT is `digital`, `hdmi`, "
+              "`component` or `composite`",
+              run_request },
+            { "meanwhile FUNCTION off", "take back what is armed for a function", forget_function },
+            { "meanwhile off", "take back everything that is armed", forget_all } } },
+    };
 }
 
 } // namespace pmxboard

@@ -6,7 +6,10 @@
 #include "board/board.h"
 #include "board/console.h"
 #include "board/threads.h"
+#include "tools/pmxboard/state_paths.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/verbs.h"
+#include "tools/record_view/record_view.h"
 #include "tools/record_view/store_watch.h"
 
 namespace pmxboard
@@ -16,22 +19,6 @@ namespace
 
 /** Where the outcome of a command goes that runs inside a platform call, in each thread; null when none does. */
 thread_local Outcome* meanwhile_outcome = nullptr;
-
-[[noreturn]] void unknown_command(const std::string& word)
-{
-    const std::string name = word.substr(0, word.find('('));
-    if (name != word && find(operations(), name) != nullptr)
-        throw LineError(word +
-                        ": arguments stand behind the name, separated by blanks: " + usage(*find(operations(), name)));
-    const auto platform = board::platform_functions();
-    if (std::any_of(platform.begin(), platform.end(), [&](const auto& function) { return function.name == word; }))
-        throw LineError(word + " belongs to the platform; a neighbouring driver calls it: neighbour " + word + " …");
-
-    std::vector<std::string_view> known = names_of(operations());
-    for (const Verb& verb : verbs())
-        known.push_back(verb.name);
-    throw LineError("no command " + word + did_you_mean(word, known));
-}
 
 /** An outcome in a notice: "= 1, *pucMode = RES_480P". */
 std::string to_text(const Outcome& outcome)
@@ -46,16 +33,6 @@ std::string to_text(const Outcome& outcome)
 }
 
 } // namespace
-
-Command find_command(const std::string& name)
-{
-    const auto& all = verbs();
-    const auto verb = std::find_if(all.begin(), all.end(), [&](const Verb& known) { return known.name == name; });
-    const Command command{ verb == all.end() ? nullptr : &*verb, find(operations(), name) };
-    if (command.verb == nullptr && command.operation == nullptr)
-        unknown_command(name);
-    return command;
-}
 
 Session::Session(Output& output, std::string board, std::filesystem::path directory)
     : m_output(output), m_board(std::move(board)), m_directory(std::move(directory))
@@ -127,7 +104,10 @@ void Session::carry_out(const Line& line)
 {
     const Command command = find_command(line.word(0));
     if (command.verb != nullptr)
-        command.verb->run(*this, line);
+    {
+        const ReadForm read = read_form(*command.verb, line);
+        read.form->run(*this, read.words);
+    }
     else
         run(*command.operation, read_arguments(*command.operation, std::span(line.words()).subspan(1)));
 }
@@ -324,6 +304,25 @@ void Session::finish()
     m_output.flush();
     check_misuses();
     check_meanwhiles();
+}
+
+board::Value whole_state()
+{
+    board::Value all = board::state();
+    const board::Value layer = record_view::state();
+    for (std::size_t i = 0; i < layer.keys().size(); ++i)
+        all.add(layer.keys()[i], layer.items()[i]);
+    return all;
+}
+
+board::Value state_at(const std::string& path)
+{
+    const board::Value board_state = board::state();
+    if (const board::Value* const found = board_state.find(path); found != nullptr && !path.empty())
+        return *found;
+    if (record_view::has(path))
+        return record_view::get(path);
+    return part_of(whole_state(), path);
 }
 
 } // namespace pmxboard

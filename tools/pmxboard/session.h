@@ -114,51 +114,8 @@ private:
     std::size_t m_console_end = 0;
 };
 
-/** A word of the language in lower case. */
-struct Verb
-{
-    std::string_view name;
-    std::string_view usage;
-    void (*run)(Session& session, const Line& line);
-    bool only_looks = false; ///< `diff` goes on showing what the command before it changed
-};
-
-const std::vector<Verb>& verbs();
-
-/** What a line begins with: one of the two is null. */
-struct Command
-{
-    const Verb* verb = nullptr;
-    const Operation* operation = nullptr;
-};
-/** Throws LineError with the nearest names. */
-Command find_command(const std::string& name);
-
 /** `expect …`. Throws StepFailed when it is not met. */
 void check_expectation(Session& session, const Line& line);
-
-/** `ipmx …`: call a function of the table that the mixer has registered, as a neighbouring driver does. */
-void run_ipmx(Session& session, const Line& line);
-
-/** `state …`, `save …`, `diff …`: what board and layer hold, and what a command changed. */
-void run_state(Session& session, const Line& line);
-void run_save(Session& session, const Line& line);
-void run_diff(Session& session, const Line& line);
-
-/** `meanwhile …`: what somebody else does while the layer is inside a platform call. */
-void run_meanwhile(Session& session, const Line& line);
-
-/** `what-if …`: what a command would do. */
-void run_what_if(Session& session, const Line& line);
-
-/** `sink …`, `display-part …`, `video-plane …`: what these devices do by themselves. */
-void run_sink(Session& session, const Line& line);
-void run_display_part(Session& session, const Line& line);
-void run_video_plane(Session& session, const Line& line);
-
-/** `source …`, `plane-delay …`: the sources of pictures, and the delays of the mixer's planes. */
-void run_source(Session& session, const Line& line);
-void run_plane_delay(Session& session, const Line& line);
 
 /** Functions of that table, for checking them against the header. The tag stands first. */
 const std::vector<Operation>& ipmx_slots();

@@ -1,12 +1,11 @@
 // Verbs for the sources of pictures, and for the delays of the planes that carry them.
-#include <charconv>
 #include <limits>
 
 #include "board/mixer.h"
 #include "board/sources.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
-#include "tools/pmxboard/verb_words.h"
+#include "tools/pmxboard/verbs.h"
 
 namespace pmxboard
 {
@@ -15,24 +14,10 @@ namespace
 
 using board::Value;
 using board::sources::Id;
-using board::sources::Size;
 
-/** `1920x1080`. */
-Size read_size(const Line& line, const std::string& word)
+Id source_in(const Words& words, std::string_view place)
 {
-    Size size{};
-    const char* const end = word.data() + word.size();
-    const auto width = std::from_chars(word.data(), end, size.width);
-    if (width.ec != std::errc() || width.ptr == end || *width.ptr != 'x')
-        wrong_usage(line);
-    const auto height = std::from_chars(width.ptr + 1, end, size.height);
-    if (height.ec != std::errc() || height.ptr != end)
-        wrong_usage(line);
-    return size;
-}
-
-Id read_source(const std::string& name)
-{
+    const std::string& name = words.at(place);
     try
     {
         return board::sources::find(name);
@@ -43,30 +28,55 @@ Id read_source(const std::string& name)
     }
 }
 
-/** `start 1920x1080 [luma N]` of a video plane, `start 1280x720 ycbcr|rgb` of an OSD plane. */
-UINT32 start(Id id, const Line& line)
+board::sources::Size size_in(const Words& words)
 {
-    if (id.type == Id::Type::VideoPlane)
-    {
-        if (line.size() != 4 && (line.size() != 6 || line.word(4) != "luma"))
-            wrong_usage(line);
-        const Size size = read_size(line, line.word(3));
-        const auto luma_key =
-            line.size() == 6 ? static_cast<UCHAR>(number_in(line.word(5), "the luma key", 0, 255)) : UCHAR{ 0 };
-        return board::sources::start_video(id.number, size, luma_key);
-    }
-    if (line.size() != 5 || (line.word(4) != "ycbcr" && line.word(4) != "rgb"))
-        wrong_usage(line);
-    return board::sources::start_graphics(id.number, read_size(line, line.word(3)),
-                                          line.word(4) == "ycbcr" ? DRV_GFX_COLOR_MODE_YCBCR : DRV_GFX_COLOR_MODE_RGB);
+    const auto [width, height] = read_size(words.at("SIZE")).value();
+    return { width, height };
 }
 
-UINT32 resize(Id id, const Line& line)
+void answer(Session& session, UINT32 result)
 {
-    need_words(line, 4, 4);
+    const auto base = result > 0xFFFF ? Value::Base::Hex : Value::Base::Decimal;
+    session.set_outcome("source", { Value::number(result, {}, base), {} });
+}
+
+void connect(Session& session, const Words& words)
+{
+    answer(session, board::sources::connect(source_in(words, "NAME")));
+}
+
+void disconnect(Session& session, const Words& words)
+{
+    answer(session, board::sources::disconnect(source_in(words, "NAME")));
+}
+
+void stop(Session& session, const Words& words)
+{
+    answer(session, board::sources::stop(source_in(words, "NAME")));
+}
+
+void start_video(Session& session, const Words& words)
+{
+    const Id id = source_in(words, "VDP");
+    const auto luma_key =
+        words.has("N") ? static_cast<UCHAR>(number_in(words.at("N"), "the luma key", 0, 255)) : UCHAR{ 0 };
+    answer(session, board::sources::start_video(id.number, size_in(words), luma_key));
+}
+
+void start_graphics(Session& session, const Words& words)
+{
+    const Id id = source_in(words, "OSD");
+    answer(session,
+           board::sources::start_graphics(id.number, size_in(words),
+                                          words.has("ycbcr") ? DRV_GFX_COLOR_MODE_YCBCR : DRV_GFX_COLOR_MODE_RGB));
+}
+
+void resize(Session& session, const Words& words)
+{
+    const Id id = source_in(words, "NAME");
     try
     {
-        return board::sources::resize(id, read_size(line, line.word(3)));
+        answer(session, board::sources::resize(id, size_in(words)));
     }
     catch (const std::invalid_argument& error)
     {
@@ -74,57 +84,29 @@ UINT32 resize(Id id, const Line& line)
     }
 }
 
-UINT32 simple(Id id, const Line& line)
+void connect_back(Session&, const Words& words)
 {
-    need_words(line, 3, 3);
-    const std::string& action = line.word(2);
-    if (action == "connect")
-        return board::sources::connect(id);
-    if (action == "disconnect")
-        return board::sources::disconnect(id);
-    if (action != "stop")
-        wrong_usage(line);
-    return board::sources::stop(id);
+    const Id id = source_in(words, "NAME");
+    if (id.type != Id::Type::VideoPlane)
+        throw LineError("an OSD plane is told nothing, and so has no place to connect back from");
+    board::sources::set_connects_back(id.number, words.has("on"));
 }
 
-} // namespace
-
-void run_source(Session& session, const Line& line)
+void set_delays(Session&, const Words& words)
 {
-    need_words(line, 3, 6);
-    const Id id = read_source(line.word(1));
-    const std::string& action = line.word(2);
-    if (action == "connects-back")
-    {
-        need_words(line, 4, 4);
-        const bool connects_back = read_switch(line, line.word(3));
-        if (id.type != Id::Type::VideoPlane)
-            throw LineError("an OSD plane is told nothing, and so has no place to connect back from");
-        board::sources::set_connects_back(id.number, connects_back);
-        return;
-    }
-    const UINT32 answer = action == "start" ? start(id, line) : action == "size" ? resize(id, line) : simple(id, line);
-    session.set_outcome("source",
-                        { Value::number(answer, {}, answer > 0xFFFF ? Value::Base::Hex : Value::Base::Decimal), {} });
-}
-
-void run_plane_delay(Session&, const Line& line)
-{
-    const bool of_order = line.size() > 1 && line.word(1) == "order";
-    const std::size_t first = of_order ? 3 : 1;
     board::mixer::Arrangement arrangement{};
-    need_words(line, first + arrangement.delay.size(), first + arrangement.delay.size());
+    const std::vector<std::string> delays = words.all("D");
     for (std::size_t plane = 0; plane < arrangement.delay.size(); ++plane)
-        arrangement.delay[plane] = static_cast<std::int32_t>(number_in(line.word(first + plane), "a plane's delay",
+        arrangement.delay[plane] = static_cast<std::int32_t>(number_in(delays[plane], "a plane's delay",
                                                                        std::numeric_limits<std::int32_t>::min(),
                                                                        std::numeric_limits<std::int32_t>::max()));
-    if (!of_order)
+    if (!words.has("ORDER"))
     {
         board::mixer::set_plane_delay(arrangement.delay);
         return;
     }
-    arrangement.order =
-        static_cast<std::uint32_t>(number_in(line.word(2), "the order", 0, std::numeric_limits<std::uint32_t>::max()));
+    arrangement.order = static_cast<std::uint32_t>(
+        number_in(words.at("ORDER"), "the order", 0, std::numeric_limits<std::uint32_t>::max()));
     try
     {
         board::mixer::set_arrangement(arrangement);
@@ -133,6 +115,36 @@ void run_plane_delay(Session&, const Line& line)
     {
         throw LineError(error.what());
     }
+}
+
+} // namespace
+
+std::vector<Verb> source_verbs()
+{
+    return {
+        { "source",
+          { { "source NAME connect",
+              "a source of pictures, `vdp0` to `vdp3` or `osd0` to `osd5`, connects to its port of the mixer. The "
+              "result "
+              "is the mixer's answer, as with all of `source`",
+              connect },
+            { "source NAME disconnect", "it leaves its port", disconnect },
+            { "source VDP start SIZE [luma N]",
+              "a video plane delivers pictures of this size, such as `1920x1080`, with luma key N, else 0; it connects "
+              "first when it has not",
+              start_video },
+            { "source OSD start SIZE ycbcr|rgb", "the same for an OSD plane, with its colour mode", start_graphics },
+            { "source NAME size SIZE", "its pictures have another size from now on", resize },
+            { "source NAME stop", "it delivers no more", stop },
+            { "source NAME connects-back on|off",
+              "a video plane's driver that connects from inside `pu4SetColorMode`, which nobody may",
+              connect_back } } },
+        { "plane-delay",
+          { { "plane-delay D D D D D D D D",
+              "delays that the mixer reports from the next plane order on, plane 1 first", set_delays },
+            { "plane-delay order ORDER D D D D D D D D", "the same for that arrangement alone, such as `0x76543210`",
+              set_delays } } },
+    };
 }
 
 } // namespace pmxboard

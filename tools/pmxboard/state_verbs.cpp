@@ -1,15 +1,17 @@
-// Verbs that look at what board and layer hold: state, save, diff.
+// Verbs for what board and layer hold.
 #include <cerrno>
 #include <cstring>
 #include <fstream>
 
 #include "board/board.h"
 #include "tools/pmxboard/diff.h"
+#include "tools/pmxboard/kind.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/state_dump.h"
 #include "tools/pmxboard/state_paths.h"
 #include "tools/pmxboard/step_error.h"
-#include "tools/pmxboard/verb_words.h"
+#include "tools/pmxboard/verbs.h"
+#include "tools/record_view/record_view.h"
 
 namespace pmxboard
 {
@@ -17,28 +19,6 @@ namespace
 {
 
 using board::Value;
-
-struct Wanted
-{
-    std::vector<std::string> paths;
-    bool json = false;
-};
-
-/** `VERB [PATH…] [--json]` */
-Wanted read_wanted(const Line& line)
-{
-    Wanted wanted;
-    for (std::size_t i = 1; i < line.size(); ++i)
-    {
-        if (line.word(i) == "--json")
-            wanted.json = true;
-        else if (line.word(i).starts_with('-'))
-            wrong_usage(line);
-        else
-            wanted.paths.push_back(line.word(i));
-    }
-    return wanted;
-}
 
 StateDump dump_of_now()
 {
@@ -57,26 +37,35 @@ std::string line_for_programs(const NamedValues& values)
     return lines;
 }
 
-} // namespace
-
-void run_state(Session& session, const Line& line)
+void show_state(Session& session, const Words& words)
 {
-    const Wanted wanted = read_wanted(line);
+    const std::vector<std::string> paths = words.all("PATH");
     NamedValues values;
-    for (const std::string& path : wanted.paths)
+    for (const std::string& path : paths)
         values.emplace_back(path, state_at(path));
-    if (wanted.paths.empty())
+    if (paths.empty())
         values.emplace_back("", whole_state());
-    const std::string json = wanted.paths.empty() ? to_json(dump_of_now()) : to_json(dump_of_now().board, values);
-    session.output().shown(line_for_programs(values), wanted.json ? json + "\n" : to_text(values));
+    const std::string json = paths.empty() ? to_json(dump_of_now()) : to_json(dump_of_now().board, values);
+    session.output().shown(line_for_programs(values), words.has("--json") ? json + "\n" : to_text(values));
 }
 
-void run_save(Session& session, const Line& line)
+void show_changes(Session& session, const Words& words)
 {
-    need_words(line, 2, 2);
+    const std::vector<std::string> paths = words.all("PATH");
+    for (const std::string& path : paths)
+        state_at(path);
+    const std::vector<Change> found = changes_at(session.changes(), paths);
+    const std::string for_people = found.empty() ? "  nothing changed\n" : to_text(found);
+    session.output().shown(R"({"kind":"diff","command":)" + Value::text(session.last_command()).to_json() +
+                               R"(,"changes":)" + to_json_list(found) + "}",
+                           words.has("--json") ? to_json(found) + "\n" : for_people);
+}
+
+void save(Session& session, const Words& words)
+{
     if (session.imagines())
         throw LineError("save writes a file, and what-if changes nothing");
-    const std::string& name = line.word(1);
+    const std::string& name = words.at("FILE");
     errno = 0;
     std::ofstream file(name, std::ios::binary);
     file << to_json(dump_of_now()) << '\n';
@@ -85,16 +74,36 @@ void run_save(Session& session, const Line& line)
     session.output().text("  saved to " + name + "\n");
 }
 
-void run_diff(Session& session, const Line& line)
+void poke(Session&, const Words& words)
 {
-    const Wanted wanted = read_wanted(line);
-    for (const std::string& path : wanted.paths)
-        state_at(path);
-    const std::vector<Change> found = changes_at(session.changes(), wanted.paths);
-    const std::string for_people = found.empty() ? "  nothing changed\n" : to_text(found);
-    session.output().shown(R"({"kind":"diff","command":)" + Value::text(session.last_command()).to_json() +
-                               R"(,"changes":)" + to_json_list(found) + "}",
-                           wanted.json ? to_json(found) + "\n" : for_people);
+    try
+    {
+        const board::trace::By scope(Session::is_meanwhile() ? "meanwhile" : "poke");
+        const record_view::FieldType field = record_view::type_of(words.at("FIELD"));
+        const auto family = board::names::family_of(field.record, field.member);
+        record_view::set(words.at("FIELD"), read_number(family, words.at("VALUE"), field.path));
+    }
+    catch (const record_view::FieldError& error)
+    {
+        throw LineError(error.what());
+    }
+}
+
+} // namespace
+
+std::vector<Verb> state_verbs()
+{
+    return {
+        { "state",
+          { { "state [PATH…] [--json]", "show what board and layer hold, or parts of it", show_state } },
+          true },
+        { "diff",
+          { { "diff [PATH…] [--json]", "show what the last command changed, of everything or at these paths",
+              show_changes } },
+          true },
+        { "save", { { "save FILE", "write the whole state to a file, relative to where the tool runs", save } }, true },
+        { "poke", { { "poke FIELD VALUE", "change the layer's record, for what no operation can set", poke } } },
+    };
 }
 
 } // namespace pmxboard

@@ -1,223 +1,226 @@
-#include <algorithm>
-#include <limits>
+#include "tools/pmxboard/verbs.h"
 
-#include "board/board.h"
-#include "tools/pmxboard/session.h"
-#include "tools/pmxboard/state_paths.h"
+#include <algorithm>
+#include <cctype>
+#include <charconv>
+#include <stdexcept>
+
+#include "board/duration.h"
+#include "board/trace.h"
+#include "tools/pmxboard/kind.h"
 #include "tools/pmxboard/step_error.h"
-#include "tools/pmxboard/verb_words.h"
-#include "tools/record_view/record_view.h"
 
 namespace pmxboard
 {
 namespace
 {
 
-void power_on(Session& session, const Line& line)
+bool is_text(std::string_view word)
 {
-    need_words(line, 1, 2);
-    session.power_on(line.size() == 2 ? line.word(1) : std::string());
+    return word.starts_with('"');
 }
 
-/** Only a partition that is there can be removed. */
-void need_partition(const std::string& name)
+bool is_no_option(std::string_view word)
 {
-    const board::Value state = board::state();
-    std::vector<std::string_view> known;
-    for (const board::Value& partition : state.find("flash.partitions")->items())
-        known.push_back(partition.find("name")->string());
-    if (std::find(known.begin(), known.end(), name) == known.end())
-        throw LineError("there is no flash partition " + name + did_you_mean(name, known));
+    return !word.starts_with('-');
 }
 
-void flash(Session& session, const Line& line)
+bool is_time(std::string_view word)
+try
 {
-    need_words(line, 3, 3);
-    if (line.word(2) == "off")
-        need_partition(line.word(1));
-    try
+    return board::read_duration(word).has_value();
+}
+catch (const std::invalid_argument&)
+{
+    return true; // one that is too long, which is told when it is read
+}
+
+bool is_size(std::string_view word)
+{
+    return read_size(word).has_value();
+}
+
+bool is_of_video(std::string_view word)
+{
+    return !word.starts_with("osd");
+}
+
+bool is_of_osd(std::string_view word)
+{
+    return !word.starts_with("vdp");
+}
+
+/** Words that stand before a command, or in place of it, begin none. */
+bool begins_command(std::string_view word)
+{
+    return word != "request" && word != "as" && word != "thread" && word != "on";
+}
+
+[[noreturn]] void unknown_command(const std::string& word)
+{
+    const std::string name = word.substr(0, word.find('('));
+    if (name != word && find(operations(), name) != nullptr)
+        throw LineError(word +
+                        ": arguments stand behind the name, separated by blanks: " + usage(*find(operations(), name)));
+    const auto platform = board::platform_functions();
+    if (std::any_of(platform.begin(), platform.end(), [&](const auto& function) { return function.name == word; }))
+        throw LineError(word + " belongs to the platform; a neighbouring driver calls it: neighbour " + word + " …");
+
+    std::vector<std::string_view> known = names_of(operations());
+    for (const Verb& verb : verbs())
+        known.push_back(verb.name);
+    throw LineError("no command " + word + did_you_mean(word, known));
+}
+
+/** Whether a place stands in a text. */
+bool stands_in(std::string_view text, std::string_view place)
+{
+    const auto is_letter = [&](std::size_t i) {
+        return i < text.size() && std::isalpha(static_cast<unsigned char>(text[i])) != 0;
+    };
+    for (std::size_t at = 0; (at = text.find(place, at)) != text.npos; at += place.size())
     {
-        board::set_flash(line.word(1), line.word(2) == "off" ? std::filesystem::path() : session.file(line.word(2)));
+        if (!is_letter(at - 1) && !is_letter(at + place.size()))
+            return true;
     }
-    catch (const std::invalid_argument& error)
+    return false;
+}
+
+/** Forms in a row: "a, b, or c". */
+std::string usage_of(const std::vector<const VerbForm*>& forms)
+{
+    std::string text;
+    for (const VerbForm* const form : forms)
+        text.append(text.empty() ? "" : form == forms.back() ? ", or " : ", ").append(form->form.written());
+    for (const Place& place : places())
     {
-        throw LineError(error.what());
+        if (!place.explanation.empty() && stands_in(text, place.name))
+            text.append("; ").append(place.name).append(" is ").append(place.explanation);
     }
-}
-
-void fault(Session&, const Line& line)
-{
-    need_words(line, 3, 5);
-    const std::string& function = line.word(1);
-    need_platform_function(function);
-    if (line.word(2) == "off" && line.size() == 3)
-    {
-        board::faults::clear(function);
-        return;
-    }
-    board::Fault scripted;
-    scripted.function = function;
-    const auto family = board::names::family_of(function, "result");
-    scripted.answer = read_number(family, line.word(2), "the answer");
-    if (scripted.answer < std::numeric_limits<std::int32_t>::min() ||
-        scripted.answer > std::numeric_limits<std::uint32_t>::max())
-        throw LineError("the answer has 32 bits, and " + line.word(2) + " does not fit");
-    if (line.size() > 3)
-    {
-        const bool has_number = line.word(3) == "on" || line.word(3) == "from";
-        if ((!has_number && line.word(3) != "always") || line.size() != (has_number ? 5 : 4))
-            wrong_usage(line);
-        scripted.when = line.word(3) == "on"     ? board::Fault::When::On
-                        : line.word(3) == "from" ? board::Fault::When::From
-                                                 : board::Fault::When::Always;
-        if (has_number)
-            scripted.n = static_cast<unsigned>(
-                number_in(line.word(4), "the call's number", 1, std::numeric_limits<std::int32_t>::max()));
-    }
-    try
-    {
-        board::faults::set(scripted);
-    }
-    catch (const std::invalid_argument& error)
-    {
-        throw LineError(error.what());
-    }
-}
-
-void advance(Session&, const Line& line)
-{
-    need_words(line, 2, 2);
-    board::advance(read_time(line, line.word(1)));
-}
-
-void loglevel(Session&, const Line& line)
-{
-    need_words(line, 2, 2);
-    board::set_console_level(static_cast<int>(number_in(line.word(1), "the console's level", -1, 1000)));
-}
-
-void poke(Session&, const Line& line)
-{
-    need_words(line, 3, 3);
-    try
-    {
-        const board::trace::By scope(Session::is_meanwhile() ? "meanwhile" : "poke");
-        const record_view::FieldType field = record_view::type_of(line.word(1));
-        const auto family = board::names::family_of(field.record, field.member);
-        record_view::set(line.word(1), read_number(family, line.word(2), field.path));
-    }
-    catch (const record_view::FieldError& error)
-    {
-        throw LineError(error.what());
-    }
-}
-
-void trace(Session& session, const Line& line)
-{
-    need_words(line, 2, 2);
-    session.output().show_trace(read_switch(line, line.word(1)));
-}
-
-void stores(Session& session, const Line& line)
-{
-    need_words(line, 2, 2);
-    session.watch_stores(read_switch(line, line.word(1)));
-}
-
-void suspend(Session& session, const Line& line)
-{
-    need_words(line, 1, 1);
-    session.set_outcome("suspend", { board::Value::number(board::suspend()), {} });
-}
-
-void resume(Session& session, const Line& line)
-{
-    need_words(line, 1, 1);
-    session.set_outcome("resume", { board::Value::number(board::resume()), {} });
-}
-
-void print(Session& session, const Line& line)
-{
-    need_words(line, 2, 2);
-    session.output().text(read_text(line, line.word(1)));
-}
-
-void neighbour(Session& session, const Line& line)
-{
-    if (line.size() < 2)
-        wrong_usage(line);
-    const Operation* const operation = find(neighbours(), line.word(1));
-    if (operation == nullptr)
-        throw LineError("a neighbour cannot call " + line.word(1) + " here" +
-                        did_you_mean(line.word(1), names_of(neighbours())));
-    const Values values = read_arguments(*operation, std::span(line.words()).subspan(2));
-    session.set_outcome(operation->name, operation->run(values));
-}
-
-void expectation(Session& session, const Line& line)
-{
-    check_expectation(session, line);
+    return text;
 }
 
 } // namespace
 
-const std::vector<Verb>& verbs()
+const std::vector<Place>& places()
 {
-    static const std::vector<Verb> all = {
-        { "power-on", "power-on [BOARD]", power_on },
-        { "flash", "flash PARTITION FILE, or flash PARTITION off", flash },
-        { "fault", "fault FUNCTION ANSWER [on N|from N|always], or fault FUNCTION off", fault },
-        { "advance", "advance 10s, 500ms or 2us", advance },
-        { "loglevel", "loglevel LEVEL", loglevel },
-        { "state", "state [PATH…] [--json]", run_state, true },
-        { "save", "save FILE", run_save, true },
-        { "diff", "diff [PATH…] [--json]", run_diff, true },
-        { "what-if", "what-if COMMAND", run_what_if, true },
-        { "meanwhile",
-          "meanwhile FUNCTION [on N] COMMAND, meanwhile as thread FUNCTION [on N] COMMAND, "
-          "meanwhile FUNCTION [on N] request digital|hdmi|component|composite MODE|on|off, meanwhile FUNCTION off, "
-          "or meanwhile off",
-          run_meanwhile },
-        { "poke", "poke FIELD VALUE", poke },
-        { "trace", "trace on, or trace off", trace, true },
-        { "stores", "stores on, or stores off", stores, true },
-        { "suspend", "suspend", suspend },
-        { "resume", "resume", resume },
-        { "sink", "sink plug, sink unplug, sink request-resolution [on|off], sink valid MODE HZ, or sink valid asked",
-          run_sink },
-        { "display-part", "display-part off|never|raise|lower, or display-part answer TIME", run_display_part },
-        { "video-plane", "video-plane waiting on|off, or video-plane hw-enable PLANE STATE", run_video_plane },
-        { "source",
-          "source vdp0…vdp3|osd0…osd5 connect|stop|disconnect, source vdp0…vdp3|osd0…osd5 size WxH, source VDP start "
-          "WxH [luma N], "
-          "source OSD start WxH ycbcr|rgb, or source VDP connects-back on|off",
-          run_source },
-        { "plane-delay", "plane-delay [order 0x76543210] and eight delays, plane 1 first", run_plane_delay },
-        { "print", "print \"text\"", print, true },
-        { "neighbour", "neighbour FUNCTION [ARGUMENT…]", neighbour },
-        { "ipmx", "ipmx SLOT tag|NUMBER [ARGUMENT…]", run_ipmx },
-        { "expect", "expect result|out|call|next|no-more|none|log|console|state|asserts|misuses …", expectation, true },
+    static const std::vector<Place> all = {
+        { "TIME", is_time, "10s, 500ms or 2us" },
+        { "SIZE", is_size, "1920x1080 or the like" },
+        { "NAME", nullptr, "vdp0…vdp3 or osd0…osd5" },
+        { "VDP", is_of_video, "vdp0…vdp3" },
+        { "OSD", is_of_osd, "osd0…osd5" },
+        { "ORDER", nullptr, "an order of planes, such as 0x76543210" },
+        { "D", nullptr, "the delay of a plane, plane 1 first" },
+        { "OUTPUT", nullptr, "digital, hdmi, component or composite" },
+        { "LINE", nullptr, "such as FUNCTION(ARGUMENT, …) = RESULT or SET FIELD OLD → NEW" },
+        { "PATH", is_no_option, "" },
+        { "COMMAND", begins_command, "" },
+        { "\"text\"", is_text, "" },
     };
     return all;
 }
 
-board::Value whole_state()
+const std::vector<Verb>& verbs()
 {
-    board::Value all = board::state();
-    const board::Value layer = record_view::state();
-    for (std::size_t i = 0; i < layer.keys().size(); ++i)
-        all.add(layer.keys()[i], layer.items()[i]);
+    static const std::vector<Verb> all = [] {
+        std::vector<Verb> joined;
+        for (const auto& verbs_of : { board_verbs, device_verbs, source_verbs, state_verbs, what_if_verbs,
+                                      meanwhile_verbs, view_verbs, neighbour_verbs, expectation_verbs })
+        {
+            for (Verb& verb : verbs_of())
+                joined.push_back(std::move(verb));
+        }
+        return joined;
+    }();
     return all;
 }
 
-board::Value state_at(const std::string& path)
+const Verb* find_verb(std::string_view name)
 {
-    const board::Value board_state = board::state();
-    if (const board::Value* const found = board_state.find(path); found != nullptr && !path.empty())
-        return *found;
-    if (record_view::has(path))
-        return record_view::get(path);
-    return part_of(whole_state(), path);
+    const auto found =
+        std::find_if(verbs().begin(), verbs().end(), [name](const Verb& verb) { return verb.name == name; });
+    return found == verbs().end() ? nullptr : &*found;
+}
+
+void wrong_usage(const Verb& verb, const Line& line)
+{
+    std::vector<const VerbForm*> forms;
+    for (const VerbForm& form : verb.forms)
+    {
+        const std::string kind = std::string(verb.name) + " " + (line.size() > 1 ? line.word(1) : "");
+        if (!verb.has_kinds || (std::string(form.form.written()) + " ").starts_with(kind + " "))
+            forms.push_back(&form);
+    }
+    throw LineError("write: " + usage_of(forms));
+}
+
+ReadForm read_form(const Verb& verb, const Line& line)
+{
+    std::optional<ReadForm> best;
+    for (const VerbForm& form : verb.forms)
+    {
+        if (auto words = form.form.match(line); words && (!best || words->own > best->words.own))
+            best = { &form, std::move(*words) };
+    }
+    if (!best)
+        wrong_usage(verb, line);
+    return std::move(*best);
+}
+
+Command find_command(const std::string& name)
+{
+    const Command command{ find_verb(name), find(operations(), name) };
+    if (command.verb == nullptr && command.operation == nullptr)
+        unknown_command(name);
+    return command;
+}
+
+void need_platform_function(const std::string& name)
+{
+    std::vector<std::string_view> names;
+    for (const auto& function : board::platform_functions())
+        names.push_back(function.name);
+    if (std::find(names.begin(), names.end(), name) == names.end())
+        throw LineError("the platform has no function " + name + did_you_mean(name, names));
+}
+
+std::int64_t number_in(const std::string& word, const std::string& what, std::int64_t lowest, std::int64_t highest)
+{
+    const std::int64_t number = read_number(board::names::Family::None, word, what);
+    if (number < lowest || number > highest)
+        throw LineError(what + " is " + std::to_string(lowest) + " to " + std::to_string(highest) + ", not " + word);
+    return number;
+}
+
+std::uint32_t named_number(const std::string& word, const std::string& what, board::names::Family family)
+{
+    const Kind kind{ .bits = 32, .family = family, .names = {}, .members = {} };
+    return static_cast<std::uint32_t>(read_value(kind, word, what).as_number());
+}
+
+std::chrono::microseconds read_time(const std::string& word)
+try
+{
+    return board::read_duration(word).value();
+}
+catch (const std::invalid_argument& error)
+{
+    throw LineError(error.what());
+}
+
+std::optional<std::pair<std::int32_t, std::int32_t>> read_size(std::string_view word)
+{
+    std::int32_t width = 0;
+    std::int32_t height = 0;
+    const char* const end = word.data() + word.size();
+    const auto first = std::from_chars(word.data(), end, width);
+    if (first.ec != std::errc() || first.ptr == end || *first.ptr != 'x')
+        return std::nullopt;
+    const auto second = std::from_chars(first.ptr + 1, end, height);
+    if (second.ec != std::errc() || second.ptr != end)
+        return std::nullopt;
+    return std::pair(width, height);
 }
 
 } // namespace pmxboard

@@ -13,7 +13,7 @@
 #include "board/threads.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
-#include "tools/pmxboard/verb_words.h"
+#include "tools/pmxboard/verbs.h"
 
 namespace pmxboard
 {
@@ -125,6 +125,27 @@ std::string carried_out(Session& session, const std::string& command, std::ostre
     }
 }
 
+void what_if(Session& session, const Words& words)
+{
+    const std::string command = words.from("COMMAND");
+    if (words.at("COMMAND") == "expect")
+        throw LineError("what-if takes a command; an expectation looks at what a command did");
+    if (const auto waiting = board::threads::waiting(); !waiting.empty())
+        throw StepFailed("what-if copies the process, and a thread that waits cannot be copied: " + waiting.front());
+    session.output().flush();
+    const Apart apart = run_apart([&](std::ostream& shown) { return carried_out(session, command, shown); });
+    const std::string message = apart.answer.empty() ? std::string() : apart.answer.substr(1);
+    const bool well = apart.death.empty() && !apart.answer.empty();
+    if (well && apart.answer.front() == wrong_line)
+        throw LineError(message);
+    const bool would_be_done = well && apart.answer.front() == done;
+    session.output().imagined(command, apart.shown, would_be_done ? message : "null");
+    if (!well)
+        session.output().remark("  would end the program: " + apart.death);
+    else if (apart.answer.front() == failed)
+        session.output().remark("  would fail: " + message);
+}
+
 } // namespace
 
 Apart run_apart(const std::function<std::string(std::ostream& shown)>& function)
@@ -145,27 +166,14 @@ Apart run_apart(const std::function<std::string(std::ostream& shown)>& function)
     return { shown.content(), answer.content(), death_of(status) };
 }
 
-void run_what_if(Session& session, const Line& line)
+std::vector<Verb> what_if_verbs()
 {
-    if (line.size() < 2)
-        wrong_usage(line);
-    if (line.word(1) == "expect")
-        throw LineError("what-if takes a command; an expectation looks at what a command did");
-    if (const auto waiting = board::threads::waiting(); !waiting.empty())
-        throw StepFailed("what-if copies the process, and a thread that waits cannot be copied: " + waiting.front());
-    session.output().flush();
-    const std::string command = line.from(1);
-    const Apart apart = run_apart([&](std::ostream& shown) { return carried_out(session, command, shown); });
-    const std::string message = apart.answer.empty() ? std::string() : apart.answer.substr(1);
-    const bool well = apart.death.empty() && !apart.answer.empty();
-    if (well && apart.answer.front() == wrong_line)
-        throw LineError(message);
-    const bool would_be_done = well && apart.answer.front() == done;
-    session.output().imagined(command, apart.shown, would_be_done ? message : "null");
-    if (!well)
-        session.output().remark("  would end the program: " + apart.death);
-    else if (apart.answer.front() == failed)
-        session.output().remark("  would fail: " + message);
+    return {
+        { "what-if",
+          { { "what-if COMMAND", "show the calls and the result that a command would have, and change nothing",
+              what_if } },
+          true },
+    };
 }
 
 } // namespace pmxboard

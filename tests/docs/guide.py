@@ -1,0 +1,37 @@
+#!/usr/bin/env python3
+"""Holds the tables of the guide to scenarios against those that the tool writes from its own verbs.
+
+usage: guide.py [--renew] TOOL GUIDE
+"""
+
+import pathlib
+import re
+import subprocess
+import sys
+
+TABLE = re.compile(r"^\| (?:Command|Expectation) \|.*\n(?:\|.*\n)+", re.M)
+
+
+def main():
+    *renew, tool, path = sys.argv[1:]
+    guide = pathlib.Path(path)
+    text = guide.read_text(encoding="utf-8")
+    written = TABLE.findall(subprocess.run([tool, "guide"], capture_output=True, text=True, check=True).stdout)
+    told = TABLE.findall(text)
+    if len(written) != 2 or len(told) != 2:
+        sys.exit(f"{path}: {len(told)} tables, and the tool writes {len(written)}; there are two")
+    if renew:
+        guide.write_text(TABLE.sub(lambda _: written.pop(0), text), encoding="utf-8")
+        return 0
+    stale = [row for one, other in zip(told, written) for row in set(one.splitlines()) ^ set(other.splitlines())]
+    for row in sorted(stale):
+        print(f"{path}: {row}")
+    if told != written:
+        print("the guide does not tell of the verbs as they are: cmake --build --preset debug --target renew_guide")
+    else:
+        print(f"{path}: {sum(table.count(chr(10)) - 2 for table in told)} forms are told")
+    return 0 if told == written else 1
+
+
+if __name__ == "__main__":
+    sys.exit(main())

@@ -28,10 +28,8 @@ std::vector<Json> traced(const std::vector<std::string>& scenarios, const pmxboa
         for (const std::string& lines : scenarios)
         {
             std::istringstream in(lines);
-            pmxboard::run_scenario(
-                in, { name, "default", "" },
-                { .trace = pmxboard::TraceForm::Chrome, .to = &shown, .chrome = &chrome, .filter = filter },
-                diagnostics);
+            pmxboard::run_scenario(in, { name, "default", "" }, { .trace = &chrome, .to = &shown, .filter = filter },
+                                   diagnostics);
         }
     }
     const Json whole = Json::parse(trace.str());
@@ -192,7 +190,7 @@ TEST(ChromeTrace, OperationsHoldTheirCalls)
     EXPECT_EQ((Json{ { "command", "PMX_SetTvType 0 PMX_TV_TYPE_PAL" }, { "result", 1 } }), operations[1].arguments);
     EXPECT_EQ((Json{ { "command", "PMX_GetTvType 0" },
                      { "result", 1 },
-                     { "*pucTvType", { { "value", 3 }, { "name", "PMX_TV_TYPE_PAL" } } } }),
+                     { "outputs", { { "pucTvType", { { "value", 3 }, { "name", "PMX_TV_TYPE_PAL" } } } } } }),
               operations[2].arguments);
     const auto calls = spans(events, "platform calls");
     EXPECT_EQ("PMX_HalSetTvType", calls.back().name);

@@ -156,7 +156,7 @@ TEST(DiffVerb, AsJson)
               shown_by_last("poke ucHue 7\ndiff --json"));
     EXPECT_EQ("{\"kind\":\"diff\",\"command\":\"poke ucMode 2\",\"changes\":[{\"path\":\"record.ucMode\","
               "\"old\":{\"value\":0,\"name\":\"RES_480I\"},\"new\":{\"value\":2,\"name\":\"RES_480P\"}}]}\n",
-              run("poke ucMode 2\ndiff", { .trace = pmxboard::TraceForm::Json }).shown);
+              tool_test::run_traced("poke ucMode 2\ndiff", "jsonl").shown);
 }
 
 TEST(DiffVerb, IsFoundInAScenarioThatUsesItLate)

@@ -8,12 +8,13 @@
 
 #include "scenario_run.h"
 #include "tools/pmxboard/output.h"
+#include "tools/pmxboard/state_paths.h"
 
 namespace
 {
 
-using pmxboard::TraceForm;
 using tool_test::run;
+using tool_test::run_traced;
 using Json = nlohmann::json;
 
 std::vector<Json> parsed_lines(const std::string& text)
@@ -114,7 +115,7 @@ TEST(Output, Colour_EndsWithEachLine)
 
 TEST(Output, TraceOff_LeavesTheConsole)
 {
-    const std::string shown = run("PMX_Init", { .trace = TraceForm::Off }).shown;
+    const std::string shown = run_traced("PMX_Init", "off").shown;
     EXPECT_NE(std::string::npos, shown.find("  | PMX_Init\n"));
     EXPECT_EQ(std::string::npos, shown.find("x_sema_create"));
 }
@@ -129,8 +130,7 @@ TEST(Output, TextTraceApart_HoldsLogLinesToo)
 
 TEST(Output, Json_OneObjectALine)
 {
-    const auto outcome =
-        run("PMX_Init\nexpect asserts 0\nPMX_SetTvType 0 PMX_TV_TYPE_PAL", { .trace = TraceForm::Json });
+    const auto outcome = run_traced("PMX_Init\nexpect asserts 0\nPMX_SetTvType 0 PMX_TV_TYPE_PAL", "jsonl");
     ASSERT_TRUE(outcome.done) << outcome.diagnostics;
     const auto lines = parsed_lines(outcome.shown);
     ASSERT_GT(lines.size(), 30u);
@@ -156,7 +156,7 @@ TEST(Output, Json_OneObjectALine)
 
 TEST(Output, Json_StateIsALineToo)
 {
-    const auto lines = parsed_lines(run("state _fgBootUp ucHue\nstate --json", { .trace = TraceForm::Json }).shown);
+    const auto lines = parsed_lines(run_traced("state _fgBootUp ucHue\nstate --json", "jsonl").shown);
     ASSERT_EQ(3u, lines.size());
     EXPECT_EQ((Json{ { "kind", "state" }, { "version", 1 }, { "path", "_fgBootUp" }, { "value", 1 } }), lines[0]);
     EXPECT_EQ("ucHue", lines[1].at("path"));
@@ -167,10 +167,10 @@ TEST(Output, Json_StateIsALineToo)
 
 TEST(Output, Json_ToItsOwnPlace)
 {
-    const auto outcome = run("PMX_SetTvType 0 3", { .quiet = true, .trace = TraceForm::Json }, true);
+    const auto outcome = run_traced("PMX_SetTvType 0 3", "jsonl", true, { .quiet = true });
     EXPECT_EQ("", outcome.shown);
     ASSERT_EQ(1u, parsed_lines(outcome.trace).size());
-    EXPECT_EQ("> PMX_SetTvType 0 3\n  = 1\n", run("PMX_SetTvType 0 3", { .trace = TraceForm::Json }, true).shown);
+    EXPECT_EQ("> PMX_SetTvType 0 3\n  = 1\n", run_traced("PMX_SetTvType 0 3", "jsonl", true).shown);
 }
 
 TEST(Output, WhatRunsInsideACall_StandsBehindIt)
@@ -209,9 +209,9 @@ TEST(Output, Tree_BreaksWhatDoesNotFit)
     all.add("list", board::Value::list({ board::Value::number(1), board::Value::number(2) }));
     all.add("wide", board::Value::list({ wide }));
     const std::string text = "\"" + std::string(30, 'x') + "\"\n";
-    EXPECT_EQ("number = 1\nempty = []\nlist = [1, 2]\nwide\n  [0]\n    first = " + text + "    second = " + text +
-                  "    third = " + text,
-              pmxboard::tree(all));
+    EXPECT_EQ("  number = 1\n  empty = []\n  list = [1, 2]\n  wide\n    [0]\n      first = " + text +
+                  "      second = " + text + "      third = " + text,
+              pmxboard::to_text(pmxboard::NamedValues{ { "", all } }));
 }
 
 } // namespace

@@ -25,7 +25,8 @@ struct Run
 };
 
 /** The scenario is called here.pmx, stands in the project's root and runs on the default board. */
-inline Run run(const std::string& lines, pmxboard::OutputOptions options = {}, bool trace_apart = false)
+inline Run run(const std::string& lines, pmxboard::OutputOptions options = {}, bool trace_apart = false,
+               std::string_view form = "text")
 {
     std::istringstream in(lines);
     std::ostringstream shown;
@@ -33,9 +34,20 @@ inline Run run(const std::string& lines, pmxboard::OutputOptions options = {}, b
     std::ostringstream diagnostics;
     options.to = &shown;
     options.trace_to = trace_apart ? &trace : nullptr;
+    const auto sink =
+        pmxboard::trace_form(form).make({ options.verbose, options.colour, trace_apart }, trace_apart ? trace : shown);
+    if (options.trace == nullptr)
+        options.trace = sink.get();
     const pmxboard::Scenario scenario{ "here.pmx", "default", "pmxboard run here.pmx" };
     const bool done = pmxboard::run_scenario(in, scenario, options, diagnostics);
     return { done, shown.str(), trace.str(), diagnostics.str() };
+}
+
+/** With the trace in another form. */
+inline Run run_traced(const std::string& lines, std::string_view form, bool trace_apart = false,
+                      pmxboard::OutputOptions options = {})
+{
+    return run(lines, std::move(options), trace_apart, form);
 }
 
 /** What the diagnostics say of a scenario; empty when all went well. */

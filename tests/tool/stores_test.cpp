@@ -202,7 +202,7 @@ TEST(Stores, Filters_CutThemDown)
 
 TEST(Stores, InJsonLines)
 {
-    const std::string shown = run("PMX_SetTvType 0 3", { .trace = pmxboard::TraceForm::Json, .stores = true }).shown;
+    const std::string shown = tool_test::run_traced("PMX_SetTvType 0 3", "jsonl", false, { .stores = true }).shown;
     const auto store = nlohmann::json::parse(shown.substr(0, shown.find('\n')));
     EXPECT_EQ(nlohmann::json::parse(R"({"sequence":1,"time_us":0,"kind":"store","operation":"PMX_SetTvType","depth":0,
         "field":"ucTvType","from":{"value":0,"name":"PMX_TV_TYPE_NTSC"},"to":{"value":3,"name":"PMX_TV_TYPE_PAL"},

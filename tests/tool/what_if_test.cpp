@@ -145,8 +145,7 @@ TEST(WhatIfLine, MisuseAndAssertion_AreShownAndNotCounted)
 
 TEST(WhatIfLine, InJsonLines_IsOneObject_ApartFromTheCalls)
 {
-    const std::string shown =
-        run("what-if PMX_SetTvType 0 3\nPMX_SetTvType 0 0", { .trace = pmxboard::TraceForm::Json }).shown;
+    const std::string shown = tool_test::run_traced("what-if PMX_SetTvType 0 3\nPMX_SetTvType 0 0", "jsonl").shown;
     std::istringstream lines(shown);
     std::string what_if;
     std::string call;

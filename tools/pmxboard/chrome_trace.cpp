@@ -94,15 +94,9 @@ void ChromeTrace::operation_ends(const Outcome& outcome)
     if (!m_operation_told)
         return;
     release();
-    std::string json = outcome.result ? "\"result\":" + outcome.result->to_json() : std::string();
-    for (const OutputValue& output : outcome.outputs)
-    {
-        json += (json.empty() ? "" : ",") + text("*" + output.name) + ":" +
-                (output.value ? output.value->to_json() : text("untouched"));
-    }
     show(states_now());
     advance_to(static_cast<std::uint64_t>(board::now().count()));
-    end_operation("{" + json + "}");
+    end_operation(to_json(outcome));
 }
 
 void ChromeTrace::settle()
@@ -114,13 +108,14 @@ void ChromeTrace::settle()
     end_operation("{}");
 }
 
-void ChromeTrace::entry(const TraceEntry& entry, bool shown)
+std::string ChromeTrace::entry(const TraceEntry& entry, bool shown)
 {
     if (m_process == 0)
         powered_on();
     m_waiting.push_back({ entry, static_cast<std::uint64_t>(board::now().count()), shown, states_now() });
     if (entry.depth == 0)
         release();
+    return {};
 }
 
 /** What waits, which came in the order of ending, is written in the order of beginning. */

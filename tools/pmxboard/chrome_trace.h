@@ -15,30 +15,26 @@
 #include <vector>
 
 #include "board/trace.h"
-#include "tools/pmxboard/operation.h"
+#include "tools/pmxboard/trace_sink.h"
 
 namespace pmxboard
 {
 
-class ChromeTrace
+class ChromeTrace : public TraceSink
 {
 public:
     explicit ChromeTrace(std::ostream& to);
     /** The trace ends; what is still open is closed. */
-    ~ChromeTrace();
-    ChromeTrace(const ChromeTrace&) = delete;
-    ChromeTrace& operator=(const ChromeTrace&) = delete;
+    ~ChromeTrace() override;
 
-    /** What the processes from here on are called. */
-    void scenario(const std::string& name);
-    void powered_on();
-    void command(std::string_view line) { m_command = line; }
-    void operation_begins(const std::string& name);
-    void operation_ends(const Outcome& outcome);
-    /** The command is done: everything that it began is closed. */
-    void settle();
-    /** `shown`: or else it only tells what it changed. */
-    void entry(const board::TraceEntry& entry, bool shown);
+    void scenario(const std::string& name) override;
+    void powered_on() override;
+    void command(std::string_view line) override { m_command = line; }
+    void operation_begins(const std::string& name) override;
+    void operation_ends(const Outcome& outcome) override;
+    void settle() override;
+    /** Written when what it is nested in is. One that is not shown only tells what it changed. */
+    std::string entry(const board::TraceEntry& entry, bool shown) override;
 
 private:
     /** What the lanes of states show: lane to the name of what holds there. */

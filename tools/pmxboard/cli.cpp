@@ -16,6 +16,8 @@
 #include "tools/pmxboard/run_command.h"
 #include "tools/pmxboard/shell_command.h"
 #include "tools/pmxboard/state_command.h"
+#include "tools/pmxboard/text/layout.h"
+#include "tools/pmxboard/trace_sink.h"
 
 namespace pmxboard
 {
@@ -45,7 +47,7 @@ std::string folded_help(const CLI::App* app, const std::string& name, CLI::AppFo
     for (std::string line; std::getline(lines, line);)
     {
         in_examples = in_examples || line.starts_with("Examples:");
-        text += in_examples || line.empty() ? line + "\n" : wrapped(line, 80, 0, description_column);
+        text += in_examples || line.empty() ? line + "\n" : wrapped(line, usual_width, 0, description_column);
     }
     return text;
 }
@@ -60,11 +62,18 @@ void add_run(CLI::App& app, Chosen& chosen)
     sub->add_option("FILE", run->files, "Scenarios; - reads the standard input")->required();
     sub->add_option("--board", run->board, "Board to power on: a name under boards/, a directory or a .toml file")
         ->type_name("NAME|FILE");
+    std::vector<std::string> forms;
+    std::string listed;
+    for (const TraceForm& form : trace_forms())
+    {
+        forms.emplace_back(form.name);
+        listed.append(listed.empty() ? "" : "|").append(form.name);
+    }
     sub->add_option("--trace-format", run->trace_format,
                     "How to show platform calls: text, jsonl (one JSON object a line), chrome (for chrome://tracing "
                     "and Perfetto's viewer) or off")
-        ->check(CLI::IsMember({ "text", "jsonl", "chrome", "off" }).description(""))
-        ->type_name("text|jsonl|chrome|off");
+        ->check(CLI::IsMember(forms).description(""))
+        ->type_name(listed);
     sub->add_option("--trace-file", run->trace_file, "Write the trace there instead of among the rest")
         ->type_name("FILE");
     sub->add_flag("--stores", run->stores, "Show what is stored into the layer's record between two calls");

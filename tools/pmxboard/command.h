@@ -1,9 +1,8 @@
 /** @file
- *  What the sub-commands share: how they end, and what they may use of the terminal. */
+ *  What the sub-commands share: how they end. */
 #pragma once
 
 #include <string>
-#include <string_view>
 
 namespace pmxboard
 {
@@ -18,9 +17,5 @@ enum ExitCode
 
 /** Say what cannot be meant on the diagnostic stream; the exit code. */
 int usage_error(const std::string& message);
-
-/** Whether the standard output gets colour. `when` is what --color says: "always", "never", or "auto", which is on a
- *  terminal that can and whose user has not refused it by NO_COLOR. */
-bool wants_colour(std::string_view when = "auto");
 
 } // namespace pmxboard

@@ -3,8 +3,8 @@
 #include <algorithm>
 #include <string_view>
 
-#include "tools/pmxboard/output.h"
 #include "tools/pmxboard/state_paths.h"
+#include "tools/pmxboard/text/layout.h"
 
 namespace pmxboard
 {
@@ -12,8 +12,6 @@ namespace
 {
 
 using board::Value;
-
-constexpr std::size_t columns = 80;
 
 /** The groups of the state that are the layer's own. */
 constexpr std::string_view layer_groups[] = { "record", "status", "module" };
@@ -134,9 +132,9 @@ std::string to_text(const std::vector<Change>& all)
         const std::string older = text_of(change.older);
         const std::string newer = text_of(change.newer);
         const std::size_t values = older.size() + 3 + newer.size(); // the arrow is one column on the screen
-        if (2 + change.path.size() + 2 + values <= columns)
+        if (2 + change.path.size() + 2 + values <= usual_width)
             text += "  " + change.path + "  " + older + " → " + newer + "\n";
-        else if (6 + values <= columns)
+        else if (6 + values <= usual_width)
             text += "  " + change.path + "\n      " + older + " → " + newer + "\n";
         else
             text += "  " + change.path + "\n      " + folded(std::string(6, ' ') + older, 8).substr(6) + "\n    → " +

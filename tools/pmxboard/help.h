@@ -7,6 +7,8 @@
 #include <vector>
 
 #include "tools/pmxboard/operation.h"
+#include "tools/pmxboard/text/layout.h"
+#include "tools/pmxboard/text/paint.h"
 
 namespace pmxboard
 {
@@ -19,16 +21,6 @@ struct Look
 
     std::string bold(std::string_view text) const;
 };
-
-/** Columns for texts: those of the terminal, 100 at most, and 80 where there is none. */
-unsigned text_width();
-/** Columns that a text takes. */
-std::size_t columns_of(std::string_view text);
-/** The text in lines of this width, the first indented by `indent`, the others by `hanging`. A word that is longer
- *  stands alone. Runs of blanks within a line stay. */
-std::string wrapped(std::string_view text, unsigned width, unsigned indent, unsigned hanging);
-/** Words in columns, downwards, as a directory is listed. */
-std::string in_columns(const std::vector<std::string>& words, unsigned width);
 
 /** How an operation is called, its contract and an example. */
 std::string operation_text(const Operation& operation, const Look& look);

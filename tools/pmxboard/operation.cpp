@@ -56,6 +56,19 @@ std::string usage(const Operation& operation)
     return text;
 }
 
+std::string to_json(const Outcome& outcome)
+{
+    const std::string result = outcome.result ? "\"result\":" + outcome.result->to_json() : std::string();
+    std::string outputs;
+    for (const OutputValue& output : outcome.outputs)
+    {
+        outputs += (outputs.empty() ? "" : ",") + Value::text(output.name).to_json() + ":" +
+                   (output.value ? output.value->to_json() : "\"untouched\"");
+    }
+    return "{" + result + (result.empty() || outputs.empty() ? "" : ",") +
+           (outputs.empty() ? "" : "\"outputs\":{" + outputs + "}") + "}";
+}
+
 const Operation* find(const std::vector<Operation>& table, std::string_view name)
 {
     for (const Operation& operation : table)

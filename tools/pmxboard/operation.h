@@ -45,6 +45,9 @@ struct Outcome
     std::vector<OutputValue> outputs;   ///< of the pointers that were not null
 };
 
+/** One JSON object: result, and outputs by name. */
+std::string to_json(const Outcome& outcome);
+
 struct Parameter
 {
     std::string name;
@@ -102,6 +105,9 @@ std::vector<std::string_view> names_of(const std::vector<Operation>& table);
 const std::vector<Operation>& operations();
 /** Functions of the platform that a neighbouring driver would call, numbers in and nothing out. */
 const std::vector<Operation>& neighbours();
+
+/** Functions of the table that the mixer registers; the tag stands first. */
+const std::vector<Operation>& ipmx_slots();
 
 /** What an output holds before the call; a function that leaves it so has not written it. */
 constexpr unsigned char untouched_byte = 0xA5;

@@ -1,30 +1,28 @@
 #include "tools/pmxboard/output.h"
 
 #include <cstdio>
-#include <ostream>
+#include <iostream>
 
 namespace pmxboard
 {
-namespace
+Output::Output(const OutputOptions& options) : m_options(options), m_paint{ options.colour }, m_trace(options.trace)
 {
-
-constexpr std::size_t columns = 80;
-
-constexpr std::string_view bold = "1";
-constexpr std::string_view green = "32";
-constexpr std::string_view yellow = "33";
-constexpr std::string_view grey = "90";
-
-} // namespace
-
-Output::Output(const OutputOptions& options) : m_options(options)
-{
+    if (m_trace == nullptr)
+        show_trace_as("text");
 }
 
+/** A trace of one's own. */
+void Output::show_trace_as(std::string_view form)
+{
+    const TraceOptions how{ m_options.verbose, m_options.colour, m_options.trace_to != nullptr };
+    m_own_trace = trace_form(form).make(how, m_options.to != nullptr ? *m_options.to : std::cout);
+    m_trace = m_own_trace.get();
+}
+
+/** Whether programs read what people otherwise do. */
 bool Output::is_machine_read() const
 {
-    return (m_options.trace == TraceForm::Json || m_options.trace == TraceForm::Chrome) &&
-           m_options.trace_to == nullptr;
+    return m_trace->is_for_programs() && m_options.trace_to == nullptr;
 }
 
 std::ostream* Output::people() const
@@ -32,67 +30,40 @@ std::ostream* Output::people() const
     return m_options.quiet || is_machine_read() ? nullptr : m_options.to;
 }
 
-std::string Output::painted(std::string_view text, std::string_view code) const
-{
-    if (!m_options.colour)
-        return std::string(text);
-    // Each line by itself: a pager may show the second one without the first.
-    const std::string begin = "\x1b[" + std::string(code) + "m";
-    const std::string end = "\x1b[0m";
-    std::string lines = begin;
-    for (const char c : text)
-        lines += c == '\n' ? end + "\n" + begin : std::string(1, c);
-    return lines + end;
-}
-
 void Output::imagine(std::ostream& to)
 {
-    m_options.trace = for_programs() ? TraceForm::Json : TraceForm::Text;
+    const bool as_lines = for_programs();
     m_options.to = &to;
     m_options.trace_to = nullptr;
-    m_options.chrome = nullptr;
+    show_trace_as(as_lines ? "jsonl" : "text");
     m_trace_shown = true;
-}
-
-void Output::powered_on()
-{
-    if (m_options.chrome != nullptr)
-        m_options.chrome->powered_on();
-}
-
-void Output::operation_begins(const std::string& name)
-{
-    if (m_options.chrome != nullptr)
-        m_options.chrome->operation_begins(name);
 }
 
 void Output::command(std::string_view line)
 {
-    if (m_options.chrome != nullptr)
-        m_options.chrome->command(line);
+    m_trace->command(line);
     if (people() != nullptr && m_options.echo)
-        *people() << painted("> " + std::string(line), bold) << '\n';
+        *people() << m_paint("> " + std::string(line), Colour::Bold) << '\n';
 }
 
 void Output::expectation(std::string_view line)
 {
     if (people() != nullptr && m_options.verbose)
-        *people() << painted("> " + std::string(line), grey) << '\n';
+        *people() << m_paint("> " + std::string(line), Colour::Grey) << '\n';
 }
 
 void Output::outcome(const Outcome& outcome)
 {
-    if (m_options.chrome != nullptr)
-        m_options.chrome->operation_ends(outcome);
+    m_trace->operation_ends(outcome);
     flush();
     if (people() == nullptr)
         return;
     if (outcome.result)
-        *people() << painted("  = " + outcome.result->to_text(), green) << '\n';
+        *people() << m_paint("  = " + outcome.result->to_text(), Colour::Green) << '\n';
     for (const OutputValue& output : outcome.outputs)
     {
         const std::string value = output.value ? " = " + output.value->to_text() : " untouched";
-        *people() << painted("  *" + output.name + value, green) << '\n';
+        *people() << m_paint("  *" + output.name + value, Colour::Green) << '\n';
     }
 }
 
@@ -107,7 +78,7 @@ void Output::remark(std::string_view text)
 {
     flush();
     if (people() != nullptr)
-        *people() << painted(text, yellow) << '\n';
+        *people() << m_paint(text, Colour::Yellow) << '\n';
 }
 
 void Output::shown(const std::string& json_line, std::string_view text)
@@ -134,40 +105,14 @@ void Output::imagined(std::string_view line, const std::string& written, const s
           {});
 }
 
-std::string Output::render(const board::TraceEntry& entry) const
-{
-    if (m_options.trace == TraceForm::Json)
-        return entry.to_json() + "\n";
-    char time[32];
-    std::snprintf(time, sizeof time, "%9llu.%03u  ", static_cast<unsigned long long>(entry.time_us / 1000),
-                  static_cast<unsigned>(entry.time_us % 1000));
-    const std::string lead = time + std::string(2 * static_cast<std::size_t>(entry.depth), ' ');
-    const std::string line = lead + (m_options.verbose ? entry.named() : entry.brief());
-    const bool remarkable =
-        entry.faulted || entry.kind == board::TraceEntry::Kind::Notice || entry.kind == board::TraceEntry::Kind::Assert;
-    const std::string mark = entry.faulted ? "  (scripted)" : "";
-    if (m_options.trace_to != nullptr)
-        return line + mark + "\n";
-    const bool is_call = entry.kind == board::TraceEntry::Kind::Call;
-    return painted(is_call ? folded(line + mark, lead.size() + 4) : line + mark, remarkable ? yellow : grey) + "\n";
-}
-
 void Output::entry(const board::TraceEntry& entry)
 {
-    // Where people read the console, a line that it shows need not stand in the trace as well.
-    const bool on_console = entry.kind == board::TraceEntry::Kind::Log && entry.shown &&
-                            m_options.trace == TraceForm::Text && m_options.trace_to == nullptr;
-    const bool is_shown = m_trace_shown && m_options.filter.shows(entry);
-    const bool as_lines = m_options.trace == TraceForm::Text || m_options.trace == TraceForm::Json;
-    if (m_options.chrome != nullptr)
-        m_options.chrome->entry(entry, is_shown);
-    if (is_shown && as_lines && !on_console)
-    {
-        if (entry.depth == 0)
-            write_trace(render(entry));
-        else
-            m_nested.push_back({ false, render(entry) });
-    }
+    const bool is_read = m_options.trace_to != nullptr || m_trace->is_for_programs() || people() != nullptr;
+    std::string line = m_trace->entry(entry, is_read && m_trace_shown && m_options.filter.shows(entry));
+    if (entry.depth == 0)
+        write_trace(line);
+    else if (!line.empty())
+        m_nested.push_back({ false, std::move(line) });
     if (entry.depth == 0)
         release_nested();
 }
@@ -221,8 +166,7 @@ void Output::release_nested()
 
 void Output::flush()
 {
-    if (m_options.chrome != nullptr)
-        m_options.chrome->settle();
+    m_trace->settle();
     release_nested();
     // A blank that the next console line begins with is no line of its own.
     if (m_console_line.find_first_not_of(' ') != std::string::npos)
@@ -231,63 +175,6 @@ void Output::flush()
         m_options.to->flush();
     if (m_options.trace_to != nullptr)
         m_options.trace_to->flush();
-}
-
-std::string folded(const std::string& line, std::size_t indent)
-{
-    std::string lines;
-    std::size_t begin = 0;
-    std::size_t comma = 0; // behind the last one of this line
-    bool quoted = false;
-    for (std::size_t i = 0; i < line.size(); ++i)
-    {
-        if (line[i] == '"' && (i == 0 || line[i - 1] != '\\'))
-            quoted = !quoted;
-        const std::size_t column = i - begin + (begin == 0 ? 0 : indent);
-        if (column >= columns && comma > begin)
-        {
-            lines += line.substr(begin, comma - begin) + '\n' + std::string(indent, ' ');
-            begin = comma + 1;
-        }
-        if (!quoted && line[i] == ',')
-            comma = i + 1;
-    }
-    return lines + line.substr(begin);
-}
-
-std::string item_step(std::size_t index)
-{
-    return std::string("[").append(std::to_string(index)).append("]");
-}
-
-std::string to_json(const Outcome& outcome)
-{
-    const std::string result = outcome.result ? "\"result\":" + outcome.result->to_json() : std::string();
-    std::string outputs;
-    for (const OutputValue& output : outcome.outputs)
-    {
-        outputs += (outputs.empty() ? "" : ",") + board::Value::text(output.name).to_json() + ":" +
-                   (output.value ? output.value->to_json() : "\"untouched\"");
-    }
-    return "{" + result + (result.empty() || outputs.empty() ? "" : ",") +
-           (outputs.empty() ? "" : "\"outputs\":{" + outputs + "}") + "}";
-}
-
-std::string tree(const board::Value& value, std::size_t indent)
-{
-    std::string text;
-    const bool is_list = value.kind() == board::Value::Kind::List;
-    for (std::size_t i = 0; i < value.items().size(); ++i)
-    {
-        const board::Value& member = value.items()[i];
-        const std::string head = std::string(indent, ' ') + (is_list ? item_step(i) : value.keys()[i]);
-        const std::string line = head + " = " + member.to_text();
-        if (member.items().empty() || line.size() <= columns)
-            text += line + "\n";
-        else
-            text += head + "\n" + tree(member, indent + 2);
-    }
-    return text;
 }
 
 } // namespace pmxboard

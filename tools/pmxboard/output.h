@@ -5,37 +5,30 @@
 
 #include <cstdint>
 #include <iosfwd>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
 
 #include "board/trace.h"
 #include "board/value.h"
-#include "tools/pmxboard/chrome_trace.h"
 #include "tools/pmxboard/operation.h"
+#include "tools/pmxboard/text/paint.h"
 #include "tools/pmxboard/trace_filter.h"
+#include "tools/pmxboard/trace_sink.h"
 
 namespace pmxboard
 {
-
-enum class TraceForm
-{
-    Text,
-    Json, ///< one object a line
-    Chrome,
-    Off
-};
 
 struct OutputOptions
 {
     bool quiet = false;   ///< people see failures only
     bool verbose = false; ///< arguments by name; expectations too
     bool colour = false;
-    bool echo = true; ///< commands are shown before what they do; not where the user has just typed them
-    TraceForm trace = TraceForm::Text;
-    std::ostream* to = nullptr;       ///< where people read
+    bool echo = true;           ///< commands are shown before what they do; not where the user has just typed them
+    TraceSink* trace = nullptr; ///< null pointer: for people, as text
+    std::ostream* to = nullptr; ///< where people read
     std::ostream* trace_to = nullptr; ///< where the trace goes when that is somewhere else
-    ChromeTrace* chrome = nullptr;    ///< for TraceForm::Chrome
     TraceFilter filter = {};
     bool stores = false; ///< what is stored into the layer's objects stands in the trace
 };
@@ -53,10 +46,10 @@ public:
     /** Whether stores are shown whatever the scenario says. */
     bool shows_stores() const { return m_options.stores; }
     /** Whether a program reads the standard output, as JSON lines. */
-    bool for_programs() const { return is_machine_read() && m_options.trace == TraceForm::Json; }
+    bool for_programs() const { return is_machine_read() && m_trace->has_lines(); }
 
-    void powered_on();
-    void operation_begins(const std::string& name);
+    void powered_on() { m_trace->powered_on(); }
+    void operation_begins(const std::string& name) { m_trace->operation_begins(name); }
     void command(std::string_view line);
     void expectation(std::string_view line);
     void outcome(const Outcome& outcome);
@@ -82,31 +75,20 @@ private:
         std::string text;
     };
 
+    void show_trace_as(std::string_view form);
     bool is_machine_read() const;
     std::ostream* people() const;
-    std::string render(const board::TraceEntry& entry) const;
     void write_trace(const std::string& line);
     void write_console(std::string_view text);
     void release_nested();
-    std::string painted(std::string_view text, std::string_view code) const;
 
     OutputOptions m_options;
+    Paint m_paint;
+    TraceSink* m_trace;
+    std::unique_ptr<TraceSink> m_own_trace;
     bool m_trace_shown = true;
     std::string m_console_line;
     std::vector<Nested> m_nested;
 };
-
-/** A call's or a value's line broken behind commas where it is too long for the screen; texts stay whole. What follows
- *  is indented. */
-std::string folded(const std::string& line, std::size_t indent);
-
-/** How a path names an item of a list: "[3]". */
-std::string item_step(std::size_t index);
-
-/** An outcome as one JSON object: result, and outputs by name. */
-std::string to_json(const Outcome& outcome);
-
-/** A value as an indented tree, members that fit into a line on one. */
-std::string tree(const board::Value& value, std::size_t indent = 0);
 
 } // namespace pmxboard

@@ -3,11 +3,11 @@
 #include <filesystem>
 #include <fstream>
 #include <iostream>
-#include <optional>
 
 #include "board/board.h"
 #include "tools/pmxboard/command.h"
 #include "tools/pmxboard/runner.h"
+#include "tools/pmxboard/text/paint.h"
 
 namespace pmxboard
 {
@@ -29,14 +29,6 @@ std::string shell_word(const std::string& word)
 std::string repeat_command(const RunOptions& run, const std::string& file)
 {
     return "pmxboard run " + (run.board.empty() ? "" : "--board " + shell_word(run.board) + " ") + shell_word(file);
-}
-
-TraceForm trace_form(const std::string& name)
-{
-    return name == "jsonl"    ? TraceForm::Json
-           : name == "chrome" ? TraceForm::Chrome
-           : name == "off"    ? TraceForm::Off
-                              : TraceForm::Text;
 }
 
 /** What is wrong with the command line; empty when nothing is. */
@@ -85,7 +77,6 @@ int run_files(const RunOptions& run)
     output.quiet = run.quiet;
     output.verbose = run.verbose;
     output.colour = wants_colour(run.colour);
-    output.trace = trace_form(run.trace_format);
     output.to = &std::cout;
     output.filter = { run.only, run.operations };
     output.stores = run.stores;
@@ -99,13 +90,11 @@ int run_files(const RunOptions& run)
             return usage_error("cannot write " + run.trace_file);
         output.trace_to = &trace_file;
     }
-    int code = exit_done;
-    {
-        std::optional<ChromeTrace> chrome;
-        if (output.trace == TraceForm::Chrome)
-            output.chrome = &chrome.emplace(run.trace_file.empty() ? std::cout : trace_file);
-        code = run_each(run, output);
-    }
+    const TraceOptions how{ run.verbose, output.colour, !run.trace_file.empty() };
+    auto trace = trace_form(run.trace_format).make(how, run.trace_file.empty() ? std::cout : trace_file);
+    output.trace = trace.get();
+    const int code = run_each(run, output);
+    trace.reset(); // what it still has to write
     if (!run.trace_file.empty() && !trace_file.flush())
         return usage_error("cannot write " + run.trace_file);
     if (!std::cout.flush())

@@ -72,8 +72,8 @@ bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOpt
     Session session(output, scenario.board, directory_of(scenario.name));
     session.watch_changes(scenario.name == "-" || asks_for_changes(lines));
     const std::string file = scenario.name == "-" ? "<stdin>" : scenario.name;
-    if (options.chrome != nullptr)
-        options.chrome->scenario(file);
+    if (options.trace != nullptr)
+        options.trace->scenario(file);
     unsigned number = 0;
     const auto location = [&] { return file + ":" + std::to_string(number) + ": "; };
     try

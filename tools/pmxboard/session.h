@@ -117,9 +117,6 @@ private:
 /** `expect …`. Throws StepFailed when it is not met. */
 void check_expectation(Session& session, const Line& line);
 
-/** Functions of that table, for checking them against the header. The tag stands first. */
-const std::vector<Operation>& ipmx_slots();
-
 /** What the board and the layer hold, all of it. */
 board::Value whole_state();
 /** A part of it. Throws LineError with the nearest paths. */

@@ -9,6 +9,7 @@
 #include "tools/pmxboard/state_dump.h"
 #include "tools/pmxboard/state_paths.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/text/paint.h"
 
 namespace pmxboard
 {
@@ -96,9 +97,8 @@ int compare(const StateOptions& options)
         std::cout << to_json(found) << '\n';
     else if (!options.quiet && !found.empty())
     {
-        const bool colour = wants_colour(options.colour);
-        std::cout << (colour ? "\x1b[1m" : "") << "--- " << options.file << "\n+++ " << other
-                  << (colour ? "\x1b[0m\n" : "\n") << to_text(found);
+        const Paint paint{ wants_colour(options.colour) };
+        std::cout << paint("--- " + options.file + "\n+++ " + other, Colour::Bold) << '\n' << to_text(found);
     }
     return found.empty() ? exit_done : exit_differs;
 }

@@ -3,8 +3,8 @@
 #include <string_view>
 
 #include "board/names.h"
-#include "tools/pmxboard/output.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/text/layout.h"
 
 namespace pmxboard
 {
@@ -29,7 +29,30 @@ void collect_paths(const Value& value, const std::string& path, std::vector<std:
     }
 }
 
+/** A value as an indented tree, members that fit into a line on one. */
+std::string tree(const board::Value& value, std::size_t indent)
+{
+    std::string text;
+    const bool is_list = value.kind() == board::Value::Kind::List;
+    for (std::size_t i = 0; i < value.items().size(); ++i)
+    {
+        const board::Value& member = value.items()[i];
+        const std::string head = std::string(indent, ' ') + (is_list ? item_step(i) : value.keys()[i]);
+        const std::string line = head + " = " + member.to_text();
+        if (member.items().empty() || line.size() <= usual_width)
+            text += line + "\n";
+        else
+            text += head + "\n" + tree(member, indent + 2);
+    }
+    return text;
+}
+
 } // namespace
+
+std::string item_step(std::size_t index)
+{
+    return std::string("[").append(std::to_string(index)).append("]");
+}
 
 std::string plain_path(std::string path)
 {

@@ -18,6 +18,9 @@ std::string plain_path(std::string path);
  *  paths. */
 board::Value part_of(const board::Value& state, const std::string& path);
 
+/** How a path names an item of a list: "[3]". */
+std::string item_step(std::size_t index);
+
 using NamedValues = std::vector<std::pair<std::string, board::Value>>;
 
 /** Values as people read them, each under its path when there are several; a path "" is the whole state. */

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <string_view>
 
-#include "tools/pmxboard/session.h"
+#include "tools/pmxboard/operation.h"
 #include "tools/pmxboard/step_error.h"
 
 namespace pmxboard

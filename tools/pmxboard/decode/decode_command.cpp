@@ -8,6 +8,7 @@
 #include "board/board.h"
 #include "tools/pmxboard/command.h"
 #include "tools/pmxboard/decode/show.h"
+#include "tools/pmxboard/text/paint.h"
 
 namespace pmxboard
 {

@@ -28,7 +28,7 @@ class Run
 {
 public:
     explicit Run(const std::string& board, const std::filesystem::path& directory)
-        : m_output(OutputOptions{ .quiet = true, .trace = TraceForm::Off }), m_session(m_output, board, directory)
+        : m_output(OutputOptions{ .quiet = true }), m_session(m_output, board, directory)
     {
         board::trace::set_sink([this](const board::TraceEntry& entry) {
             if (printed(entry))

@@ -1,0 +1,29 @@
+/** @file
+ *  Texts in the columns of a screen. */
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace pmxboard
+{
+
+/** Where there is no terminal. */
+inline constexpr unsigned usual_width = 80;
+
+/** Columns for texts: those of the terminal, 100 at most, and 80 where there is none. */
+unsigned text_width();
+/** Columns that a text takes. */
+std::size_t columns_of(std::string_view text);
+/** The text in lines of this width, the first indented by `indent`, the others by `hanging`. A word that is longer
+ *  stands alone. Runs of blanks within a line stay. */
+std::string wrapped(std::string_view text, unsigned width, unsigned indent, unsigned hanging);
+/** Words in columns, downwards, as a directory is listed. */
+std::string in_columns(const std::vector<std::string>& words, unsigned width);
+/** A call's or a value's line broken behind commas where it is too long for the screen; texts stay whole. What follows
+ *  is indented. */
+std::string folded(const std::string& line, std::size_t indent);
+
+} // namespace pmxboard

@@ -269,9 +269,9 @@ int unregister_pm_ops(const PM_OPERATIONS_T* prOps)
 /* drv_if.h */
 
 /** Publish an interface.
- *  @param     u2CompType  component type
+ *  @param     u2CompType  component type, a PMX_COMP_TYPE_ value
  *  @param     u2CompId    component id
- *  @param     u4IfId      interface id
+ *  @param     u4IfId      interface id, an IID_ value
  *  @param[in] pvIf        [symbol] the table; stays where it is until it is unregistered
  *  @param[in] pvTag       [tag] handed to every function of the table as its first argument
  *  @return 0 or above; negative on a failure
@@ -287,9 +287,9 @@ INT32 i4ImRegisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, 
 }
 
 /** Withdraw an interface.
- *  @param u2CompType  component type
+ *  @param u2CompType  component type, a PMX_COMP_TYPE_ value
  *  @param u2CompId    component id
- *  @param u4IfId      interface id
+ *  @param u4IfId      interface id, an IID_ value
  *  @return 0 or above; negative on a failure, for instance when it is not registered
  *  @context a thread that may sleep */
 INT32 i4ImUnregisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId)
@@ -303,9 +303,9 @@ INT32 i4ImUnregisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId
 /** Fetch an interface and hold it until it is released.
  *  The stack guarantees that a successful query yields a complete table, no function of it null; a failed one
  *  yields nothing that may be called.
- *  @param      u2CompType  component type
+ *  @param      u2CompType  component type, a PMX_COMP_TYPE_ value
  *  @param      u2CompId    component id
- *  @param      u4IfId      interface id
+ *  @param      u4IfId      interface id, an IID_ value
  *  @param[out] ppvIf       [symbol] receives the table
  *  @param[out] ppvTag      [tag] receives its tag
  *  @return 0 or above; negative on a failure
@@ -321,9 +321,9 @@ INT32 i4ImQueryInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void
 }
 
 /** Give a fetched interface back, once for each successful query.
- *  @param     u2CompType  component type
+ *  @param     u2CompType  component type, a PMX_COMP_TYPE_ value
  *  @param     u2CompId    component id
- *  @param     u4IfId      interface id
+ *  @param     u4IfId      interface id, an IID_ value
  *  @param[in] pvTag       [tag] the tag that the query yielded
  *  @return 0 or above; negative on a failure
  *  @context a thread that may sleep; the mixer holds MutexPMX */
@@ -370,7 +370,7 @@ void PMX_HalScalerReset(UCHAR ucPmxId)
 
 /** Select the TV type.
  *  @param ucPmxId   mixer id
- *  @param ucTvType  0 60 Hz systems, 3 50 Hz systems; any other value may come and must do no harm */
+ *  @param ucTvType  a PMX_TV_TYPE_ value: 0 60 Hz systems, 3 50 Hz systems; any other may come and must do no harm */
 void PMX_HalSetTvType(UCHAR ucPmxId, UCHAR ucTvType)
 {
     (void)ucPmxId;
@@ -441,7 +441,7 @@ INT32 PMX_HalGetPlaneOrder(UCHAR ucPmxId, UINT8* pu1PlnSel)
 
 /** Put a plane into the mix. Called in the timer's context too.
  *  @param ucPmxId  mixer id
- *  @param ucPlane  plane 0 to 7 */
+ *  @param ucPlane  plane 0 to 7, a DRV_PMX_PLANE_T value */
 void vPmxMixPlane(UCHAR ucPmxId, UCHAR ucPlane)
 {
     (void)ucPmxId;
@@ -450,7 +450,7 @@ void vPmxMixPlane(UCHAR ucPmxId, UCHAR ucPlane)
 
 /** Take a plane out of the mix.
  *  @param ucPmxId  mixer id
- *  @param ucPlane  plane 0 to 7 */
+ *  @param ucPlane  plane 0 to 7, a DRV_PMX_PLANE_T value */
 void vPmxNotMixPlane(UCHAR ucPmxId, UCHAR ucPlane)
 {
     (void)ucPmxId;
@@ -459,7 +459,7 @@ void vPmxNotMixPlane(UCHAR ucPmxId, UCHAR ucPlane)
 
 /** Ask whether a plane is in the mix.
  *  @param ucPmxId  mixer id
- *  @param ucPlane  plane 0 to 7
+ *  @param ucPlane  plane 0 to 7, a DRV_PMX_PLANE_T value
  *  @return TRUE or FALSE */
 BOOL fgPmxHalMixPlane(UCHAR ucPmxId, UCHAR ucPlane)
 {
@@ -766,9 +766,9 @@ void PMX_VsyncDisable(void)
 
 /** Set an encoder's format.
  *  @param u4Tve        TVE_1 or TVE_2
- *  @param ucMainFmt    the mixer's resolution mode
+ *  @param ucMainFmt    the mixer's mode, a PMX_RESOLUTION_MODE_T value
  *  @param ucVFreq      vertical frequency in Hz
- *  @param ucTargetFmt  the output's resolution mode; any other value may come and must do no harm
+ *  @param ucTargetFmt  the output's mode, a PMX_RESOLUTION_MODE_T value; any other may come and must do no harm
  *  @param fgEnable     the output is on
  *  @param fgHD         the mixer's format is an HD one
  *  @param fgOSD5       routing of the fifth OSD plane: 0, 1 or 2; any other value may come and must do no harm
@@ -797,8 +797,8 @@ void TVE_SetEnable(UINT32 u4Tve, BOOL fgEnable)
 
 /** Announce a per-output mode setting; called on every one, before the formats.
  *  @param fgFmtChange  the mixer's format changes
- *  @param ucCavFmt     component's resolution mode; any other value may come and must do no harm
- *  @param ucCvbsFmt    composite's resolution mode; any other value may come and must do no harm
+ *  @param ucCavFmt     component's mode, a PMX_RESOLUTION_MODE_T value; any other may come and must do no harm
+ *  @param ucCvbsFmt    composite's mode, a PMX_RESOLUTION_MODE_T value; any other may come and must do no harm
  *  @param fgHD         the mixer's format is an HD one
  *  @param fgOSD5       routing of the fifth OSD plane: 0, 1 or 2; any other value may come and must do no harm */
 void TVE_SetMuteCtrol(BOOL fgFmtChange, UCHAR ucCavFmt, UCHAR ucCvbsFmt, BOOL fgHD, UINT8 fgOSD5)
@@ -1002,7 +1002,7 @@ INT32 _i4OSD_SetPosOffset(INT32* pi4Offset)
 
 /** Show the fifth OSD plane on component and composite, or on neither.
  *  @param fgOn        1 show, 0 do not
- *  @param ucCvbsMode  composite's resolution mode; any other value may come and must do no harm
+ *  @param ucCvbsMode  composite's mode, a PMX_RESOLUTION_MODE_T value; any other may come and must do no harm
  *  @return the driver's result, which the mixer ignores */
 INT32 _i4Osd5Out(BOOL fgOn, UCHAR ucCvbsMode)
 {
@@ -1013,7 +1013,7 @@ INT32 _i4Osd5Out(BOOL fgOn, UCHAR ucCvbsMode)
 
 /** Show the fifth OSD plane on composite alone.
  *  @param fgOn        1 show
- *  @param ucCvbsMode  composite's resolution mode; any other value may come and must do no harm
+ *  @param ucCvbsMode  composite's mode, a PMX_RESOLUTION_MODE_T value; any other may come and must do no harm
  *  @return the driver's result, which the mixer ignores */
 INT32 _i4Osd5Out_CVBSOnly(BOOL fgOn, UCHAR ucCvbsMode)
 {

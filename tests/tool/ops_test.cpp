@@ -100,9 +100,9 @@ TEST(Ops, OneText_InFull)
 Store and program the TV type.
 
   ucPmxId   mixer id, 0 [0 to 255]
-  ucTvType  PMX_TV_TYPE_NTSC or PMX_TV_TYPE_PAL; any other goes into the record
-            and to the hardware unchanged [0 to 255, or a name:
-            PMX_TV_TYPE_NTSC, PMX_TV_TYPE_PAL]
+  ucTvType  a PMX_TV_TYPE_ value; any other goes into the record and to the
+            hardware unchanged [0 to 255, or a name: PMX_TV_TYPE_NTSC,
+            PMX_TV_TYPE_PAL]
 
 Returns  PMX_SET_OK; 0 for a mixer id other than 0
 Called   from any thread that may sleep; takes no lock

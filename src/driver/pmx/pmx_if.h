@@ -34,7 +34,7 @@ extern "C" void* memset(void* pvDest, int iValue, size_t zSize);
 /* State of one input port. */
 typedef struct
 {
-    UINT16 u2CompType; /* whoever feeds the port */
+    UINT16 u2CompType; /* whoever feeds the port, a PMX_COMP_TYPE_ value */
     UINT16 u2CompId;
     BOOL fgConnected;
     BOOL fgEnabled; /* its source says that it delivers pictures */
@@ -49,14 +49,14 @@ typedef struct
 typedef struct
 {
     UCHAR ucEnable;     /* master enable, as given */
-    UCHAR ucMode;       /* PMX_RESOLUTION_MODE_T */
-    UCHAR ucTvType;     /* PMX_TV_TYPE_NTSC or PMX_TV_TYPE_PAL, others as given */
+    UCHAR ucMode;       /* a PMX_RESOLUTION_MODE_T value */
+    UCHAR ucTvType;     /* a PMX_TV_TYPE_ value, others as given */
     UCHAR ucVfreq;      /* Hz */
     UCHAR ucDigitalOut; /* parallel digital port on */
     UCHAR u4Phase;      /* digital clock phase: 8 bits in spite of its prefix */
     UCHAR ucProprietaryMode;
     UCHAR ucDigitalBit; /* bus width in bits */
-    UCHAR ucDigitalRgb; /* PLA_MXR_DIGITAL_OUTPUT_FMT_T */
+    UCHAR ucDigitalRgb; /* a PLA_MXR_DIGITAL_OUTPUT_FMT_T value */
     UCHAR ucCAVBlackLv;
     UCHAR ucCVBSBlackLv;
     UCHAR ucGamma;      /* 0 off, 1 to 4 curve, others as given */
@@ -66,7 +66,7 @@ typedef struct
     UCHAR ucSaturation;
     UCHAR ucCBEnable;                   /* colour bar, as given */
     UCHAR ucMuteEnable;                 /* output mute, as given */
-    UINT32 u4AspectRatio;               /* ASP_ code */
+    UINT32 u4AspectRatio;               /* an ASPECT_RATIO_T value */
     UINT32 u4BgColor;                   /* 0x00YYUUVV */
     UINT32 u4Capability;                /* bits 0 to 16 groups of modes, 20 to 25, 27 and 30 features */
     UCHAR aucPlaneOrder[PMX_PLANE_NUM]; /* plane id at each position of the stack */
@@ -78,8 +78,8 @@ typedef struct
     PMX_PORT_INFO_T arPortInfo[PMX_PORT_NUM];
     DRV_PMX_COLOR_SPACE_T eMasterColorSpace; /* what the mixer mixes in */
     PMX_RESOLUTION_T arOutputConf[PMX_OUTPUT_NUM];
-    BOOL fgAspNext; /* u4AspNext waits for the next mode change */
-    UINT32 u4AspNext;
+    BOOL fgAspNext;          /* u4AspNext waits for the next mode change */
+    UINT32 u4AspNext;        /* an ASPECT_RATIO_T value */
     BOOL fgSetModeCalled;    /* some mode has been set since the last reset */
     UCHAR ucCavYcInputDelay; /* nothing here fills the delays and levels */
     UCHAR ucCavYcOutputDelay;
@@ -90,8 +90,8 @@ typedef struct
     UCHAR ucCvbsBurstLvl;
     UCHAR ucCavYLvl;
     UCHAR ucCvbsYLvl;
-    BOOL fgDigestEnable; /* the digest view is shown, with u4DigestAsp */
-    UINT32 u4DigestAsp;
+    BOOL fgDigestEnable;             /* the digest view is shown, with u4DigestAsp */
+    UINT32 u4DigestAsp;              /* an ASPECT_RATIO_T value */
     DRV_EXT_CHIP_USAGE_T rDrvExtScl; /* as PMX_SetModeEx last got it */
     UINT32 u4PlaneOrder;             /* arbitrary plane order: 4 bits a plane, plane 0 lowest */
     BOOL fgForceMode;

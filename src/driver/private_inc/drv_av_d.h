@@ -54,16 +54,16 @@ typedef DRV_ENUM(PMX_AVD_QUERY_T)
 DRV_STATIC_ASSERT(sizeof(PMX_AVD_COMMAND_T) == 4, "enumerations are 32 bits wide");
 DRV_STATIC_ASSERT(sizeof(PMX_AVD_QUERY_T) == 4, "enumerations are 32 bits wide");
 
-/** What goes with the commands for resolution, PLL and digital port. Resolutions are PMX_RESOLUTION_MODE_T values.
- *  One-mode setting leaves eCcirDrvInfo, fgOsdMsg and fgCCIROutEnable 0. Per-output mode setting checks the mixer's
- *  format alone: in the fields of HDMI, of the external chip, of the port's set-up and of the fifth OSD plane any other
- *  value may come, which must do no harm. */
+/** What goes with the commands for resolution, PLL and digital port. One-mode setting leaves eCcirDrvInfo,
+ *  fgOsdMsg and fgCCIROutEnable 0. Per-output mode setting checks the mixer's format alone: in the fields of HDMI, of
+ *  the external chip, of the port's set-up and of the fifth OSD plane any other value may come, which must do no
+ *  harm. */
 typedef struct
 {
     UINT8 u1ScaleMode;
-    UINT8 ucHdmiOutDisplayResolution; /**< what HDMI shows */
-    UINT8 ucFmtOutResolution;         /**< the mixer's format */
-    UINT8 ucCCIROutResolution;        /**< what the digital port carries */
+    UINT8 ucHdmiOutDisplayResolution; /**< what HDMI shows, a PMX_RESOLUTION_MODE_T value */
+    UINT8 ucFmtOutResolution;         /**< the mixer's format, a PMX_RESOLUTION_MODE_T value */
+    UINT8 ucCCIROutResolution;        /**< what the digital port carries, a PMX_RESOLUTION_MODE_T value */
     UINT8 ucHdmiOutMode;              /**< a DRV_EXT_CHIP_USAGE_T value */
     CCIR_DRV_INFO_T eCcirDrvInfo;     /**< the digital port's set-up */
     BOOL fgOsdMsg;                    /**< the fifth OSD plane's mode: 0, 1 or 2 */
@@ -83,9 +83,9 @@ typedef struct
 /** Valid-resolution query. */
 typedef struct
 {
-    UINT32 u4ResCheck;       /**< in: resolution to check */
+    UINT32 u4ResCheck;       /**< in: resolution to check, a PMX_RESOLUTION_MODE_T value */
     UINT16 u2VsyncFreq;      /**< in: frequency to check, in Hz */
-    UINT32 u4ValidAutoRes;   /**< out: resolution that the driver would choose */
+    UINT32 u4ValidAutoRes;   /**< out: the PMX_RESOLUTION_MODE_T value that the driver would choose */
     UINT16 u2ValidAutoVfreq; /**< out: frequency that the driver would choose, in Hz */
 } PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T;
 

@@ -14,9 +14,9 @@ extern "C" {
 #define IID_IPMX 9 /**< the mixer's IPMX table */
 
 /** Publish an interface.
- *  @param     u2CompType  component type
+ *  @param     u2CompType  component type, a PMX_COMP_TYPE_ value
  *  @param     u2CompId    component id
- *  @param     u4IfId      interface id
+ *  @param     u4IfId      interface id, an IID_ value
  *  @param[in] pvIf        [symbol] the table; stays where it is until it is unregistered
  *  @param[in] pvTag       [tag] handed to every function of the table as its first argument
  *  @return 0 or above; negative on a failure
@@ -24,9 +24,9 @@ extern "C" {
 INT32 i4ImRegisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, const void* pvIf, void* pvTag);
 
 /** Withdraw an interface.
- *  @param u2CompType  component type
+ *  @param u2CompType  component type, a PMX_COMP_TYPE_ value
  *  @param u2CompId    component id
- *  @param u4IfId      interface id
+ *  @param u4IfId      interface id, an IID_ value
  *  @return 0 or above; negative on a failure, for instance when it is not registered
  *  @context a thread that may sleep */
 INT32 i4ImUnregisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId);
@@ -34,9 +34,9 @@ INT32 i4ImUnregisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId
 /** Fetch an interface and hold it until it is released.
  *  The stack guarantees that a successful query yields a complete table, no function of it null; a failed one
  *  yields nothing that may be called.
- *  @param      u2CompType  component type
+ *  @param      u2CompType  component type, a PMX_COMP_TYPE_ value
  *  @param      u2CompId    component id
- *  @param      u4IfId      interface id
+ *  @param      u4IfId      interface id, an IID_ value
  *  @param[out] ppvIf       [symbol] receives the table
  *  @param[out] ppvTag      [tag] receives its tag
  *  @return 0 or above; negative on a failure
@@ -44,9 +44,9 @@ INT32 i4ImUnregisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId
 INT32 i4ImQueryInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void** ppvIf, void** ppvTag);
 
 /** Give a fetched interface back, once for each successful query.
- *  @param     u2CompType  component type
+ *  @param     u2CompType  component type, a PMX_COMP_TYPE_ value
  *  @param     u2CompId    component id
- *  @param     u4IfId      interface id
+ *  @param     u4IfId      interface id, an IID_ value
  *  @param[in] pvTag       [tag] the tag that the query yielded
  *  @return 0 or above; negative on a failure
  *  @context a thread that may sleep; the mixer holds MutexPMX */

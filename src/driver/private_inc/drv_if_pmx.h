@@ -189,17 +189,18 @@ typedef struct
  *  drv_pmx.h returns; the four source events are inert and return 1. */
 typedef struct
 {
-    INT32 (*pi4SetMode)(void* pvTag, UCHAR ucMode, UCHAR ucVFreq, BOOL fgOSD5);
-    INT32 (*pi4GetMode)(void* pvTag, UCHAR* pucMode);                         /**< as i4PmxGetMode */
-    INT32 (*pi4GetOutSize)(void* pvTag, UINT32* pu4Width, UINT32* pu4Height); /**< as i4PmxGetOutSize */
-    INT32 (*pi4GetAspectRatio)(void* pvTag, UINT32* pu4AspectRatio);          /**< as i4PmxGetAspectRatio */
-    INT32 (*pi4DisableVideoPlane)(void* pvTag, UCHAR ucVdpId);
-    INT32 (*pi4EnableVideoPlane)(void* pvTag, UCHAR ucVdpId);
+    INT32 (*pi4SetMode)(void* pvTag, UCHAR ucMode, UCHAR ucVFreq, BOOL fgOSD5); /**< as i4PmxSetMode */
+    INT32 (*pi4GetMode)(void* pvTag, UCHAR* pucMode);                           /**< as i4PmxGetMode */
+    INT32 (*pi4GetOutSize)(void* pvTag, UINT32* pu4Width, UINT32* pu4Height);   /**< as i4PmxGetOutSize */
+    INT32 (*pi4GetAspectRatio)(void* pvTag, UINT32* pu4AspectRatio);            /**< as i4PmxGetAspectRatio */
+    INT32 (*pi4DisableVideoPlane)(void* pvTag, UCHAR ucVdpId);                  /**< as i4PmxDisableVideoPlane */
+    INT32 (*pi4EnableVideoPlane)(void* pvTag, UCHAR ucVdpId);                   /**< as i4PmxEnableVideoPlane */
+    /** as i4PmxOsdEnabled */
     INT32 (*pi4OsdEnabled)(void* pvTag, INT32 i4SrcWidth, INT32 i4SrcHeight, DRV_GFX_COLOR_MODE_T eSrcColorSpace);
-    INT32 (*pi4OsdDisabled)(void* pvTag);
-    INT32 (*pi4VdpEnabled)(void* pvTag, INT32 i4SrcWidth, INT32 i4SrcHeight);
-    INT32 (*pi4VdpDisabled)(void* pvTag);
-    INT32 (*pi4VdpGetPlanePosition)(void* pvTag, UCHAR ucVdpHwId);
+    INT32 (*pi4OsdDisabled)(void* pvTag);                                     /**< as i4PmxOsdDisabled */
+    INT32 (*pi4VdpEnabled)(void* pvTag, INT32 i4SrcWidth, INT32 i4SrcHeight); /**< as i4PmxVdpEnabled */
+    INT32 (*pi4VdpDisabled)(void* pvTag);                                     /**< as i4PmxVdpDisabled */
+    INT32 (*pi4VdpGetPlanePosition)(void* pvTag, UCHAR ucVdpHwId);            /**< as i4PmxGetPlanePosition */
 } IPMX;
 
 /** Printable names of the resolution modes 0 to 46; null for 47 to 50. RES_2D_640x480HZ is printed without its HZ: the

@@ -33,13 +33,13 @@ INT32 _i4OSD_SetPosOffset(INT32* pi4Offset);
 
 /** Show the fifth OSD plane on component and composite, or on neither.
  *  @param fgOn        1 show, 0 do not
- *  @param ucCvbsMode  composite's resolution mode; any other value may come and must do no harm
+ *  @param ucCvbsMode  composite's mode, a PMX_RESOLUTION_MODE_T value; any other may come and must do no harm
  *  @return the driver's result, which the mixer ignores */
 INT32 _i4Osd5Out(BOOL fgOn, UCHAR ucCvbsMode);
 
 /** Show the fifth OSD plane on composite alone.
  *  @param fgOn        1 show
- *  @param ucCvbsMode  composite's resolution mode; any other value may come and must do no harm
+ *  @param ucCvbsMode  composite's mode, a PMX_RESOLUTION_MODE_T value; any other may come and must do no harm
  *  @return the driver's result, which the mixer ignores */
 INT32 _i4Osd5Out_CVBSOnly(BOOL fgOn, UCHAR ucCvbsMode);
 

@@ -78,14 +78,14 @@ PMX_API int i4PMX_Suspend(void* param);
 PMX_API int i4PMX_Resume(void* param);
 
 /** Register the IPMX table at the interface manager.
- *  @param u2CompType  component type, 66 for the mixer
+ *  @param u2CompType  component type, a PMX_COMP_TYPE_ value: 66 for the mixer
  *  @param u2CompId    component id, 0; it is also the tag that the table's users hand back
  *  @return the interface manager's result, negative on a failure
  *  @context a thread that may sleep */
 PMX_API INT32 i4PmxRegisterIM(UINT16 u2CompType, UINT16 u2CompId);
 
 /** Withdraw the IPMX table from the interface manager.
- *  @param u2CompType  component type, 66 for the mixer
+ *  @param u2CompType  component type, a PMX_COMP_TYPE_ value: 66 for the mixer
  *  @param u2CompId    component id, 0
  *  @return the interface manager's result, negative on a failure
  *  @context a thread that may sleep */
@@ -160,14 +160,14 @@ PMX_API void vSetPLLGP_HDMIDDS(BYTE bResIndex);
 
 /** Store and program the TV type.
  *  @param ucPmxId   mixer id, 0
- *  @param ucTvType  PMX_TV_TYPE_NTSC or PMX_TV_TYPE_PAL; any other goes into the record and to the hardware unchanged
+ *  @param ucTvType  a PMX_TV_TYPE_ value; any other goes into the record and to the hardware unchanged
  *  @return PMX_SET_OK; 0 for a mixer id other than 0
  *  @context any thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetTvType(UCHAR ucPmxId, UCHAR ucTvType);
 
 /** Read the TV type.
  *  @param      ucPmxId    mixer id, 0
- *  @param[out] pucTvType  receives it
+ *  @param[out] pucTvType  receives a PMX_TV_TYPE_ value, or whatever was given
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetTvType(UCHAR ucPmxId, UCHAR* pucTvType);
@@ -356,7 +356,8 @@ PMX_API UINT32 PMX_SetTVSystem(UCHAR ucPmxId, UINT16 u2VSyncFreq, BOOL fgTvSysAu
  *  @param      ucPmxId                   mixer id, 0
  *  @param      ucChkRes                  a PMX_RESOLUTION_MODE_T value
  *  @param      u2VSyncFreq               vertical frequency in Hz
- *  @param[out] ucSupportedAutoRes        receives the low 8 bits of the driver's resolution; not tested for null
+ *  @param[out] ucSupportedAutoRes        receives a PMX_RESOLUTION_MODE_T value, the driver's cut to 8 bits; not
+ *                                        tested for null
  *  @param[out] ucSupportedAutoVsyncFreg  receives the frequency in Hz; not tested for null
  *  @return 1; 0 for a mixer id other than 0 or when the driver has no answer, and then nothing is written
  *  @context a thread that may sleep; takes no lock */
@@ -535,7 +536,7 @@ PMX_API UINT32 PMX_SetDelay(UCHAR ucVdoId, UCHAR ucADJ_F, UINT16 u2HDelay, UINT1
 #define PMX_NO_SUCH_PORT 0xF1000002u
 
 /** Find the input port of an upstream component. A type that has no ports is logged, an id beyond them is not.
- *  @param u2CompType  PMX_COMP_TYPE_VDP or PMX_COMP_TYPE_OSD
+ *  @param u2CompType  a PMX_COMP_TYPE_ value, of a video plane or an OSD plane
  *  @param u2CompId    its id; the low 8 bits count: video planes 0 (port 0) and 1 to 3 (port 1), OSD planes 0 to 5
  *                     (ports 2 to 7)
  *  @return port 0 to 7; 8: none
@@ -544,9 +545,9 @@ PMX_API UINT32 u4PmxCompId2LocalId(UINT16 u2CompType, UINT16 u2CompId);
 
 /** Record that an upstream component feeds the mixer. It replaces whatever the port held; whether the source is enabled
  *  stays.
- *  @param u2ThisCompType      ignored
+ *  @param u2ThisCompType      ignored, a PMX_COMP_TYPE_ value
  *  @param u2ThisCompId        the mixer's component id, 0
- *  @param u2UpstreamCompType  the component's type
+ *  @param u2UpstreamCompType  the component's type, a PMX_COMP_TYPE_ value
  *  @param u2UpstreamCompId    its id
  *  @return PMX_PORT_DONE; PMX_NO_SUCH_PORT for a component without a port or a mixer id other than 0, and then nothing
  *          is stored
@@ -556,9 +557,9 @@ PMX_API UINT32 i4Pmx_Connect(UINT16 u2ThisCompType, UINT16 u2ThisCompId, UINT16 
 
 /** Clear an upstream component's port, whatever it holds; the source is not enabled any more. The master colour space
  *  is not decided here: see PMX_DecideMasterColorSpace.
- *  @param u2ThisCompType      ignored
+ *  @param u2ThisCompType      ignored, a PMX_COMP_TYPE_ value
  *  @param u2ThisCompId        the mixer's component id, 0
- *  @param u2UpstreamCompType  the component's type
+ *  @param u2UpstreamCompType  the component's type, a PMX_COMP_TYPE_ value
  *  @param u2UpstreamCompId    its id
  *  @return PMX_PORT_DONE; PMX_NO_SUCH_PORT for a component without a port or a mixer id other than 0, and then nothing
  *          is cleared
@@ -854,7 +855,7 @@ PMX_API void d_PMX_Set2DSmooth(UCHAR uc2D);
 
 /** Set the normal aspect ratio and signal it on HDMI.
  *  @param ucPmxId        mixer id, 0
- *  @param u4AspectRatio  an ASP_ code
+ *  @param u4AspectRatio  an ASPECT_RATIO_T value
  *  @return 1; 0 for a mixer id other than 0; 0 also when the HDMI/AV driver refuses it, and then it is stored all the
  *          same, and the video planes are not told
  *  @context a thread that may sleep; takes no lock */
@@ -862,7 +863,7 @@ PMX_API UINT32 PMX_SetAspectRatio(UCHAR ucPmxId, UINT32 u4AspectRatio);
 
 /** Set the normal aspect ratio now, which drops one that waits, or let it wait for PMX_SetAspectRatioNext.
  *  @param ucPmxId        mixer id, 0
- *  @param u4AspectRatio  an ASP_ code
+ *  @param u4AspectRatio  an ASPECT_RATIO_T value
  *  @param fgApplyOnNext  0 now, anything else: it waits
  *  @return 1; 0 for a mixer id other than 0; 0 also when the HDMI/AV driver refuses it, and then it is stored all the
  *          same, and the video planes are not told
@@ -871,14 +872,15 @@ PMX_API UINT32 PMX_SetAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fg
 
 /** Apply the aspect ratio that waits; callers do it at a mode change.
  *  @param ucPmxId  mixer id; HDMI is told for 0 alone
- *  @return the normal aspect ratio afterwards (an ASP_ code, not a success), also when none waited; 0 when the HDMI/AV
- *          driver refuses it, and then it is stored all the same, waits no more, and the video planes are not told
+ *  @return the normal aspect ratio afterwards (an ASPECT_RATIO_T value, not a success), also when none waited; 0 when
+ *          the HDMI/AV driver refuses it, and then it is stored all the same, waits no more, and the video planes are
+ *          not told
  *  @context a thread that may sleep; takes no lock */
 PMX_API UINT32 PMX_SetAspectRatioNext(UCHAR ucPmxId);
 
 /** Enter or leave the digest view with its aspect ratio. Leaving sets the analogue widescreen signalling.
  *  @param ucPmxId         mixer id, 0
- *  @param u4AspectRatio   an ASP_ code; stored in either case
+ *  @param u4AspectRatio   an ASPECT_RATIO_T value; stored in either case
  *  @param fgDigestEnable  0 leave, anything else enter
  *  @return 1; 0 for a mixer id other than 0
  *  @context a thread that may sleep; takes no lock */
@@ -886,14 +888,14 @@ PMX_API UINT32 PMX_SetDigestAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, B
 
 /** Read the aspect ratio in force: the digest view's while it is shown, else the normal one.
  *  @param      ucPmxId         mixer id, 0
- *  @param[out] pu4AspectRatio  receives an ASP_ code
+ *  @param[out] pu4AspectRatio  receives an ASPECT_RATIO_T value
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio);
 
 /** IPMX: PMX_GetAspectRatio.
  *  @param[in]  pvTag           [tag] the table's tag
- *  @param[out] pu4AspectRatio  receives an ASP_ code
+ *  @param[out] pu4AspectRatio  receives an ASPECT_RATIO_T value
  *  @return 1; 0 for a tag whose low 8 bits are not 0, or a null pointer
  *  @context any thread; takes no lock */
 PMX_API INT32 i4PmxGetAspectRatio(void* pvTag, UINT32* pu4AspectRatio);
@@ -906,21 +908,21 @@ PMX_API BOOL PMX_IsUnderDigestMode(UCHAR ucPmxId);
 
 /** Read the normal aspect ratio, digest view or not.
  *  @param      ucPmxId         mixer id, 0
- *  @param[out] pu4AspectRatio  receives an ASP_ code
+ *  @param[out] pu4AspectRatio  receives an ASPECT_RATIO_T value
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetNormalAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio);
 
 /** Read the digest view's aspect ratio, shown or not.
  *  @param      ucPmxId         mixer id, 0
- *  @param[out] pu4AspectRatio  receives an ASP_ code
+ *  @param[out] pu4AspectRatio  receives an ASPECT_RATIO_T value
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetDigestAspectRatio(UCHAR ucPmxId, UINT32* pu4AspectRatio);
 
 /** Read the aspect ratio that the middleware asked for last: the one that waits, if any, else the normal one.
  *  @param      ucPmxId         mixer id, 0
- *  @param[out] pu4AspectRatio  receives an ASP_ code
+ *  @param[out] pu4AspectRatio  receives an ASPECT_RATIO_T value
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetAspectRatioMW(UCHAR ucPmxId, UINT32* pu4AspectRatio);
@@ -972,7 +974,7 @@ PMX_API UINT32 PMX_SetDigitalOutRgb(UCHAR ucPmxId, UCHAR ucRgb);
 
 /** Read the digital picture's colour format.
  *  @param      ucPmxId  mixer id, 0
- *  @param[out] pucRgb   receives the value last given
+ *  @param[out] pucRgb   receives the PLA_MXR_DIGITAL_OUTPUT_FMT_T value last given
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetDigitalOutRgb(UCHAR ucPmxId, UCHAR* pucRgb);

@@ -25,9 +25,9 @@ DRV_STATIC_ASSERT(sizeof(TVE_ASPECT_RATIO_T) == 4, "enumerations are 32 bits wid
 
 /** Set an encoder's format.
  *  @param u4Tve        TVE_1 or TVE_2
- *  @param ucMainFmt    the mixer's resolution mode
+ *  @param ucMainFmt    the mixer's mode, a PMX_RESOLUTION_MODE_T value
  *  @param ucVFreq      vertical frequency in Hz
- *  @param ucTargetFmt  the output's resolution mode; any other value may come and must do no harm
+ *  @param ucTargetFmt  the output's mode, a PMX_RESOLUTION_MODE_T value; any other may come and must do no harm
  *  @param fgEnable     the output is on
  *  @param fgHD         the mixer's format is an HD one
  *  @param fgOSD5       routing of the fifth OSD plane: 0, 1 or 2; any other value may come and must do no harm
@@ -42,8 +42,8 @@ void TVE_SetEnable(UINT32 u4Tve, BOOL fgEnable);
 
 /** Announce a per-output mode setting; called on every one, before the formats.
  *  @param fgFmtChange  the mixer's format changes
- *  @param ucCavFmt     component's resolution mode; any other value may come and must do no harm
- *  @param ucCvbsFmt    composite's resolution mode; any other value may come and must do no harm
+ *  @param ucCavFmt     component's mode, a PMX_RESOLUTION_MODE_T value; any other may come and must do no harm
+ *  @param ucCvbsFmt    composite's mode, a PMX_RESOLUTION_MODE_T value; any other may come and must do no harm
  *  @param fgHD         the mixer's format is an HD one
  *  @param fgOSD5       routing of the fifth OSD plane: 0, 1 or 2; any other value may come and must do no harm */
 void TVE_SetMuteCtrol(BOOL fgFmtChange, UCHAR ucCavFmt, UCHAR ucCvbsFmt, BOOL fgHD, UINT8 fgOSD5);

@@ -32,7 +32,7 @@ void PMX_HalScalerReset(UCHAR ucPmxId);
 
 /** Select the TV type.
  *  @param ucPmxId   mixer id
- *  @param ucTvType  0 60 Hz systems, 3 50 Hz systems; any other value may come and must do no harm */
+ *  @param ucTvType  a PMX_TV_TYPE_ value: 0 60 Hz systems, 3 50 Hz systems; any other may come and must do no harm */
 void PMX_HalSetTvType(UCHAR ucPmxId, UCHAR ucTvType);
 
 /** Switch a clock of the mixer. Power management calls it too, on suspend and resume.
@@ -72,17 +72,17 @@ INT32 PMX_HalGetPlaneOrder(UCHAR ucPmxId, UINT8* pu1PlnSel);
 
 /** Put a plane into the mix. Called in the timer's context too.
  *  @param ucPmxId  mixer id
- *  @param ucPlane  plane 0 to 7 */
+ *  @param ucPlane  plane 0 to 7, a DRV_PMX_PLANE_T value */
 void vPmxMixPlane(UCHAR ucPmxId, UCHAR ucPlane);
 
 /** Take a plane out of the mix.
  *  @param ucPmxId  mixer id
- *  @param ucPlane  plane 0 to 7 */
+ *  @param ucPlane  plane 0 to 7, a DRV_PMX_PLANE_T value */
 void vPmxNotMixPlane(UCHAR ucPmxId, UCHAR ucPlane);
 
 /** Ask whether a plane is in the mix.
  *  @param ucPmxId  mixer id
- *  @param ucPlane  plane 0 to 7
+ *  @param ucPlane  plane 0 to 7, a DRV_PMX_PLANE_T value
  *  @return TRUE or FALSE */
 BOOL fgPmxHalMixPlane(UCHAR ucPmxId, UCHAR ucPlane);
 

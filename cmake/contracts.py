@@ -12,39 +12,9 @@ import sys
 
 sys.dont_write_bytecode = True
 
-from platform_functions import LAYER_HEADER, PLATFORM_HEADERS, ROOT, functions  # noqa: E402
+from platform_functions import LAYER_HEADER, PLATFORM_HEADERS, ROOT, functions, joined, parts  # noqa: E402
 
-TAG = re.compile(r"^@(param|return|context)\b(?:\[([^\]]*)\])?\s*", re.MULTILINE)
-BEHIND = re.compile(r"\[([^\]]*)\]\s*")  # see pointers.py
 SECTION = re.compile(r"^/\* ((?:(?!\*/).)*)\*/", re.DOTALL | re.MULTILINE)
-
-
-def without_stars(comment):
-    return "\n".join(re.sub(r"^\s*\* ?", "", line).strip() for line in comment.split("\n"))
-
-
-def joined(text):
-    """One line of several; runs of blanks within a line stay, for they set columns apart."""
-    return re.sub(r"\s*\n\s*", " ", text).strip()
-
-
-def parts(comment):
-    """(brief, [(parameter, text, direction, what stands behind it)], result, context) of a contract."""
-    text = without_stars(comment)
-    tags = list(TAG.finditer(text))
-    ends = [tag.start() for tag in tags[1:]] + [len(text)]
-    parameters, single = [], {"return": "", "context": ""}
-    for tag, end in zip(tags, ends):
-        body = joined(text[tag.end():end])
-        if tag[1] == "param":
-            name, _, meaning = body.partition(" ")
-            meaning = meaning.strip()
-            behind = BEHIND.match(meaning)
-            parameters.append((name, meaning[behind.end():] if behind else meaning, tag[2] or "",
-                               behind[1] if behind else ""))
-        else:
-            single[tag[1]] = body
-    return joined(text[:tags[0].start()] if tags else text), parameters, single["return"], single["context"]
 
 
 def sections(path):

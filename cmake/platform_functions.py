@@ -5,7 +5,7 @@ with.
 usage: platform_functions.py OUTPUT     the table behind board::platform_functions()
 
 As a module: functions(path) yields what one header declares, function_pointers(path) the types of functions that are
-called through a pointer.
+called through a pointer, and parts(contract) takes a contract to pieces.
 """
 
 import dataclasses
@@ -29,12 +29,14 @@ DECLARATION = re.compile(
         (?:\s*DRV_PRINTF_FORMAT\(\d+,\s*\d+\))?\s*;""",
     re.DOTALL | re.MULTILINE | re.VERBOSE)
 FUNCTION_POINTER = re.compile(
-    rf"""{CONTRACT}
+    rf"""(?:/\*\*\s*as\s+(?P<model_above>\w+)\s*\*/\s*|{CONTRACT})
         ^\s*(?P<typedef>typedef\s+)?
         {RESULT}\s*\(\*(?P<name>\w+)\)
         \((?P<parameters>[^()]*)\)\s*;
         (?:[ ]*/\*\*<\s*as\s+(?P<model>\w+)\s*\*/)?""",
     re.DOTALL | re.MULTILINE | re.VERBOSE)
+TAG = re.compile(r"^@(param|return|context)\b(?:\[([^\]]*)\])?\s*", re.MULTILINE)
+BEHIND = re.compile(r"\[([^\]]*)\]\s*")  # see pointers.py
 LOOKS_LIKE_ONE = {"typedef", "return", "DRV_STATIC_ASSERT", "static_assert", "DRV_ENUM"}
 
 
@@ -82,7 +84,36 @@ def function_pointers(path):
     """Every typedef of a pointer to a function, and every such member of a table, in the header's order."""
     text = pathlib.Path(path).read_text(encoding="utf-8")
     for match in FUNCTION_POINTER.finditer(text):
-        yield FunctionPointer(_function(match, text), match["typedef"] is not None, match["model"] or "")
+        yield FunctionPointer(_function(match, text), match["typedef"] is not None,
+                              match["model_above"] or match["model"] or "")
+
+
+def _without_stars(comment):
+    return "\n".join(re.sub(r"^\s*\* ?", "", line).strip() for line in comment.split("\n"))
+
+
+def joined(text):
+    """One line of several; runs of blanks within a line stay, for they set columns apart."""
+    return re.sub(r"\s*\n\s*", " ", text).strip()
+
+
+def parts(contract):
+    """(brief, [(parameter, text, direction, what stands behind it)], result, context) of a contract."""
+    text = _without_stars(contract)
+    tags = list(TAG.finditer(text))
+    ends = [tag.start() for tag in tags[1:]] + [len(text)]
+    parameters, single = [], {"return": "", "context": ""}
+    for tag, end in zip(tags, ends):
+        body = joined(text[tag.end():end])
+        if tag[1] == "param":
+            name, _, meaning = body.partition(" ")
+            meaning = meaning.strip()
+            behind = BEHIND.match(meaning)
+            parameters.append((name, meaning[behind.end():] if behind else meaning, tag[2] or "",
+                               behind[1] if behind else ""))
+        else:
+            single[tag[1]] = body
+    return joined(text[:tags[0].start()] if tags else text), parameters, single["return"], single["context"]
 
 
 def table(listed):

@@ -12,23 +12,21 @@ behind the parameter's name, in brackets, what the pointer leads to:
     [by command]    what the value of the parameter `command` asks for: its own text names the enumeration ("a NAME
                     value"), and there each enumerator's comment begins with a type in brackets
 
-Of a void**, [tag] and [symbol] are what it receives.
+Of a void**, [tag] and [symbol] are what it receives. An output of which the text says "not tested for null" is written
+whatever the pointer is. Which names a number has is told by "a NAME value": see declarations.py.
 """
 
 import dataclasses
 import re
 
+import declarations
+from declarations import Unclear
+from platform_functions import parts
+
 DIRECTIONS = ("in", "out", "in,out")
-PARAM = re.compile(r"@param(?:\[(?P<direction>[^\]]*)\])?\s+(?P<name>\w+)(?:\s+\[(?P<behind>[^\]]*)\])?")
-ENUMERATION = re.compile(r"typedef\s+DRV_ENUM\((\w+)\)\s*\{(.*?)\}", re.DOTALL)
-ENUMERATOR = re.compile(r"^\s*(\w+)\s*=\s*\w+\s*,?[ ]*(?:/\*\*<\s*(?:\[(\w+)\])?)?", re.MULTILINE)
-NAMED_ENUMERATION = r"@param\s+{}\s+a (\w+) value\b"
+NOT_TESTED = "not tested for null"
 CHARACTERS = {"CHAR", "char"}
 BYTES = {"UCHAR", "UINT8", "BYTE", "void"}
-
-
-class Unclear(Exception):
-    """A pointer of which the header does not tell what it means."""
 
 
 @dataclasses.dataclass(frozen=True)
@@ -37,6 +35,7 @@ class Pointer:
     target: str     # the type that is pointed to, without const
     kind: str       # items, bytes, text, tag, symbol, by
     size: str       # how many items or bytes, of a text at most; by: the parameter that tells; or nothing
+    may_be_null: bool = True  # as far as the function is concerned
 
     @property
     def is_read(self):
@@ -56,8 +55,8 @@ def declared_parameters(function):
 
 
 def described(function):
-    """{parameter: (direction, what stands in brackets)}; None for what is not written."""
-    return {match["name"]: (match["direction"], match["behind"]) for match in PARAM.finditer(function.contract)}
+    """{parameter: (text, direction, what stands in brackets)}; the last two are empty where they are not written."""
+    return {name: (text, direction, behind) for name, text, direction, behind in parts(function.contract)[1]}
 
 
 def is_pointer(type_name, callbacks):
@@ -66,13 +65,7 @@ def is_pointer(type_name, callbacks):
 
 def enumerations(text):
     """{enumeration: {enumerator: the type in brackets, or nothing}} of a header."""
-    return {match[1]: dict(ENUMERATOR.findall(match[2])) for match in ENUMERATION.finditer(text)}
-
-
-def named_enumeration(function, parameter):
-    """The enumeration whose values a parameter takes, as its text says; or nothing."""
-    match = re.search(NAMED_ENUMERATION.format(parameter), function.contract)
-    return match[1] if match else ""
+    return {one.name: {each.name: each.type for each in one.enumerators} for one in declarations.enumerations(text)}
 
 
 def _kind_and_size(behind, numbers):
@@ -119,7 +112,7 @@ def _contradiction(type_name, pointer, is_callback):
 def pointer_of(function, type_name, name, callbacks=()):
     """The Pointer that a parameter is; Unclear when its contract does not tell."""
     numbers = {other for other_type, other in declared_parameters(function) if not is_pointer(other_type, callbacks)}
-    direction, behind = described(function).get(name, (None, None))
+    text, direction, behind = described(function).get(name, ("", "", ""))
     if direction not in DIRECTIONS:
         raise Unclear(f"{function.name}: {name} is a pointer: @param[in], @param[out] or @param[in,out]")
     try:
@@ -127,7 +120,7 @@ def pointer_of(function, type_name, name, callbacks=()):
     except Unclear as reason:
         raise Unclear(f"{function.name}: {name}: {reason}") from None
     target = type_name.removeprefix("const ").removesuffix("*").strip()
-    pointer = Pointer(direction, target, kind, size)
+    pointer = Pointer(direction, target, kind, size, NOT_TESTED not in text)
     contradiction = _contradiction(type_name, pointer, type_name in callbacks)
     if contradiction:
         raise Unclear(f"{function.name}: {name} {contradiction}")
@@ -137,7 +130,7 @@ def pointer_of(function, type_name, name, callbacks=()):
 def types_by_value(function, pointer, known):
     """{enumerator: type} of a pointer whose meaning hangs on another parameter. `known`: enumerations() of the
     headers."""
-    name = named_enumeration(function, pointer.size)
+    name = declarations.named(described(function)[pointer.size][0])
     if not known.get(name):
         raise Unclear(f"{function.name}: {pointer.size} does not say of which enumeration: \"a NAME value\"")
     for enumerator, type_name in known[name].items():

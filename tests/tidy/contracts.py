@@ -58,7 +58,7 @@ def check_pointers(declaration, callbacks, enumerations):
                 pointer = pointers.pointer_of(declaration, type_name, name, callbacks)
                 if pointer.kind == "by":
                     pointers.types_by_value(declaration, pointer, enumerations)
-            elif described.get(name, (None, None)) != (None, None):
+            elif any(described.get(name, ("", "", ""))[1:]):
                 yield f"{declaration.name}: {name} is no pointer, and needs neither a direction nor brackets"
         except pointers.Unclear as reason:
             yield str(reason)

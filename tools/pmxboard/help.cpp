@@ -18,49 +18,16 @@ namespace
 
 using board::names::Family;
 
-struct FamilyTitle
-{
-    Family family;
-    const char* title;
-};
-
-constexpr FamilyTitle family_titles[] = {
-    { Family::ResolutionMode, "resolution modes" },
-    { Family::CcirMode, "modes of the digital port" },
-    { Family::CcirFormat, "formats of the digital port" },
-    { Family::GfxColorMode, "colour modes of graphics" },
-    { Family::ColorSpace, "colour spaces of the mixer" },
-    { Family::Plane, "planes of the mixer" },
-    { Family::Output, "outputs" },
-    { Family::ExtChipUsage, "uses of the external chip" },
-    { Family::TvType, "TV types" },
-    { Family::ComponentType, "component types" },
-    { Family::InterfaceId, "interfaces" },
-    { Family::SemaType, "types of semaphores" },
-    { Family::SemaOption, "options of a lock" },
-    { Family::TimerFlag, "kinds of timers" },
-    { Family::VdpEnable, "enable states of a video plane" },
-    { Family::TveAspect, "aspect ratios of the TV encoder" },
-    { Family::Aspect, "aspect ratios" },
-    { Family::HdmiColorSpace, "colour spaces of HDMI" },
-    { Family::HdmiPictureAspect, "picture aspect ratios of HDMI" },
-    { Family::HdmiAfd, "active formats of HDMI" },
-    { Family::AvdCommand, "commands to the HDMI/AV driver" },
-    { Family::AvdQuery, "queries of the HDMI/AV driver" },
-    { Family::DigitalFormat, "formats of the digital picture" },
-    { Family::ExtChipSetting, "settings of the external chip" },
-    { Family::ClosedCaption, "closed-caption switch" },
-};
-
 std::string constant_text(const std::string& name, std::int64_t number, const Look& look)
 {
-    for (const auto& [family, title] : family_titles)
+    for (const auto& [family, title] : board::names::families())
     {
         if (board::names::name_of(family, number) != name)
             continue;
         if (family == Family::ResolutionMode)
             return mode_text(record_view::mode_row(static_cast<unsigned>(number)), look);
-        std::string text = look.bold(name) + " = " + std::to_string(number) + ", one of the " + title + ":\n";
+        std::string text = look.bold(name) + " = " + std::to_string(number) + ", one of the ";
+        text.append(title).append(":\n");
         for (const std::string_view other : names_in(family))
             text +=
                 "  " + std::to_string(board::names::number_of(other).value_or(0)) + "  " + std::string(other) + "\n";

@@ -186,12 +186,11 @@ std::int64_t read_number(Family family, std::string_view token, const std::strin
 std::optional<std::int64_t> general_constant(std::string_view token)
 {
     const auto number = board::names::number_of(token);
-    for (int family = 0; number && family <= static_cast<int>(Family::ClosedCaption); ++family)
-    {
-        if (is_of(static_cast<Family>(family), token, *number))
-            return std::nullopt;
-    }
-    return number;
+    const auto families = board::names::families();
+    const bool has_family = number && std::any_of(families.begin(), families.end(), [&](const auto& named) {
+                                return is_of(named.family, token, *number);
+                            });
+    return has_family ? std::nullopt : number;
 }
 
 } // namespace pmxboard

@@ -47,7 +47,7 @@ TEST(Ops, EachExample_Works)
     for (const Operation& operation : operations())
     {
         const pmxboard::OperationExample* const example = example_of(operation.name);
-        ASSERT_NE(nullptr, example) << operation.name;
+        ASSERT_NE(nullptr, example) << operation.name << " has no example: tools/pmxboard/ops_examples.cpp";
         std::string before = "power-on\n";
         for (const std::string_view line : example->before)
             before.append(line).append("\n");
@@ -80,12 +80,14 @@ TEST(Ops, EachText_TellsArgumentsContractAndExample)
         const Shown shown = show({ operation.name });
         EXPECT_EQ(pmxboard::exit_done, shown.code);
         EXPECT_TRUE(shown.out.starts_with(pmxboard::usage(operation) + "\n")) << shown.out;
+        const pmxboard::OperationExample* const example = example_of(operation.name);
+        ASSERT_NE(nullptr, example) << operation.name << " has no example: tools/pmxboard/ops_examples.cpp";
         for (const pmxboard::Parameter& parameter : operation.parameters)
             EXPECT_THAT(shown.out, HasSubstr("\n  " + parameter.name + " ")) << operation.name;
         EXPECT_THAT(shown.out, HasSubstr(std::string(contract.brief.substr(0, contract.brief.find(' ')))));
         EXPECT_EQ(contract.result.empty(), shown.out.find("\nReturns  ") == std::string::npos) << operation.name;
         EXPECT_THAT(shown.out, HasSubstr("\nCalled   from "));
-        EXPECT_TRUE(shown.out.ends_with("\n  " + std::string(example_of(operation.name)->line) + "\n")) << shown.out;
+        EXPECT_TRUE(shown.out.ends_with("\n  " + std::string(example->line) + "\n")) << shown.out;
         std::istringstream lines(shown.out);
         for (std::string line; std::getline(lines, line);)
             EXPECT_LE(pmxboard::columns_of(line), 80u) << line;

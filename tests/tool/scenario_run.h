@@ -4,11 +4,9 @@
 
 #include <fstream>
 #include <iterator>
-#include <regex>
 #include <sstream>
 #include <string>
 #include <string_view>
-#include <utility>
 #include <vector>
 
 #include "tools/pmxboard/runner.h"
@@ -61,35 +59,6 @@ inline std::string project_file(const std::string& path)
 {
     std::ifstream file(std::string(PMX_SOURCE_DIR) + "/" + path);
     return { std::istreambuf_iterator<char>(file), {} };
-}
-
-struct DeclaredFunction
-{
-    std::string result;
-    std::string name;
-    std::vector<std::pair<std::string, std::string>> parameters; ///< type and name
-};
-
-/** The declarations that a pattern finds: its groups are result, name and parameters. */
-inline std::vector<DeclaredFunction> declarations(const std::string& header, const std::string& pattern)
-{
-    const std::string code = std::regex_replace(header, std::regex(R"(/\*[^*]*\*+([^/*][^*]*\*+)*/)"), "");
-    const std::regex declaration(pattern);
-    const std::regex parameter(R"(\s*(.*[ *])(\w+)\s*)");
-    std::vector<DeclaredFunction> found;
-    for (std::sregex_iterator it(code.begin(), code.end(), declaration), end; it != end; ++it)
-    {
-        DeclaredFunction function{ (*it)[1], (*it)[2], {} };
-        std::istringstream list((*it)[3].str());
-        for (std::string text; std::getline(list, text, ',');)
-        {
-            std::smatch parts;
-            if (std::regex_match(text, parts, parameter))
-                function.parameters.emplace_back(parts[1], parts[2]);
-        }
-        found.push_back(std::move(function));
-    }
-    return found;
 }
 
 } // namespace tool_test

@@ -1,6 +1,6 @@
-#include "drv_if.h"
-#include "drv_if_pmx.h"
+#include "tools/pmxboard/ipmx.h"
 
+#include "drv_if.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
 #include "tools/pmxboard/verbs.h"
@@ -10,44 +10,6 @@ namespace pmxboard
 namespace
 {
 
-/** The table and tag that a neighbour holds while it calls. */
-struct Held
-{
-    const IPMX* table = nullptr;
-    void* tag = nullptr;
-};
-
-Held& held()
-{
-    static Held now;
-    return now;
-}
-
-template <typename Slot, Slot IPMX::*slot>
-struct SlotOf;
-
-/** A slot as an operation on the table that is held. */
-template <typename R, typename... A, R (*IPMX::*slot)(A...)>
-struct SlotOf<R (*)(A...), slot>
-{
-    static Operation operation(const char* name, const std::vector<ParameterName>& names)
-    {
-        R (*const type)(A...) = nullptr;
-        Operation made;
-        made.name = name;
-        made.parameters = parameters_of(type, name, names);
-        made.call = [](const Operation& self, const Values& values) {
-            if (held().table->*slot == nullptr)
-                throw StepFailed("the slot " + self.name + " of the registered table is null");
-            return call_function(held().table->*slot, self, values);
-        };
-        return made;
-    }
-};
-
-#define SLOT(slot, ...) \
-    SlotOf<decltype(IPMX::slot), &IPMX::slot>::operation(#slot, { "pvTag" __VA_OPT__(, ) __VA_ARGS__ })
-
 std::int64_t number_of_tag(void* tag)
 {
     return static_cast<std::int64_t>(reinterpret_cast<std::uintptr_t>(tag));
@@ -55,22 +17,10 @@ std::int64_t number_of_tag(void* tag)
 
 } // namespace
 
-const std::vector<Operation>& ipmx_slots()
+HeldTable& held_table()
 {
-    static const std::vector<Operation> all = {
-        SLOT(pi4SetMode, "ucMode", "ucVFreq", "fgOSD5"),
-        SLOT(pi4GetMode, "pucMode"),
-        SLOT(pi4GetOutSize, "pu4Width", "pu4Height"),
-        SLOT(pi4GetAspectRatio, "pu4AspectRatio"),
-        SLOT(pi4DisableVideoPlane, "ucVdpId"),
-        SLOT(pi4EnableVideoPlane, "ucVdpId"),
-        SLOT(pi4OsdEnabled, "i4SrcWidth", "i4SrcHeight", "eSrcColorSpace"),
-        SLOT(pi4OsdDisabled),
-        SLOT(pi4VdpEnabled, "i4SrcWidth", "i4SrcHeight"),
-        SLOT(pi4VdpDisabled),
-        SLOT(pi4VdpGetPlanePosition, "ucVdpHwId").returning(board::names::Family::Plane),
-    };
-    return all;
+    static HeldTable now;
+    return now;
 }
 
 namespace
@@ -95,7 +45,7 @@ void call_slot(Session& session, const Words& given)
         throw StepFailed("no IPMX table is registered: i4ImQueryInterface answers " + std::to_string(queried));
     if (table == nullptr)
         throw StepFailed("i4ImQueryInterface answered " + std::to_string(queried) + " without a table");
-    held() = { static_cast<const IPMX*>(table), tag };
+    held_table() = { static_cast<const IPMX*>(table), tag };
     if (registered_tag)
         values[0] = board::Value::number(number_of_tag(tag));
 

@@ -10,13 +10,6 @@ namespace pmxboard
 using board::Value;
 using board::names::Family;
 
-Operation Operation::returning(Family family) const
-{
-    Operation named = *this;
-    named.result_family = family;
-    return named;
-}
-
 Values read_arguments(const Operation& operation, std::span<const std::string> words)
 {
     Values values;
@@ -108,6 +101,13 @@ T field(const Value& record, std::string_view path)
 }
 
 } // namespace
+
+Parameter Argument<const char*>::describe(std::string_view, const ParameterName& name)
+{
+    Parameter parameter{ .name = name.name, .is_output = false, .may_be_null = false, .kind = {} };
+    parameter.kind.form = Kind::Form::Text;
+    return parameter;
+}
 
 LentOutputs::LentOutputs(std::span<PMX_RESOLUTION_T> outputs) : m_outputs(outputs)
 {

@@ -4,9 +4,10 @@
  *      operation<PMX_SetTvType>("PMX_SetTvType", { "ucPmxId", "ucTvType" })
  *      operation<PMX_SetPlaneOrderArray>("PMX_SetPlaneOrderArray", { "ucPmxId", { "pu4PlaneOrder", 8 } })
  *
- *  Numbers and enumerations are written as such; a tag (void*) as the number that it carries. A pointer to a number
- *  that may be changed is an output, which is not written: the tool provides it. A pointer to numbers that stay as they
- *  are, or to records, is a list of as many items as its name is given with. */
+ *  Numbers and enumerations are written as such; a tag (void*) as the number that it carries; a text (const char*) in
+ *  quotes. A pointer to a number that may be changed is an output, which is not written: the tool provides it. A
+ *  pointer to numbers that stay as they are, or to records, is a list of as many items as its name is given with. The
+ *  last parameter before values of any kind and number is their format. */
 #pragma once
 
 #include <cstdint>
@@ -25,6 +26,7 @@
 #include "board/names.h"
 #include "board/value.h"
 #include "drv_if_pmx.h"
+#include "tools/pmxboard/format_check.h"
 #include "tools/pmxboard/kind.h"
 
 namespace pmxboard
@@ -65,20 +67,16 @@ struct Operation
     board::names::Family result_family = board::names::Family::None;
 
     Outcome run(const Values& values) const { return call(*this, values); }
-    /** The operation with a name for its result. */
-    Operation returning(board::names::Family family) const;
 };
 
-/** How a parameter is called, and what its type does not tell: the number of items behind a pointer to a list, names
- *  for its numbers where the name alone does not find them, and whether the function copes with a null pointer. */
+/** How a parameter is called, and what its type does not tell: the number of items behind a pointer to a list, and
+ *  whether the function copes with a null pointer. */
 struct ParameterName
 {
     ParameterName(const char* written, std::size_t items = 1) : name(written), count(items) {}
-    ParameterName(const char* written, board::names::Family names) : name(written), family(names) {}
 
     std::string name;
     std::size_t count = 1;
-    board::names::Family family = board::names::Family::None; ///< None: found from the name
     bool may_be_null = true;
 };
 
@@ -129,9 +127,7 @@ struct Argument
                  .kind = { .form = Kind::Form::Number,
                            .bits = 8 * sizeof(T),
                            .is_signed = std::is_signed_v<T>,
-                           .family = name.family != board::names::Family::None
-                                         ? name.family
-                                         : board::names::family_of(owner, name.name),
+                           .family = board::names::family_of(owner, name.name),
                            .count = 0,
                            .names = {},
                            .members = {} } };
@@ -201,6 +197,21 @@ struct Argument<T*>
     bool is_null;
     T number;
     T* passed;
+};
+
+/** A text that the function reads. */
+template <>
+struct Argument<const char*>
+{
+    explicit Argument(const board::Value& value) : text(value.string()), passed(text.c_str()) {}
+    Argument(const Argument&) = delete;
+    Argument& operator=(const Argument&) = delete;
+    void report(const Parameter&, Outcome&) const {}
+
+    static Parameter describe(std::string_view, const ParameterName& name);
+
+    std::string text;
+    const char* passed;
 };
 
 /** A list of numbers that the function reads. */
@@ -320,6 +331,14 @@ Outcome call_function(R (*function)(A...), const Operation& operation, const Val
     return call_with<R, A...>(function, operation, values, std::index_sequence_for<A...>{});
 }
 
+/** Without the values that it takes besides. The pointer is of plain type: what the text wants is checked before, not
+ *  by the compiler. */
+template <typename R, typename... A>
+Outcome call_function(R (*function)(A..., ...), const Operation& operation, const Values& values)
+{
+    return call_with<R, A...>(function, operation, values, std::index_sequence_for<A...>{});
+}
+
 template <typename... A, std::size_t... I>
 std::vector<Parameter> describe(std::string_view owner, const std::vector<ParameterName>& names,
                                 std::index_sequence<I...>)
@@ -335,6 +354,25 @@ std::vector<Parameter> parameters_of(R (*)(A...), std::string_view owner, const 
     return describe<A...>(owner, names, std::index_sequence_for<A...>{});
 }
 
+template <typename R, typename... A>
+std::vector<Parameter> parameters_of(R (*)(A..., ...), std::string_view owner, const std::vector<ParameterName>& names)
+{
+    return describe<A...>(owner, names, std::index_sequence_for<A...>{});
+}
+
+/** What the kinds of a function's arguments cannot refuse, where there is such a thing. */
+template <typename R, typename... A>
+std::function<void(const Values&)> check_of(R (*)(A...), const std::vector<Parameter>&)
+{
+    return {};
+}
+template <typename R, typename... A>
+std::function<void(const Values&)> check_of(R (*)(A..., ...), const std::vector<Parameter>& parameters)
+{
+    static_assert(std::is_same_v<std::tuple_element_t<sizeof...(A) - 1, std::tuple<A...>>, const char*>);
+    return [format = parameters.back().name](const Values& values) { check_format(format, values.back().string()); };
+}
+
 template <auto function>
 Operation operation(const char* name, const std::vector<ParameterName>& names)
 {
@@ -342,6 +380,7 @@ Operation operation(const char* name, const std::vector<ParameterName>& names)
     made.name = name;
     made.parameters = parameters_of(function, name, names);
     made.result_family = board::names::family_of(name, "result");
+    made.check = check_of(function, made.parameters);
     made.call = [](const Operation& self, const Values& values) { return call_function(function, self, values); };
     return made;
 }

@@ -1,7 +1,8 @@
 #include "tools/pmxboard/decode/clean.h"
 
 #include <algorithm>
-#include <cstdlib>
+#include <cctype>
+#include <regex>
 
 #include "tools/pmxboard/decode/pattern.h"
 
@@ -10,37 +11,19 @@ namespace pmxboard::decode
 namespace
 {
 
-// Longer sequences are rubbish, and are not searched for their end.
-constexpr std::size_t longest_sequence = 64;
+constexpr std::size_t longest_sequence = 64; ///< what is longer is rubbish, and is not searched for its end
 constexpr std::size_t stamp_within = 48;
 
 constexpr char escape = '\x1b';
-constexpr char bell = '\a';
-
-bool is_digit(char c)
-{
-    return c >= '0' && c <= '9';
-}
 
 /** The length of the terminal sequence at the beginning, which is an escape. */
 std::size_t sequence_length(std::string_view text)
 {
-    if (text.size() < 2)
-        return 1;
-    const std::string_view head = text.substr(0, longest_sequence);
-    if (head[1] == '[')
-    {
-        std::size_t at = 2;
-        while (at < head.size() && head[at] >= 0x20 && head[at] <= 0x3F)
-            ++at;
-        return at < head.size() && head[at] >= 0x40 && head[at] <= 0x7E ? at + 1 : 2;
-    }
-    if (head[1] == ']')
-    {
-        const std::size_t end = head.find(bell);
-        return end == head.npos ? 2 : end + 1;
-    }
-    return head[1] >= 0x20 && head[1] <= 0x7E ? 2 : 1;
+    static const std::regex sequence("\x1b(?:\\[[ -?]*[@-~]|\\][^\a]*\a|[ -~])?");
+    text = text.substr(0, longest_sequence);
+    std::cmatch found;
+    std::regex_search(text.data(), text.data() + text.size(), found, sequence, std::regex_constants::match_continuous);
+    return static_cast<std::size_t>(found.length());
 }
 
 /** The trace of `pmxboard run` shows a text in quotes, with its line end written out. */
@@ -48,52 +31,9 @@ void unquote_trace(std::string& line)
 {
     if (!line.ends_with('"') || (line.find("LOG") == line.npos && line.find("rintf \"") == line.npos))
         return;
-    std::size_t end = line.find_last_not_of(" \"");
-    if (end == line.npos || end == 0 || line[end] != 'n' || line[end - 1] != '\\')
-        return;
-    line.resize(end - 1);
-}
-
-/** The length of digits and a fraction at the beginning; 0 for none. */
-std::size_t decimal_length(std::string_view text)
-{
-    std::size_t at = 0;
-    while (at < text.size() && is_digit(text[at]))
-        ++at;
-    if (at == 0 || at + 1 >= text.size() || text[at] != '.' || !is_digit(text[at + 1]))
-        return 0;
-    ++at;
-    while (at < text.size() && is_digit(text[at]))
-        ++at;
-    return at;
-}
-
-/** The length of hh:mm:ss with or without a fraction at the beginning; 0 for none. */
-std::size_t clock_length(std::string_view text)
-{
-    constexpr std::string_view shape = "00:00:00";
-    if (text.size() < shape.size())
-        return 0;
-    for (std::size_t i = 0; i < shape.size(); ++i)
-    {
-        if (shape[i] == ':' ? text[i] != ':' : !is_digit(text[i]))
-            return 0;
-    }
-    std::size_t at = shape.size();
-    if (at + 1 < text.size() && (text[at] == '.' || text[at] == ',') && is_digit(text[at + 1]))
-    {
-        ++at;
-        while (at < text.size() && is_digit(text[at]))
-            ++at;
-    }
-    return at;
-}
-
-double number(std::string_view text)
-{
-    std::string digits(text);
-    std::replace(digits.begin(), digits.end(), ',', '.');
-    return std::strtod(digits.c_str(), nullptr);
+    const std::size_t end = line.find_last_not_of(" \"");
+    if (end != line.npos && end != 0 && line[end] == 'n' && line[end - 1] == '\\')
+        line.resize(end - 1);
 }
 
 } // namespace
@@ -121,29 +61,19 @@ std::string clean(std::string_view line)
 
 Stamp stamp_of(std::string_view line)
 {
+    // A clock's time anywhere; a decimal number at the beginning or in a bracket.
+    static const std::regex time("(?:^|[^0-9.])(([0-9]{2}):([0-9]{2}):([0-9]{2}(?:[.,][0-9]+)?))|"
+                                 "(?:^|[\\[(>]) *([0-9]+\\.[0-9]+)(?=[ \\]):]|$)");
     line = line.substr(0, stamp_within);
-    if (line.find("  LOG") != line.npos) // a trace, whose console lines have no times
+    std::cmatch found;
+    if (line.find("  LOG") != line.npos || // a trace, whose console lines have no times
+        !std::regex_search(line.data(), line.data() + line.size(), found, time))
         return {};
-    for (std::size_t at = 0; at < line.size(); ++at)
-    {
-        if (!is_digit(line[at]) || (at > 0 && (is_digit(line[at - 1]) || line[at - 1] == '.')))
-            continue;
-        if (const std::size_t length = clock_length(line.substr(at)); length != 0)
-        {
-            const std::string_view clock = line.substr(at, length);
-            return { std::string(clock),
-                     number(clock.substr(0, 2)) * 3600 + number(clock.substr(3, 2)) * 60 + number(clock.substr(6)) };
-        }
-        const std::size_t length = decimal_length(line.substr(at));
-        const std::size_t before = at == 0 ? line.npos : line.find_last_not_of(' ', at - 1);
-        const char behind = at + length < line.size() ? line[at + length] : ' ';
-        const bool alone = before == line.npos || line[before] == '[' || line[before] == '(' || line[before] == '>';
-        if (length != 0 && alone && (behind == ' ' || behind == ']' || behind == ')' || behind == ':'))
-        {
-            return { std::string(line.substr(at, length)), number(line.substr(at, length)) };
-        }
-    }
-    return {};
+    if (found[5].matched)
+        return { found.str(5), std::stod(found.str(5)) };
+    std::string seconds = found.str(4);
+    std::replace(seconds.begin(), seconds.end(), ',', '.');
+    return { found.str(1), std::stod(found.str(2)) * 3600 + std::stod(found.str(3)) * 60 + std::stod(seconds) };
 }
 
 bool is_prefix(std::string_view before)
@@ -153,7 +83,8 @@ bool is_prefix(std::string_view before)
         return true;
     if (before.ends_with("AM ") || before.ends_with("PM "))
         return true;
-    return is_digit(before[last]) ? last + 1 < before.size() : !is_word(before[last]);
+    return std::isdigit(static_cast<unsigned char>(before[last])) != 0 ? last + 1 < before.size()
+                                                                       : !is_word(before[last]);
 }
 
 } // namespace pmxboard::decode

@@ -1,6 +1,8 @@
 // The resolution modes as the tool shows them, held against expectations that are typed here and not read anywhere.
 #include <gmock/gmock.h>
 
+#include <fstream>
+#include <regex>
 #include <sstream>
 
 #include "tools/pmxboard/command.h"
@@ -72,6 +74,22 @@ constexpr Expected modes[] = {
 std::string facts_of(const ModeRow& mode)
 {
     return std::string(mode.is_progressive ? "p" : "") + (mode.is_hd_out ? "h" : "") + (mode.is_tve_hd ? "t" : "");
+}
+
+TEST(Modes, EachFeatureOfTheCapabilityWord_IsTheLayersOwn)
+{
+    std::ifstream in("src/driver/pmx/pmx_if.h");
+    const std::regex define(R"(#define PMX_CAP_BIT_(\w+) (\d+))");
+    std::map<unsigned, std::string> found;
+    for (std::string line; std::getline(in, line);)
+    {
+        if (std::smatch part; std::regex_match(line, part, define))
+            found[static_cast<unsigned>(std::stoul(part[2]))] = part[1];
+    }
+    const std::map<unsigned, std::string> features = record_view::capability_features();
+    EXPECT_EQ(found.size(), features.size());
+    for (const auto& [bit, name] : found)
+        EXPECT_TRUE(features.contains(bit)) << "record_view::capability_features() lacks bit " << bit << ", " << name;
 }
 
 TEST(Modes, EachFact_IsTheLayersOwn)

@@ -82,4 +82,12 @@ std::vector<ModeRow> mode_rows()
     return rows;
 }
 
+std::map<unsigned, std::string> capability_features()
+{
+    return { { PMX_CAP_BIT_GAMMA, "gamma" },           { PMX_CAP_BIT_BRIGHTNESS, "brightness" },
+             { PMX_CAP_BIT_CONTRAST, "contrast" },     { PMX_CAP_BIT_HUE, "hue" },
+             { PMX_CAP_BIT_SATURATION, "saturation" }, { PMX_CAP_BIT_DIGITAL_OUT, "digital port" },
+             { PMX_CAP_BIT_SHARPNESS, "sharpness" },   { PMX_CAP_BIT_BLACK_LEVEL, "black level" } };
+}
+
 } // namespace record_view

@@ -3,7 +3,9 @@
 #pragma once
 
 #include <cstdint>
+#include <map>
 #include <optional>
+#include <string>
 #include <string_view>
 #include <vector>
 
@@ -45,5 +47,8 @@ ModeRow mode_row(unsigned number);
 
 /** The modes that there are, by number. */
 std::vector<ModeRow> mode_rows();
+
+/** What hangs on the bits of the capability word that are no modes', by bit. */
+std::map<unsigned, std::string> capability_features();
 
 } // namespace record_view

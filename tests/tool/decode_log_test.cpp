@@ -66,7 +66,7 @@ TEST(DecodeLog, Assertion_IsKnownByExpressionAndFile)
 {
     const auto one = read_text("ASSERT x_sema_delete (MutexPMX) == OSR_OK, src/driver/pmx/pmx_lifecycle.cpp:88");
     ASSERT_TRUE(one);
-    EXPECT_EQ(Role::Assertion, one->text->role);
+    EXPECT_EQ(level_assertion, one->text->level);
     EXPECT_EQ((std::vector<std::string>{ "pmx_lifecycle.cpp", "88" }), one->values);
     const auto nought = read_text("ASSERT 0, src/driver/pmx/pmx_colour.cpp:12");
     ASSERT_TRUE(nought);

@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+#include <nlohmann/json.hpp>
+
 #include "tools/pmxboard/decode/report.h"
 #include "tools/pmxboard/decode/story.h"
 
@@ -55,12 +57,16 @@ TEST(DecodeReport, Capability_SignedDecimalBecomesBits)
     expect_line(cap("-1"), "capability 0xFFFFFFFF: admits every mode that has a bit");
     expect_line(cap("-2097153"), "of the features it admits gamma, contrast, hue, saturation, digital port, "
                                  "sharpness, black level; refuses brightness");
-    expect_line(cap("-2"), "capability 0xFFFFFFFE: admits 576i, 480p, 576p, 720p 60 Hz (and its top-and-bottom mode), "
-                           "720p 50 Hz (and its top-and-bottom mode), 1080i 60 Hz (and its side-by-side mode), "
-                           "1080i 50 Hz (and its side-by-side mode), 1080p 60 Hz, 1080p 50 Hz, 1080p 30 Hz, "
-                           "1080p 25 Hz, 1080p 24 Hz (and its top-and-bottom mode), 1080p 23.976 Hz, 1080p 29.97 Hz "
-                           "(and the top-and-bottom mode of 23 Hz), all frame-packed 3D modes, 640x480; refuses 480i "
-                           "(and 2D 480i 60 Hz)");
+    expect_line(cap("4113"),
+                "capability 0x00001011: admits 480i (and 2D 480i 60 Hz), 720p 60 Hz (and 3D 720p 60 Hz, top and "
+                "bottom), 1080p 24 Hz (and 3D 1080p 24 Hz, top and bottom); refuses 576i, 480p, 576p, 720p 50 Hz (and "
+                "3D 720p 50 Hz, top and bottom), 1080i 60 Hz (and 3D 1080i 60 Hz, side by side), 1080i 50 Hz (and 3D "
+                "1080i 50 Hz, side by side), 1080p 60 Hz, 1080p 50 Hz, 1080p 30 Hz, 1080p 25 Hz, 1080p 23.976 Hz, "
+                "1080p 29.97 Hz (and 3D 1080p 23 Hz, top and bottom), 3D 1080p 23 Hz (and 3D 1080p 24 Hz, 3D 720p "
+                "60 Hz, 3D 720p 50 Hz, 3D 720p 30 Hz, 3D 720p 25 Hz, 3D 576p 50 Hz, 3D 480p 60 Hz, 3D 1080i 60 Hz, 3D "
+                "1080i 50 Hz, 3D 1080i 30 Hz, 3D 1080i 25 Hz, 3D 576i 25 Hz, 3D 480i 30 Hz, 3D 576i 50 Hz, 3D 480i "
+                "60 Hz), 2D 640x480");
+    expect_line(cap("0"), "capability 0x00000000: admits no mode that has a bit");
 }
 
 TEST(DecodeReport, MasterColorSpaceOfAPort_IsItsSources)
@@ -129,8 +135,8 @@ TEST(DecodeReport, Value_HasTheFieldsOfTheRecordPutRight)
     StatusReport report;
     for (const Item& item : read_log(output_line(1, "eResMode(RES_AUTO)")).items)
         report.add(item);
-    EXPECT_NE(std::string::npos, report.value().to_json().find("\"eResMode\":\"RES_3D_720P60HZ_TB\""))
-        << report.value().to_json();
+    EXPECT_NE(std::string::npos, report.json().dump().find("\"eResMode\":\"RES_3D_720P60HZ_TB\""))
+        << report.json().dump();
 }
 
 } // namespace

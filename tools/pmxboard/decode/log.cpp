@@ -18,11 +18,65 @@ constexpr unsigned broken_within = 2;  ///< foreign lines that may stand within 
 
 constexpr std::string_view command_echo = "> ";
 constexpr std::string_view traced_assertion = "  Assert(\""; ///< the console shows it, too
+constexpr std::string_view digits = "0123456789";
 
 std::string_view before(std::string_view line, std::size_t from, std::size_t at)
 {
     const std::size_t begin = std::max(from, at > look_back ? at - look_back : 0);
     return line.substr(begin, at - begin);
+}
+
+/** A text that stands whole. */
+struct Whole
+{
+    const Pattern* pattern = nullptr;
+    Match match;
+};
+
+/** The longest text that stands whole at the beginning. */
+Whole longest_at_begin(std::string_view line)
+{
+    Whole best;
+    if (line.empty())
+        return best;
+    for (const Pattern* const pattern : patterns_of(line.front()))
+    {
+        const Match found = match(pattern->format, line);
+        if (found.state == Match::State::Whole && found.end > best.match.end)
+            best = { pattern, found };
+    }
+    return best;
+}
+
+/** The same, within a line: only where a text may stand. */
+Whole find_at(std::string_view line, std::size_t from, std::size_t at)
+{
+    const Whole best = longest_at_begin(line.substr(at, longest_text));
+    if (best.pattern == nullptr || (at > from && is_word(line[at]) && is_word(line[at - 1])))
+        return {};
+    if (!best.pattern->weak)
+        return best;
+    std::string_view behind = line.substr(at + best.match.end, longest_text);
+    behind.remove_prefix(std::min(behind.find_first_not_of(' '), behind.size()));
+    const bool names_line =
+        best.pattern->text->level == level_file && behind.starts_with(':') && behind.find_first_of(digits) == 1;
+    const bool ends = behind.empty() || names_line || longest_at_begin(behind).pattern != nullptr;
+    return ends && is_prefix(before(line, from, at)) ? best : Whole{};
+}
+
+/** The assertion of a source file whose expression stands before the file's name; else the file itself. */
+const Text& assertion_of(const Text& file, std::string_view lead)
+{
+    for (const Text& text : texts())
+    {
+        const std::size_t stands = lead.rfind(text.format);
+        if (text.level != level_assertion || text.file != file.file || stands == lead.npos)
+            continue;
+        const std::size_t end = stands + text.format.size();
+        if ((stands == 0 || !is_word(lead[stands - 1])) && (end == lead.size() || !is_word(lead[end])))
+            return text;
+    }
+    return file;
 }
 
 /** Reads one line after the other. */
@@ -40,36 +94,26 @@ private:
         unsigned age = 0;
     };
 
-    void segment(const std::string& text);
-    bool begins_text(std::string_view line) const;
-    const Pattern* find_at(std::string_view line, std::size_t from, std::size_t at, Match& match) const;
+    bool segment(const std::string& text);
     std::size_t mend(const std::string& text);
     std::size_t scan(std::string_view line, std::size_t from);
-    void take_assertion(std::string_view line, std::size_t at, const Match& match, const Text& file);
+    void take_assertion(std::string_view line, std::size_t at, std::size_t end, const Text& file);
     void find_cut_end(std::string_view line, std::size_t from);
     void find_cut_begin(std::string_view line);
     Item& add(const Text& text, std::string_view shown);
+    void take_whole(Item& item, const Whole& whole);
 
     Log m_log;
     std::optional<Broken> m_broken;
-    std::size_t m_number = 0;
     bool m_first = true;
-    Stamp m_stamp;
-    std::size_t m_line_items = 0; ///< items before this line
+    std::string_view m_segment; ///< that is read
 };
-
-void take_values(Item& item, const Match& match)
-{
-    item.values.assign(match.values.begin(), match.values.begin() + static_cast<std::ptrdiff_t>(match.count));
-}
 
 void Reader::line(std::string_view bytes)
 {
-    ++m_number;
     ++m_log.lines;
-    const std::size_t items_before = m_log.items.size();
-    const bool joined_before = m_broken.has_value();
     bool seen = false;
+    bool found = false;
     while (!bytes.empty())
     {
         const std::size_t end = std::min(bytes.find('\r'), bytes.size());
@@ -78,81 +122,54 @@ void Reader::line(std::string_view bytes)
         if (text.find_first_not_of(' ') == text.npos)
             continue;
         seen = true;
-        segment(text);
+        found = segment(text) || found;
     }
-    const bool joined = joined_before && !m_broken && m_log.items.size() == items_before && !m_log.shown.empty() &&
-                        m_log.shown.back().line == m_number && m_log.shown.back().item;
-    if (seen && m_log.items.size() == items_before && !joined)
+    if (seen && !found)
         ++m_log.foreign;
 }
 
-void Reader::segment(const std::string& text)
+/** Whether a piece between two carriage returns has anything of the layer. */
+bool Reader::segment(const std::string& text)
 {
-    m_line_items = m_log.items.size();
+    const std::size_t items_before = m_log.items.size();
     const std::string_view line = std::string_view(text).substr(0, text.find_last_not_of(' ') + 1);
     bool found = false;
     if (!line.starts_with(command_echo) && line.substr(0, longest_text).find(traced_assertion) == line.npos)
     {
-        m_stamp = stamp_of(line);
+        m_segment = line;
         const std::size_t from = mend(text);
         const std::size_t end = scan(line, from);
         if (m_first && m_log.items.empty())
             find_cut_begin(line);
         find_cut_end(text, end);
-        found = from != 0 || m_log.items.size() > m_line_items;
+        found = from != 0 || m_log.items.size() > items_before;
     }
     m_first = false;
     if (!found)
-        m_log.shown.push_back({ m_number, {}, std::string(line.substr(0, longest_text)) });
+        m_log.shown.push_back({ m_log.lines, {}, std::string(line.substr(0, longest_text)) });
+    return found;
 }
 
 Item& Reader::add(const Text& text, std::string_view shown)
 {
-    Item item;
+    const Stamp stamp = stamp_of(m_segment);
+    m_log.shown.push_back({ m_log.lines, m_log.items.size(), {} });
+    Item& item = m_log.items.emplace_back();
     item.text = &text;
-    item.line = m_number;
-    item.last_line = m_number;
-    item.time = m_stamp.text;
-    item.seconds = m_stamp.seconds;
+    item.line = m_log.lines;
+    item.last_line = m_log.lines;
+    item.time = stamp.text;
+    item.seconds = stamp.seconds;
     item.shown = shown;
-    m_log.shown.push_back({ m_number, m_log.items.size(), {} });
-    m_log.items.push_back(std::move(item));
-    return m_log.items.back();
+    return item;
 }
 
-/** Whether some text stands whole at the beginning. */
-bool Reader::begins_text(std::string_view line) const
+void Reader::take_whole(Item& item, const Whole& whole)
 {
-    if (line.empty())
-        return false;
-    const auto candidates = patterns_of(line.front());
-    return std::any_of(candidates.begin(), candidates.end(),
-                       [line](const Pattern* pattern) { return match(*pattern, line).state == Match::State::Whole; });
-}
-
-/** The longest text that stands whole at a place where it may stand. */
-const Pattern* Reader::find_at(std::string_view line, std::size_t from, std::size_t at, Match& found) const
-{
-    const Pattern* best = nullptr;
-    for (const Pattern* const pattern : patterns_of(line[at]))
-    {
-        const Match match = decode::match(*pattern, line.substr(at, longest_text));
-        if (match.state != Match::State::Whole || (best != nullptr && match.end <= found.end))
-            continue;
-        best = pattern;
-        found = match;
-    }
-    if (best == nullptr || (at > from && is_word(line[at]) && is_word(line[at - 1])))
-        return nullptr;
-    if (!best->weak)
-        return best;
-    std::size_t next = at + found.end;
-    while (next < line.size() && next < at + longest_text && line[next] == ' ')
-        ++next;
-    const bool names_line = best->text->role == Role::SourceFile && next + 1 < line.size() && line[next] == ':' &&
-                            line[next + 1] >= '0' && line[next + 1] <= '9';
-    const bool ends = next >= line.size() || names_line || begins_text(line.substr(next, longest_text));
-    return ends && is_prefix(before(line, from, at)) ? best : nullptr;
+    const auto& values = whole.match.values;
+    item.text = whole.pattern->text;
+    item.values.assign(values.begin(), values.begin() + static_cast<std::ptrdiff_t>(whole.match.count));
+    m_log.level = std::max(m_log.level.value_or(level_plain), item.text->level);
 }
 
 /** Puts a text together that something foreign broke in two; how much of this line belongs to it. */
@@ -160,34 +177,22 @@ std::size_t Reader::mend(const std::string& text)
 {
     if (!m_broken)
         return 0;
-    const std::string whole = m_broken->begin + text.substr(0, longest_text);
-    const Pattern* best = nullptr;
-    Match found;
-    for (const Pattern* const pattern : patterns_of(whole.front()))
-    {
-        const Match match = decode::match(*pattern, whole);
-        if (match.state == Match::State::Whole && match.end > m_broken->begin.size() && match.end > found.end)
-        {
-            best = pattern;
-            found = match;
-        }
-    }
-    if (best == nullptr)
+    const std::string together = m_broken->begin + text.substr(0, longest_text);
+    const Whole whole = longest_at_begin(together);
+    if (whole.match.end <= m_broken->begin.size())
     {
         if (++m_broken->age > broken_within)
             m_broken.reset();
         return 0;
     }
     Item& item = m_log.items[m_broken->item];
-    item.text = best->text;
     item.cut = Item::Cut::None;
-    item.last_line = m_number;
-    item.shown = whole.substr(0, found.end);
-    take_values(item, found);
+    item.last_line = m_log.lines;
+    item.shown = together.substr(0, whole.match.end);
+    take_whole(item, whole);
     --m_log.cut;
-    m_log.level = std::max(m_log.level.value_or(level_plain), best->text->level);
-    m_log.shown.push_back({ m_number, m_broken->item, {} });
-    const std::size_t used = found.end - m_broken->begin.size();
+    m_log.shown.push_back({ m_log.lines, m_broken->item, {} });
+    const std::size_t used = whole.match.end - m_broken->begin.size();
     m_broken.reset();
     return used;
 }
@@ -197,60 +202,39 @@ std::size_t Reader::scan(std::string_view line, std::size_t from)
 {
     for (std::size_t at = from; at < line.size();)
     {
-        Match match;
-        const Pattern* const pattern = find_at(line, from, at, match);
-        if (pattern == nullptr)
+        const Whole whole = find_at(line, from, at);
+        if (whole.pattern == nullptr)
         {
             ++at;
             continue;
         }
-        const Text& text = *pattern->text;
-        if (text.role == Role::SourceFile)
-        {
-            take_assertion(line, at, match, text);
-        }
+        const std::size_t end = at + whole.match.end;
+        if (whole.pattern->text->level == level_file)
+            take_assertion(line, at, end, *whole.pattern->text);
         else
-        {
-            Item& item = add(text, line.substr(at, match.end));
-            take_values(item, match);
-            if (text.level > level_plain || !m_log.level)
-                m_log.level = std::max(m_log.level.value_or(level_plain), text.level);
-        }
-        at += match.end;
-        from = at;
+            take_whole(add(*whole.pattern->text, line.substr(at, whole.match.end)), whole);
+        at = end;
+        from = end;
     }
     return from;
 }
 
 /** The layer's source files are named by assertions alone. The expression stands before, if anywhere. */
-void Reader::take_assertion(std::string_view line, std::size_t at, const Match& match, const Text& file)
+void Reader::take_assertion(std::string_view line, std::size_t at, std::size_t end, const Text& file)
 {
-    const std::string_view name = file.format.substr(file.format.rfind('/') + 1);
-    std::string_view number = line.substr(at + match.end, longest_text);
-    number = number.starts_with(':') ? number.substr(1) : std::string_view();
-    const std::size_t digits = std::min(number.find_first_not_of("0123456789"), number.size());
-
-    if (m_log.items.size() == m_line_items || m_log.items.back().text->role != Role::Assertion ||
-        !m_log.items.back().values.empty())
+    const auto is_open = [&](const Item& item) {
+        return item.text->level == level_assertion && item.values.empty() && item.line == m_log.lines;
+    };
+    if (m_log.items.empty() || !is_open(m_log.items.back()))
     {
-        const std::string_view lead = line.substr(0, at).substr(at > look_back ? at - look_back : 0);
-        const Text* meant = &file;
-        for (const Text& text : texts())
-        {
-            const std::size_t stands = lead.rfind(text.format);
-            if (text.role == Role::Assertion && has(text.values, name) && stands != lead.npos &&
-                (stands == 0 || !is_word(lead[stands - 1])) &&
-                (stands + text.format.size() == lead.size() || !is_word(lead[stands + text.format.size()])))
-            {
-                meant = &text;
-                break;
-            }
-        }
-        add(*meant, meant->format);
+        const Text& meant = assertion_of(file, before(line, 0, at));
+        add(meant, meant.format);
     }
+    std::string_view number = line.substr(end, longest_text);
+    number = number.starts_with(':') ? number.substr(1, 9) : std::string_view();
     Item& item = m_log.items.back();
-    item.values = { std::string(name), std::string(number.substr(0, std::min<std::size_t>(digits, 9))) };
-    if (item.text->role == Role::Assertion)
+    item.values = { std::string(file.file), std::string(number.substr(0, number.find_first_not_of(digits))) };
+    if (item.text->level == level_assertion)
         item.shown = std::string(item.text->format) + ", " + item.values.front();
 }
 
@@ -264,8 +248,8 @@ void Reader::find_cut_end(std::string_view line, std::size_t from)
             continue;
         for (const Pattern* const pattern : patterns_of(line[at]))
         {
-            const Match match = decode::match(*pattern, line.substr(at));
-            if (match.state != Match::State::RanOut || match.literal < cut_literal)
+            const Match found = match(pattern->format, line.substr(at));
+            if (found.state != Match::State::RanOut || found.literal < cut_literal)
                 continue;
             add(*pattern->text, line.substr(at)).cut = Item::Cut::End;
             ++m_log.cut;
@@ -280,17 +264,17 @@ void Reader::find_cut_begin(std::string_view line)
 {
     for (const Pattern& pattern : patterns())
     {
-        for (std::size_t piece = 0; piece < pattern.pieces.size(); ++piece)
+        std::size_t step = 1;
+        for (std::size_t at = 0; at < pattern.format.size(); at += step)
         {
-            for (std::size_t skip = 0; skip <= pattern.pieces[piece].literal.size(); ++skip)
-            {
-                const Match match = match_rest(pattern, piece, skip, line.substr(0, longest_text));
-                if (match.state != Match::State::Whole || match.literal < cut_literal || match.end != line.size())
-                    continue;
-                add(*pattern.text, line).cut = Item::Cut::Begin;
-                ++m_log.cut;
-                return;
-            }
+            const std::string_view rest = pattern.format.substr(at);
+            step = std::max<std::size_t>(conversion_length(rest), 1);
+            const Match found = match(rest, line.substr(0, longest_text));
+            if (found.state != Match::State::Whole || found.literal < cut_literal || found.end != line.size())
+                continue;
+            add(*pattern.text, line).cut = Item::Cut::Begin;
+            ++m_log.cut;
+            return;
         }
     }
 }
@@ -299,15 +283,10 @@ void Reader::find_cut_begin(std::string_view line)
 
 std::string Item::value(std::string_view name) const
 {
-    if (text->role == Role::Assertion || text->role == Role::SourceFile)
-        return {};
     const std::vector<std::string_view> names = split(text->values);
-    for (std::size_t i = 0; i < names.size() && i < values.size(); ++i)
-    {
-        if (names[i] == name)
-            return values[i];
-    }
-    return {};
+    const auto found = std::find(names.begin(), names.end(), name);
+    const auto index = static_cast<std::size_t>(found - names.begin());
+    return index < values.size() ? values[index] : "";
 }
 
 std::optional<std::int64_t> Item::number(std::string_view name) const
@@ -335,11 +314,11 @@ std::optional<Item> read_text(std::string_view printed)
     return std::move(log.items.front());
 }
 
-std::optional<std::int64_t> number_of(std::string_view digits, int base)
+std::optional<std::int64_t> number_of(std::string_view printed, int base)
 {
     std::int64_t number = 0;
-    const auto [end, error] = std::from_chars(digits.data(), digits.data() + digits.size(), number, base);
-    if (error != std::errc{} || end != digits.data() + digits.size())
+    const auto [end, error] = std::from_chars(printed.data(), printed.data() + printed.size(), number, base);
+    if (error != std::errc{} || end != printed.data() + printed.size())
         return {};
     return number;
 }

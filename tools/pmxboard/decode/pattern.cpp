@@ -1,6 +1,7 @@
 #include "tools/pmxboard/decode/pattern.h"
 
 #include <algorithm>
+#include <cctype>
 
 namespace pmxboard::decode
 {
@@ -19,40 +20,45 @@ constexpr std::size_t short_expression = 20;
 
 bool is_digit(char c)
 {
-    return c >= '0' && c <= '9';
+    return std::isdigit(static_cast<unsigned char>(c)) != 0;
 }
 
 bool is_hex(char c)
 {
-    return is_digit(c) || (c >= 'a' && c <= 'f') || (c >= 'A' && c <= 'F');
+    return std::isxdigit(static_cast<unsigned char>(c)) != 0;
 }
 
-Pattern compile(const Text& text)
+/** How many characters at the beginning are of a kind, at most so many. */
+std::size_t run_length(std::string_view text, bool (*is_of_kind)(char), std::size_t most)
 {
-    Pattern pattern{ &text, {}, false };
-    const std::string_view format = visible(text.format);
-    std::size_t literal = 0;
-    std::size_t begin = 0;
-    for (std::size_t i = 0; i < format.size(); ++i)
-    {
-        if (format[i] != '%' || text.role == Role::Assertion)
-            continue;
-        if (i > begin)
-            pattern.pieces.push_back({ Piece::Kind::Literal, format.substr(begin, i - begin) });
-        literal += i - begin;
-        i = format.find_first_of("dxs", i);
-        const char letter = format[i];
-        pattern.pieces.push_back({ letter == 's'   ? Piece::Kind::Name
-                                   : letter == 'x' ? Piece::Kind::Hex
-                                                   : Piece::Kind::Decimal,
-                                   {} });
-        begin = i + 1;
-    }
-    if (begin < format.size())
-        pattern.pieces.push_back({ Piece::Kind::Literal, format.substr(begin) });
-    literal += format.size() - begin;
-    pattern.weak = text.role != Role::Assertion && literal < weak_literal && is_word(format.front());
-    return pattern;
+    text = text.substr(0, most);
+    return static_cast<std::size_t>(std::find_if_not(text.begin(), text.end(), is_of_kind) - text.begin());
+}
+
+/** The length of what a conversion prints at the beginning of a line; 0 for nothing of it. */
+std::size_t value_length(char conversion, std::string_view line)
+{
+    if (conversion == 's')
+        return line.starts_with(null_name) ? null_name.size() : run_length(line, is_word, longest_name);
+    const bool hex = conversion == 'x';
+    const std::size_t lead = hex ? std::min(line.find_first_not_of(' '), most_blanks) : line.starts_with('-');
+    const std::size_t begin = std::min(lead, line.size());
+    const std::size_t digits = run_length(line.substr(begin), hex ? is_hex : is_digit, most_digits);
+    return digits == 0 ? 0 : begin + digits;
+}
+
+/** Whether a line may have ended within a value. */
+bool is_begin_of_value(std::string_view line)
+{
+    return line.size() <= most_blanks && (line.find_first_not_of(" -") == line.npos || null_name.starts_with(line));
+}
+
+bool is_weak(const Text& text, std::string_view format)
+{
+    std::size_t literal = format.size();
+    for (std::size_t at = format.find('%'); at != format.npos; at = format.find('%', at + 1))
+        literal -= conversion_length(format.substr(at));
+    return text.level != level_assertion && literal < weak_literal && is_word(format.front());
 }
 
 std::vector<Pattern> compile_all()
@@ -60,46 +66,30 @@ std::vector<Pattern> compile_all()
     std::vector<Pattern> all;
     for (const Text& text : texts())
     {
-        const bool told_by_its_file = text.role == Role::Assertion && text.format.size() < short_expression;
-        const bool twin = !all.empty() && visible(all.back().text->format) == visible(text.format);
+        const std::string_view format = visible(text.format);
+        const bool told_by_its_file = text.level == level_assertion && text.format.size() < short_expression;
+        const bool twin = !all.empty() && all.back().format == format;
         if (!told_by_its_file && !twin)
-            all.push_back(compile(text));
+            all.push_back({ &text, format, is_weak(text, format) });
     }
     return all;
 }
 
-/** The length of a value at the beginning of `line`; 0 for none. */
-std::size_t value_length(Piece::Kind kind, std::string_view line)
-{
-    std::size_t at = 0;
-    if (kind == Piece::Kind::Name)
-    {
-        if (line.starts_with(null_name))
-            return null_name.size();
-        while (at < line.size() && at < longest_name && is_word(line[at]))
-            ++at;
-        return at;
-    }
-    if (kind == Piece::Kind::Hex)
-    {
-        while (at < line.size() && at < most_blanks && line[at] == ' ')
-            ++at;
-    }
-    else if (line.starts_with('-'))
-    {
-        at = 1;
-    }
-    const std::size_t begin = at;
-    while (at < line.size() && at - begin < most_digits && (kind == Piece::Kind::Hex ? is_hex : is_digit)(line[at]))
-        ++at;
-    return at == begin ? 0 : at;
-}
-
 } // namespace
+
+std::string_view visible(std::string_view format)
+{
+    return format.substr(0, format.find_last_not_of(" \n") + 1);
+}
 
 bool is_word(char c)
 {
-    return is_digit(c) || (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_';
+    return std::isalnum(static_cast<unsigned char>(c)) != 0 || c == '_';
+}
+
+std::size_t conversion_length(std::string_view format)
+{
+    return format.starts_with('%') ? format.find_first_of("dxs") + 1 : 0;
 }
 
 const std::vector<Pattern>& patterns()
@@ -113,48 +103,33 @@ std::span<const Pattern* const> patterns_of(char first)
     static const auto by_first = [] {
         std::array<std::vector<const Pattern*>, 256> lists;
         for (const Pattern& pattern : patterns())
-            lists[static_cast<unsigned char>(pattern.pieces.front().literal.front())].push_back(&pattern);
+            lists[static_cast<unsigned char>(pattern.format.front())].push_back(&pattern);
         return lists;
     }();
     return by_first[static_cast<unsigned char>(first)];
 }
 
-Match match(const Pattern& pattern, std::string_view line)
-{
-    return match_rest(pattern, 0, 0, line);
-}
-
-Match match_rest(const Pattern& pattern, std::size_t piece, std::size_t skip, std::string_view line)
+Match match(std::string_view format, std::string_view line)
 {
     Match found;
-    for (; piece < pattern.pieces.size(); ++piece, skip = 0)
+    while (!format.empty())
     {
         const std::string_view rest = line.substr(found.end);
-        if (pattern.pieces[piece].kind == Piece::Kind::Literal)
-        {
-            const std::string_view literal = pattern.pieces[piece].literal.substr(skip);
-            const std::size_t most = std::min(literal.size(), rest.size());
-            std::size_t same = 0;
-            while (same < most && literal[same] == rest[same])
-                ++same;
-            found.end += same;
-            found.literal += same;
-            if (same == literal.size())
-                continue;
-            found.state = same == rest.size() ? Match::State::RanOut : Match::State::No;
-            return found;
-        }
-        const std::size_t length = value_length(pattern.pieces[piece].kind, rest);
+        const std::size_t conversion = conversion_length(format);
+        const std::size_t length =
+            conversion == 0 ? rest.starts_with(format.front()) : value_length(format[conversion - 1], rest);
         if (length == 0)
         {
-            const bool ended = rest.find_first_not_of(" -") == rest.npos || null_name.starts_with(rest);
-            found.state = ended && rest.size() <= most_blanks ? Match::State::RanOut : Match::State::No;
+            const bool ran_out = conversion == 0 ? rest.empty() : is_begin_of_value(rest);
+            found.state = ran_out ? Match::State::RanOut : Match::State::No;
             return found;
         }
-        if (found.count < found.values.size())
-            found.values[found.count++] =
-                rest.substr(rest.find_first_not_of(' '), length - rest.find_first_not_of(' '));
+        if (conversion == 0)
+            ++found.literal;
+        else if (found.count < found.values.size())
+            found.values[found.count++] = board::tokens::trim(rest.substr(0, length));
         found.end += length;
+        format.remove_prefix(std::max<std::size_t>(conversion, 1));
     }
     found.state = Match::State::Whole;
     return found;

@@ -1,5 +1,5 @@
 /** @file
- *  The layer's texts as patterns: a format's literal pieces, with numbers and names between them. */
+ *  The layer's texts as patterns: a format's own characters, with numbers and names between them. */
 #pragma once
 
 #include <array>
@@ -12,24 +12,11 @@
 namespace pmxboard::decode
 {
 
-struct Piece
-{
-    enum class Kind
-    {
-        Literal,
-        Decimal,
-        Hex,
-        Name
-    };
-    Kind kind;
-    std::string_view literal;
-};
-
 struct Pattern
 {
     const Text* text;
-    std::vector<Piece> pieces;
-    bool weak; ///< so short or plain that a foreign line may hold it by chance
+    std::string_view format; ///< what the console shows of it
+    bool weak;               ///< so short or plain that a foreign line may hold it by chance
 };
 
 /** How far a pattern leads into a line. */
@@ -55,10 +42,14 @@ const std::vector<Pattern>& patterns();
 /** Those that begin with a character. */
 std::span<const Pattern* const> patterns_of(char first);
 
-/** Match from the beginning of `line`. The work is bounded by the text's length. */
-Match match(const Pattern& pattern, std::string_view line);
-/** Match from within the text: what is left of it behind `skip` characters of its piece number `piece`. */
-Match match_rest(const Pattern& pattern, std::size_t piece, std::size_t skip, std::string_view line);
+/** Match from the beginning of `line`. The work is bounded by the format's length. */
+Match match(std::string_view format, std::string_view line);
+
+/** The length of the conversion that a format begins with; 0 for none. */
+std::size_t conversion_length(std::string_view format);
+
+/** What the console shows of a format: without blanks and line ends behind it. */
+std::string_view visible(std::string_view format);
 
 /** Whether a character can stand within an identifier. */
 bool is_word(char c);

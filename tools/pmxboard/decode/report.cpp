@@ -2,7 +2,8 @@
 
 #include <algorithm>
 
-#include "board/names.h"
+#include <nlohmann/json.hpp>
+
 #include "tools/pmxboard/decode/words.h"
 
 namespace pmxboard::decode
@@ -15,19 +16,14 @@ constexpr std::string_view output_names[] = { "digital port", "HDMI", "component
 /** What the report labels as an input format may be the output's, when that has 12 bits. */
 constexpr std::string_view mislabelled = "CCIR_YCMIX_12BIT";
 
+/** Never filled by the layer: worth a line only when it is. */
+constexpr std::string_view delays_and_levels[] = { "ucCavYcInputDelay",   "ucCavYcOutputDelay", "ucCvbsYcInputDelay",
+                                                   "ucCvbsYcOutputDelay", "ucCavSyncLvl",       "ucCvbsSyncLvl",
+                                                   "ucCvbsBurstLvl",      "ucCavYLvl",          "ucCvbsYLvl" };
+
 bool is_index(std::string_view name)
 {
     return name == "ucPmxId" || name == "conf" || name == "i";
-}
-
-bool is_port_line(const Item& item)
-{
-    return item.text->format.find("arPortInfo") != std::string_view::npos;
-}
-
-bool is_output_line(const Item& item)
-{
-    return item.text->format.find("arOutputConf") != std::string_view::npos;
 }
 
 bool is_order_line(const Item& item)
@@ -35,68 +31,96 @@ bool is_order_line(const Item& item)
     return has(item.text->values, "aucPlaneOrder");
 }
 
-template <typename Fields>
-std::string get(const Fields& fields, std::string_view name, std::string_view otherwise = "?")
+using Json = nlohmann::ordered_json;
+
+/** The fields as the record names them; what stands twice once. */
+Json json_of(const std::map<std::string, std::string, std::less<>>& fields)
 {
-    const auto found = fields.find(name);
-    return std::string(found == fields.end() ? otherwise : std::string_view(found->second));
+    Json json = Json::object();
+    for (const auto& [name, printed] : fields)
+    {
+        const auto number = number_of(printed, name == "u4PlaneOrder" ? 16 : 10);
+        if (name == "E" || name == "eColorSpace") // the bus width and the master colour space once more
+            continue;
+        if (name == "eReportedMode")
+            json["eResMode"] = reported_mode(printed);
+        else if (name == "u4Capability" || name == "u4BgColor" || name == "u4PlaneOrder")
+            json[name] = static_cast<std::uint32_t>(number.value_or(0));
+        else if (number)
+            json[name] = *number;
+        else
+            json[name] = printed;
+    }
+    return json;
 }
 
-template <typename Fields>
-std::string words_of(const Fields& fields, std::string_view name)
+template <typename Groups>
+Json json_list(const Groups& groups)
 {
-    return fields.contains(name) ? value_words(name, get(fields, name)) : "?";
-}
-
-std::string on_off(const std::string& printed)
-{
-    return printed == "0" ? "off" : printed == "1" ? "on" : printed == "?" ? "?" : "on (" + printed + ")";
-}
-
-template <typename Fields>
-bool all_zero(const Fields& fields, std::initializer_list<std::string_view> names)
-{
-    return std::all_of(names.begin(), names.end(), [&](auto name) { return get(fields, name) == "0"; });
+    Json list = Json::array();
+    for (std::size_t i = 0; i < groups.size(); ++i)
+    {
+        if (groups[i].empty())
+            continue;
+        list.push_back(json_of(groups[i]));
+        list.back()["index"] = i;
+    }
+    return list;
 }
 
 } // namespace
 
-template <typename Report>
-auto* StatusReport::group(Report& report, const Item& item)
+std::string StatusReport::Fields::get(std::string_view name) const
 {
-    if (is_order_line(item))
-        return &report.m_order;
-    if (!is_port_line(item) && !is_output_line(item))
-        return &report.m_record;
-    const auto index = static_cast<std::size_t>(item.number("i").value_or(-1));
-    if (is_port_line(item))
-        return index < ports ? &report.m_ports[index] : nullptr;
-    return index < outputs ? &report.m_outputs[index] : nullptr;
+    const auto found = find(name);
+    return found == end() ? "?" : found->second;
 }
 
-bool StatusReport::wants(const Item& item) const
+std::string StatusReport::Fields::say(std::string_view with_names) const
 {
-    const Fields* const fields = group(*this, item);
+    return sentence(with_names, [this](std::string_view name) { return get(name); });
+}
+
+std::string StatusReport::Fields::say_if(std::string_view needed, std::string_view with_names) const
+{
+    return contains(needed) ? say(with_names) : "";
+}
+
+/** The fields that a line belongs to; null for an index that does not exist. */
+StatusReport::Fields* StatusReport::group(const Item& item)
+{
+    const auto has_part = [&](std::string_view part) { return item.text->format.find(part) != std::string_view::npos; };
+    const auto index = static_cast<std::size_t>(item.number("i").value_or(-1));
+    if (is_order_line(item))
+        return &m_order;
+    if (has_part("arPortInfo"))
+        return index < m_ports.size() ? &m_ports[index] : nullptr;
+    if (has_part("arOutputConf"))
+        return index < m_outputs.size() ? &m_outputs[index] : nullptr;
+    return &m_record;
+}
+
+bool StatusReport::wants(const Item& item)
+{
+    const Fields* const fields = group(item);
     if (fields == nullptr || m_lines == 0)
         return true;
     if (item.text->format.starts_with("Mode("))
         return false;
     if (is_order_line(item))
         return !fields->contains(item.value("i"));
-    for (const std::string_view name : split(item.text->values))
-    {
+    const std::vector<std::string_view> names = split(item.text->values);
+    return std::none_of(names.begin(), names.end(), [&](std::string_view name) {
         // The mode stands in two lines, a 12-bit output format under the input's label.
         const bool twice = name == "ucMode" || (name == "eDgiFmt" && !fields->contains("eDgoFmt"));
-        if (!is_index(name) && !twice && fields->contains(name))
-            return false;
-    }
-    return true;
+        return !is_index(name) && !twice && fields->contains(name);
+    });
 }
 
 void StatusReport::add(const Item& item)
 {
     ++m_lines;
-    Fields* const fields = group(*this, item);
+    Fields* const fields = group(item);
     if (fields == nullptr || item.cut != Item::Cut::None)
         return;
     if (is_order_line(item))
@@ -110,7 +134,7 @@ void StatusReport::add(const Item& item)
         has(item.text->values, "eDgiFmt") && (fields->contains("eDgiFmt") || fields->contains("eDgiMode"));
     // Its input's mode is missing between: what was taken for the input's format is the output's.
     if (has(item.text->values, "eDgoMode") && !fields->contains("eDgiMode") && !fields->contains("eDgoFmt") &&
-        get(*fields, "eDgiFmt") == mislabelled)
+        fields->get("eDgiFmt") == mislabelled)
     {
         (*fields)["eDgoFmt"] = mislabelled;
         fields->erase("eDgiFmt");
@@ -122,214 +146,141 @@ void StatusReport::add(const Item& item)
     }
 }
 
-void StatusReport::record_words(std::vector<std::string>& lines) const
+void StatusReport::tell_record(std::vector<std::string>& lines) const
 {
-    if (m_record.contains("ucMode"))
-    {
-        std::string line = "mixer format " + words_of(m_record, "ucMode");
-        if (m_record.contains("ucVfreq"))
-        {
-            const auto type = number_of(get(m_record, "ucTvType"));
-            const std::string_view name = board::names::name_of(board::names::Family::TvType, type.value_or(-1));
-            line += " at " + get(m_record, "ucVfreq") + " Hz, TV type " +
-                    (name.empty() ? get(m_record, "ucTvType") : std::string(name.substr(name.rfind('_') + 1)));
-        }
-        if (m_record.contains("fgSetModeCalled"))
-            line += get(m_record, "fgSetModeCalled") == "0" ? "; no mode was set since the reset"
-                                                            : "; set by a mode setting";
-        lines.push_back(line);
-    }
-    if (m_record.contains("eMasterColorSpace") || m_record.contains("eColorSpace"))
-        lines.push_back("master colour space " +
-                        words_of(m_record, m_record.contains("eColorSpace") ? "eColorSpace" : "eMasterColorSpace"));
-    if (m_record.contains("E"))
-    {
-        lines.push_back("E(" + get(m_record, "E") +
-                        ") is the digital port's bus width; the report does not show the "
-                        "master enable");
-        lines.push_back("digital port: switch " + on_off(get(m_record, "ucDigitalOut")) + ", " +
-                        get(m_record, "ucDigitalBit") + " bits, phase " + get(m_record, "u4Phase") +
-                        ", proprietary mode " + get(m_record, "ucProprietaryMode"));
-    }
-    if (const auto word = number_of(get(m_record, "u4Capability")))
+    const Fields& record = m_record;
+    const auto tell = [&](std::string_view needed, std::string_view with_names) {
+        lines.push_back(record.say_if(needed, with_names));
+    };
+    if (record.contains("ucMode"))
+        lines.push_back(record.say("mixer format {ucMode}") +
+                        record.say_if("ucVfreq", " at {ucVfreq} Hz, TV type {ucTvType:standard}") +
+                        record.say_if("fgSetModeCalled", "; {fgSetModeCalled:called}"));
+    if (record.contains("eColorSpace"))
+        tell("eColorSpace", "master colour space {eColorSpace}");
+    else
+        tell("eMasterColorSpace", "master colour space {eMasterColorSpace}");
+    tell("E", "E({E}) is the digital port's bus width; the report does not show the master enable");
+    tell("E", "digital port: switch {ucDigitalOut:switch}, {ucDigitalBit} bits, phase {u4Phase}, proprietary mode "
+              "{ucProprietaryMode}");
+    if (const auto word = number_of(record.get("u4Capability")))
     {
         for (const std::string& line : capability_words(static_cast<std::uint32_t>(*word)))
             lines.push_back(line);
     }
-    if (m_record.contains("rDrvExtScl"))
-        lines.push_back("external chip " + get(m_record, "rDrvExtScl"));
-    else if (!m_external_line && m_ports.back().contains("eSrcColorSpace") && !m_outputs.front().empty())
+    tell("rDrvExtScl", "external chip {rDrvExtScl}");
+    if (!m_external_line && m_ports.back().contains("eSrcColorSpace") && !m_outputs.front().empty())
         lines.push_back("external chip: no line, so DRV_RX_BYPASS_TX or a value without a name");
-    if (m_record.contains("fgForceMode"))
-        lines.push_back("force mode " + on_off(get(m_record, "fgForceMode")) + "; digest view " +
-                        on_off(get(m_record, "fgDigestEnable")) + ", its ratio " + words_of(m_record, "u4DigestAsp"));
-    if (m_record.contains("fgOSD5"))
-        lines.push_back("fifth OSD plane " + get(m_record, "fgOSD5"));
+    tell("fgForceMode", "force mode {fgForceMode:switch}; digest view {fgDigestEnable}, its ratio {u4DigestAsp}");
+    tell("fgOSD5", "fifth OSD plane {fgOSD5}");
 }
 
-void StatusReport::picture_words(std::vector<std::string>& lines) const
+void StatusReport::tell_picture(std::vector<std::string>& lines) const
 {
-    if (m_record.contains("ucBrightness"))
-    {
-        constexpr std::string_view formats[] = { "YCbCr 4:4:4", "RGB", "xvYCC", "YCbCr 4:2:2", "full-range RGB" };
-        const auto format = static_cast<std::size_t>(number_of(get(m_record, "ucDigitalRgb")).value_or(-1));
-        lines.push_back("digital colour format " +
-                        (format < std::size(formats) ? std::string(formats[format]) : get(m_record, "ucDigitalRgb")) +
-                        ", gamma " + (get(m_record, "ucGamma") == "0" ? "off" : "curve " + get(m_record, "ucGamma")));
-        lines.push_back("brightness " + get(m_record, "ucBrightness") + ", contrast " + get(m_record, "ucContrast") +
-                        ", hue " + get(m_record, "ucHue") + ", saturation " + get(m_record, "ucSaturation") +
-                        "; black level: component " + get(m_record, "ucCAVBlackLv") + ", composite " +
-                        get(m_record, "ucCVBSBlackLv"));
-    }
-    if (const auto colour = number_of(get(m_record, "u4BgColor")))
-    {
-        const auto yuv = static_cast<std::uint32_t>(*colour);
-        lines.push_back("colour bar " + on_off(get(m_record, "ucCBEnable")) + ", mute " +
-                        on_off(get(m_record, "ucMuteEnable")) + ", sharpness " + get(m_record, "ucSharpness") +
-                        ", background Y " + std::to_string(yuv >> 16 & 0xFF) + " U " + std::to_string(yuv >> 8 & 0xFF) +
-                        " V " + std::to_string(yuv & 0xFF));
-        const bool waits = get(m_record, "fgAspNext") != "0";
-        lines.push_back("aspect ratio " + words_of(m_record, "u4AspectRatio") +
-                        (waits ? "; " + words_of(m_record, "u4AspNext") + " waits for the next mode change" : ""));
-    }
-    if (m_record.contains("ucCavSyncLvl") && m_record.contains("ucCvbsYLvl") &&
-        !all_zero(m_record, { "ucCavYcInputDelay", "ucCavYcOutputDelay", "ucCvbsYcInputDelay", "ucCvbsYcOutputDelay",
-                              "ucCavSyncLvl", "ucCvbsSyncLvl", "ucCvbsBurstLvl", "ucCavYLvl", "ucCvbsYLvl" }))
-        lines.push_back("delays in and out: component " + get(m_record, "ucCavYcInputDelay") + ", " +
-                        get(m_record, "ucCavYcOutputDelay") + "; composite " + get(m_record, "ucCvbsYcInputDelay") +
-                        ", " + get(m_record, "ucCvbsYcOutputDelay") + "; levels of sync and luma: component " +
-                        get(m_record, "ucCavSyncLvl") + ", " + get(m_record, "ucCavYLvl") + "; composite " +
-                        get(m_record, "ucCvbsSyncLvl") + ", " + get(m_record, "ucCvbsYLvl") + ", burst " +
-                        get(m_record, "ucCvbsBurstLvl"));
+    const Fields& record = m_record;
+    const auto tell = [&](std::string_view needed, std::string_view with_names) {
+        lines.push_back(record.say_if(needed, with_names));
+    };
+    tell("ucBrightness", "digital colour format {ucDigitalRgb:format}, gamma {ucGamma:gamma}");
+    tell("ucBrightness", "brightness {ucBrightness}, contrast {ucContrast}, hue {ucHue}, saturation {ucSaturation}; "
+                         "black level: component {ucCAVBlackLv}, composite {ucCVBSBlackLv}");
+    tell("u4BgColor", "colour bar {ucCBEnable:switch}, mute {ucMuteEnable:switch}, sharpness {ucSharpness}, "
+                      "background {u4BgColor:yuv}");
+    tell("u4BgColor", record.is("fgAspNext", "0")
+                          ? "aspect ratio {u4AspectRatio}"
+                          : "aspect ratio {u4AspectRatio}; {u4AspNext} waits for the next mode change");
+    const bool filled = std::any_of(std::begin(delays_and_levels), std::end(delays_and_levels),
+                                    [&](std::string_view name) { return !record.is(name, "0"); });
+    if (filled && record.contains("ucCvbsYLvl"))
+        tell("ucCavSyncLvl", "delays in and out: component {ucCavYcInputDelay}, {ucCavYcOutputDelay}; composite "
+                             "{ucCvbsYcInputDelay}, {ucCvbsYcOutputDelay}; levels of sync and luma: component "
+                             "{ucCavSyncLvl}, {ucCavYLvl}; composite {ucCvbsSyncLvl}, {ucCvbsYLvl}, burst "
+                             "{ucCvbsBurstLvl}");
 }
 
-void StatusReport::order_words(std::vector<std::string>& lines) const
+void StatusReport::tell_order(std::vector<std::string>& lines) const
 {
     if (!m_order.empty())
-    {
-        std::string line = "planes at positions 0 to 7:";
-        for (std::size_t i = 0; i < positions; ++i)
-            line += " " + get(m_order, std::to_string(i));
-        lines.push_back(line);
-    }
-    if (m_record.contains("u4PlaneOrder"))
-        lines.push_back("packed order 0x" + words_of(m_record, "u4PlaneOrder") + ": planes 1 to 8 show sources " +
-                        packed_order_words(get(m_record, "u4PlaneOrder")));
+        lines.push_back(m_order.say("planes at positions 0 to 7: {0} {1} {2} {3} {4} {5} {6} {7}"));
+    lines.push_back(m_record.say_if("u4PlaneOrder", "packed order 0x{u4PlaneOrder}: planes 1 to 8 show sources "
+                                                    "{u4PlaneOrder:sources}"));
 }
 
-void StatusReport::port_words(std::vector<std::string>& lines) const
+void StatusReport::tell_ports(std::vector<std::string>& lines) const
 {
-    std::string idle;
-    for (std::size_t i = 0; i < ports; ++i)
+    std::vector<std::string> idle;
+    for (std::size_t i = 0; i < m_ports.size(); ++i)
     {
         const Fields& port = m_ports[i];
         if (port.empty())
             continue;
-        if (get(port, "fgConnected") == "0" && get(port, "fgEnabled") == "0")
+        if (port.is("fgConnected", "0") && port.is("fgEnabled", "0"))
         {
-            idle += (idle.empty() ? "" : ", ") + std::to_string(i);
+            idle.push_back(std::to_string(i));
             continue;
         }
         std::string line = "port " + std::to_string(i) + ": ";
-        if (get(port, "fgConnected") == "?")
-            line += "source unknown";
-        else if (get(port, "fgConnected") == "0")
-            line += "not connected";
-        else
-            line += words_of(port, "u2CompType") + " " + get(port, "u2CompId") + " connected";
-        line += get(port, "fgEnabled") == "?" ? "" : get(port, "fgEnabled") == "0" ? ", idle" : ", delivers pictures";
-        if (port.contains("eSrcColorSpace"))
-            line += ", source " + words_of(port, "eSrcColorSpace") + " (labelled eMasterColorSpace)";
-        if (port.contains("eInputColorMode"))
-            line += get(port, "eInputColorMode").ends_with("RGB") ? ", RGB" : ", YCbCr";
-        if (port.contains("ucLumaKey") && get(port, "ucLumaKey") != "0")
-            line += ", luma key " + get(port, "ucLumaKey");
-        lines.push_back(line);
+        line += port.is("fgConnected", "?")   ? "source unknown"
+                : port.is("fgConnected", "0") ? "not connected"
+                                              : port.say("{u2CompType} {u2CompId} connected");
+        line += port.say_if("fgEnabled", port.is("fgEnabled", "0") ? ", idle" : ", delivers pictures");
+        line += port.say_if("eSrcColorSpace", ", source {eSrcColorSpace} (labelled eMasterColorSpace)");
+        line += port.say_if("eInputColorMode", port.get("eInputColorMode").ends_with("RGB") ? ", RGB" : ", YCbCr");
+        lines.push_back(line + (port.is("ucLumaKey", "0") ? "" : port.say_if("ucLumaKey", ", luma key {ucLumaKey}")));
     }
     if (!idle.empty())
-        lines.push_back("ports neither connected nor delivering: " + idle);
+        lines.push_back("ports neither connected nor delivering: " + joined(idle, ", "));
 }
 
-std::string StatusReport::output_mode_words(const Fields& output) const
+std::string StatusReport::mode_of(const Fields& output)
 {
     if (!output.contains("eReportedMode"))
-    {
-        const bool left_out = output.contains("u4VFreq") && output.contains("eDgiFmt");
-        return left_out ? "mode above 41, which has no line" : "mode not in the log";
-    }
-    const std::string printed = get(output, "eReportedMode");
-    const std::string_view meant = reported_mode(printed);
-    return mode_words(meant) + (meant == printed ? "" : " (reported as " + printed + ")");
+        return output.contains("u4VFreq") && output.contains("eDgiFmt") ? "mode above 41, which has no line"
+                                                                        : "mode not in the log";
+    const std::string printed = output.get("eReportedMode");
+    return output.say("{eReportedMode}") + (reported_mode(printed) == printed ? "" : " (reported as " + printed + ")");
 }
 
-void StatusReport::output_words(std::vector<std::string>& lines) const
+void StatusReport::tell_outputs(std::vector<std::string>& lines) const
 {
-    for (std::size_t i = 0; i < outputs; ++i)
+    for (std::size_t i = 0; i < m_outputs.size(); ++i)
     {
         const Fields& output = m_outputs[i];
+        const auto is_set = [&](std::string_view name, std::string_view unset) {
+            return output.contains(name) && !output.is(name, unset);
+        };
         if (output.empty())
             continue;
-        std::string line = "output " + std::string(output_names[i]) + ": " + on_off(get(output, "fgOutputEnable")) +
-                           ", " + output_mode_words(output);
-        if (output.contains("u4VFreq"))
-            line += ", " + get(output, "u4VFreq") + " Hz";
-        for (const auto& [mode, format, what] :
-             { std::tuple{ "eDgiMode", "eDgiFmt", "input" }, std::tuple{ "eDgoMode", "eDgoFmt", "output" } })
-        {
-            if (get(output, mode, "CCIR_INVALID") != "CCIR_INVALID" ||
-                get(output, format, "CCIR_NON_USED") != "CCIR_NON_USED")
-                line += std::string(", digital ") + what + " " + get(output, mode) + " " + get(output, format);
-        }
-        if (get(output, "eDgoFmt") == mislabelled)
-            line += " (the output's format, labelled as the input's)";
-        lines.push_back(line);
+        std::string line = "output " + std::string(output_names[i]) + ": " + output.say("{fgOutputEnable:switch}") +
+                           ", " + mode_of(output);
+        line += output.say_if("u4VFreq", ", {u4VFreq} Hz");
+        if (is_set("eDgiMode", "CCIR_INVALID") || is_set("eDgiFmt", "CCIR_NON_USED"))
+            line += output.say(", digital input {eDgiMode} {eDgiFmt}");
+        if (is_set("eDgoMode", "CCIR_INVALID") || is_set("eDgoFmt", "CCIR_NON_USED"))
+            line += output.say(", digital output {eDgoMode} {eDgoFmt}");
+        lines.push_back(line +
+                        (output.is("eDgoFmt", mislabelled) ? " (the output's format, labelled as the input's)" : ""));
     }
 }
 
 std::vector<std::string> StatusReport::words() const
 {
     std::vector<std::string> lines;
-    record_words(lines);
-    picture_words(lines);
-    order_words(lines);
-    port_words(lines);
-    output_words(lines);
+    tell_record(lines);
+    tell_picture(lines);
+    tell_order(lines);
+    tell_ports(lines);
+    tell_outputs(lines);
+    std::erase(lines, "");
     return lines;
 }
 
-board::Value StatusReport::value() const
+nlohmann::ordered_json StatusReport::json() const
 {
-    const auto value_of = [](const Fields& fields) {
-        board::Value value = board::Value::record({});
-        for (const auto& [name, printed] : fields)
-        {
-            if (name == "E" || name == "eColorSpace")
-                continue; // the bus width and the master colour space once more
-            const auto number = number_of(printed, name == "u4PlaneOrder" ? 16 : 10);
-            if (name == "eReportedMode")
-                value.add("eResMode", board::Value::text(std::string(reported_mode(printed))));
-            else if (name == "u4Capability" || name == "u4BgColor" || name == "u4PlaneOrder")
-                value.add(name, board::Value::number(static_cast<std::uint32_t>(number.value_or(0))));
-            else
-                value.add(name, number ? board::Value::number(*number) : board::Value::text(printed));
-        }
-        return value;
-    };
-    const auto list_of = [&](const auto& groups) {
-        std::vector<board::Value> list;
-        for (std::size_t i = 0; i < groups.size(); ++i)
-        {
-            if (groups[i].empty())
-                continue;
-            list.push_back(value_of(groups[i]));
-            list.back().add("index", board::Value::number(static_cast<std::int64_t>(i)));
-        }
-        return board::Value::list(std::move(list));
-    };
-    board::Value report = value_of(m_record);
-    report.add("aucPlaneOrder", value_of(m_order));
-    report.add("arPortInfo", list_of(m_ports));
-    report.add("arOutputConf", list_of(m_outputs));
+    Json report = json_of(m_record);
+    report["aucPlaneOrder"] = json_of(m_order);
+    report["arPortInfo"] = json_list(m_ports);
+    report["arOutputConf"] = json_list(m_outputs);
     return report;
 }
 

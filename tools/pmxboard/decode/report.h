@@ -7,7 +7,8 @@
 #include <string>
 #include <vector>
 
-#include "board/value.h"
+#include <nlohmann/json_fwd.hpp>
+
 #include "tools/pmxboard/decode/log.h"
 
 namespace pmxboard::decode
@@ -17,37 +18,41 @@ class StatusReport
 {
 public:
     /** Whether a line of a report can belong to this one; if not, it begins another. */
-    bool wants(const Item& item) const;
+    bool wants(const Item& item);
     void add(const Item& item);
 
-    std::size_t lines_seen() const { return m_lines; }
     /** In words, one subject a line. */
     std::vector<std::string> words() const;
     /** For programs: the fields by their names in the record. */
-    board::Value value() const;
+    nlohmann::ordered_json json() const;
 
 private:
-    using Fields = std::map<std::string, std::string, std::less<>>;
-    static constexpr std::size_t positions = 8;
-    static constexpr std::size_t ports = 8;
-    static constexpr std::size_t outputs = 4;
+    class Fields : public std::map<std::string, std::string, std::less<>>
+    {
+    public:
+        /** As printed; a question mark for what no line had. */
+        std::string get(std::string_view name) const;
+        bool is(std::string_view name, std::string_view printed) const { return get(name) == printed; }
+        /** A sentence with these fields for its names. */
+        std::string say(std::string_view with_names) const;
+        /** The same; nothing when no line had the needed field. */
+        std::string say_if(std::string_view needed, std::string_view with_names) const;
+    };
 
-    /** The fields that a line belongs to; null for an index that does not exist. */
-    template <typename Report>
-    static auto* group(Report& report, const Item& item);
-    void record_words(std::vector<std::string>& lines) const;
-    void picture_words(std::vector<std::string>& lines) const;
-    void order_words(std::vector<std::string>& lines) const;
-    void port_words(std::vector<std::string>& lines) const;
-    void output_words(std::vector<std::string>& lines) const;
-    std::string output_mode_words(const Fields& output) const;
+    Fields* group(const Item& item);
+    void tell_record(std::vector<std::string>& lines) const;
+    void tell_picture(std::vector<std::string>& lines) const;
+    void tell_order(std::vector<std::string>& lines) const;
+    void tell_ports(std::vector<std::string>& lines) const;
+    void tell_outputs(std::vector<std::string>& lines) const;
+    static std::string mode_of(const Fields& output);
 
     std::size_t m_lines = 0;
     bool m_external_line = false;
     Fields m_record;
     Fields m_order; ///< by position
-    std::array<Fields, ports> m_ports;
-    std::array<Fields, outputs> m_outputs;
+    std::array<Fields, 8> m_ports;
+    std::array<Fields, 4> m_outputs;
 };
 
 } // namespace pmxboard::decode

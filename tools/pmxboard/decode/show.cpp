@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <ostream>
 
+#include "board/value.h"
 #include "tools/pmxboard/decode/words.h"
 
 namespace pmxboard::decode
@@ -60,11 +61,8 @@ void show_event(std::ostream& out, const Event& event, std::size_t range_width, 
     std::vector<std::string> paragraphs;
     if (event.report)
         paragraphs = event.report->words();
-    std::string details;
-    for (const std::string& detail : event.details)
-        details += (details.empty() ? "" : "; ") + detail;
-    if (!details.empty())
-        paragraphs.push_back(details);
+    if (!event.details.empty())
+        paragraphs.push_back(joined(event.details, "; "));
     for (const std::string& paragraph : paragraphs)
         out << indent << folded(paragraph, indent.size(), indent.size() + 2) << '\n';
 }
@@ -112,10 +110,9 @@ void show_lines(std::ostream& out, const Log& log, const Story& story, const Sho
             out << std::string(step_indent, ' ') << "the rest of line " << item.line << '\n';
             continue;
         }
-        std::string where;
-        for (const std::string_view operation : split(story.operations[*shown.item]))
-            where += (where.empty() ? "" : " or ") + std::string(operation);
-        where += ": " + std::string(item.text->step);
+        const std::vector<std::string_view> operations = split(story.operations[*shown.item]);
+        std::string where =
+            joined({ operations.begin(), operations.end() }, " or ") + ": " + std::string(item.text->step);
         if (item.cut == Item::Cut::Begin)
             where = "cut: ends like a line of " + where;
         else if (item.cut == Item::Cut::End)
@@ -175,6 +172,18 @@ std::string folded(std::string_view text, std::size_t begin, std::size_t indent)
     return lines;
 }
 
+void show_texts(std::ostream& out)
+{
+    for (const Text& text : texts())
+    {
+        const std::string source =
+            text.level >= 0 ? "level " + std::to_string(text.level) : std::string(source_of(text));
+        const std::string printer(split(text.operations).front());
+        out << board::quote(text.format) << "\n  "
+            << folded(source + ", " + printer + ": " + std::string(text.step), 2, 4) << '\n';
+    }
+}
+
 void show_log(std::ostream& out, const Log& log, const Story& story, const ShowOptions& options)
 {
     show_summary(out, log, options);
@@ -210,9 +219,7 @@ void show_comparison(std::ostream& out, const Comparison& comparison, const Show
         << '\n';
     show_field(out, "agreement", agreement);
     show_field(out, "expected",
-               departure.expected ? departure.expected->item.shown
-                                  : "nothing more: the scenario is "
-                                    "over");
+               departure.expected ? departure.expected->item.shown : "nothing more: the scenario is over");
     if (departure.found)
         show_field(out, departure.kind == Departure::Kind::Missing ? "instead" : "found", departure.found->shown);
     for (const ValueDifference& value : departure.values)

@@ -7,62 +7,71 @@
 #include <string_view>
 #include <vector>
 
+#include "board/tokens.h"
+
 namespace pmxboard::decode
 {
 
+struct Item;
+struct Teller;
+
 /** What the story makes of a text. */
-enum class Role
+using Rule = void (*)(Teller& story, const Item& item);
+
+/** The rules that there are; the story has them. */
+namespace rules
 {
-    Opens, ///< an operation begins
-    Head,  ///< begins an operation, unless it is part of the one that is running
-    Part,  ///< goes on with an operation
-    ModeEx,
-    Output, ///< one of the four outputs that are asked for
-    Port,   ///< set-up of the digital port that is asked for
-    Fifth,  ///< the fifth OSD plane that is asked for
-    NotWait,
-    HeldBack,
-    Flag,    ///< the display part's flag
-    OsdFlag, ///< whether graphics wait for their return
-    OsdBack, ///< graphics may return
-    TimedOut,
-    TimerSet,
-    Ready,
-    Report,    ///< a line of the status report
-    Assertion, ///< an expression that did not hold
-    SourceFile ///< what an assertion names beside its expression
-};
+using Function = void(Teller& story, const Item& item);
+
+Function opens;   ///< an operation begins
+Function heads;   ///< begins an operation, unless it is part of the one that is running
+Function goes_on; ///< goes on with an operation
+Function ends;    ///< goes on with an operation that has nothing more to say
+
+Function mode_ex;      ///< a per-output mode setting begins
+Function output;       ///< one of the four outputs that it asks for
+Function digital_port; ///< the set-up of the digital port that it asks for
+Function fifth_osd;    ///< the fifth OSD plane that it asks for
+Function no_wait;      ///< it does not wait for the display part, and lowers its flag
+
+Function flag;      ///< the display part's flag
+Function held_back; ///< graphics leave the mix
+Function timer_set;
+Function timed_out;
+Function osd_flag; ///< whether graphics wait for their return
+Function osd_back; ///< graphics may return
+Function ready;    ///< somebody asks whether the display part switches
+
+Function report;    ///< a line of the status report
+Function assertion; ///< an assertion's expression, or its source file
+} // namespace rules
 
 /** Levels of what PMX_IsLog does not print. */
 constexpr int level_plain = -1;     ///< Printf, UTIL_Printf: whatever the console's level is
-constexpr int level_assertion = -2; ///< an assertion, the same
+constexpr int level_assertion = -2; ///< the expression of an assertion, the same
+constexpr int level_file = -3;      ///< the source file that an assertion names beside it
 
 struct Text
 {
-    Role role;
-    bool problem; ///< says that something went wrong
     int level;
     std::string_view format;
     std::string_view values;     ///< their names, with commas between
     std::string_view operations; ///< the one that prints it, and then those that come there; with commas between
     std::string_view step;       ///< what it says of the operation's progress
     std::string_view tale;       ///< its sentence in the story, {name} standing for a value; empty: none of its own
+    Rule rule = rules::goes_on;
+    bool problem = false;       ///< says that something went wrong
+    std::string_view file = {}; ///< that reports an assertion
+
+    bool is_assertion() const { return level <= level_assertion; }
 };
 
 /** The table. Texts that differ in blanks at their end alone stand one after the other. */
 std::span<const Text> texts();
 
-/** What %s prints in these texts, and a name that the layer looks up in flash: with the formats all texts of the
- *  layer's object. */
-std::span<const std::string_view> value_texts();
-std::span<const std::string_view> other_texts();
+using board::tokens::split;
 
-/** The items of a list with commas. */
-std::vector<std::string_view> split(std::string_view list);
 /** Whether a list with commas has an item. */
 bool has(std::string_view list, std::string_view item);
-
-/** What the console shows of a format: without blanks and line ends behind it. */
-std::string_view visible(std::string_view format);
 
 } // namespace pmxboard::decode

@@ -2,8 +2,11 @@
 
 #include <algorithm>
 #include <cstdio>
+#include <map>
+#include <regex>
 
 #include "board/names.h"
+#include "tools/record_view/mode_table.h"
 
 namespace pmxboard::decode
 {
@@ -12,59 +15,98 @@ namespace
 
 using board::names::Family;
 
-/** `60HZ`, `23_976HZ`, `4K2K24HZ`'s end: the frequency in words; empty for anything else. */
-std::string frequency_words(std::string_view text)
+constexpr const char* unknown = "?";
+
+/** `60`, `23_976`, and `23976` as the 4K mode has it. */
+std::string frequency_words(std::string digits)
 {
-    if (!text.ends_with("HZ"))
-        return {};
-    text.remove_suffix(2);
-    if (text.empty() || text.find_first_not_of("0123456789_") != text.npos)
-        return {};
-    std::string words(text);
-    std::replace(words.begin(), words.end(), '_', '.');
-    if (words == "23976")
-        words = "23.976";
-    return words + " Hz";
+    std::replace(digits.begin(), digits.end(), '_', '.');
+    return (digits == "23976" ? "23.976" : digits) + " Hz";
 }
 
-/** A mode's name without RES_, in words. */
-std::string named_mode_words(std::string_view name)
+/** A mode's name without RES_, in words; empty when it is not made like one. */
+std::string named_mode_words(const std::string& name)
 {
-    std::string words;
-    std::string behind;
-    if (name.starts_with("3D_") || name.starts_with("2D_"))
-    {
-        words = std::string(name.substr(0, 2)) + " ";
-        name.remove_prefix(3);
-    }
-    for (const auto& [end, meaning] : { std::pair<std::string_view, std::string_view>{ "_TB", ", top and bottom" },
-                                        { "_SBS_HALF", ", side by side" },
-                                        { "_1440", ", 1440 samples a line" },
-                                        { "_2880", ", 2880 samples a line" },
-                                        { "_4096", ", 4096 wide" } })
-    {
-        if (name.ends_with(end))
-        {
-            name.remove_suffix(end.size());
-            behind = meaning;
-        }
-    }
-    if (name.starts_with("640x480"))
-        return words + "640x480";
-    if (name.starts_with("4K2K"))
-        return "4K2K " + frequency_words(name.substr(4));
-    const std::size_t digits = std::min(name.find_first_not_of("0123456789"), name.size());
-    if (digits == 0 || digits == name.size() || (name[digits] != 'I' && name[digits] != 'P'))
+    static const std::regex shape("(?:([23]D)_)?(?:(640x480).*|(4K2K)([0-9_]+)HZ|([0-9]+)([IP])(?:([0-9_]+)HZ)?)"
+                                  "(_TB|_SBS_HALF|_1440|_2880|_4096)?");
+    static const std::map<std::string, std::string> ends = { { "_TB", ", top and bottom" },
+                                                             { "_SBS_HALF", ", side by side" },
+                                                             { "_1440", ", 1440 samples a line" },
+                                                             { "_2880", ", 2880 samples a line" },
+                                                             { "_4096", ", 4096 wide" } };
+    std::smatch part;
+    if (!std::regex_match(name, part, shape))
         return {};
-    words += std::string(name.substr(0, digits)) + (name[digits] == 'I' ? "i" : "p");
-    name.remove_prefix(digits + 1);
-    if (name.starts_with("HZ")) // no mode, but it must not become a word
-        return {};
-    const std::string frequency = frequency_words(name);
-    if (frequency.empty() && !name.empty())
-        return {};
-    return words + (frequency.empty() ? "" : " " + frequency) + behind;
+    std::string words = part[1].matched ? part.str(1) + " " : "";
+    if (part[2].matched)
+        return words + part.str(2);
+    if (part[3].matched)
+        return words + part.str(3) + " " + frequency_words(part.str(4));
+    words += part.str(5) + (part.str(6) == "I" ? "i" : "p");
+    if (part[7].matched)
+        words += " " + frequency_words(part.str(7));
+    return part[8].matched ? words + ends.at(part.str(8)) : words;
 }
+
+std::string reported_mode_words(const std::string& printed)
+{
+    return mode_words(std::string(reported_mode(printed)));
+}
+
+std::string hex_words(const std::string& printed)
+{
+    return std::string(8 - std::min<std::size_t>(printed.size(), 8), '0') + printed;
+}
+
+/** What feeds each plane in a packed order, plane 1 first: `0 1 2 3 4 5 6 7`. */
+std::string sources_words(const std::string& hex)
+{
+    const auto order = number_of(hex, 16);
+    std::vector<std::string> sources;
+    for (unsigned plane = 0; order && plane < 8; ++plane)
+        sources.push_back(std::to_string(*order >> (4 * plane) & 7));
+    return joined(sources, " ");
+}
+
+std::string yuv_words(const std::string& printed)
+{
+    const auto yuv = static_cast<std::uint32_t>(number_of(printed).value_or(0));
+    return "Y " + std::to_string(yuv >> 16 & 0xFF) + " U " + std::to_string(yuv >> 8 & 0xFF) + " V " +
+           std::to_string(yuv & 0xFF);
+}
+
+/** How values of some names are said: as the family names them, and that as it stands in the list, where * is any
+ *  other. What a list cannot say, a function does. */
+struct ValueWords
+{
+    std::string_view names;
+    Family family = Family::None;
+    std::string_view list = {};
+    std::string (*function)(const std::string& printed) = nullptr;
+};
+
+// The names without a prefix stand in sentences alone.
+constexpr ValueWords value_table[] = {
+    { "ucMode,eResMode", Family::None, {}, mode_words },
+    { "eReportedMode", Family::None, {}, reported_mode_words },
+    { "u4PlaneOrder,u4Hardware,u4TestData", Family::None, {}, hex_words },
+    { "sources", Family::None, {}, sources_words },
+    { "yuv", Family::None, {}, yuv_words },
+    { "eColorSpace,eNewColorSpace,eMasterColorSpace,eSrcColorSpace", Family::ColorSpace,
+      "DRV_PMX_CS_YCBCR_601=BT.601,DRV_PMX_CS_YCBCR_709=BT.709,DRV_PMX_CS_RGB=RGB,*=colour space *" },
+    { "u2CompType", Family::ComponentType, "PMX_COMP_TYPE_VDP=video plane,PMX_COMP_TYPE_OSD=OSD plane,*=of type *" },
+    { "standard", Family::TvType, "PMX_TV_TYPE_NTSC=NTSC,PMX_TV_TYPE_PAL=PAL" },
+    { "u4AspectRatio,u4AspNext,u4DigestAsp", Family::Aspect },
+    { "eDgoMode,eDgiMode", Family::CcirMode },
+    { "eDgoFmt,eDgiFmt", Family::CcirFormat },
+    { "fgEnable,fgDigestEnable,ucCAVEn,ucCVBSEn,switch", Family::None, "0=off,1=on,*=on (*)" },
+    { "port", Family::None, "8=no port (8): refused,*=port *" },
+    { "bSetTVE", Family::None, "0=HDMI,*=the analogue outputs" },
+    { "fgApplyOnNext", Family::None, "0=now,*=at the next mode change" },
+    { "format", Family::None, "0=YCbCr 4:4:4,1=RGB,2=xvYCC,3=YCbCr 4:2:2,4=full-range RGB" },
+    { "called", Family::None, "0=no mode was set since the reset,*=set by a mode setting" },
+    { "gamma", Family::None, "0=off,*=curve *" },
+};
 
 std::string named(Family family, const std::string& printed)
 {
@@ -73,98 +115,65 @@ std::string named(Family family, const std::string& printed)
     return name.empty() ? printed : std::string(name);
 }
 
-std::string colour_space_words(const std::string& printed)
+/** A value as a list says it. */
+std::string listed(std::string_view list, const std::string& value)
 {
-    const std::string name = named(Family::ColorSpace, printed);
-    if (name == "DRV_PMX_CS_YCBCR_601")
-        return "BT.601";
-    if (name == "DRV_PMX_CS_YCBCR_709")
-        return "BT.709";
-    return name == "DRV_PMX_CS_RGB" ? "RGB" : "colour space " + name;
-}
-
-std::string component_words(const std::string& printed)
-{
-    const std::string name = named(Family::ComponentType, printed);
-    if (name == "PMX_COMP_TYPE_VDP")
-        return "video plane";
-    return name == "PMX_COMP_TYPE_OSD" ? "OSD plane" : "of type " + name;
-}
-
-std::string switch_words(const std::string& printed)
-{
-    return printed == "0" ? "off" : printed == "1" ? "on" : "on (" + printed + ")";
-}
-
-std::string hex_word(const std::string& printed)
-{
-    return std::string(8 - std::min<std::size_t>(printed.size(), 8), '0') + printed;
-}
-
-struct CapabilityBit
-{
-    unsigned bit;
-    const char* name;
-};
-
-constexpr CapabilityBit modes[] = {
-    { 0, "480i (and 2D 480i 60 Hz)" },
-    { 1, "576i" },
-    { 2, "480p" },
-    { 3, "576p" },
-    { 4, "720p 60 Hz (and its top-and-bottom mode)" },
-    { 5, "720p 50 Hz (and its top-and-bottom mode)" },
-    { 6, "1080i 60 Hz (and its side-by-side mode)" },
-    { 7, "1080i 50 Hz (and its side-by-side mode)" },
-    { 8, "1080p 60 Hz" },
-    { 9, "1080p 50 Hz" },
-    { 10, "1080p 30 Hz" },
-    { 11, "1080p 25 Hz" },
-    { 12, "1080p 24 Hz (and its top-and-bottom mode)" },
-    { 13, "1080p 23.976 Hz" },
-    { 14, "1080p 29.97 Hz (and the top-and-bottom mode of 23 Hz)" },
-    { 15, "all frame-packed 3D modes" },
-    { 16, "640x480" },
-};
-
-constexpr CapabilityBit features[] = {
-    { 20, "gamma" },      { 21, "brightness" },   { 22, "contrast" },  { 23, "hue" },
-    { 24, "saturation" }, { 25, "digital port" }, { 27, "sharpness" }, { 30, "black level" },
-};
-
-template <std::size_t Count>
-std::string bit_words(std::uint32_t word, const CapabilityBit (&bits)[Count], const char* what)
-{
-    std::string set;
-    std::string clear;
-    for (const CapabilityBit& bit : bits)
+    for (const std::string_view item : split(list))
     {
-        std::string& list = (word >> bit.bit & 1) != 0 ? set : clear;
-        list += (list.empty() ? "" : ", ") + std::string(bit.name);
+        const std::size_t equals = item.find('=');
+        if (item.substr(0, equals) != value && !item.starts_with('*'))
+            continue;
+        std::string words(item.substr(equals + 1));
+        const std::size_t place = words.find('*');
+        return place == words.npos ? words : words.replace(place, 1, value);
     }
+    return value;
+}
+
+using Bits = std::map<unsigned, std::string>;
+
+/** What a word admits and refuses of all that hangs on bits. */
+std::string bit_words(std::uint32_t word, const Bits& bits, const std::string& every, const std::string& none)
+{
+    std::vector<std::string> set;
+    std::vector<std::string> clear;
+    for (const auto& [bit, name] : bits)
+        ((word >> bit & 1) != 0 ? set : clear).push_back(name);
     if (clear.empty())
-        return std::string("admits every ") + what + (Count == std::size(features) ? ": " + set : "");
-    if (set.empty())
-        return std::string("admits no ") + what + " that has a bit";
-    return std::string("admits ") + set + "; refuses " + clear;
+        return "admits " + every;
+    return "admits " + (set.empty() ? none : joined(set, ", ") + "; refuses " + joined(clear, ", "));
+}
+
+/** The modes that hang on each bit: `720p 60 Hz (and 3D 720p 60 Hz, top and bottom)`. */
+Bits modes_by_bit()
+{
+    std::map<unsigned, std::vector<std::string>> modes;
+    for (const record_view::ModeRow& mode : record_view::mode_rows())
+    {
+        if (mode.capability)
+            modes[*mode.capability].push_back(mode_words(std::string(mode.name)));
+    }
+    Bits words;
+    for (const auto& [bit, names] : modes)
+    {
+        const std::string others = joined({ names.begin() + 1, names.end() }, ", ");
+        words[bit] = others.empty() ? names.front() : names.front() + " (and " + others + ")";
+    }
+    return words;
 }
 
 } // namespace
 
-std::string mode_words(std::string_view mode)
+std::string mode_words(const std::string& mode)
 {
     if (mode == "(null)")
         return "a mode without a name (4K)";
-    std::string name(mode);
-    if (const auto number = number_of(mode))
-        name = board::names::name_of(Family::ResolutionMode, *number);
-    if (name.empty())
-        return "mode " + std::string(mode) + " (unknown)";
+    const std::string name = named(Family::ResolutionMode, mode);
+    if (number_of(name))
+        return "mode " + name + " (unknown)";
     if (name == "RES_PANEL_AUO_B089AW01")
         return "panel 1024x600";
-    if (!name.starts_with("RES_"))
-        return name;
-    const std::string words = named_mode_words(std::string_view(name).substr(4));
+    const std::string words = name.starts_with("RES_") ? named_mode_words(name.substr(4)) : "";
     return words.empty() ? name : words;
 }
 
@@ -179,67 +188,84 @@ std::string_view reported_mode(std::string_view name)
 
 std::string value_words(std::string_view name, const std::string& printed)
 {
-    if (name == "ucMode" || name == "eResMode")
-        return mode_words(printed);
-    if (name == "eReportedMode")
-        return mode_words(reported_mode(printed));
-    if (name.find("ColorSpace") != name.npos)
-        return colour_space_words(printed);
-    if (name == "u2CompType")
-        return component_words(printed);
-    if (name == "port")
-        return printed == "8" ? "no port (8): refused" : "port " + printed;
-    if (name == "bSetTVE")
-        return printed == "0" ? "HDMI" : "the analogue outputs";
-    if (name == "u4PlaneOrder" || name == "u4Hardware" || name == "u4TestData")
-        return hex_word(printed);
-    if (name == "fgApplyOnNext")
-        return printed == "0" ? "now" : "at the next mode change";
-    if (name == "u4AspectRatio" || name == "u4AspNext" || name == "u4DigestAsp")
-        return named(Family::Aspect, printed);
-    if (name == "eDgoMode" || name == "eDgiMode")
-        return named(Family::CcirMode, printed);
-    if (name == "eDgoFmt" || name == "eDgiFmt")
-        return named(Family::CcirFormat, printed);
-    if (name == "fgEnable" || name == "fgDigestEnable" || name == "ucCAVEn" || name == "ucCVBSEn")
-        return switch_words(printed);
-    return printed;
+    const auto row = std::find_if(std::begin(value_table), std::end(value_table),
+                                  [name](const ValueWords& one) { return has(one.names, name); });
+    if (row == std::end(value_table))
+        return printed;
+    return row->function != nullptr ? row->function(printed) : listed(row->list, named(row->family, printed));
+}
+
+std::string sentence(std::string_view with_names, const std::function<std::string(std::string_view)>& value_of)
+{
+    std::string said;
+    while (!with_names.empty())
+    {
+        const std::size_t open = std::min(with_names.find('{'), with_names.size());
+        const std::size_t close = std::min(with_names.find('}', open), with_names.size());
+        said += with_names.substr(0, open);
+        if (open < close)
+        {
+            const std::string_view name = with_names.substr(open + 1, close - open - 1);
+            const std::size_t colon = name.find(':');
+            const std::string printed = value_of(name.substr(0, colon));
+            said += printed == unknown ? printed : value_words(name.substr(colon + 1), printed);
+        }
+        with_names.remove_prefix(std::min(close + 1, with_names.size()));
+    }
+    return said;
 }
 
 std::string tale_of(const Item& item)
 {
-    std::string tale;
-    std::string_view left = item.text->tale;
-    while (!left.empty())
-    {
-        const std::size_t open = std::min(left.find('{'), left.size());
-        tale += left.substr(0, open);
-        left.remove_prefix(open);
-        if (left.empty())
-            break;
-        const std::size_t close = left.find('}');
-        const std::string_view name = left.substr(1, close - 1);
-        tale += value_words(name, item.value(name));
-        left.remove_prefix(close + 1);
-    }
-    return tale;
+    return sentence(item.text->tale, [&](std::string_view name) { return item.value(name); });
 }
 
 std::vector<std::string> capability_words(std::uint32_t word)
 {
-    char digits[16];
-    std::snprintf(digits, sizeof digits, "0x%08X", word);
-    return { "capability " + std::string(digits) + ": " + bit_words(word, modes, "mode that has a bit"),
-             "of the features it " + bit_words(word, features, "one") };
+    char number[16];
+    std::snprintf(number, sizeof number, "0x%08X", word);
+    const Bits features = record_view::capability_features();
+    std::vector<std::string> names;
+    for (const auto& [bit, name] : features)
+        names.push_back(name);
+    return { "capability " + std::string(number) + ": " +
+                 bit_words(word, modes_by_bit(), "every mode that has a bit", "no mode that has a bit"),
+             "of the features it " +
+                 bit_words(word, features, "every one: " + joined(names, ", "), "no one that has a bit") };
 }
 
-std::string packed_order_words(std::string_view hex)
+std::vector<std::string> printed_names()
 {
-    const auto order = number_of(hex, 16);
-    std::string words;
-    for (unsigned plane = 0; order && plane < 8; ++plane)
-        words += (plane == 0 ? "" : " ") + std::to_string(*order >> (4 * plane) & 7);
-    return words;
+    std::vector<std::string> names;
+    for (const record_view::ModeRow& mode : record_view::mode_rows())
+    {
+        if (mode.printed_name)
+            names.emplace_back(*mode.printed_name);
+    }
+    // The report's list of modes is older than the modes, and has what ended them then.
+    names.insert(names.end(), { "RES_MODE_NUM", "RES_AUTO" });
+    for (const Family family :
+         { Family::CcirMode, Family::CcirFormat, Family::ExtChipUsage, Family::GfxColorMode, Family::ColorSpace })
+    {
+        for (std::int64_t number = 0; !board::names::name_of(family, number).empty(); ++number)
+            names.emplace_back(board::names::name_of(family, number));
+    }
+    std::erase(names, "DRV_RX_BYPASS_TX"); // has no line
+    return names;
+}
+
+std::string_view source_of(const Text& text)
+{
+    constexpr std::string_view sources[] = { "print", "assertion", "file" };
+    return text.level >= 0 ? "log" : sources[level_plain - text.level];
+}
+
+std::string joined(const std::vector<std::string>& texts, std::string_view between)
+{
+    std::string all;
+    for (const std::string& text : texts)
+        all.append(all.empty() ? "" : between).append(text);
+    return all;
 }
 
 std::string counted(std::size_t count, std::string_view what)

@@ -88,7 +88,6 @@ def table(root):
 {includes}
 #include "tools/pmxboard/ipmx.h"
 #include "tools/pmxboard/operation.h"
-#include "tools/pmxboard/session.h"
 
 namespace pmxboard
 {{

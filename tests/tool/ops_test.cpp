@@ -7,6 +7,7 @@
 #include "scenario_run.h"
 #include "tools/pmxboard/command.h"
 #include "tools/pmxboard/contracts.h"
+#include "tools/pmxboard/operation_examples.h"
 #include "tools/pmxboard/ops_command.h"
 
 namespace

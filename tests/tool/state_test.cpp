@@ -9,6 +9,7 @@
 #include "scenario_run.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/state_dump.h"
+#include "tools/pmxboard/state_now.h"
 #include "tools/pmxboard/state_paths.h"
 #include "tools/pmxboard/step_error.h"
 

@@ -9,9 +9,9 @@
 
 #include "board/board.h"
 #include "scenario_run.h"
+#include "tools/pmxboard/apart.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
-#include "tools/pmxboard/what_if.h"
 
 namespace
 {

@@ -6,6 +6,7 @@
 #include "tools/pmxboard/kind.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/text/suggest.h"
 #include "tools/pmxboard/verbs.h"
 
 namespace pmxboard

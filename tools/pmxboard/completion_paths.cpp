@@ -4,6 +4,7 @@
 #include "board/board.h"
 #include "tools/pmxboard/completion_values.h"
 #include "tools/pmxboard/session.h"
+#include "tools/pmxboard/state_now.h"
 #include "tools/pmxboard/state_paths.h"
 #include "tools/record_view/record_view.h"
 

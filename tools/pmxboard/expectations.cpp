@@ -3,7 +3,9 @@
 
 #include "board/board.h"
 #include "tools/pmxboard/session.h"
+#include "tools/pmxboard/state_now.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/text/suggest.h"
 #include "tools/pmxboard/verbs.h"
 #include "tools/record_view/record_view.h"
 #include "tools/record_view/store_watch.h"

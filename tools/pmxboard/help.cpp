@@ -3,11 +3,12 @@
 #include <algorithm>
 
 #include "board/board.h"
+#include "tools/pmxboard/about_mode.h"
+#include "tools/pmxboard/about_operation.h"
 #include "tools/pmxboard/contracts.h"
-#include "tools/pmxboard/modes_command.h"
-#include "tools/pmxboard/ops_command.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/text/suggest.h"
 #include "tools/pmxboard/verbs.h"
 #include "tools/record_view/record_view.h"
 
@@ -76,27 +77,6 @@ std::string slot_text(const Operation& slot, const Look& look)
 }
 
 } // namespace
-
-std::string Look::bold(std::string_view text) const
-{
-    return Paint{ colour }(text, Colour::Bold);
-}
-
-std::vector<std::string_view> names_in(Family family)
-{
-    std::vector<std::pair<std::int64_t, std::string_view>> found;
-    for (const std::string_view name : board::names::all())
-    {
-        const auto number = board::names::number_of(name);
-        if (family != Family::None && number && board::names::name_of(family, *number) == name)
-            found.emplace_back(*number, name);
-    }
-    std::stable_sort(found.begin(), found.end(), [](const auto& a, const auto& b) { return a.first < b.first; });
-    std::vector<std::string_view> names;
-    for (const auto& [number, name] : found)
-        names.push_back(name);
-    return names;
-}
 
 std::vector<std::string_view> help_words()
 {

@@ -16,7 +16,11 @@ struct HeldTable
     void* tag = nullptr;
 };
 
-HeldTable& held_table();
+inline HeldTable& held_table()
+{
+    static HeldTable now;
+    return now;
+}
 
 template <typename Slot, Slot IPMX::*slot>
 struct SlotOf;

@@ -5,6 +5,7 @@
 
 #include "board/tokens.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/text/suggest.h"
 
 namespace pmxboard
 {
@@ -191,6 +192,22 @@ std::optional<std::int64_t> general_constant(std::string_view token)
                                 return is_of(named.family, token, *number);
                             });
     return has_family ? std::nullopt : number;
+}
+
+std::vector<std::string_view> names_in(Family family)
+{
+    std::vector<std::pair<std::int64_t, std::string_view>> found;
+    for (const std::string_view name : board::names::all())
+    {
+        const auto number = board::names::number_of(name);
+        if (family != Family::None && number && board::names::name_of(family, *number) == name)
+            found.emplace_back(*number, name);
+    }
+    std::stable_sort(found.begin(), found.end(), [](const auto& a, const auto& b) { return a.first < b.first; });
+    std::vector<std::string_view> names;
+    for (const auto& [number, name] : found)
+        names.push_back(name);
+    return names;
 }
 
 } // namespace pmxboard

@@ -52,4 +52,7 @@ std::int64_t read_number(board::names::Family family, std::string_view token, co
 /** The number of a name that belongs to no family and so goes with any number: TRUE, FALSE, OSR_OK, PMX_SET_OK, … */
 std::optional<std::int64_t> general_constant(std::string_view token);
 
+/** The names of a family, by number. */
+std::vector<std::string_view> names_in(board::names::Family family);
+
 } // namespace pmxboard

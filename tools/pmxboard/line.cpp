@@ -1,6 +1,5 @@
 #include "tools/pmxboard/line.h"
 
-#include "board/names.h"
 #include "tools/pmxboard/step_error.h"
 
 namespace pmxboard
@@ -77,14 +76,6 @@ Line::Line(std::string_view text)
 std::string Line::from(std::size_t index) const
 {
     return index < m_starts.size() ? m_text.substr(m_starts[index]) : std::string();
-}
-
-std::string did_you_mean(std::string_view wrong, const std::vector<std::string_view>& candidates)
-{
-    std::string text;
-    for (const std::string& name : board::names::nearest(wrong, candidates))
-        text += (text.empty() ? "; did you mean " : ", ") + name;
-    return text.empty() ? text : text + "?";
 }
 
 } // namespace pmxboard

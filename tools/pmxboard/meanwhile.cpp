@@ -10,6 +10,7 @@
 #include "board/meanwhile.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/text/suggest.h"
 #include "tools/pmxboard/verbs.h"
 
 namespace pmxboard

@@ -6,9 +6,6 @@
 #include <string>
 #include <vector>
 
-#include "tools/pmxboard/help.h"
-#include "tools/record_view/mode_table.h"
-
 namespace pmxboard
 {
 
@@ -21,8 +18,5 @@ struct ModesOptions
 
 /** The exit code. */
 int show_modes(const ModesOptions& options, std::ostream& to);
-
-/** All that is decided from a mode, one line each. */
-std::string mode_text(const record_view::ModeRow& mode, const Look& look);
 
 } // namespace pmxboard

@@ -4,10 +4,7 @@
 
 #include <iosfwd>
 #include <string>
-#include <string_view>
 #include <vector>
-
-#include "tools/pmxboard/help.h"
 
 namespace pmxboard
 {
@@ -21,15 +18,5 @@ struct OpsOptions
 
 /** The exit code. */
 int show_operations(const OpsOptions& options, std::ostream& to);
-
-/** A line that works on the default board, and the lines that it needs before it. */
-struct OperationExample
-{
-    std::string_view line;
-    std::vector<std::string_view> before = { "PMX_Init" };
-};
-
-/** Null pointer when there is none, which is a gap. */
-const OperationExample* example_of(std::string_view operation);
 
 } // namespace pmxboard

@@ -117,9 +117,4 @@ private:
 /** `expect …`. Throws StepFailed when it is not met. */
 void check_expectation(Session& session, const Line& line);
 
-/** What the board and the layer hold, all of it. */
-board::Value whole_state();
-/** A part of it. Throws LineError with the nearest paths. */
-board::Value state_at(const std::string& path);
-
 } // namespace pmxboard

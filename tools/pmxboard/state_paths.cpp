@@ -5,6 +5,7 @@
 #include "board/names.h"
 #include "tools/pmxboard/step_error.h"
 #include "tools/pmxboard/text/layout.h"
+#include "tools/pmxboard/text/suggest.h"
 
 namespace pmxboard
 {

@@ -8,6 +8,7 @@
 #include "tools/pmxboard/kind.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/state_dump.h"
+#include "tools/pmxboard/state_now.h"
 #include "tools/pmxboard/state_paths.h"
 #include "tools/pmxboard/step_error.h"
 #include "tools/pmxboard/verbs.h"

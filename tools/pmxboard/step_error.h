@@ -3,9 +3,6 @@
 #pragma once
 
 #include <stdexcept>
-#include <string>
-#include <string_view>
-#include <vector>
 
 namespace pmxboard
 {
@@ -23,8 +20,5 @@ class StepFailed : public std::runtime_error
 public:
     using std::runtime_error::runtime_error;
 };
-
-/** "; did you mean X, Y?", or nothing when no candidate is near. */
-std::string did_you_mean(std::string_view wrong, const std::vector<std::string_view>& candidates);
 
 } // namespace pmxboard

@@ -4,7 +4,7 @@
 #include <string_view>
 
 #include "tools/pmxboard/operation.h"
-#include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/text/suggest.h"
 
 namespace pmxboard
 {

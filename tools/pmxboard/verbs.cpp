@@ -9,6 +9,7 @@
 #include "board/trace.h"
 #include "tools/pmxboard/kind.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/text/suggest.h"
 
 namespace pmxboard
 {

@@ -7,11 +7,22 @@
 #include <string_view>
 #include <vector>
 
+#include "tools/pmxboard/text/paint.h"
+
 namespace pmxboard
 {
 
 /** Where there is no terminal. */
 inline constexpr unsigned usual_width = 80;
+
+/** How a text is to look. */
+struct Look
+{
+    unsigned width = usual_width;
+    bool colour = false;
+
+    std::string bold(std::string_view text) const { return Paint{ colour }(text, Colour::Bold); }
+};
 
 /** Columns for texts: those of the terminal, 100 at most, and 80 where there is none. */
 unsigned text_width();

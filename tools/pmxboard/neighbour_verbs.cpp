@@ -1,8 +1,9 @@
-#include "tools/pmxboard/ipmx.h"
-
+// Verbs for what neighbouring drivers call: the platform, and the table that the mixer registers.
 #include "drv_if.h"
+#include "tools/pmxboard/ipmx.h"
 #include "tools/pmxboard/session.h"
 #include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/text/suggest.h"
 #include "tools/pmxboard/verbs.h"
 
 namespace pmxboard
@@ -14,17 +15,6 @@ std::int64_t number_of_tag(void* tag)
 {
     return static_cast<std::int64_t>(reinterpret_cast<std::uintptr_t>(tag));
 }
-
-} // namespace
-
-HeldTable& held_table()
-{
-    static HeldTable now;
-    return now;
-}
-
-namespace
-{
 
 void call_slot(Session& session, const Words& given)
 {

@@ -1,5 +1,5 @@
 // A line for every operation that works as it stands on the default board.
-#include "tools/pmxboard/ops_command.h"
+#include "tools/pmxboard/operation_examples.h"
 
 namespace pmxboard
 {

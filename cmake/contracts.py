@@ -43,7 +43,7 @@ def main():
     output, = sys.argv[1:]
     functions_text = "\n".join(row for header in (LAYER_HEADER, *PLATFORM_HEADERS) for row in rows(header))
     pathlib.Path(output).write_text(f"""// Written from the headers when the tool is built.
-#include "tools/pmxboard/contracts.h"
+#include "tools/pmxboard/functions/contracts.h"
 
 namespace pmxboard
 {{

@@ -4,8 +4,8 @@ platform that a neighbouring driver would call, and the slots of the mixer's tab
 
 usage: operations.py OUTPUT     the tables behind operations(), neighbours() and ipmx_slots()
 
-How an argument is written is told by its type (tools/pmxboard/operation.h). What the type does not tell is told by the
-header: see pointers.py.
+How an argument is written is told by its type (tools/pmxboard/functions/operation.h). What the type does not tell is
+told by the header: see pointers.py.
 """
 
 import pathlib
@@ -86,8 +86,8 @@ def table(root):
     includes = "\n".join(f'#include "{pathlib.Path(header).name}"' for header in headers)
     return f"""// Written from the headers when the tool is built.
 {includes}
-#include "tools/pmxboard/ipmx.h"
-#include "tools/pmxboard/operation.h"
+#include "tools/pmxboard/functions/ipmx.h"
+#include "tools/pmxboard/functions/operation.h"
 
 namespace pmxboard
 {{

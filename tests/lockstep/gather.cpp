@@ -8,7 +8,7 @@
 
 #include "tests/lockstep/gathered.h"
 #include "tests/lockstep/lockstep.h"
-#include "tools/pmxboard/runner.h"
+#include "tools/pmxboard/language/runner.h"
 #include "tools/record_view/record_layout.h"
 
 namespace lockstep

@@ -9,7 +9,7 @@
 #include <nlohmann/json.hpp>
 
 #include "scenario_run.h"
-#include "tools/pmxboard/chrome_trace.h"
+#include "tools/pmxboard/view/chrome_trace.h"
 
 namespace
 {

@@ -5,10 +5,10 @@
 #include <fstream>
 
 #include "board/board.h"
-#include "tools/pmxboard/completion.h"
-#include "tools/pmxboard/help.h"
-#include "tools/pmxboard/session.h"
-#include "tools/pmxboard/verbs.h"
+#include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/language/verbs.h"
+#include "tools/pmxboard/prompt/completion.h"
+#include "tools/pmxboard/prompt/help.h"
 
 namespace
 {

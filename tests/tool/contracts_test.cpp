@@ -3,11 +3,11 @@
 
 #include "board/board.h"
 #include "scenario_run.h"
-#include "tools/pmxboard/contracts.h"
-#include "tools/pmxboard/help.h"
-#include "tools/pmxboard/session.h"
-#include "tools/pmxboard/step_error.h"
-#include "tools/pmxboard/verbs.h"
+#include "tools/pmxboard/functions/contracts.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/language/verbs.h"
+#include "tools/pmxboard/prompt/help.h"
 
 namespace
 {

@@ -3,7 +3,7 @@
 #include <algorithm>
 
 #include "scenario_run.h"
-#include "tools/pmxboard/diff.h"
+#include "tools/pmxboard/state/diff.h"
 
 namespace
 {

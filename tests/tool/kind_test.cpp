@@ -1,9 +1,9 @@
-#include "tools/pmxboard/kind.h"
+#include "tools/pmxboard/functions/kind.h"
 
 #include <gtest/gtest.h>
 
-#include "tools/pmxboard/operation.h"
-#include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/functions/operation.h"
 
 namespace
 {

@@ -1,8 +1,8 @@
-#include "tools/pmxboard/line.h"
+#include "tools/pmxboard/language/line.h"
 
 #include <gtest/gtest.h>
 
-#include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/functions/errors.h"
 
 namespace
 {

@@ -8,10 +8,10 @@
 #include "board/threads.h"
 #include "drv_pmx.h"
 #include "scenario_run.h"
-#include "tools/pmxboard/completion.h"
-#include "tools/pmxboard/operation.h"
-#include "tools/pmxboard/session.h"
-#include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/functions/operation.h"
+#include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/prompt/completion.h"
 
 namespace
 {

@@ -5,9 +5,10 @@
 #include <regex>
 #include <sstream>
 
-#include "tools/pmxboard/command.h"
-#include "tools/pmxboard/help.h"
-#include "tools/pmxboard/modes_command.h"
+#include "tools/pmxboard/commands/exit_codes.h"
+#include "tools/pmxboard/commands/modes.h"
+#include "tools/pmxboard/prompt/about_mode.h"
+#include "tools/pmxboard/prompt/help.h"
 
 namespace
 {

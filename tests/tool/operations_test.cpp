@@ -1,10 +1,10 @@
-#include "tools/pmxboard/operation.h"
+#include "tools/pmxboard/functions/operation.h"
 
 #include <gtest/gtest.h>
 
 #include "scenario_run.h"
-#include "tools/pmxboard/session.h"
-#include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/session.h"
 
 namespace
 {

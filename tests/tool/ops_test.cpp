@@ -5,10 +5,11 @@
 
 #include "board/board.h"
 #include "scenario_run.h"
-#include "tools/pmxboard/command.h"
-#include "tools/pmxboard/contracts.h"
-#include "tools/pmxboard/operation_examples.h"
-#include "tools/pmxboard/ops_command.h"
+#include "tools/pmxboard/commands/exit_codes.h"
+#include "tools/pmxboard/commands/ops.h"
+#include "tools/pmxboard/functions/contracts.h"
+#include "tools/pmxboard/functions/operation_examples.h"
+#include "tools/pmxboard/text/layout.h"
 
 namespace
 {

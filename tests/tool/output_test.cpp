@@ -7,8 +7,8 @@
 #include <nlohmann/json.hpp>
 
 #include "scenario_run.h"
-#include "tools/pmxboard/output.h"
-#include "tools/pmxboard/state_paths.h"
+#include "tools/pmxboard/state/paths.h"
+#include "tools/pmxboard/view/output.h"
 
 namespace
 {

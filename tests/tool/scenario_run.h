@@ -9,7 +9,7 @@
 #include <string_view>
 #include <vector>
 
-#include "tools/pmxboard/runner.h"
+#include "tools/pmxboard/language/runner.h"
 
 namespace tool_test
 {

@@ -7,7 +7,7 @@
 #include <iterator>
 
 #include "program_run.h"
-#include "tools/pmxboard/shell_command.h"
+#include "tools/pmxboard/commands/shell.h"
 
 namespace
 {

@@ -7,11 +7,11 @@
 
 #include "board/board.h"
 #include "scenario_run.h"
-#include "tools/pmxboard/session.h"
-#include "tools/pmxboard/state_dump.h"
-#include "tools/pmxboard/state_now.h"
-#include "tools/pmxboard/state_paths.h"
-#include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/state/dump.h"
+#include "tools/pmxboard/state/now.h"
+#include "tools/pmxboard/state/paths.h"
 
 namespace
 {

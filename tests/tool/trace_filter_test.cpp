@@ -1,7 +1,7 @@
 #include <gtest/gtest.h>
 
 #include "scenario_run.h"
-#include "tools/pmxboard/trace_filter.h"
+#include "tools/pmxboard/view/trace_filter.h"
 
 namespace
 {

@@ -8,8 +8,8 @@
 #include "drv_if.h"
 #include "drv_if_pmx.h"
 #include "scenario_run.h"
-#include "tools/pmxboard/session.h"
-#include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/session.h"
 
 namespace
 {

@@ -9,9 +9,10 @@
 
 #include "board/board.h"
 #include "scenario_run.h"
-#include "tools/pmxboard/apart.h"
-#include "tools/pmxboard/session.h"
-#include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/apart.h"
+#include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/state/now.h"
 
 namespace
 {

@@ -11,8 +11,8 @@
 #include <vector>
 
 #include "drv_if.h"
-#include "tools/pmxboard/session.h"
-#include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/session.h"
 
 namespace cost
 {

@@ -1,4 +1,4 @@
-#include "tools/pmxboard/cli.h"
+#include "tools/pmxboard/commands/command_line.h"
 
 int main(int count, char** arguments)
 {

@@ -4,9 +4,9 @@
 
 #include "board/board.h"
 #include "tools/pmxboard/decode/against.h"
-#include "tools/pmxboard/output.h"
-#include "tools/pmxboard/session.h"
-#include "tools/pmxboard/step_error.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/view/output.h"
 
 namespace pmxboard::decode
 {

@@ -1,0 +1,223 @@
+#include "tools/pmxboard/commands/command_line.h"
+
+#include <functional>
+#include <iostream>
+#include <sstream>
+
+// The one place of the tool that knows the argument parser: it compiles slowly.
+#include <CLI/CLI.hpp>
+
+#include "tools/pmxboard/commands/decode.h"
+#include "tools/pmxboard/commands/examples.h"
+#include "tools/pmxboard/commands/exit_codes.h"
+#include "tools/pmxboard/commands/modes.h"
+#include "tools/pmxboard/commands/ops.h"
+#include "tools/pmxboard/commands/run.h"
+#include "tools/pmxboard/commands/shell.h"
+#include "tools/pmxboard/commands/state.h"
+#include "tools/pmxboard/prompt/help.h"
+#include "tools/pmxboard/text/layout.h"
+#include "tools/pmxboard/view/trace_sink.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+constexpr const char* version = "pmxboard 0.1.0";
+
+/** What the chosen sub-command does when everything is parsed; set by the sub-command's own callback. */
+using Chosen = std::function<int()>;
+
+/** --color, for every sub-command that paints what it prints; see wants_colour(). */
+void add_colour(CLI::App* sub, std::string& when)
+{
+    sub->add_option("--color,--colour", when, "Colour: auto (on a terminal, unless NO_COLOR is set), always or never")
+        ->check(CLI::IsMember({ "auto", "always", "never" }).description(""))
+        ->type_name("auto|always|never");
+}
+
+/** The parser's own help, its descriptions folded to 80 columns. Examples stay as they are, for they are copied. */
+std::string folded_help(const CLI::App* app, const std::string& name, CLI::AppFormatMode mode)
+{
+    constexpr unsigned description_column = 30; // where the parser begins descriptions
+    std::istringstream lines(CLI::Formatter().make_help(app, name, mode));
+    std::string text;
+    bool in_examples = false;
+    for (std::string line; std::getline(lines, line);)
+    {
+        in_examples = in_examples || line.starts_with("Examples:");
+        text += in_examples || line.empty() ? line + "\n" : wrapped(line, usual_width, 0, description_column);
+    }
+    return text;
+}
+
+/* One function for each sub-command: its options, and what it does with them. */
+
+void add_run(CLI::App& app, Chosen& chosen)
+{
+    const auto run = std::make_shared<RunOptions>();
+    CLI::App* const sub =
+        app.add_subcommand("run", "Run scenarios, each on a board of its own; stop at the first that fails.");
+    sub->add_option("FILE", run->files, "Scenarios; - reads the standard input")->required();
+    sub->add_option("--board", run->board, "Board to power on: a name under boards/, a directory or a .toml file")
+        ->type_name("NAME|FILE");
+    std::vector<std::string> forms;
+    std::string types;
+    std::string meanings;
+    for (const TraceForm& form : trace_forms())
+    {
+        const bool is_last = &form == &trace_forms().back();
+        forms.emplace_back(form.name);
+        types.append(types.empty() ? "" : "|").append(form.name);
+        meanings.append(meanings.empty() ? "" : is_last ? " or " : ", ").append(form.name);
+        meanings += form.meaning.empty() ? "" : " (" + std::string(form.meaning) + ")";
+    }
+    sub->add_option("--trace-format", run->trace_format, "How to show platform calls: " + meanings)
+        ->check(CLI::IsMember(forms).description(""))
+        ->type_name(types);
+    sub->add_option("--trace-file", run->trace_file, "Write the trace there instead of among the rest")
+        ->type_name("FILE");
+    sub->add_flag("--stores", run->stores, "Show what is stored into the layer's record between two calls");
+    sub->add_option("--only", run->only,
+                    "Show only platform functions whose names begin so, and stores for SET; it may be repeated")
+        ->delimiter(',')
+        ->allow_extra_args(false)
+        ->type_name("PREFIX[,PREFIX]");
+    sub->add_option("--op", run->operations, "Show only what these operations of the layer cause; it may be repeated")
+        ->delimiter(',')
+        ->allow_extra_args(false)
+        ->type_name("NAME[,NAME]");
+    add_colour(sub, run->colour);
+    sub->add_flag("-q,--quiet", run->quiet, "Show failures only");
+    sub->add_flag("-v,--verbose", run->verbose, "Show arguments by name, and expectations");
+    sub->footer(run_examples);
+    sub->callback([run, &chosen] { chosen = [run] { return run_files(*run); }; });
+}
+
+void add_state(CLI::App& app, Chosen& chosen)
+{
+    const auto state = std::make_shared<StateOptions>();
+    CLI::App* const sub = app.add_subcommand("state", "Show a saved state, or what differs between two.");
+    sub->add_option("FILE", state->file, "A state that a scenario saved; - reads the standard input")->required();
+    sub->add_option("OTHER|PATH", state->words,
+                    "Another state to compare with, and paths of what is wanted; all when there are none")
+        ->type_name("");
+    sub->add_flag("--json", state->json, "JSON for programs");
+    add_colour(sub, state->colour);
+    sub->add_flag("-q,--quiet", state->quiet, "Show nothing, but end with the exit code");
+    sub->footer(state_examples);
+    sub->callback([state, &chosen] { chosen = [state] { return show_state(*state); }; });
+}
+
+void add_shell(CLI::App& app, Chosen& chosen)
+{
+    const auto shell = std::make_shared<ShellOptions>();
+    CLI::App* const sub =
+        app.add_subcommand("shell", "The scenario language at a prompt, or line by line from a pipe.");
+    sub->add_option("--board", shell->board, "Board to power on: a name under boards/, a directory or a .toml file")
+        ->type_name("NAME|FILE");
+    add_colour(sub, shell->colour);
+    sub->add_flag("-q,--quiet", shell->quiet, "Show failures only");
+    sub->add_flag("-v,--verbose", shell->verbose, "Show arguments by name, and expectations");
+    sub->footer(shell_examples);
+    sub->callback([shell, &chosen] { chosen = [shell] { return run_shell(*shell); }; });
+
+    const auto line = std::make_shared<std::string>();
+    CLI::App* const completion = app.add_subcommand("complete", "What may stand at the end of a line of the shell.");
+    completion->add_option("LINE", *line, "The line as far as it is written")->required();
+    completion->group("");
+    completion->callback([line, &chosen] { chosen = [line] { return print_completions(*line, std::cout); }; });
+}
+
+void add_guide(CLI::App& app, Chosen& chosen)
+{
+    CLI::App* const sub = app.add_subcommand("guide", "The tables of the guide to scenarios.");
+    sub->group("");
+    sub->callback([&chosen] {
+        chosen = [] {
+            std::cout << guide_tables();
+            return exit_done;
+        };
+    });
+}
+
+void add_ops(CLI::App& app, Chosen& chosen)
+{
+    const auto ops = std::make_shared<OpsOptions>();
+    CLI::App* const sub = app.add_subcommand("ops", "The operations of the layer: arguments, contract, example.");
+    sub->add_option("NAME", ops->names, "Operations, or functions of the platform; * stands for anything");
+    sub->add_flag("--json", ops->json, "JSON for programs");
+    add_colour(sub, ops->colour);
+    sub->footer(ops_examples);
+    sub->callback([ops, &chosen] { chosen = [ops] { return show_operations(*ops, std::cout); }; });
+}
+
+void add_modes(CLI::App& app, Chosen& chosen)
+{
+    const auto modes = std::make_shared<ModesOptions>();
+    CLI::App* const sub =
+        app.add_subcommand("modes", "The resolution modes, with all that the layer decides from them.");
+    sub->add_option("NAME", modes->modes, "Modes, by name or number");
+    sub->add_flag("--json", modes->json, "JSON for programs");
+    add_colour(sub, modes->colour);
+    sub->footer(modes_examples);
+    sub->callback([modes, &chosen] { chosen = [modes] { return show_modes(*modes, std::cout); }; });
+}
+
+void add_decode(CLI::App& app, Chosen& chosen)
+{
+    const auto decode = std::make_shared<DecodeOptions>();
+    CLI::App* const sub = app.add_subcommand(
+        "decode", "Read a captured console log: what the layer did, and where it departs from a scenario.");
+    sub->add_option("FILE", decode->file, "A log; - reads the standard input");
+    sub->add_option("--against", decode->against,
+                    "Find the first departure from what the layer prints in this scenario")
+        ->type_name("SCENARIO");
+    sub->add_option("--level", decode->level,
+                    "Compare lines of this level of PMX_IsLog and below; else the highest that the log shows")
+        ->check(CLI::Range(0, 31))
+        ->needs("--against");
+    sub->add_option("--board", decode->board,
+                    "Board for the scenario: a name under boards/, a directory or a .toml file")
+        ->needs("--against")
+        ->type_name("NAME|FILE");
+    sub->add_flag("--texts", decode->texts, "Show every text that the layer prints, with operation and step");
+    sub->add_flag("--json", decode->json, "JSON for programs");
+    add_colour(sub, decode->colour);
+    sub->add_flag("-q,--quiet", decode->quiet, "Show problems only; with --against a departure only");
+    sub->add_flag("-v,--verbose", decode->verbose, "Show every line, with operation and step");
+    sub->footer(decode_examples);
+    sub->callback([decode, &chosen] { chosen = [decode] { return decode_log(*decode); }; });
+}
+
+} // namespace
+
+int run_command_line(int count, const char* const* arguments)
+{
+    CLI::App app{ "The mixer layer on a virtual board." };
+    app.formatter_fn(folded_help);
+    app.set_version_flag("--version", version);
+    app.require_subcommand(1);
+    app.footer(overview_examples);
+
+    Chosen chosen;
+    add_run(app, chosen);
+    add_state(app, chosen);
+    add_shell(app, chosen);
+    add_guide(app, chosen);
+    add_ops(app, chosen);
+    add_modes(app, chosen);
+    add_decode(app, chosen);
+    try
+    {
+        app.parse(count, arguments);
+    }
+    catch (const CLI::ParseError& error)
+    {
+        return app.exit(error) == 0 ? exit_done : exit_usage;
+    }
+    return chosen();
+}
+
+} // namespace pmxboard

@@ -1,0 +1,14 @@
+#include "tools/pmxboard/commands/exit_codes.h"
+
+#include <iostream>
+
+namespace pmxboard
+{
+
+int usage_error(const std::string& message)
+{
+    std::cerr << "pmxboard: " << message << '\n';
+    return exit_usage;
+}
+
+} // namespace pmxboard

@@ -1,0 +1,194 @@
+#include "tools/pmxboard/commands/shell.h"
+
+#include <unistd.h>
+
+#include <cstdlib>
+#include <iostream>
+
+#include "board/board.h"
+#include "tools/pmxboard/commands/exit_codes.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/runner.h"
+#include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/prompt/completion.h"
+#include "tools/pmxboard/prompt/editor.h"
+#include "tools/pmxboard/prompt/help.h"
+#include "tools/pmxboard/view/output.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+const std::vector<std::string> shell_words = { "help", "quit", "exit" };
+
+/** The lines of one shell, carried out one after the other. */
+class Shell
+{
+public:
+    Shell(const ShellOptions& options, bool interactive)
+        : m_interactive(interactive), m_output(output_options(options, interactive)),
+          m_session(m_output, options.board.empty() ? "default" : options.board, "."), m_look{
+              text_width(), wants_colour(options.colour)
+          }
+    {
+    }
+
+    /** Before the first line: completion looks into the board. */
+    void power_on() { m_session.power_on({}); }
+
+    /** Carry a line out; false when it ends the shell. */
+    bool run(const std::string& text)
+    {
+        ++m_number;
+        try
+        {
+            const Line line(text);
+            if (line.empty())
+                return true;
+            if (line.word(0) == "quit" || line.word(0) == "exit")
+            {
+                if (line.size() != 1)
+                    throw LineError("write: " + line.word(0));
+                return false;
+            }
+            if (line.word(0) == "help")
+                help(line);
+            else
+                m_session.run_line(text);
+        }
+        catch (const std::exception& error)
+        {
+            report(error.what());
+        }
+        return true;
+    }
+
+    /** The end of all lines; the exit code. */
+    int finish()
+    {
+        try
+        {
+            m_session.finish();
+        }
+        catch (const StepFailed& error)
+        {
+            report(error.what());
+            return exit_failed;
+        }
+        return m_failed && !m_interactive ? exit_failed : exit_done;
+    }
+
+private:
+    static OutputOptions output_options(const ShellOptions& shell, bool interactive)
+    {
+        OutputOptions output;
+        output.quiet = shell.quiet;
+        output.verbose = shell.verbose;
+        output.colour = wants_colour(shell.colour);
+        output.echo = !interactive;
+        output.to = &std::cout;
+        return output;
+    }
+
+    void help(const Line& line)
+    {
+        m_output.flush();
+        if (line.size() == 1)
+            std::cout << shell_help(m_look);
+        for (std::size_t i = 1; i < line.size(); ++i)
+            std::cout << (i == 1 ? "" : "\n") << help_on(line.word(i), m_look);
+    }
+
+    void report(const char* message)
+    {
+        m_failed = true;
+        m_output.flush();
+        std::cout.flush();
+        if (!m_interactive)
+            std::cerr << "<stdin>:" << m_number << ": ";
+        std::cerr << presentable(message) << '\n';
+    }
+
+    bool m_interactive;
+    Output m_output;
+    Session m_session;
+    Look m_look;
+    unsigned m_number = 0;
+    bool m_failed = false;
+};
+
+bool is_terminal()
+{
+    return isatty(STDIN_FILENO) == 1 && isatty(STDOUT_FILENO) == 1;
+}
+
+/** The history's place, made where it does not exist; empty when it cannot be. */
+std::filesystem::path usable_history()
+{
+    const std::filesystem::path file = history_file();
+    std::error_code error;
+    if (file.has_parent_path())
+        std::filesystem::create_directories(file.parent_path(), error);
+    return error ? std::filesystem::path() : file;
+}
+
+void greet(const std::string& board)
+{
+    std::cout << "The mixer layer on board " << (board.empty() ? "default" : board)
+              << ". Tab completes, help tells more, Ctrl-D ends.\n";
+}
+
+} // namespace
+
+std::filesystem::path history_file()
+{
+    if (const char* const chosen = std::getenv("PMXBOARD_HISTORY"))
+        return chosen;
+    const char* const state = std::getenv("XDG_STATE_HOME");
+    if (state != nullptr && *state == '/')
+        return std::filesystem::path(state) / "pmxboard" / "history";
+    const char* const home = std::getenv("HOME");
+    if (home == nullptr || *home != '/')
+        return {};
+    return std::filesystem::path(home) / ".local" / "state" / "pmxboard" / "history";
+}
+
+int run_shell(const ShellOptions& options)
+{
+    try
+    {
+        board::load_description(options.board.empty() ? "default" : options.board);
+    }
+    catch (const board::DescriptionError& error)
+    {
+        return usage_error(error.what());
+    }
+    const bool interactive = is_terminal();
+    Shell shell(options, interactive);
+    shell.power_on();
+    if (interactive)
+        greet(options.board);
+    const auto complete_here = [](std::string_view line, std::size_t cursor) {
+        return complete(line, cursor, { ".", shell_words });
+    };
+    const auto lines = interactive ? make_editor({ "pmx> ", usable_history(), complete_here }) : make_plain_source();
+    std::optional<std::string> line;
+    bool goes_on = true;
+    while (goes_on && (line = lines->read()))
+    {
+        if (line->find_first_not_of(" \t\r") != line->npos)
+            lines->remember(*line);
+        goes_on = shell.run(*line);
+    }
+    return shell.finish();
+}
+
+int print_completions(const std::string& line, std::ostream& to)
+{
+    for (const std::string& candidate : complete(line, line.size(), { ".", shell_words }).candidates)
+        to << candidate << '\n';
+    return exit_done;
+}
+
+} // namespace pmxboard

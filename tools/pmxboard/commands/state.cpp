@@ -1,0 +1,121 @@
+#include "tools/pmxboard/commands/state.h"
+
+#include <filesystem>
+#include <fstream>
+#include <iostream>
+#include <iterator>
+
+#include "tools/pmxboard/commands/exit_codes.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/state/dump.h"
+#include "tools/pmxboard/state/paths.h"
+#include "tools/pmxboard/text/paint.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+constexpr int exit_differs = 1;
+
+StateDump load(const std::string& name)
+{
+    std::error_code ignored;
+    if (name != "-" && std::filesystem::is_directory(name, ignored))
+        throw DumpError(name + " is a directory");
+    std::ifstream file;
+    if (name != "-")
+        file.open(name, std::ios::binary);
+    if (name != "-" && !file)
+        throw DumpError("cannot read " + name);
+    std::istream& in = name == "-" ? std::cin : file;
+    const std::string text{ std::istreambuf_iterator<char>(in), {} };
+    try
+    {
+        return read_dump(text);
+    }
+    catch (const DumpError& error)
+    {
+        throw DumpError((name == "-" ? "<stdin>" : name) + ": " + error.what());
+    }
+}
+
+/** Whether a word means a file: no path of a state looks like that. */
+bool is_file(const std::string& word)
+{
+    std::error_code ignored;
+    return word == "-" || word.find('/') != word.npos || word.ends_with(".json") ||
+           std::filesystem::is_regular_file(word, ignored);
+}
+
+int print(const StateOptions& options)
+{
+    const StateDump dump = load(options.file);
+    NamedValues values;
+    for (const std::string& path : options.words)
+        values.emplace_back(path, part_of(dump.state, path));
+    if (options.quiet)
+        return exit_done;
+    if (values.empty() && options.json)
+        std::cout << to_json(dump) << '\n';
+    else if (options.json)
+        std::cout << to_json(dump.board, values) << '\n';
+    else
+        std::cout << to_text(values.empty() ? NamedValues{ { "", dump.state } } : values);
+    return exit_done;
+}
+
+/** The words behind the second file are paths; each leads somewhere in one of the states. */
+std::vector<std::string> paths_to_compare(const StateOptions& options, const StateDump& older, const StateDump& newer)
+{
+    std::vector<std::string> paths;
+    for (auto word = options.words.begin() + 1; word != options.words.end(); ++word)
+    {
+        try
+        {
+            part_of(older.state, *word);
+        }
+        catch (const LineError&)
+        {
+            part_of(newer.state, *word);
+        }
+        paths.push_back(*word);
+    }
+    return paths;
+}
+
+int compare(const StateOptions& options)
+{
+    const std::string& other = options.words.front();
+    if (options.file == "-" && other == "-")
+        return usage_error("the standard input holds one state only");
+    const StateDump older = load(options.file);
+    const StateDump newer = load(other);
+    const std::vector<Change> found =
+        changes_at(changes(older.state, newer.state), paths_to_compare(options, older, newer));
+    if (options.json && !options.quiet)
+        std::cout << to_json(found) << '\n';
+    else if (!options.quiet && !found.empty())
+    {
+        const Paint paint{ wants_colour(options.colour) };
+        std::cout << paint("--- " + options.file + "\n+++ " + other, Colour::Bold) << '\n' << to_text(found);
+    }
+    return found.empty() ? exit_done : exit_differs;
+}
+
+} // namespace
+
+int show_state(const StateOptions& options)
+{
+    try
+    {
+        const int code = !options.words.empty() && is_file(options.words.front()) ? compare(options) : print(options);
+        return std::cout.flush() ? code : usage_error("cannot write to the standard output");
+    }
+    catch (const std::runtime_error& error)
+    {
+        return usage_error(error.what());
+    }
+}
+
+} // namespace pmxboard

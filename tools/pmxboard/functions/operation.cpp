@@ -1,0 +1,153 @@
+#include "tools/pmxboard/functions/operation.h"
+
+#include <algorithm>
+
+#include "tools/pmxboard/functions/errors.h"
+
+namespace pmxboard
+{
+
+using board::Value;
+using board::names::Family;
+
+Values read_arguments(const Operation& operation, std::span<const std::string> words)
+{
+    Values values;
+    std::size_t next = 0;
+    for (const Parameter& parameter : operation.parameters)
+    {
+        const bool written = next < words.size();
+        if (parameter.may_be_null && written && words[next] == "null")
+        {
+            values.push_back(Value::null());
+            ++next;
+        }
+        else if (parameter.is_output && written && words[next] == "null")
+            throw LineError(parameter.name + " may not be null: " + operation.name + " does not test it");
+        else if (parameter.is_output)
+            values.push_back(Value::number(0));
+        else if (written)
+            values.push_back(read_value(parameter.kind, words[next++], parameter.name));
+        else
+            throw LineError(parameter.name + " is missing: " + usage(operation));
+    }
+    if (next < words.size())
+        throw LineError(words[next] + " is too much: " + usage(operation));
+    if (operation.check)
+        operation.check(values);
+    return values;
+}
+
+std::string usage(const Operation& operation)
+{
+    std::string text = operation.name;
+    for (const Parameter& parameter : operation.parameters)
+    {
+        if (!parameter.is_output)
+            text += " " + parameter.name;
+    }
+    return text;
+}
+
+std::string to_json(const Outcome& outcome)
+{
+    const std::string result = outcome.result ? "\"result\":" + outcome.result->to_json() : std::string();
+    std::string outputs;
+    for (const OutputValue& output : outcome.outputs)
+    {
+        outputs += (outputs.empty() ? "" : ",") + Value::text(output.name).to_json() + ":" +
+                   (output.value ? output.value->to_json() : "\"untouched\"");
+    }
+    return "{" + result + (result.empty() || outputs.empty() ? "" : ",") +
+           (outputs.empty() ? "" : "\"outputs\":{" + outputs + "}") + "}";
+}
+
+const Operation* find(const std::vector<Operation>& table, std::string_view name)
+{
+    for (const Operation& operation : table)
+    {
+        if (operation.name == name)
+            return &operation;
+    }
+    return nullptr;
+}
+
+std::vector<std::string_view> names_of(const std::vector<Operation>& table)
+{
+    std::vector<std::string_view> names;
+    for (const Operation& operation : table)
+        names.push_back(operation.name);
+    return names;
+}
+
+namespace
+{
+
+std::vector<std::span<PMX_RESOLUTION_T>>& lent_outputs()
+{
+    static std::vector<std::span<PMX_RESOLUTION_T>> all;
+    return all;
+}
+
+Kind number_kind(unsigned bits, Family family)
+{
+    return { Kind::Form::Number, bits, false, family, 0, {}, {} };
+}
+
+template <typename T>
+T field(const Value& record, std::string_view path)
+{
+    return static_cast<T>(record.find(path)->as_number());
+}
+
+} // namespace
+
+Parameter Argument<const char*>::describe(std::string_view, const ParameterName& name)
+{
+    Parameter parameter{ .name = name.name, .is_output = false, .may_be_null = false, .kind = {} };
+    parameter.kind.form = Kind::Form::Text;
+    return parameter;
+}
+
+LentOutputs::LentOutputs(std::span<PMX_RESOLUTION_T> outputs) : m_outputs(outputs)
+{
+    if (!outputs.empty())
+        lent_outputs().push_back(outputs);
+}
+
+LentOutputs::~LentOutputs()
+{
+    // Not the last one when threads end in another order than they began.
+    std::erase_if(lent_outputs(), [this](const auto& lent) { return lent.data() == m_outputs.data(); });
+}
+
+std::span<PMX_RESOLUTION_T> LentOutputs::innermost()
+{
+    return lent_outputs().empty() ? std::span<PMX_RESOLUTION_T>() : lent_outputs().back();
+}
+
+Kind RecordKind<PMX_RESOLUTION_T>::kind()
+{
+    Kind port{ Kind::Form::Record, 0, false, Family::None, 0, { "eDgoMode", "eDgoFmt", "eDgiMode", "eDgiFmt" }, {} };
+    port.members = { number_kind(32, Family::CcirMode), number_kind(32, Family::CcirFormat),
+                     number_kind(32, Family::CcirMode), number_kind(32, Family::CcirFormat) };
+    Kind output{
+        Kind::Form::Record, 0, false, Family::None, 0, { "fgOutputEnable", "eResMode", "u4VFreq", "eCcirDrvInfo" }, {}
+    };
+    output.members = { number_kind(8, Family::None), number_kind(32, Family::ResolutionMode),
+                       number_kind(32, Family::None), port };
+    return output;
+}
+
+PMX_RESOLUTION_T RecordKind<PMX_RESOLUTION_T>::from(const Value& value)
+{
+    return { field<BOOL>(value, "fgOutputEnable"),
+             field<PMX_RESOLUTION_MODE_T>(value, "eResMode"),
+             field<UINT32>(value, "u4VFreq"),
+             { field<CCIR_IN_OUT_MODE_T>(value, "eCcirDrvInfo.eDgoMode"),
+               field<CCIR_IN_OUT_FORMAT_T>(value, "eCcirDrvInfo.eDgoFmt"),
+               field<CCIR_IN_OUT_MODE_T>(value, "eCcirDrvInfo.eDgiMode"),
+               field<CCIR_IN_OUT_FORMAT_T>(value, "eCcirDrvInfo.eDgiFmt") } };
+}
+
+} // namespace pmxboard

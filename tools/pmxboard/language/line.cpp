@@ -1,0 +1,81 @@
+#include "tools/pmxboard/language/line.h"
+
+#include "tools/pmxboard/functions/errors.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+constexpr std::string_view blanks = " \t\r\n\v\f";
+
+char closing_of(char open)
+{
+    return open == '[' ? ']' : open == '{' ? '}' : ')';
+}
+
+/** Index behind the quote that closes the one at `open`. */
+std::size_t behind_quotes(std::string_view text, std::size_t open)
+{
+    for (std::size_t i = open + 1; i < text.size(); ++i)
+    {
+        if (text[i] == '\\')
+            ++i;
+        else if (text[i] == '"')
+            return i + 1;
+    }
+    throw LineError("a quote does not close: " + std::string(text.substr(open)));
+}
+
+/** Index behind the word that begins at `start`. */
+std::size_t behind_word(std::string_view text, std::size_t start)
+{
+    std::string open;
+    std::size_t i = start;
+    while (i < text.size())
+    {
+        const char c = text[i];
+        if (open.empty() && (blanks.find(c) != blanks.npos || c == '#'))
+            break;
+        if (c == '"')
+        {
+            i = behind_quotes(text, i);
+            continue;
+        }
+        if (c == '[' || c == '{' || c == '(')
+            open += c;
+        else if (c == ']' || c == '}' || c == ')')
+        {
+            if (open.empty() || closing_of(open.back()) != c)
+                throw LineError(std::string("a '") + c + "' closes nothing: " + std::string(text.substr(start)));
+            open.pop_back();
+        }
+        ++i;
+    }
+    if (!open.empty())
+        throw LineError(std::string("a '") + open.back() + "' does not close: " + std::string(text.substr(start)));
+    return i;
+}
+
+} // namespace
+
+Line::Line(std::string_view text)
+{
+    std::size_t i = 0;
+    std::size_t end = 0;
+    while ((i = text.find_first_not_of(blanks, i)) != text.npos && text[i] != '#')
+    {
+        end = behind_word(text, i);
+        m_words.emplace_back(text.substr(i, end - i));
+        m_starts.push_back(i);
+        i = end;
+    }
+    m_text = text.substr(0, end);
+}
+
+std::string Line::from(std::size_t index) const
+{
+    return index < m_starts.size() ? m_text.substr(m_starts[index]) : std::string();
+}
+
+} // namespace pmxboard

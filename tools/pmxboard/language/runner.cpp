@@ -1,0 +1,106 @@
+#include "tools/pmxboard/language/runner.h"
+
+#include <algorithm>
+#include <istream>
+#include <ostream>
+
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/session.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+std::filesystem::path directory_of(const std::string& name)
+{
+    return name == "-" ? std::filesystem::path(".") : std::filesystem::path(name).parent_path();
+}
+
+/** Whether a line is about `diff`, by itself or within another command. */
+bool mentions_changes(const std::string& text)
+try
+{
+    const Line line(text);
+    return std::find(line.words().begin(), line.words().end(), "diff") != line.words().end();
+}
+catch (const LineError&)
+{
+    return false; // told when its turn comes
+}
+
+/** Whether a line of a file is. Keeping the state before each command costs more than most commands. What comes through
+ *  a pipe is not read ahead: somebody may be typing it. */
+bool asks_for_changes(std::istream& lines)
+{
+    const auto begin = lines.tellg();
+    if (begin < 0)
+    {
+        lines.clear();
+        return true;
+    }
+    bool found = false;
+    for (std::string text; !found && std::getline(lines, text);)
+        found = mentions_changes(text);
+    lines.clear();
+    lines.seekg(begin);
+    return found;
+}
+
+} // namespace
+
+std::string presentable(std::string_view message)
+{
+    constexpr std::size_t most = 500;
+    constexpr std::string_view hex = "0123456789abcdef";
+    std::string line;
+    for (const char c : message.substr(0, most))
+    {
+        const auto byte = static_cast<unsigned char>(c);
+        if (byte >= 0x20 && byte != 0x7F)
+            line += c;
+        else
+            line.append("\\x").append(1, hex[byte >> 4]).append(1, hex[byte & 0xF]);
+    }
+    return message.size() > most ? line + "…" : line;
+}
+
+bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOptions& options,
+                  std::ostream& diagnostics)
+{
+    Output output(options);
+    Session session(output, scenario.board, directory_of(scenario.name));
+    session.watch_changes(scenario.name == "-" || asks_for_changes(lines));
+    const std::string file = scenario.name == "-" ? "<stdin>" : scenario.name;
+    if (options.trace != nullptr)
+        options.trace->scenario(file);
+    unsigned number = 0;
+    const auto location = [&] { return file + ":" + std::to_string(number) + ": "; };
+    try
+    {
+        std::string text;
+        while (std::getline(lines, text))
+        {
+            ++number;
+            session.run_line(text);
+        }
+        session.finish();
+    }
+    catch (const LineError& error)
+    {
+        output.flush();
+        diagnostics << location() << presentable(error.what()) << '\n';
+        return false;
+    }
+    catch (const std::exception& error)
+    {
+        output.flush();
+        diagnostics << location() << presentable(error.what()) << '\n' << "repeat: " << scenario.repeat << '\n';
+        return false;
+    }
+    if (session.expectations() != 0)
+        output.text(file + ": " + std::to_string(session.expectations()) + " expectations met\n");
+    return true;
+}
+
+} // namespace pmxboard

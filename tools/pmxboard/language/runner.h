@@ -1,0 +1,29 @@
+/** @file
+ *  Run a scenario from its first line to its last, or to the first that is wrong or fails. */
+#pragma once
+
+#include <iosfwd>
+#include <string>
+#include <string_view>
+
+#include "tools/pmxboard/view/output.h"
+
+namespace pmxboard
+{
+
+struct Scenario
+{
+    std::string name;   ///< as the user wrote it; "-" for the standard input
+    std::string board;  ///< for `power-on` without a name
+    std::string repeat; ///< the command that runs it again
+};
+
+/** Whether every line was carried out and every expectation met. What was not is said on `diagnostics`, with file and
+ *  line. */
+bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOptions& options,
+                  std::ostream& diagnostics);
+
+/** A message that quotes a scenario, fit for a terminal: one line of bearable length, without control characters. */
+std::string presentable(std::string_view message);
+
+} // namespace pmxboard

@@ -1,0 +1,310 @@
+#include "tools/pmxboard/language/session.h"
+
+#include <algorithm>
+#include <utility>
+
+#include "board/board.h"
+#include "board/console.h"
+#include "board/threads.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/verbs.h"
+#include "tools/pmxboard/state/now.h"
+#include "tools/pmxboard/state/paths.h"
+#include "tools/record_view/record_view.h"
+#include "tools/record_view/store_watch.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+/** Where the outcome of a command goes that runs inside a platform call, in each thread; null when none does. */
+thread_local Outcome* meanwhile_outcome = nullptr;
+
+/** An outcome in a notice: "= 1, *pucMode = RES_480P". */
+std::string to_text(const Outcome& outcome)
+{
+    std::string text = outcome.result ? "= " + outcome.result->to_text() : std::string();
+    for (const OutputValue& output : outcome.outputs)
+    {
+        text += (text.empty() ? "*" : ", *") + output.name +
+                (output.value ? " = " + output.value->to_text() : std::string(" untouched"));
+    }
+    return text;
+}
+
+} // namespace
+
+Session::Session(Output& output, std::string board, std::filesystem::path directory)
+    : m_output(output), m_board(std::move(board)), m_directory(std::move(directory))
+{
+    board::set_console([this](std::string_view text) { m_output.console(text); });
+    board::trace::set_sink([this](const board::TraceEntry& entry) {
+        if (entry.kind == board::TraceEntry::Kind::Notice && entry.function == "misuse")
+            m_last_misuse = entry.text;
+        m_output.entry(entry);
+    });
+    record_view::watch_stores(m_output.shows_stores());
+}
+
+Session::~Session()
+{
+    board::set_console({});
+    board::trace::set_sink({});
+    board::meanwhiles::forget_all();
+    board::threads::end_all();
+    record_view::watch_stores(false);
+}
+
+void Session::run_line(std::string_view text)
+{
+    const Line line(text);
+    if (line.empty())
+        return;
+    if (line.word(0) == "expect")
+    {
+        m_output.expectation(line.from(0));
+        need_power({});
+        check_expectation(*this, line);
+        ++m_expectations;
+        return;
+    }
+    m_output.command(line.from(0));
+    try
+    {
+        run_command(line);
+    }
+    catch (...)
+    {
+        m_output.flush();
+        board::meanwhiles::forget_failures(); // the first one that was told is enough
+        throw;
+    }
+    m_output.flush();
+}
+
+void Session::run_command(const Line& line)
+{
+    const std::string& name = line.word(0);
+    const Command command = find_command(name);
+    need_power(name);
+    if (command.verb == nullptr || !command.verb->only_looks)
+    {
+        forget_the_past();
+        remember(line);
+    }
+    begin_window();
+    carry_out(line);
+    board::trace::look();
+    if (m_window_end == std::string::npos)
+        end_window();
+    board::meanwhiles::rethrow_failure();
+}
+
+void Session::carry_out(const Line& line)
+{
+    const Command command = find_command(line.word(0));
+    if (command.verb != nullptr)
+    {
+        const ReadForm read = read_form(*command.verb, line);
+        read.form->run(*this, read.words);
+    }
+    else
+        run(*command.operation, read_arguments(*command.operation, std::span(line.words()).subspan(1)));
+}
+
+void Session::run_meanwhile(const Line& line)
+{
+    Outcome outcome;
+    Outcome* const outer = std::exchange(meanwhile_outcome, &outcome);
+    try
+    {
+        carry_out(line);
+    }
+    catch (...)
+    {
+        meanwhile_outcome = outer;
+        throw;
+    }
+    meanwhile_outcome = outer;
+    if (const std::string text = to_text(outcome); !text.empty())
+        board::trace::notice("meanwhile", text);
+}
+
+bool Session::is_meanwhile()
+{
+    return meanwhile_outcome != nullptr;
+}
+
+void Session::watch_stores(bool on)
+{
+    m_watches_stores = on;
+    record_view::watch_stores(on || m_output.shows_stores());
+}
+
+/** Nobody looks further back than the last command. In large pieces, so that it costs next to nothing. */
+void Session::forget_the_past()
+{
+    constexpr std::size_t many_entries = 4096;
+    constexpr std::size_t much_text = 65536;
+    if (board::trace::entries().size() > many_entries)
+        board::trace::clear();
+    if (board::console::printed() > much_text)
+        board::console::forget();
+}
+
+void Session::remember(const Line& line)
+{
+    m_last_command = line.from(0);
+    m_before.reset();
+    if (m_watches && m_powered)
+        m_before = whole_state();
+}
+
+std::vector<Change> Session::changes() const
+{
+    return m_before ? pmxboard::changes(*m_before, whole_state()) : std::vector<Change>();
+}
+
+void Session::imagine(std::string_view text, std::ostream& shown)
+{
+    m_imagines = true;
+    m_output.imagine(shown);
+    run_command(Line(text));
+    m_output.flush();
+}
+
+void Session::need_power(std::string_view command)
+{
+    if (!m_powered && command != "power-on")
+        power_on({});
+}
+
+void Session::run(const Operation& operation, const Values& values)
+{
+    Outcome outcome;
+    {
+        const board::trace::Operation scope(operation.name);
+        if (!is_meanwhile())
+            m_output.operation_begins(operation.name);
+        outcome = operation.run(values);
+    }
+    set_outcome(operation.name, std::move(outcome));
+}
+
+void Session::set_outcome(std::string operation, Outcome outcome)
+{
+    if (is_meanwhile())
+    {
+        *meanwhile_outcome = std::move(outcome);
+        return;
+    }
+    m_last_operation = std::move(operation);
+    m_last_outcome = std::move(outcome);
+    m_output.outcome(m_last_outcome);
+}
+
+void Session::power_on(const std::string& board)
+{
+    if (m_powered)
+    {
+        board::threads::end_all();
+        check_misuses();
+        check_meanwhiles();
+    }
+    const std::string& name = board.empty() ? m_board : board;
+    const std::filesystem::path beside = m_directory / name;
+    const bool is_file = name.find('/') != name.npos || name.ends_with(".toml");
+    const bool from_scenario = !board.empty() && is_file && std::filesystem::exists(beside);
+    try
+    {
+        const board::Description description = board::load_description(from_scenario ? beside.string() : name);
+        board::power_on(description);
+    }
+    catch (const board::DescriptionError& error)
+    {
+        throw StepFailed(std::string("the board cannot be powered on: ") + error.what());
+    }
+    m_powered = true;
+    m_before.reset();
+    m_output.powered_on();
+    m_misuses_expected = 0;
+    m_last_operation.clear();
+    m_last_outcome = {};
+    begin_window();
+}
+
+void Session::begin_window()
+{
+    if (is_meanwhile())
+        return;
+    m_window_begin = board::trace::entries().size();
+    m_window_end = std::string::npos;
+    m_cursor = 0;
+    m_console_begin = board::console::printed();
+    m_console_end = std::string::npos;
+}
+
+void Session::end_window()
+{
+    if (is_meanwhile())
+        return;
+    m_window_end = board::trace::entries().size();
+    m_console_end = board::console::printed();
+}
+
+std::vector<board::TraceEntry> Session::window() const
+{
+    const auto& all = board::trace::entries();
+    const std::size_t end = std::min(m_window_end, all.size());
+    const std::size_t begin = std::min(m_window_begin, end);
+    std::vector<board::TraceEntry> window(all.begin() + static_cast<std::ptrdiff_t>(begin),
+                                          all.begin() + static_cast<std::ptrdiff_t>(end));
+    // What a scenario expects does not depend on how it is shown.
+    if (!m_watches_stores)
+        std::erase_if(window, [](const auto& entry) { return entry.kind == board::TraceEntry::Kind::Store; });
+    return window;
+}
+
+std::string Session::console_window() const
+{
+    return board::console::printed(m_console_begin, m_console_end);
+}
+
+std::filesystem::path Session::file(const std::string& name) const
+{
+    return m_directory / name;
+}
+
+void Session::check_misuses() const
+{
+    if (board::misuses() <= m_misuses_expected)
+        return;
+    throw StepFailed("the platform was misused " + std::to_string(board::misuses()) + " times, and " +
+                     std::to_string(m_misuses_expected) + " were expected; the last: " + m_last_misuse);
+}
+
+/** What was to happen and has not: the scenario's author has miscounted, or armed the wrong function. */
+void Session::check_meanwhiles() const
+{
+    const auto armed = board::meanwhiles::armed();
+    board::meanwhiles::forget_all();
+    if (armed.empty())
+        return;
+    const auto& first = armed.front();
+    throw StepFailed(first.name + ": never happened; " + first.function + " was called " + std::to_string(first.calls) +
+                     " times since");
+}
+
+void Session::finish()
+{
+    m_output.flush();
+    if (!m_powered)
+        return;
+    board::threads::end_all();
+    m_output.flush();
+    check_misuses();
+    check_meanwhiles();
+}
+
+} // namespace pmxboard

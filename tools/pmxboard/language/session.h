@@ -1,0 +1,120 @@
+/** @file
+ *  A scenario that runs: it carries lines out, one after the other, and remembers what expectations look at. */
+#pragma once
+
+#include <cstdint>
+#include <filesystem>
+#include <iosfwd>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "board/trace.h"
+#include "board/value.h"
+#include "tools/pmxboard/functions/operation.h"
+#include "tools/pmxboard/language/line.h"
+#include "tools/pmxboard/state/diff.h"
+#include "tools/pmxboard/view/output.h"
+
+namespace pmxboard
+{
+
+class Session
+{
+public:
+    /** @param board      what `power-on` without a name takes
+     *  @param directory  what file names in the scenario are relative to */
+    Session(Output& output, std::string board, std::filesystem::path directory);
+    ~Session();
+    Session(const Session&) = delete;
+    Session& operator=(const Session&) = delete;
+
+    /** Carry out one line. Throws LineError or StepFailed. */
+    void run_line(std::string_view text);
+    /** The scenario ends. Throws StepFailed when the board found a misuse that no line expected. */
+    void finish();
+
+    unsigned expectations() const { return m_expectations; }
+
+    /** Whether the state is kept before each command, for `diff`. It is, unless a scenario that never asks for the
+     *  differences turns it off. */
+    void watch_changes(bool on) { m_watches = on; }
+
+    /* For verbs */
+
+    Output& output() { return m_output; }
+    /** A file named in the scenario. */
+    std::filesystem::path file(const std::string& name) const;
+    /** Power the board on; an empty name takes the session's own board. */
+    void power_on(const std::string& board);
+    /** Call an operation and remember its outcome. */
+    void run(const Operation& operation, const Values& values);
+    /** Remember a result that a verb has. */
+    void set_outcome(std::string operation, Outcome outcome);
+    /** What the command does from here on, or did until here, is what expectations look at. */
+    void begin_window();
+    void end_window();
+
+    /** Have stores in the trace from now on, where expectations see them; or no more. */
+    void watch_stores(bool on);
+    bool watches_stores() const { return m_watches_stores; }
+    /** Carry a command out from inside a platform call: what it does is the running command's, its outcome a notice. */
+    void run_meanwhile(const Line& line);
+    /** Whether such a command is running. */
+    static bool is_meanwhile();
+
+    /** What the last command changed that did not only look. */
+    std::vector<Change> changes() const;
+    const std::string& last_command() const { return m_last_command; }
+    /** Carry a line out in a process that is about to end: its effects are nobody's. */
+    void imagine(std::string_view text, std::ostream& shown);
+    bool imagines() const { return m_imagines; }
+
+    /* For expectations */
+
+    const std::string& last_operation() const { return m_last_operation; }
+    const Outcome& last_outcome() const { return m_last_outcome; }
+    /** What the last command left in the trace, and how much of it expectations have gone through. */
+    std::vector<board::TraceEntry> window() const;
+    std::size_t cursor() const { return m_cursor; }
+    void set_cursor(std::size_t cursor) { m_cursor = cursor; }
+    /** What the last command printed on the console. */
+    std::string console_window() const;
+    void expect_misuses(unsigned count) { m_misuses_expected = count; }
+
+private:
+    void run_command(const Line& line);
+    void carry_out(const Line& line);
+    void check_meanwhiles() const;
+    /** A scenario that does not begin with power-on has a board all the same. */
+    void need_power(std::string_view command);
+    void check_misuses() const;
+    void remember(const Line& line);
+    static void forget_the_past();
+
+    Output& m_output;
+    std::string m_board;
+    std::filesystem::path m_directory;
+    bool m_powered = false;
+    unsigned m_expectations = 0;
+    unsigned m_misuses_expected = 0;
+    std::string m_last_misuse;
+    bool m_watches = true;
+    bool m_imagines = false;
+    bool m_watches_stores = false;
+    std::string m_last_command;
+    std::optional<board::Value> m_before; ///< the state that the last command found; not for power-on
+    std::string m_last_operation;
+    Outcome m_last_outcome;
+    std::size_t m_window_begin = 0;
+    std::size_t m_window_end = 0;
+    std::size_t m_cursor = 0;
+    std::size_t m_console_begin = 0;
+    std::size_t m_console_end = 0;
+};
+
+/** `expect …`. Throws StepFailed when it is not met. */
+void check_expectation(Session& session, const Line& line);
+
+} // namespace pmxboard

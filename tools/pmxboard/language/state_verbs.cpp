@@ -1,0 +1,110 @@
+// Verbs for what board and layer hold.
+#include <cerrno>
+#include <cstring>
+#include <fstream>
+
+#include "board/board.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/functions/kind.h"
+#include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/language/verbs.h"
+#include "tools/pmxboard/state/diff.h"
+#include "tools/pmxboard/state/dump.h"
+#include "tools/pmxboard/state/now.h"
+#include "tools/pmxboard/state/paths.h"
+#include "tools/record_view/record_view.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+using board::Value;
+
+StateDump dump_of_now()
+{
+    return { board::description().name, whole_state() };
+}
+
+std::string line_for_programs(const NamedValues& values)
+{
+    std::string lines;
+    for (const auto& [path, value] : values)
+    {
+        lines += lines.empty() ? "" : "\n";
+        lines += R"({"kind":"state","version":)" + std::to_string(state_schema_version) + R"(,"path":)" +
+                 Value::text(path).to_json() + R"(,"value":)" + value.to_json() + "}";
+    }
+    return lines;
+}
+
+void show_state(Session& session, const Words& words)
+{
+    const std::vector<std::string> paths = words.all("PATH");
+    NamedValues values;
+    for (const std::string& path : paths)
+        values.emplace_back(path, state_at(path));
+    if (paths.empty())
+        values.emplace_back("", whole_state());
+    const std::string json = paths.empty() ? to_json(dump_of_now()) : to_json(dump_of_now().board, values);
+    session.output().shown(line_for_programs(values), words.has("--json") ? json + "\n" : to_text(values));
+}
+
+void show_changes(Session& session, const Words& words)
+{
+    const std::vector<std::string> paths = words.all("PATH");
+    for (const std::string& path : paths)
+        state_at(path);
+    const std::vector<Change> found = changes_at(session.changes(), paths);
+    const std::string for_people = found.empty() ? "  nothing changed\n" : to_text(found);
+    session.output().shown(R"({"kind":"diff","command":)" + Value::text(session.last_command()).to_json() +
+                               R"(,"changes":)" + to_json_list(found) + "}",
+                           words.has("--json") ? to_json(found) + "\n" : for_people);
+}
+
+void save(Session& session, const Words& words)
+{
+    if (session.imagines())
+        throw LineError("save writes a file, and what-if changes nothing");
+    const std::string& name = words.at("FILE");
+    errno = 0;
+    std::ofstream file(name, std::ios::binary);
+    file << to_json(dump_of_now()) << '\n';
+    if (!file.flush())
+        throw StepFailed("cannot write " + name + (errno != 0 ? std::string(": ") + std::strerror(errno) : ""));
+    session.output().text("  saved to " + name + "\n");
+}
+
+void poke(Session&, const Words& words)
+{
+    try
+    {
+        const board::trace::By scope(Session::is_meanwhile() ? "meanwhile" : "poke");
+        const record_view::FieldType field = record_view::type_of(words.at("FIELD"));
+        const auto family = board::names::family_of(field.record, field.member);
+        record_view::set(words.at("FIELD"), read_number(family, words.at("VALUE"), field.path));
+    }
+    catch (const record_view::FieldError& error)
+    {
+        throw LineError(error.what());
+    }
+}
+
+} // namespace
+
+std::vector<Verb> state_verbs()
+{
+    return {
+        { "state",
+          { { "state [PATH…] [--json]", "show what board and layer hold, or parts of it", show_state } },
+          true },
+        { "diff",
+          { { "diff [PATH…] [--json]", "show what the last command changed, of everything or at these paths",
+              show_changes } },
+          true },
+        { "save", { { "save FILE", "write the whole state to a file, relative to where the tool runs", save } }, true },
+        { "poke", { { "poke FIELD VALUE", "change the layer's record, for what no operation can set", poke } } },
+    };
+}
+
+} // namespace pmxboard

@@ -1,0 +1,33 @@
+// Verbs for what the run shows.
+#include "tools/pmxboard/functions/kind.h"
+#include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/language/verbs.h"
+
+namespace pmxboard
+{
+
+std::vector<Verb> view_verbs()
+{
+    return {
+        { "trace",
+          { { "trace on", "show platform calls from here on",
+              [](Session& session, const Words&) { session.output().show_trace(true); } },
+            { "trace off", "show them no more",
+              [](Session& session, const Words&) { session.output().show_trace(false); } } },
+          true },
+        { "stores",
+          { { "stores on",
+              "have stores into the layer's objects in the trace from here on, where expectations see them",
+              [](Session& session, const Words&) { session.watch_stores(true); } },
+            { "stores off", "or no more", [](Session& session, const Words&) { session.watch_stores(false); } } },
+          true },
+        { "print",
+          { { "print \"text\"", "show a text",
+              [](Session& session, const Words& words) {
+                  session.output().text(read_text(words.at("\"text\""), "the text"));
+              } } },
+          true },
+    };
+}
+
+} // namespace pmxboard

@@ -1,0 +1,209 @@
+// The one place of the tool that knows the line editor's library.
+#include "tools/pmxboard/prompt/editor.h"
+
+#include <iostream>
+
+#ifdef PMX_HAS_LIBEDIT
+#include <histedit.h>
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cstdio>
+
+#include "tools/pmxboard/prompt/help.h"
+#endif
+
+namespace pmxboard
+{
+namespace
+{
+
+class PlainSource : public LineSource
+{
+public:
+    explicit PlainSource(std::string prompt) : m_prompt(std::move(prompt)) {}
+
+    std::optional<std::string> read() override
+    {
+        if (!m_prompt.empty())
+            std::cout << m_prompt << std::flush;
+        std::string line;
+        if (!std::getline(std::cin, line))
+            return std::nullopt;
+        return line;
+    }
+
+private:
+    std::string m_prompt;
+};
+
+#ifdef PMX_HAS_LIBEDIT
+
+constexpr int kept_lines = 1000;
+
+class Editor : public LineSource
+{
+public:
+    explicit Editor(EditorOptions options) : m_options(std::move(options))
+    {
+        HistEvent event{};
+        m_history = history_init();
+        history(m_history, &event, H_SETSIZE, kept_lines);
+        history(m_history, &event, H_SETUNIQUE, 1);
+        if (!m_options.history.empty())
+            history(m_history, &event, H_LOAD, m_options.history.c_str());
+
+        m_editor = el_init("pmxboard", stdin, stdout, stderr);
+        el_set(m_editor, EL_CLIENTDATA, this);
+        el_set(m_editor, EL_PROMPT, &Editor::prompt);
+        el_set(m_editor, EL_EDITOR, "emacs");
+        el_set(m_editor, EL_HIST, history, m_history);
+        // The names stay with the editor; its narrow form would clone them for good.
+        el_wset(m_editor, EL_ADDFN, L"pmx-complete", L"complete the word", &Editor::on_complete);
+        el_set(m_editor, EL_BIND, "^I", "pmx-complete", nullptr);
+        el_set(m_editor, EL_BIND, "^R", "em-inc-search-prev", nullptr);
+        el_wset(m_editor, EL_ADDFN, L"pmx-drop-line", L"drop the line", &Editor::on_drop);
+        el_set(m_editor, EL_BIND, "^C", "pmx-drop-line", nullptr);
+        // While a line is edited Ctrl-C is a key like any other; while a command runs it ends the tool as ever.
+        el_set(m_editor, EL_SETTY, "-d", "-isig", nullptr);
+        el_set(m_editor, EL_SIGNAL, 1);
+        el_source(m_editor, nullptr);
+    }
+
+    ~Editor() override
+    {
+        el_end(m_editor);
+        history_end(m_history);
+    }
+
+    std::optional<std::string> read() override
+    {
+        std::cout.flush();
+        int count = 0;
+        const char* text = nullptr;
+        do
+        {
+            m_dropped = false;
+            text = el_gets(m_editor, &count);
+        }
+        while (m_dropped);
+        if (text == nullptr || count <= 0)
+        {
+            std::cout << '\n';
+            return std::nullopt;
+        }
+        std::string line(text, static_cast<std::size_t>(count));
+        if (line.ends_with('\n'))
+            line.pop_back();
+        return line;
+    }
+
+    void remember(const std::string& line) override
+    {
+        HistEvent event{};
+        history(m_history, &event, H_ENTER, line.c_str());
+        // At once: a shell that is ended by a signal has its history, too.
+        if (!m_options.history.empty())
+            history(m_history, &event, H_SAVE, m_options.history.c_str());
+    }
+
+private:
+    static Editor& self(EditLine* editor)
+    {
+        void* data = nullptr;
+        el_get(editor, EL_CLIENTDATA, &data);
+        return *static_cast<Editor*>(data);
+    }
+
+    static char* prompt(EditLine* editor) { return self(editor).m_options.prompt.data(); }
+
+    static unsigned char on_drop(EditLine* editor, int)
+    {
+        self(editor).m_dropped = true;
+        std::fputs("^C\n", stdout);
+        std::fflush(stdout);
+        return CC_EOF;
+    }
+
+    static unsigned char on_complete(EditLine* editor, int) { return self(editor).complete_word(); }
+
+    unsigned char complete_word()
+    {
+        const LineInfo* const info = el_line(m_editor);
+        const std::string line(info->buffer, static_cast<std::size_t>(info->lastchar - info->buffer));
+        const auto cursor = static_cast<std::size_t>(info->cursor - info->buffer);
+        const Completion completion = m_options.complete(line, cursor);
+        if (completion.candidates.empty())
+            return CC_REFRESH_BEEP;
+
+        const std::string written = line.substr(completion.begin, cursor - completion.begin);
+        std::string insert = completion.common().substr(written.size());
+        const bool single = completion.candidates.size() == 1;
+        const bool at_blank = cursor < line.size() && line[cursor] == ' ';
+        if (single && is_whole(completion.candidates[0]) && !at_blank)
+            insert += ' ';
+        if (!insert.empty())
+            el_insertstr(m_editor, insert.c_str());
+        if (single || !insert.empty())
+            return CC_REFRESH;
+        list(completion.candidates);
+        return CC_REDISPLAY;
+    }
+
+    /** All candidates below the line; what does not fit the screen only when the user says so. */
+    void list(const std::vector<std::string>& candidates)
+    {
+        winsize window{};
+        const bool known = ioctl(STDOUT_FILENO, TIOCGWINSZ, &window) == 0 && window.ws_col != 0 && window.ws_row != 0;
+        const std::string text = in_columns(candidates, known ? window.ws_col : 80u);
+        const auto lines = std::count(text.begin(), text.end(), '\n');
+        std::fputc('\n', stdout);
+        if (lines >= (known ? window.ws_row : 24))
+        {
+            std::fprintf(stdout, "%zu candidates; show them all? (y or n) ", candidates.size());
+            std::fflush(stdout);
+            char key = 0;
+            const bool yes = el_getc(m_editor, &key) == 1 && (key == 'y' || key == 'Y');
+            std::fputc('\n', stdout);
+            if (!yes)
+                return;
+        }
+        std::fputs(text.c_str(), stdout);
+        std::fflush(stdout);
+    }
+
+    EditorOptions m_options;
+    History* m_history = nullptr;
+    EditLine* m_editor = nullptr;
+    bool m_dropped = false;
+};
+
+#endif
+
+} // namespace
+
+std::unique_ptr<LineSource> make_editor(const EditorOptions& options)
+{
+#ifdef PMX_HAS_LIBEDIT
+    return std::make_unique<Editor>(options);
+#else
+    return std::make_unique<PlainSource>(options.prompt);
+#endif
+}
+
+std::unique_ptr<LineSource> make_plain_source()
+{
+    return std::make_unique<PlainSource>(std::string());
+}
+
+bool has_editor()
+{
+#ifdef PMX_HAS_LIBEDIT
+    return true;
+#else
+    return false;
+#endif
+}
+
+} // namespace pmxboard

@@ -1,0 +1,107 @@
+#include "tools/pmxboard/state/paths.h"
+
+#include <string_view>
+
+#include "board/names.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/text/layout.h"
+#include "tools/pmxboard/text/suggest.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+using board::Value;
+
+/** The groups of the state that are the layer's own; a path may leave them out. */
+constexpr const char* layer_groups[] = { "record", "status", "module" };
+
+void collect_paths(const Value& value, const std::string& path, std::vector<std::string>& into)
+{
+    if (!path.empty())
+        into.push_back(path);
+    for (std::size_t i = 0; i < value.items().size(); ++i)
+    {
+        const std::string step = value.kind() == Value::Kind::List ? item_step(i)
+                                 : path.empty()                    ? value.keys()[i]
+                                                                   : "." + value.keys()[i];
+        collect_paths(value.items()[i], path + step, into);
+    }
+}
+
+/** A value as an indented tree, members that fit into a line on one. */
+std::string tree(const board::Value& value, std::size_t indent)
+{
+    std::string text;
+    const bool is_list = value.kind() == board::Value::Kind::List;
+    for (std::size_t i = 0; i < value.items().size(); ++i)
+    {
+        const board::Value& member = value.items()[i];
+        const std::string head = std::string(indent, ' ') + (is_list ? item_step(i) : value.keys()[i]);
+        const std::string line = head + " = " + member.to_text();
+        if (member.items().empty() || line.size() <= usual_width)
+            text += line + "\n";
+        else
+            text += head + "\n" + tree(member, indent + 2);
+    }
+    return text;
+}
+
+} // namespace
+
+std::string item_step(std::size_t index)
+{
+    return std::string("[").append(std::to_string(index)).append("]");
+}
+
+std::string plain_path(std::string path)
+{
+    for (std::size_t open = path.find('['); open != path.npos; open = path.find('[', open + 1))
+    {
+        const std::size_t close = path.find(']', open);
+        if (close == path.npos)
+            break;
+        const std::string name = path.substr(open + 1, close - open - 1);
+        if (const auto number = board::names::number_of(name))
+            path.replace(open + 1, name.size(), std::to_string(*number));
+    }
+    return path;
+}
+
+Value part_of(const Value& state, const std::string& written)
+{
+    const std::string path = plain_path(written);
+    if (const Value* const found = path.empty() ? nullptr : state.find(path))
+        return *found;
+    for (const char* const group : layer_groups)
+    {
+        if (const Value* const found = path.empty() ? nullptr : state.find(group + ("." + path)))
+            return *found;
+    }
+    std::vector<std::string> paths;
+    collect_paths(state, {}, paths);
+    for (const char* const group : layer_groups)
+    {
+        if (const Value* const members = state.find(group))
+            collect_paths(*members, {}, paths);
+    }
+    throw LineError("no state " + written + did_you_mean(path, { paths.begin(), paths.end() }));
+}
+
+std::string to_text(const NamedValues& values)
+{
+    std::string text;
+    for (const auto& [path, value] : values)
+    {
+        const bool is_tree = !value.items().empty();
+        const bool is_alone = values.size() == 1;
+        if (!is_tree)
+            text += "  " + (path.empty() ? "" : path + " = ") + value.to_text() + "\n";
+        else
+            text += (is_alone ? "" : "  " + path + "\n") + tree(value, is_alone ? 2 : 4);
+    }
+    return text;
+}
+
+} // namespace pmxboard

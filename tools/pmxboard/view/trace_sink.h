@@ -1,0 +1,62 @@
+/** @file
+ *  A form in which the trace is shown. A new one is a class, and a row of trace_forms(). */
+#pragma once
+
+#include <functional>
+#include <memory>
+#include <span>
+#include <string>
+#include <string_view>
+
+#include "board/trace.h"
+#include "tools/pmxboard/functions/operation.h"
+
+namespace pmxboard
+{
+
+/** Hears what happens in a run. Whatever it has nothing to say to it leaves alone. */
+class TraceSink
+{
+public:
+    TraceSink() = default;
+    TraceSink(const TraceSink&) = delete;
+    TraceSink& operator=(const TraceSink&) = delete;
+    virtual ~TraceSink() = default;
+
+    /** What runs from here on. */
+    virtual void scenario(const std::string&) {}
+    virtual void powered_on() {}
+    virtual void command(std::string_view) {}
+    virtual void operation_begins(const std::string&) {}
+    virtual void operation_ends(const Outcome&) {}
+    /** The command is done: everything that it began has ended. */
+    virtual void settle() {}
+    /** What is to be written for an entry now; nothing for one that is only to be heard (`shown` false). */
+    virtual std::string entry(const board::TraceEntry& entry, bool shown) = 0;
+
+    /** Whether programs read it: then nothing for people stands in the same stream. */
+    virtual bool is_for_programs() const { return true; }
+    /** Whether each line stands for itself, so that others may stand between. */
+    virtual bool has_lines() const { return false; }
+};
+
+struct TraceOptions
+{
+    bool verbose = false; ///< arguments by name
+    bool colour = false;
+    bool apart = false; ///< it goes somewhere else than what people read
+};
+
+struct TraceForm
+{
+    std::string_view name;    ///< as --trace-format has it
+    std::string_view meaning; ///< where the name does not tell it
+    std::function<std::unique_ptr<TraceSink>(const TraceOptions& options, std::ostream& to)> make;
+};
+
+/** All forms, the usual one first. */
+std::span<const TraceForm> trace_forms();
+/** The form of this name. */
+const TraceForm& trace_form(std::string_view name);
+
+} // namespace pmxboard

@@ -43,6 +43,11 @@ NOT_IN_THE_LAYER = [
      "is a header of neither the compiler nor the kernel"),
 ]
 
+# The wings of the tool, from the bottom up: a file includes what stands in its own wing or further down.
+TOOL = "tools/pmxboard/"
+WINGS = ("text", "functions", "state", "view", "language", "prompt", "decode", "commands")
+INCLUDE = re.compile(r'^#include "tools/pmxboard/(\w+)/', re.M)
+
 
 def files(root):
     for path in sorted(root.rglob("*")):
@@ -116,6 +121,17 @@ def check_layer(source):
             yield source.line_of(match.start()), f"{match.group().strip()} {why}"
 
 
+def check_wings(name, source):
+    wing = name.removeprefix(TOOL).partition("/")[0]
+    if wing not in WINGS:
+        return
+    for match in INCLUDE.finditer(source.text):
+        if match[1] not in WINGS:
+            yield source.line_of(match.start()), f"{match[1]} is no wing of the tool: {', '.join(WINGS)}"
+        elif WINGS.index(match[1]) > WINGS.index(wing):
+            yield source.line_of(match.start()), f"{wing} does not know {match[1]}, which is built on it"
+
+
 def allowed_long_functions(root):
     """(file, function) of every line `FILE FUNCTION  # reason`."""
     path = root / LONG_FUNCTIONS
@@ -143,6 +159,8 @@ def complaints(root):
             source = Source(text)
             found += [(name, *complaint) for complaint in check_comments(source)]
             found += [(name, *complaint) for complaint in check_function_length(name, source, allowed)]
+            if name.startswith(TOOL):
+                found += [(name, *complaint) for complaint in check_wings(name, source)]
             if name.startswith("src/driver/pmx/"):
                 found += [(name, *complaint) for complaint in check_layer(source)]
     found += [(LONG_FUNCTIONS, 1, f"no longer needed: {file} {function}") for file, function in sorted(allowed)]

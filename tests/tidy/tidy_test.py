@@ -105,6 +105,14 @@ class Tidy(unittest.TestCase):
         self.accepted("src/driver/pmx/a.c", "#include <linux/export.h>\n")
         self.accepted("src/driver/pmx/a.cpp", "#include <stddef.h>\n// a new class of modes\n")
 
+    def test_wings_of_the_tool_stand_on_each_other(self):
+        self.refused("a.cpp:1: view does not know language, which is built on it", "tools/pmxboard/view/a.cpp",
+                     '#include "tools/pmxboard/language/session.h"\n')
+        self.refused("a.cpp:1: widgets is no wing", "tools/pmxboard/view/a.cpp",
+                     '#include "tools/pmxboard/widgets/b.h"\n')
+        self.accepted("tools/pmxboard/language/a.cpp", '#include "tools/pmxboard/view/output.h"\n')
+        self.accepted("tools/pmxboard/main.cpp", '#include "tools/pmxboard/commands/command_line.h"\n')
+
     def test_contracts_of_the_layer(self):
         head, tail = "/** Do.\n", "PMX_API UINT32 PMX_Init(UCHAR ucPmxId);\n"
         good = " *  @param ucPmxId  id\n *  @return 1\n *  @context any */\n"

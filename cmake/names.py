@@ -52,14 +52,23 @@ class Names:
         self.root = root
         self.families = list(families(root))
         self.paths = headers(root)
-        texts = {path: declarations.read(path) for path in self.paths}
-        self.enumerations = {one.name: (path, one) for path in self.paths
-                             for one in declarations.enumerations(texts[path]) if one.name}
-        self.constants = [one.name for path in self.paths for one in declarations.constants(texts[path])]
-        self.constants += [each.name for path in self.paths for one in declarations.enumerations(texts[path])
-                           if not one.name for each in one.enumerators]
+        self.enumerations, self.constants = {}, []
+        for path in self.paths:
+            self._read(path)
         self.family_of = {source: family for family, sources, _, _ in self.families for source in sources}
         self._check_enumerations()
+
+    def _read(self, path):
+        text = declarations.read(path)
+        self.constants += [one.name for one in declarations.constants(text)]
+        try:
+            for one in declarations.enumerations(text):
+                if one.name:
+                    self.enumerations[one.name] = path, one
+                else:
+                    self.constants += [each.name for each in one.enumerators]
+        except Unclear as reason:
+            raise Unclear(f"{path.relative_to(self.root).as_posix()}:{reason}") from None
 
     def place(self, path, line):
         return f"{path.relative_to(self.root).as_posix()}:{line}"

@@ -144,7 +144,7 @@ TEST(Modes, Table_HasEveryModeIn80Columns)
     std::istringstream lines(show({}).out);
     std::string line;
     std::getline(lines, line);
-    for (unsigned number = 0; number < 51; ++number)
+    for (unsigned number = 0; number < RES_MODE_NUM; ++number)
     {
         ASSERT_TRUE(std::getline(lines, line)) << number;
         EXPECT_LE(pmxboard::columns_of(line), 80u) << line;

@@ -68,7 +68,7 @@ typedef struct
     UCHAR ucMuteEnable;                 /* output mute, as given */
     UINT32 u4AspectRatio;               /* an ASPECT_RATIO_T value */
     UINT32 u4BgColor;                   /* 0x00YYUUVV */
-    UINT32 u4Capability;                /* bits 0 to 16 groups of modes, 20 to 25, 27 and 30 features */
+    UINT32 u4Capability;                /* below PMX_CAP_BIT_GAMMA groups of modes, from there on features */
     UCHAR aucPlaneOrder[PMX_PLANE_NUM]; /* plane id at each position of the stack */
     UCHAR ucSharpness;
     IVdp* piVdp1; /* never filled: a video plane's table is fetched anew for every call */
@@ -98,7 +98,7 @@ typedef struct
     UINT8 fgOSD5; /* fifth-OSD mode as PMX_SetModeEx last got it */
 } PMX_CONF_T;
 
-/* Bit numbers of features in the capability word, for fgPmxHasCap; bits 0 to 16 are the modes'. */
+/* Bit numbers of features in the capability word, for fgPmxHasCap; those below are the modes'. */
 #define PMX_CAP_BIT_GAMMA 20
 #define PMX_CAP_BIT_BRIGHTNESS 21
 #define PMX_CAP_BIT_CONTRAST 22
@@ -129,7 +129,7 @@ typedef struct
 typedef struct
 {
     UINT8 u1Mode;       /* PMX_RESOLUTION_MODE_T: the row's own number */
-    UINT8 u1CapBit : 6; /* 0 to 16, PMX_CAP_ALWAYS or PMX_CAP_NEVER */
+    UINT8 u1CapBit : 6; /* a bit number, PMX_CAP_ALWAYS or PMX_CAP_NEVER */
     UINT8 u1Colour : 2; /* PMX_COLOUR_… */
     UINT16 u2Width;
     UINT16 u2Height;

@@ -203,8 +203,8 @@ typedef struct
     INT32 (*pi4VdpGetPlanePosition)(void* pvTag, UCHAR ucVdpHwId);            /**< as i4PmxGetPlanePosition */
 } IPMX;
 
-/** Printable names of the resolution modes 0 to 46; null for 47 to 50. RES_2D_640x480HZ is printed without its HZ: the
- *  text is part of the console interface. */
+/** Printable names of the resolution modes; null for one that has none, as the 4K modes. RES_2D_640x480HZ is printed
+ *  without its HZ: the text is part of the console interface. */
 extern PMX_API const CHAR* const szResStr[RES_MODE_NUM];
 
 /** The interface table that is registered under IID_IPMX. */

@@ -95,7 +95,7 @@ PMX_API INT32 i4PmxUnregisterIM(UINT16 u2CompType, UINT16 u2CompId);
 
 /** Read the capability word.
  *  @param      ucPmxId  mixer id, 0
- *  @param[out] pu4Cap   receives it: bits 0 to 16 admit groups of resolution modes, 20 to 25, 27 and 30 features
+ *  @param[out] pu4Cap   receives it: bits below 20 admit groups of resolution modes, those from 20 on features
  *  @return 1; 0 for a mixer id other than 0 or a null pointer
  *  @context any thread; takes no lock */
 PMX_API UINT32 PMX_GetCap(UCHAR ucPmxId, UINT32* pu4Cap);
@@ -311,8 +311,8 @@ PMX_API void PMX_ColorSpaceSetup(DRV_PMX_COLOR_SPACE_T eMixerOutCS, UCHAR ucOutp
 
 /* Geometry */
 
-/** Read the size of the mixer's picture in its resolution mode. The 1440 and 2880 modes count 720 pixels;
- *  RES_2D_576I50HZ, the 4K modes and all other numbers count 1920 x 1080.
+/** Read the size of the mixer's picture in its resolution mode. The 1440 and 2880 modes count 720 pixels.
+ *  RES_2D_576I50HZ counts 1920 x 1080, and so does every number without a row in the mode table.
  *  @param      ucPmxId    mixer id, 0
  *  @param[out] pu4Width   receives the width in pixels
  *  @param[out] pu4Height  receives the height in lines of a frame
@@ -331,12 +331,12 @@ PMX_API INT32 i4PmxGetOutSize(void* pvTag, UINT32* pu4Width, UINT32* pu4Height);
 /** Ask whether the mixer's resolution mode is reported as progressive.
  *  @param ucPmxId  mixer id, 0
  *  @return 1 or 0; 0 for a mixer id other than 0. RES_1080P23_976HZ, RES_1080P29_97HZ, the top-and-bottom modes and
- *          every number above them count as 0
+ *          every number without a row in the mode table count as 0
  *  @context any thread; takes no lock */
 PMX_API UCHAR PMX_ProgressiveOut(UCHAR ucPmxId);
 
 /** Ask whether the mixer's resolution mode is reported as an HD output. Not the HD formats of the TV encoders:
- *  RES_1080P29_97HZ, RES_2D_576I50HZ and every mode above RES_3D_1080P24HZ_TB count here.
+ *  RES_1080P29_97HZ, RES_2D_576I50HZ and every number without a row in the mode table count here.
  *  @param ucPmxId  mixer id, unchecked
  *  @return TRUE or FALSE
  *  @context any thread; takes no lock */

@@ -7,57 +7,24 @@
 #include "drv_pmx.h"
 #include "numbers.h"
 #include "pmx_if.h"
+#include "tests/layer/mode_facts.h"
 
 using namespace numbers;
 
 TEST(Enumerators, ResolutionModes)
 {
+    for (const mode_facts::Mode& mode : mode_facts::all_modes)
+        EXPECT_EQ(mode.number, mode.mode) << mode.enumerator;
+    // Facts are looked up by number.
+    for (UINT32 number = 0; number < mode_facts::known; ++number)
+        EXPECT_EQ(number, mode_facts::all_modes[number].number);
     expect_numbers({
-        NUMBER(RES_480I, 0),
-        NUMBER(RES_576I, 1),
-        NUMBER(RES_480P, 2),
-        NUMBER(RES_576P, 3),
-        NUMBER(RES_480P_1440, 4),
-        NUMBER(RES_576P_1440, 5),
-        NUMBER(RES_480P_2880, 6),
-        NUMBER(RES_576P_2880, 7),
-        NUMBER(RES_720P60HZ, 8),
-        NUMBER(RES_720P50HZ, 9),
-        NUMBER(RES_1080I60HZ, 10),
-        NUMBER(RES_1080I50HZ, 11),
-        NUMBER(RES_1080P60HZ, 12),
-        NUMBER(RES_1080P50HZ, 13),
-        NUMBER(RES_1080P30HZ, 14),
-        NUMBER(RES_1080P25HZ, 15),
-        NUMBER(RES_480I_2880, 16),
-        NUMBER(RES_576I_2880, 17),
-        NUMBER(RES_1080P24HZ, 18),
-        NUMBER(RES_1080P23_976HZ, 19),
-        NUMBER(RES_1080P29_97HZ, 20),
-        NUMBER(RES_2D_480I60HZ, 37),
-        NUMBER(RES_2D_576I50HZ, 38),
-        NUMBER(RES_2D_640x480HZ, 39),
-        NUMBER(RES_PANEL_AUO_B089AW01, 40),
         NUMBER(RES_4K2K23976HZ, 47),
         NUMBER(RES_4K2K24HZ, 48),
         NUMBER(RES_2160P, 49),
         NUMBER(RES_2160P_4096, 50),
         NUMBER(RES_MODE_NUM, 51),
         NUMBER(RES_AUTO, 52),
-    });
-}
-
-TEST(Enumerators, ResolutionModes3D)
-{
-    expect_numbers({
-        NUMBER(RES_3D_1080P23HZ, 21),          NUMBER(RES_3D_1080P24HZ, 22),          NUMBER(RES_3D_720P60HZ, 23),
-        NUMBER(RES_3D_720P50HZ, 24),           NUMBER(RES_3D_720P30HZ, 25),           NUMBER(RES_3D_720P25HZ, 26),
-        NUMBER(RES_3D_576P50HZ, 27),           NUMBER(RES_3D_480P60HZ, 28),           NUMBER(RES_3D_1080I60HZ, 29),
-        NUMBER(RES_3D_1080I50HZ, 30),          NUMBER(RES_3D_1080I30HZ, 31),          NUMBER(RES_3D_1080I25HZ, 32),
-        NUMBER(RES_3D_576I25HZ, 33),           NUMBER(RES_3D_480I30HZ, 34),           NUMBER(RES_3D_576I50HZ, 35),
-        NUMBER(RES_3D_480I60HZ, 36),           NUMBER(RES_3D_720P60HZ_TB, 41),        NUMBER(RES_3D_720P50HZ_TB, 42),
-        NUMBER(RES_3D_1080I60HZ_SBS_HALF, 43), NUMBER(RES_3D_1080I50HZ_SBS_HALF, 44), NUMBER(RES_3D_1080P23HZ_TB, 45),
-        NUMBER(RES_3D_1080P24HZ_TB, 46),
     });
 }
 

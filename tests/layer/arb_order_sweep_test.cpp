@@ -1,42 +1,12 @@
 /** The packed plane order: every mode, every way to name a source twice, every permutation. */
 #include <algorithm>
 #include <random>
-#include <set>
 
 #include "tests/layer/arb_order.h"
+#include "tests/layer/mode_facts.h"
 
 namespace
 {
-
-const std::set<unsigned> modes_with_hd_offsets{
-    RES_720P60HZ,
-    RES_720P50HZ,
-    RES_1080I60HZ,
-    RES_1080I50HZ,
-    RES_1080P60HZ,
-    RES_1080P50HZ,
-    RES_1080P30HZ,
-    RES_1080P25HZ,
-    RES_1080P24HZ,
-    RES_1080P23_976HZ,
-    RES_3D_1080P23HZ,
-    RES_3D_1080P24HZ,
-    RES_3D_720P60HZ,
-    RES_3D_720P50HZ,
-    RES_3D_720P30HZ,
-    RES_3D_720P25HZ,
-    RES_3D_1080I60HZ,
-    RES_3D_1080I50HZ,
-    RES_3D_1080I30HZ,
-    RES_3D_1080I25HZ,
-    RES_PANEL_AUO_B089AW01,
-    RES_3D_720P60HZ_TB,
-    RES_3D_720P50HZ_TB,
-    RES_3D_1080I60HZ_SBS_HALF,
-    RES_3D_1080I50HZ_SBS_HALF,
-    RES_3D_1080P23HZ_TB,
-    RES_3D_1080P24HZ_TB,
-};
 
 using Sources = std::array<unsigned, 8>;
 
@@ -52,12 +22,11 @@ UINT32 packed(const Sources& sources, UINT32 top_bits = 0)
 
 TEST_F(ArbOrder, SetArbPlaneOrder_EveryMode_TakesItsOffsets)
 {
-    ASSERT_EQ(27u, modes_with_hd_offsets.size());
     for (unsigned mode = 0; mode < 256; ++mode)
     {
         SCOPED_TRACE("mode " + std::to_string(mode));
         set_record("ucMode", mode);
-        const Eight& offsets = modes_with_hd_offsets.contains(mode) ? offsets_hd : offsets_others;
+        const Eight& offsets = mode_facts::facts_of(mode).is(mode_facts::tve_hd) ? offsets_hd : offsets_others;
         EXPECT_EQ(1u, PMX_SetArbPlaneOrder(0, 0x76543210));
         EXPECT_TRACE(printed(0, 0x76543210, offsets) + programmed(0, 0x76543210, offsets));
     }

@@ -183,7 +183,7 @@ TEST_F(Colour, ColorSpaceSetup_EveryModeNumberInEveryColourSpace)
             colour_setup(colour_space, mode);
             EXPECT_TRACE(one_mode::colour_setup(mode, colour_space));
         }
-        const bool handled = mode_facts::colours(mode) != mode_facts::Colours::None;
+        const bool handled = mode_facts::facts_of(mode).colours != mode_facts::Colours::None;
         refused += handled ? 3 : 0;
         without += handled ? 0 : 1;
     }

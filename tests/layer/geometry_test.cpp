@@ -1,12 +1,11 @@
 /** What the current mode is reported as: progressive, HD; that nothing is remembered from an earlier mode. */
-#include "tests/layer/picture_facts.h"
+#include "tests/layer/mode_facts.h"
 #include "tests/support/layer_fixture.h"
 
 using ProgressiveOut = LayerTest;
 using HdOutput = LayerTest;
 
-using picture_facts::progressive;
-using picture_facts::sd_output;
+using mode_facts::facts_of;
 
 TEST_F(ProgressiveOut, ProgressiveOut_EveryModeNumber)
 {
@@ -15,10 +14,10 @@ TEST_F(ProgressiveOut, ProgressiveOut_EveryModeNumber)
     for (unsigned mode = 0; mode < 256; ++mode)
     {
         set_record("ucMode", mode);
-        EXPECT_EQ(progressive().contains(mode) ? 1 : 0, PMX_ProgressiveOut(0)) << mode;
+        EXPECT_EQ(facts_of(mode).is(mode_facts::progressive) ? 1 : 0, PMX_ProgressiveOut(0)) << mode;
         number += PMX_ProgressiveOut(0);
     }
-    EXPECT_EQ(23u, number);
+    EXPECT_EQ(mode_facts::modes_with(mode_facts::progressive).size(), number);
     EXPECT_NO_TRACE();
 }
 
@@ -85,10 +84,10 @@ TEST_F(HdOutput, FmtHDOutput_EveryModeNumber)
     for (unsigned mode = 0; mode < 256; ++mode)
     {
         set_record("ucMode", mode);
-        EXPECT_EQ(sd_output().contains(mode) ? 0 : 1, fgPmxFmtHDOutput(0)) << mode;
+        EXPECT_EQ(facts_of(mode).is(mode_facts::hd_out) ? 1 : 0, fgPmxFmtHDOutput(0)) << mode;
         number += fgPmxFmtHDOutput(0);
     }
-    EXPECT_EQ(256u - 18, number);
+    EXPECT_EQ(256u - mode_facts::known + mode_facts::modes_with(mode_facts::hd_out).size(), number);
     EXPECT_NO_TRACE();
 }
 
@@ -99,11 +98,11 @@ TEST_F(HdOutput, FmtHDOutput_MoreThanTheTvEncodersHdFormats)
     for (unsigned mode = 0; mode < 256; ++mode)
     {
         set_record("ucMode", mode);
-        const bool is_more = mode == RES_1080P29_97HZ || mode == RES_2D_576I50HZ || mode > RES_3D_1080P24HZ_TB;
-        EXPECT_EQ(is_more || mode_facts::tve_hd().contains(mode) ? 1 : 0, fgPmxFmtHDOutput(0)) << mode;
+        const bool is_more = mode == RES_1080P29_97HZ || mode == RES_2D_576I50HZ || mode >= mode_facts::known;
+        EXPECT_EQ(is_more || facts_of(mode).is(mode_facts::tve_hd) ? 1 : 0, fgPmxFmtHDOutput(0)) << mode;
         more += is_more ? 1 : 0;
     }
-    EXPECT_EQ(2u + 256 - 47, more);
+    EXPECT_EQ(2u + 256 - mode_facts::known, more);
 }
 
 TEST_F(HdOutput, FmtHDOutput_2D576I_IsHdAndOf1920x1080)

@@ -2,6 +2,7 @@
 #include <set>
 
 #include "tests/layer/mode_ex.h"
+#include "tests/layer/mode_facts.h"
 
 using namespace mode_ex;
 
@@ -10,35 +11,7 @@ using Encoders = mode_ex::Test;
 namespace
 {
 
-const std::set<UINT32> hd_modes{
-    RES_720P60HZ,
-    RES_720P50HZ,
-    RES_1080I60HZ,
-    RES_1080I50HZ,
-    RES_1080P60HZ,
-    RES_1080P50HZ,
-    RES_1080P30HZ,
-    RES_1080P25HZ,
-    RES_1080P24HZ,
-    RES_1080P23_976HZ,
-    RES_3D_1080P23HZ,
-    RES_3D_1080P24HZ,
-    RES_3D_720P60HZ,
-    RES_3D_720P50HZ,
-    RES_3D_720P30HZ,
-    RES_3D_720P25HZ,
-    RES_3D_1080I60HZ,
-    RES_3D_1080I50HZ,
-    RES_3D_1080I30HZ,
-    RES_3D_1080I25HZ,
-    RES_PANEL_AUO_B089AW01,
-    RES_3D_720P60HZ_TB,
-    RES_3D_720P50HZ_TB,
-    RES_3D_1080I60HZ_SBS_HALF,
-    RES_3D_1080I50HZ_SBS_HALF,
-    RES_3D_1080P23HZ_TB,
-    RES_3D_1080P24HZ_TB,
-};
+const std::set<UINT32> hd_modes = mode_facts::modes_with(mode_facts::tve_hd);
 
 /** Lines of these functions since the trace was cleared, one behind the other; a log line counts by its text. */
 std::vector<std::string> lines_of(const std::set<std::string>& functions)

@@ -272,10 +272,10 @@ TEST_F(SetMode, SetMode_EveryAdmittedMode_WholeSequenceAndHdFlag)
         EXPECT_TRACE(one_mode::set_mode({ mode, 60, 2 }));
         EXPECT_EQ(mode, record("ucMode"));
         ++admitted;
-        hd += mode_facts::tve_hd().contains(mode) ? 1 : 0;
+        hd += mode_facts::facts_of(mode).is(mode_facts::tve_hd) ? 1 : 0;
     }
     EXPECT_EQ(46u, admitted);
-    EXPECT_EQ(27u, hd);
+    EXPECT_EQ(mode_facts::modes_with(mode_facts::tve_hd).size(), hd);
 }
 
 TEST_F(SetMode, SetMode_EveryOtherNumber_OnlyLogs)

@@ -18,7 +18,7 @@ inline std::string colour_setup(unsigned mode, std::uint32_t colour_space)
                               ")\\n\"\n"
                               "PMX_HalSelectVdoutCconv(0, 1)\n"
                               "PMX_HalSelectScalerCconv(0, 0)\n";
-    const mode_facts::Colours colours = mode_facts::colours(mode);
+    const mode_facts::Colours colours = mode_facts::facts_of(mode).colours;
     if (colours == mode_facts::Colours::None)
         return entry;
     if (colour_space > 1)
@@ -84,7 +84,8 @@ inline std::string set_mode(const Request& request)
     const std::string mode = std::to_string(request.mode);
     const bool is_60 = request.frequency == 60;
     const std::string format = ", " + mode + ", " + std::to_string(request.frequency) + ", ";
-    const std::string flags = std::string(", 1, ") + (mode_facts::tve_hd().contains(request.mode) ? "1" : "0") + ", " +
+    const std::string flags = std::string(", 1, ") +
+                              (mode_facts::facts_of(request.mode).is(mode_facts::tve_hd) ? "1" : "0") + ", " +
                               std::to_string(request.osd5) + ")\n";
     std::string lines = log_of(request.mode);
     lines += "OSD_BASE_SetDisplayMode(" + mode + ")\n";

@@ -1,5 +1,5 @@
 /** The video PLL's frequency synthesiser. */
-#include "tests/layer/picture_facts.h"
+#include "tests/layer/mode_facts.h"
 #include "tests/layer/sequences.h"
 #include "tests/support/layer_fixture.h"
 #include "u_os.h"
@@ -63,13 +63,13 @@ TEST_F(VideoPll, SetPLLGP_EveryByte_WholeSequenceWithItsFamilysWord)
     for (unsigned mode = 0; mode < 256; ++mode)
     {
         SCOPED_TRACE(mode);
-        const bool is_60 = picture_facts::pll_60().contains(mode);
+        const bool is_60 = mode_facts::facts_of(mode).is(mode_facts::pll_60);
         of_the_family += is_60 ? 1 : 0;
         preset(0, 0, 0);
         vSetPLLGP_HDMIDDS(static_cast<BYTE>(mode));
         EXPECT_TRACE(sequences::pll(is_60 ? word_60 : word_other));
     }
-    EXPECT_EQ(25u, of_the_family);
+    EXPECT_EQ(mode_facts::modes_with(mode_facts::pll_60).size(), of_the_family);
 }
 
 TEST_F(VideoPll, SetPLLGP_OtherBitsOfTheControlWords_AreKept)

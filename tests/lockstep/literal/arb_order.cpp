@@ -26,7 +26,7 @@ UINT32 PMX_SetArbPlaneOrder(UCHAR ucPmxId, UINT32 u4PlaneOrder)
     Printf("[PMX%d] Set PlaneOrder = [0x%8x]\n", ucPmxId, u4PlaneOrder);
     for (int k = 0; k < 8; ++k)
         u1PlnSel[k] = static_cast<UINT8>((u4PlaneOrder >> (4 * k)) & 7);
-    if (!mode_facts::tve_hd().contains(conf.ucMode))
+    if (!mode_facts::facts_of(conf.ucMode).is(mode_facts::tve_hd))
     {
         const INT32 others[8] = { 6, 6, 5, 4, 3, 2, 1, 0 };
         std::memcpy(i4OffSet, others, sizeof i4OffSet);

@@ -1,5 +1,4 @@
 /* Boot resolution, video PLL, TV type. */
-#include "tests/layer/picture_facts.h"
 #include "tests/lockstep/literal/literal.h"
 
 UINT8 PMX_GetHDMIDefaultRes(void)
@@ -19,7 +18,7 @@ void vSetPLLGP_HDMIDDS(BYTE bResIndex)
     const UINT32 synthesiser = 0xFD000040;
     const UINT32 control_b = 0xFD000044;
     x_reg_write32(control_b, x_reg_read32(control_b) | 0x7);
-    x_reg_write32(synthesiser, picture_facts::pll_60().contains(bResIndex) ? 0x03D2F1AA : 0x03D1745E);
+    x_reg_write32(synthesiser, mode_facts::facts_of(bResIndex).is(mode_facts::pll_60) ? 0x03D2F1AA : 0x03D1745E);
     x_reg_write32(control_a, x_reg_read32(control_a) | 0x2);
     x_reg_write32(control_b, x_reg_read32(control_b) | 0x4000);
     x_thread_delay(1);

@@ -6,7 +6,7 @@ void PMX_ColorSpaceSetup(DRV_PMX_COLOR_SPACE_T eMixerOutCS, UCHAR ucOutputMode)
     PMX_IsLog(9, "Mode(%d), eMixerOutCS(%d)\n", ucOutputMode, static_cast<int>(eMixerOutCS));
     PMX_HalSelectVdoutCconv(0, 1);
     PMX_HalSelectScalerCconv(0, 0);
-    const mode_facts::Colours group = mode_facts::colours(ucOutputMode);
+    const mode_facts::Colours group = mode_facts::facts_of(ucOutputMode).colours;
     if (group == mode_facts::Colours::None)
         return;
     if (group == mode_facts::Colours::Sd && eMixerOutCS == DRV_PMX_CS_YCBCR_601)

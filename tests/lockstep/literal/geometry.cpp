@@ -1,5 +1,4 @@
 /* The picture of the current mode; commands about the TV system. */
-#include "tests/layer/picture_facts.h"
 #include "tests/lockstep/literal/literal.h"
 
 UINT32 PMX_GetOutSize(UCHAR ucPmxId, UINT32* pu4Width, UINT32* pu4Height)
@@ -10,7 +9,7 @@ UINT32 PMX_GetOutSize(UCHAR ucPmxId, UINT32* pu4Width, UINT32* pu4Height)
         return 0;
     if (pu4Height == nullptr)
         return 0;
-    const picture_facts::Size size = picture_facts::size_of(conf.ucMode);
+    const mode_facts::Mode& size = mode_facts::facts_of(conf.ucMode);
     *pu4Width = size.width;
     *pu4Height = size.height;
     return 1;
@@ -25,12 +24,12 @@ UCHAR PMX_ProgressiveOut(UCHAR ucPmxId)
 {
     if (ucPmxId != 0)
         return 0;
-    return picture_facts::progressive().contains(conf.ucMode) ? 1 : 0;
+    return mode_facts::facts_of(conf.ucMode).is(mode_facts::progressive) ? 1 : 0;
 }
 
 BOOL fgPmxFmtHDOutput(UCHAR)
 {
-    return picture_facts::sd_output().contains(conf.ucMode) ? 0 : 1;
+    return mode_facts::facts_of(conf.ucMode).is(mode_facts::hd_out) ? 1 : 0;
 }
 
 UINT32 PMX_SetTVSystem(UCHAR ucPmxId, UINT16 u2VSyncFreq, BOOL fgTvSysAuto)

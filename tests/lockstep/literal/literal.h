@@ -34,8 +34,9 @@ static inline UCHAR id_of(void* pvTag)
     return static_cast<UCHAR>(reinterpret_cast<std::uintptr_t>(pvTag) & 0xFF);
 }
 
-/* How the console names a mode; a number without a name is a null text. */
-static inline const CHAR* name_of(UINT32 mode)
+/* How the console names a mode; a number without a name is a null text, which the console may get and the compiler need
+ * not see. */
+[[gnu::noinline]] static inline const CHAR* name_of(UINT32 mode)
 {
-    return mode < mode_facts::known ? mode_facts::name(mode).c_str() : nullptr;
+    return mode_facts::printable(mode);
 }

@@ -47,7 +47,7 @@ UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
         if (PMX_SetTvType(ucPmxId, 3) != 1)
             Assert("PMX_SetTvType(ucPmxId, PMX_TV_TYPE_PAL) == PMX_SET_OK", __FILE__, __LINE__);
     }
-    const BOOL fgHD = mode_facts::tve_hd().contains(ucMode) ? 1 : 0;
+    const BOOL fgHD = mode_facts::facts_of(ucMode).is(mode_facts::tve_hd) ? 1 : 0;
     TVE_SetFmtEx(0, ucMode, ucVFreq, ucMode, 1, fgHD, fgOSD5);
     if (ucVFreq == 60)
         TVE_SetFmtEx(1, ucMode, 60, RES_480I, 1, fgHD, fgOSD5);

@@ -17,7 +17,7 @@ struct Working
 
 static bool in_hd_set(UINT32 mode)
 {
-    return mode_facts::tve_hd().contains(mode);
+    return mode_facts::facts_of(mode).is(mode_facts::tve_hd);
 }
 
 static void log_request(const Working& w)

@@ -6,8 +6,11 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <map>
 #include <regex>
 #include <string>
+
+#include "board/value.h"
 
 namespace
 {
@@ -74,20 +77,48 @@ std::string source(const std::filesystem::path& path)
     return std::regex_replace(text, std::regex(R"("\s*\n\s*")"), "");
 }
 
+/** The layer's sources by their names. */
+std::map<std::string, std::string> sources()
+{
+    std::map<std::string, std::string> all;
+    for (const auto& entry : std::filesystem::directory_iterator("src/driver/pmx"))
+    {
+        if (entry.path().extension() == ".cpp")
+            all[entry.path().filename()] = source(entry.path());
+    }
+    return all;
+}
+
+TEST(DecodePattern, ATextHasTheLevelThatTheLayerGivesIt)
+{
+    const std::regex call(R"re((PMX_IsLog\((\d+),|Printf\()\s*("(?:[^"\\]|\\.)*"))re");
+    std::size_t compared = 0;
+    for (const auto& [name, code] : sources())
+    {
+        for (std::sregex_iterator found(code.begin(), code.end(), call), end; found != end; ++found)
+        {
+            const int level = (*found)[2].matched ? std::stoi((*found)[2]) : level_plain;
+            const std::string format = board::unquote((*found).str(3));
+            const auto has_format = [&](const Text& text) { return text.format == format; };
+            const auto text = std::find_if(texts().begin(), texts().end(), has_format);
+            ASSERT_NE(texts().end(), text) << name << ": " << format;
+            EXPECT_EQ(level, text->level) << name << ": " << format;
+            ++compared;
+        }
+    }
+    EXPECT_LT(80u, compared);
+}
+
 TEST(DecodePattern, AnAssertionNamesTheFilesThatHoldIt)
 {
     for (const Text& text : texts())
     {
         if (text.level != level_assertion || text.format == "0")
             continue;
-        for (const auto& entry : std::filesystem::directory_iterator("src/driver/pmx"))
+        for (const auto& [name, code] : sources())
         {
-            const std::string name = entry.path().filename();
-            if (name.ends_with(".cpp"))
-            {
-                const bool holds = source(entry.path()).find('"' + std::string(text.format) + '"') != std::string::npos;
-                EXPECT_EQ(holds, text.file == name) << text.format << ' ' << name;
-            }
+            const bool holds = code.find('"' + std::string(text.format) + '"') != std::string::npos;
+            EXPECT_EQ(holds, text.file == name) << text.format << ' ' << name;
         }
     }
 }

@@ -73,7 +73,7 @@ int decode_log(const DecodeOptions& options)
     decode::ShowOptions show;
     show.quiet = options.quiet;
     show.verbose = options.verbose;
-    show.colour = wants_colour(options.colour);
+    show.paint.on = wants_colour(options.colour);
     show.name = options.file == "-" ? "standard input" : options.file;
     if (options.json)
         decode::show_json(std::cout, log, story, comparison, show.name);

@@ -2,8 +2,7 @@
 
 #include <algorithm>
 
-#include <nlohmann/json.hpp>
-
+#include "board/json.h"
 #include "tools/pmxboard/decode/words.h"
 
 namespace pmxboard::decode
@@ -31,7 +30,7 @@ bool is_order_line(const Item& item)
     return has(item.text->values, "aucPlaneOrder");
 }
 
-using Json = nlohmann::ordered_json;
+using board::Json;
 
 /** The fields as the record names them; what stands twice once. */
 Json json_of(const std::map<std::string, std::string, std::less<>>& fields)
@@ -275,7 +274,7 @@ std::vector<std::string> StatusReport::words() const
     return lines;
 }
 
-nlohmann::ordered_json StatusReport::json() const
+Json StatusReport::json() const
 {
     Json report = json_of(m_record);
     report["aucPlaneOrder"] = json_of(m_order);

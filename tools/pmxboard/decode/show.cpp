@@ -5,22 +5,22 @@
 
 #include "board/value.h"
 #include "tools/pmxboard/decode/words.h"
+#include "tools/pmxboard/text/layout.h"
 
 namespace pmxboard::decode
 {
 namespace
 {
 
-constexpr std::size_t columns = 80;
-constexpr std::size_t step_indent = 10;
+constexpr std::size_t columns = usual_width;
+constexpr unsigned step_indent = 10;
 
-constexpr std::string_view bold = "1";
-constexpr std::string_view yellow = "33";
-constexpr std::string_view grey = "90";
-
-std::string painted(std::string_view text, std::string_view code, const ShowOptions& options)
+/** A text behind what leads to it on its first line; the lines below hang under it, with so many columns more. */
+std::string behind(std::string_view lead, std::string_view text, std::size_t hanging)
 {
-    return options.colour ? "\x1b[" + std::string(code) + "m" + std::string(text) + "\x1b[0m" : std::string(text);
+    const auto indent = static_cast<unsigned>(lead.size());
+    const std::string lines = wrapped(text, columns, indent, indent + static_cast<unsigned>(hanging));
+    return lines.empty() ? lines : lines.substr(indent, lines.size() - indent - 1);
 }
 
 std::string padded_left(const std::string& text, std::size_t width)
@@ -42,7 +42,7 @@ void show_summary(std::ostream& out, const Log& log, const ShowOptions& options)
     text += ", " + std::to_string(log.foreign) + " foreign";
     if (log.cut != 0)
         text += ", " + std::to_string(log.cut) + " cut";
-    out << folded(text, 0, 2) << '\n';
+    out << wrapped(text, columns, 0, 2);
     if (log.items.empty())
         out << "Nothing in it comes from the mixer layer.\n";
 }
@@ -54,17 +54,18 @@ void show_event(std::ostream& out, const Event& event, std::size_t range_width, 
     if (time_width != 0)
         lead += padded_left(event.time, time_width) + "  ";
     const std::string mark = event.problem ? "! " : "";
-    const std::string head = folded(mark + event.operation + ": " + event.title, lead.size(), lead.size() + 2);
-    out << painted(lead, grey, options) << painted(head, event.problem ? yellow : bold, options) << '\n';
+    const std::string head = behind(lead, mark + event.operation + ": " + event.title, 2);
+    out << options.paint(lead, Colour::Grey) << options.paint(head, event.problem ? Colour::Yellow : Colour::Bold)
+        << '\n';
 
-    const std::string indent(lead.size() + 2, ' ');
+    const auto indent = static_cast<unsigned>(lead.size() + 2);
     std::vector<std::string> paragraphs;
     if (event.report)
         paragraphs = event.report->words();
     if (!event.details.empty())
         paragraphs.push_back(joined(event.details, "; "));
     for (const std::string& paragraph : paragraphs)
-        out << indent << folded(paragraph, indent.size(), indent.size() + 2) << '\n';
+        out << wrapped(paragraph, columns, indent, indent + 2);
 }
 
 void show_story(std::ostream& out, const Story& story, const ShowOptions& options)
@@ -99,12 +100,12 @@ void show_lines(std::ostream& out, const Log& log, const Story& story, const Sho
         const std::string lead = padded_left(std::to_string(shown.line), 6) + "  ";
         if (!shown.item)
         {
-            out << painted(lead + printable(shown.foreign, columns - lead.size()), grey, options) << '\n';
+            out << options.paint(lead + printable(shown.foreign, columns - lead.size()), Colour::Grey) << '\n';
             continue;
         }
         const Item& item = log.items[*shown.item];
-        out << painted(lead, grey, options)
-            << painted(folded(printable(item.shown, 4 * columns), lead.size(), lead.size()), bold, options) << '\n';
+        out << options.paint(lead, Colour::Grey)
+            << options.paint(behind(lead, printable(item.shown, 4 * columns), 0), Colour::Bold) << '\n';
         if (item.last_line == shown.line && item.line != shown.line)
         {
             out << std::string(step_indent, ' ') << "the rest of line " << item.line << '\n';
@@ -119,7 +120,7 @@ void show_lines(std::ostream& out, const Log& log, const Story& story, const Sho
             where = "cut: begins like a line of " + where;
         if (item.text->level >= 0)
             where += " [level " + std::to_string(item.text->level) + "]";
-        out << std::string(step_indent, ' ') << folded(where, step_indent, step_indent + 2) << '\n';
+        out << wrapped(where, columns, step_indent, step_indent + 2);
     }
 }
 
@@ -140,37 +141,10 @@ void show_field(std::ostream& out, std::string_view name, std::string_view text)
 {
     constexpr std::size_t width = 13;
     const std::string lead = "  " + std::string(name) + std::string(width - 2 - name.size(), ' ');
-    out << lead << folded(printable(text, 6 * columns), width, width) << '\n';
+    out << lead << behind(lead, printable(text, 6 * columns), 0) << '\n';
 }
 
 } // namespace
-
-std::string folded(std::string_view text, std::size_t begin, std::size_t indent)
-{
-    std::string lines;
-    std::size_t column = begin;
-    bool first = true;
-    while (!text.empty())
-    {
-        const std::size_t blank = std::min(text.find(' '), text.size());
-        const std::string_view word = text.substr(0, blank);
-        text.remove_prefix(std::min(blank + 1, text.size()));
-        if (!first && column + 1 + word.size() > columns)
-        {
-            lines += "\n" + std::string(indent, ' ');
-            column = indent;
-        }
-        else if (!first)
-        {
-            lines += ' ';
-            ++column;
-        }
-        lines += word;
-        column += word.size();
-        first = false;
-    }
-    return lines;
-}
 
 void show_texts(std::ostream& out)
 {
@@ -179,8 +153,8 @@ void show_texts(std::ostream& out)
         const std::string source =
             text.level >= 0 ? "level " + std::to_string(text.level) : std::string(source_of(text));
         const std::string printer(split(text.operations).front());
-        out << board::quote(text.format) << "\n  "
-            << folded(source + ", " + printer + ": " + std::string(text.step), 2, 4) << '\n';
+        out << board::quote(text.format) << '\n'
+            << wrapped(source + ", " + printer + ": " + std::string(text.step), columns, 2, 4);
     }
 }
 
@@ -208,15 +182,14 @@ void show_comparison(std::ostream& out, const Comparison& comparison, const Show
     {
         if (comparison.left != 0)
             agreement += "; it ends " + counted(comparison.left, "line") + " before the scenario does";
-        out << folded(painted(against + ": no departure", bold, options), 0, 2) << '\n';
+        out << options.paint(behind("", against + ": no departure", 2), Colour::Bold) << '\n';
         show_field(out, "agreement", agreement);
         return;
     }
     const Departure& departure = *comparison.departure;
-    std::string where = departure.found ? "line " + std::to_string(departure.found->line) : "its end";
-    out << painted(folded(against + " departs at " + where + ": " + std::string(kind_words(departure.kind)), 0, 2),
-                   yellow, options)
-        << '\n';
+    const std::string where = departure.found ? "line " + std::to_string(departure.found->line) : "its end";
+    const std::string title = against + " departs at " + where + ": " + std::string(kind_words(departure.kind));
+    out << options.paint(behind("", title, 2), Colour::Yellow) << '\n';
     show_field(out, "agreement", agreement);
     show_field(out, "expected",
                departure.expected ? departure.expected->item.shown : "nothing more: the scenario is over");

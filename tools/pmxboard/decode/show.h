@@ -10,6 +10,7 @@
 #include "tools/pmxboard/decode/against.h"
 #include "tools/pmxboard/decode/log.h"
 #include "tools/pmxboard/decode/story.h"
+#include "tools/pmxboard/text/paint.h"
 
 namespace pmxboard::decode
 {
@@ -18,7 +19,7 @@ struct ShowOptions
 {
     bool quiet = false;   ///< problems alone
     bool verbose = false; ///< every line, with operation and step
-    bool colour = false;
+    Paint paint;
     std::string name; ///< how the log is called
 };
 
@@ -32,8 +33,5 @@ void show_json(std::ostream& out, const Log& log, const Story& story, const std:
 /** The table of texts: for people, and as a JSON list. */
 void show_texts(std::ostream& out);
 void show_texts_json(std::ostream& out);
-
-/** A text with line breaks at blanks, later lines indented. The first begins in column `begin`. */
-std::string folded(std::string_view text, std::size_t begin, std::size_t indent);
 
 } // namespace pmxboard::decode

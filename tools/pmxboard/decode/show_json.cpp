@@ -1,7 +1,6 @@
 #include <ostream>
 
-#include <nlohmann/json.hpp>
-
+#include "board/json.h"
 #include "tools/pmxboard/decode/show.h"
 #include "tools/pmxboard/decode/words.h"
 
@@ -10,12 +9,8 @@ namespace pmxboard::decode
 namespace
 {
 
-using Json = nlohmann::ordered_json;
-
-std::string on_one_line(const Json& json)
-{
-    return json.dump(-1, ' ', false, Json::error_handler_t::replace);
-}
+using board::Json;
+using board::written;
 
 Json or_null(const std::string& text)
 {
@@ -104,22 +99,22 @@ Json json_of(const Comparison& comparison)
 void show_json(std::ostream& out, const Log& log, const Story& story, const std::optional<Comparison>& comparison,
                const std::string& name)
 {
-    out << "{\"log\":" << on_one_line(printable(name, name.size() * 4)) << ",\"lines\":" << log.lines
+    out << "{\"log\":" << written(printable(name, name.size() * 4)) << ",\"lines\":" << log.lines
         << ",\"foreign\":" << log.foreign << ",\"cut\":" << log.cut
         << ",\"level\":" << (log.level ? std::to_string(*log.level) : "null") << ",\n\"events\":[";
     for (std::size_t i = 0; i < story.events.size(); ++i)
-        out << (i == 0 ? "\n" : ",\n") << on_one_line(json_of(story.events[i]));
+        out << (i == 0 ? "\n" : ",\n") << written(json_of(story.events[i]));
     out << "],\n\"texts\":[";
     for (std::size_t i = 0; i < log.items.size(); ++i)
-        out << (i == 0 ? "\n" : ",\n") << on_one_line(json_of(log.items[i], story.operations[i]));
-    out << "],\n\"against\":" << (comparison ? on_one_line(json_of(*comparison)) : "null") << "}\n";
+        out << (i == 0 ? "\n" : ",\n") << written(json_of(log.items[i], story.operations[i]));
+    out << "],\n\"against\":" << (comparison ? written(json_of(*comparison)) : "null") << "}\n";
 }
 
 void show_texts_json(std::ostream& out)
 {
     const char* lead = "[\n";
     const auto show = [&](const Json& json) {
-        out << lead << on_one_line(json);
+        out << lead << written(json);
         lead = ",\n";
     };
     for (const Text& text : texts())

@@ -2,6 +2,7 @@
 """Holds the tool that measures costs against small cases that are counted by hand."""
 
 import copy
+import json
 import pathlib
 import re
 import sys
@@ -11,6 +12,7 @@ sys.dont_write_bytecode = True
 sys.path.insert(0, str(pathlib.Path(__file__).resolve().parent.parent.parent / "tools" / "cost"))
 
 import callgraph  # noqa: E402
+import card as cards  # noqa: E402
 import check  # noqa: E402
 import diff  # noqa: E402
 import goals  # noqa: E402
@@ -165,6 +167,16 @@ def card():
             "files": {"pmx_a": {"code": 1000, "texts": 500, "tables": 100, "ram": 50}},
             "functions": {"PMX_A": function},
             "tables": {"T": 100}, "ram": {"_arPmxConf": 40, "x": 10}, "repeated": [], "indirect": [], "paths": [path]}
+
+
+class AsJson(unittest.TestCase):
+    def test_says_the_same_with_an_entry_a_line(self):
+        text = cards.as_json(card())
+        self.assertEqual(card(), json.loads(text))
+        self.assertIn('\n  "PMX_A": {"label": "PMX_A", "code": 200, ', text)
+        self.assertIn('\n  {"operation": "PMX_A", "kind": "only", ', text)
+        entries = sum(len(part) for part in card().values())
+        self.assertEqual(2 + entries + sum(2 if part else 1 for part in card().values()), text.count("\n"))
 
 
 class Check(unittest.TestCase):

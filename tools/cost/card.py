@@ -1,5 +1,6 @@
 """The cost card: everything that was measured as one object, and the document that people read."""
 
+import json
 import textwrap
 
 import arm
@@ -48,6 +49,19 @@ def make(paths, counts, sizes):
             "files": sizes.files,
             "functions": _functions(sizes), "tables": sizes.tables, "ram": sizes.ram, "repeated": sizes.repeated,
             "indirect": [list(row) for row in sizes.graph.indirect], "paths": rows}
+
+
+def as_json(card):
+    """The card with each entry on a line of its own, so that a difference shows what was measured otherwise."""
+    parts = []
+    for name, part in card.items():
+        if isinstance(part, dict):
+            entries, brackets = [f"{json.dumps(key)}: {json.dumps(value)}" for key, value in part.items()], "{}"
+        else:
+            entries, brackets = [json.dumps(entry) for entry in part], "[]"
+        lines = "".join(f"\n  {entry}," for entry in entries).removesuffix(",") + ("\n " if entries else "")
+        parts.append(f" {json.dumps(name)}: {brackets[0]}{lines}{brackets[1]}")
+    return "{\n" + ",\n".join(parts) + "\n}\n"
 
 
 def _thousands(number):

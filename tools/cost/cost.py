@@ -55,13 +55,9 @@ def goal_complaints(card):
     return list(goal_list.complaints(every_goal, explanations))
 
 
-def as_json(card):
-    return json.dumps(card, indent=1) + "\n"
-
-
 def write_card(card):
     goals, explanations = goals_and_explanations()
-    DATA.write_text(as_json(card), encoding="utf-8")
+    DATA.write_text(cards.as_json(card), encoding="utf-8")
     DOCUMENT.write_text(cards.render(card, goals, explanations), encoding="utf-8")
     for name, value, text in cards.five_figures(card, goals):
         print(f"{name}: {value} ({text.replace('`', '')})")
@@ -130,7 +126,7 @@ def main():
     made = build / "cost"
     card = measure(build, ROOT, made)
     if given.json:
-        print(as_json(card), end="")
+        print(cards.as_json(card), end="")
         return []
     if given.list is not None:
         list_card(card, given.list)

@@ -5,10 +5,11 @@ set(PMX_PRODUCT_LANGUAGE
     -std=c++20 -ffreestanding -fno-exceptions -fno-rtti -fno-threadsafe-statics -fno-use-cxa-atexit
     -fvisibility=hidden -fno-pic -fno-pie)
 
-# What keeps the objects free of symbols and sections that a stack does not provide for.
+# What keeps the objects free of symbols and sections that a stack does not provide for, and of the names of the folders
+# in which they were made.
 set(PMX_PRODUCT_CODE
     -fno-stack-protector -fno-asynchronous-unwind-tables -fno-unwind-tables -U_FORTIFY_SOURCE
-    -ffile-prefix-map=${PROJECT_SOURCE_DIR}/= -g)
+    -ffile-prefix-map=${PROJECT_SOURCE_DIR}/= -ffile-prefix-map=${PROJECT_BINARY_DIR}=build -g)
 
 # The 32-bit target. The headers hold the width of enumerations, whatever a compiler thinks, and the layer has no
 # wchar_t; an object's attributes name a width for both all the same, and a linker warns of any but a kernel's.

@@ -1,6 +1,7 @@
-/* What other kernel modules link against by name; everybody else in the stack is linked with the layer. Compiled by the
- * kernel's build beside pmx_if.o. */
+/* What other kernel modules link against by name, and under which licence the layer is; everybody else in the stack is
+ * linked with the layer. Compiled by the kernel's build beside pmx_if.o. */
 #include <linux/export.h>
+#include <linux/module.h>
 
 #include "drv_pmx.h"
 
@@ -10,3 +11,5 @@ EXPORT_SYMBOL(i4Pmx_Connect);
 EXPORT_SYMBOL(i4Pmx_Disconnect);
 EXPORT_SYMBOL(PMX_OsdEnabled);
 EXPORT_SYMBOL(PMX_OsdDisabled);
+
+MODULE_LICENSE("Dual MIT/GPL");

@@ -7,6 +7,7 @@
 // The one place of the tool that knows the argument parser: it compiles slowly.
 #include <CLI/CLI.hpp>
 
+#include "pmx_version.h"
 #include "tools/pmxboard/commands/decode.h"
 #include "tools/pmxboard/commands/examples.h"
 #include "tools/pmxboard/commands/exit_codes.h"
@@ -24,7 +25,7 @@ namespace pmxboard
 namespace
 {
 
-constexpr const char* version = "pmxboard 0.1.0";
+constexpr const char* version = "pmxboard " PMX_VERSION_TEXT;
 
 /** What the chosen sub-command does when everything is parsed; set by the sub-command's own callback. */
 using Chosen = std::function<int()>;
@@ -176,8 +177,9 @@ void add_decode(CLI::App& app, Chosen& chosen)
         ->type_name("SCENARIO");
     sub->add_option("--level", decode->level,
                     "Compare lines of this level of PMX_IsLog and below; else the highest that the log shows")
-        ->check(CLI::Range(0, 31))
-        ->needs("--against");
+        ->check(CLI::Range(0, 31).description(""))
+        ->needs("--against")
+        ->type_name("0-31");
     sub->add_option("--board", decode->board,
                     "Board for the scenario: a name under boards/, a directory or a .toml file")
         ->needs("--against")

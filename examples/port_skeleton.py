@@ -2,20 +2,20 @@
 """Writes port_skeleton.c: a body with its contract for every function that a stack provides, all of them empty but
 those that keep the list of timers.
 
-usage: port_skeleton.py [--check]    rewrite the file, or compare it with what the headers declare
+usage: port_skeleton.py FILE
 """
 
 import pathlib
-import subprocess
 import sys
+import textwrap
 
 ROOT = pathlib.Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(ROOT / "cmake"))
 from platform_functions import LAYER_HEADER, PLATFORM_HEADERS, functions  # noqa: E402
 
-SKELETON = ROOT / "examples/port_skeleton.c"
+LONGEST_LINE = 120
 HEAD = """/* Every function that a stack provides, with its contract and an empty body: what a port starts from.
- * Written from the headers by port_skeleton.py; copy it and fill the bodies, group by group, console first. As it
+ * Written from the headers; copy it and fill the bodies, group by group, console first. As it
  * stands it links with pmx_if.o, answers 0 and does nothing, but for the list of timers that every port keeps. */
 """
 
@@ -85,6 +85,14 @@ def body(function):
     return "\n".join(lines) + "\n" if lines else ""
 
 
+def head(function):
+    """The function's first line, folded behind a comma where it is long."""
+    begin = f"{function.result} {function.name}("
+    glued = ", ".join(parameter.replace(" ", "\0") for parameter in function.declared.split(", "))
+    folded = textwrap.wrap(glued + ")", LONGEST_LINE, initial_indent=begin, subsequent_indent=" " * len(begin))
+    return "\n".join(folded).replace("\0", " ")
+
+
 def skeleton():
     names = sorted(pathlib.PurePath(header).name for header in (*PLATFORM_HEADERS, LAYER_HEADER))
     text = HEAD + "".join(f'#include "{name}"\n' for name in names)
@@ -92,22 +100,9 @@ def skeleton():
         text += f"\n/* {pathlib.PurePath(header).name} */\n"
         for function in functions(ROOT / header):
             text += BEFORE.get(function.name, "")
-            text += (f"\n/** {function.contract} */\n{function.result} {function.name}({function.declared})\n"
-                     f"{{\n{body(function)}}}\n")
-    text += UNLOAD
-    return subprocess.run(["clang-format", "--style=file", f"--assume-filename={SKELETON}"], check=True, input=text,
-                          capture_output=True, text=True, encoding="utf-8").stdout
-
-
-def main():
-    if sys.argv[1:] == ["--check"]:
-        if SKELETON.read_text(encoding="utf-8") != skeleton():
-            print("examples/port_skeleton.c is not what the headers declare: run examples/port_skeleton.py")
-            return 1
-        return 0
-    SKELETON.write_text(skeleton(), encoding="utf-8")
-    return 0
+            text += f"\n/** {function.contract} */\n{head(function)}\n{{\n{body(function)}}}\n"
+    return text + UNLOAD
 
 
 if __name__ == "__main__":
-    sys.exit(main())
+    pathlib.Path(sys.argv[1]).write_text(skeleton(), encoding="utf-8")

@@ -2,7 +2,7 @@
 """Compiles the porting skeleton as C and links it with the object that ships: nothing but the kernel's own may stay
 open.
 
-usage: check_port_skeleton.py PMX_IF_OBJECT COMPILER...
+usage: check_port_skeleton.py SKELETON PMX_IF_OBJECT COMPILER...
 """
 
 import pathlib
@@ -16,10 +16,10 @@ INCLUDES = ["src/system/inc", "src/driver/inc", "src/driver/private_inc"]
 OF_THE_KERNEL = {"memcpy", "memset"}
 
 
-def open_symbols(shipped, compiler, directory):
+def open_symbols(source, shipped, compiler, directory):
     skeleton, linked = directory / "skeleton.o", directory / "linked.o"
-    subprocess.run([compiler, *FLAGS, *(f"-I{ROOT / include}" for include in INCLUDES), "-c",
-                    ROOT / "examples/port_skeleton.c", "-o", skeleton], check=True)
+    subprocess.run([compiler, *FLAGS, *(f"-I{ROOT / include}" for include in INCLUDES), "-c", source,
+                    "-o", skeleton], check=True)
     subprocess.run(["ld", "-r", "-o", linked, shipped, skeleton], check=True)
     names = subprocess.run(["nm", "--undefined-only", "--format=posix", linked], check=True, capture_output=True,
                            text=True).stdout
@@ -27,11 +27,11 @@ def open_symbols(shipped, compiler, directory):
 
 
 def main():
-    shipped, compilers = sys.argv[1], sys.argv[2:]
+    source, shipped, *compilers = sys.argv[1:]
     missing = set()
     with tempfile.TemporaryDirectory() as directory:
         for compiler in compilers:
-            missing |= open_symbols(shipped, compiler, pathlib.Path(directory)) - OF_THE_KERNEL
+            missing |= open_symbols(source, shipped, compiler, pathlib.Path(directory)) - OF_THE_KERNEL
     for name in sorted(missing):
         print(f"no body in the skeleton: {name}")
     return 1 if missing or not compilers else 0

@@ -31,7 +31,8 @@ def main():
         run(prefix / "bin/pmxboard", "run", "--quiet", "--board", "installed",
             prefix / "share/pmx/scenarios/cold-boot.pmx", cwd=directory)
 
-        for part in ("share/man/man1/pmxboard.1", "share/bash-completion/completions/pmxboard"):
+        for part in ("share/man/man1/pmxboard.1", "share/bash-completion/completions/pmxboard",
+                     "share/pmx/examples/port_skeleton.c", "include/pmx/pmx_version.h"):
             if not (prefix / part).is_file():
                 sys.exit(f"{part} is not installed")
 

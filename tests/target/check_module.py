@@ -2,7 +2,7 @@
 """Links an object for a kernel as a kernel's build links a module: with C files of the stack, compiled as kernels
 compile theirs. The linker has nothing to warn of, and nothing stays open but what every kernel offers to modules.
 
-usage: check_module.py OBJECT COMPILER
+usage: check_module.py OBJECT COMPILER SKELETON
 """
 
 import pathlib
@@ -11,7 +11,7 @@ import sys
 import tempfile
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
-SOURCES = ("examples/port_skeleton.c", "src/driver/pmx/pmx_export.c")
+GLUE = ROOT / "src/driver/pmx/pmx_export.c"
 INCLUDES = ("tests/kernel/include", "src/system/inc", "src/driver/inc", "src/driver/private_inc")
 # Of a kernel for ARMv7; in which state it is compiled is the object's matter.
 FLAGS = ("-D__KERNEL__", "-std=gnu11", "-nostdinc", "-ffreestanding", "-Wall", "-Wextra", "-Werror", "-O2",
@@ -24,12 +24,12 @@ def run(*command):
     return subprocess.run(command, capture_output=True, text=True, check=False)
 
 
-def link(shipped, compiler, directory):
+def link(shipped, compiler, sources, directory):
     """(module, what the linker said); no module when it failed."""
     objects = []
-    for source in SOURCES:
+    for source in sources:
         objects.append(directory / f"{pathlib.Path(source).stem}.o")
-        made = run(compiler, *FLAGS, *(f"-I{ROOT / include}" for include in INCLUDES), "-c", ROOT / source, "-o",
+        made = run(compiler, *FLAGS, *(f"-I{ROOT / include}" for include in INCLUDES), "-c", source, "-o",
                    objects[-1])
         if made.returncode != 0:
             sys.exit(f"{source}: {made.stderr}")
@@ -39,9 +39,9 @@ def link(shipped, compiler, directory):
 
 
 def main():
-    shipped, compiler = sys.argv[1:]
+    shipped, compiler, skeleton = sys.argv[1:]
     with tempfile.TemporaryDirectory() as directory:
-        module, said = link(shipped, compiler, pathlib.Path(directory))
+        module, said = link(shipped, compiler, (skeleton, GLUE), pathlib.Path(directory))
         found = said.splitlines()
         if module:
             names = run("nm", "--undefined-only", "--format=posix", module).stdout.splitlines()

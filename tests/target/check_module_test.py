@@ -1,7 +1,8 @@
 #!/usr/bin/env python3
 """Feeds check_module.py objects that do not fit into a kernel's module, each for one reason, and one that does.
 
-usage: check_module_test.py C_COMPILER CPP_COMPILER FLAG...    the target's, with the product's flags for a kernel
+usage: check_module_test.py SKELETON C_COMPILER CPP_COMPILER FLAG...    the target's, with the product's flags for a
+                                                                       kernel
 """
 
 import pathlib
@@ -12,6 +13,7 @@ import unittest
 
 CHECKER = pathlib.Path(__file__).with_name("check_module.py")
 COMPILERS = []
+SKELETON = []
 
 # What the stack's C files of a module call of the layer.
 CALLED = ("PMX_GetMode", "fgPMX_DisplayModeReady", "i4Pmx_Connect", "i4Pmx_Disconnect", "PMX_OsdEnabled",
@@ -26,7 +28,7 @@ class CheckModule(unittest.TestCase):
             sample = pathlib.Path(scratch) / "sample.cpp"
             sample.write_text(text)
             subprocess.run([*COMPILERS[1:], *flags, "-c", sample, "-o", sample.with_suffix(".o")], check=True)
-            return subprocess.run([sys.executable, CHECKER, sample.with_suffix(".o"), COMPILERS[0]],
+            return subprocess.run([sys.executable, CHECKER, sample.with_suffix(".o"), COMPILERS[0], *SKELETON],
                                   capture_output=True, text=True, check=False)
 
     def refused(self, text, *arguments, **named):
@@ -58,5 +60,5 @@ class CheckModule(unittest.TestCase):
 
 
 if __name__ == "__main__":
-    COMPILERS = sys.argv[1:]
+    SKELETON, COMPILERS = sys.argv[1:2], sys.argv[2:]
     unittest.main(argv=sys.argv[:1])

@@ -32,7 +32,8 @@ def main():
             prefix / "share/pmx/scenarios/cold-boot.pmx", cwd=directory)
 
         for part in ("share/man/man1/pmxboard.1", "share/bash-completion/completions/pmxboard",
-                     "share/pmx/examples/port_skeleton.c", "include/pmx/pmx_version.h"):
+                     "share/pmx/examples/port_skeleton.c", "include/pmx/pmx_version.h",
+                     "share/pmx/schemas/trace.schema.json", "share/doc/pmx/LICENSE"):
             if not (prefix / part).is_file():
                 sys.exit(f"{part} is not installed")
 

@@ -22,3 +22,28 @@ endif()
 install(FILES tools/pmxboard/pmxboard.bash DESTINATION share/bash-completion/completions RENAME pmxboard)
 install(FILES LICENSE CHANGELOG.md SECURITY.md DESTINATION share/doc/pmx)
 install(DIRECTORY LICENSES DESTINATION share/doc/pmx)
+
+# Last, the bill of materials, which lists what was put in place before it. Files are found under DESTDIR, when that is
+# where they are put, and listed as they will lie.
+set(libraries "")
+foreach(library CLI11 nlohmann_json tomlplusplus)
+    find_package(${library} QUIET)
+    list(APPEND libraries "${library}=${${library}_VERSION}")
+endforeach()
+if(PMX_LINE_EDITOR AND LIBEDIT_LIBRARY)
+    list(APPEND libraries libedit=)
+endif()
+list(JOIN libraries " " libraries)
+install(CODE "
+    set(prefix \"\$ENV{DESTDIR}\${CMAKE_INSTALL_PREFIX}\")
+    set(listed \"${PROJECT_BINARY_DIR}/installed.txt\")
+    string(REPLACE \";\" \"\\n\$ENV{DESTDIR}\" files \"\$ENV{DESTDIR}\${CMAKE_INSTALL_MANIFEST_FILES}\")
+    file(WRITE \${listed} \"\${files}\\n\")
+    set(bill share/pmx/pmx.spdx.json)
+    execute_process(
+        COMMAND \"${Python3_EXECUTABLE}\" \"${PROJECT_SOURCE_DIR}/cmake/bill_of_materials.py\" \${prefix}
+            ${PROJECT_VERSION} ${PMX_VERSION_DATE} \${prefix}/\${bill} ${libraries}
+        INPUT_FILE \${listed}
+        COMMAND_ERROR_IS_FATAL ANY)
+    list(APPEND CMAKE_INSTALL_MANIFEST_FILES \${CMAKE_INSTALL_PREFIX}/\${bill})
+    message(STATUS \"Written: \${prefix}/\${bill}\")")

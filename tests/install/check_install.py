@@ -1,14 +1,18 @@
 #!/usr/bin/env python3
-"""Installs a build into a directory of its own, runs the tool there, and builds and runs the middleware example against
-it and nothing else.
+"""Installs a build into a directory of its own, holds the bill of materials against what lies there, runs the tool, and
+builds and runs the middleware example against it and nothing else.
 
-usage: check_install.py CMAKE BUILD_DIRECTORY LINKER_FLAGS
+usage: check_install.py CMAKE BUILD_DIRECTORY VERSION LINKER_FLAGS
 """
 
 import pathlib
 import subprocess
 import sys
 import tempfile
+
+sys.dont_write_bytecode = True
+
+import bill  # noqa: E402
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 
@@ -20,11 +24,14 @@ def run(*command, **options):
 
 
 def main():
-    cmake, build, linker_flags = sys.argv[1:]
+    cmake, build, version, linker_flags = sys.argv[1:]
     with tempfile.TemporaryDirectory() as directory:
         prefix = pathlib.Path(directory) / "prefix"
         elsewhere = pathlib.Path(directory) / "examples"
         run(cmake, "--install", build, "--prefix", prefix)
+        wrong = bill.complaints(prefix, version)
+        if wrong:
+            sys.exit("\n".join(["the bill of materials:", *wrong]))
         # Under a name that the project itself does not have, so that only the installed boards can serve.
         boards = prefix / "share/pmx/boards"
         (boards / "default").rename(boards / "installed")

@@ -18,14 +18,8 @@ TEST(Enumerators, ResolutionModes)
     // Facts are looked up by number.
     for (UINT32 number = 0; number < mode_facts::known; ++number)
         EXPECT_EQ(number, mode_facts::all_modes[number].number);
-    expect_numbers({
-        NUMBER(RES_4K2K23976HZ, 47),
-        NUMBER(RES_4K2K24HZ, 48),
-        NUMBER(RES_2160P, 49),
-        NUMBER(RES_2160P_4096, 50),
-        NUMBER(RES_MODE_NUM, 51),
-        NUMBER(RES_AUTO, 52),
-    });
+    for (const auto& [mode, number, enumerator] : mode_facts::other_enumerators)
+        EXPECT_EQ(number, mode) << enumerator;
 }
 
 TEST(Enumerators, DigitalPort)

@@ -93,10 +93,10 @@ TEST(ModeTable, CapMask)
 TEST(ModeTable, CapMask_DefaultWordAdmitsEveryModeThatHasABit)
 {
     const UINT32 word = _arPmxConfDefault.u4Capability;
-    for (UINT32 mode = 0; mode < known; ++mode)
-        EXPECT_EQ(mode != RES_2D_576I50HZ, (word & cap_mask(mode)) != 0) << "mode " << mode;
-    for (UINT32 mode : { RES_4K2K23976HZ, RES_4K2K24HZ, RES_2160P, RES_2160P_4096, RES_MODE_NUM, RES_AUTO })
-        EXPECT_EQ(0u, word & cap_mask(mode)) << "mode " << mode;
+    for (const Mode& mode : all_modes)
+        EXPECT_EQ(mode.capability != never, (word & cap_mask(mode.mode)) != 0) << mode.enumerator;
+    for (const Number& other : other_enumerators)
+        EXPECT_EQ(0u, word & cap_mask(other.mode)) << other.enumerator;
 }
 
 TEST(ModeTable, CapBit_TopAndBottom23HzGoesWith29_97Hz)

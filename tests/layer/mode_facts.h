@@ -109,6 +109,19 @@ inline constexpr Mode all_modes[] = {
 };
 #undef MODE
 
+struct Number
+{
+    UINT32 mode;
+    UINT32 number; ///< that the enumerator must have
+    const char* enumerator;
+};
+
+/** The enumerators without facts of their own. */
+inline constexpr Number other_enumerators[] = {
+    { RES_4K2K23976HZ, 47, "RES_4K2K23976HZ" }, { RES_4K2K24HZ, 48, "RES_4K2K24HZ" }, { RES_2160P, 49, "RES_2160P" },
+    { RES_2160P_4096, 50, "RES_2160P_4096" },   { RES_MODE_NUM, 51, "RES_MODE_NUM" }, { RES_AUTO, 52, "RES_AUTO" },
+};
+
 /** Number of modes that have facts of their own; the numbers from there on share what follows. */
 inline constexpr UINT32 known = std::size(all_modes);
 inline constexpr Mode any_other = { known, known, "", never, 1920, 1080, Colours::None, 30, hd_out };

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The virtual board: what tools and tests may do to it. There is one in a process, and one thread uses it; threads of
  *  the board's own world run by turns, see threads.h. */

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The board for C programs.
 #include "board/board_c.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The virtual board for C programs: power it on, let time pass, see its console. Everything else is in board.h, for
  *  C++. */

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The serial console: levelled and plain prints, assertions.
 #include "board/console.h"
 

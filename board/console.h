@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What the serial console has printed, for those who look at it piece by piece. board.h has the rest. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The one place of the board that knows the TOML library: it compiles slowly.
 #include <limits>
 #include <toml++/toml.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  How devices report what they hold. A setting that nobody has made since power-on is reported as null, so that "never
  *  programmed" and "programmed with 0" stay apart. */

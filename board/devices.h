@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The devices of the board: each holds its state in one struct in its own file, makes it good as new and reports it.
  *  What one device must know of another it asks here. */

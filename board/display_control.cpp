@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Display control: the delays of the two video planes.
 #include <array>
 #include <optional>

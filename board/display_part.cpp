@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The display part, which switches the sink: raises and lowers the mixer's format-change flag, after a set time or
 // never.
 #include "board/display_part.h"

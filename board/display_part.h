@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The display part: what switches the sink when the HDMI resolution changes. It raises the mixer's format-change flag
  *  when it begins and lowers it when it is done, so that graphics wait meanwhile. */

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Lengths of time as people write them: "10s", "500ms", "2us". */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "board/executable_symbols.h"
 
 #include <elf.h>

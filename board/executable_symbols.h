@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The symbol table of the running executable, local symbols included: finds the private objects of the layer also in
  *  the object that ships, the way a debugger does. Throws std::runtime_error when the executable was stripped. */

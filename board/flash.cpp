@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Flash partitions: each is an image file, read anew at every call.
 #include <algorithm>
 #include <fstream>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What a printf format says, for consoles that must survive whatever the stack prints. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The HDMI/AV driver: the sink, the commands that it was given, what it was told of the mixed picture.
 #include "board/hdmi_av.h"
 

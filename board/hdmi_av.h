@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What tools and tests may do to the board's HDMI side. Scripted refusals are faults of fgPmxDrvSetAvd and
  *  fgPmxDrvGetAvdInfo. */

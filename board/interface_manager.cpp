@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The interface manager: a registry of tables with reference counts.
 #include <compare>
 #include <map>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Values as JSON. Only those include it who build JSON of their own, for the library compiles slowly; for the rest
  *  there are Value::to_json() and TraceEntry::to_json(). */

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The layer's own state: kept as it was at load, so that a board that is powered on again starts the layer afresh. */
 #pragma once

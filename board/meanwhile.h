@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What somebody else does while the layer is inside a platform call: a neighbour's thread, an interrupt. It is done at
  *  the end of the call: the device has acted and its answer is settled, but the layer does not have it yet. */

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The plane mixer, its scaler, colour converters, digital port and vertical-sync handling.
 #include "board/mixer.h"
 

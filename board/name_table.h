@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The tables of names, written from the headers when the board is built. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Symbolic names of the numbers that cross the platform's and the layer's interfaces. */
 #pragma once

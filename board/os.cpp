@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The operating-system layer: handles, semaphores, formatting. What would make a thread wait for itself is reported and
 // refused, and so is a wait of the one that tools and tests run in: nobody else would go on meanwhile.
 #include <limits>

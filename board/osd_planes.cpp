@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The OSD driver: display mode, colour space, full-range conversion, plane positions, routing of the fifth plane.
 #include <algorithm>
 #include <array>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Power management: the operations that drivers registered, and the kernel that runs them.
 #include <algorithm>
 #include <vector>

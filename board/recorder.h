@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The trace as it is kept: what trace.cpp and trace_call.cpp share. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The chip's register space, and what its video PLL makes of it.
 #include <array>
 #include <map>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The sources of pictures: video planes vdp0 to vdp3 and OSD planes osd0 to osd5, each a component that connects to a
  *  port of the mixer, starts, changes its size, stops and disconnects, by the calls that its driver makes. A connected

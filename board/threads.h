@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Threads of the board's world, beside the one that tools and tests run in. A thread runs until it is done or waits
  *  for a semaphore that another one holds; only then does the one that let it run go on. So exactly one runs at any

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Timers of the operating-system layer, on the board's virtual clock.
 #include <algorithm>
 #include <map>

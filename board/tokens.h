@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What people write: numbers, lists and records as tokens of one line. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Every platform call, typed, in order. A platform function records itself and is a fault point in one line:
  *

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  How a platform function records itself; included by trace.h, whose first comment shows the use.
  *

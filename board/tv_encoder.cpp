@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The TV encoders: component behind encoder 0, composite behind encoder 1.
 #include "drv_tve.h"
 

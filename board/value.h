@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  A plain value tree: what the trace records about arguments and what devices report about their state. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The video plane driver: what the mixer told it, and what it answers.
 #include "board/video_planes.h"
 

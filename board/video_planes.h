@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What tools and tests may do to the board's video planes. Planes 0 and 1 show video, plane 2 the background
  *  picture. */

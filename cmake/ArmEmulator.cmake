@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # PMX_ARM_EMULATOR: the command before an ARM Linux program on this machine; empty where it cannot be run.
 set(PMX_ARM_EMULATOR "")
 find_program(PMX_QEMU_ARM qemu-arm)

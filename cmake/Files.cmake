@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # pmx_files(<variable> <pattern>...): the files of each pattern, looked up again at every build. A pattern that finds
 # none is an error: a folder was moved or misspelt, and what it holds would silently be left out.
 function(pmx_files variable)

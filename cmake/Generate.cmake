@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # What is written from the headers when it is needed: the headers are the one place that tells it.
 set(PMX_DECLARATIONS "")
 foreach(directory ${PMX_HEADER_DIRECTORIES})

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # The headers through which the layer, the stack and the virtual board know each other.
 set(PMX_HEADER_DIRECTORIES
     ${PROJECT_SOURCE_DIR}/src/system/inc

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # How everything that runs on the host is compiled: board, tools, tests. Optimised, g++ 12 takes "x" + std::string for
 # a copy onto itself: no -Wrestrict.
 add_library(pmx_host INTERFACE)

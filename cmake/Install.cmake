@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # What cmake --install puts in place: the layer's object and headers for a stack, the virtual board as a library, the
 # tool with its boards and scenarios, the guides and the examples.
 include(CMakePackageConfigHelpers)

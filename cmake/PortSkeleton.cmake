@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # The skeleton that a port starts from is written from the headers, at every build that finds them changed.
 set(PMX_PORT_SKELETON ${PROJECT_BINARY_DIR}/examples/port_skeleton.c)
 pmx_files(headers ${PROJECT_SOURCE_DIR}/src/system/inc/*.h ${PROJECT_SOURCE_DIR}/src/driver/private_inc/*.h)

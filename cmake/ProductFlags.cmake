@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # How the layer is compiled, in every preset alike: what ships is what was tested. Nothing of the build type enters.
 
 # The language that the product allows itself, on every target.

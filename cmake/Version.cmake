@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # The version stands in project(), and nowhere else. From there it goes into a header for C and C++, and into the
 # objects that ship; the day of its release, which CHANGELOG.md tells, goes into whatever carries a date.
 set(PMX_VERSION_DIRECTORY ${PROJECT_BINARY_DIR}/include)

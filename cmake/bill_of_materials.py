@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes what an installation consists of as an SPDX 2.3 document: each file with its checksums and licence, and the
 libraries that went into it. The same files give the same document: its date is the version's, or SOURCE_DATE_EPOCH.
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes what the headers promise about each function as a table that the tool is built with: its help is the text
 that a reader of the headers sees.
 

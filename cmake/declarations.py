@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Reads what the headers declare besides functions: enumerations, constants that are numbers, and records.
 
 What a number's name is told by stands in the text beside it: `a NAME value`, where NAME is an enumeration, or what the

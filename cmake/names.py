@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes the names of the numbers that cross the interfaces, as the headers have them: which names there are, and which
 parameters, results and fields take them.
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes the operations that a scenario can call, as the headers declare them: the layer's own, the functions of the
 platform that a neighbouring driver would call, and the slots of the mixer's table.
 

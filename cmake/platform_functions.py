@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Reads the functions that the headers declare, and writes the table of platform functions that the board is built
 with.
 

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # find_package(pmx): pmx::layer is the object that ships, with its headers; pmx::board the virtual board under it.
 get_filename_component(PMX_PREFIX ${CMAKE_CURRENT_LIST_DIR}/../../.. ABSOLUTE)
 

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """What the headers say of pointers: which way a parameter goes, and what stands behind it.
 
 A contract writes `@param[in]`, `@param[out]` or `@param[in,out]` for what the function reads, writes or both, and

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* A small middleware: boots the mixer, connects a video plane and a graphics plane, sets the four outputs, changes the
  * aspect ratio and shows the status, against the layer and the virtual board.
  *

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes port_skeleton.c: a body with its contract for every function that a stack provides, all of them empty but
 those that keep the list of timers.
 
@@ -14,7 +15,8 @@ sys.path.insert(0, str(ROOT / "cmake"))
 from platform_functions import LAYER_HEADER, PLATFORM_HEADERS, functions  # noqa: E402
 
 LONGEST_LINE = 120
-HEAD = """/* Every function that a stack provides, with its contract and an empty body: what a port starts from.
+HEAD = """// SPDX-License-Identifier: MIT OR GPL-2.0-only
+/* Every function that a stack provides, with its contract and an empty body: what a port starts from.
  * Written from the headers; copy it and fill the bodies, group by group, console first. As it
  * stands it links with pmx_if.o, answers 0 and does nothing, but for the list of timers that every port keeps. */
 """

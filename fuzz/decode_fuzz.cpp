@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Any bytes are a log: libFuzzer looks for some that are not.
 #include <cstddef>
 #include <cstdint>

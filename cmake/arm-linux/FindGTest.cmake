@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # GoogleTest for the target, from the sources that Debian has.
 if(NOT EXISTS /usr/src/googletest/CMakeLists.txt)
     message(FATAL_ERROR "GTest: /usr/src/googletest is missing: ./dev setup installs it")

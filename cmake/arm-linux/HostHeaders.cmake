@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # pmx_host_headers(<target> <directory>): a library of headers alone, in a directory of /usr/include, for a cross
 # compiler. It gets that directory and no other: the host's C library stays out of its sight.
 function(pmx_host_headers target directory)

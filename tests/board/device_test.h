@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What the tests of the board's devices share: a board that was just powered on, the last call's line, members of a
  *  state. */

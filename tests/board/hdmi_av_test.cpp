@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "board/hdmi_av.h"
 
 #include <string>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "drv_if.h"
 #include "drv_if_vdp.h"
 #include "sources_test.h"

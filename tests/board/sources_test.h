@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What the tests of the sources share: a board on which the mixer has started, and what happened on it. */
 #pragma once

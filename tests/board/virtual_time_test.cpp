@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Simulated time costs what happens in it, and nothing for passing. */
 #include "device_test.h"
 

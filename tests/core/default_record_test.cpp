@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // What every reset loads, field by field, and what is there before the first one.
 
 #include <algorithm>

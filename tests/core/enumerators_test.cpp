@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The numbers of the mixer's own enumerations and constants: other drivers, flash images and middleware were built
 // with them.
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The mode table's sets: which modes are HD for the TV encoder, which capability bit admits a mode, which standard's
 // colours it carries, how wide the colour bar is.
 

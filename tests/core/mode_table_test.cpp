@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The mode table, column by column: what each mode decides.
 
 #include <utility>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The module's objects besides the record: their values at load, the tables that other drivers read.
 
 #include <cstddef>

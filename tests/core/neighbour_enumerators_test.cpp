@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The numbers that cross the interfaces to middleware and neighbouring drivers.
 
 #include <gtest/gtest.h>

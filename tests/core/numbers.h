@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Enumerators and constants against the numbers that they must have. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The records' fields in their order and of their types: what debuggers' scripts and crash dumps rely on, and what
 // other drivers were compiled with.
 

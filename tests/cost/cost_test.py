@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds the tool that measures costs against small cases that are counted by hand."""
 
 import copy

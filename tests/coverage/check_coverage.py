@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Runs test programs over a compile of the layer that counts, and prints which of its lines and branches they run.
 A report to look at, line by line, is left in the build directory: coverage/index.html.
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds the table of the layer's texts against the strings in the layer's object.
 
 usage: texts.py OBJECT TABLE    TABLE: what `pmxboard decode --texts --json` writes

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Runs texts.py on the layer's object and on such as must be refused.
 
 usage: texts_test.py OBJECT TOOL OBJCOPY

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Runs the examples of a document on the virtual board and holds what stands there against what it shows.
 
 usage: calling.py [--fix] [--header HEADER] DOCUMENT TOOL

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds calling.py documents that are right, and documents with each kind of mistake."""
 
 import pathlib

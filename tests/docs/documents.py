@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Checks what documents tell their readers: commands work, links lead somewhere.
 
 usage: documents.py ROOT TOOL DOCUMENT...

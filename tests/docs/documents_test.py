@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds documents.py a document that is right, and documents with each kind of mistake."""
 
 import pathlib

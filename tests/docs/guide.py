@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds the tables of the guide to scenarios against those that the tool writes from its own verbs.
 
 usage: guide.py [--renew] TOOL GUIDE

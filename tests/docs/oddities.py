@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds the document of oddities against the tests: every row names tests, and every test named exists.
 
 usage: oddities.py DOCUMENT TESTS

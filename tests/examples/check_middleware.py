@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Runs the middleware example and holds what it prints against what it is written to show.
 
 usage: check_middleware.py PROGRAM [BOARD]

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Compiles the porting skeleton as C and links it with the object that ships: nothing but the kernel's own may stay
 open.
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Starts and unloads the porting skeleton, and looks at its list of timers on the way. */
 #include "port_skeleton.c" // NOLINT(bugprone-suspicious-include): its list is private
 

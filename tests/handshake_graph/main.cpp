@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Writes the state graph of the handshake with the display part, as DOT, to a file.
 #include <cstdio>
 #include <exception>

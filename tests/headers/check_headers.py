@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Compiles every header of the given directories alone, twice in one file, and all together in both orders: as C and as
 C++, with gcc and clang, hosted and freestanding, for the host, for the 32-bit target and as a kernel's C files see it:
 a kernel of today, and one that takes <stdarg.h> from the compiler.

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds check_headers.py headers that must be refused, each for one reason, and one that must pass.
 
 usage: check_headers_test.py OPTION...    the compilers, as for check_headers.py

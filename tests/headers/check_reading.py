@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Compares what the scripts of cmake/ read in the headers with what a compiler finds there: functions with their
 parameters, functions behind pointers, enumerations with their numbers, records with their fields; of the layer's own
 header the records alone.

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Changes one thing in a copy of the headers, and looks at what the scripts of cmake/ write, or refuse, and whether
 check_reading.py sees what they misread.
 

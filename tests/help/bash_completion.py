@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Asks bash what it would complete.
 
 usage: bash_completion.py TOOL ROOT

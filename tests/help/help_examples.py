@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Runs every example that the --help of the tool and of its sub-commands ends with.
 
 usage: help_examples.py TOOL ROOT

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds help_examples.py tools whose examples work, and such whose do not."""
 
 import pathlib

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Has the manual page written for small tools, and holds it against what their helps say; mandoc must like it."""
 
 import pathlib

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """What is wrong with the bill of materials of an installation."""
 
 import datetime

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Has a bill of materials written for a small installation, changes either, and looks for the complaint."""
 
 import json

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Installs a build into a directory of its own, holds the bill of materials against what lies there, runs the tool, and
 builds and runs the middleware example against it and nothing else.
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds the binary interface of the object that ships against the one that is committed: what it offers, what it needs,
 and each type that the headers show. What the platform provides comes from the skeleton of a port, which has a body for
 every function. Whatever differs is named; that is not always wrong, but never meant to happen unnoticed.

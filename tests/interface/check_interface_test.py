@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Changes headers, and the skeleton with them, in ways that break callers or neighbours, and looks for the names.
 
 usage: check_interface_test.py SKELETON COMPILER

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds the tests that there are against the number that there must be: none vanishes unnoticed.
 
 usage: inventory.py [--renew] LIST BUILD PROGRAM...

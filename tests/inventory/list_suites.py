@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes a ctest file that registers each suite of a test program as one test: a process for each case takes several
 times as long as the cases.
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Compiles the kernel glue as a kernel would, without any header of the host, and names what it exports; the licence
 must be one that gives the module the kernel's own exports.
 

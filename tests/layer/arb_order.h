@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The packed plane order as its tests look at it: the lines that a call prints, whatever comes of it. */
 #pragma once

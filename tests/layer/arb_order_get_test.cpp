@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The packed plane order: reading it back, and what outlives what. */
 #include "board/mixer.h"
 #include "pmx_hal.h"

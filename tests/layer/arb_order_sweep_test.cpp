@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The packed plane order: every mode, every way to name a source twice, every permutation. */
 #include <algorithm>
 #include <random>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The packed plane order: programming it, compensating the delays that follow, refusals. */
 #include "tests/layer/arb_order.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What tests of the aspect ratio have in common: the record's five fields, ratios, expected lines. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The digest view's aspect ratio. */
 #include <set>
 

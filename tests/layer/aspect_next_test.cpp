@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** An aspect ratio that waits for the next mode change. */
 #include "tests/layer/aspect.h"
 

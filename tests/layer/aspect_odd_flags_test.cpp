@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Aspect ratios while their two flags hold neither 0 nor 1, and an HDMI driver that answers neither. */
 #include "tests/layer/aspect.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The normal aspect ratio, set now. */
 #include "tests/layer/aspect.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Reading the boot resolution; the TV type. */
 #include "tests/layer/sequences.h"
 #include "tests/support/layer_fixture.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Which modes the capability word admits; the force-mode flag. */
 #include "tests/layer/mode_facts.h"
 #include "tests/support/layer_fixture.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The colour bar, and what it does to planes 1 and 2 while they are swapped. */
 #include "tests/support/layer_fixture.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The two colour converters: the mixer's and the scaler's. */
 #include "pmx_hal.h"
 #include "tests/layer/one_mode.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // PMX_Printf prints what a bit of PMX_debug_level lets through.
 
 #include <climits>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The digital picture's colour format, on the port and on HDMI; and what the master enable applies of the port. */
 #include <string>
 

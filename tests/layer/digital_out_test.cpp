@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The parallel digital port: switch, width and mode, clock phase, drive strength. */
 #include <string>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Master enable and capability word. */
 #include "tests/support/layer_fixture.h"
 

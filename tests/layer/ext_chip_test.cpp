@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Settings of the external video chip, and closed captions. */
 #include <string>
 

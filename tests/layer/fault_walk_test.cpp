@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The n-th platform call with a result fails, for every n: start-up and shut-down always go on to their end. */
 #include <algorithm>
 #include <map>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The fixture itself: what it must refuse, it refuses. */
 #include <gtest/gtest-spi.h>
 

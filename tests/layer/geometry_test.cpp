@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** What the current mode is reported as: progressive, HD; that nothing is remembered from an earlier mode. */
 #include "tests/layer/mode_facts.h"
 #include "tests/support/layer_fixture.h"

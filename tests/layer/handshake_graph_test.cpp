@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The drawing of the handshake in docs/ shows what the layer does. */
 #include <gtest/gtest.h>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The display timer runs out at every point of every operation that may be under way meanwhile: after each platform
  *  call, log lines and the last one included. Once a timer that was left running has run out too, graphics are back or
  *  owed. What shows in between is held here by the name of the point: callers live with it, and nobody repairs it. */

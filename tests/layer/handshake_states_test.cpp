@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The handshake with the display part in every state that it can reach: the layer is brought there on the board, and
  *  every event is tried from each. */
 #include <gtest/gtest.h>

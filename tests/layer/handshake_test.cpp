@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The handshake with the display part, function by function. */
 #include "board/video_planes.h"
 #include "tests/layer/mode_ex.h"

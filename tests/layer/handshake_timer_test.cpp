@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The display timer: starting it, its failures, its expiry. */
 #include <chrono>
 

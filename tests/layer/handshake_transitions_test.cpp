@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** From state to state of the handshake with the display part, by the calls that lead there. */
 #include <chrono>
 

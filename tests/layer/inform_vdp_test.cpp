@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Telling the video planes the master colour space. */
 #include "drv_if.h"
 #include "tests/layer/source_events.h"

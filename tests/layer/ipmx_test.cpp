@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The IPMX table, fetched from the interface manager as a neighbouring driver does. */
 #include "drv_if.h"
 #include "pmx_hal.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** How the master colour space is chosen, over all that it may depend on. */
 #include <array>
 #include <optional>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** How the master colour space is chosen: rule by rule, and its announcement. */
 #include "tests/layer/source_events.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What the tests of per-output mode setting share: requests that read as a middleware would say them, and expected
  *  lines that many traces have in common. */

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Per-output mode setting and the analogue side: TV type, HD formats, fifth OSD plane, encoders that fail. */
 #include <set>
 

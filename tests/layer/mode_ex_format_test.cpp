@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Per-output mode setting: choosing the mixer's format, refusing it, and what the record keeps. */
 #include "board/video_planes.h"
 #include "tests/layer/mode_ex.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Per-output mode setting when the mixer's format changes: the whole sequence. */
 #include "tests/layer/mode_ex.h"
 #include "tests/layer/sequences.h"

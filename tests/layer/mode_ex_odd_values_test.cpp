@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Per-output mode setting with flags, switches and numbers that are neither 0 nor 1: what counts as set, as a change,
  *  as a sink, and what is handed on and kept. */
 #include <array>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Per-output mode setting: which fields of a request count, how wide they are, and when they are stored. */
 #include "tests/layer/mode_ex.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What per-output mode setting does, said a second time, for tests that go through many combinations: the record
  *  before, the request and the board give the whole list of platform calls and the record afterwards. Knows the modes

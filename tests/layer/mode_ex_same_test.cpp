@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Per-output mode setting while the mixer's format stays: only what changed is sent. */
 #include "board/hdmi_av.h"
 #include "tests/layer/mode_ex.h"

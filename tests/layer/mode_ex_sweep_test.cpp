@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Per-output mode setting, all combinations: against the rule said a second time. */
 #include "board/hdmi_av.h"
 #include "board/video_planes.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The end of per-output mode setting: whether graphics wait for the display part. */
 #include <chrono>
 

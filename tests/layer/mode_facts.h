@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What each resolution mode decides, typed here anew and once for all tests: a line for a mode. What the layer's own
  *  table says of it is never looked at. */

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** One resolution mode on all outputs: refusals, answers that count for nothing, the record's share, the IPMX slot. */
 #include "drv_if.h"
 #include "tests/layer/one_mode.h"

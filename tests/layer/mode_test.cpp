@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** One resolution mode on all outputs: what is called, in which order, and what is stored when. */
 #include "tests/layer/one_mode.h"
 #include "tests/support/layer_fixture.h"

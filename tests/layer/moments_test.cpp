@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** What others change while an operation is inside a call, and what it goes on with: each value is read where it is
  *  used, and the caller's own only once. */
 #include <algorithm>

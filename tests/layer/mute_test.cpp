@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The output mute, and the colour bar that it hides. */
 #include "tests/support/layer_fixture.h"
 

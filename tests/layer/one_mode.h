@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The expected traces of the colour conversions and of one mode on all outputs, put together from their inputs. */
 #pragma once

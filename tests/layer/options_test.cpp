@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Switches that others act on: digital port's source, composite's set-up and PAL-60, media type; and the 2D
  *  smoothing flag. */
 #include <string>

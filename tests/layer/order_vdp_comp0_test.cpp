@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Which of the two video planes lies above the other. */
 #include "board/video_planes.h"
 #include "pmx_hal.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The five picture adjustments side by side, for what is alike in all of them. */
 #pragma once

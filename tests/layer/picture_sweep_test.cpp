@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** What the five picture adjustments have in common, each value, target and capability bit of each. */
 #include "tests/layer/picture.h"
 #include "tests/support/layer_fixture.h"

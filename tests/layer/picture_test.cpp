@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Brightness, contrast, hue, saturation, sharpness: each for the analogue outputs and for HDMI, and refused. */
 #include "tests/support/layer_fixture.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Background colour and the stacking order, position by position. */
 #include <array>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Swapping planes in the hardware, and what is handed straight on to it: active zone and delay. */
 #include "tests/support/layer_fixture.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The video PLL's frequency synthesiser. */
 #include "tests/layer/mode_facts.h"
 #include "tests/layer/sequences.h"

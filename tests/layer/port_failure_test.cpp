@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Connecting and disconnecting what has no port, with another mixer, without a working mutex; what connecting leaves
  *  to others. */
 #include "pmx_hal.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The input ports: which component has which, and what connecting and disconnecting leaves there. */
 #include "tests/layer/source_events.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The status report as its tests look at it: the texts of its lines. */
 #pragma once

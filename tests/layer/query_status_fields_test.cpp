@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // PMX_QueryStatus: every field where it belongs. All numbers of the record are different, so that an exchanged field
 // shows.
 

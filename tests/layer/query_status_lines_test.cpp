@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // PMX_QueryStatus: lines that are not what their labels say, numbers in an unexpected form, names and their absence.
 
 #include <climits>

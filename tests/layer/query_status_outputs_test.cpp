@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // PMX_QueryStatus: the lines of the four outputs, every value of their enumerations with the blanks that go with it.
 
 #include <array>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // PMX_QueryStatus: the whole report, word for word. Field engineers read it and their tools parse it, blanks and all.
 
 #include <string>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** What others may ask: mode, output size, aspect ratio. */
 #include "tests/layer/mode_facts.h"
 #include "tests/support/layer_fixture.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Registration at the interface manager; suspend and resume. */
 #include "drv_if.h"
 #include "tests/support/layer_fixture.h"

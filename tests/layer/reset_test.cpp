@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Reset: record, boot resolution, hardware. */
 #include <algorithm>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Expected calls that many operations have in common, written out for the register and boot values at hand. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Shut-down, both ways, and the light stop. */
 #include "tests/layer/sequences.h"
 #include "tests/support/layer_fixture.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What tests of sources share: video planes that stand in for the driver's, published at the board's interface
  *  manager, and the lines that a change of the master colour space leaves in the trace. */

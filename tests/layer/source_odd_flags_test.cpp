@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Ports whose flags hold neither 0 nor 1: any number but 0 is set, and what sets or clears a flag leaves 1 or 0. */
 #include <vector>
 

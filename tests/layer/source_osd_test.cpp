@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** An OSD plane starts and stops. */
 #include "tests/layer/source_events.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Source events that are refused, and those of the mixer's interface table, which are inert. */
 #include "tests/layer/source_events.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** A video plane stops: the mixer forgets that it runs, and decides nothing. */
 #include "tests/layer/source_events.h"
 

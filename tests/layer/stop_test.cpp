@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The light stop, and what may come behind any way of shutting down. */
 #include <stdexcept>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** What is handed to the HDMI/AV driver: TV system, supported resolution, deep colour, automatic resolution. */
 #include <algorithm>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** The second video plane in and out of the mix; where a video plane sits. */
 #include "pmx_hal.h"
 #include "tests/support/layer_fixture.h"

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds every file to say its licence in its first line, but those that .reuse/dep5 excepts. With --fix, writes the
 line where it is missing.
 

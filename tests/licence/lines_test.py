@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds lines.py small projects: with every licence said, with one that is missing, and with files that it cannot
 know."""
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Drawn values seldom agree with each other. What a layer decides by comparing is reached by making them agree, and
  *  then by making them differ in one place. */

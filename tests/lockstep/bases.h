@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Calls of operations to start trials from: with their arguments, and the state that they find. */
 #pragma once

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Runs the layer of an older revision and today's side by side over random operations, and tells what they do
 differently: calls and their order, arguments, bytes behind pointers, texts, results, outputs and stored values, and
 where stores stand among the calls.

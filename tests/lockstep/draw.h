@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Drawn states and arguments: any value can come, and those that decide something come often. */
 #pragma once

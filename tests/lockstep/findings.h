@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Runs trials in both layers, and keeps what they did differently, counted by kind. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Runs scenarios, and writes every call of an operation that they make, each once: operation, arguments, and the state
  * that it finds. */
 #include <cstring>

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes the functions that stand before the layer's operations while scenarios run: each notes its arguments and the
 state, and lets the call pass. The linker puts them in place (--wrap).
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What is noted of an operation that a scenario calls. */
 #pragma once

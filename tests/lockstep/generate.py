@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes what two layers side by side have in common, from the headers: the platform's functions, which hand all that
 they are given to a recorder, and the tables of operations, state and names with both layers' addresses.
 

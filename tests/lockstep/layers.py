@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Makes a program of two layers and whatever runs them side by side."""
 
 import pathlib

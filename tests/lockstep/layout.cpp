@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Where everything stands in an image: the state's objects in the order of the record's layout, the caller's memory
  * behind them. */
 #include <cstring>

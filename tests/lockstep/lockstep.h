@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Two layers side by side: one operation is run by each, from the same state, with the same arguments, on a platform
  *  that answers both alike; what they did is then compared. Neither board nor time takes part: a platform function

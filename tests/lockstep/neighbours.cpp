@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Holds the layer against a literal writing of its steps: every call of an operation, and while the layer is inside
  * that call a neighbour that changes any one field of what the layer may look at. What follows must be what the steps
  * say. */

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds the comparison with the literal writing against layers that are wrong in one place: it has to tell.
 
 usage: neighbours_test.py DIRECTORY LITERAL [UNITTEST-OPTION...]

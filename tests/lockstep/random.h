@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Numbers that look random and follow from a seed alone. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Runs one operation in one layer, and is the platform meanwhile. */
 #include "tests/lockstep/recorder.h"
 

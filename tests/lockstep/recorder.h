@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What the platform functions of the lockstep programs do: they are written from the headers and hand everything to
  *  one of these. */

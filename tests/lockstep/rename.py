@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes a copy of a layer's object with a prefix before every name that it defines, for two of them to fit into one
 program. The first of them must not remember more than what is compared.
 

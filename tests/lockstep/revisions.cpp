@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Runs two layers side by side over random operations, and counts by kind what they do differently. */
 #include <iostream>
 #include <string>

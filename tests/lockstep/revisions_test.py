@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds the comparison of two layers against layers that are known to be alike, and to differ.
 
 usage: revisions_test.py DIRECTORY [UNITTEST-OPTION...]

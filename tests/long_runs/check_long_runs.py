@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Time for a command is the same at the end of a long run as at its beginning, and memory does not grow: instructions
 of 20,000 and of 40,000 commands, memory of 2,000 and of 200,000.
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Runs the object that ships on a stack filled with a byte, then with another, and holds every byte that it hands to
 the platform by address against the image written here: fields that nobody fills and padding are 0.
 

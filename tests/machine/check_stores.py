@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Runs the object that ships, and holds its loads and stores in the handshake's status against what is written here:
 which, in which order, between which calls, and that each is of its own and as wide as its field.
 

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """The layer's object code run instruction by instruction, in an emulator, for any of its processors: what it stores and
 loads in the objects that others look at, when, and how wide; and every byte that it hands over by address.
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds check_stores.py and check_handed_bytes.py, for each compiler and processor, small layers that must be refused,
 each for one reason, and some that must pass.
 

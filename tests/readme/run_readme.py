@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Runs the commands of a document, so that what it tells the reader to type works.
 
 usage: run_readme.py DOCUMENT TOOL

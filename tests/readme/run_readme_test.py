@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds run_readme.py documents whose commands fail, and one whose commands work."""
 
 import pathlib

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Types the sessions that a document shows, and holds what comes against what it shows.
 
 usage: run_sessions.py [--most N] DOCUMENT TOOL

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds run_sessions.py sessions that show what comes, and such that do not."""
 
 import pathlib

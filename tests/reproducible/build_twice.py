@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Builds the objects that ship twice, from copies of the tree in folders of different depth and name, and compares them
 byte for byte: whoever builds a version gets what was tested. No compiler cache takes part.
 

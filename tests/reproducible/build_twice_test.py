@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds build_twice.py files that are alike, and files that are not."""
 
 import pathlib

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds what the tool writes for programs against the schemas: the trace of every scenario with its stores, the state
 and the difference that it ends with, operations, modes, and logs that are decoded.
 

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """The schemas of what the tool writes for programs, and what is wrong with a document by one of them."""
 
 import json

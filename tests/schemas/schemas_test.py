@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Changes what the tool writes in ways that a schema must refuse, and names where.
 
 usage: schemas_test.py TOOL

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """`pmxboard shell` on a terminal, as somebody uses it who types.
 
 usage: shell_test.py PMXBOARD

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The handshake with the display part, explored: the layer on a board, brought from state to state by the events that
  *  a stack knows, until no new state appears. */

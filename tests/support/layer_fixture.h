@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The ground that tests of the layer stand on: a board that is powered on with a boot image of the test's choice, the
  *  trace compared with lines written out, the layer's record by field name. A test arranges the board, calls the layer,

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds an object file that ships against two lists: the global symbols it defines, and those it needs.
 
 Refused as well is whatever a plain C driver stack, a kernel's module loader for instance, does not provide for: weak

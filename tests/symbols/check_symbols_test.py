@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds check_symbols.py objects that must be refused, each for one reason, and one that must pass.
 
 usage: check_symbols_test.py COMPILER FLAG...    with the flags of the product

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Brings the build directory of another preset up to date, which is quick when it is; says how to make one that is not
 there.
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds what the headers and the porting guide say of MutexPMX against the compiler's call graph: which operations can
 take it. A caller that does not know waits for ever.
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds check_locks.py call graphs and headers that are at odds, and some that agree."""
 
 import pathlib

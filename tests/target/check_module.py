@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Links an object for a kernel as a kernel's build links a module: with C files of the stack, compiled as kernels
 compile theirs. The linker has nothing to warn of, and nothing stays open but what every kernel offers to modules.
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds check_module.py objects that do not fit into a kernel's module, each for one reason, and one that does.
 
 usage: check_module_test.py SKELETON C_COMPILER CPP_COMPILER FLAG...    the target's, with the product's flags for a

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds an object for the 32-bit ARM target against what a kernel's module loader and a small stack take.
 
 As on the host: the two lists of symbols, nothing weak, no code before the first call (see ../symbols/check_symbols.py).

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds check_target.py objects for the target that must be refused, each for one reason, and one that must pass.
 
 usage: check_target_test.py COMPILER FLAG...    the target's compiler, with the flags of the product

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """One call log: every scenario gives the same trace, byte for byte, on every target and with every compile.
 
 Each scenario runs with all arguments named, traced in the form for people. The SHA-256 of what a program prints is held

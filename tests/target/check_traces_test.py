@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds check_traces.py against programs whose traces differ from the list, each in one way."""
 
 import pathlib

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Runs the threads' program in one of four ways and judges what ThreadSanitizer and the program itself say.
 
     suppressed      nothing but what the suppression file lists races, and no call waits for ever

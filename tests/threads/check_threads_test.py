@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds check_threads.py suppression files and reports that it must refuse, and some that it must not."""
 
 import pathlib

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* The threads of a stack that is busy: each calls what its component calls on a product, and nothing that the layer's
  * contracts forbid: one thread alone changes modes. */
 #include "jobs.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* What each thread does. */
 #ifndef TESTS_THREADS_JOBS_H
 #define TESTS_THREADS_JOBS_H

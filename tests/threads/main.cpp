@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* The layer on several threads, under ThreadSanitizer: what the layer's mutex protects is free of races, what the layer
  * leaves unlocked is listed by name in unlocked_by_design.supp, and nothing waits for ever.
  *

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* The neighbouring drivers: the interface manager with four video planes, and the hardware's mixing and swapping. */
 #include "stand_ins.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* The operating-system layer on POSIX threads: one mutex, one timer, and no console. */
 #include "stand_ins.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* The platform as the threads find it. What several threads reach is a relaxed atomic on purpose: it orders nothing, so
  * that the mutex of the layer is the only thing in the program that does, and no race hides behind a stand-in. */
 #ifndef TESTS_THREADS_STAND_INS_H

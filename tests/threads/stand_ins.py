@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes a body for every platform function: it does nothing and answers zero. The bodies are weak, so that a function
 that is written by hand elsewhere in the program takes its place.
 

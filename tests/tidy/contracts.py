@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Contracts: what the headers promise about every function, and that the virtual board and the symbol lists keep up."""
 
 import pathlib

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """A light reading of C and C++ text: enough to find comments and functions, not a parser."""
 
 import re

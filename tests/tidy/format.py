@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Names the C and C++ files that are not in the house style, with what would change; with --fix, rewrites them.
 
 clang-format does not know that DRV_ENUM(NAME) { … } is an enumeration. It is shown one.

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Runs clang-tidy over every file that the build compiles, and names what it finds.
 
 A file whose text, headers of the project and rules are as they were when it last passed is not read again.

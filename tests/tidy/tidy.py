@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Keeps the house clean: reads every file of the project and names what does not belong there.
 
 usage: tidy.py [ROOT]

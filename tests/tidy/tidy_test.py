@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds tidy.py small projects, each with one thing that it must name, and one that must pass."""
 
 import pathlib

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The built program, as a shell sees it.
 #include <gtest/gtest.h>
 

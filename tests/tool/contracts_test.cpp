@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The text that the tool's help is made of, as the build takes it from the headers and from the guide.
 #include <gmock/gmock.h>
 

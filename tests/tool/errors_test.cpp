@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Wrong lines: each names its file and line, what is wrong, and what may have been meant; and nothing of it is done.
 #include <gtest/gtest.h>
 

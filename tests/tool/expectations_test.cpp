@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Every expectation both ways: met in silence, and failed with what was expected and what was found.
 #include <gtest/gtest.h>
 

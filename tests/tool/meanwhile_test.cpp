@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // What happens while the layer is inside a platform call.
 #include <gtest/gtest.h>
 

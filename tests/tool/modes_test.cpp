@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The resolution modes as the tool shows them, held against expectations that are typed here and not read anywhere.
 #include <gmock/gmock.h>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The operations as the tool explains them: each with its contract, and with a line that works.
 #include <gmock/gmock.h>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The built program, as a shell sees it: a fixture that runs it, each test with a directory of its own. */
 #pragma once

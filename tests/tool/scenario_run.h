@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Runs the lines of a scenario within a test, and looks into the project's headers. */
 #pragma once

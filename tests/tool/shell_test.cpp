@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The shell from a pipe, and where it keeps its history. On a terminal: tests/shell.
 #include <gmock/gmock.h>
 

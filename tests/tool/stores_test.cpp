@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Stores into the layer's objects, in the trace and in what is expected of it.
 #include <gtest/gtest.h>
 

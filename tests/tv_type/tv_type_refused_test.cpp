@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Mode setting when the TV type is refused: the assertion says so in its place, and the sequence goes on. */
 #include "tests/support/layer_fixture.h"
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """One version everywhere: what the tool says, what the header says, and what the objects that ship say.
 
 usage: check_version.py VERSION TOOL HEADER OBJECT...

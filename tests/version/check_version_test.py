@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Feeds check_version.py a tool, a header and an object of one version, and each of them of another one."""
 
 import pathlib

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """The layer on the 32-bit target, compiled for size: bytes of code, texts, tables and RAM by symbol, and stack by the
 compiler's own call graph. Of the form for kernels the bytes in all, and those of its unwind tables."""
 

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """The compiler's own call-graph information (VCG, one file for each source): frames, worst paths, indirect calls."""
 
 import dataclasses

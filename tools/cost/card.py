@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """The cost card: everything that was measured as one object, and the document that people read."""
 
 import json

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds what is measured against the committed card: calls to the one, bytes and instructions to two in a hundred."""
 
 GROWTH = 0.02

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """The cost card: what the layer costs in bytes, stack, calls and instructions. Writes docs/cost.md for people and
 docs/cost.json for programs.
 

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """What a change has cost: two trees measured alike, symbol by symbol and path by path."""
 
 import card as cards

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Reads what the cost is measured by from an object file: sections and symbols."""
 
 import dataclasses

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # Prints the product's flags, one list a line: cmake -DROOT=... -P flags.cmake
 set(PROJECT_SOURCE_DIR ${ROOT})
 set(PROJECT_BINARY_DIR ${ROOT}/build)

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """What the layer is meant to cost, which goals are missed, and whether each miss is explained."""
 
 import dataclasses

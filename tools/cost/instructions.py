@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Counts the instructions of each path, inside the layer and inside its floor: records the paths on the virtual board,
 builds the measuring program from the recording, and runs it under callgrind."""
 

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """The paths that are measured: for each operation a cheapest and a dearest one, written in the scenario language.
 
     [PMX_SetTvType cheapest]

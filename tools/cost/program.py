@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes the program whose instructions are counted, from what was recorded of each path: the floors, and around them
 functions of the platform that answer at once what was answered then.
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Runs paths on the virtual board and writes each path's last call, and every call of the platform within it, as one
  * JSON object a line. Reads from the standard input: a line `path NUMBER`, then the path's lines. */
 #include "tools/cost/recorder.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Records what passes between a caller, the layer and the platform, in the raw: the arguments as they are handed over,
  *  and what is answered. The functions between which it stands are written from the headers. */

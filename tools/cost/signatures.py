@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """What the headers tell of the layer's operations and the platform's functions, as those need it who stand between
 them: for each parameter how it is recorded, and how many bytes are read or written behind it."""
 

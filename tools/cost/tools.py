@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Running compilers and other programs."""
 
 import concurrent.futures

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes the functions that stand between the layer and its surroundings while paths are recorded: one for each
 operation and each function of the platform, put in place by the linker (--wrap)."""
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Writes the manual page from what the tool's --help, and that of each sub-command, say. What no help tells, the
 environment and where things are, stands here.
 

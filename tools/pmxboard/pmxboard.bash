@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
 # Completion of pmxboard for bash. The tool itself says what there is: sub-commands and options in its --help, the words
 # of the scenario language by `pmxboard complete LINE`.
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The layer's table of resolution modes, as it lies in the linked layer. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Where the layer's private objects keep their fields: one table, made from the layer's own types; and how they are
  *  read there. */

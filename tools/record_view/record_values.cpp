@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Objects of the layer as they lie in memory, read by the table of their fields.
 #include <bit>
 #include <cstring>

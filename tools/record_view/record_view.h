@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The layer's record and the module's other objects, seen from outside: the one place that looks in there. It finds
  *  the objects through the executable's symbol table, as a debugger does, so that it works on the object that ships,

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What is stored into the layer's objects, told to the trace: record, handshake and the module's others are compared
  *  whenever those who may store take turns. Stores between two such moments are told in the order of the fields, for

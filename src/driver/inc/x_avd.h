@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  HDMI codes shared by the HDMI/AV driver and its callers. */
 #ifndef X_AVD_H

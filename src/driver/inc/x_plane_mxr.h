@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The middleware's view of the plane mixer: enumerations that its calls carry. */
 #ifndef X_PLANE_MXR_H

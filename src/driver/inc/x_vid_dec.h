@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Aspect codes of decoded video, as the middleware hands them to the mixer. */
 #ifndef X_VID_DEC_H

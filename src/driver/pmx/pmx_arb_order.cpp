@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Arbitrary plane order: any permutation of the eight sources over the eight planes, with the delays that follow from
  * it. */
 #include "drv_osd.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Three aspect ratios: the one in force, one on its way in with the next mode change, and one for the digest view. */
 #include "drv_av_d.h"
 #include "drv_pmx.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Boot resolution, video PLL and TV type. */
 #include "drv_pmx.h"
 #include "pmx_hal.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Colour conversions between the mixer's colour space and the output's. */
 #include "drv_pmx.h"
 #include "pmx_hal.h"

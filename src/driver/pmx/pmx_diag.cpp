@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Formatted print and status report. Field engineers know the report line by line: labels, blanks and omissions are
  * kept as they are, the misleading ones too. */
 #include "drv_pmx.h"

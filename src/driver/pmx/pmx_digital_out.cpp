@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* The parallel digital port, and the colour format of the digital picture. Switch, width and mode
  * wait in the record until PMX_SetEnable has the mixer on; phase and colour format never wait. */
 #include "drv_av_d.h"

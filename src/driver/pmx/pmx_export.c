@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* What other kernel modules link against by name, and under which licence the layer is; everybody else in the stack is
  * linked with the layer. Compiled by the kernel's build beside pmx_if.o. */
 #include <linux/export.h>

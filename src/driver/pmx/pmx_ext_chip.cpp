@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Settings of the external chip, and closed captions: handed on, never kept. */
 #include "drv_av_d.h"
 #include "drv_pmx.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* How large and of what kind the mixer's picture is, and what HDMI is told or asked about resolutions. */
 #include "drv_av_d.h"
 #include "drv_pmx.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* The display part's handshake: graphics stay out of the picture while the sink switches format.
  *
  *  format-change  OSD-enable  timer     OSD planes

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* The module's state and tables, and the answers of its getters. Whatever is decided from the resolution mode stands in
  * the mode table and nowhere else. */
 #include "pmx_if.h"

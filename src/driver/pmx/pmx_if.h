@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Private to the mixer layer: its one record, its tables and the helpers that its files share. Nothing outside this
  *  folder includes it but the tests of the tables and the record view. */

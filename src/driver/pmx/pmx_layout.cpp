@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Layout of the records that leave the module, in calls or in memory dumps. No code comes of this file. */
 #include "drv_av_d.h"
 #include "pmx_if.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Capability check, one mode on all outputs, force mode. */
 #include "drv_av_d.h"
 #include "drv_osd.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Per-output mode setting: choose the mixer's format, find what changed, drive the stack, decide whether graphics must
  * wait. The order of the calls is what the neighbouring drivers rely on. */
 #include "drv_av_d.h"

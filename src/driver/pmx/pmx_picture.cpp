@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Picture adjustments, gamma, black level, and options that are passed straight on. */
 #include "drv_av_d.h"
 #include "drv_pmx.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Stacking order position by position, background, and where the video planes stand. The packed order of
  * pmx_arb_order.cpp is another representation, kept apart. */
 #include "drv_pmx.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Input ports: which upstream component feeds which, and the lock over connecting them. */
 #include "drv_pmx.h"
 #include "pmx_if.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Source events, and the master colour space that follows from them. Port fields are written on the sources' threads
  * without the mutex; only informing the video planes takes it. */
 #include "drv_av_d.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Plane swaps, colour bar and output mute. The mute hides the bar while it is on; the bar undoes "first video on top"
  * meanwhile. */
 #include "drv_pmx.h"

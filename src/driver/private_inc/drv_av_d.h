@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  HDMI/AV driver: commands and queries of the mixer, and the records that go with them. */
 #ifndef DRV_AV_D_H

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Interface manager: where a driver publishes its table of functions and others fetch it.
  *  An interface is named by its component's type and id and by an interface id. Negative results are failures. */

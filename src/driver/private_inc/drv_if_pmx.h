@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The mixer as the rest of the stack sees it: resolution modes, colour and plane enumerations, output records,
  *  the IPMX interface table and the objects that the mixer layer exports. */

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What a video plane can be told through the interface manager (IID_IVdp). */
 #ifndef DRV_IF_VDP_H

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  OSD driver and display control: what the mixer tells them. Called on threads that may sleep. */
 #ifndef DRV_OSD_H

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The mixer layer: every function that it offers, with its contract. This is the header that a caller includes.
  *

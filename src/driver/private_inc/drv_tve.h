@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  TV encoder driver. Encoder 0 (TVE_1) drives component, encoder 1 (TVE_2) composite. Called on threads that may
  *  sleep. */

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Video plane driver: what the mixer tells it and asks of it. Its planes' interface table is in drv_if_vdp.h. */
 #ifndef DRV_VDP_H

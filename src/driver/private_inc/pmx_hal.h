@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Mixer hardware layer: what the mixer layer asks of the plane mixer, its scaler, colour converters, digital port and
  *  vertical-sync handling. No function here fails unless it says so. Called on threads; those that the timer's context

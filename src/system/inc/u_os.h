@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Operating-system layer, console, flash partitions, register access and power management of the stack.
  *  OSR_OK is the one success of an operating-system call. */

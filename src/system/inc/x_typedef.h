@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Basic types of the driver stack. Widths are the contract: every header of the stack builds on them, in C and in
  *  C++. */

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Arbitrary plane order with the planes' delays. */
 #include "tests/lockstep/literal/literal.h"
 

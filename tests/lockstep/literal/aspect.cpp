@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Aspect ratio: normal, deferred, digest. */
 #include "tests/lockstep/literal/literal.h"
 

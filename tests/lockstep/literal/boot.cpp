@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Boot resolution, video PLL, TV type. */
 #include "tests/lockstep/literal/literal.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Formatted print and status report. */
 #include "tests/lockstep/literal/literal.h"
 

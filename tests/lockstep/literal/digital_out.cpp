@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* The parallel digital port, the digital picture's colour format; external chip and closed captions. */
 #include "tests/lockstep/literal/literal.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* The picture of the current mode; commands about the TV system. */
 #include "tests/lockstep/literal/literal.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* The display part's flags and timer. */
 #include "tests/lockstep/literal/literal.h"
 

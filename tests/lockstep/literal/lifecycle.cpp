@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Start-up, reset, shut-down, registration, power, master enable, second video plane. */
 #include "tests/lockstep/literal/literal.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The mixer's operations written a second time, as literally as can be: one step, one line or two, in the order in
  *  which a neighbour would see them. What a step takes from the record, from another object or from a driver is taken

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Capability check, one mode on all outputs, force mode. */
 #include "tests/lockstep/literal/literal.h"
 

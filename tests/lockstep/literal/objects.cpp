@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* What the module holds, as it is at load, and what a reset loads. */
 #include "tests/lockstep/literal/literal.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Picture adjustments, gamma, black level, options that are passed on. */
 #include "tests/lockstep/literal/literal.h"
 

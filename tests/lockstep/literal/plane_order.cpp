@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Background, stacking order, first video plane on top, where the video planes sit. */
 #include "tests/lockstep/literal/literal.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Source events and the master colour space. */
 #include "tests/lockstep/literal/literal.h"
 

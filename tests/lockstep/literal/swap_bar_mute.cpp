@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Plane swaps, colour bar, output mute, active zone, delay. */
 #include "tests/lockstep/literal/literal.h"
 

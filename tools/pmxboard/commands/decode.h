@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  `pmxboard decode`: what a captured console log tells. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Worked examples of each sub-command, as its --help ends with them. A test runs every one of them. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  `pmxboard modes`: the resolution modes and all that the layer decides from them. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  `pmxboard ops`: the operations of the layer, their contracts and an example of each. */
 #pragma once

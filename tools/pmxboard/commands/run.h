@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  `pmxboard run`: scenarios from files. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  `pmxboard shell`: the scenario language at a prompt, or from a pipe. `pmxboard complete`: its completion, for other
  *  shells. */

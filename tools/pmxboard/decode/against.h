@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  A log against what the layer prints in a scenario: where they part first. */
 #pragma once

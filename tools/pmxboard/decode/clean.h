@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What a serial console puts around and into lines: terminal sequences, time stamps. */
 #pragma once

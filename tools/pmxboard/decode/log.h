@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  A captured console log: which of the layer's texts stand on which line, whatever else a serial console put there. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The layer's texts as patterns: a format's own characters, with numbers and names between them. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "tools/pmxboard/decode/report.h"
 
 #include <algorithm>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The status report, put together from whichever of its lines a log has, with its misleading parts put right. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  A decoded log for people, on 80 columns, and for programs, as JSON. */
 #pragma once

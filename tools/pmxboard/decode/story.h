@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What happened, told from the texts in a log: operations, what they decided, and how graphics came and went. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Every text that the layer writes to the console, each with what it means: the one table that recognition, the story
  *  and the comparison stand on. A test holds it against the texts in the layer's object. */

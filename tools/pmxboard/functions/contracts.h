@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What the headers promise about the functions of the layer and of the platform.
  *  The table is written when the tool is built. */

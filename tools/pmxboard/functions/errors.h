@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What ends a run: a line that nobody can mean, or a step that did not do what the scenario says. */
 #pragma once

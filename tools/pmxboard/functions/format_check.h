@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  A text that the layer takes for a format, and that no values go with. */
 #pragma once

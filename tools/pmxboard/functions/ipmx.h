@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The slots of the mixer's table as operations, on the table that a neighbour holds. */
 #pragma once

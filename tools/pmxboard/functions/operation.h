@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  A function that a scenario can call: its arguments and their kinds, found from its type, and the call itself.
  *

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // A line for every operation that works as it stands on the default board.
 #include "tools/pmxboard/functions/operation_examples.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Something done in a copy of the process, which ends with it. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Verbs for the board as a whole: power, flash, faults, time, the console.
 #include <algorithm>
 #include <limits>

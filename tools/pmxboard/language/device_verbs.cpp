@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Verbs for what the devices of the board do by themselves: the sink, the display part, the video planes.
 #include "board/display_part.h"
 #include "board/hdmi_av.h"

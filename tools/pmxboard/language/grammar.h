@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  How a line of the language is written, as data. A form is words, and in capitals or quotes the places that a line
  *  fills:

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // `meanwhile …`: commands that run from inside a platform call, as a neighbour's thread or an interrupt would.
 #include <algorithm>
 #include <functional>

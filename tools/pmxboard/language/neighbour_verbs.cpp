@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Verbs for what neighbouring drivers call: the platform, and the table that the mixer registers.
 #include "drv_if.h"
 #include "tools/pmxboard/functions/errors.h"

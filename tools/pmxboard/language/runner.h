@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Run a scenario from its first line to its last, or to the first that is wrong or fails. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  A scenario that runs: it carries lines out, one after the other, and remembers what expectations look at. */
 #pragma once

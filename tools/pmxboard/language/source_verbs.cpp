@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Verbs for the sources of pictures, and for the delays of the planes that carry them.
 #include <limits>
 

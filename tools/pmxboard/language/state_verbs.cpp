@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Verbs for what board and layer hold.
 #include <cerrno>
 #include <cstring>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The verbs of the language. Each stands in one place with all that there is to it: how it is written, what that
  *  means, and what it does. Usage, completion, help and the guide's tables come from there. */

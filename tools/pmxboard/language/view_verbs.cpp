@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Verbs for what the run shows.
 #include "tools/pmxboard/functions/kind.h"
 #include "tools/pmxboard/language/session.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // `what-if`: a command in a copy of the process, which ends with it.
 #include "board/threads.h"
 #include "tools/pmxboard/functions/errors.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What there is to tell about a resolution mode: all that the layer decides from it. */
 #pragma once

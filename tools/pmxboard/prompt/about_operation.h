@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What there is to tell about a function of the layer or of the platform. */
 #pragma once

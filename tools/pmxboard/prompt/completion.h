@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Completion of a line of the language: what may stand where the cursor is. Verbs are completed from their usage, so
  *  that a new verb needs nothing here. */

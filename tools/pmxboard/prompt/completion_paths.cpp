@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Candidates for paths into board and layer, for what stands there, and for outputs.
 #include <algorithm>
 

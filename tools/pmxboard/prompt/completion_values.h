@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Candidates for completion, by what stands in a place: names of functions, boards, files, fields, values. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The one place of the tool that knows the line editor's library.
 #include "tools/pmxboard/prompt/editor.h"
 

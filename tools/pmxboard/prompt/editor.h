@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Where the shell's lines come from: a terminal, with history and completion, or anything else. */
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What the tool tells about the words of the language: operations, platform functions, verbs, constants. */
 #pragma once

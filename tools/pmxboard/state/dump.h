@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The state as a file: JSON for programs, and to be looked at or compared later.
  *

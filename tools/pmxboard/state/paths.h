@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Where in the state a path leads, in that of the running board or in a saved one. */
 #pragma once

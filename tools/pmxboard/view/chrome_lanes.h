@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  The lanes of a Chrome trace, and what those of states show. */
 #pragma once

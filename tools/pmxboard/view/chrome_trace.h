@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  A run as a Chrome trace: the JSON that chrome://tracing and Perfetto's viewer open. Each power-on is a process of
  *  its own; what happens there goes by lanes: operations, platform calls, console, the board's own doings, the three

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  What a run shows: commands, platform calls, console, results. For people as text of 80 columns where it can be; for
  *  programs the trace as one JSON object a line. */

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  Which entries of the trace are shown. What expectations look at is always the whole trace. */
 #pragma once

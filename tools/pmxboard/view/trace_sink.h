@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  A form in which the trace is shown. A new one is a class, and a row of trace_forms(). */
 #pragma once

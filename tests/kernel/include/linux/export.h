@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Stands in for the kernel's header: an exported symbol leaves its name in the object. */
 #pragma once
 

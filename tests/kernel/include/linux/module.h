@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Stands in for the kernel's header: what a module says of itself stands in a section that its loader reads. */
 #pragma once
 

@@ -31,6 +31,12 @@ if(PMX_SANITIZE)
     target_link_options(pmx_host INTERFACE ${PMX_SANITIZE_FLAGS})
 endif()
 
+# What nearly every source includes, compiled once for all libraries. Headers of the library alone: a header of the
+# project that is changed would have everything compiled again.
+set(PMX_PRECOMPILED
+    <algorithm> <chrono> <filesystem> <fstream> <functional> <iostream> <map> <memory> <optional> <span> <sstream>
+    <stdexcept> <string> <string_view> <utility> <vector>)
+
 # A static library of the C++ sources of the given directories, but for a program's main.cpp.
 function(pmx_host_library name)
     set(sources "")
@@ -44,5 +50,15 @@ function(pmx_host_library name)
     target_link_libraries(${name} PUBLIC pmx_host)
     if(CMAKE_CROSSCOMPILING)
         target_compile_options(${name} PRIVATE -O2)   # what runs often under the emulator; tests need not
+    endif()
+endfunction()
+
+# pmx_precompiled(<name> [<other>]): the library has these headers compiled, or those of another one.
+function(pmx_precompiled name)
+    target_compile_options(${name} PRIVATE -fpch-preprocess)   # for the compiler cache
+    if(ARGN)
+        target_precompile_headers(${name} REUSE_FROM ${ARGN})
+    else()
+        target_precompile_headers(${name} PRIVATE ${PMX_PRECOMPILED})
     endif()
 endfunction()

@@ -17,9 +17,12 @@ from concurrent.futures import ThreadPoolExecutor
 
 sys.dont_write_bytecode = True
 
+ROOT = pathlib.Path(__file__).resolve().parents[2]
+sys.path.insert(0, str(ROOT / "cmake"))
+
+from platform_functions import PLATFORM_HEADERS, functions  # noqa: E402
 from schemas import Dialect, Schemas  # noqa: E402
 
-ROOT = pathlib.Path(__file__).resolve().parents[2]
 LOOKS = """PMX_Init
 what-if PMX_GetTvType 0
 what-if PMX_SetTvType 0 3
@@ -59,8 +62,7 @@ def of_looks(tool, directory):
 
 def of_commands(tool):
     contracts = [entry["name"] for entry in json.loads(run(tool, "ops", "--json"))]
-    platform = (ROOT / "tests/symbols/needed.txt").read_text(encoding="utf-8").splitlines()
-    platform = [name for name in platform if name and name[0] not in "#?-"]
+    platform = [function.name for header in PLATFORM_HEADERS for function in functions(ROOT / header)]
     yield "ops", json.loads(run(tool, "ops", "--json"))
     yield "ops", json.loads(run(tool, "ops", "--json", *contracts[:3], *platform))
     yield "modes", json.loads(run(tool, "modes", "--json"))

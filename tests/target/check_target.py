@@ -140,8 +140,7 @@ def frame_complaints(directory, budgets):
 
 def main():
     parser = argparse.ArgumentParser(description="Hold an object for the ARM target against what the target takes.")
-    parser.add_argument("--defined", required=True, help="list of the global symbols that it defines")
-    parser.add_argument("--needed", required=True, help="list of the symbols that it needs")
+    check_symbols.add_lists(parser)
     parser.add_argument("--objdump", required=True, help="the target's objdump")
     parser.add_argument("--hard-float-calls", action="store_true",
                         help="the object is for a system that passes floating-point numbers in registers, and has its "
@@ -156,8 +155,8 @@ def main():
     if not pathlib.Path(arguments.object).exists():
         sys.exit(f"{arguments.object}: is not there; ./dev build arm-bare and ./dev build arm-linux make the objects")
 
-    lists = [check_symbols.List(arguments.defined), check_symbols.List(arguments.needed)]
-    lists[1].plain.update(arguments.unwinder)
+    lists = check_symbols.lists_of(arguments)
+    lists[1].places.update(dict.fromkeys(arguments.unwinder, "--unwinder"))
     found = list(check_symbols.complaints(arguments.object, *lists))
     found += helper_complaints(arguments.object, arguments.unwinder)
     found += section_complaints(arguments.object, arguments.unwinder)

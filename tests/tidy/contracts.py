@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
-"""Contracts: what the headers promise about every function, and that the virtual board and the symbol lists keep up."""
+"""Contracts: what the headers promise about every function, and that the virtual board keeps up."""
 
 import pathlib
 import re
@@ -12,10 +12,7 @@ from cpp import Source  # noqa: E402
 from platform_functions import LAYER_HEADER, PLATFORM_HEADERS, function_pointers  # noqa: E402
 from platform_functions import functions as declared  # noqa: E402
 
-DEFINED = "tests/symbols/defined.txt"
-NEEDED = "tests/symbols/needed.txt"
 HEADER_DIRECTORIES = ("src/system/inc", "src/driver/inc", "src/driver/private_inc")
-COMPILERS_OWN = {"memcpy", "memset"}
 
 
 def read_declarations(root, header):
@@ -96,30 +93,6 @@ def check_all_pointers(root):
                 yield name, pointer.function.line, message
 
 
-def read_list(root, path):
-    """{name: mark} of a symbol list; the mark is "", "-" or "?"."""
-    if not (root / path).exists():
-        return {}
-    matches = re.finditer(r"^([-?] )?(\w+)$", (root / path).read_text(encoding="utf-8"), re.M)
-    return {match.group(2): (match.group(1) or "").strip() for match in matches}
-
-
-def check_lists(root):
-    """The headers declare what the lists of symbols name, and nothing else."""
-    platform = {declaration.name for header in PLATFORM_HEADERS for declaration in read_declarations(root, header)}
-    needed = set(read_list(root, NEEDED)) - COMPILERS_OWN
-    for name in sorted(platform - needed):
-        yield NEEDED, 1, f"{name}: declared in a platform header, but not listed"
-    for name in sorted(needed - platform):
-        yield NEEDED, 1, f"{name}: listed, but declared in no platform header"
-
-    offered = {declaration.name for declaration in read_declarations(root, LAYER_HEADER)}
-    defined = read_list(root, DEFINED)
-    for name in sorted(offered):
-        if defined.get(name) != "":
-            yield DEFINED, 1, f"{name}: declared in {LAYER_HEADER}, but not listed as there"
-
-
 def check_board(root):
     """Every platform function of the board records itself first, under its own name and with all its arguments."""
     functions = {}
@@ -149,4 +122,4 @@ def check_board(root):
 
 
 def complaints(root):
-    return [*check_headers(root), *check_all_pointers(root), *check_lists(root), *check_board(root)]
+    return [*check_headers(root), *check_all_pointers(root), *check_board(root)]

@@ -15,7 +15,7 @@ from cpp import Source  # noqa: E402
 
 PLATFORM = "src/driver/private_inc/drv_tve.h"
 LAYER = "src/driver/private_inc/drv_pmx.h"
-HEADER = "src/driver/private_inc/drv_other.h"  # of neither, so that no list of symbols speaks of it
+HEADER = "src/driver/private_inc/drv_other.h"  # neither the layer's nor the platform's
 
 CLEAN = {
     PLATFORM: '#ifdef __cplusplus\nextern "C" {\n#endif\n'
@@ -25,8 +25,6 @@ CLEAN = {
     "src/driver/pmx/pmx_if.cpp": "void PMX_Init(void)\n{\n    TVE_Black(0); // before the first picture\n}\n",
     "board/tv_encoder.cpp": "UINT32 TVE_Black(UINT32 u4Tve)\n{\n"
                             "    BOARD_CALL_R(TVE_Black, u4Tve);\n    return 1;\n}\n",
-    "tests/symbols/defined.txt": "PMX_Init\n- PMX_Later\n",
-    "tests/symbols/needed.txt": "TVE_Black\n? memcpy\n",
 }
 
 
@@ -205,16 +203,10 @@ class Tidy(unittest.TestCase):
                      table(member + " /**< as i4PmxGet */"))
         layer = ("/** Get.\n *  @param[in] pvTag  [tag] any\n *  @param[out] pu1  receives it\n *  @return 1\n"
                  " *  @context any */\nPMX_API INT32 i4PmxGet(void* pvTag, UINT8* pu1);\n")
-        files = {LAYER: CLEAN[LAYER] + layer, HEADER: table(member + " /**< as i4PmxGet */"),
-                 "tests/symbols/defined.txt": "PMX_Init\ni4PmxGet\n"}
+        files = {LAYER: CLEAN[LAYER] + layer, HEADER: table(member + " /**< as i4PmxGet */")}
         self.assertEqual([], self.found(files=files))
         files[HEADER] = files[HEADER].replace("UINT8* pu1", "UINT16* pu2")
         self.assertIn("with the same parameters", "".join(self.found(files=files)))
-
-    def test_lists_follow_the_headers(self):
-        self.refused("TVE_Black: declared in a platform header, but not listed", "tests/symbols/needed.txt", "")
-        self.refused("TVE_White: listed, but declared in no", "tests/symbols/needed.txt", "TVE_Black\n- TVE_White\n")
-        self.refused("PMX_Init: declared", "tests/symbols/defined.txt", "- PMX_Init\n")
 
     def test_the_board_records_every_call(self):
         def board(body):

@@ -221,18 +221,5 @@ def unseen(needed, scenarios):
                 yield f"{function.name}: takes a pointer, and no operation here hands it anything"
 
 
-def main():
-    objects = [pathlib.Path(argument) for argument in sys.argv[1:]]
-    if not objects:
-        sys.exit(__doc__)
-    checked = objects[0] if len(objects) == 1 else objects[0].parent
-    found = list(complaints(objects, SCENARIOS))
-    for complaint in found:
-        print(f"{checked}: {complaint}")
-    if not found:
-        print(f"{checked}: {len(SCENARIOS)} operations, every byte that they hand over")
-    return 1 if found else 0
-
-
 if __name__ == "__main__":
-    sys.exit(main())
+    sys.exit(layer_machine.check(__doc__, complaints, SCENARIOS, "operations, every byte that they hand over"))

@@ -13,7 +13,6 @@ place that names the status and was not reached is therefore a complaint.
 usage: check_stores.py OBJECT...    the objects of one link: pmx_if.o, or one for each source
 """
 
-import pathlib
 import struct
 import sys
 
@@ -145,18 +144,5 @@ def complaints(objects, scenarios):
         yield f"nothing in it names {STATUS}"
 
 
-def main():
-    objects = [pathlib.Path(argument) for argument in sys.argv[1:]]
-    if not objects:
-        sys.exit(__doc__)
-    checked = objects[0] if len(objects) == 1 else objects[0].parent
-    found = list(complaints(objects, SCENARIOS))
-    for complaint in found:
-        print(f"{checked}: {complaint}")
-    if not found:
-        print(f"{checked}: {len(SCENARIOS)} operations, each flag by itself and in its order")
-    return 1 if found else 0
-
-
 if __name__ == "__main__":
-    sys.exit(main())
+    sys.exit(layer_machine.check(__doc__, complaints, SCENARIOS, "operations, each flag by itself and in its order"))

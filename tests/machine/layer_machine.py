@@ -309,3 +309,18 @@ class Machine:
     def _note_block(self, is_store, address, data):
         if self.watched and address < self.watched + self._watched_size and address + len(data) > self.watched:
             self.events.append(Access(is_store, address - self.watched, len(data), int.from_bytes(data, "little")))
+
+
+def check(usage, complaints, scenarios, what):
+    """The program of a check: it names what complaints() finds in the objects of its command line, or says what it has
+    seen, and how often."""
+    objects = [pathlib.Path(argument) for argument in sys.argv[1:]]
+    if not objects:
+        sys.exit(usage)
+    checked = objects[0] if len(objects) == 1 else objects[0].parent
+    found = list(complaints(objects, scenarios))
+    for complaint in found:
+        print(f"{checked}: {complaint}")
+    if not found:
+        print(f"{checked}: {len(scenarios)} {what}")
+    return 1 if found else 0

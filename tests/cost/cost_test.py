@@ -71,6 +71,13 @@ class PathTable(unittest.TestCase):
         self.assertEqual(("power-on", "PMX_Init", "PMX_A 1"), read[0].lines)
         self.assertEqual(("power-on", "PMX_B", "PMX_A 0"), read[1].lines)
 
+    def test_an_operation_that_stands_nowhere_has_its_example(self):
+        read = paths.read("[PMX_A only]\nPMX_A 1\n", {"PMX_A", "PMX_B"},
+                          {"PMX_A": ([], "PMX_A 2"), "PMX_B": (["PMX_Init", "PMX_A 3"], "PMX_B 4")})
+        self.assertEqual([("PMX_A only", ("power-on", "PMX_Init", "PMX_A 1")),
+                          ("PMX_B only", ("power-on", "PMX_Init", "PMX_A 3", "PMX_B 4"))],
+                         [(path.name, path.lines) for path in read])
+
     def refused(self, text, message):
         with self.assertRaisesRegex(paths.PathError, message):
             paths.read(text, {"PMX_A"})

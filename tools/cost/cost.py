@@ -41,8 +41,9 @@ README = ROOT / "README.md"  # shows the five figures
 
 def measure(build, tree, made):
     """The card of the layer of a tree."""
-    listed = path_list.read((TOOL / "paths.txt").read_text(encoding="utf-8"), signatures.operations())
-    counts = instructions.count(listed, instructions.Board(build), tree, made / "host")
+    board = instructions.Board(build)
+    listed = path_list.read((TOOL / "paths.txt").read_text(encoding="utf-8"), signatures.operations(), board.examples)
+    counts = instructions.count(listed, board, tree, made / "host")
     return cards.make(listed, counts, arm.measure(tree, made / "target"))
 
 

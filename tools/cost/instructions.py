@@ -77,6 +77,12 @@ class Board:
         sanitized = re.search(r"^PMX_SANITIZE:BOOL=(ON|TRUE|1)$", self._cache, re.M)
         return ["-fsanitize=address,undefined"] if sanitized else []
 
+    @functools.cached_property
+    def examples(self):
+        """(lines before it, line) of the tool's example of each operation."""
+        told = json.loads(run(self.build / "pmxboard", "ops", "--json"))
+        return {each["name"]: (each["example_needs"], each["example"]) for each in told if each["example"]}
+
     @property
     def libraries(self):
         return [self.build / library for library in LIBRARIES]

@@ -7,7 +7,8 @@
 Further paths of an operation, of interest for themselves, have names of their own.
 
 The last line of a path is the one that is measured; those before it make its situation. A path that does not begin with
-`power-on` begins with `power-on` and `PMX_Init`. An operation with one path alone has it under `only`.
+`power-on` begins with `power-on` and `PMX_Init`. An operation with one path alone has it under `only`; one that stands
+nowhere has the example that the tool shows for it.
 """
 
 import dataclasses
@@ -38,8 +39,8 @@ class PathError(Exception):
     """The table of paths is not what it should be."""
 
 
-def read(text, operations):
-    """All paths of a table, held against the names of all operations."""
+def read(text, operations, examples=None):
+    """All paths of a table, held against the names of all operations. `examples`: (lines before it, line) of each."""
     sections = []
     for number, line in enumerate(text.splitlines(), start=1):
         line = line.split("#", 1)[0].strip()
@@ -51,6 +52,9 @@ def read(text, operations):
         elif line:
             sections[-1][2].append(line)
     paths = [_path(*section) for section in sections]
+    listed = {path.operation for path in paths}
+    paths += [Path(operation, "only", ("power-on", *before), line, 0)
+              for operation, (before, line) in (examples or {}).items() if operation not in listed]
     _check(paths, operations)
     return paths
 

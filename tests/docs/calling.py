@@ -11,12 +11,13 @@ every example that does not power the board on by itself.
 
 In a platform call a record that has the content of the one shown before it in the same example is {as before}.
 
---fix     rewrites the blocks that differ, all lines in full
+--fix     rewrites the blocks that differ, all lines in full, and adds the tool's example of what no block calls
 --header  every function that this header offers must be called in some example
 """
 
 import argparse
 import difflib
+import json
 import pathlib
 import re
 import subprocess
@@ -137,15 +138,23 @@ def checked(document, tool):
     return wrong, BLOCK.sub(lambda block: block.group() if block["prologue"] else f"```pmx\n{next(renewed)}```", text)
 
 
-def uncalled(document, header):
+def uncalled(text, header):
     """The functions of a header that no example calls."""
-    text = document.read_text(encoding="utf-8")
     called = {command.split()[0] for block in BLOCK.finditer(text) if not block["prologue"]
               for command in commands(block["body"]) if command.strip()}
     offered = OFFERED.findall(header.read_text(encoding="utf-8"))
     if not offered:
-        return [f"{header.name}: offers no function"]
-    return [f"{document.name}: no example calls {name}" for name in offered if name not in called]
+        raise Failure(f"{header.name}: offers no function")
+    return [name for name in offered if name not in called]
+
+
+def added(text, names, tool):
+    """The document with an example, whose run is still to be shown, of each of these functions at its end."""
+    told = subprocess.run([tool, "ops", "--json", *names], capture_output=True, text=True, timeout=60, check=True)
+    for each in json.loads(told.stdout):
+        lines = ["power-on", *each["example_needs"], each["example"]]
+        text += f"\n`{each['name']}`: {each['brief']}\n\n```pmx\n" + "".join(f"> {line}\n" for line in lines) + "```\n"
+    return text
 
 
 def main():
@@ -158,16 +167,20 @@ def main():
 
     tool = arguments.tool.resolve()
     try:
+        text = arguments.document.read_text(encoding="utf-8")
+        lacking = uncalled(text, arguments.header) if arguments.header else []
+        if arguments.fix and lacking:
+            arguments.document.write_text(added(text, lacking, tool), encoding="utf-8")
+            lacking = []
         wrong, text = checked(arguments.document, tool)
         if arguments.fix and wrong:
             arguments.document.write_text(text, encoding="utf-8")
             wrong, _ = checked(arguments.document, tool)
-        elif wrong:
-            wrong.append(f"to renew the examples: {pathlib.Path(__file__).name} --fix DOCUMENT TOOL")
+        wrong += [f"{arguments.document.name}:{text.count(chr(10))}: no example calls {name}" for name in lacking]
+        if wrong:
+            wrong.append("to renew the examples: cmake --build --preset debug --target renew_calling")
     except Failure as failure:
         wrong = [str(failure)]
-    if arguments.header:
-        wrong += uncalled(arguments.document, arguments.header)
     print("\n".join(wrong) if wrong else f"{arguments.document.name}: every example shows what a run shows")
     return 1 if wrong else 0
 

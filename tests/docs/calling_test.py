@@ -13,6 +13,9 @@ CHECKER = pathlib.Path(__file__).with_name("calling.py")
 # A tool that shows every command, a call for those that begin with PMX_, and refuses the command "wrong".
 TOOL = '''#!/usr/bin/env python3
 import sys
+if sys.argv[1:] == ["ops", "--json", "PMX_Get"]:
+    print('[{"name": "PMX_Get", "brief": "Ask.", "example_needs": ["quit"], "example": "PMX_Get 2"}]')
+    sys.exit()
 for number, line in enumerate(sys.stdin.read().splitlines(), start=1):
     print("> " + line)
     if line == "wrong":
@@ -105,6 +108,10 @@ class Calling(unittest.TestCase):
         self.assertEqual(1, code, text)
         self.assertIn("no example calls PMX_Get", text)
         self.assertNotIn("PMX_Set\n", text)
+        self.assertEqual(0, self.check(block(SHOWN), "--header", self.header, "--fix")[0])
+        shown = SHOWN.replace("PMX_Set 1", "PMX_Get 2").replace("PMX_Set", "PMX_Get")
+        self.assertEqual(block(SHOWN) + "\n`PMX_Get`: Ask.\n\n```pmx\n> power-on\n> quit\n" + shown + "```\n",
+                         self.document.read_text())
         self.header.write_text("PMX_API UINT32 PMX_Set(UCHAR ucId);\n")
         self.assertEqual(0, self.check(block(SHOWN), "--header", self.header)[0])
         self.header.write_text("\n")

@@ -9,6 +9,7 @@
 
 #include "program_run.h"
 #include "scenario_run.h"
+#include "tools/pmxboard/view/trace_sink.h"
 
 namespace
 {
@@ -137,8 +138,11 @@ TEST_F(CommandLine, WhatIf_LeavesNothingInTheTraceFile)
 {
     const std::string change = "PMX_SetModeEx 0 [ [0], [1, RES_1080I60HZ], [0], [1, RES_480I] ] 60 0 0\n";
     const std::string imagining = "PMX_Init\nwhat-if " + change + "what-if what-if " + change + "what-if advance 10s\n";
-    for (const std::string form : { "text", "jsonl", "chrome" })
+    for (const pmxboard::TraceForm& each : pmxboard::trace_forms())
     {
+        const std::string form(each.name);
+        if (form == "off")
+            continue;
         const std::string options = "run --trace-format " + form + " --trace-file ";
         ASSERT_EQ(0, run(options + file("real") + " -", "PMX_Init\n").code) << form;
         ASSERT_EQ(0, run(options + file("imagining") + " -", imagining).code) << form;

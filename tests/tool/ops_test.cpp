@@ -37,6 +37,8 @@ Shown show(const std::vector<std::string>& names, bool json = false)
     return { code, out.str(), testing::internal::GetCapturedStderr() };
 }
 
+constexpr const char* no_example = " has no example: tools/pmxboard/functions/operation_examples.cpp";
+
 /** The result that the last command has shown; empty when there was none. */
 std::string last_result(const std::string& all)
 {
@@ -50,7 +52,7 @@ TEST(Ops, EachExample_Works)
     for (const Operation& operation : operations())
     {
         const pmxboard::OperationExample* const example = example_of(operation.name);
-        ASSERT_NE(nullptr, example) << operation.name << " has no example: tools/pmxboard/ops_examples.cpp";
+        ASSERT_NE(nullptr, example) << operation.name << no_example;
         std::string before = "power-on\n";
         for (const std::string_view line : example->before)
             before.append(line).append("\n");
@@ -84,7 +86,7 @@ TEST(Ops, EachText_TellsArgumentsContractAndExample)
         EXPECT_EQ(pmxboard::exit_done, shown.code);
         EXPECT_TRUE(shown.out.starts_with(pmxboard::usage(operation) + "\n")) << shown.out;
         const pmxboard::OperationExample* const example = example_of(operation.name);
-        ASSERT_NE(nullptr, example) << operation.name << " has no example: tools/pmxboard/ops_examples.cpp";
+        ASSERT_NE(nullptr, example) << operation.name << no_example;
         for (const pmxboard::Parameter& parameter : operation.parameters)
             EXPECT_THAT(shown.out, HasSubstr("\n  " + parameter.name + " ")) << operation.name;
         EXPECT_THAT(shown.out, HasSubstr(std::string(contract.brief.substr(0, contract.brief.find(' ')))));

@@ -29,14 +29,9 @@
 namespace board
 {
 
-/** Records by field name. */
-Value to_value(const CCIR_DRV_INFO_T& record);
-Value to_value(const PMX_SET_HDMI_RES_PARAMETER_T& record);
-Value to_value(const PMX_SET_TV_SYS_PARAMETER_T& record);
-Value to_value(const PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T& record);
-
-/** A member of a record as a value, named as the record's field is. */
-Value field_value(std::string_view record, std::string_view field, std::int64_t number);
+/** A record of the headers by field name. */
+template <typename Record>
+Value to_value(const Record& record);
 
 /** One argument of a call that begins. */
 struct CallArgument

@@ -9,6 +9,8 @@ sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "tools" / "
 import elf  # noqa: E402
 import generate  # noqa: E402
 import instructions  # noqa: E402
+import names  # noqa: E402
+import records  # noqa: E402
 import signatures  # noqa: E402
 from tools import compiler, in_parallel, run, write  # noqa: E402
 
@@ -77,6 +79,9 @@ def hold_state_alike(layer):
 def build_harness(made, program=HERE / "revisions.cpp"):
     """Everything but the layers, with the program's own source."""
     flags = ["-std=c++20", "-O2", "-fno-pie", f"-I{ROOT}", *instructions.includes()]
+    flags.append(f"-I{made}")
+    write(made / "record_fields.h", records.table(names.headers(ROOT)))
+    write(made / "layer_record_fields.h", records.table([ROOT / names.RECORD_HEADER], "layer_record_fields"))
     sources = [write(made / "surroundings.cpp", generate.source()), *SOURCES, program]
     objects = [made / f"{source.stem}.o" for source in sources]
 

@@ -19,7 +19,7 @@ using record_view::Node;
 
 void add_fields(const Node& node, const std::string& name, std::size_t offset, std::vector<Field>& fields)
 {
-    if (node.form == Node::Form::Number || node.form == Node::Form::Pointer)
+    if (record_view::is_single(node))
     {
         fields.push_back({ name, offset, node.size });
         return;
@@ -27,10 +27,7 @@ void add_fields(const Node& node, const std::string& name, std::size_t offset, s
     for (std::size_t i = 0; i < node.children.size(); ++i)
     {
         const Node& child = node.children[i];
-        const std::string below = node.form == Node::Form::List ? name + "[" + std::to_string(i) + "]"
-                                  : name.empty()                ? child.name
-                                                                : name + "." + child.name;
-        add_fields(child, below, offset + child.offset, fields);
+        add_fields(child, record_view::path_of_child(node, i, name), offset + child.offset, fields);
     }
 }
 
@@ -59,20 +56,10 @@ const Layout& layout()
 std::vector<Field> outputs_array()
 {
     std::vector<Field> fields;
-    const auto add = [&](std::size_t i, const char* field, std::size_t offset, std::size_t size) {
-        fields.push_back({ "prOutConf[" + std::to_string(i) + "]." + field,
-                           caller_offset() + i * sizeof(PMX_RESOLUTION_T) + offset, size });
-    };
-    for (std::size_t i = 0; i < PMX_OUTPUT_NUM; ++i)
+    for (const Node& child : record_view::objects().front().node.children)
     {
-        const std::size_t info = offsetof(PMX_RESOLUTION_T, eCcirDrvInfo);
-        add(i, "fgOutputEnable", offsetof(PMX_RESOLUTION_T, fgOutputEnable), sizeof(BOOL));
-        add(i, "eResMode", offsetof(PMX_RESOLUTION_T, eResMode), 4);
-        add(i, "u4VFreq", offsetof(PMX_RESOLUTION_T, u4VFreq), 4);
-        add(i, "eCcirDrvInfo.eDgoMode", info + offsetof(CCIR_DRV_INFO_T, eDgoMode), 4);
-        add(i, "eCcirDrvInfo.eDgoFmt", info + offsetof(CCIR_DRV_INFO_T, eDgoFmt), 4);
-        add(i, "eCcirDrvInfo.eDgiMode", info + offsetof(CCIR_DRV_INFO_T, eDgiMode), 4);
-        add(i, "eCcirDrvInfo.eDgiFmt", info + offsetof(CCIR_DRV_INFO_T, eDgiFmt), 4);
+        if (child.name == "arOutputConf")
+            add_fields(child, "prOutConf", caller_offset(), fields);
     }
     return fields;
 }

@@ -1,9 +1,11 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "tools/record_view/record_layout.h"
 
+#include <cstdint>
 #include <type_traits>
 
-#include "src/driver/pmx/pmx_if.h"
+#include "layer_record_fields.h"
+#include "record_fields.h"
 
 namespace record_view
 {
@@ -43,95 +45,32 @@ Node list(std::string name, std::size_t offset, std::size_t count, const Node& i
     return node;
 }
 
-#define FIELD(Record, field) single<decltype(Record::field)>(#field, offsetof(Record, field), #Record)
+template <typename Record>
+std::vector<Node> fields();
 
-#define CCIR(field) FIELD(CCIR_DRV_INFO_T, field)
-#define OUTPUT(field) FIELD(PMX_RESOLUTION_T, field)
-
-Node output()
+/** What stands at an offset: a number, a pointer, an array, or a record with its fields. */
+template <typename T>
+Node node(const std::string& name, std::size_t offset, const std::string& owner)
 {
-    Node port_set_up = record("eCcirDrvInfo", offsetof(PMX_RESOLUTION_T, eCcirDrvInfo), sizeof(CCIR_DRV_INFO_T),
-                              { CCIR(eDgoMode), CCIR(eDgoFmt), CCIR(eDgiMode), CCIR(eDgiFmt) });
-    return record("", 0, sizeof(PMX_RESOLUTION_T),
-                  { OUTPUT(fgOutputEnable), OUTPUT(eResMode), OUTPUT(u4VFreq), std::move(port_set_up) });
+    if constexpr (std::is_array_v<T>)
+        return list(name, offset, std::extent_v<T>, node<std::remove_extent_t<T>>(name, 0, owner));
+    else if constexpr (std::is_class_v<T>)
+        return record(name, offset, sizeof(T), fields<T>());
+    else
+        return single<T>(name, offset, owner);
 }
 
-#define PORT(field) FIELD(PMX_PORT_INFO_T, field)
-
-Node port()
+template <typename Record>
+std::vector<Node> fields()
 {
-    return record("", 0, sizeof(PMX_PORT_INFO_T),
-                  { PORT(u2CompType), PORT(u2CompId), PORT(fgConnected), PORT(fgEnabled), PORT(eInputColorMode),
-                    PORT(eSrcColorSpace), PORT(u4SrcWidth), PORT(u4SrcHeight), PORT(ucLumaKey) });
-}
-
-#define CONF(field) FIELD(PMX_CONF_T, field)
-#define CONF_LIST(field, item) \
-    list(#field, offsetof(PMX_CONF_T, field), std::extent_v<decltype(PMX_CONF_T::field)>, item)
-
-Node configuration()
-{
-    const Node plane = single<UCHAR>("aucPlaneOrder", 0, "PMX_CONF_T");
-    return record("", 0, sizeof(PMX_CONF_T),
-                  {
-                      CONF(ucEnable),
-                      CONF(ucMode),
-                      CONF(ucTvType),
-                      CONF(ucVfreq),
-                      CONF(ucDigitalOut),
-                      CONF(u4Phase),
-                      CONF(ucProprietaryMode),
-                      CONF(ucDigitalBit),
-                      CONF(ucDigitalRgb),
-                      CONF(ucCAVBlackLv),
-                      CONF(ucCVBSBlackLv),
-                      CONF(ucGamma),
-                      CONF(ucBrightness),
-                      CONF(ucContrast),
-                      CONF(ucHue),
-                      CONF(ucSaturation),
-                      CONF(ucCBEnable),
-                      CONF(ucMuteEnable),
-                      CONF(u4AspectRatio),
-                      CONF(u4BgColor),
-                      CONF(u4Capability),
-                      CONF_LIST(aucPlaneOrder, plane),
-                      CONF(ucSharpness),
-                      CONF(piVdp1),
-                      CONF(pvTag1),
-                      CONF(piVdp2),
-                      CONF(pvTag2),
-                      CONF_LIST(arPortInfo, port()),
-                      CONF(eMasterColorSpace),
-                      CONF_LIST(arOutputConf, output()),
-                      CONF(fgAspNext),
-                      CONF(u4AspNext),
-                      CONF(fgSetModeCalled),
-                      CONF(ucCavYcInputDelay),
-                      CONF(ucCavYcOutputDelay),
-                      CONF(ucCvbsYcInputDelay),
-                      CONF(ucCvbsYcOutputDelay),
-                      CONF(ucCavSyncLvl),
-                      CONF(ucCvbsSyncLvl),
-                      CONF(ucCvbsBurstLvl),
-                      CONF(ucCavYLvl),
-                      CONF(ucCvbsYLvl),
-                      CONF(fgDigestEnable),
-                      CONF(u4DigestAsp),
-                      CONF(rDrvExtScl),
-                      CONF(u4PlaneOrder),
-                      CONF(fgForceMode),
-                      CONF(fgOSD5),
-                  });
-}
-
-#define STATUS(field) FIELD(PMX_DISPLAY_PART_STATUS_T, field)
-
-Node handshake()
-{
-    return record(
-        "", 0, sizeof(PMX_DISPLAY_PART_STATUS_T),
-        { STATUS(hPMXTimer), STATUS(fgPmxFormatChangeFlag), STATUS(fgPmxEnabeOsdFlag), STATUS(fgTimerAlreadySet) });
+    std::vector<Node> nodes;
+    const Record record{};
+    const auto start = reinterpret_cast<std::uintptr_t>(&record);
+    records::each_field(record, [&](const char* owner, const char* name, const auto& field) {
+        using Field = std::remove_cv_t<std::remove_reference_t<decltype(field)>>;
+        nodes.push_back(node<Field>(name, reinterpret_cast<std::uintptr_t>(&field) - start, owner));
+    });
+    return nodes;
 }
 
 #define VARIABLE(object)                                              \
@@ -142,11 +81,24 @@ Node handshake()
 
 } // namespace
 
+bool is_single(const Node& node)
+{
+    return node.form == Node::Form::Number || node.form == Node::Form::Pointer;
+}
+
+std::string path_of_child(const Node& node, std::size_t index, const std::string& path)
+{
+    if (node.form == Node::Form::List)
+        return path + "[" + std::to_string(index) + "]";
+    const std::string& name = node.children[index].name;
+    return path.empty() ? name : path + "." + name;
+}
+
 const std::vector<Object>& objects()
 {
     static const std::vector<Object> all = {
-        { "_arPmxConf", "record", configuration() },
-        { "_arPmxDispPartStatus", "status", handshake() },
+        { "_arPmxConf", "record", node<PMX_CONF_T>("", 0, "") },
+        { "_arPmxDispPartStatus", "status", node<PMX_DISPLAY_PART_STATUS_T>("", 0, "") },
         VARIABLE(bComp0OnTop),
         VARIABLE(MutexPMX),
         VARIABLE(_PmxInitiated),

@@ -24,7 +24,7 @@ struct Node
         Record
     };
 
-    std::string name; ///< without an index; empty for the items of an array of records
+    std::string name; ///< without an index; empty for a whole record
     Form form = Form::Record;
     std::size_t offset = 0; ///< from the start of the enclosing node
     std::size_t size = 0;
@@ -43,6 +43,9 @@ struct Object
 
 /** Whether it is a field, with nothing below it. */
 bool is_single(const Node& node);
+
+/** How the path to a child is written: "name", "path.name", or "path[index]" in an array. */
+std::string path_of_child(const Node& node, std::size_t index, const std::string& path);
 
 const std::vector<Object>& objects();
 

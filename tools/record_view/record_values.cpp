@@ -40,11 +40,6 @@ Value number_at(const Node& node, const unsigned char* at)
 
 } // namespace
 
-bool is_single(const Node& node)
-{
-    return node.form == Node::Form::Number || node.form == Node::Form::Pointer;
-}
-
 unsigned char* address_of(const Object& object)
 {
     static std::map<const Object*, unsigned char*> known;

@@ -36,13 +36,7 @@ void collect(const Node& node, const std::string& path, std::vector<std::string>
     if (is_single(node))
         into.push_back(path);
     for (std::size_t i = 0; i < node.children.size(); ++i)
-    {
-        const std::string& name = node.children[i].name;
-        if (node.form == Node::Form::List)
-            collect(node.children[i], path + "[" + std::to_string(i) + "]", into);
-        else
-            collect(node.children[i], path.empty() ? name : path + "." + name, into);
-    }
+        collect(node.children[i], path_of_child(node, i, path), into);
 }
 
 /** Go from a record or array to what `step` names, "name" or "[index]"; the index may be a symbolic name. */

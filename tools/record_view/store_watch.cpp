@@ -37,10 +37,7 @@ void tell(const Node& node, const std::string& path, const unsigned char* before
     for (std::size_t i = 0; i < node.children.size(); ++i)
     {
         const Node& child = node.children[i];
-        const std::string name = node.form == Node::Form::List ? path + "[" + std::to_string(i) + "]"
-                                 : path.empty()                ? child.name
-                                                               : path + "." + child.name;
-        tell(child, name, before + child.offset, now + child.offset);
+        tell(child, path_of_child(node, i, path), before + child.offset, now + child.offset);
     }
 }
 

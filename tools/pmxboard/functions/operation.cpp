@@ -3,6 +3,7 @@
 
 #include <algorithm>
 
+#include "record_fields.h"
 #include "tools/pmxboard/functions/errors.h"
 
 namespace pmxboard
@@ -90,15 +91,35 @@ std::vector<std::span<PMX_RESOLUTION_T>>& lent_outputs()
     return all;
 }
 
-Kind number_kind(unsigned bits, Family family)
+/** Of a record: its fields by name, with their kinds. */
+template <typename Record>
+Kind record_kind()
 {
-    return { Kind::Form::Number, bits, false, family, 0, {}, {} };
+    Kind kind{ Kind::Form::Record, 0, false, Family::None, 0, {}, {} };
+    const Record record{};
+    records::each_field(record, [&kind](std::string_view owner, const char* name, const auto& field) {
+        using Field = std::remove_cvref_t<decltype(field)>;
+        kind.names.emplace_back(name);
+        if constexpr (std::is_class_v<Field>)
+            kind.members.push_back(record_kind<Field>());
+        else
+            kind.members.push_back(Argument<Field>::describe(owner, name).kind);
+    });
+    return kind;
 }
 
-template <typename T>
-T field(const Value& record, std::string_view path)
+template <typename Record>
+Record filled(const Value& value)
 {
-    return static_cast<T>(record.find(path)->as_number());
+    Record record{};
+    records::each_field(record, [&value](std::string_view, std::string_view name, auto& field) {
+        using Field = std::remove_cvref_t<decltype(field)>;
+        if constexpr (std::is_class_v<Field>)
+            field = filled<Field>(*value.find(name));
+        else
+            field = static_cast<Field>(value.find(name)->as_number());
+    });
+    return record;
 }
 
 } // namespace
@@ -129,26 +150,12 @@ std::span<PMX_RESOLUTION_T> LentOutputs::innermost()
 
 Kind RecordKind<PMX_RESOLUTION_T>::kind()
 {
-    Kind port{ Kind::Form::Record, 0, false, Family::None, 0, { "eDgoMode", "eDgoFmt", "eDgiMode", "eDgiFmt" }, {} };
-    port.members = { number_kind(32, Family::CcirMode), number_kind(32, Family::CcirFormat),
-                     number_kind(32, Family::CcirMode), number_kind(32, Family::CcirFormat) };
-    Kind output{
-        Kind::Form::Record, 0, false, Family::None, 0, { "fgOutputEnable", "eResMode", "u4VFreq", "eCcirDrvInfo" }, {}
-    };
-    output.members = { number_kind(8, Family::None), number_kind(32, Family::ResolutionMode),
-                       number_kind(32, Family::None), port };
-    return output;
+    return record_kind<PMX_RESOLUTION_T>();
 }
 
 PMX_RESOLUTION_T RecordKind<PMX_RESOLUTION_T>::from(const Value& value)
 {
-    return { field<BOOL>(value, "fgOutputEnable"),
-             field<PMX_RESOLUTION_MODE_T>(value, "eResMode"),
-             field<UINT32>(value, "u4VFreq"),
-             { field<CCIR_IN_OUT_MODE_T>(value, "eCcirDrvInfo.eDgoMode"),
-               field<CCIR_IN_OUT_FORMAT_T>(value, "eCcirDrvInfo.eDgoFmt"),
-               field<CCIR_IN_OUT_MODE_T>(value, "eCcirDrvInfo.eDgiMode"),
-               field<CCIR_IN_OUT_FORMAT_T>(value, "eCcirDrvInfo.eDgiFmt") } };
+    return filled<PMX_RESOLUTION_T>(value);
 }
 
 } // namespace pmxboard

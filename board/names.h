@@ -15,10 +15,10 @@ namespace board::names
 
 /** A family of names; a number has at most one name in each. Behind it stands where the names come from (an enumeration
  *  of the headers, a constant, or what the names of constants begin with), and what people call them: cmake/names.py
- *  writes the tables by it. */
+ *  writes the tables by it. Names of None go with any number, and no number is shown by them. */
 enum class Family
 {
-    None,           ///< TRUE, FALSE, OSR_OK, TVE_, PMX_SET_OK: constants that go with any number, and are never shown
+    None,           ///< TRUE, FALSE, OSR_OK, TVE_, PMX_SET_OK, PMX_PORT_DONE, PMX_NO_SUCH_PORT, VDP_CMD_: never shown
     ResolutionMode, ///< PMX_RESOLUTION_MODE_T: resolution modes
     CcirMode,       ///< CCIR_IN_OUT_MODE_T: modes of the digital port
     CcirFormat,     ///< CCIR_IN_OUT_FORMAT_T: formats of the digital port

@@ -76,6 +76,16 @@ def hold_state_alike(layer):
         raise Unlike(f"{layer}: these variables are in the layer or in the headers, but not in both: {names}")
 
 
+def hold_literal_complete(layer):
+    """The literal writing has every operation: what it lacks would not be compared."""
+    has = {symbol.name for symbol in elf.Elf(layer).symbols if symbol.section and not symbol.is_local}
+    header = signatures.platform_functions.LAYER_HEADER
+    lacking = [f"{header}:{function.line}: tests/lockstep/literal has no {function.name}"
+               for function in signatures.platform_functions.functions(ROOT / header) if function.name not in has]
+    if lacking:
+        raise Unlike("\n".join(lacking))
+
+
 def build_harness(made, program=HERE / "revisions.cpp"):
     """Everything but the layers, with the program's own source."""
     flags = ["-std=c++20", "-O2", "-fno-pie", f"-I{ROOT}", *instructions.includes()]

@@ -54,7 +54,7 @@ class Neighbours(unittest.TestCase):
         done = self.told(Built.layer, "--undisturbed")
         self.assertEqual("", done.stderr)
         counted = re.match(r"(\d+) operations, (\d+) runs without a neighbour; (\d+) bases", done.stdout)
-        self.assertEqual(126, int(counted[1]))
+        self.assertEqual(len(layers.signatures.operations()), int(counted[1]))
         self.assertGreater(int(counted[3]), 1000)
 
     def test_an_operation_that_is_missing_is_told(self):

@@ -1,27 +1,79 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
-"""Runs clang-tidy over every file that the build compiles, and names what it finds.
+"""Runs clang-tidy over the files that differ from the main line, or include what differs, and names what it finds.
 
-A file whose text, headers of the project and rules are as they were when it last passed is not read again.
+With --all, and where there is nothing to compare with, over every file that the build compiles. A file whose text,
+headers of the project and rules are as they were when it last passed is not read again.
 
-usage: lint.py BUILD_DIRECTORY [JOBS]
+usage: lint.py [--all] BUILD_DIRECTORY [JOBS]
 """
 
+import argparse
 import hashlib
 import json
 import os
 import pathlib
 import re
+import shlex
 import subprocess
 import sys
 from concurrent.futures import ThreadPoolExecutor
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
-RULES = [ROOT / ".clang-tidy", ROOT / "tests/.clang-tidy", pathlib.Path(__file__)]
+RULES = [ROOT / ".clang-tidy", ROOT / "tests/.clang-tidy", pathlib.Path(__file__).resolve()]
+MAIN_LINES = ("refs/remotes/origin/main", "@{upstream}")  # the first that is there
 
 
-# How the build has a source include what it precompiled; clang-tidy reads the header itself.
-PRECOMPILED = re.compile(r" -Winvalid-pch| -fpch-preprocess| -include (\S+/cmake_pch\.hxx)\b")
+class NothingToCompareWith(Exception):
+    """Why nobody can tell what has changed."""
+
+
+def git(root, *arguments):
+    """What git answers about the repository in which the tree lies; a hook that calls may speak of another one."""
+    surroundings = {name: value for name, value in os.environ.items() if not name.startswith("GIT_")}
+    try:
+        return subprocess.run(["git", "-C", root, *arguments], check=True, capture_output=True, encoding="utf-8",
+                              errors="surrogateescape", env={**surroundings, "GIT_OPTIONAL_LOCKS": "0"}).stdout
+    except FileNotFoundError:
+        raise NothingToCompareWith("git is not installed") from None
+    except subprocess.CalledProcessError as error:
+        reason = (error.stderr.strip().splitlines() or [f"git {arguments[0]} ended with {error.returncode}"])[0]
+        raise NothingToCompareWith(reason.removeprefix("fatal: ")) from None
+
+
+def main_line(root):
+    """The name of the main line, and the revision where the work on it began."""
+    for name in MAIN_LINES:
+        try:
+            shown = git(root, "rev-parse", "--abbrev-ref", "--verify", "--quiet", name).strip()
+        except NothingToCompareWith:
+            continue
+        return shown, git(root, "merge-base", "HEAD", name).strip()
+    raise NothingToCompareWith("there is no main line to compare with")
+
+
+def changed(root):
+    """The files that differ from the main line, committed or not, and what they were compared with."""
+    top = pathlib.Path(git(root, "rev-parse", "--show-toplevel").removesuffix("\n"))
+    if not top.samefile(root):
+        raise NothingToCompareWith("the tree is no repository")  # but lies in somebody's
+    name, base = main_line(root)
+    listed = git(root, "diff", "--name-only", "--no-renames", "--no-ext-diff", "-z", base, "--")
+    listed += git(root, "ls-files", "--others", "--exclude-standard", "-z")
+    return {root / file for file in listed.split("\0") if file}, f"{name} ({base[:9]})"
+
+
+def to_look_at(sources, root):
+    """Those of the sources that a change concerns, and why just those."""
+    try:
+        files, base = changed(root)
+    except NothingToCompareWith as error:
+        return set(sources), f"all {len(sources)} files, since {error}"
+    if files & set(RULES):
+        return set(sources), f"all {len(sources)} files, since the rules differ from {base}"
+    # What the build has noted nothing about may include anything.
+    found = {source for source, read in sources.items() if source in files or not read or read & files}
+    return found, f"{len(found)} of {len(sources)} files, which differ from {base} or include what does"
 
 
 def commands_of(build):
@@ -30,21 +82,35 @@ def commands_of(build):
     return [command for command in commands if not pathlib.Path(command["file"]).is_relative_to(build)]
 
 
+def arguments_of(command):
+    """How a source is compiled, and the headers that it was given precompiled; clang-tidy reads those themselves."""
+    words = [word for word in shlex.split(command["command"]) if word not in ("-Winvalid-pch", "-fpch-preprocess")]
+    kept, precompiled = [], []
+    while words:
+        word = words.pop(0)
+        if word == "-include" and words and words[0].endswith("/cmake_pch.hxx"):
+            precompiled.append(pathlib.Path(words.pop(0)))
+        else:
+            kept.append(word)
+    return kept, precompiled
+
+
 def sources_of(commands, build):
-    """{source: the project's files that it was last made from, itself not among them}."""
+    """{source: the project's files that it was last made from}."""
     made_from, sources = dependencies(build), {}
     for command in commands:
-        read = set(made_from.get(re.search(r" -o (\S+)", command["command"])[1], ()))
-        for match in PRECOMPILED.finditer(command["command"]):
-            if match[1]:
-                read |= made_from.get(f"{pathlib.Path(match[1]).relative_to(build)}.gch", set())
+        words, precompiled = arguments_of(command)
+        read = set(made_from.get(words[words.index("-o") + 1], ()))
+        for header in precompiled:
+            read |= made_from.get(f"{header.relative_to(build)}.gch", set())
         sources[pathlib.Path(command["file"])] = read
     return sources
 
 
 def write_commands(commands, directory):
     directory.mkdir(exist_ok=True)
-    written = [{**command, "command": PRECOMPILED.sub("", command["command"])} for command in commands]
+    written = [{"directory": command["directory"], "file": command["file"], "arguments": arguments_of(command)[0]}
+               for command in commands]
     (directory / "compile_commands.json").write_text(json.dumps(written, indent=1), encoding="utf-8")
 
 
@@ -75,33 +141,59 @@ def lint(build, source):
     return result.returncode == 0, result.stdout + noise.sub("", result.stderr)
 
 
-def main():
-    build = pathlib.Path(sys.argv[1]).resolve()
-    jobs = int(sys.argv[2]) if len(sys.argv) > 2 else os.cpu_count()
+def passed_before(file):
+    """{source: its fingerprint when it last passed}; a note that cannot be read says nothing."""
+    try:
+        return json.loads(file.read_text(encoding="utf-8"))
+    except (FileNotFoundError, ValueError):
+        return {}
 
+
+def write_whole(file, text):
+    """Interrupted, it leaves the file as it was."""
+    beside = file.with_suffix(".new")
+    beside.write_text(text, encoding="utf-8")
+    beside.replace(file)
+
+
+def arguments():
+    parser = argparse.ArgumentParser(description=__doc__.splitlines()[0])
+    parser.add_argument("--all", action="store_true", help="every file, whatever has changed")
+    parser.add_argument("build", type=lambda text: pathlib.Path(text).resolve(), help="a build directory")
+    parser.add_argument("jobs", type=int, nargs="?", default=os.cpu_count(), help="how many at once")
+    return parser.parse_args()
+
+
+def main():
+    given = arguments()
+    build = given.build
     commands = commands_of(build)
     if not commands:
         sys.exit(f"{build}: compiles no files of the project")
     sources = sources_of(commands, build)
     write_commands(commands, build / "lint")
+    wanted, why = (set(sources), f"all {len(sources)} files") if given.all else to_look_at(sources, ROOT)
     passed_file = build / "lint-passed.json"
-    passed = json.loads(passed_file.read_text(encoding="utf-8")) if passed_file.exists() else {}
+    passed = passed_before(passed_file)
     marks = {str(source): fingerprint({source, *read, *RULES}) for source, read in sources.items()}
-    to_do = [source for source in sources if passed.get(str(source)) != marks[str(source)]]
+    to_do = [source for source in sources if source in wanted and passed.get(str(source)) != marks[str(source)]]
 
     failures = 0
     passed = {source: mark for source, mark in marks.items() if passed.get(source) == mark}
-    with ThreadPoolExecutor(max_workers=jobs) as pool:
+    with ThreadPoolExecutor(max_workers=given.jobs) as pool:
         for source, (is_clean, text) in zip(to_do, pool.map(lambda source: lint(build, source), to_do)):
             if is_clean:
                 passed[str(source)] = marks[str(source)]
             else:
                 failures += 1
                 print(f"{source.relative_to(ROOT)}:\n{text}")
-            passed_file.write_text(json.dumps(passed, indent=1), encoding="utf-8")
-    print(f"lint: {len(sources)} files, {len(to_do)} read, {failures} with findings")
+            write_whole(passed_file, json.dumps(passed, indent=1))
+    print(f"lint: {why}; {len(to_do)} read, {failures} with findings")
     return 1 if failures else 0
 
 
 if __name__ == "__main__":
-    sys.exit(main())
+    try:
+        sys.exit(main())
+    except KeyboardInterrupt:
+        sys.exit(130)

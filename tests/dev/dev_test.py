@@ -1,0 +1,327 @@
+#!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+"""./dev works on the tree it stands in, whatever the surroundings: links, odd names, copies, other runs and users."""
+
+import os
+import pathlib
+import shutil
+import signal
+import subprocess
+import sys
+import time
+import unittest
+
+sys.dont_write_bytecode = True
+
+from trees import NOBODY, TreeTest  # noqa: E402
+
+ODD = "a 'b' $c `d` (e) ü~!%@{},:=+^& -"   # what else there is, CMake makes no path of
+AS_NOBODY = ("setpriv", f"--reuid={NOBODY}", f"--regid={NOBODY}", "--clear-groups")
+takes_two_users = unittest.skipIf(os.geteuid() != 0, "takes two users")
+
+
+class Place(TreeTest):
+    def runs_in(self, tree, **how):
+        self.expect(0, f"ran in {tree}: run {tree}/scenarios/cold-boot.pmx\n", "run", **how)
+
+    def test_from_any_folder(self):
+        (self.tree / "docs").mkdir()
+        self.runs_in(self.tree)
+        self.runs_in(self.tree, cwd="/")
+        self.runs_in(self.tree, cwd=self.tree, script="./dev")
+        self.runs_in(self.tree, cwd=self.tree / "docs", script="../dev")
+        self.runs_in(self.tree, cwd=self.tree, before=("bash",), script="dev")
+
+    def test_where_folders_are_looked_for_does_not_matter(self):
+        (self.tree / "tree").mkdir()
+        for path in (".", str(self.tree), "/"):
+            self.runs_in(self.tree, script="tree/dev", CDPATH=path)
+
+    def test_a_link_means_the_tree_that_it_leads_to(self):
+        foreign = self.space / "foreign"
+        (foreign / "build").mkdir(parents=True)
+        (foreign / "build" / "kept").touch()
+        (foreign / "dev").symlink_to(self.tree / "dev")
+        (foreign / "again").symlink_to("dev")
+        for script in (foreign / "dev", foreign / "again"):
+            self.runs_in(self.tree, script=script)
+            self.expect(0, "", "clean", script=script)
+            self.assertFalse((self.tree / "build").exists())
+        self.assertEqual(["again", "build", "dev"], sorted(os.listdir(foreign)))
+        self.assertTrue((foreign / "build" / "kept").exists())
+
+    def test_a_script_without_its_tree_does_nothing(self):
+        alone = self.space / "alone"
+        (alone / "build").mkdir(parents=True)
+        shutil.copy2(self.tree / "dev", alone)
+        for verb in ("clean", "run"):
+            self.expect(1, "it has no packages.txt", verb, script=alone / "dev")
+        self.assertTrue((alone / "build").exists())
+
+    def test_odd_names(self):
+        tree = self.make_tree(ODD)
+        self.runs_in(tree, script=tree / "dev")
+        self.runs_in(tree, script=f"{ODD}/dev")
+        self.runs_in(tree, before=("bash", "--"), script="-dev/dev", cwd=self.link_named("-dev", tree))
+        self.assertNotIn("made for", self.dev("run", script=tree / "dev")[2])
+        self.expect(0, "", "clean", script=tree / "dev")
+        self.assertFalse((tree / "build").exists())
+
+    def test_names_in_which_nothing_can_be_built_are_refused(self):
+        for character in '"\\;#<>|*?[]\t\n':
+            with self.subTest(character):
+                tree = self.make_tree(f"odd {character} name")
+                self.expect(1, f"CMake cannot build in {tree}, for the {character} in that name", "run",
+                            script=tree / "dev")
+                self.expect(0, "", "clean", script=tree / "dev")
+                self.assertFalse((tree / "build").exists())
+        self.assertEqual([], self.calls("cmake"))
+
+    def test_names_in_which_all_is_built_every_time_are_told(self):
+        for character in "'&^`":
+            tree = self.make_tree(f"odd {character} name")
+            self.expect(0, f"for the {character} in {tree}: all is compiled every time", "run", script=tree / "dev")
+        self.assertNotIn("every time", self.dev("run")[2])
+
+    def link_named(self, name, tree):
+        (self.space / name).symlink_to(tree)
+        return self.space
+
+    def test_a_copied_or_moved_tree_is_built_afresh(self):
+        self.runs_in(self.tree)
+        copy = self.space / "copy"
+        shutil.copytree(self.tree, copy, symlinks=True)
+        _, _, text = self.dev("run", script=copy / "dev")
+        self.assertIn(f"build/release was made for {self.tree}, in {self.tree}/build/release: starting afresh", text)
+        self.assertEqual(f"tree {copy}\n", (copy / "build/release/build.ninja").read_text(encoding="utf-8"))
+        self.runs_in(copy, script=copy / "dev")
+        moved = self.space / "moved"
+        self.tree.rename(moved)
+        (moved / "build/release/left-over").touch()
+        self.runs_in(moved, script=moved / "dev")
+        self.assertFalse((moved / "build/release/left-over").exists())
+
+    def test_what_is_configured_stays(self):
+        self.runs_in(self.tree)
+        self.runs_in(self.tree)
+        link = self.space / "link"
+        link.symlink_to(self.tree)
+        self.runs_in(self.tree, script=link / "dev")
+        self.assertEqual(1, len(self.calls("cmake --preset")))
+
+    def test_a_folder_copied_within_the_tree_is_made_afresh(self):
+        self.dev("build", "release")
+        shutil.copytree(self.tree / "build/release", self.tree / "build/debug")
+        self.expect(0, "starting afresh", "build", "debug")
+
+    def test_a_folder_that_leads_out_of_the_tree_is_refused(self):
+        outside = self.space / "outside"
+        outside.mkdir()
+        for name in ("build", ".cache"):
+            with self.subTest(name):
+                link = self.tree / name
+                link.symlink_to(outside)
+                self.expect(1, f"leads out of this tree, to {outside}", "run")
+                self.assertEqual([], os.listdir(outside))
+                link.unlink()
+        (self.tree / "build/release").mkdir(parents=True, exist_ok=True)
+        shutil.rmtree(self.tree / "build/release")
+        (self.tree / "build/release").symlink_to(outside)
+        (outside / "CMakeCache.txt").touch()
+        self.expect(1, "leads out of this tree", "run")
+        self.expect(0, "", "clean")
+        self.assertTrue((outside / "CMakeCache.txt").exists())
+        self.assertFalse((self.tree / "build").exists())
+        (self.tree / "build").symlink_to(outside)
+        self.expect(0, "", "clean")
+        self.assertTrue((outside / "CMakeCache.txt").exists())
+
+
+class Caches(TreeTest):
+    def test_the_cache_is_the_trees_and_stays(self):
+        self.expect(0, f"cache {self.tree}/.cache/ccache", "run")
+        self.expect(0, "", "clean")
+        self.assertTrue((self.tree / ".cache/ccache").is_dir())
+
+    def test_another_place_for_it(self):
+        self.expect(0, f"cache {self.space}/my cache/ccache", "run", PMX_CACHE="my cache")
+        self.assertFalse((self.tree / ".cache").exists())
+
+    def test_the_users_own_is_used(self):
+        self.expect(0, "cache /elsewhere", "run", CCACHE_DIR="/elsewhere")
+        self.expect(0, "cache none", "run", CCACHE_CONFIGPATH="/elsewhere/ccache.conf")
+        self.assertFalse((self.tree / ".cache").exists())
+
+    def test_a_place_that_cannot_be_used(self):
+        self.expect(1, "/dev/null/ccache cannot be made: Not a directory", "run", PMX_CACHE="/dev/null")
+
+    def test_a_home_is_not_needed(self):
+        for home in ("/nowhere", "/dev/null", ""):
+            self.expect(0, "ran in", "run", HOME=home)
+        self.expect(0, "ran in", "run", before=("env", "--unset=HOME"))
+
+
+class Others(TreeTest):
+    def test_two_at_once_build_one_after_the_other(self):
+        runs = [self.start("run", SLOW_BUILD="0.4", SLOW_CONFIGURE="0.2") for _ in range(3)]
+        texts = [run.communicate(timeout=30)[0] for run in runs]
+        self.assertEqual([0, 0, 0], [run.returncode for run in runs], texts)
+        self.assertNotIn("cmake met another one", self.calls())
+        self.assertEqual(1, len(self.calls("cmake --preset")))
+        self.assertEqual(2, "".join(texts).count("dev: waiting for another run that is using build/release\n"), texts)
+
+    def test_two_folders_are_built_at_once(self):
+        begin = time.monotonic()
+        runs = [self.start("build", preset, SLOW_BUILD="2") for preset in ("release", "debug")]
+        texts = [run.communicate(timeout=30)[0] for run in runs]
+        self.assertNotIn("waiting", "".join(texts))
+        self.assertLess(time.monotonic() - begin, 3.9)
+
+    def test_cleaning_waits_and_whoever_waited_starts_anew(self):
+        first = self.start("run", SLOW_BUILD="0.6")
+        self.wait_for("cmake --build")
+        others = [self.start("clean"), self.start("run")]
+        texts = [run.communicate(timeout=30)[0] for run in (first, *others)]
+        self.assertEqual([0, 0, 0], [run.returncode for run in (first, *others)], texts)
+        self.assertNotIn("cmake met another one", self.calls())
+        self.expect(0, "ran in", "run")
+
+    def wait_for(self, call):
+        until = time.monotonic() + 20
+        while not self.calls(call):
+            self.assertLess(time.monotonic(), until)
+            time.sleep(0.02)
+
+    def test_a_killed_run_blocks_nobody(self):
+        run = self.start("run", SLOW_BUILD="30")
+        self.wait_for("cmake --build")
+        os.killpg(run.pid, signal.SIGKILL)
+        run.communicate(timeout=30)
+        (self.tree / "build/release/building").rmdir()
+        self.assertNotIn("waiting", self.expect(0, "ran in", "run")[2])
+
+    def test_what_a_killed_run_left_at_work_is_waited_for(self):
+        run = self.start("run", SLOW_BUILD="1")
+        self.wait_for("cmake --build")
+        run.kill()
+        self.expect(0, "waiting for another run", "run")
+        self.assertNotIn("cmake met another one", self.calls())
+        run.communicate(timeout=30)
+
+    def test_interrupted(self):
+        for step, slow in (("cmake --preset", "SLOW_CONFIGURE"), ("cmake --build", "SLOW_BUILD")):
+            with self.subTest(step):
+                shutil.rmtree(self.tree / "build", ignore_errors=True)
+                (self.stubs / "calls").write_text("", encoding="utf-8")
+                run = self.start("run", **{slow: "30"})
+                self.wait_for(step)
+                os.killpg(run.pid, signal.SIGINT)
+                text = run.communicate(timeout=30)[0]
+                self.assertEqual(-signal.SIGINT, run.returncode, text)   # a shell calls that 130
+                self.assertNotIn("failed", text)
+                for left in self.tree.glob("build/*/building"):
+                    left.rmdir()
+                self.expect(0, f"ran in {self.tree}", "run")
+                self.assertEqual(f"tree {self.tree}\n", (self.tree / "build/release/build.ninja").read_text("utf-8"))
+
+    def test_a_shell_calls_an_interrupted_run_130(self):
+        run = subprocess.Popen(["bash", "-c", '"$0" run; echo "ended with $?"', self.tree / "dev"], text=True,
+                               env=self.environment(SLOW_BUILD="30"), stdout=subprocess.PIPE,
+                               stderr=subprocess.DEVNULL, start_new_session=True)
+        self.wait_for("cmake --build")
+        children = pathlib.Path(f"/proc/{run.pid}/task/{run.pid}/children").read_text(encoding="utf-8").split()
+        # All but the asking shell, which would end as well.
+        for process in [*self.below(int(children[0])), int(children[0])]:
+            os.kill(process, signal.SIGINT)
+        self.assertEqual("ended with 130\n", run.communicate(timeout=30)[0])
+
+    def below(self, process):
+        text = pathlib.Path(f"/proc/{process}/task/{process}/children").read_text(encoding="utf-8")
+        return [found for child in map(int, text.split()) for found in (*self.below(child), child)]
+
+    def test_a_half_configured_folder_is_not_used(self):
+        (self.tree / "build/release").mkdir(parents=True)
+        for left in ("CMakeCache.txt", "build.ninja"):
+            (self.tree / "build/release" / left).touch()
+            self.expect(0, "configuring build/release", "run")
+            (self.tree / "build/release" / left).unlink()
+            self.expect(0, "configuring build/release", "run")
+            shutil.rmtree(self.tree / "build/release")
+            (self.tree / "build/release").mkdir()
+
+
+class Rights(TreeTest):
+    @takes_two_users
+    def test_a_tree_that_may_only_be_read(self):
+        self.expect(1, f"{self.tree}/build cannot be made: Permission denied", "run", before=AS_NOBODY)
+        read_only = ("unshare", "--mount", "sh", "-c",
+                     'mount --bind "$0" "$0" && mount -o remount,bind,ro "$0" && exec "$0/dev" "$@"')
+        self.expect(1, f"{self.tree}/build cannot be made: Read-only file system", "run", script=self.tree,
+                    before=read_only)
+        self.expect(0, "usage: ./dev", "help", script=self.tree, before=read_only)
+        self.assertEqual([], self.calls("cmake"))
+        self.dev("run")
+        count = len(self.calls())
+        self.expect(1, f"{self.tree}/build, which belongs to root, cannot be written by root: Read-only file system",
+                    "run", script=self.tree, before=read_only)
+        self.expect(1, "Read-only file system", "clean", script=self.tree, before=read_only)
+        self.assertEqual([], self.calls("cmake")[count:])
+
+    @takes_two_users
+    def test_what_another_user_built(self):
+        self.dev("run")
+        count = len(self.calls("cmake"))
+        for verb in ("run", "clean"):
+            self.expect(1, f"{self.tree}/build, which belongs to root, cannot be written by nobody: Permission denied",
+                        verb, before=AS_NOBODY)
+        (self.tree / "build").chmod(0o777)
+        self.expect(1, "release.lock cannot be written by nobody: Permission denied", "run", before=AS_NOBODY)
+        (self.tree / "build/release.lock").chmod(0o666)
+        self.tree.chmod(0o777)
+        self.expect(1, f"{self.tree}/build/release, which belongs to root, cannot be written", "run",
+                    before=AS_NOBODY, PMX_CACHE=str(self.tree / "own"))
+        self.assertEqual(count, len(self.calls("cmake")))
+
+    def test_failures_are_failures(self):
+        self.expect(1, "no compiler\ndev: configuring failed", "run", BREAK_CONFIGURE="1")
+        self.expect(1, "dev: the build failed", "run", BREAK_BUILD="1")
+        with open("/dev/full", "w", encoding="utf-8") as full:
+            result = subprocess.run([self.tree / "dev", "help"], stdout=full, stderr=subprocess.PIPE, check=False,
+                                    text=True, env=self.environment())
+        self.assertEqual(1, result.returncode)
+        self.assertIn("No space left on device", result.stderr)
+
+
+class Usage(TreeTest):
+    def test_errors_of_usage_end_with_2_and_do_nothing(self):
+        (self.tree / "build").mkdir()
+        for arguments, message in ((("cleam",), "no such verb: cleam"),
+                                   (("build", "relase"), "no such preset: relase"),
+                                   (("build", "release", "debug"), "build release does not take: debug"),
+                                   (("clean", "release"), "clean does not take: release"),
+                                   (("coverage", "x"), "coverage does not take: x"),
+                                   (("docs", "x"), "docs does not take: x"),
+                                   (("format", "a b", "c"), "format does not take: a b c"),
+                                   (("lint", "--al"), "lint does not take: --al"),
+                                   (("compare",), "compare: which revision?")):
+            with self.subTest(arguments):
+                self.expect(2, message, *arguments)
+        self.assertEqual([], self.calls())
+        self.assertTrue((self.tree / "build").exists())
+
+    def test_words_go_on_as_they_are(self):
+        self.expect(0, "run a b $c * --quiet\n", "run", "a b", "$c", "*", "--quiet")
+        self.expect(0, "", "test", "-R", "a b|c")
+        self.assertEqual(["ctest --preset debug -R a b|c"], self.calls("ctest"))
+
+    def test_what_builds_is_called_in_the_tree_alone(self):
+        self.dev("test")
+        built = [line.split()[2] for line in self.calls("cmake --preset")]
+        self.assertEqual(["debug", "release", "arm-linux", "arm-bare"], built)
+        self.assertEqual(["CMakeLists.txt", "CMakePresets.json", "build", "dev", "packages.txt"],
+                         sorted(set(os.listdir(self.tree)) - {".cache"}))
+        self.assertEqual(["stubs", "tree"], sorted(os.listdir(self.space)))
+
+
+if __name__ == "__main__":
+    unittest.main()

@@ -6,6 +6,7 @@
 #include <regex>
 #include <sstream>
 
+#include "drv_if_pmx.h"
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/commands/modes.h"
 #include "tools/pmxboard/prompt/about_mode.h"

@@ -6,6 +6,8 @@
 #include <algorithm>
 #include <set>
 
+#include "drv_if_pmx.h"
+
 namespace
 {
 
@@ -17,8 +19,8 @@ TEST(Names, NameOf_ANumberOfAFamily)
     using board::names::name_of;
     EXPECT_EQ("RES_480I", name_of(Family::ResolutionMode, 0));
     EXPECT_EQ("RES_1080P23_976HZ", name_of(Family::ResolutionMode, 19));
-    EXPECT_EQ("RES_AUTO", name_of(Family::ResolutionMode, 52));
-    EXPECT_EQ("", name_of(Family::ResolutionMode, 53));
+    EXPECT_EQ("RES_AUTO", name_of(Family::ResolutionMode, RES_AUTO));
+    EXPECT_EQ("", name_of(Family::ResolutionMode, RES_AUTO + 1));
     EXPECT_EQ("", name_of(Family::ResolutionMode, -1));
     EXPECT_EQ("", name_of(Family::ResolutionMode, 0x100000000));
     EXPECT_EQ("PMX_TV_TYPE_PAL", name_of(Family::TvType, 3));
@@ -34,7 +36,7 @@ TEST(Names, NameOf_ANumberOfAFamily)
 TEST(Names, NumberOf_AName)
 {
     using board::names::number_of;
-    EXPECT_EQ(50, number_of("RES_2160P_4096"));
+    EXPECT_EQ(RES_2160P_4096, number_of("RES_2160P_4096"));
     EXPECT_EQ(0xB0, number_of("PMX_COMP_TYPE_OSD"));
     EXPECT_EQ(8, number_of("HDMI_AS_PICTURE_AR"));
     EXPECT_EQ(14, number_of("PLA_MXR_EXT_DEEP_COLOR"));
@@ -44,6 +46,8 @@ TEST(Names, NumberOf_AName)
     EXPECT_EQ(1, number_of("TVE_2"));
     EXPECT_EQ(1, number_of("TVE_SET_OK"));
     EXPECT_EQ(1, number_of("PMX_SET_OK"));
+    EXPECT_EQ(0x71000000, number_of("PMX_PORT_DONE"));
+    EXPECT_EQ(17, number_of("VDP_CMD_ORDER_CHANGES"));
     EXPECT_EQ(std::nullopt, number_of("RES_480p"));
     EXPECT_EQ(std::nullopt, number_of(""));
 }

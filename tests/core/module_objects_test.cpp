@@ -70,7 +70,7 @@ TEST(ModuleObjects, Types)
     EXPECT_TRUE((std::is_same_v<decltype(PMX_debug_level), UINT32>));
     EXPECT_TRUE((std::is_same_v<decltype(pmx_pm_ops), const PM_OPERATIONS_T>));
     EXPECT_TRUE((std::is_same_v<decltype(_rPMXIF), const IPMX>));
-    EXPECT_TRUE((std::is_same_v<decltype(szResStr), const CHAR* const[51]>));
+    EXPECT_TRUE((std::is_same_v<decltype(szResStr), const CHAR* const[RES_MODE_NUM]>));
 }
 
 TEST(ModuleObjects, PowerOperations)

@@ -173,6 +173,13 @@ inline bool admitted(UINT32 mode, std::uint32_t word)
     return bit == always || (bit != never && ((word >> bit) & 1) != 0);
 }
 
+/** How many modes a capability word admits. */
+inline unsigned number_admitted(std::uint32_t word)
+{
+    return static_cast<unsigned>(std::count_if(std::begin(all_modes), std::end(all_modes),
+                                               [word](const Mode& mode) { return admitted(mode.mode, word); }));
+}
+
 /** The known modes that have a fact. */
 inline std::set<UINT32> modes_with(Fact fact)
 {

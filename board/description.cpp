@@ -4,6 +4,7 @@
 #include <toml++/toml.h>
 
 #include "board/devices.h"
+#include "board/files.h"
 #include "board/names.h"
 
 namespace board
@@ -105,7 +106,8 @@ void read_flash(const File& file, const toml::table& flash, Description& descrip
         const auto image = file.path.parent_path() / text_at(file, value, "the image of flash partition " + name);
         if (name.empty())
             file.wrong(key.source(), "a flash partition has a name");
-        if (!std::filesystem::is_regular_file(image))
+        std::error_code error;
+        if (!std::filesystem::is_regular_file(image, error))
             file.wrong(value.source(), "flash partition " + name + ": no such image file: " + image.string());
         description.flash[name] = image;
     }
@@ -303,12 +305,34 @@ Description read(const File& file, const toml::table& root)
     return description;
 }
 
+/** The library follows dotted keys however deep they lead, and falls with what it has built; a key's depth is bounded
+ *  by the length of its line. */
+void check_lines(const File& file, std::string_view text)
+{
+    constexpr std::size_t longest = 4096;
+    std::size_t number = 1;
+    while (!text.empty())
+    {
+        const std::string_view line = text.substr(0, text.find('\n'));
+        if (line.size() > longest)
+            throw DescriptionError(file.path.string() + ":" + std::to_string(number) + ": a line is longer than " +
+                                   std::to_string(longest) + " bytes");
+        text.remove_prefix(std::min(line.size() + 1, text.size()));
+        ++number;
+    }
+}
+
 std::filesystem::path find_file(const std::filesystem::path& board)
 {
     for (const auto& candidate : { board, board / "board.toml", boards_directory() / board / "board.toml" })
     {
-        if (!board.empty() && std::filesystem::is_regular_file(candidate))
+        std::error_code error;
+        if (!board.empty() && std::filesystem::is_regular_file(candidate, error))
             return candidate;
+        const bool is_absent =
+            !error || error == std::errc::no_such_file_or_directory || error == std::errc::not_a_directory;
+        if (!board.empty() && !is_absent)
+            throw DescriptionError("cannot read " + candidate.string() + ": " + error.message());
     }
     const std::vector<std::string> known = boards_by_name();
     throw DescriptionError("no such board: " + board.string() +
@@ -321,10 +345,13 @@ std::vector<std::string> boards_by_name()
 {
     std::vector<std::string> names;
     std::error_code error;
-    for (const auto& entry : std::filesystem::directory_iterator(boards_directory(), error))
+    std::error_code ignored;
+    // Step by step: the loop over a range would throw where a step fails.
+    for (std::filesystem::directory_iterator entry(boards_directory(), error), end; !error && entry != end;
+         entry.increment(error))
     {
-        if (std::filesystem::is_regular_file(entry.path() / "board.toml"))
-            names.push_back(entry.path().filename().string());
+        if (std::filesystem::is_regular_file(entry->path() / "board.toml", ignored))
+            names.push_back(entry->path().filename().string());
     }
     std::sort(names.begin(), names.end());
     return names;
@@ -340,7 +367,13 @@ Description load_description(const std::filesystem::path& board)
     const File file{ find_file(board) };
     try
     {
-        return read(file, toml::parse_file(file.path.string()));
+        const std::string text = files::read(file.path, files::mebibyte);
+        check_lines(file, text);
+        return read(file, toml::parse(text, file.path.string()));
+    }
+    catch (const files::FileError& error)
+    {
+        throw DescriptionError(error.what());
     }
     catch (const toml::parse_error& error)
     {

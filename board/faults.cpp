@@ -54,6 +54,10 @@ void check(const Fault& fault)
     if (!found->has_result)
         throw std::invalid_argument(fault.function + " has no result that a fault could answer" +
                                     nearest_functions(fault.function, true));
+    // Its table is called: success without one would have the layer jump to nowhere.
+    if (fault.function == "i4ImQueryInterface" && static_cast<std::int32_t>(fault.answer) >= 0)
+        throw std::invalid_argument("i4ImQueryInterface hands out a table when it answers " +
+                                    std::to_string(fault.answer) + ", and a fault has none; answer less than 0");
     if (fault.when != Fault::When::Always && fault.n == 0)
         throw std::invalid_argument("calls of " + fault.function + " are counted from 1");
 }

@@ -7,6 +7,7 @@
 
 #include "board/device_values.h"
 #include "board/devices.h"
+#include "board/files.h"
 
 #include "u_os.h"
 
@@ -28,14 +29,28 @@ struct Flash
 
 Flash flash_state;
 
-/** Reads all that is asked for, or nothing. */
-bool read_image(const std::filesystem::path& image, UINT32 offset, std::vector<char>& content)
+/** All that is asked for, or nothing. The layer's caller knows no exceptions: whatever is wrong with the file, to it
+ *  the device has failed. */
+bool read_image(const std::filesystem::path& image, UINT32 offset, UINT32 count, void* into)
+try
 {
-    std::ifstream file(image, std::ios::binary | std::ios::ate);
-    if (!file || static_cast<std::uint64_t>(file.tellg()) < std::uint64_t{ offset } + content.size())
+    std::error_code error;
+    if (!std::filesystem::is_regular_file(image, error))
         return false;
+    const std::uintmax_t size = std::filesystem::file_size(image, error);
+    if (error || size < std::uintmax_t{ offset } + count)
+        return false;
+    std::ifstream file(image, std::ios::binary);
     file.seekg(offset);
-    return static_cast<bool>(file.read(content.data(), static_cast<std::streamsize>(content.size())));
+    std::vector<char> content(count);
+    if (!file.read(content.data(), static_cast<std::streamsize>(content.size())))
+        return false;
+    std::copy(content.begin(), content.end(), static_cast<char*>(into));
+    return true;
+}
+catch (const std::exception&)
+{
+    return false;
 }
 
 } // namespace
@@ -47,8 +62,10 @@ void set_flash(std::string partition, std::filesystem::path image)
 {
     if (partition.empty())
         throw std::invalid_argument("a flash partition has a name");
-    if (!image.empty() && !std::filesystem::is_regular_file(image))
+    std::error_code error;
+    if (!image.empty() && !std::filesystem::is_regular_file(image, error))
         throw std::invalid_argument("flash partition " + partition + ": no such image file: " + image.string());
+    files::note_input(image);
     auto& partitions = flash_state.partitions;
     const auto found = std::find_if(partitions.begin(), partitions.end(),
                                     [&](const Partition& known) { return known.name == partition; });
@@ -70,7 +87,10 @@ void power_on(const Description& description)
 {
     flash_state = {};
     for (const auto& [name, image] : description.flash)
+    {
+        files::note_input(image);
         flash_state.partitions.push_back({ name, image });
+    }
 }
 
 Value state()
@@ -123,17 +143,10 @@ INT32 i4NFBPartitionRead(INT32 i4PartId, UINT32 u4Offset, void* pvDest, UINT32 u
     // The result has to be able to tell the number of bytes.
     const bool readable = pvDest != nullptr && u4Count <= 0x7FFFFFFFu && i4PartId >= 0 && id < partitions.size() &&
                           !partitions[id].name.empty();
-    std::vector<char> content;
-    if (readable && std::filesystem::is_regular_file(partitions[id].image) &&
-        u4Count <= std::filesystem::file_size(partitions[id].image))
+    if (readable && read_image(partitions[id].image, u4Offset, u4Count, pvDest))
     {
-        content.resize(u4Count);
-        if (read_image(partitions[id].image, u4Offset, content))
-        {
-            std::copy(content.begin(), content.end(), static_cast<char*>(pvDest));
-            ++partitions[id].reads;
-            return boardCall.answer(static_cast<INT32>(u4Count));
-        }
+        ++partitions[id].reads;
+        return boardCall.answer(static_cast<INT32>(u4Count));
     }
     ++flash_state.failed_reads;
     return boardCall.fail(-1);

@@ -4,7 +4,9 @@
  *  there are Value::to_json() and TraceEntry::to_json(). */
 #pragma once
 
+#include <stdexcept>
 #include <string>
+#include <string_view>
 
 #include <nlohmann/json.hpp>
 
@@ -19,7 +21,19 @@ using Json = nlohmann::ordered_json;
  *  well, an object that is known by name {"symbol": …}. */
 Json json_of(const Value& value);
 
-/** indent < 0: on one line. Bytes that are no UTF-8, which a console text may hold, become replacement characters. */
+/** A text that is no JSON, or that is larger in some way than anything that this project writes; the message says what
+ *  is wrong, and where. */
+class JsonError : public std::runtime_error
+{
+public:
+    using std::runtime_error::runtime_error;
+};
+
+/** JSON that somebody else may have written. Throws JsonError. */
+Json read_json(std::string_view text);
+
+/** indent < 0: on one line. Bytes that are no UTF-8, which a console text may hold, become replacement characters;
+ *  what a terminal would act on is escaped. */
 std::string written(const Json& json, int indent = -1);
 
 } // namespace board

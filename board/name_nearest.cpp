@@ -49,10 +49,18 @@ std::vector<std::string> nearest(std::string_view wrong, const std::vector<std::
                                  std::size_t count)
 {
     std::vector<std::pair<std::size_t, std::string_view>> near;
+    constexpr std::size_t longest = 200; // nobody means a name by more
+    if (wrong.size() > longest)
+        return {};
     const std::size_t most = std::max<std::size_t>(2, wrong.size() / 3);
     for (const std::string_view candidate : candidates)
     {
-        const std::size_t changes = begins_with(candidate, wrong) ? 0 : distance(wrong, candidate);
+        const bool is_begun = begins_with(candidate, wrong);
+        const std::size_t difference =
+            std::max(candidate.size(), wrong.size()) - std::min(candidate.size(), wrong.size());
+        if (!is_begun && difference > most)
+            continue;
+        const std::size_t changes = is_begun ? 0 : distance(wrong, candidate);
         if (changes <= most && changes < candidate.size())
             near.emplace_back(changes, candidate);
     }

@@ -34,6 +34,27 @@ std::size_t closing_quote(std::string_view text, std::size_t quote)
     throw std::invalid_argument("a text is not closed: " + std::string(text.substr(quote)));
 }
 
+/** Where a bracket closes that stands in so many others. */
+std::size_t closing_within(std::string_view text, std::size_t open, unsigned depth)
+{
+    constexpr unsigned deepest = 64;
+    if (depth == deepest)
+        throw std::invalid_argument("brackets stand more than " + std::to_string(deepest) + " deep in each other");
+    const char close = partner(text[open]);
+    for (std::size_t i = open + 1; i < text.size(); ++i)
+    {
+        if (text[i] == close)
+            return i;
+        if (text[i] == '"')
+            i = closing_quote(text, i);
+        else if (partner(text[i]) != '\0')
+            i = closing_within(text, i, depth + 1);
+        else if (text[i] == ')' || text[i] == ']' || text[i] == '}')
+            break;
+    }
+    throw std::invalid_argument("a bracket is not closed: " + std::string(text.substr(open)));
+}
+
 } // namespace
 
 std::string_view trim(std::string_view text)
@@ -68,19 +89,7 @@ std::optional<std::int64_t> number(std::string_view token)
 
 std::size_t closing(std::string_view text, std::size_t open)
 {
-    const char close = partner(text[open]);
-    for (std::size_t i = open + 1; i < text.size(); ++i)
-    {
-        if (text[i] == close)
-            return i;
-        if (text[i] == '"')
-            i = closing_quote(text, i);
-        else if (partner(text[i]) != '\0')
-            i = closing(text, i);
-        else if (text[i] == ')' || text[i] == ']' || text[i] == '}')
-            break;
-    }
-    throw std::invalid_argument("a bracket is not closed: " + std::string(text.substr(open)));
+    return closing_within(text, open, 0);
 }
 
 std::string_view inside(std::string_view token, char open, char close)

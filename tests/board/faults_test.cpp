@@ -40,6 +40,13 @@ protected:
 
 using Answers = std::vector<INT32>;
 
+TEST_F(Faults, TableThatNobodyHandsOut_IsRefused)
+{
+    for (const std::int64_t answer : { 0, 1, 0x7FFFFFFF })
+        EXPECT_TRUE(refusal({ "i4ImQueryInterface", answer }).starts_with("i4ImQueryInterface hands out a table"));
+    EXPECT_EQ("accepted", refusal({ "i4ImQueryInterface", 0xFFFFFFFF })) << "-1 in 32 bits";
+}
+
 TEST_F(Faults, On_AnswersThatCallAlone)
 {
     board::faults::set({ "get_part_id_by_name", 7 });

@@ -19,7 +19,7 @@ const PMX_MODE_ROW_T* table()
         const auto symbol = board::executable_symbols::find("_arPmxModeRow");
         if (!symbol)
             throw std::runtime_error("the layer's mode table is not in this executable");
-        if (symbol->size != sizeof(PMX_MODE_ROW_T) * (PMX_MODE_ROW_NUM + 1))
+        if (symbol->size < sizeof(PMX_MODE_ROW_T) * (PMX_MODE_ROW_NUM + 1))
             throw std::runtime_error("the layer's mode table has " + std::to_string(symbol->size) + " bytes");
         return static_cast<const PMX_MODE_ROW_T*>(symbol->address);
     }();

@@ -34,8 +34,6 @@ void call_slot(Session& session, const Words& given)
     const INT32 queried = i4ImQueryInterface(PMX_COMP_TYPE_PMX, 0, IID_IPMX, &table, &tag);
     if (queried < 0)
         throw StepFailed("no IPMX table is registered: i4ImQueryInterface answers " + std::to_string(queried));
-    if (table == nullptr)
-        throw StepFailed("i4ImQueryInterface answered " + std::to_string(queried) + " without a table");
     held_table() = { static_cast<const IPMX*>(table), tag };
     if (registered_tag)
         values[0] = board::Value::number(number_of_tag(tag));

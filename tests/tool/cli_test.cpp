@@ -228,14 +228,16 @@ TEST_F(CommandLine, State_OfNoSuchFile_Is2)
     const std::string broken = scenario("broken.json", "{\n  \"schema\": \"pmxboard-state\",\n  \"vers");
     EXPECT_EQ("pmxboard: " + broken + ": it ends in the middle, at line 3, column 8\n", run("state " + broken).err);
     EXPECT_EQ(2, run("state " + broken).code);
-    EXPECT_EQ("pmxboard: cannot read no/such/file.json\n", run("state no/such/file.json").err);
+    EXPECT_EQ("pmxboard: cannot read no/such/file.json: No such file or directory\n",
+              run("state no/such/file.json").err);
     EXPECT_EQ("pmxboard: scenarios is a directory\n", run("state scenarios").err);
-    EXPECT_EQ("pmxboard: cannot read no/such/other\n", run("state -  no/such/other",
-                                                           [&] {
-                                                               run("run -q -", "save " + file("fine.json") + "\n");
-                                                               return content(file("fine.json"));
-                                                           }())
-                                                           .err);
+    EXPECT_EQ("pmxboard: cannot read no/such/other: No such file or directory\n",
+              run("state -  no/such/other",
+                  [&] {
+                      run("run -q -", "save " + file("fine.json") + "\n");
+                      return content(file("fine.json"));
+                  }())
+                  .err);
     EXPECT_EQ("pmxboard: the standard input holds one state only\n", run("state - -").err);
     EXPECT_EQ(2, run("state").code);
     EXPECT_EQ(2, run("state --frob x.json").code);

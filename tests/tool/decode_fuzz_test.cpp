@@ -9,6 +9,7 @@
 #include <sstream>
 
 #include "tools/pmxboard/decode/show.h"
+#include "tools/pmxboard/text/printable.h"
 
 namespace
 {
@@ -63,7 +64,7 @@ void expect_fit(const std::string& bytes, int round)
     const std::string shown = everything_shown(bytes);
     const std::size_t at = unfit(shown);
     ASSERT_EQ(std::string::npos, at) << "round " << round << ": "
-                                     << decode::printable(shown.substr(at < 40 ? 0 : at - 40, 80), 400);
+                                     << printable(shown.substr(at < 40 ? 0 : at - 40, 80), 400);
 }
 
 TEST(DecodeFuzz, TheCheckOfTheOutputKnowsWhatIsUnfit)
@@ -72,7 +73,7 @@ TEST(DecodeFuzz, TheCheckOfTheOutputKnowsWhatIsUnfit)
     EXPECT_EQ(1u, unfit("a\x1b[0m"));
     for (const char* bad :
          { "\x80", "\xC0\x80", "\xC2\x85", "\xE0\x80\x80", "\xED\xA0\x80", "\xF5\x80\x80\x80", "\xC3" })
-        EXPECT_EQ(0u, unfit(bad)) << decode::printable(bad, 40);
+        EXPECT_EQ(0u, unfit(bad)) << printable(bad, 40);
 }
 
 TEST(DecodeFuzz, RandomBytesAreShownPrintably)
@@ -138,7 +139,7 @@ TEST(DecodeFuzz, TheWorkGrowsWithTheBytesHoweverTheyAreDivided)
     {
         const double small = reading_takes(repeated(piece, 16 << 10));
         const double large = reading_takes(repeated(piece, 64 << 10));
-        EXPECT_LT(large, 10 * small + 0.05) << decode::printable(piece, 40);
+        EXPECT_LT(large, 10 * small + 0.05) << printable(piece, 40);
     }
 }
 

@@ -2,10 +2,12 @@
 #include <gtest/gtest.h>
 
 #include "tools/pmxboard/decode/log.h"
+#include "tools/pmxboard/text/printable.h"
 
 namespace
 {
 
+using namespace pmxboard;
 using namespace pmxboard::decode;
 
 TEST(DecodeLog, PrefixesOfEveryKind_DoNotMatter)

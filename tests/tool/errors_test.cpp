@@ -188,7 +188,7 @@ TEST(ScenarioErrors, AnyBytes_AreAWrongLineAndNothingElse)
 
 TEST(ScenarioErrors, WhatIsQuoted_IsFitForATerminal)
 {
-    EXPECT_EQ("here.pmx:1: no command \\x1bqqqqqqqqqqqqqq\\x07\n", diagnostics("\x1bqqqqqqqqqqqqqq\x07"));
+    EXPECT_EQ("here.pmx:1: no command \\x1Bqqqqqqqqqqqqqq\\x07\n", diagnostics("\x1bqqqqqqqqqqqqqq\x07"));
     EXPECT_LT(diagnostics(std::string(5000, 'q')).size(), 600u);
 }
 

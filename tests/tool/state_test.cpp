@@ -152,9 +152,14 @@ TEST(Dump, Broken_IsRefused_WithThePlace)
     std::string deep;
     for (int i = 0; i < 5000; ++i)
         deep += "[";
-    EXPECT_NE(
-        std::string::npos,
-        refused(with_state(R"({"a": )" + deep + std::string(5000, ']') + "}")).find("a state is not nested so deeply"));
+    EXPECT_NE(std::string::npos, refused(with_state(R"({"a": )" + deep + std::string(5000, ']') + "}"))
+                                     .find("values are nested more than 64 deep"));
+    EXPECT_NE(std::string::npos, refused(with_state(R"({"a": 1e400})")).find("a number is too large, or too small"));
+    EXPECT_NE(std::string::npos, refused(with_state(R"({"a\u001b": 1})")).find("no terminal shows it: a\\x1B"));
+    std::string keys;
+    for (int i = 0; i < 5000; ++i)
+        keys += (i == 0 ? "\"" : ", \"") + std::to_string(i) + "\": 1";
+    EXPECT_NE(std::string::npos, refused(with_state("{" + keys + "}")).find("a record has more than 1024 members"));
 }
 
 TEST(Dump, CutShortAnywhere_IsRefused)

@@ -19,6 +19,7 @@
 #include "tools/pmxboard/commands/state.h"
 #include "tools/pmxboard/prompt/help.h"
 #include "tools/pmxboard/text/layout.h"
+#include "tools/pmxboard/text/printable.h"
 #include "tools/pmxboard/view/trace_sink.h"
 
 namespace pmxboard
@@ -194,6 +195,15 @@ void add_decode(CLI::App& app, Chosen& chosen)
     sub->callback([decode, &chosen] { chosen = [decode] { return decode_log(*decode); }; });
 }
 
+/** Help, or what is wrong with the command line, which may quote anything. */
+int told(const CLI::App& app, const CLI::ParseError& error)
+{
+    std::ostringstream wrong;
+    const bool is_help = app.exit(error, std::cout, wrong) == 0;
+    std::cerr << printable_lines(wrong.str());
+    return is_help ? exit_done : exit_usage;
+}
+
 } // namespace
 
 int run_command_line(int count, const char* const* arguments)
@@ -218,9 +228,16 @@ int run_command_line(int count, const char* const* arguments)
     }
     catch (const CLI::ParseError& error)
     {
-        return app.exit(error) == 0 ? exit_done : exit_usage;
+        return with_all_printed(told(app, error));
     }
-    return chosen();
+    try
+    {
+        return with_all_printed(chosen());
+    }
+    catch (const std::exception& error) // a tool without its symbols, a machine without memory
+    {
+        return usage_error(error.what());
+    }
 }
 
 } // namespace pmxboard

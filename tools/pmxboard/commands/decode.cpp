@@ -1,12 +1,9 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "tools/pmxboard/commands/decode.h"
 
-#include <filesystem>
-#include <fstream>
 #include <iostream>
-#include <iterator>
 
-#include "board/board.h"
+#include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/decode/show.h"
 #include "tools/pmxboard/text/paint.h"
@@ -15,20 +12,6 @@ namespace pmxboard
 {
 namespace
 {
-
-/** All bytes of a file; nothing when it cannot be read. */
-std::optional<std::string> content(const std::string& file)
-{
-    std::error_code ignored;
-    if (file == "-")
-        return std::string(std::istreambuf_iterator<char>(std::cin), {});
-    if (std::filesystem::is_directory(file, ignored))
-        return {};
-    std::ifstream in(file, std::ios::binary);
-    if (!in)
-        return {};
-    return std::string(std::istreambuf_iterator<char>(in), {});
-}
 
 decode::Comparison compared(const decode::Log& log, const DecodeOptions& options)
 {
@@ -39,35 +22,16 @@ decode::Comparison compared(const decode::Log& log, const DecodeOptions& options
     return comparison;
 }
 
-} // namespace
-
-int decode_log(const DecodeOptions& options)
+int decode_file(const DecodeOptions& options)
 {
-    if (options.texts)
-    {
-        (options.json ? decode::show_texts_json : decode::show_texts)(std::cout);
-        return exit_done;
-    }
-    if (options.file.empty())
-        return usage_error("decode needs a FILE; - reads the standard input");
-    const std::optional<std::string> bytes = content(options.file);
-    if (!bytes)
-        return usage_error("cannot read " + options.file);
-
-    const decode::Log log = decode::read_log(*bytes);
+    const std::string bytes = board::files::read_named(options.file);
+    const decode::Log log = decode::read_log(bytes);
     std::optional<decode::Comparison> comparison;
     if (!options.against.empty())
     {
         if (log.items.empty())
             return usage_error("nothing in " + options.file + " comes from the mixer layer: nothing to compare");
-        try
-        {
-            comparison = compared(log, options);
-        }
-        catch (const decode::ScenarioFailed& failure)
-        {
-            return usage_error(failure.what());
-        }
+        comparison = compared(log, options);
     }
 
     const decode::Story story = decode::tell(log);
@@ -82,8 +46,30 @@ int decode_log(const DecodeOptions& options)
         decode::show_log(std::cout, log, story, show);
     if (comparison && !options.json && (comparison->departure || !options.quiet))
         decode::show_comparison(std::cout, *comparison, show);
-    std::cout.flush();
     return comparison && comparison->departure ? exit_failed : exit_done;
+}
+
+} // namespace
+
+int decode_log(const DecodeOptions& options)
+{
+    if (options.texts)
+    {
+        (options.json ? decode::show_texts_json : decode::show_texts)(std::cout);
+        return exit_done;
+    }
+    if (options.file.empty())
+        return usage_error("decode needs a FILE; - reads the standard input");
+    if (options.file == "-" && options.against == "-")
+        return usage_error("the standard input holds a log or a scenario, not both");
+    try
+    {
+        return decode_file(options);
+    }
+    catch (const std::runtime_error& error) // a file that cannot be used, a scenario that fails
+    {
+        return usage_error(error.what());
+    }
 }
 
 } // namespace pmxboard

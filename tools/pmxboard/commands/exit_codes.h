@@ -19,4 +19,7 @@ enum ExitCode
 /** Say what cannot be meant on the diagnostic stream; the exit code. */
 int usage_error(const std::string& message);
 
+/** The exit code of a sub-command, unless what it printed did not arrive: then that is told. */
+int with_all_printed(int code);
+
 } // namespace pmxboard

@@ -1,12 +1,15 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "tools/pmxboard/commands/run.h"
 
-#include <filesystem>
-#include <fstream>
+#include <algorithm>
 #include <iostream>
+#include <istream>
+#include <memory>
 
 #include "board/board.h"
+#include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
+#include "tools/pmxboard/files/new_file.h"
 #include "tools/pmxboard/language/runner.h"
 #include "tools/pmxboard/text/paint.h"
 
@@ -35,14 +38,8 @@ std::string repeat_command(const RunOptions& run, const std::string& file)
 /** What is wrong with the command line; empty when nothing is. */
 std::string complaint(const RunOptions& run, const OutputOptions& output)
 {
-    std::error_code ignored;
-    for (const std::string& file : run.files)
-    {
-        if (file != "-" && std::filesystem::is_directory(file, ignored))
-            return file + " is a directory";
-        if (file != "-" && !std::ifstream(file))
-            return "cannot read " + file;
-    }
+    if (std::count(run.files.begin(), run.files.end(), "-") > 1)
+        return "the standard input holds one scenario only";
     try
     {
         if (!run.board.empty())
@@ -55,19 +52,48 @@ std::string complaint(const RunOptions& run, const OutputOptions& output)
     return output.filter.complaint();
 }
 
-/** Each scenario on a board of its own; the exit code. */
-int run_each(const RunOptions& run, const OutputOptions& output)
+/** All scenarios, open: one that cannot be read is told before any other runs. */
+using Opened = std::vector<std::unique_ptr<std::istream>>;
+
+Opened open_all(const RunOptions& run)
 {
+    Opened opened;
     for (const std::string& file : run.files)
+        opened.push_back(board::files::open_lines(file));
+    return opened;
+}
+
+/** Each scenario on a board of its own; the exit code. */
+int run_each(const RunOptions& run, const Opened& opened, const OutputOptions& output)
+{
+    for (std::size_t i = 0; i < run.files.size(); ++i)
     {
-        std::ifstream opened;
-        if (file != "-")
-            opened.open(file);
+        const std::string& file = run.files[i];
         const Scenario scenario{ file, run.board.empty() ? "default" : run.board, repeat_command(run, file) };
-        if (!run_scenario(file == "-" ? std::cin : opened, scenario, output, std::cerr))
+        if (!run_scenario(*opened[i], scenario, output, std::cerr))
             return exit_failed;
     }
     return exit_done;
+}
+
+/** The same, with the trace where it is wanted. Throws FileError. */
+int run_traced(const RunOptions& run, OutputOptions output)
+{
+    const Opened opened = open_all(run);
+    std::unique_ptr<NewFile> trace_file;
+    if (!run.trace_file.empty())
+    {
+        trace_file = std::make_unique<NewFile>(run.trace_file);
+        output.trace_to = &trace_file->stream();
+    }
+    const TraceOptions how{ run.verbose, output.colour, trace_file != nullptr };
+    auto trace = trace_form(run.trace_format).make(how, trace_file ? trace_file->stream() : std::cout);
+    output.trace = trace.get();
+    const int code = run_each(run, opened, output);
+    trace.reset(); // what it still has to write
+    if (trace_file)
+        trace_file->commit();
+    return code;
 }
 
 } // namespace
@@ -83,24 +109,14 @@ int run_files(const RunOptions& run)
     output.stores = run.stores;
     if (const std::string wrong = complaint(run, output); !wrong.empty())
         return usage_error(wrong);
-    std::ofstream trace_file;
-    if (!run.trace_file.empty())
+    try
     {
-        trace_file.open(run.trace_file);
-        if (!trace_file)
-            return usage_error("cannot write " + run.trace_file);
-        output.trace_to = &trace_file;
+        return run_traced(run, output);
     }
-    const TraceOptions how{ run.verbose, output.colour, !run.trace_file.empty() };
-    auto trace = trace_form(run.trace_format).make(how, run.trace_file.empty() ? std::cout : trace_file);
-    output.trace = trace.get();
-    const int code = run_each(run, output);
-    trace.reset(); // what it still has to write
-    if (!run.trace_file.empty() && !trace_file.flush())
-        return usage_error("cannot write " + run.trace_file);
-    if (!std::cout.flush())
-        return usage_error("cannot write to the standard output");
-    return code;
+    catch (const board::files::FileError& error)
+    {
+        return usage_error(error.what());
+    }
 }
 
 } // namespace pmxboard

@@ -7,7 +7,9 @@
 #include <iostream>
 
 #include "board/board.h"
+#include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
+#include "tools/pmxboard/files/ending.h"
 #include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/language/runner.h"
 #include "tools/pmxboard/language/session.h"
@@ -42,6 +44,7 @@ public:
     bool run(const std::string& text)
     {
         ++m_number;
+        set_place("<stdin>:" + std::to_string(m_number));
         try
         {
             const Line line(text);
@@ -174,13 +177,20 @@ int run_shell(const ShellOptions& options)
         return complete(line, cursor, { ".", shell_words });
     };
     const auto lines = interactive ? make_editor({ "pmx> ", usable_history(), complete_here }) : make_plain_source();
-    std::optional<std::string> line;
-    bool goes_on = true;
-    while (goes_on && (line = lines->read()))
+    try
     {
-        if (line->find_first_not_of(" \t\r") != line->npos)
-            lines->remember(*line);
-        goes_on = shell.run(*line);
+        std::optional<std::string> line;
+        bool goes_on = true;
+        while (goes_on && (line = lines->read()))
+        {
+            if (line->find_first_not_of(" \t\r") != line->npos)
+                lines->remember(*line);
+            goes_on = shell.run(*line);
+        }
+    }
+    catch (const board::files::FileError& error)
+    {
+        return usage_error(error.what());
     }
     return shell.finish();
 }

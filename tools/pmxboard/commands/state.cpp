@@ -2,15 +2,15 @@
 #include "tools/pmxboard/commands/state.h"
 
 #include <filesystem>
-#include <fstream>
 #include <iostream>
-#include <iterator>
 
+#include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/state/dump.h"
 #include "tools/pmxboard/state/paths.h"
 #include "tools/pmxboard/text/paint.h"
+#include "tools/pmxboard/text/printable.h"
 
 namespace pmxboard
 {
@@ -21,16 +21,7 @@ constexpr int exit_differs = 1;
 
 StateDump load(const std::string& name)
 {
-    std::error_code ignored;
-    if (name != "-" && std::filesystem::is_directory(name, ignored))
-        throw DumpError(name + " is a directory");
-    std::ifstream file;
-    if (name != "-")
-        file.open(name, std::ios::binary);
-    if (name != "-" && !file)
-        throw DumpError("cannot read " + name);
-    std::istream& in = name == "-" ? std::cin : file;
-    const std::string text{ std::istreambuf_iterator<char>(in), {} };
+    const std::string text = board::files::read_named(name, 16 * board::files::mebibyte);
     try
     {
         return read_dump(text);
@@ -99,7 +90,8 @@ int compare(const StateOptions& options)
     else if (!options.quiet && !found.empty())
     {
         const Paint paint{ wants_colour(options.colour) };
-        std::cout << paint("--- " + options.file + "\n+++ " + other, Colour::Bold) << '\n' << to_text(found);
+        std::cout << paint("--- " + printable(options.file) + "\n+++ " + printable(other), Colour::Bold) << '\n'
+                  << to_text(found);
     }
     return found.empty() ? exit_done : exit_differs;
 }
@@ -110,8 +102,7 @@ int show_state(const StateOptions& options)
 {
     try
     {
-        const int code = !options.words.empty() && is_file(options.words.front()) ? compare(options) : print(options);
-        return std::cout.flush() ? code : usage_error("cannot write to the standard output");
+        return !options.words.empty() && is_file(options.words.front()) ? compare(options) : print(options);
     }
     catch (const std::runtime_error& error)
     {

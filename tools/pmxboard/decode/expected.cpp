@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include <algorithm>
 #include <filesystem>
-#include <fstream>
 
 #include "board/board.h"
+#include "board/files.h"
 #include "tools/pmxboard/decode/against.h"
 #include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/language/session.h"
@@ -67,16 +67,18 @@ private:
 
 std::vector<Expected> run_for_texts(const std::string& scenario, const std::string& board)
 {
-    std::ifstream lines(scenario);
-    if (!lines)
-        throw ScenarioFailed("cannot read " + scenario);
+    const auto lines = board::files::open_lines(scenario);
     std::size_t number = 0;
     try
     {
         Run run(board.empty() ? "default" : board, std::filesystem::path(scenario).parent_path());
-        for (std::string text; std::getline(lines, text);)
+        for (std::string text; board::files::next_line(*lines, text);)
             run.line(++number, text);
         return run.finish();
+    }
+    catch (const board::files::FileError&)
+    {
+        throw;
     }
     catch (const std::exception& error)
     {

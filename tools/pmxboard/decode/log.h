@@ -62,9 +62,6 @@ Log read_log(std::string_view bytes);
 /** A text of the layer as it was printed, alone on its line. Nothing: it is not one of the table. */
 std::optional<Item> read_text(std::string_view printed);
 
-/** Bytes as text for a terminal: UTF-8, control characters and stray bytes as \xNN, at most so many columns. */
-std::string printable(std::string_view bytes, std::size_t columns);
-
 /** A number as the layer prints it. */
 std::optional<std::int64_t> number_of(std::string_view digits, int base = 10);
 

@@ -7,6 +7,7 @@
 #include "board/value.h"
 #include "tools/pmxboard/decode/words.h"
 #include "tools/pmxboard/text/layout.h"
+#include "tools/pmxboard/text/printable.h"
 
 namespace pmxboard::decode
 {

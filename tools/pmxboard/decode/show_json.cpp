@@ -4,6 +4,7 @@
 #include "board/json.h"
 #include "tools/pmxboard/decode/show.h"
 #include "tools/pmxboard/decode/words.h"
+#include "tools/pmxboard/text/printable.h"
 
 namespace pmxboard::decode
 {

@@ -11,6 +11,8 @@
 #include <stdexcept>
 #include <streambuf>
 
+#include "tools/pmxboard/files/ending.h"
+
 namespace pmxboard
 {
 namespace
@@ -84,6 +86,7 @@ private:
 [[noreturn]] void be_the_copy(const std::function<std::string(std::ostream&)>& function, const MemoryFile& shown,
                               const MemoryFile& answer)
 {
+    end_as_it_comes();
     MemoryStream buffer(shown);
     std::ostream stream(&buffer);
     const std::string text = function(stream);

@@ -17,7 +17,7 @@ namespace
 
 void power_on(Session& session, const Words& words)
 {
-    session.power_on(words.has("BOARD") ? words.at("BOARD") : std::string());
+    session.power_on(words.has("BOARD") ? file_name(words.at("BOARD")) : std::string());
 }
 
 void set_flash(const std::string& partition, const std::filesystem::path& image)

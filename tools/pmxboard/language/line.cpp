@@ -9,6 +9,8 @@ namespace
 {
 
 constexpr std::string_view blanks = " \t\r\n\v\f";
+constexpr std::size_t most_words = 1000;
+constexpr std::size_t deepest = 32; ///< brackets within brackets
 
 char closing_of(char open)
 {
@@ -44,7 +46,11 @@ std::size_t behind_word(std::string_view text, std::size_t start)
             continue;
         }
         if (c == '[' || c == '{' || c == '(')
+        {
+            if (open.size() == deepest)
+                throw LineError("brackets stand more than " + std::to_string(deepest) + " deep in each other");
             open += c;
+        }
         else if (c == ']' || c == '}' || c == ')')
         {
             if (open.empty() || closing_of(open.back()) != c)
@@ -66,6 +72,8 @@ Line::Line(std::string_view text)
     std::size_t end = 0;
     while ((i = text.find_first_not_of(blanks, i)) != text.npos && text[i] != '#')
     {
+        if (m_words.size() == most_words)
+            throw LineError("a line has more than " + std::to_string(most_words) + " words");
         end = behind_word(text, i);
         m_words.emplace_back(text.substr(i, end - i));
         m_starts.push_back(i);

@@ -5,8 +5,11 @@
 #include <istream>
 #include <ostream>
 
+#include "board/files.h"
+#include "tools/pmxboard/files/ending.h"
 #include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/text/printable.h"
 
 namespace pmxboard
 {
@@ -41,7 +44,7 @@ bool asks_for_changes(std::istream& lines)
         return true;
     }
     bool found = false;
-    for (std::string text; !found && std::getline(lines, text);)
+    for (std::string text; !found && board::files::next_line(lines, text);)
         found = mentions_changes(text);
     lines.clear();
     lines.seekg(begin);
@@ -52,18 +55,7 @@ bool asks_for_changes(std::istream& lines)
 
 std::string presentable(std::string_view message)
 {
-    constexpr std::size_t most = 500;
-    constexpr std::string_view hex = "0123456789abcdef";
-    std::string line;
-    for (const char c : message.substr(0, most))
-    {
-        const auto byte = static_cast<unsigned char>(c);
-        if (byte >= 0x20 && byte != 0x7F)
-            line += c;
-        else
-            line.append("\\x").append(1, hex[byte >> 4]).append(1, hex[byte & 0xF]);
-    }
-    return message.size() > most ? line + "…" : line;
+    return printable(message, longest_message);
 }
 
 bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOptions& options,
@@ -76,13 +68,14 @@ bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOpt
     if (options.trace != nullptr)
         options.trace->scenario(file);
     unsigned number = 0;
-    const auto location = [&] { return file + ":" + std::to_string(number) + ": "; };
+    const auto location = [&] { return printable(file) + ":" + std::to_string(number) + ": "; };
     try
     {
         std::string text;
-        while (std::getline(lines, text))
+        while (board::files::next_line(lines, text))
         {
             ++number;
+            set_place(printable(file) + ":" + std::to_string(number));
             session.run_line(text);
         }
         session.finish();
@@ -93,14 +86,20 @@ bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOpt
         diagnostics << location() << presentable(error.what()) << '\n';
         return false;
     }
+    catch (const board::files::FileError&) // the scenario itself cannot be read any further
+    {
+        output.flush();
+        throw;
+    }
     catch (const std::exception& error)
     {
         output.flush();
-        diagnostics << location() << presentable(error.what()) << '\n' << "repeat: " << scenario.repeat << '\n';
+        diagnostics << location() << presentable(error.what()) << '\n'
+                    << "repeat: " << printable(scenario.repeat) << '\n';
         return false;
     }
     if (session.expectations() != 0)
-        output.text(file + ": " + std::to_string(session.expectations()) + " expectations met\n");
+        output.text(printable(file) + ": " + std::to_string(session.expectations()) + " expectations met\n");
     return true;
 }
 

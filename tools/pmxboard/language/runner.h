@@ -20,7 +20,7 @@ struct Scenario
 };
 
 /** Whether every line was carried out and every expectation met. What was not is said on `diagnostics`, with file and
- *  line. */
+ *  line. Throws board::files::FileError when the lines cannot be read. */
 bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOptions& options,
                   std::ostream& diagnostics);
 

@@ -169,7 +169,10 @@ std::vector<Change> Session::changes() const
 
 void Session::imagine(std::string_view text, std::ostream& shown)
 {
-    m_imagines = true;
+    constexpr unsigned deepest = 8;
+    if (m_imagined == deepest)
+        throw LineError("what-if stands at most " + std::to_string(deepest) + " times within itself");
+    ++m_imagined;
     m_output.imagine(shown);
     run_command(Line(text));
     m_output.flush();
@@ -215,16 +218,17 @@ void Session::power_on(const std::string& board)
     }
     const std::string& name = board.empty() ? m_board : board;
     const std::filesystem::path beside = m_directory / name;
+    std::error_code error;
     const bool is_file = name.find('/') != name.npos || name.ends_with(".toml");
-    const bool from_scenario = !board.empty() && is_file && std::filesystem::exists(beside);
+    const bool from_scenario = !board.empty() && is_file && std::filesystem::exists(beside, error);
     try
     {
         const board::Description description = board::load_description(from_scenario ? beside.string() : name);
         board::power_on(description);
     }
-    catch (const board::DescriptionError& error)
+    catch (const board::DescriptionError& wrong)
     {
-        throw StepFailed(std::string("the board cannot be powered on: ") + error.what());
+        throw StepFailed(std::string("the board cannot be powered on: ") + wrong.what());
     }
     m_powered = true;
     m_before.reset();
@@ -274,7 +278,20 @@ std::string Session::console_window() const
 
 std::filesystem::path Session::file(const std::string& name) const
 {
-    return m_directory / name;
+    return m_directory / file_name(name);
+}
+
+std::string file_name(const std::string& word)
+try
+{
+    const std::string name = word.starts_with('"') ? board::unquote(word) : word;
+    if (name.empty() || name.find('\0') != name.npos)
+        throw LineError("a file has a name, and no \\x00 in it");
+    return name;
+}
+catch (const std::invalid_argument& error)
+{
+    throw LineError(error.what());
 }
 
 void Session::check_misuses() const

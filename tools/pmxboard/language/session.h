@@ -45,7 +45,7 @@ public:
     /* For verbs */
 
     Output& output() { return m_output; }
-    /** A file named in the scenario. */
+    /** A file named in the scenario, in double quotes where its name has blanks. Throws LineError. */
     std::filesystem::path file(const std::string& name) const;
     /** Power the board on; an empty name takes the session's own board. */
     void power_on(const std::string& board);
@@ -70,7 +70,7 @@ public:
     const std::string& last_command() const { return m_last_command; }
     /** Carry a line out in a process that is about to end: its effects are nobody's. */
     void imagine(std::string_view text, std::ostream& shown);
-    bool imagines() const { return m_imagines; }
+    bool imagines() const { return m_imagined != 0; }
 
     /* For expectations */
 
@@ -102,7 +102,7 @@ private:
     unsigned m_misuses_expected = 0;
     std::string m_last_misuse;
     bool m_watches = true;
-    bool m_imagines = false;
+    unsigned m_imagined = 0; ///< what-if within what-if
     bool m_watches_stores = false;
     std::string m_last_command;
     std::optional<board::Value> m_before; ///< the state that the last command found; not for power-on
@@ -114,6 +114,9 @@ private:
     std::size_t m_console_begin = 0;
     std::size_t m_console_end = 0;
 };
+
+/** A file's name as a scenario writes it: with blanks it stands in double quotes. Throws LineError. */
+std::string file_name(const std::string& word);
 
 /** `expect …`. Throws StepFailed when it is not met. */
 void check_expectation(Session& session, const Line& line);

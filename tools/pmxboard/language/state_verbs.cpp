@@ -1,10 +1,8 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Verbs for what board and layer hold.
-#include <cerrno>
-#include <cstring>
-#include <fstream>
-
 #include "board/board.h"
+#include "board/files.h"
+#include "tools/pmxboard/files/new_file.h"
 #include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/functions/kind.h"
 #include "tools/pmxboard/language/session.h"
@@ -13,6 +11,7 @@
 #include "tools/pmxboard/state/dump.h"
 #include "tools/pmxboard/state/now.h"
 #include "tools/pmxboard/state/paths.h"
+#include "tools/pmxboard/text/printable.h"
 #include "tools/record_view/record_view.h"
 
 namespace pmxboard
@@ -67,13 +66,16 @@ void save(Session& session, const Words& words)
 {
     if (session.imagines())
         throw LineError("save writes a file, and what-if changes nothing");
-    const std::string& name = words.at("FILE");
-    errno = 0;
-    std::ofstream file(name, std::ios::binary);
-    file << to_json(dump_of_now()) << '\n';
-    if (!file.flush())
-        throw StepFailed("cannot write " + name + (errno != 0 ? std::string(": ") + std::strerror(errno) : ""));
-    session.output().text("  saved to " + name + "\n");
+    const std::string name = file_name(words.at("FILE"));
+    try
+    {
+        write_file(name, to_json(dump_of_now()) + "\n");
+    }
+    catch (const board::files::FileError& error)
+    {
+        throw StepFailed(error.what());
+    }
+    session.output().text("  saved to " + printable(name) + "\n");
 }
 
 void poke(Session&, const Words& words)

@@ -3,6 +3,7 @@
 #include "tools/pmxboard/functions/kind.h"
 #include "tools/pmxboard/language/session.h"
 #include "tools/pmxboard/language/verbs.h"
+#include "tools/pmxboard/text/printable.h"
 
 namespace pmxboard
 {
@@ -25,7 +26,7 @@ std::vector<Verb> view_verbs()
         { "print",
           { { "print \"text\"", "show a text",
               [](Session& session, const Words& words) {
-                  session.output().text(read_text(words.at("\"text\""), "the text"));
+                  session.output().text(printable_lines(read_text(words.at("\"text\""), "the text")));
               } } },
           true },
     };

@@ -3,6 +3,9 @@
 #include "tools/pmxboard/prompt/editor.h"
 
 #include <iostream>
+#include <istream>
+
+#include "board/files.h"
 
 #ifdef PMX_HAS_LIBEDIT
 #include <histedit.h>
@@ -13,6 +16,7 @@
 #include <cstdio>
 
 #include "tools/pmxboard/prompt/help.h"
+#include "tools/pmxboard/prompt/history_file.h"
 #endif
 
 namespace pmxboard
@@ -30,13 +34,14 @@ public:
         if (!m_prompt.empty())
             std::cout << m_prompt << std::flush;
         std::string line;
-        if (!std::getline(std::cin, line))
+        if (!board::files::next_line(*m_lines, line))
             return std::nullopt;
         return line;
     }
 
 private:
     std::string m_prompt;
+    std::unique_ptr<std::istream> m_lines = board::files::open_lines("-");
 };
 
 #ifdef PMX_HAS_LIBEDIT
@@ -46,14 +51,14 @@ constexpr int kept_lines = 1000;
 class Editor : public LineSource
 {
 public:
-    explicit Editor(EditorOptions options) : m_options(std::move(options))
+    explicit Editor(EditorOptions options) : m_options(std::move(options)), m_kept(m_options.history, kept_lines)
     {
         HistEvent event{};
         m_history = history_init();
         history(m_history, &event, H_SETSIZE, kept_lines);
         history(m_history, &event, H_SETUNIQUE, 1);
-        if (!m_options.history.empty())
-            history(m_history, &event, H_LOAD, m_options.history.c_str());
+        for (const std::string& line : m_kept.lines())
+            history(m_history, &event, H_ENTER, line.c_str());
 
         m_editor = el_init("pmxboard", stdin, stdout, stderr);
         el_set(m_editor, EL_CLIENTDATA, this);
@@ -105,8 +110,7 @@ public:
         HistEvent event{};
         history(m_history, &event, H_ENTER, line.c_str());
         // At once: a shell that is ended by a signal has its history, too.
-        if (!m_options.history.empty())
-            history(m_history, &event, H_SAVE, m_options.history.c_str());
+        m_kept.add(line);
     }
 
 private:
@@ -175,6 +179,7 @@ private:
     }
 
     EditorOptions m_options;
+    HistoryFile m_kept;
     History* m_history = nullptr;
     EditLine* m_editor = nullptr;
     bool m_dropped = false;

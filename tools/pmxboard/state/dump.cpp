@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "tools/pmxboard/state/dump.h"
 
-#include <algorithm>
 #include <cstdint>
 #include <limits>
 
 #include "board/json.h"
+#include "tools/pmxboard/text/printable.h"
 
 namespace pmxboard
 {
@@ -18,7 +18,6 @@ using board::Value;
 
 constexpr const char* state_schema = "pmxboard-state";
 constexpr const char* diff_schema = "pmxboard-diff";
-constexpr unsigned deepest = 64;
 
 Json json_of(const std::vector<Change>& changes)
 {
@@ -37,7 +36,16 @@ Json json_of(const std::vector<Change>& changes)
 
 [[noreturn]] void no_value(const std::string& path, const Json& json)
 {
-    throw DumpError(path + ": " + board::written(json).substr(0, 60) + " is no value of a state");
+    throw DumpError(path + ": " + printable(board::written(json), 60) + " is no value of a state");
+}
+
+/** A name is shown as it stands. */
+std::string name_in(const std::string& name, const std::string& path)
+{
+    constexpr std::size_t longest = 200;
+    if (name.size() > longest || printable(name) != name)
+        throw DumpError(path + ": a name in it is too long, or no terminal shows it: " + printable(name, 60));
+    return name;
 }
 
 /** {"value": 12, "name": …, "hex": …}, and nothing else in it. */
@@ -57,10 +65,8 @@ std::int64_t integer(const Json& json, const std::string& path)
     return json.get<std::int64_t>();
 }
 
-Value value_of(const Json& json, const std::string& path, unsigned depth = 0)
+Value value_of(const Json& json, const std::string& path)
 {
-    if (depth > deepest)
-        throw DumpError(path.substr(0, 60) + "…: a state is not nested so deeply");
     if (json.is_null())
         return Value::null();
     if (json.is_number_integer())
@@ -71,43 +77,30 @@ Value value_of(const Json& json, const std::string& path, unsigned depth = 0)
     {
         std::vector<Value> items;
         for (const Json& item : json)
-            items.push_back(value_of(item, path + "[" + std::to_string(items.size()) + "]", depth + 1));
+            items.push_back(value_of(item, path + "[" + std::to_string(items.size()) + "]"));
         return Value::list(std::move(items));
     }
     if (!json.is_object())
         no_value(path, json);
     if (is_number(json))
-        return Value::number(integer(json.at("value"), path), json.value("name", ""),
+        return Value::number(integer(json.at("value"), path), name_in(json.value("name", ""), path),
                              json.contains("hex") ? Value::Base::Hex : Value::Base::Decimal);
     if (json.size() == 1 && json.contains("symbol") && json.at("symbol").is_string())
-        return Value::symbol(json.at("symbol").get<std::string>());
+        return Value::symbol(name_in(json.at("symbol").get<std::string>(), path));
     Value record = Value::record({});
     for (const auto& [key, member] : json.items())
-        record.add(key, value_of(member, path + "." + key, depth + 1));
+        record.add(name_in(key, path), value_of(member, path + "." + key));
     return record;
 }
 
-/** Line and column of a byte, both counted from 1. */
-std::string place_of(std::string_view text, std::size_t byte)
-{
-    const std::string_view before = text.substr(0, byte == 0 ? 0 : byte - 1);
-    const auto line = 1 + std::count(before.begin(), before.end(), '\n');
-    const std::size_t begin = before.find_last_of('\n');
-    const std::size_t column = before.size() - (begin == before.npos ? 0 : begin + 1) + 1;
-    return "line " + std::to_string(line) + ", column " + std::to_string(column);
-}
-
 Json parsed(std::string_view text)
+try
 {
-    try
-    {
-        return Json::parse(text.begin(), text.end());
-    }
-    catch (const Json::parse_error& error)
-    {
-        throw DumpError((error.byte > text.size() ? "it ends in the middle, at " : "it is no JSON from ") +
-                        place_of(text, error.byte) + (error.byte > text.size() ? "" : " on"));
-    }
+    return board::read_json(text);
+}
+catch (const board::JsonError& error)
+{
+    throw DumpError(error.what());
 }
 
 void check_schema(const Json& json)

@@ -18,8 +18,12 @@ using board::Value;
 /** The groups of the state that are the layer's own; a path may leave them out. */
 constexpr const char* layer_groups[] = { "record", "status", "module" };
 
+/** As many as a state of the board has, many times over; a stranger's may have more. */
 void collect_paths(const Value& value, const std::string& path, std::vector<std::string>& into)
 {
+    constexpr std::size_t most = 20'000;
+    if (into.size() == most)
+        return;
     if (!path.empty())
         into.push_back(path);
     for (std::size_t i = 0; i < value.items().size(); ++i)

@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
-#include "tools/pmxboard/decode/log.h"
+#include "tools/pmxboard/text/printable.h"
 
-namespace pmxboard::decode
+#include <algorithm>
+
+namespace pmxboard
 {
 namespace
 {
@@ -88,4 +90,20 @@ std::string printable(std::string_view bytes, std::size_t columns)
     return text;
 }
 
-} // namespace pmxboard::decode
+std::string printable_lines(std::string_view text)
+{
+    std::string lines;
+    while (!text.empty())
+    {
+        const std::size_t length = std::min(text.find_first_of("\n\t"), text.size());
+        lines += printable(text.substr(0, length));
+        text.remove_prefix(length);
+        if (text.empty())
+            break;
+        lines += text.front();
+        text.remove_prefix(1);
+    }
+    return lines;
+}
+
+} // namespace pmxboard

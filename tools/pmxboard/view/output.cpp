@@ -4,6 +4,8 @@
 #include <cstdio>
 #include <iostream>
 
+#include "tools/pmxboard/text/printable.h"
+
 namespace pmxboard
 {
 Output::Output(const OutputOptions& options) : m_options(options), m_paint{ options.colour }, m_trace(options.trace)
@@ -44,13 +46,13 @@ void Output::command(std::string_view line)
 {
     m_trace->command(line);
     if (people() != nullptr && m_options.echo)
-        *people() << m_paint("> " + std::string(line), Colour::Bold) << '\n';
+        *people() << m_paint("> " + printable_lines(line), Colour::Bold) << '\n';
 }
 
 void Output::expectation(std::string_view line)
 {
     if (people() != nullptr && m_options.verbose)
-        *people() << m_paint("> " + std::string(line), Colour::Grey) << '\n';
+        *people() << m_paint("> " + printable_lines(line), Colour::Grey) << '\n';
 }
 
 void Output::outcome(const Outcome& outcome)
@@ -79,7 +81,7 @@ void Output::remark(std::string_view text)
 {
     flush();
     if (people() != nullptr)
-        *people() << m_paint(text, Colour::Yellow) << '\n';
+        *people() << m_paint(printable_lines(text), Colour::Yellow) << '\n';
 }
 
 void Output::shown(const std::string& json_line, std::string_view text)
@@ -147,7 +149,7 @@ void Output::write_console(std::string_view text)
             continue;
         }
         if (people() != nullptr)
-            *people() << "  | " << m_console_line << '\n';
+            *people() << "  | " << printable_lines(m_console_line) << '\n';
         m_console_line.clear();
     }
 }

@@ -8,6 +8,7 @@
 
 #include "tools/pmxboard/text/layout.h"
 #include "tools/pmxboard/text/paint.h"
+#include "tools/pmxboard/text/printable.h"
 #include "tools/pmxboard/view/chrome_trace.h"
 
 namespace pmxboard
@@ -39,8 +40,8 @@ private:
         std::snprintf(time, sizeof time, "%9llu.%03u  ", static_cast<unsigned long long>(entry.time_us / 1000),
                       static_cast<unsigned>(entry.time_us % 1000));
         const std::string lead = time + std::string(2 * static_cast<std::size_t>(entry.depth), ' ');
-        const std::string line =
-            lead + (m_options.verbose ? entry.named() : entry.brief()) + (entry.faulted ? "  (scripted)" : "");
+        const std::string line = lead + printable_lines(m_options.verbose ? entry.named() : entry.brief()) +
+                                 (entry.faulted ? "  (scripted)" : "");
         if (m_options.apart)
             return line;
         const bool is_remarkable =

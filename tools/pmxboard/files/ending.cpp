@@ -1,0 +1,212 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
+#include "tools/pmxboard/files/ending.h"
+
+#include <fcntl.h>
+#include <signal.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <atomic>
+#include <climits>
+#include <cstring>
+#include <exception>
+#include <iterator>
+#include <string>
+
+namespace pmxboard
+{
+namespace
+{
+
+/** An unfinished file's name, where a signal handler can read it. */
+struct Temporary
+{
+    std::atomic<pid_t> owner{ 0 }; ///< 0: the place is free
+    char name[PATH_MAX] = {};
+};
+
+Temporary temporaries[4];
+char current_place[512] = "pmxboard";
+
+constexpr int breakdowns[] = { SIGSEGV, SIGBUS, SIGFPE, SIGILL, SIGABRT, SIGTRAP, SIGSYS };
+constexpr int interrupts[] = { SIGINT, SIGTERM, SIGHUP, SIGQUIT };
+constexpr int code_of_signal = 128; ///< as shells have it
+constexpr int code_of_failed_step = 1;
+
+void say(const char* text)
+{
+    [[maybe_unused]] const ssize_t ignored = write(STDERR_FILENO, text, std::strlen(text));
+}
+
+/* What follows runs in signal handlers: system calls alone. */
+
+void remove_temporaries()
+{
+    for (Temporary& temporary : temporaries)
+    {
+        if (temporary.owner == getpid())
+            unlink(temporary.name);
+    }
+}
+
+void on_closed_pipe(int number)
+{
+    remove_temporaries();
+    _exit(code_of_signal + number);
+}
+
+void on_interrupt(int number)
+{
+    remove_temporaries();
+    signal(number, SIG_DFL);
+    raise(number);
+}
+
+void on_breakdown(int number)
+{
+    remove_temporaries();
+    say(current_place);
+    say(": the step broke the program down: ");
+    say(number == SIGSEGV   ? "memory that is not there (SIGSEGV)"
+        : number == SIGBUS  ? "memory that is not there (SIGBUS)"
+        : number == SIGFPE  ? "a division that has no result (SIGFPE)"
+        : number == SIGABRT ? "it gave up (SIGABRT)"
+                            : "a signal");
+    say("\n");
+    _exit(code_of_failed_step);
+}
+
+void handle(int number, void (*handler)(int), int flags = 0)
+{
+    struct sigaction action
+    {
+    };
+    action.sa_handler = handler;
+    action.sa_flags = flags;
+    sigemptyset(&action.sa_mask);
+    sigaction(number, &action, nullptr);
+}
+
+/** Checked builds tell more about a breakdown than this does. */
+bool is_checked_build()
+{
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+    return true;
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer) || __has_feature(memory_sanitizer) || __has_feature(thread_sanitizer)
+    return true;
+#else
+    return false;
+#endif
+#else
+    return false;
+#endif
+}
+
+/** Handlers run on a stack of their own: the usual one may be what has run out. */
+void use_another_stack()
+{
+    static char memory[65536];
+    stack_t stack{};
+    stack.ss_sp = memory;
+    stack.ss_size = sizeof memory;
+    sigaltstack(&stack, nullptr);
+}
+
+/** An exception that nobody catches: it met code that knows none. */
+[[noreturn]] void on_uncaught()
+{
+    remove_temporaries();
+    say(current_place);
+    say(": the step broke the program down: ");
+    try
+    {
+        if (const auto error = std::current_exception())
+            std::rethrow_exception(error);
+        say("without an exception");
+    }
+    catch (const std::exception& error)
+    {
+        say(error.what());
+    }
+    catch (...)
+    {
+        say("something unknown was thrown");
+    }
+    say("\n");
+    _exit(code_of_failed_step);
+}
+
+/** A file that is opened must not become the standard output of a program that was started without one. */
+void open_what_is_closed()
+{
+    for (const int file : { STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO })
+    {
+        // The wrong way round, so that to use it goes on failing.
+        if (fcntl(file, F_GETFD) < 0)
+            open("/dev/null", file == STDIN_FILENO ? O_WRONLY : O_RDONLY);
+    }
+}
+
+} // namespace
+
+void end_in_order()
+{
+    open_what_is_closed();
+    signal(SIGXFSZ, SIG_IGN);
+    handle(SIGPIPE, on_closed_pipe);
+    for (const int number : interrupts)
+    {
+        struct sigaction before
+        {
+        };
+        sigaction(number, nullptr, &before);
+        if (before.sa_handler != SIG_IGN) // nohup's wish
+            handle(number, on_interrupt);
+    }
+    if (is_checked_build())
+        return;
+    use_another_stack();
+    for (const int number : breakdowns)
+        handle(number, on_breakdown, SA_ONSTACK | static_cast<int>(SA_RESETHAND));
+    std::set_terminate(on_uncaught);
+}
+
+void set_place(std::string_view place)
+{
+    const std::size_t size = std::min(place.size(), sizeof current_place - 1);
+    std::memcpy(current_place, place.data(), size);
+    current_place[size] = '\0';
+}
+
+void end_as_it_comes()
+{
+    if (is_checked_build())
+        return;
+    for (const int number : breakdowns)
+        handle(number, SIG_DFL);
+    std::set_terminate(std::abort);
+}
+
+void remember_temporary(const char* name)
+{
+    for (Temporary& temporary : temporaries)
+    {
+        if (temporary.owner != 0 || std::strlen(name) >= sizeof temporary.name)
+            continue;
+        std::strcpy(temporary.name, name);
+        temporary.owner = getpid();
+        return;
+    }
+}
+
+void forget_temporary(const char* name)
+{
+    for (Temporary& temporary : temporaries)
+    {
+        if (std::strcmp(temporary.name, name) == 0)
+            temporary.owner = 0;
+    }
+}
+
+} // namespace pmxboard

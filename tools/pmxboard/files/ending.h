@@ -1,0 +1,25 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
+/** @file
+ *  How the program ends when something ends it: in good order, and with a line that says where it was. */
+#pragma once
+
+#include <string_view>
+
+namespace pmxboard
+{
+
+/** From now on: a reader that has gone away ends the program quietly; an interrupt removes what is unfinished and ends
+ *  it as one does; a full disk is an error of the write that met it; what breaks down is told, and is a failed step. */
+void end_in_order();
+
+/** Where the program is: what a breakdown is told with. */
+void set_place(std::string_view place);
+
+/** In a copy of the process that is to die as it would by itself: its parent tells it. */
+void end_as_it_comes();
+
+/** An unfinished file, to be removed when the program is ended. There are few at a time. */
+void remember_temporary(const char* name);
+void forget_temporary(const char* name);
+
+} // namespace pmxboard

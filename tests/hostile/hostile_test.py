@@ -1,0 +1,429 @@
+#!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+"""Bad input and bad luck: the tool never breaks down, never loses a file, and never calls a failure a success.
+
+usage: hostile_test.py PMXBOARD inputs|outputs|interrupts|faults [ROUNDS]
+
+ROUNDS multiplies what is drawn at random: a long campaign is the same test with more of it.
+"""
+
+import json
+import os
+import pathlib
+import random
+import resource
+import shutil
+import signal
+import stat
+import subprocess
+import sys
+import tempfile
+import threading
+import time
+import unittest
+
+sys.path.insert(0, str(pathlib.Path(__file__).parent))
+
+import contents  # noqa: E402
+
+PROGRAM = ""
+ROUNDS = 1
+PATIENCE = 20      # seconds for one run; what is linear in its input needs a fraction of one
+NOBODY = 65534
+CLOSED_PIPE = 128 + signal.SIGPIPE
+CODES = {0: "done", 1: "a failed step", 2: "nothing that can be used"}
+CONTROLS = {chr(code) for code in [*range(0x20), *range(0x7f, 0xa0)]} - {"\n", "\t"}
+LONGEST_NAME = "n" * 300
+
+
+class Directory(unittest.TestCase):
+    """Each test has a directory with files of every kind that are right."""
+
+    def setUp(self):
+        kept = tempfile.TemporaryDirectory()
+        self.addCleanup(kept.cleanup)
+        self.place = pathlib.Path(kept.name)
+        self.log = pathlib.Path("tests/decode/first-mode.log").resolve()
+        self.board = pathlib.Path("boards/default/board.toml").resolve()
+        self.scenario = self.write("good.pmx", b"PMX_Init\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\nstate ucMode\n")
+        self.state = self.place / "good.json"
+        self.good("run", "-q", self.write("save.pmx", f"PMX_Init\nsave {self.state}\n".encode()))
+
+    def write(self, name, content):
+        path = self.place / name
+        path.write_bytes(content)
+        return path
+
+    def run_tool(self, *arguments, stdin=b"", prepare=None, **options):
+        """The ended process. Text that is fed comes through a pipe."""
+        return subprocess.run([PROGRAM, *map(str, arguments)], input=stdin, capture_output=True, cwd=self.place,
+                              timeout=PATIENCE, preexec_fn=prepare, check=False, **options)
+
+    def good(self, *arguments, **options):
+        ended = self.run_tool(*arguments, **options)
+        self.assertEqual((0, b""), (ended.returncode, ended.stderr), arguments)
+        return ended
+
+    def check(self, ended, what, codes=tuple(CODES)):
+        """It ended as a program does that was in command all the time, and what it said is fit for a terminal."""
+        self.assertIn(ended.returncode, codes, f"{what}: {ended.stderr[-300:]}")
+        self.assertNotIn(b"broke the program down", ended.stderr, what)
+        for output in (ended.stdout, ended.stderr):
+            text = output.decode("utf-8")  # raises where it is none
+            self.assertFalse(CONTROLS & set(text), f"{what}: a control character")
+        if ended.returncode == 2:
+            self.assertTrue(ended.stderr.strip(), f"{what}: nothing is said")
+
+    def left_behind(self):
+        return [path.name for path in self.place.iterdir() if path.name.startswith(".pmxboard")]
+
+
+class Inputs(Directory):
+    """Any content and any name, wherever something is read."""
+
+    def every_way(self, content):
+        """(how, arguments, standard input) of all that reads a file."""
+        file = self.write("hostile", content)
+        toml = self.write("hostile.toml", content)
+        image = f"flash boot {file}\nPMX_Init\nstate flash\n".encode()
+        yield "run", ("run", file), b""
+        yield "run jsonl", ("run", "--trace-format", "jsonl", file), b""
+        yield "run -", ("run", "-"), content
+        yield "shell", ("shell",), content
+        yield "state", ("state", file), b""
+        yield "state -", ("state", "--json", "-"), content
+        yield "state two", ("state", self.state, file, ), b""
+        yield "decode", ("decode", "-v", file), b""
+        yield "decode json", ("decode", "--json", "-"), content
+        yield "against", ("decode", self.log, "--against", file), b""
+        yield "against hostile", ("decode", file, "--against", self.scenario), b""
+        yield "board", ("run", "--board", toml, self.scenario), b""
+        yield "power-on", ("run", "-"), f"power-on {toml}\nPMX_Init\n".encode()
+        yield "image", ("run", "-"), image
+
+    def try_all(self, found, ways=None):
+        """Each in one of the ways, or in all that there are."""
+        for number, (name, content) in enumerate(found.items()):
+            wanted = ways and ways[number % len(ways)]
+            for way, arguments, stdin in self.every_way(content):
+                if wanted in (None, way):
+                    self.check(self.run_tool(*arguments, stdin=stdin), f"{name}, {way}")
+
+    def test_any_bytes_everywhere(self):
+        self.try_all(contents.shapes())
+
+    def test_nesting_without_end(self):
+        self.try_all(contents.brackets(), ("run", "state", "board", "decode", "against"))
+        self.try_all(contents.brackets(), ("state -", "shell", "power-on"))
+
+    def test_lines_of_scenarios(self):
+        self.try_all(contents.scenario_lines(), ("run", "shell", "against"))
+
+    def test_saved_states(self):
+        self.try_all(contents.states(self.state.read_bytes()), ("state", "state -", "state two"))
+
+    def test_board_files(self):
+        self.try_all(contents.boards(), ("board", "power-on"))
+
+    def test_right_but_for_a_few_bytes(self):
+        lines = pathlib.Path("scenarios/picture-in-picture.pmx").read_bytes()
+        for good, ways in ((lines, ("run", "shell")), (self.state.read_bytes(), ("state", "state two")),
+                           (self.board.read_bytes(), ("board",)),
+                           (self.log.read_bytes(), ("decode", "against hostile"))):
+            self.try_all(contents.mutations(good, 40 * ROUNDS, len(good)), ways)
+
+    def test_names_that_lead_nowhere(self):
+        loop = self.place / "loop"
+        loop.symlink_to(loop)
+        (self.place / "directory").mkdir()
+        closed = self.place / "closed"
+        closed.mkdir()
+        (closed / "board.toml").write_bytes(self.board.read_bytes())
+        closed.chmod(0)
+        self.addCleanup(closed.chmod, stat.S_IRWXU)
+        for name in ("missing", "directory", loop, loop / "board.toml", LONGEST_NAME, LONGEST_NAME + "/x", "",
+                     closed / "board.toml", "/proc/self/mem", "/dev/zero", "\x1b[31m\n", "a" * 5_000):
+            for arguments in (("run", "-q", name), ("state", name), ("state", self.state, f"{name}/"),
+                              ("decode", name), ("decode", self.log, "--against", name),
+                              ("run", "--board", name, self.scenario), ("shell", "--board", name)):
+                if name == "" and {"--board", "--against"} & set(arguments):
+                    continue  # as if nothing was said
+                if name == "/dev/zero" and "--board" not in arguments and "state" not in arguments:
+                    continue  # a quarter of a gigabyte, which takes its time
+                self.check(self.run_as_nobody(*arguments), f"{name!r}: {arguments[0]}", codes=(2,))
+
+    def run_as_nobody(self, *arguments):
+        """The superuser may read everything, so somebody else does it."""
+        if os.getuid() != 0:
+            return self.run_tool(*arguments)
+        self.place.chmod(0o777)
+        return self.run_tool(*arguments, prepare=lambda: os.setuid(NOBODY))
+
+    def test_image_that_goes_away(self):
+        image = self.write("image", bytes(4096))
+        self.place.chmod(0o777)
+        lines = f"flash boot {image}\nprint \"go\\n\"\n"
+        for gone in (lambda: image.unlink(), lambda: self.place.chmod(0)):
+            self.write("image", bytes(4096))
+            process = subprocess.Popen([PROGRAM, "run", "-"], stdin=subprocess.PIPE, stdout=subprocess.PIPE,
+                                       stderr=subprocess.PIPE, cwd=self.place)
+            process.stdin.write(lines.encode())
+            process.stdin.flush()
+            while b"go" not in process.stdout.readline():
+                pass
+            gone()
+            _, said = process.communicate(b"PMX_Init\n", timeout=PATIENCE)
+            self.place.chmod(0o777)
+            self.assertEqual((0, b""), (process.returncode, said))
+
+    def test_no_more_files_can_be_opened(self):
+        image = self.write("image", bytes(4096))
+        lines = f"flash boot {image}\nPMX_Init\nsave full.json\n".encode()
+        for limit in range(3, 9):
+            ended = self.run_tool("run", "-", stdin=lines, prepare=lambda most=limit: resource.setrlimit(
+                resource.RLIMIT_NOFILE, (most, most)))
+            if ended.returncode != 127:  # the loader needs some, too
+                self.check(ended, f"{limit} files")
+
+    def test_a_pipe_is_opened_once(self):
+        for number in range(10):
+            fifo = self.place / f"fifo{number}"
+            os.mkfifo(fifo)
+            writer = threading.Thread(target=fifo.write_bytes, args=(b"PMX_Init\nfoo\n",))
+            writer.start()
+            ended = self.run_tool("run", fifo)
+            writer.join()
+            self.check(ended, "a pipe", codes=(1,))
+            self.assertIn(f"{fifo}:2: no command foo", ended.stderr.decode())
+
+    def test_names_with_blanks(self):
+        name = self.place / "a \"b\" c"
+        quoted = str(name).replace('"', '\\"')
+        self.good("run", "-q", "-", stdin=f"PMX_Init\nsave \"{quoted}\"\nflash boot \"{quoted}\"\n".encode())
+        self.good("state", "-q", name)
+
+    def test_environment(self):
+        strange = ("", "/", "/dev/null", "/dev/full", "no/such", "\x1b[31m", "x" * 5_000, LONGEST_NAME)
+        for name in ("PMXBOARD_HISTORY", "XDG_STATE_HOME", "HOME", "TERM", "NO_COLOR", "COLUMNS", "LANG", "EDITRC"):
+            for value in strange:
+                ended = self.run_tool("shell", stdin=b"PMX_Init\n", env={**os.environ, name: value})
+                self.check(ended, f"{name}={value[:20]!r}", codes=(0,))
+
+    def test_without_symbols(self):
+        stripped = self.place / "stripped"
+        subprocess.run(["strip", "-o", stripped, PROGRAM], check=True)
+        for arguments in (("run", self.scenario), ("shell",), ("modes",), ("decode", self.log),
+                          ("decode", self.log, "--against", self.scenario), ("ops",)):
+            ended = subprocess.run([stripped, *map(str, arguments)], capture_output=True, input=b"PMX_Init\n",
+                                   check=False, timeout=PATIENCE)
+            self.check(ended, f"stripped {arguments[0]}")
+
+
+class Outputs(Directory):
+    """Wherever something is written."""
+
+    def commands(self):
+        yield from (("--help",), ("--version",), ("run", "--help"), ("ops",), ("ops", "--json"), ("modes",),
+                    ("modes", "--json"), ("guide",), ("complete", "PMX_"), ("run", self.scenario),
+                    ("run", "--trace-format", "jsonl", self.scenario),
+                    ("run", "--trace-format", "chrome", self.scenario), ("state", self.state),
+                    ("state", "--json", self.state), ("shell",), ("decode", self.log), ("decode", "--json", self.log),
+                    ("decode", "--texts"), ("decode", self.log, "--against", self.scenario))
+
+    def run_into(self, arguments, output, **options):
+        return subprocess.run([PROGRAM, *map(str, arguments)], input=b"PMX_Init\n", stdout=output,
+                              stderr=subprocess.PIPE, cwd=self.place, timeout=PATIENCE, check=False, **options)
+
+    def test_a_full_device(self):
+        with open("/dev/full", "wb") as full:
+            for arguments in self.commands():
+                ended = self.run_into(arguments, full)
+                self.assertEqual(2, ended.returncode, arguments)
+                self.assertIn(b"cannot write to the standard output", ended.stderr, arguments)
+
+    def test_no_standard_output(self):
+        for arguments in self.commands():
+            ended = self.run_into(arguments, None, preexec_fn=lambda: os.close(1))
+            self.assertEqual(2, ended.returncode, arguments)
+            self.assertIn(b"cannot write to the standard output", ended.stderr, arguments)
+
+    def test_a_reader_that_goes_away(self):
+        for arguments in self.commands():
+            reading, writing = os.pipe()
+            os.close(reading)
+            ended = self.run_into(arguments, writing)
+            os.close(writing)
+            self.assertEqual((CLOSED_PIPE, b""), (ended.returncode, ended.stderr), arguments)
+
+    def writers(self, name):
+        """(arguments, standard input, exit code) of what writes a file."""
+        save = f"PMX_Init\nsave {name}\n".encode()
+        for form in ("text", "jsonl", "chrome"):
+            yield ("run", "--trace-format", form, "--trace-file", name, self.scenario), b"", 2
+        yield ("run", "-"), save, 1
+        yield ("shell",), save, 1
+
+    def test_a_full_disk(self):
+        kept = self.place / "kept"
+        limit = lambda: resource.setrlimit(resource.RLIMIT_FSIZE, (700, 700))  # noqa: E731
+        for exists in (True, False):
+            for arguments, stdin, code in self.writers(kept):
+                kept.unlink(missing_ok=True)
+                if exists:
+                    kept.write_bytes(b"what was there")
+                ended = self.run_tool(*arguments, stdin=stdin, prepare=limit)
+                self.check(ended, arguments, codes=(code,))
+                self.assertIn(f"cannot write {kept}: File too large", ended.stderr.decode())
+                self.assertEqual(exists, kept.exists())
+                self.assertTrue(not exists or kept.read_bytes() == b"what was there")
+                self.assertEqual([], self.left_behind())
+
+    def test_places_that_cannot_be_written(self):
+        (self.place / "directory").mkdir()
+        for name in ("/dev/full", self.place / "no/such", self.place / "directory", LONGEST_NAME,
+                     "/proc/nothing"):
+            for arguments, stdin, code in self.writers(name):
+                self.check(self.run_tool(*arguments, stdin=stdin), f"{name}: {arguments}", codes=(code,))
+        self.assertEqual([], self.left_behind())
+
+    def test_inputs_are_no_outputs(self):
+        board = self.write("board.toml", self.board.read_bytes().replace(b"../", b"../../"))
+        board.write_bytes(b'name = "mine"\n')
+        image = self.write("image", bytes(4096))
+        link, twin = self.place / "link", self.place / "twin"
+        for wanted in (board, image, self.place / "this.pmx"):
+            link.unlink(missing_ok=True)
+            twin.unlink(missing_ok=True)
+            scenario = self.write("this.pmx", b"")
+            link.symlink_to(wanted)
+            os.link(wanted, twin)
+            for name in (wanted, link, twin):
+                lines = f"power-on {board}\nflash boot {image}\nPMX_Init\n".encode()
+                scenario.write_bytes(lines + f"save {name}\n".encode())
+                before = wanted.read_bytes()
+                ended = self.run_tool("run", scenario)
+                self.check(ended, name, codes=(1,))
+                self.assertIn(b"this run reads it", ended.stderr)
+                scenario.write_bytes(lines)
+                before_trace = wanted.read_bytes()
+                self.check(self.run_tool("run", "--trace-file", name, scenario), name, codes=(2,))
+                self.assertEqual(before_trace, wanted.read_bytes())
+                self.assertTrue(wanted == scenario or before == wanted.read_bytes())
+        self.assertEqual([], self.left_behind())
+
+    def test_a_replaced_file_keeps_what_is_its_own(self):
+        kept, link = self.write("kept", b"before"), self.place / "link"
+        kept.chmod(0o640)
+        link.symlink_to(kept)
+        self.good("run", "-q", "-", stdin=f"PMX_Init\nsave {link}\n".encode())
+        self.assertTrue(link.is_symlink())
+        self.assertEqual(0o640, stat.S_IMODE(kept.stat().st_mode))
+        json.loads(kept.read_text())
+
+    def test_what_is_no_file_is_written_to_as_it_is(self):
+        self.good("run", "-q", "-", stdin=b"PMX_Init\nsave /dev/null\n")
+        self.assertTrue(stat.S_ISCHR(os.stat("/dev/null").st_mode))
+        shown = self.good("run", "-q", "-", stdin=b"PMX_Init\nsave /dev/stdout\n").stdout
+        json.loads(shown)
+
+
+class Interrupts(Directory):
+    """Ended at a moment that nobody has chosen."""
+
+    def saving(self, name, times=300):
+        return f"PMX_Init\n{f'save {name}' + chr(10)}".encode() + f"save {name}\n".encode() * times
+
+    def test_killed_while_it_saves(self):
+        kept = self.write("kept", self.state.read_bytes())
+        lines = self.write("saving.pmx", self.saving(kept))
+        chance = random.Random(7)
+        for number in (signal.SIGKILL, signal.SIGINT, signal.SIGTERM, signal.SIGHUP) * (8 * ROUNDS):
+            process = subprocess.Popen([PROGRAM, "run", "-q", lines], cwd=self.place, stderr=subprocess.PIPE)
+            time.sleep(chance.uniform(0.005, 0.08))
+            process.send_signal(number)
+            _, said = process.communicate(timeout=PATIENCE)
+            self.assertIn(process.returncode, (0, -number), said)
+            self.assertEqual(b"", said)
+            json.loads(kept.read_text())
+            if number != signal.SIGKILL:
+                self.assertEqual([], self.left_behind(), number)
+            for left in self.left_behind():
+                (self.place / left).unlink()
+
+    def test_interrupted_while_it_traces(self):
+        for number in (signal.SIGINT, signal.SIGTERM):
+            kept = self.write("trace", b"before")
+            process = subprocess.Popen([PROGRAM, "run", "--trace-file", kept, "-"], stdin=subprocess.PIPE,
+                                       stdout=subprocess.PIPE, cwd=self.place)
+            process.stdin.write(b"PMX_Init\n")
+            process.stdin.flush()
+            process.stdout.readline()
+            process.send_signal(number)
+            process.communicate(timeout=PATIENCE)
+            self.assertEqual(-number, process.returncode)
+            self.assertEqual((b"before", []), (kept.read_bytes(), self.left_behind()))
+
+    def test_many_writers_of_one_file(self):
+        kept = self.write("kept", self.state.read_bytes())
+        lines = self.write("saving.pmx", self.saving(kept, 60))
+        writers = [subprocess.Popen([PROGRAM, "run", "-q", lines], cwd=self.place) for _ in range(6)]
+        reads = 0
+        while any(writer.poll() is None for writer in writers):
+            json.loads(kept.read_text())
+            reads += 1
+        self.assertEqual([0] * 6, [writer.wait() for writer in writers])
+        self.assertLess(10, reads)
+        self.assertEqual([], self.left_behind())
+
+
+class Faults(Directory):
+    """Whatever a platform function answers, what follows is a failed step or none."""
+
+    LINES = """PMX_Init
+PMX_SetTvType 0 PMX_TV_TYPE_PAL
+source vdp0 start 1920x1080
+advance 1s
+sink unplug
+sink plug
+suspend
+resume
+PMX_Reset
+PMX_Stop
+PMX_Uninit
+"""
+
+    def functions(self):
+        listed = json.loads(self.good("ops", "--json", "*").stdout)
+        return [one["name"] for one in listed]
+
+    def test_every_answer(self):
+        answers = ("0", "1", "-1", "2147483647", "-2147483648")
+        for number, function in enumerate(self.functions()):
+            for offset in range(min(ROUNDS, len(answers))):
+                answer = answers[(number + offset) % len(answers)]
+                lines = f"fault {function} {answer} always\n{self.LINES}"
+                self.check(self.run_tool("run", "-", stdin=lines.encode()), f"{function} {answer}", codes=(0, 1))
+
+    def test_a_table_that_nobody_has(self):
+        ended = self.run_tool("run", "-", stdin=b"fault i4ImQueryInterface 0\n")
+        self.check(ended, "fault", codes=(1,))
+        self.assertIn(b"<stdin>:1: i4ImQueryInterface hands out a table", ended.stderr)
+
+
+PARTS = {"inputs": Inputs, "outputs": Outputs, "interrupts": Interrupts, "faults": Faults}
+
+
+def main():
+    global PROGRAM, ROUNDS  # what is tested is given on the command line
+    if len(sys.argv) not in (3, 4) or sys.argv[2] not in PARTS:
+        sys.exit(__doc__)
+    PROGRAM = str(pathlib.Path(sys.argv[1]).resolve())
+    ROUNDS = int(sys.argv[3]) if len(sys.argv) == 4 else 1
+    if shutil.which("strip") is None:
+        sys.exit("strip is needed")
+    suite = unittest.TestLoader().loadTestsFromTestCase(PARTS[sys.argv[2]])
+    return 0 if unittest.TextTestRunner(verbosity=1).run(suite).wasSuccessful() else 1
+
+
+if __name__ == "__main__":
+    sys.exit(main())

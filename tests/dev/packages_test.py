@@ -5,7 +5,6 @@
 import os
 import subprocess
 import sys
-import time
 import unittest
 
 sys.dont_write_bytecode = True
@@ -96,9 +95,7 @@ class Packages(TreeTest):
 
     def test_an_installing_run_that_was_killed_blocks_nobody(self):
         run = self.start("setup", SLOW_INSTALL="1")
-        while not self.calls("apt-get install"):
-            self.assertIsNone(run.poll())
-            time.sleep(0.02)
+        self.wait_for("apt-get install")
         run.kill()
         self.expect(0, "installing with apt-get", "setup")
         run.communicate(timeout=30)

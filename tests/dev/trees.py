@@ -6,6 +6,7 @@ import pathlib
 import shutil
 import subprocess
 import tempfile
+import time
 import unittest
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
@@ -27,6 +28,8 @@ case "$1" in
     folder="build/$3"
     mkdir "$folder/building" || note "cmake met another one"
     echo "[1/1] building, cache ${CCACHE_DIR:-none}"
+    [ -z "${CATCHES:-}" ] || trap 'rmdir "$folder/building"; exit 1' INT
+    while [ -n "${GATE:-}" ] && [ ! -e "$GATE" ]; do sleep 0.02; done
     sleep "${SLOW_BUILD:-0}"
     [ -z "${BREAK_BUILD:-}" ] || { rmdir "$folder/building"; exit 1; }
     printf '#!/bin/bash\nprintf "%%s\\n" "ran in "%q": $*"\n' "$PWD" >"$folder/pmxboard"
@@ -54,7 +57,7 @@ do
 done
 """,
     "sudo": 'exec "$@"\n',
-    "ctest": "",
+    "ctest": 'note "repository ${GIT_DIR:-none}"\n',
     "doxygen": "",
 }
 
@@ -104,6 +107,12 @@ class TreeTest(unittest.TestCase):
     def start(self, *arguments, **more):
         return subprocess.Popen([self.tree / "dev", *arguments], cwd=self.space, stdout=subprocess.PIPE, text=True,
                                 stderr=subprocess.STDOUT, env=self.environment(**more), start_new_session=True)
+
+    def wait_for(self, call, times=1):
+        until = time.monotonic() + 60
+        while len(self.calls(call)) < times:
+            self.assertLess(time.monotonic(), until)
+            time.sleep(0.02)
 
     def calls(self, program=""):
         lines = (self.stubs / "calls").read_text(encoding="utf-8").splitlines()

@@ -52,7 +52,9 @@ class NotUnderstood(Exception):
 
 
 def help_of(tool, *arguments):
-    return subprocess.run([tool, *arguments, "--help"], capture_output=True, text=True, check=True).stdout
+    # By its plain name, which the help repeats: a long path would fold its lines elsewhere.
+    return subprocess.run(["pmxboard", *arguments, "--help"], executable=tool, capture_output=True, text=True,
+                          check=True).stdout
 
 
 def section(text, heading):

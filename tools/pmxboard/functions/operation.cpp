@@ -53,15 +53,17 @@ std::string usage(const Operation& operation)
 
 std::string to_json(const Outcome& outcome)
 {
-    const std::string result = outcome.result ? "\"result\":" + outcome.result->to_json() : std::string();
-    std::string outputs;
+    std::string json = "{";
+    if (outcome.result)
+        json.append("\"result\":").append(outcome.result->to_json());
     for (const OutputValue& output : outcome.outputs)
     {
-        outputs += (outputs.empty() ? "" : ",") + Value::text(output.name).to_json() + ":" +
-                   (output.value ? output.value->to_json() : "\"untouched\"");
+        const bool is_first = &output == &outcome.outputs.front();
+        json.append(is_first && outcome.result ? "," : "").append(is_first ? "\"outputs\":{" : ",");
+        json.append(Value::text(output.name).to_json()).append(":");
+        json.append(output.value ? output.value->to_json() : "\"untouched\"");
     }
-    return "{" + result + (result.empty() || outputs.empty() ? "" : ",") +
-           (outputs.empty() ? "" : "\"outputs\":{" + outputs + "}") + "}";
+    return json.append(outcome.outputs.empty() ? "}" : "}}");
 }
 
 const Operation* find(const std::vector<Operation>& table, std::string_view name)

@@ -53,8 +53,12 @@ function(pmx_host_library name)
     endif()
 endfunction()
 
-# pmx_precompiled(<name> [<other>]): the library has these headers compiled, or those of another one.
+# pmx_precompiled(<name> [<other>]): the library has these headers compiled, or those of another one. Not where it is
+# optimised: g++ 12 then takes precompiled headers of the library for the project's own, and warns of them.
 function(pmx_precompiled name)
+    if(CMAKE_CROSSCOMPILING OR NOT CMAKE_BUILD_TYPE STREQUAL Debug)
+        return()
+    endif()
     target_compile_options(${name} PRIVATE -fpch-preprocess)   # for the compiler cache
     if(ARGN)
         target_precompile_headers(${name} REUSE_FROM ${ARGN})

@@ -27,6 +27,7 @@ PATIENCE_MS = 3000
 RACES = 66  # ThreadSanitizer's exit code
 DEADLOCK = 3
 TIME_LIMIT = 100  # seconds, below that of the test
+RUNS = 5
 
 ENTRY = re.compile(r"race_top:\^(\w+)\$")
 ACCESS = re.compile(
@@ -134,12 +135,20 @@ def check_suppressed(program, suppressions, _listed):
 
 
 def check_exact(program, _suppressions, listed):
-    code, out, err = run(program)
-    pairs, complaints = races(err)
-    complaints += judge_exact(pairs, listed)
-    require(complaints, code == RACES, f"exit code {code}")
-    require(complaints, ", 0 breaches\n" in out, f"not all calls were made: {out}")
-    return f"{len(pairs)} races, of {len(listed)} functions that take no lock", complaints, out + err
+    # Which threads meet is chance: what one run does not show, another one does.
+    met, complaints, output = [], [], ""
+    for _ in range(RUNS):
+        code, out, err = run(program)
+        pairs, found = races(err)
+        met += pairs
+        complaints += found
+        output += out + err
+        require(complaints, code == RACES, f"exit code {code}")
+        require(complaints, ", 0 breaches\n" in out, f"not all calls were made: {out}")
+        if complaints or listed <= {access.function for pair in met for access in pair}:
+            break
+    complaints += judge_exact(met, listed)
+    return f"{len(met)} races, of {len(listed)} functions that take no lock", complaints, output
 
 
 def check_without_mutex(program, suppressions, _listed):

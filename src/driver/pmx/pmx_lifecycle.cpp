@@ -121,10 +121,13 @@ INT32 i4PMX_Uninit(UINT32 u4Case)
     if (_PmxInitiated == 1)
     {
         vStopAndUnregister();
-        if (MutexPMX != 0 && x_sema_delete(MutexPMX) != OSR_OK)
-            i4Ret = -1;
-        else
-            MutexPMX = 0;
+        if (MutexPMX != 0)
+        {
+            if (x_sema_delete(MutexPMX) == OSR_OK)
+                MutexPMX = 0;
+            else
+                i4Ret = -1;
+        }
         _PmxInitiated = 0;
     }
     PMX_IsLog(1, "i4PMX_Uninit return %d\n", i4Ret);

@@ -73,8 +73,7 @@ public:
     std::optional<Words> match(const Line& line) const;
     /** What may follow the words of a line that begin with the verb. */
     std::vector<FormWord> next(std::span<const std::string> before) const;
-    /** The place that the last of these words fills, when the rest of the line stands there: "COMMAND", and where it
-     *  begins. */
+    /** Where among these words the command begins that stands in the form's place COMMAND; nothing when none does. */
     std::optional<std::size_t> command_within(std::span<const std::string> words) const;
 
 private:

@@ -232,7 +232,7 @@ void fill(Part& part, std::string_view place, const std::vector<std::string>& wo
 Part of_verb(const Verb& verb, const std::vector<std::string>& words, const CompletionPlace& where)
 {
     Part part;
-    std::size_t command = 0; // the words that most forms share before it
+    std::size_t command = 0; // behind as many words of the verb as any form takes; 0: there is none
     for (const VerbForm& form : verb.forms)
         command = std::max(command, form.form.command_within(words).value_or(0));
     if (command != 0)

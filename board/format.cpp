@@ -106,7 +106,7 @@ bool copy_memory(const char* from, char* to, std::size_t count)
         return made;
     }();
     const auto size = static_cast<ssize_t>(count);
-    return syscall(SYS_write, ends[1], from, count) == size && read(ends[0], to, count) == size;
+    return syscall(SYS_write, ends[1], from, count) == size && ::read(ends[0], to, count) == size;
 }
 
 /** Read the text at an address that may be anything, at most `most` characters; false when it is no readable memory. */

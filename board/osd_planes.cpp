@@ -15,9 +15,9 @@ namespace
 using board::Value;
 using board::names::Family;
 
-constexpr unsigned OSD_PLANES = 5;
+constexpr unsigned PLANES_WITH_OFFSET = 5;
 constexpr INT32 DONE = 0;
-constexpr INT32 REFUSED = -1;
+constexpr INT32 OSD_REFUSED = -1;
 
 struct Osd5Route
 {
@@ -32,7 +32,7 @@ struct OsdPlanes
     unsigned resolution_changes_done = 0;
     std::optional<UCHAR> colour_space;
     bool full_range_conversion = false;
-    std::optional<std::array<INT32, OSD_PLANES>> position_offsets;
+    std::optional<std::array<INT32, PLANES_WITH_OFFSET>> position_offsets;
     std::optional<Osd5Route> osd5;
 };
 
@@ -96,10 +96,10 @@ void OSD_RNG_Set_Xvycc_En(BOOL fgEnable)
 
 INT32 _i4OSD_SetPosOffset(INT32* pi4Offset)
 {
-    BOARD_CALL_R(_i4OSD_SetPosOffset, input(pi4Offset, OSD_PLANES));
+    BOARD_CALL_R(_i4OSD_SetPosOffset, input(pi4Offset, PLANES_WITH_OFFSET));
     if (pi4Offset == nullptr)
-        return boardCall.answer(REFUSED);
-    std::copy_n(pi4Offset, OSD_PLANES, osd_planes_state.position_offsets.emplace().begin());
+        return boardCall.answer(OSD_REFUSED);
+    std::copy_n(pi4Offset, PLANES_WITH_OFFSET, osd_planes_state.position_offsets.emplace().begin());
     return boardCall.answer(DONE);
 }
 

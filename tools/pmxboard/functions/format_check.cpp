@@ -19,7 +19,7 @@ std::string conversion_in(std::string_view format)
     return {};
 }
 
-std::string folded(std::string_view format)
+std::string once_formatted(std::string_view format)
 {
     std::string text;
     for (std::size_t i = 0; i < format.size(); ++i)
@@ -43,7 +43,7 @@ void check_format(std::string_view name, const std::string& format)
     if (!first.empty())
         throw LineError(what + " wants a value for \"" + first +
                         "\", and values cannot be given here; write %% for a percent sign");
-    const std::string second = conversion_in(folded(format));
+    const std::string second = conversion_in(once_formatted(format));
     if (!second.empty())
         throw LineError(what + " is formatted twice on its way to the console, and the second time \"" + second +
                         "\" wants a value; write %%%% for a percent sign");

@@ -23,7 +23,7 @@ namespace
 thread_local Outcome* meanwhile_outcome = nullptr;
 
 /** An outcome in a notice: "= 1, *pucMode = RES_480P". */
-std::string to_text(const Outcome& outcome)
+std::string outcome_text(const Outcome& outcome)
 {
     std::string text = outcome.result ? "= " + outcome.result->to_text() : std::string();
     for (const OutputValue& output : outcome.outputs)
@@ -128,7 +128,7 @@ void Session::run_meanwhile(const Line& line)
         throw;
     }
     meanwhile_outcome = outer;
-    if (const std::string text = to_text(outcome); !text.empty())
+    if (const std::string text = outcome_text(outcome); !text.empty())
         board::trace::notice("meanwhile", text);
 }
 

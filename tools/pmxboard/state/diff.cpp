@@ -14,9 +14,6 @@ namespace
 
 using board::Value;
 
-/** The groups of the state that are the layer's own. */
-constexpr std::string_view layer_groups[] = { "record", "status", "module" };
-
 std::string joined(const std::string& path, const std::string& key)
 {
     return path.empty() ? key : path + "." + key;

@@ -15,9 +15,6 @@ namespace
 
 using board::Value;
 
-/** The groups of the state that are the layer's own; a path may leave them out. */
-constexpr const char* layer_groups[] = { "record", "status", "module" };
-
 /** As many as a state of the board has, many times over; a stranger's may have more. */
 void collect_paths(const Value& value, const std::string& path, std::vector<std::string>& into)
 {
@@ -79,14 +76,14 @@ Value part_of(const Value& state, const std::string& written)
     const std::string path = plain_path(written);
     if (const Value* const found = path.empty() ? nullptr : state.find(path))
         return *found;
-    for (const char* const group : layer_groups)
+    for (const std::string_view group : layer_groups)
     {
-        if (const Value* const found = path.empty() ? nullptr : state.find(group + ("." + path)))
+        if (const Value* const found = path.empty() ? nullptr : state.find(std::string(group) + "." + path))
             return *found;
     }
     std::vector<std::string> paths;
     collect_paths(state, {}, paths);
-    for (const char* const group : layer_groups)
+    for (const std::string_view group : layer_groups)
     {
         if (const Value* const members = state.find(group))
             collect_paths(*members, {}, paths);

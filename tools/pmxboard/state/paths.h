@@ -4,6 +4,7 @@
 #pragma once
 
 #include <string>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -11,6 +12,9 @@
 
 namespace pmxboard
 {
+
+/** The groups of the state that are the layer's own. */
+constexpr std::string_view layer_groups[] = { "record", "status", "module" };
 
 /** A path whose indices are numbers: arOutputConf[PMX_OUTPUT_HDMI] is arOutputConf[1]. */
 std::string plain_path(std::string path);

@@ -24,7 +24,7 @@ std::vector<std::string_view> operation_names()
     return names;
 }
 
-std::vector<std::string_view> platform_names()
+std::vector<std::string_view> names_of_platform()
 {
     std::vector<std::string_view> names;
     for (const board::PlatformFunction& function : board::platform_functions())
@@ -69,7 +69,7 @@ bool TraceFilter::shows(const board::TraceEntry& entry) const
 
 std::string TraceFilter::complaint() const
 {
-    const auto functions = platform_names();
+    const auto functions = names_of_platform();
     for (const std::string& beginning : only)
     {
         if (beginning == stores_name)

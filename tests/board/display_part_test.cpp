@@ -15,7 +15,7 @@ namespace
 using namespace std::chrono_literals;
 using board::display_part::read_behaviour;
 
-constexpr const char* AS_NEW = "{answer=\"off\", resolution_changes=0, switching=0, answer_due_us=null}";
+constexpr const char* DISPLAY_PART_AS_NEW = "{answer=\"off\", resolution_changes=0, switching=0, answer_due_us=null}";
 
 class DisplayPart : public DeviceTest
 {
@@ -45,12 +45,12 @@ protected:
 
 TEST_F(DisplayPart, PowerOn_ItTakesNoNotice)
 {
-    EXPECT_EQ(AS_NEW, now());
+    EXPECT_EQ(DISPLAY_PART_AS_NEW, now());
     change_resolution();
     EXPECT_EQ(Lines{}, told());
     EXPECT_EQ("{answer=\"off\", resolution_changes=1, switching=0, answer_due_us=null}", now());
     power_on({});
-    EXPECT_EQ(AS_NEW, now());
+    EXPECT_EQ(DISPLAY_PART_AS_NEW, now());
 }
 
 TEST_F(DisplayPart, PowerOn_BehavesAsTheBoardSays_AndForgetsItsAnswer)
@@ -62,7 +62,7 @@ TEST_F(DisplayPart, PowerOn_BehavesAsTheBoardSays_AndForgetsItsAnswer)
     change_resolution();
     EXPECT_EQ("{answer=\"3s\", resolution_changes=1, switching=1, answer_due_us=3000000}", now());
     power_on({});
-    EXPECT_EQ(AS_NEW, now());
+    EXPECT_EQ(DISPLAY_PART_AS_NEW, now());
     board::advance(10s);
     EXPECT_EQ(Lines{}, told());
 }
@@ -164,7 +164,7 @@ TEST_F(DisplayPart, RaiseAndLower_AtOnce)
     EXPECT_EQ((Lines{ "0: 1" }), told());
     board::display_part::lower();
     EXPECT_EQ((Lines{ "0: 1", "3600000: 0" }), told());
-    EXPECT_EQ(AS_NEW, now());
+    EXPECT_EQ(DISPLAY_PART_AS_NEW, now());
 }
 
 TEST_F(DisplayPart, Lower_IsTheAnswer_AndNoOtherFollows)

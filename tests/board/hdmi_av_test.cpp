@@ -21,9 +21,9 @@ constexpr const char* NO_COMMAND =
     "PMX_SET_EXT_EDGE_ENHANCEMENT=null, PMX_SET_EXT_DETAIL_ENHANCEMENT=null, PMX_SET_EXT_ZOOM_IMAGE=null, "
     "PMX_SET_EXT_GAMMA=null, PMX_SET_EXT_DEEP_COLOR=null}";
 
-const std::string AS_NEW = std::string("{sink_plugged=1, resolution_requested=0, commands=") + NO_COMMAND +
-                           ", chosen_resolution=null, posted_resolution=null, posted_colour_space=null, "
-                           "change_ok_notices=0, ccir_before_mixer=null}";
+const std::string HDMI_AS_NEW = std::string("{sink_plugged=1, resolution_requested=0, commands=") + NO_COMMAND +
+                                ", chosen_resolution=null, posted_resolution=null, posted_colour_space=null, "
+                                "change_ok_notices=0, ccir_before_mixer=null}";
 
 class HdmiAv : public DeviceTest
 {
@@ -56,7 +56,7 @@ constexpr const char* SOME_RESOLUTION =
 
 TEST_F(HdmiAv, PowerOn_ASinkIsPluggedInAndNothingWasSent)
 {
-    EXPECT_EQ(AS_NEW, board::hdmi_av::state().to_text());
+    EXPECT_EQ(HDMI_AS_NEW, board::hdmi_av::state().to_text());
 }
 
 TEST_F(HdmiAv, PowerOn_TheSinkIsAsTheBoardSays)
@@ -83,7 +83,7 @@ TEST_F(HdmiAv, PowerOn_RequestAndChoiceAreAsTheBoardSays)
     EXPECT_EQ(UINT32{ RES_720P50HZ }, query.u4ValidAutoRes);
     EXPECT_EQ(50u, query.u2ValidAutoVfreq);
     power_on({});
-    EXPECT_EQ(AS_NEW, board::hdmi_av::state().to_text());
+    EXPECT_EQ(HDMI_AS_NEW, board::hdmi_av::state().to_text());
 }
 
 TEST_F(HdmiAv, PowerOn_ForgetsEverything)
@@ -101,7 +101,7 @@ TEST_F(HdmiAv, PowerOn_ForgetsEverything)
     board::hdmi_av::choose_resolution(board::hdmi_av::Resolution{ RES_480P, 60 });
     EXPECT_EQ("{mode=RES_480P, frequency=60}", now("chosen_resolution"));
     power_on({});
-    EXPECT_EQ(AS_NEW, board::hdmi_av::state().to_text());
+    EXPECT_EQ(HDMI_AS_NEW, board::hdmi_av::state().to_text());
 }
 
 struct ByteCommand
@@ -224,7 +224,7 @@ TEST_F(HdmiAv, SetAvd_CommandThatDoesNotExist_IsRefused)
         EXPECT_EQ(FALSE, fgPmxDrvSetAvd(command, &value, 1));
         EXPECT_EQ("fgPmxDrvSetAvd(" + std::to_string(command) + ", <pointer>, 1) = 0", last_call());
     }
-    EXPECT_EQ(AS_NEW, board::hdmi_av::state().to_text());
+    EXPECT_EQ(HDMI_AS_NEW, board::hdmi_av::state().to_text());
 }
 
 TEST_F(HdmiAv, SetAvd_WithoutParameter_IsRefused)
@@ -232,7 +232,7 @@ TEST_F(HdmiAv, SetAvd_WithoutParameter_IsRefused)
     EXPECT_EQ(FALSE, fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, nullptr, 1));
     EXPECT_EQ("fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, null, 1) = 0", last_call());
     EXPECT_EQ(FALSE, fgPmxDrvSetAvd(PMX_SET_HDMI_HUE, nullptr, 1));
-    EXPECT_EQ(AS_NEW, board::hdmi_av::state().to_text());
+    EXPECT_EQ(HDMI_AS_NEW, board::hdmi_av::state().to_text());
 }
 
 TEST_F(HdmiAv, GetAvdInfo_ValidResolution_EchoesWhatWasAsked)
@@ -270,7 +270,7 @@ TEST_F(HdmiAv, GetAvdInfo_QueryThatDoesNotExist_HasNoAnswer)
     EXPECT_EQ("fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, null) = 0", last_call());
     EXPECT_EQ(1u, query.u4ValidAutoRes);
     EXPECT_EQ(2u, query.u2ValidAutoVfreq);
-    EXPECT_EQ(AS_NEW, board::hdmi_av::state().to_text());
+    EXPECT_EQ(HDMI_AS_NEW, board::hdmi_av::state().to_text());
 }
 
 TEST_F(HdmiAv, Plug_ChangesTheStatusAndIsNoted)
@@ -360,7 +360,7 @@ TEST_F(HdmiAv, Fault_AnswersInsteadOfActing)
     EXPECT_EQ(0u, query.u4ValidAutoRes);
     EXPECT_EQ(-1, i4GetHotPlugStatus());
     EXPECT_EQ(TRUE, fgIsHotPlugChgRes());
-    EXPECT_EQ(AS_NEW, board::hdmi_av::state().to_text());
+    EXPECT_EQ(HDMI_AS_NEW, board::hdmi_av::state().to_text());
 }
 
 } // namespace

@@ -10,7 +10,7 @@
 namespace
 {
 
-constexpr const char* AS_NEW =
+constexpr const char* MIXER_AS_NEW =
     "{mode=null, scaler_mode=null, resets=0, scaler_resets=0, tv_type=null, clocks=[1, 1, 1], background=null, "
     "stacking=null, selectors=[0, 1, 2, 3, 4, 5, 6, 7], plane_delay=[0, 0, 0, 0, 0, 0, 0, 0], arrangements=[], "
     "mixed=[1, 1, 1, 1, 1, 1, 1, 1], "
@@ -40,7 +40,7 @@ protected:
 
 TEST_F(Mixer, PowerOn_MixesAllPlanesUnswappedWithClocksOn)
 {
-    EXPECT_EQ(AS_NEW, board::mixer::state().to_text());
+    EXPECT_EQ(MIXER_AS_NEW, board::mixer::state().to_text());
 }
 
 void program_everything(UCHAR mixer)
@@ -101,7 +101,7 @@ TEST_F(Mixer, PowerOn_ForgetsEverything)
               "vsync={initialised=1, enabled=1}}",
               board::mixer::state().to_text());
     power_on({});
-    EXPECT_EQ(AS_NEW, board::mixer::state().to_text());
+    EXPECT_EQ(MIXER_AS_NEW, board::mixer::state().to_text());
 }
 
 TEST_F(Mixer, MixerThatDoesNotExist_DoesNoHarm)
@@ -114,7 +114,7 @@ TEST_F(Mixer, MixerThatDoesNotExist_DoesNoHarm)
         vPmxMixPlane(mixer, 2);
         PMX_HalDisableCB(mixer);
         PMX_HalDisableMute(mixer);
-        EXPECT_EQ(AS_NEW, board::mixer::state().to_text());
+        EXPECT_EQ(MIXER_AS_NEW, board::mixer::state().to_text());
         EXPECT_EQ(33u, board::trace::entries().size());
         EXPECT_EQ("PMX_HalDisableMute(" + std::to_string(mixer) + ")", last_call());
     }
@@ -387,7 +387,7 @@ TEST_F(Mixer, MixPlane_PlaneThatDoesNotExist_DoesNoHarm)
     EXPECT_EQ(FALSE, fgPmxHalMixPlane(0, 255));
     EXPECT_EQ(FALSE, fgPmxHalMixPlane(1, 0));
     EXPECT_EQ("fgPmxHalMixPlane(1, DRV_PMX_PLANE_1) = 0", last_call());
-    EXPECT_EQ(AS_NEW, board::mixer::state().to_text());
+    EXPECT_EQ(MIXER_AS_NEW, board::mixer::state().to_text());
     vPmxMixPlane(0, 8);
     EXPECT_EQ("vPmxMixPlane(0, 8)", last_call());
     EXPECT_EQ(FALSE, fgPmxHalMixPlane(0, 8));
@@ -430,7 +430,7 @@ TEST_F(Mixer, Swaps_EachPairIsSwitchedAndAskedForAlone)
         pair.swap(0, 0);
         EXPECT_EQ("PMX_HalSwapPlane" + pair.planes + "(0, 0)", last_call());
         EXPECT_EQ(FALSE, pair.is_swapped(0));
-        EXPECT_EQ(AS_NEW, board::mixer::state().to_text());
+        EXPECT_EQ(MIXER_AS_NEW, board::mixer::state().to_text());
     }
 }
 
@@ -574,7 +574,7 @@ TEST_F(Mixer, Fault_AnswersInsteadOfActing)
     EXPECT_EQ(FALSE, fgPmxHalMixPlane(0, 0));
     EXPECT_EQ(9u, selectors[0]);
     EXPECT_EQ(9, delays[0]);
-    EXPECT_EQ(AS_NEW, board::mixer::state().to_text());
+    EXPECT_EQ(MIXER_AS_NEW, board::mixer::state().to_text());
 }
 
 TEST_F(Mixer, Fault_AnswersEverySwapQuery)
@@ -585,7 +585,7 @@ TEST_F(Mixer, Fault_AnswersEverySwapQuery)
         EXPECT_EQ(TRUE, pair.is_swapped(0)) << pair.planes;
         EXPECT_EQ("fgPmxHalSwapPlane" + pair.planes + "(0) = 1", last_call());
     }
-    EXPECT_EQ(AS_NEW, board::mixer::state().to_text());
+    EXPECT_EQ(MIXER_AS_NEW, board::mixer::state().to_text());
 }
 
 } // namespace

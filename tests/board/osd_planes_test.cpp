@@ -5,8 +5,8 @@
 namespace
 {
 
-constexpr const char* AS_NEW = "{display_mode=null, resolution_changes_done=0, colour_space=null, "
-                               "full_range_conversion=0, position_offsets=null, osd5=null}";
+constexpr const char* OSD_AS_NEW = "{display_mode=null, resolution_changes_done=0, colour_space=null, "
+                                   "full_range_conversion=0, position_offsets=null, osd5=null}";
 
 class OsdPlanes : public DeviceTest
 {
@@ -16,7 +16,7 @@ protected:
 
 TEST_F(OsdPlanes, PowerOn_NothingWasSet)
 {
-    EXPECT_EQ(AS_NEW, board::osd_planes::state().to_text());
+    EXPECT_EQ(OSD_AS_NEW, board::osd_planes::state().to_text());
 }
 
 TEST_F(OsdPlanes, PowerOn_ForgetsEverything)
@@ -28,9 +28,9 @@ TEST_F(OsdPlanes, PowerOn_ForgetsEverything)
     OSD_RNG_Set_Xvycc_En(1);
     _i4OSD_SetPosOffset(offsets);
     _i4Osd5Out(1, 0);
-    EXPECT_NE(AS_NEW, board::osd_planes::state().to_text());
+    EXPECT_NE(OSD_AS_NEW, board::osd_planes::state().to_text());
     power_on({});
-    EXPECT_EQ(AS_NEW, board::osd_planes::state().to_text());
+    EXPECT_EQ(OSD_AS_NEW, board::osd_planes::state().to_text());
 }
 
 TEST_F(OsdPlanes, SetDisplayMode_KeepsTheMode)
@@ -122,7 +122,7 @@ TEST_F(OsdPlanes, Fault_AnswersInsteadOfActing)
     EXPECT_EQ(-8, _i4Osd5Out(1, 0));
     EXPECT_EQ(-9, _i4Osd5Out_CVBSOnly(1, 0));
     EXPECT_EQ("_i4Osd5Out_CVBSOnly(1, RES_480I) = -9", last_call());
-    EXPECT_EQ(AS_NEW, board::osd_planes::state().to_text());
+    EXPECT_EQ(OSD_AS_NEW, board::osd_planes::state().to_text());
 }
 
 } // namespace

@@ -6,7 +6,7 @@
 namespace
 {
 
-constexpr const char* AS_NEW =
+constexpr const char* ENCODER_AS_NEW =
     "{encoders=[{enabled=0, format=null, black_screen=0}, {enabled=0, format=null, black_screen=0}], "
     "mute_control=null, brightness=null, contrast=null, hue=null, saturation=null, sharpness=null, black_level=null, "
     "composite_setup=0, composite_pal60=0, media_type=null, aspect=null}";
@@ -19,7 +19,7 @@ protected:
 
 TEST_F(TvEncoder, PowerOn_BothEncodersAreOff)
 {
-    EXPECT_EQ(AS_NEW, board::tv_encoder::state().to_text());
+    EXPECT_EQ(ENCODER_AS_NEW, board::tv_encoder::state().to_text());
 }
 
 TEST_F(TvEncoder, PowerOn_ForgetsEverything)
@@ -48,7 +48,7 @@ TEST_F(TvEncoder, PowerOn_ForgetsEverything)
               "composite_setup=1, composite_pal60=1, media_type=6, aspect=ASPECT_RATIO_16_9_FULL_FORMAT}",
               board::tv_encoder::state().to_text());
     power_on({});
-    EXPECT_EQ(AS_NEW, board::tv_encoder::state().to_text());
+    EXPECT_EQ(ENCODER_AS_NEW, board::tv_encoder::state().to_text());
 }
 
 TEST_F(TvEncoder, SetFmtEx_SetsFormatAndEnableOfItsEncoder)
@@ -102,7 +102,7 @@ TEST_F(TvEncoder, EncoderThatDoesNotExist_DoesNoHarm)
     EXPECT_EQ("TVE_SetEnable(4294967295, 1)", last_call());
     TVE_SetBlackScreen(2, 1);
     EXPECT_EQ("TVE_SetBlackScreen(2, 1)", last_call());
-    EXPECT_EQ(AS_NEW, board::tv_encoder::state().to_text());
+    EXPECT_EQ(ENCODER_AS_NEW, board::tv_encoder::state().to_text());
     EXPECT_EQ(0u, board::misuses());
 }
 
@@ -193,7 +193,7 @@ TEST_F(TvEncoder, Fault_AnswersInsteadOfActing)
     answer_always("TVE_SetFmtEx", 0);
     EXPECT_EQ(0u, TVE_SetFmtEx(TVE_1, 12, 60, 10, 1, 1, 0));
     EXPECT_EQ("TVE_SetFmtEx(0, RES_1080P60HZ, 60, RES_1080I60HZ, 1, 1, 0) = 0", last_call());
-    EXPECT_EQ(AS_NEW, board::tv_encoder::state().to_text());
+    EXPECT_EQ(ENCODER_AS_NEW, board::tv_encoder::state().to_text());
 }
 
 } // namespace

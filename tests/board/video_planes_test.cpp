@@ -9,11 +9,11 @@
 namespace
 {
 
-constexpr const char* AS_NEW = "{tv_format=null, output_changes=0, planes=["
-                               "{hw_enable=VDP_ENABLED, commands=[], clear_video=null}, "
-                               "{hw_enable=VDP_DISABLED, commands=[], clear_video=null}, "
-                               "{hw_enable=VDP_DISABLED, commands=[], clear_video=null}], "
-                               "closed_caption=0, waiting_for_sync=0}";
+constexpr const char* VIDEO_AS_NEW = "{tv_format=null, output_changes=0, planes=["
+                                     "{hw_enable=VDP_ENABLED, commands=[], clear_video=null}, "
+                                     "{hw_enable=VDP_DISABLED, commands=[], clear_video=null}, "
+                                     "{hw_enable=VDP_DISABLED, commands=[], clear_video=null}], "
+                                     "closed_caption=0, waiting_for_sync=0}";
 
 class VideoPlanes : public DeviceTest
 {
@@ -23,7 +23,7 @@ protected:
 
 TEST_F(VideoPlanes, PowerOn_TheFirstPlaneAloneIsEnabled)
 {
-    EXPECT_EQ(AS_NEW, board::video_planes::state().to_text());
+    EXPECT_EQ(VIDEO_AS_NEW, board::video_planes::state().to_text());
 }
 
 TEST_F(VideoPlanes, PowerOn_ForgetsEverything)
@@ -35,9 +35,9 @@ TEST_F(VideoPlanes, PowerOn_ForgetsEverything)
     VDP_EnableCC(1);
     board::video_planes::set_hw_enable(1, VDP_HIDDEN);
     board::video_planes::set_waiting_for_sync(true);
-    EXPECT_NE(AS_NEW, board::video_planes::state().to_text());
+    EXPECT_NE(VIDEO_AS_NEW, board::video_planes::state().to_text());
     power_on({});
-    EXPECT_EQ(AS_NEW, board::video_planes::state().to_text());
+    EXPECT_EQ(VIDEO_AS_NEW, board::video_planes::state().to_text());
 }
 
 TEST_F(VideoPlanes, SetTvFormat_KeepsModeAndWhetherItChanged)
@@ -189,7 +189,7 @@ TEST_F(VideoPlanes, Fault_AnswersInsteadOfTheDriver)
     EXPECT_EQ(VDP_HIDDEN, VDP_GetHwEnable(0));
     EXPECT_EQ("VDP_GetHwEnable(0) = VDP_HIDDEN", last_call());
     EXPECT_EQ(TRUE, fgVdpIsWaitforSyncCtrl());
-    EXPECT_EQ(AS_NEW, board::video_planes::state().to_text());
+    EXPECT_EQ(VIDEO_AS_NEW, board::video_planes::state().to_text());
 }
 
 } // namespace

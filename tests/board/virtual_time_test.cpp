@@ -14,11 +14,11 @@ using namespace std::chrono_literals;
 namespace
 {
 
-unsigned expiries;
+unsigned counted_expiries;
 
 extern "C" void virtual_time_expiry(HANDLE_T, void*)
 {
-    ++expiries;
+    ++counted_expiries;
 }
 
 class VirtualTime : public DeviceTest
@@ -27,7 +27,7 @@ protected:
     void SetUp() override
     {
         DeviceTest::SetUp();
-        expiries = 0;
+        counted_expiries = 0;
     }
 
     static void start_timer(UINT32 milliseconds, X_TIMER_FLAG_T flag)
@@ -67,8 +67,9 @@ TEST_F(VirtualTime, TenMinutes_TakeAsManyStepsAsTimersExpire)
     board::advance(10min);
     const unsigned once_a_second = 600;
     const unsigned every_ten_seconds = 60;
-    EXPECT_EQ(once_a_second + every_ten_seconds + 1, expiries);
-    EXPECT_EQ(expiries, board::trace::entries().size()) << "one notice for each expiry, and nothing else happens";
+    EXPECT_EQ(once_a_second + every_ten_seconds + 1, counted_expiries);
+    EXPECT_EQ(counted_expiries, board::trace::entries().size())
+        << "one notice for each expiry, and nothing else happens";
     EXPECT_EQ(10min, board::now());
 }
 
@@ -79,7 +80,7 @@ TEST_F(VirtualTime, LongSilence_CostsNoMoreThanAShortOne)
     const std::int64_t minute = cost_of(1min);
     const std::int64_t ten_minutes = cost_of(10min);
     EXPECT_LT(ten_minutes, 5 * minute + 10'000) << "nanoseconds; one minute took " << minute;
-    EXPECT_EQ(0u, expiries);
+    EXPECT_EQ(0u, counted_expiries);
 }
 
 } // namespace

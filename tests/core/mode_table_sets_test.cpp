@@ -96,7 +96,7 @@ TEST(ModeTable, CapMask_DefaultWordAdmitsEveryModeThatHasABit)
     const UINT32 word = _arPmxConfDefault.u4Capability;
     for (const Mode& mode : all_modes)
         EXPECT_EQ(mode.capability != never, (word & cap_mask(mode.mode)) != 0) << mode.enumerator;
-    for (const Number& other : other_enumerators)
+    for (const mode_facts::Number& other : other_enumerators)
         EXPECT_EQ(0u, word & cap_mask(other.mode)) << other.enumerator;
 }
 

@@ -21,7 +21,7 @@ std::string announced_ex(std::uint32_t ratio, unsigned on_next)
            std::to_string(on_next) + ")\\n\"\n";
 }
 
-const std::string told = "LOG9 \"VDP_GlobalOutputChange\\n\"\n";
+const std::string change_told = "LOG9 \"VDP_GlobalOutputChange\\n\"\n";
 const std::string told_ex = "LOG9 \"[EX] VDP_GlobalOutputChange\\n\"\n";
 
 } // namespace
@@ -55,7 +55,7 @@ TEST_F(Aspect, SetAspectRatio_EachRatioIsHandedOnWhole)
     for (const std::uint32_t ratio : aspect::ratios)
     {
         EXPECT_EQ(1u, PMX_SetAspectRatio(0, ratio));
-        EXPECT_TRACE(announced(ratio) + hdmi(ratio) + output_change + told);
+        EXPECT_TRACE(announced(ratio) + hdmi(ratio) + output_change + change_told);
         EXPECT_EQ((Fields{ .normal = ratio }), fields());
     }
 }
@@ -65,7 +65,7 @@ TEST_F(Aspect, SetAspectRatio_TheStoredRatioAgain_IsSignalledAgain)
     for (int i = 0; i < 2; ++i)
     {
         EXPECT_EQ(1u, PMX_SetAspectRatio(0, 3));
-        EXPECT_TRACE(announced(3) + hdmi(3) + output_change + told);
+        EXPECT_TRACE(announced(3) + hdmi(3) + output_change + change_told);
     }
 }
 
@@ -127,7 +127,7 @@ TEST_F(Aspect, SetAspectRatio_DigestViewShown_ItsRatioStaysInForce)
 {
     set_fields({ .digest_shown = true, .digest = 9 });
     EXPECT_EQ(1u, PMX_SetAspectRatio(0, 2));
-    EXPECT_TRACE(announced(2) + hdmi(2) + output_change + told);
+    EXPECT_TRACE(announced(2) + hdmi(2) + output_change + change_told);
     EXPECT_EQ((Fields{ .normal = 2, .digest_shown = true, .digest = 9 }), fields());
     EXPECT_EQ(9u, in_force());
 }

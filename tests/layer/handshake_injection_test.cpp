@@ -84,8 +84,8 @@ std::vector<State> armed_states()
     return states;
 }
 
-const State held_back{ true, false, true, true, false, 0 };
-const State held_back_waiting{ true, false, true, true, true, 0 };
+const State state_held_back{ true, false, true, true, false, 0 };
+const State state_held_back_waiting{ true, false, true, true, true, 0 };
 const State switching{ true, false, true, true, false, handshake::osd_planes };
 const State ready{ false, false, true, true, false, handshake::osd_planes };
 
@@ -224,7 +224,7 @@ private:
 
 TEST_F(HandshakeInjection, SetModeEx_NewFormat_LeavesPlanesOutFromTheDecisionToHoldBackOn)
 {
-    expect_held_back({ "new format", mode(hd) }, { held_back, held_back_waiting, switching, ready });
+    expect_held_back({ "new format", mode(hd) }, { state_held_back, state_held_back_waiting, switching, ready });
 }
 
 TEST_F(HandshakeInjection, SetModeEx_SameFormatOtherHdmi_LeavesPlanesOutFromTheDecisionToHoldBackOn)
@@ -239,7 +239,7 @@ TEST_F(HandshakeInjection, SetModeEx_Unchanged_HoldsBackWhileTheTimerIsArmed)
 
 TEST_F(HandshakeInjection, SetModeEx_OtherPathsThatHoldBack_AreTheSame)
 {
-    const std::vector<State> from{ held_back };
+    const std::vector<State> from{ state_held_back };
     const auto no_faults = [] { board::faults::clear_all(); };
     expect_held_back({ "new frequency, PLL programmed", mode(unchanged, 50) }, from);
     expect_held_back({ "fifth OSD plane on composite", mode(unchanged, 60, 1) }, from);
@@ -260,7 +260,7 @@ TEST_F(HandshakeInjection, SetModeEx_PathsThatDoNotHoldBack_LeaveNothingUnusual)
 {
     expect_nothing_unusual({ "refused", mode(beyond_capability) }, armed_states());
     expect_nothing_unusual({ "no sink", mode(unchanged), plug(false), plug(true) }, armed_states());
-    const std::vector<State> from{ held_back, held_back_waiting };
+    const std::vector<State> from{ state_held_back, state_held_back_waiting };
     expect_nothing_unusual({ "no sink, new format", mode(hd), plug(false), plug(true) }, from);
     expect_nothing_unusual({ "answered within the call", mode(hd), [] {}, [] {}, true }, from);
 }
@@ -292,7 +292,7 @@ TEST_F(HandshakeInjection, SetFormatChangeTimer_RunOutBeforeTheRestart_LeavesThe
 
 TEST_F(HandshakeInjection, SetModeEx_RunOutAtClearVideo_PlanesStayOutTenMoreSecondsWithBothFlagsClear)
 {
-    run_out_after("VDP_SetClearVideo", { "new format", mode(hd) }, held_back);
+    run_out_after("VDP_SetClearVideo", { "new format", mode(hd) }, state_held_back);
     board::advance(timer_interval - std::chrono::milliseconds(1));
     EXPECT_EQ("ab: 2 3 4 5 6 out, T, armed", shown(bench.state()));
     PMX_SetOsdEnable(); // nothing is owed
@@ -303,7 +303,7 @@ TEST_F(HandshakeInjection, SetModeEx_RunOutAtClearVideo_PlanesStayOutTenMoreSeco
 
 TEST_F(HandshakeInjection, SetModeEx_RunOutAtItsTimersStart_AnUnchangedModeHoldsBackOnceMore)
 {
-    run_out_after("x_timer_start", { "new format", mode(hd) }, held_back);
+    run_out_after("x_timer_start", { "new format", mode(hd) }, state_held_back);
     EXPECT_EQ("c: all mixed, T", shown(bench.state()));
     board::advance(std::chrono::minutes(1));
     EXPECT_EQ("c: all mixed, T", shown(bench.state())) << "no timer is left that would clear T";

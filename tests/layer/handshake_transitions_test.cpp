@@ -37,13 +37,13 @@ Request of_mode(UINT32 mode)
     return { .digital_port = on(mode), .hdmi = on(mode), .component = on(mode), .composite = on(RES_480I) };
 }
 
-const Request first = of_mode(RES_1080P60HZ);
-const Request second = of_mode(RES_720P60HZ);
-const Request refused = of_mode(RES_2160P);
+const Request first_request = of_mode(RES_1080P60HZ);
+const Request second_request = of_mode(RES_720P60HZ);
+const Request refused_request = of_mode(RES_2160P);
 
-constexpr const char* ready = "F0 E0 T0 mixed";
+constexpr const char* when_ready = "F0 E0 T0 mixed";
 constexpr const char* ready_timer_running = "F0 E0 T1 mixed";
-constexpr const char* switching = "F1 E0 T0 mixed";
+constexpr const char* when_switching = "F1 E0 T0 mixed";
 constexpr const char* switching_timer_running = "F1 E0 T1 mixed";
 constexpr const char* held = "F1 E0 T1 out";
 constexpr const char* waiting = "F0 E1 T0 out";
@@ -54,7 +54,7 @@ constexpr const char* waiting_timer_running = "F0 E1 T1 out";
 class Handshake : public mode_ex::Test
 {
 protected:
-    static void be_ready() { running(first); }
+    static void be_ready() { running(first_request); }
     static void be_switching()
     {
         be_ready();
@@ -64,7 +64,7 @@ protected:
     static void be_held_back()
     {
         be_switching();
-        EXPECT_EQ(1u, set_mode(second));
+        EXPECT_EQ(1u, set_mode(second_request));
         ASSERT_EQ(held, state());
     }
     /** The display part has answered, the timer runs on. */
@@ -89,16 +89,16 @@ protected:
 TEST_F(Handshake, Ready_AtStartAndAfterAModeSetting)
 {
     started();
-    EXPECT_EQ(ready, state());
-    EXPECT_EQ(1u, set_mode(first));
-    EXPECT_EQ(ready, state());
+    EXPECT_EQ(when_ready, state());
+    EXPECT_EQ(1u, set_mode(first_request));
+    EXPECT_EQ(when_ready, state());
 }
 
 TEST_F(Handshake, SetFormatChangeFlag_RaisedFromReady_Switching)
 {
     be_ready();
     PMX_SetFormatChangeFlag(TRUE);
-    EXPECT_EQ(switching, state());
+    EXPECT_EQ(when_switching, state());
 }
 
 TEST_F(Handshake, SetFormatChangeFlag_RaisedFromReadyWithTheTimerRunning_Switching)
@@ -113,7 +113,7 @@ TEST_F(Handshake, SetFormatChangeFlag_RaisedWhileSwitching_StaysSwitching)
 {
     be_switching();
     PMX_SetFormatChangeFlag(TRUE);
-    EXPECT_EQ(switching, state());
+    EXPECT_EQ(when_switching, state());
 }
 
 TEST_F(Handshake, SetFormatChangeFlag_RaisedWhileHeldBack_StaysHeldBack)
@@ -134,19 +134,19 @@ TEST_F(Handshake, SetFormatChangeFlag_RaisedWhileTheReleaseIsOwed_StaysOwed)
 TEST_F(Handshake, SetModeEx_WhileSwitching_HeldBackForTenSeconds)
 {
     be_switching();
-    EXPECT_EQ(1u, set_mode(second));
+    EXPECT_EQ(1u, set_mode(second_request));
     EXPECT_EQ(held, state());
     board::advance(10s - 1us);
     EXPECT_EQ(held, state());
     board::advance(1us);
-    EXPECT_EQ(ready, state());
+    EXPECT_EQ(when_ready, state());
 }
 
 TEST_F(Handshake, SetFormatChangeFlag_LoweredWhileSwitching_Ready)
 {
     be_switching();
     PMX_SetFormatChangeFlag(FALSE);
-    EXPECT_EQ(ready, state());
+    EXPECT_EQ(when_ready, state());
 }
 
 TEST_F(Handshake, SetFormatChangeFlag_LoweredWhileHeldBack_Ready)
@@ -176,7 +176,7 @@ TEST_F(Handshake, TmrIsr_WhileHeldBack_Ready)
 {
     be_held_back();
     board::advance(10s);
-    EXPECT_EQ(ready, state());
+    EXPECT_EQ(when_ready, state());
 }
 
 TEST_F(Handshake, TmrIsr_WhileHeldBackAndTheVideoPlaneWaits_Released)
@@ -192,7 +192,7 @@ TEST_F(Handshake, TmrIsr_WhileSwitching_Ready)
     be_switching_with_timer();
     EXPECT_EQ(switching_timer_running, state());
     board::advance(10s);
-    EXPECT_EQ(ready, state());
+    EXPECT_EQ(when_ready, state());
 }
 
 TEST_F(Handshake, TmrIsr_WhileReady_StaysReadyAndMixesOnceMore)
@@ -202,7 +202,7 @@ TEST_F(Handshake, TmrIsr_WhileReady_StaysReadyAndMixesOnceMore)
     vPmxNotMixPlane(0, 4);
     EXPECT_EQ("F0 E0 T1 2356", state());
     board::advance(7s);
-    EXPECT_EQ(ready, state());
+    EXPECT_EQ(when_ready, state());
 }
 
 TEST_F(Handshake, TmrIsr_WhileTheReleaseIsOwed_StaysOwed)
@@ -216,7 +216,7 @@ TEST_F(Handshake, SetModeEx_NotWaitingWhileHeldBack_Ready)
 {
     be_held_back();
     board::hdmi_av::plug(false);
-    EXPECT_EQ(1u, set_mode(first));
+    EXPECT_EQ(1u, set_mode(first_request));
     EXPECT_EQ(ready_timer_running, state());
 }
 
@@ -225,21 +225,21 @@ TEST_F(Handshake, SetModeEx_NotWaitingWhileHeldBackAndTheVideoPlaneWaits_Release
     be_held_back();
     board::hdmi_av::plug(false);
     board::video_planes::set_waiting_for_sync(true);
-    EXPECT_EQ(1u, set_mode(first));
+    EXPECT_EQ(1u, set_mode(first_request));
     EXPECT_EQ(waiting_timer_running, state());
 }
 
 TEST_F(Handshake, SetModeEx_NotWaitingWhileSwitching_Ready)
 {
     be_switching();
-    EXPECT_EQ(1u, set_mode(first));
-    EXPECT_EQ(ready, state());
+    EXPECT_EQ(1u, set_mode(first_request));
+    EXPECT_EQ(when_ready, state());
 }
 
 TEST_F(Handshake, SetModeEx_RefusedWhileHeldBack_Ready)
 {
     be_held_back();
-    EXPECT_EQ(0u, set_mode(refused));
+    EXPECT_EQ(0u, set_mode(refused_request));
     EXPECT_EQ(ready_timer_running, state());
 }
 
@@ -247,15 +247,15 @@ TEST_F(Handshake, SetModeEx_RefusedWhileHeldBackAndTheVideoPlaneWaits_Released)
 {
     be_held_back();
     board::video_planes::set_waiting_for_sync(true);
-    EXPECT_EQ(0u, set_mode(refused));
+    EXPECT_EQ(0u, set_mode(refused_request));
     EXPECT_EQ(waiting_timer_running, state());
 }
 
 TEST_F(Handshake, SetModeEx_RefusedWhileSwitching_Ready)
 {
     be_switching();
-    EXPECT_EQ(0u, set_mode(refused));
-    EXPECT_EQ(ready, state());
+    EXPECT_EQ(0u, set_mode(refused_request));
+    EXPECT_EQ(when_ready, state());
 }
 
 TEST_F(Handshake, SetOsdEnable_WhileTheReleaseIsOwed_Ready)
@@ -285,19 +285,19 @@ TEST_F(Handshake, SetFormatChangeFlag_Lowered_NeverStopsTheTimer)
     EXPECT_NO_TRACE();
     board::advance(1us);
     EXPECT_TRACE(std::string("LOG0 \"PMX timeout.\\n\"\n") + lowered);
-    EXPECT_EQ(ready, state());
+    EXPECT_EQ(when_ready, state());
 }
 
 TEST_F(Handshake, SetModeEx_HeldBackAgain_StartsTheFullIntervalAnew)
 {
     be_held_back();
     board::advance(6s);
-    EXPECT_EQ(1u, set_mode(first));
+    EXPECT_EQ(1u, set_mode(first_request));
     EXPECT_EQ(held, state());
     board::advance(10s - 1us);
     EXPECT_EQ(held, state());
     board::advance(1us);
-    EXPECT_EQ(ready, state());
+    EXPECT_EQ(when_ready, state());
     board::advance(100s);
     EXPECT_NO_TRACE();
 }

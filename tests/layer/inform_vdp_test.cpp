@@ -4,19 +4,17 @@
 #include "tests/layer/source_events.h"
 #include "u_os.h"
 
+using source_events::answered;
 using source_events::inform;
 using source_events::lock;
+using source_events::lock_failed;
 using source_events::log8;
 using source_events::told;
 using source_events::unlock;
+using source_events::unlock_failed;
 
 namespace
 {
-
-constexpr const char* lock_failed =
-    "Assert(\"x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) == OSR_OK\", \"src/driver/pmx/pmx_port.cpp\")\n";
-constexpr const char* unlock_failed =
-    "Assert(\"x_sema_unlock(MutexPMX) == OSR_OK\", \"src/driver/pmx/pmx_port.cpp\")\n";
 
 /** A plane whose table cannot be fetched. */
 std::string not_told(int colour_space, const SourceTest::Plane& plane, int answer)
@@ -26,12 +24,6 @@ std::string not_told(int colour_space, const SourceTest::Plane& plane, int answe
         LOG5 "Query VDP Interface Fail!\n"
         Assert("0", "src/driver/pmx/pmx_source.cpp")
     )";
-}
-
-/** A call of the mutex that failed. */
-std::string answered(const std::string& line, int answer)
-{
-    return line.substr(0, line.rfind('=')) + "= " + std::to_string(answer) + "\n";
 }
 
 } // namespace

@@ -8,11 +8,6 @@ using Lifecycle = LayerTest;
 namespace
 {
 
-void fail(const char* function, std::int64_t answer)
-{
-    board::faults::set({ function, answer, board::Fault::When::Always });
-}
-
 /** Start-up between the creation of the mutex and the registration, for the boot word 0x0000010C. */
 std::string first_reset()
 {

@@ -7,11 +7,6 @@
 namespace
 {
 
-void* tag(std::uintptr_t number)
-{
-    return reinterpret_cast<void*>(number);
-}
-
 /** Tags that name mixer 0: only their low eight bits count. */
 constexpr std::uintptr_t tags_of_mixer_0[] = { 0, 0x100, 0xFFFFFF00, ~std::uintptr_t{ 0xFF } };
 

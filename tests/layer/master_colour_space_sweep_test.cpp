@@ -10,18 +10,18 @@ using source_events::log8;
 namespace
 {
 
-struct Port
+struct SweptPort
 {
     bool enabled = false;
     bool ycbcr = false;
     int colour_space = 1;
 
-    bool operator==(const Port&) const = default;
+    bool operator==(const SweptPort&) const = default;
 };
 
 struct Situation
 {
-    std::array<Port, 8> ports;
+    std::array<SweptPort, 8> ports;
     int luma_key = 0;
     bool mixed = false;
     int master = 1;
@@ -108,7 +108,7 @@ protected:
     unsigned m_changed = 0;
 
 private:
-    static void put(unsigned port, const Port& what)
+    static void put(unsigned port, const SweptPort& what)
     {
         const std::string name = "arPortInfo[" + std::to_string(port) + "].";
         set_record(name + "fgEnabled", what.enabled ? 1 : 0);
@@ -121,19 +121,19 @@ private:
 
 TEST_F(MasterColourSpaceSweep, DecideMasterColorSpace_EveryStateOfTheVideosUnderSomeGraphics)
 {
-    constexpr Port none{};
-    constexpr Port rgb{ true, false, 0 };
-    constexpr Port sd{ true, true, 0 };
-    constexpr Port hd{ true, true, 1 };
-    constexpr Port stopped{ false, true, 0 };
-    const std::array<Port, 6> graphics[] = { { none, none, none, none, none, none },
-                                             { rgb, stopped, rgb, stopped, rgb, rgb },
-                                             { sd, none, none, none, rgb, none },
-                                             { sd, rgb, none, none, none, hd },
-                                             { none, hd, none, sd, stopped, none } };
+    constexpr SweptPort none{};
+    constexpr SweptPort rgb{ true, false, 0 };
+    constexpr SweptPort sd{ true, true, 0 };
+    constexpr SweptPort hd{ true, true, 1 };
+    constexpr SweptPort stopped{ false, true, 0 };
+    const std::array<SweptPort, 6> graphics[] = { { none, none, none, none, none, none },
+                                                  { rgb, stopped, rgb, stopped, rgb, rgb },
+                                                  { sd, none, none, none, rgb, none },
+                                                  { sd, rgb, none, none, none, hd },
+                                                  { none, hd, none, sd, stopped, none } };
     Situation now;
     const auto with_graphics = [&] {
-        for (const std::array<Port, 6>& planes : graphics)
+        for (const std::array<SweptPort, 6>& planes : graphics)
         {
             for (unsigned i = 0; i < 6; ++i)
                 now.ports[i + 2] = planes[i];
@@ -159,8 +159,10 @@ TEST_F(MasterColourSpaceSweep, DecideMasterColorSpace_EveryStateOfTheVideosUnder
 TEST_F(MasterColourSpaceSweep, DecideMasterColorSpace_EveryStateOfTheGraphicsOverVideos)
 {
     // Off, RGB and YCbCr of either colour space. What does not count has the colour space that would be seen.
-    constexpr Port states[2][4] = { { { false, true, 0 }, { true, false, 1 }, { true, true, 0 }, { true, true, 1 } },
-                                    { { false, true, 1 }, { true, false, 0 }, { true, true, 0 }, { true, true, 1 } } };
+    constexpr SweptPort states[2][4] = {
+        { { false, true, 0 }, { true, false, 1 }, { true, true, 0 }, { true, true, 1 } },
+        { { false, true, 1 }, { true, false, 0 }, { true, true, 0 }, { true, true, 1 } }
+    };
     Situation now;
     now.luma_key = 1;
     now.mixed = true;

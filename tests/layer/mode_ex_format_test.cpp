@@ -10,7 +10,7 @@ using MixerFormat = mode_ex::Test;
 namespace
 {
 
-constexpr const char* refused = R"(
+constexpr const char* refused_change = R"(
     LOG0 "[PMX] PMX_SetModeEx, PMX_CheckCap error, set format change flag, wait display part...\n"
 )";
 
@@ -195,7 +195,7 @@ TEST_F(MixerFormat, SetModeEx_Refused_ReleasesTheHandshakeAndStoresNothing)
         LOG9 "CVBS(1, RES_480I)\n"
         LOG9 "CCIR(0, 0, 0, 0)\n"
         LOG9 "OSD5(1)\n"
-    )") + refused +
+    )") + refused_change +
                  lowered);
     EXPECT_RECORD_CHANGED(before, "status.fgPmxFormatChangeFlag");
 }
@@ -244,7 +244,7 @@ TEST_F(MixerFormat, SetModeEx_AllDisabledAndHdmisModeRefused_WarnsAndRefuses)
         LOG9 "CCIR(0, 0, 0, 0)\n"
         LOG9 "OSD5(0)\n"
         LOG0 "[PMX] Warning: Disable All output, set fmt as 50.\n"
-    )") + refused +
+    )") + refused_change +
                  lowered);
     EXPECT_RECORD_UNCHANGED(before);
 }

@@ -9,11 +9,6 @@ using SetMode = LayerTest;
 namespace
 {
 
-void* tag(std::uintptr_t number)
-{
-    return reinterpret_cast<void*>(number);
-}
-
 /** The table as a neighbouring driver gets it. */
 const IPMX& table()
 {

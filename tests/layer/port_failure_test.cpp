@@ -5,20 +5,17 @@
 #include "tests/layer/source_events.h"
 #include "u_os.h"
 
+using source_events::answered;
+using source_events::done;
 using source_events::lock;
+using source_events::lock_failed;
 using source_events::log8;
+using source_events::no_such_port;
 using source_events::unlock;
+using source_events::unlock_failed;
 
 namespace
 {
-
-constexpr UINT32 done = 0x71000000;
-constexpr UINT32 no_such_port = 0xF1000002;
-
-constexpr const char* lock_failed =
-    "Assert(\"x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) == OSR_OK\", \"src/driver/pmx/pmx_port.cpp\")\n";
-constexpr const char* unlock_failed =
-    "Assert(\"x_sema_unlock(MutexPMX) == OSR_OK\", \"src/driver/pmx/pmx_port.cpp\")\n";
 
 /** The two operations have the same form. */
 struct Operation
@@ -32,12 +29,6 @@ constexpr Operation operations[] = { { i4Pmx_Connect, "connect", 1 }, { i4Pmx_Di
 std::string traces(const Operation& operation, int type, int id, int port)
 {
     return log8("Tp,Id=%d,%d", type, id) + log8(std::string("Comp(%d) ") + operation.verb, port);
-}
-
-/** A call of the mutex that failed. */
-std::string answered(const std::string& line, int answer)
-{
-    return line.substr(0, line.rfind('=')) + "= " + std::to_string(answer) + "\n";
 }
 
 } // namespace

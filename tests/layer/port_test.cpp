@@ -2,15 +2,16 @@
 /** The input ports: which component has which, and what connecting and disconnecting leaves there. */
 #include "tests/layer/source_events.h"
 
+using source_events::done;
 using source_events::lock;
 using source_events::log8;
+using source_events::no_such_port;
+using source_events::port_field;
 using source_events::unlock;
 
 namespace
 {
 
-constexpr UINT32 done = 0x71000000;
-constexpr UINT32 no_such_port = 0xF1000002;
 constexpr UINT16 vdp = 0x41;
 constexpr UINT16 osd = 0xB0;
 
@@ -39,11 +40,6 @@ std::string traced(unsigned type, unsigned id, const char* verb)
            log8(std::string("Comp(%d) ") + verb, static_cast<int>(port_of(type, id))) + unlock();
 }
 
-std::string field(unsigned port, const char* name)
-{
-    return "arPortInfo[" + std::to_string(port) + "]." + name;
-}
-
 } // namespace
 
 class Port : public SourceTest
@@ -55,23 +51,23 @@ protected:
     /** The component on a port: "65/0", "-" when none is recorded. */
     static std::string component(unsigned port)
     {
-        const std::string name =
-            std::to_string(record(field(port, "u2CompType"))) + "/" + std::to_string(record(field(port, "u2CompId")));
-        return record(field(port, "fgConnected")) == 1 ? name : name == "0/0" ? "-" : name + " left behind";
+        const std::string name = std::to_string(record(port_field(port, "u2CompType"))) + "/" +
+                                 std::to_string(record(port_field(port, "u2CompId")));
+        return record(port_field(port, "fgConnected")) == 1 ? name : name == "0/0" ? "-" : name + " left behind";
     }
 
     /** All fields of a port hold values that nothing sets them to by itself. */
     static void fill(unsigned port)
     {
-        set_record(field(port, "u2CompType"), 0x1234);
-        set_record(field(port, "u2CompId"), 0x4321);
-        set_record(field(port, "fgConnected"), 1);
-        set_record(field(port, "fgEnabled"), 1);
-        set_record(field(port, "eInputColorMode"), 77);
-        set_record(field(port, "eSrcColorSpace"), 78);
-        set_record(field(port, "u4SrcWidth"), 79);
-        set_record(field(port, "u4SrcHeight"), 80);
-        set_record(field(port, "ucLumaKey"), 81);
+        set_record(port_field(port, "u2CompType"), 0x1234);
+        set_record(port_field(port, "u2CompId"), 0x4321);
+        set_record(port_field(port, "fgConnected"), 1);
+        set_record(port_field(port, "fgEnabled"), 1);
+        set_record(port_field(port, "eInputColorMode"), 77);
+        set_record(port_field(port, "eSrcColorSpace"), 78);
+        set_record(port_field(port, "u4SrcWidth"), 79);
+        set_record(port_field(port, "u4SrcHeight"), 80);
+        set_record(port_field(port, "ucLumaKey"), 81);
     }
 };
 
@@ -202,11 +198,12 @@ TEST_F(Port, Connect_ChangesNothingButTheComponent)
     for (unsigned port = 0; port < 8; ++port)
     {
         fill(port);
-        set_record(field(port, "fgConnected"), 0);
+        set_record(port_field(port, "fgConnected"), 0);
         const RecordSnapshot before;
         const UINT16 id = static_cast<UINT16>(port < 2 ? port : port - 2);
         EXPECT_EQ(done, connect(port < 2 ? vdp : osd, id));
-        EXPECT_RECORD_CHANGED(before, field(port, "u2CompType"), field(port, "u2CompId"), field(port, "fgConnected"));
+        EXPECT_RECORD_CHANGED(before, port_field(port, "u2CompType"), port_field(port, "u2CompId"),
+                              port_field(port, "fgConnected"));
         EXPECT_EQ(std::to_string(port < 2 ? 65 : 176) + "/" + std::to_string(id), component(port));
     }
 }
@@ -218,12 +215,12 @@ TEST_F(Port, Disconnect_KeepsWhatIsKnownOfTheSource)
         fill(port);
         const RecordSnapshot before;
         EXPECT_EQ(done, disconnect(port < 2 ? vdp : osd, static_cast<UINT16>(port < 2 ? port : port - 2)));
-        EXPECT_RECORD_CHANGED(before, field(port, "u2CompType"), field(port, "u2CompId"), field(port, "fgConnected"),
-                              field(port, "fgEnabled"));
+        EXPECT_RECORD_CHANGED(before, port_field(port, "u2CompType"), port_field(port, "u2CompId"),
+                              port_field(port, "fgConnected"), port_field(port, "fgEnabled"));
         EXPECT_EQ("-", component(port));
-        EXPECT_EQ(0, record(field(port, "fgEnabled")));
-        EXPECT_EQ(78, record(field(port, "eSrcColorSpace")));
-        EXPECT_EQ(81, record(field(port, "ucLumaKey")));
+        EXPECT_EQ(0, record(port_field(port, "fgEnabled")));
+        EXPECT_EQ(78, record(port_field(port, "eSrcColorSpace")));
+        EXPECT_EQ(81, record(port_field(port, "ucLumaKey")));
     }
 }
 

@@ -5,16 +5,6 @@
 
 using Shutdown = LayerTest;
 
-namespace
-{
-
-void fail(const char* function, std::int64_t answer)
-{
-    board::faults::set({ function, answer, board::Fault::When::Always });
-}
-
-} // namespace
-
 TEST_F(Shutdown, Uninit_TakesEverythingBack)
 {
     started();

@@ -146,6 +146,11 @@ std::string log8(std::string text, int first, int second)
     return "LOG8 \"" + text + "\\n\"\n";
 }
 
+std::string port_field(unsigned port, const char* name)
+{
+    return "arPortInfo[" + std::to_string(port) + "]." + name;
+}
+
 std::string lock()
 {
     return "x_sema_lock(" + std::to_string(SourceTest::record("MutexPMX")) + ", X_SEMA_OPTION_WAIT) = 0\n";
@@ -154,6 +159,15 @@ std::string lock()
 std::string unlock()
 {
     return "x_sema_unlock(" + std::to_string(SourceTest::record("MutexPMX")) + ") = 0\n";
+}
+
+const char* const lock_failed =
+    "Assert(\"x_sema_lock(MutexPMX, X_SEMA_OPTION_WAIT) == OSR_OK\", \"src/driver/pmx/pmx_port.cpp\")\n";
+const char* const unlock_failed = "Assert(\"x_sema_unlock(MutexPMX) == OSR_OK\", \"src/driver/pmx/pmx_port.cpp\")\n";
+
+std::string answered(const std::string& line, int answer)
+{
+    return line.substr(0, line.rfind('=')) + "= " + std::to_string(answer) + "\n";
 }
 
 std::string told(int colour_space, const SourceTest::Plane& plane)

@@ -59,12 +59,24 @@ protected:
 namespace source_events
 {
 
+/** What connecting and disconnecting answer. */
+constexpr UINT32 done = 0x71000000;
+constexpr UINT32 no_such_port = 0xF1000002;
+
+/** A field of a port in the record: "arPortInfo[3].eSrcColorSpace". */
+std::string port_field(unsigned port, const char* name);
+
 /** A line of the trace from a text with numbers, without its end of line: log8("VDP_%d Enabled", 2). */
 std::string log8(std::string text, int first = 0, int second = 0);
 
 /** How the planes are told a colour space: all that is connected is given, in the order of the ports. */
 std::string lock();
 std::string unlock();
+/** What a call of the mutex that fails leaves on the console, and such a call: the line of one that worked, with
+ *  another answer. */
+extern const char* const lock_failed;
+extern const char* const unlock_failed;
+std::string answered(const std::string& line, int answer);
 std::string told(int colour_space, const SourceTest::Plane& plane);
 std::string inform(int colour_space, const SourceTest::Planes& connected);
 

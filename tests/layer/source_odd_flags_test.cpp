@@ -7,38 +7,34 @@
 using source_events::change;
 using source_events::inform;
 using source_events::log8;
+using source_events::port_field;
 
 namespace
 {
 
-constexpr unsigned odd_numbers[] = { 2, 128, 254, 255 };
-
-std::string field(unsigned port, const char* name)
-{
-    return "arPortInfo[" + std::to_string(port) + "]." + name;
-}
+constexpr unsigned odd_bytes[] = { 2, 128, 254, 255 };
 
 } // namespace
 
 class OddPort : public SourceTest
 {
 protected:
-    static void flag(unsigned port, const char* name, unsigned number) { set_record(field(port, name), number); }
-    static std::int64_t flag(unsigned port, const char* name) { return record(field(port, name)); }
+    static void flag(unsigned port, const char* name, unsigned number) { set_record(port_field(port, name), number); }
+    static std::int64_t flag(unsigned port, const char* name) { return record(port_field(port, name)); }
 
     /** A source whose plane counts for the master colour space, in BT.601. */
     static void source(unsigned port, unsigned enabled)
     {
         flag(port, "fgEnabled", enabled);
         flag(port, "ucLumaKey", enabled);
-        set_record(field(port, "eInputColorMode"), DRV_GFX_COLOR_MODE_YCBCR);
-        set_record(field(port, "eSrcColorSpace"), DRV_PMX_CS_YCBCR_601);
+        set_record(port_field(port, "eInputColorMode"), DRV_GFX_COLOR_MODE_YCBCR);
+        set_record(port_field(port, "eSrcColorSpace"), DRV_PMX_CS_YCBCR_601);
     }
 };
 
 TEST_F(OddPort, Connect_ConnectedIsOne_AndEnabledStaysAsItWas)
 {
-    for (const unsigned number : odd_numbers)
+    for (const unsigned number : odd_bytes)
     {
         flag(3, "fgConnected", number);
         flag(3, "fgEnabled", number);
@@ -50,7 +46,7 @@ TEST_F(OddPort, Connect_ConnectedIsOne_AndEnabledStaysAsItWas)
 
 TEST_F(OddPort, Disconnect_BothFlagsAreZero)
 {
-    for (const unsigned number : odd_numbers)
+    for (const unsigned number : odd_bytes)
     {
         flag(3, "fgConnected", number);
         flag(3, "fgEnabled", number);
@@ -62,7 +58,7 @@ TEST_F(OddPort, Disconnect_BothFlagsAreZero)
 
 TEST_F(OddPort, VdpEnabled_AnyNonZeroConnected_IsConnected_AndEnabledBecomesOne)
 {
-    for (const unsigned number : odd_numbers)
+    for (const unsigned number : odd_bytes)
     {
         for (const unsigned port : { 0u, 1u })
         {
@@ -81,7 +77,7 @@ TEST_F(OddPort, VdpEnabled_AnyNonZeroConnected_IsConnected_AndEnabledBecomesOne)
 
 TEST_F(OddPort, VdpDisabled_EnabledBecomesZero)
 {
-    for (const unsigned number : odd_numbers)
+    for (const unsigned number : odd_bytes)
     {
         flag(0, "fgEnabled", number);
         flag(1, "fgEnabled", number);
@@ -95,7 +91,7 @@ TEST_F(OddPort, VdpDisabled_EnabledBecomesZero)
 
 TEST_F(OddPort, OsdEnabledAndDisabled_EnabledBecomesOneAndZero)
 {
-    for (const unsigned number : odd_numbers)
+    for (const unsigned number : odd_bytes)
     {
         flag(7, "fgEnabled", number);
         EXPECT_EQ(1u, PMX_OsdEnabled(0, 5, 1280, 720, DRV_GFX_COLOR_MODE_RGB));
@@ -108,11 +104,11 @@ TEST_F(OddPort, OsdEnabledAndDisabled_EnabledBecomesOneAndZero)
 
 TEST_F(OddPort, DecideMasterColorSpace_AnyNonZeroEnabled_Counts)
 {
-    for (const unsigned number : odd_numbers)
+    for (const unsigned number : odd_bytes)
     {
         for (unsigned port = 0; port < 8; ++port)
         {
-            SCOPED_TRACE(field(port, "fgEnabled = ") + std::to_string(number));
+            SCOPED_TRACE(port_field(port, "fgEnabled = ") + std::to_string(number));
             set_record("eMasterColorSpace", DRV_PMX_CS_YCBCR_709);
             source(port, number);
             mix_second_video(true);
@@ -134,7 +130,7 @@ TEST_F(OddPort, DecideMasterColorSpace_OnlyTheWholeNumberZeroIsYCbCr)
         for (unsigned port = 2; port < 8; ++port)
         {
             source(port, 1);
-            set_record(field(port, "eInputColorMode"), mode);
+            set_record(port_field(port, "eInputColorMode"), mode);
         }
         EXPECT_EQ(1u, PMX_DecideMasterColorSpace(0));
         EXPECT_NO_TRACE();
@@ -146,7 +142,7 @@ TEST_F(OddPort, InformVdpColorSpace_AnyNonZeroConnected_IsTold)
 {
     for (const Plane& plane : { main_video, second_video })
         connect(plane);
-    for (const unsigned number : odd_numbers)
+    for (const unsigned number : odd_bytes)
     {
         flag(0, "fgConnected", number);
         flag(1, "fgConnected", 0);

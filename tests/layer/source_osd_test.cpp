@@ -22,7 +22,7 @@ namespace
 {
 
 /** The port of an OSD plane. */
-std::string port(unsigned plane)
+std::string osd_port(unsigned plane)
 {
     return "arPortInfo[" + std::to_string(plane + 2) + "].";
 }
@@ -100,7 +100,7 @@ TEST_F(SourceOsd, OsdEnabled_EachPlaneInEachColourSpaceFromEachMaster)
                 EXPECT_EQ(1u, source == 1 ? enable(plane, 1280, 720) : enable(plane, 720, 480));
                 EXPECT_TRACE(enabled(plane, source) + (was == source ? "" : announce(source)));
                 EXPECT_EQ(source, master());
-                EXPECT_EQ(source, record(port(plane) + "eSrcColorSpace"));
+                EXPECT_EQ(source, record(osd_port(plane) + "eSrcColorSpace"));
             }
         }
     }
@@ -139,12 +139,12 @@ TEST_F(SourceOsd, OsdEnabled_Rgb_OnlySaysSo)
         for (const int was : { 0, 1 })
         {
             master(was);
-            set_record(port(plane) + "fgEnabled", 0);
+            set_record(osd_port(plane) + "fgEnabled", 0);
             const RecordSnapshot before;
             EXPECT_EQ(1u, enable(plane, was == 0 ? 1920 : 720, 480, DRV_GFX_COLOR_MODE_RGB));
             EXPECT_TRACE(enabled_in_rgb(plane));
-            EXPECT_RECORD_CHANGED(before, port(plane) + "fgEnabled");
-            EXPECT_EQ(1, record(port(plane) + "fgEnabled"));
+            EXPECT_RECORD_CHANGED(before, osd_port(plane) + "fgEnabled");
+            EXPECT_EQ(1, record(osd_port(plane) + "fgEnabled"));
         }
     }
 }
@@ -302,8 +302,8 @@ TEST_F(SourceOsd, OsdDisabled_NothingElseEnabled_MasterStays)
         board::trace::clear();
         EXPECT_EQ(1u, PMX_OsdDisabled(0, static_cast<UCHAR>(plane)));
         EXPECT_TRACE(log8("OSD_%d Disabled", static_cast<int>(plane)));
-        EXPECT_EQ(0, record(port(plane) + "fgEnabled"));
-        EXPECT_EQ(DRV_GFX_COLOR_MODE_YCBCR, record(port(plane) + "eInputColorMode"));
+        EXPECT_EQ(0, record(osd_port(plane) + "fgEnabled"));
+        EXPECT_EQ(DRV_GFX_COLOR_MODE_YCBCR, record(osd_port(plane) + "eInputColorMode"));
         EXPECT_EQ(DRV_PMX_CS_YCBCR_601, master());
     }
 }

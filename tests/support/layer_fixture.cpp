@@ -174,6 +174,11 @@ void LayerTest::TearDown()
         std::filesystem::remove_all(m_directory);
 }
 
+void LayerTest::fail(const char* function, std::int64_t answer)
+{
+    board::faults::set({ function, answer, board::Fault::When::Always });
+}
+
 void LayerTest::watch_stores()
 {
     record_view::watch_stores(true);

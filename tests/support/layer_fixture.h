@@ -84,6 +84,12 @@ protected:
     void expect_asserts(unsigned number) { m_asserts = number; }
     void expect_misuses(unsigned number) { m_misuses = number; }
 
+    /** A platform function answers this, however often it is called. */
+    static void fail(const char* function, std::int64_t answer);
+
+    /** As IPMX takes it: a number carried in a pointer. */
+    static void* tag(std::uintptr_t number) { return reinterpret_cast<void*>(number); }
+
     /** From now on the trace holds what is stored, so that EXPECT_TRACE shows it: `SET ucMode RES_480I → RES_480P`. */
     static void watch_stores();
 

@@ -10,7 +10,6 @@ namespace
 {
 
 using namespace pmxboard::decode;
-using Kind = Departure::Kind;
 
 const std::string scenario = PMX_SOURCE_DIR "/scenarios/first-mode-after-boot.pmx";
 
@@ -74,7 +73,7 @@ TEST(DecodeAgainst, ChangedValue_IsFoundByName)
 {
     const Comparison found = against(with(captured(), "HDMI(1, RES_1080P60HZ)", "HDMI(1, RES_1080P50HZ)"));
     ASSERT_TRUE(found.departure);
-    EXPECT_EQ(Kind::Value, found.departure->kind);
+    EXPECT_EQ(Departure::Kind::Value, found.departure->kind);
     EXPECT_EQ(11u, found.departure->found->line);
     EXPECT_EQ("HDMI(1, RES_1080P50HZ)", found.departure->found->shown);
     EXPECT_EQ("HDMI(1, RES_1080P60HZ)", found.departure->expected->item.shown);
@@ -90,7 +89,7 @@ TEST(DecodeAgainst, MissingLine_IsNamedWithWhatStandsInItsPlace)
 {
     const Comparison found = against(with_line(captured(), 22, ""));
     ASSERT_TRUE(found.departure);
-    EXPECT_EQ(Kind::Missing, found.departure->kind);
+    EXPECT_EQ(Departure::Kind::Missing, found.departure->kind);
     EXPECT_EQ("Mode(12), eMixerOutCS(1)", found.departure->expected->item.shown);
     EXPECT_EQ("CC_A disable", found.departure->found->shown);
     EXPECT_EQ(23u, found.departure->found->line);
@@ -101,7 +100,7 @@ TEST(DecodeAgainst, LineTooMany_IsFound)
 {
     const Comparison found = against(with_line(captured(), 24, line_of(captured(), 24) + "CC_A enable, 601->709\n"));
     ASSERT_TRUE(found.departure);
-    EXPECT_EQ(Kind::Extra, found.departure->kind);
+    EXPECT_EQ(Departure::Kind::Extra, found.departure->kind);
     EXPECT_EQ(25u, found.departure->found->line);
     EXPECT_EQ("CC_A enable, 601->709", found.departure->found->shown);
     EXPECT_EQ("Scaler CC enable, 709->601", found.departure->expected->item.shown);
@@ -112,7 +111,7 @@ TEST(DecodeAgainst, SwappedLines_AreFound)
     const std::string log = captured();
     const Comparison found = against(with_line(with_line(log, 12, line_of(log, 13)), 13, line_of(log, 12)));
     ASSERT_TRUE(found.departure);
-    EXPECT_EQ(Kind::Swapped, found.departure->kind);
+    EXPECT_EQ(Departure::Kind::Swapped, found.departure->kind);
     EXPECT_EQ(12u, found.departure->found->line);
     EXPECT_EQ("CVBS(1, RES_480I)", found.departure->found->shown);
     EXPECT_EQ("CAV (1, RES_480P)", found.departure->expected->item.shown);
@@ -122,7 +121,7 @@ TEST(DecodeAgainst, AnotherLine_IsFound)
 {
     const Comparison found = against(with(captured(), "CC_A disable", "CC_A enable, 601->709"));
     ASSERT_TRUE(found.departure);
-    EXPECT_EQ(Kind::Different, found.departure->kind);
+    EXPECT_EQ(Departure::Kind::Different, found.departure->kind);
     EXPECT_EQ(24u, found.departure->found->line);
 }
 
@@ -140,7 +139,7 @@ TEST(DecodeAgainst, LogFromTheMiddleWithADeparture_IsAlignedAndFound)
     const std::string log = captured();
     const Comparison found = against(with(log.substr(begin_of(log, 13)), "HD Exist(1)", "HD Exist(0)"));
     ASSERT_TRUE(found.departure);
-    EXPECT_EQ(Kind::Value, found.departure->kind);
+    EXPECT_EQ(Departure::Kind::Value, found.departure->kind);
     EXPECT_EQ(5u, found.departure->found->line);
     EXPECT_EQ(9u, found.skipped);
     EXPECT_EQ(3u, found.agreeing);
@@ -165,7 +164,7 @@ TEST(DecodeAgainst, LogOfALowerLevel_OnlyWhatItShowsIsCompared)
     EXPECT_EQ(8u, found.agreeing);
     const Comparison detailed = against(log, 9);
     ASSERT_TRUE(detailed.departure);
-    EXPECT_EQ(Kind::Missing, detailed.departure->kind);
+    EXPECT_EQ(Departure::Kind::Missing, detailed.departure->kind);
     EXPECT_EQ("CCIR(0, RES_480I)", detailed.departure->expected->item.shown);
 }
 
@@ -173,7 +172,7 @@ TEST(DecodeAgainst, LogGoesOnBehindTheScenario_ThatIsTooMany)
 {
     const Comparison found = against(captured() + "\nPMX_Stop\n");
     ASSERT_TRUE(found.departure);
-    EXPECT_EQ(Kind::Extra, found.departure->kind);
+    EXPECT_EQ(Departure::Kind::Extra, found.departure->kind);
     EXPECT_FALSE(found.departure->expected);
     EXPECT_EQ("PMX_Stop", operation_of(*found.departure));
 }

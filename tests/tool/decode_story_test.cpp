@@ -24,9 +24,9 @@ std::string told(const std::string& log)
     return story;
 }
 
-const std::string held_back = "[   10.000300] [PMX] fgPMX_DisplayModeReady is 1.\r\n"
-                              "[   10.000400] [PMX] VDP_SetClearVideo & Not Mix OSD..\r\n"
-                              "[   10.000500] Display Format Change Timer Set.\r\n";
+const std::string lines_held_back = "[   10.000300] [PMX] fgPMX_DisplayModeReady is 1.\r\n"
+                                    "[   10.000400] [PMX] VDP_SetClearVideo & Not Mix OSD..\r\n"
+                                    "[   10.000500] Display Format Change Timer Set.\r\n";
 const std::string told_held_back =
     "1-3 PMX_SetModeEx: a mode change, of which the log has the end | graphics held back until the display part has "
     "switched | the display timer runs\n";
@@ -55,11 +55,11 @@ TEST(DecodeStory, TimerReleases_IsAProblem)
 {
     EXPECT_EQ(told_held_back + "! 4-8 _PMX_TmrIsr: the timer runs out after 10.0 s: the display part has not answered "
                                "| graphics are back\n",
-              told(held_back + "[   20.000400] PMX timeout.\n"
-                               "[   20.000500] Display Format Change :0.\n"
-                               "[   20.000600] Set Osd Enable :1.\n"
-                               "[   20.000700] PMX_SetOsdEnable.\n"
-                               "[   20.000800] Set Osd Enable :0.\n"));
+              told(lines_held_back + "[   20.000400] PMX timeout.\n"
+                                     "[   20.000500] Display Format Change :0.\n"
+                                     "[   20.000600] Set Osd Enable :1.\n"
+                                     "[   20.000700] PMX_SetOsdEnable.\n"
+                                     "[   20.000800] Set Osd Enable :0.\n"));
 }
 
 TEST(DecodeStory, VideoPlaneWaits_LetsGraphicsBackLater)
@@ -67,10 +67,10 @@ TEST(DecodeStory, VideoPlaneWaits_LetsGraphicsBackLater)
     EXPECT_EQ(told_held_back + "4-5 PMX_SetFormatChangeFlag: the display part has switched after 1.0 s | graphics go "
                                "on waiting, for the video plane driver\n"
                                "6-7 PMX_SetOsdEnable: graphics are back after 1.5 s: the video plane driver let them\n",
-              told(held_back + "[   11.000400] Display Format Change :0.\n"
-                               "[   11.000500] Set Osd Enable :1.\n"
-                               "[   11.500400] PMX_SetOsdEnable.\n"
-                               "[   11.500500] Set Osd Enable :0.\n"));
+              told(lines_held_back + "[   11.000400] Display Format Change :0.\n"
+                                     "[   11.000500] Set Osd Enable :1.\n"
+                                     "[   11.500400] PMX_SetOsdEnable.\n"
+                                     "[   11.500500] Set Osd Enable :0.\n"));
 }
 
 TEST(DecodeStory, TimerOfAnEarlierChange_IsNoProblem)
@@ -82,7 +82,7 @@ TEST(DecodeStory, TimerOfAnEarlierChange_IsNoProblem)
 TEST(DecodeStory, StillHeldBackAtTheEnd_IsSaid)
 {
     EXPECT_EQ(told_held_back + "! 2-3 PMX_SetModeEx: graphics are still held back where the log ends\n",
-              told(held_back));
+              told(lines_held_back));
 }
 
 TEST(DecodeStory, NotWaited_FlagAndGraphicsBelongToTheModeChange)

@@ -8,8 +8,7 @@ namespace
 {
 
 using tool_test::diagnostics;
-
-const std::string repeat = "\nrepeat: pmxboard run here.pmx\n";
+using tool_test::repeat;
 
 /** A scenario whose second line is an expectation on the first. */
 std::string after(const std::string& command, const std::string& expectation)

@@ -18,15 +18,10 @@ namespace
 {
 
 using tool_test::diagnostics;
+using tool_test::repeat;
 using tool_test::run;
 
-const std::string repeat = "\nrepeat: pmxboard run here.pmx\n";
 const std::string change = "PMX_SetModeEx 0 [ [0], [1, RES_1080P50HZ], [1, RES_576P], [1, RES_576I] ] 50 0 0\n";
-
-std::vector<std::string> candidates(std::string_view line)
-{
-    return pmxboard::complete(line, line.size()).candidates;
-}
 
 TEST(MeanwhileVerb, RunsInsideTheCall_BelowItInTheTrace)
 {
@@ -317,7 +312,7 @@ TEST(ThreadVerb, IsTheSameEveryTime)
 TEST(MeanwhileVerb, Completion)
 {
     const auto has = [](const std::string& line, const std::string& word) {
-        const auto all = candidates(line);
+        const auto all = pmxboard::complete(line, line.size()).candidates;
         return std::find(all.begin(), all.end(), word) != all.end();
     };
     EXPECT_TRUE(has("meanwhile ", "x_thread_delay"));
@@ -392,7 +387,7 @@ TEST(MeanwhileVerb, HostileLines_AreRefusedOrDone_AndNothingElse)
         carry_out("PMX_Init");
         EXPECT_NO_THROW(carry_out(line)) << line;
         EXPECT_NO_THROW(carry_out("source vdp0 start 1920x1080")) << line;
-        (void)candidates(line);
+        (void)pmxboard::complete(line, line.size()).candidates;
     }
 }
 

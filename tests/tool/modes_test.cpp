@@ -7,6 +7,7 @@
 #include <sstream>
 
 #include "drv_if_pmx.h"
+#include "shown.h"
 #include "tests/layer/mode_facts.h"
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/commands/modes.h"
@@ -19,6 +20,7 @@ namespace
 using record_view::ColourGroup;
 using record_view::mode_row;
 using record_view::ModeRow;
+using tool_test::Shown;
 
 ColourGroup group_of(mode_facts::Colours colours)
 {
@@ -88,24 +90,14 @@ TEST(Modes, PrintedNames)
         EXPECT_FALSE(mode_row(number).printed_name) << number;
 }
 
-struct Shown
+Shown modes_shown(const std::vector<std::string>& words, bool json = false)
 {
-    int code;
-    std::string out;
-    std::string err;
-};
-
-Shown show(const std::vector<std::string>& words, bool json = false)
-{
-    std::ostringstream out;
-    testing::internal::CaptureStderr();
-    const int code = pmxboard::show_modes({ words, json, "never" }, out);
-    return { code, out.str(), testing::internal::GetCapturedStderr() };
+    return tool_test::shown_by([&](std::ostream& out) { return pmxboard::show_modes({ words, json, "never" }, out); });
 }
 
 TEST(Modes, Table_HasEveryModeIn80Columns)
 {
-    std::istringstream lines(show({}).out);
+    std::istringstream lines(modes_shown({}).out);
     std::string line;
     std::getline(lines, line);
     for (unsigned number = 0; number < RES_MODE_NUM; ++number)
@@ -119,28 +111,28 @@ TEST(Modes, Table_HasEveryModeIn80Columns)
 
 TEST(Modes, NumbersAndNames_AreTheSame)
 {
-    EXPECT_EQ(show({ "10" }).out, show({ "RES_1080I60HZ" }).out);
-    EXPECT_EQ(show({ "0x0A" }, true).out, show({ "RES_1080I60HZ" }, true).out);
-    EXPECT_EQ(pmxboard::exit_done, show({ "10", "RES_480P" }).code);
-    EXPECT_THAT(show({ "10", "RES_480P" }).out,
+    EXPECT_EQ(modes_shown({ "10" }).out, modes_shown({ "RES_1080I60HZ" }).out);
+    EXPECT_EQ(modes_shown({ "0x0A" }, true).out, modes_shown({ "RES_1080I60HZ" }, true).out);
+    EXPECT_EQ(pmxboard::exit_done, modes_shown({ "10", "RES_480P" }).code);
+    EXPECT_THAT(modes_shown({ "10", "RES_480P" }).out,
                 testing::AllOf(testing::HasSubstr("RES_1080I60HZ (10)\n"), testing::HasSubstr("\nRES_480P (2)\n")));
 }
 
 TEST(Modes, ANumberWithoutMode_IsSaidToBeNone)
 {
-    const Shown shown = show({ "200" });
+    const Shown shown = modes_shown({ "200" });
     EXPECT_EQ(pmxboard::exit_done, shown.code);
     EXPECT_TRUE(shown.out.starts_with("no mode has the number 200\n")) << shown.out;
 }
 
 TEST(Modes, UnknownNames_AreRefusedWithTheNearest)
 {
-    const Shown near = show({ "RES_1080I60" });
+    const Shown near = modes_shown({ "RES_1080I60" });
     EXPECT_EQ(pmxboard::exit_usage, near.code);
     EXPECT_EQ("", near.out);
     EXPECT_THAT(near.err, testing::HasSubstr("did you mean RES_1080I60HZ"));
     for (const char* const wrong : { "PMX_TV_TYPE_PAL", "256", "-1", "010", "x" })
-        EXPECT_EQ(pmxboard::exit_usage, show({ wrong }).code) << wrong;
+        EXPECT_EQ(pmxboard::exit_usage, modes_shown({ wrong }).code) << wrong;
 }
 
 TEST(Modes, Json_IsAListWithStableKeys)
@@ -169,7 +161,7 @@ TEST(Modes, Json_IsAListWithStableKeys)
   }
 ]
 )",
-              show({ "39" }, true).out);
+              modes_shown({ "39" }, true).out);
 }
 
 } // namespace

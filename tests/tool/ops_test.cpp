@@ -6,6 +6,7 @@
 
 #include "board/board.h"
 #include "scenario_run.h"
+#include "shown.h"
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/commands/ops.h"
 #include "tools/pmxboard/functions/contracts.h"
@@ -21,20 +22,13 @@ using pmxboard::example_of;
 using pmxboard::Operation;
 using pmxboard::operations;
 using testing::HasSubstr;
+using tool_test::Shown;
 
-struct Shown
+Shown operations_shown(const std::vector<std::string>& names, bool json = false)
 {
-    int code;
-    std::string out;
-    std::string err;
-};
-
-Shown show(const std::vector<std::string>& names, bool json = false)
-{
-    std::ostringstream out;
-    testing::internal::CaptureStderr();
-    const int code = pmxboard::show_operations({ names, json, "never" }, out);
-    return { code, out.str(), testing::internal::GetCapturedStderr() };
+    return tool_test::shown_by([&](std::ostream& out) {
+        return pmxboard::show_operations({ names, json, "never" }, out);
+    });
 }
 
 constexpr const char* no_example = " has no example: tools/pmxboard/functions/operation_examples.cpp";
@@ -82,7 +76,7 @@ TEST(Ops, EachText_TellsArgumentsContractAndExample)
     for (const Operation& operation : operations())
     {
         const Contract& contract = *contract_of(operation.name);
-        const Shown shown = show({ operation.name });
+        const Shown shown = operations_shown({ operation.name });
         EXPECT_EQ(pmxboard::exit_done, shown.code);
         EXPECT_TRUE(shown.out.starts_with(pmxboard::usage(operation) + "\n")) << shown.out;
         const pmxboard::OperationExample* const example = example_of(operation.name);
@@ -118,12 +112,12 @@ Example
   PMX_Init
   PMX_SetTvType 0 PMX_TV_TYPE_PAL
 )",
-              show({ "PMX_SetTvType" }).out);
+              operations_shown({ "PMX_SetTvType" }).out);
 }
 
 TEST(Ops, List_HasEveryOperationIn80Columns)
 {
-    const std::string list = show({}).out;
+    const std::string list = operations_shown({}).out;
     for (const Operation& operation : operations())
         EXPECT_THAT(list, HasSubstr("\n  " + operation.name + " "));
     EXPECT_TRUE(list.starts_with("Life cycle and power\n  PMX_Init ")) << list.substr(0, 80);
@@ -137,8 +131,8 @@ TEST(Ops, Patterns_List_NamesExplain)
 {
     EXPECT_EQ("Mode\n  PMX_SetMode    Set one resolution mode on all outputs\n"
               "  PMX_SetModeEx  Set the state of all four outputs\n",
-              show({ "PMX_SetMode*" }).out);
-    const std::string two = show({ "PMX_GetMode", "PMX_GetMode", "PMX_Stop" }).out;
+              operations_shown({ "PMX_SetMode*" }).out);
+    const std::string two = operations_shown({ "PMX_GetMode", "PMX_GetMode", "PMX_Stop" }).out;
     EXPECT_TRUE(two.starts_with("PMX_GetMode ucPmxId\n")) << two;
     EXPECT_THAT(two, HasSubstr("\n\nPMX_Stop\n"));
     EXPECT_EQ(two.find("PMX_GetMode ucPmxId\n"), two.rfind("PMX_GetMode ucPmxId\n"));
@@ -154,23 +148,23 @@ Switch an encoder on or off.
   u4Tve     TVE_1 or TVE_2
   fgEnable  on
 )",
-              show({ "TVE_SetEnable" }).out);
+              operations_shown({ "TVE_SetEnable" }).out);
     for (const auto& function : board::platform_functions())
         EXPECT_NE(nullptr, contract_of(function.name)) << function.name;
 }
 
 TEST(Ops, UnknownNames_AreRefusedWithTheNearest)
 {
-    const Shown shown = show({ "PMX_SetTvTyp" });
+    const Shown shown = operations_shown({ "PMX_SetTvTyp" });
     EXPECT_EQ(pmxboard::exit_usage, shown.code);
     EXPECT_EQ("", shown.out);
     EXPECT_EQ("pmxboard: no operation PMX_SetTvTyp; did you mean PMX_SetTvType?\n", shown.err);
-    EXPECT_EQ(pmxboard::exit_usage, show({ "PMX_Init", "NO_*" }).code);
+    EXPECT_EQ(pmxboard::exit_usage, operations_shown({ "PMX_Init", "NO_*" }).code);
 }
 
 TEST(Ops, Json_IsAListWithStableKeys)
 {
-    const std::string json = show({ "PMX_GetMode", "TVE_SetEnable" }, true).out;
+    const std::string json = operations_shown({ "PMX_GetMode", "TVE_SetEnable" }, true).out;
     EXPECT_TRUE(json.starts_with("[\n  {\n    \"name\": \"PMX_GetMode\",\n    \"owner\": \"layer\",\n")) << json;
     for (const char* const part :
          { "\"usage\": \"PMX_GetMode ucPmxId\"",
@@ -181,7 +175,7 @@ TEST(Ops, Json_IsAListWithStableKeys)
            "\"example_needs\": [\n      \"PMX_Init\"\n    ]", "\"name\": \"RES_2160P\"", "\"owner\": \"platform\"" })
         EXPECT_THAT(json, HasSubstr(part));
     EXPECT_EQ(operations().size(), [] {
-        const std::string all = show({}, true).out;
+        const std::string all = operations_shown({}, true).out;
         std::size_t count = 0;
         for (std::size_t at = 0; (at = all.find("\"example\": \"", at)) != all.npos; ++at)
             ++count;

@@ -42,6 +42,16 @@ inline Run run(const std::string& lines, pmxboard::OutputOptions options = {}, b
     return { done, shown.str(), trace.str(), diagnostics.str() };
 }
 
+/** What stands behind the echo of the last command. */
+inline std::string behind_last(const std::string& shown)
+{
+    const std::size_t last = shown.rfind("> ");
+    return shown.substr(shown.find('\n', last) + 1);
+}
+
+/** How a failed run of here.pmx ends. */
+inline const std::string repeat = "\nrepeat: pmxboard run here.pmx\n";
+
 /** With the trace in another form. */
 inline Run run_traced(const std::string& lines, std::string_view form, bool trace_apart = false,
                       pmxboard::OutputOptions options = {})

@@ -21,14 +21,9 @@ using board::Value;
 using pmxboard::DumpError;
 using pmxboard::read_dump;
 using pmxboard::StateDump;
+using tool_test::behind_last;
 using tool_test::run;
 using Json = nlohmann::json;
-
-std::string behind_last(const std::string& shown)
-{
-    const std::size_t last = shown.rfind("> ");
-    return shown.substr(shown.find('\n', last) + 1);
-}
 
 /** Why a text is no dump. */
 std::string refused(const std::string& text)

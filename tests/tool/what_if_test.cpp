@@ -18,15 +18,9 @@
 namespace
 {
 
+using tool_test::behind_last;
 using tool_test::diagnostics;
 using tool_test::run;
-
-/** What stands behind the echo of the last command. */
-std::string behind_last(const std::string& shown)
-{
-    const std::size_t last = shown.rfind("> ");
-    return shown.substr(shown.find('\n', last) + 1);
-}
 
 /** Everything that a command could have left behind. */
 struct Everything

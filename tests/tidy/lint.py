@@ -79,7 +79,16 @@ def to_look_at(sources, root):
 def commands_of(build):
     """How the build compiles every file of the project; a generated file is nobody's to clean up."""
     commands = json.loads((build / "compile_commands.json").read_text(encoding="utf-8"))
-    return [command for command in commands if not pathlib.Path(command["file"]).is_relative_to(build)]
+    return [{**command, "file": file, "given": command["file"]} for command in commands for file in compiled_with(command)
+            if not pathlib.Path(file).is_relative_to(build)]
+
+
+def compiled_with(command):
+    """The sources that a command compiles: one, or those of the batch that the build has put together."""
+    file = pathlib.Path(command["file"])
+    if not file.name.startswith("unity_"):
+        return [command["file"]]
+    return re.findall(r'^#include "(.*)"$', file.read_text(encoding="utf-8"), re.M)
 
 
 def arguments_of(command):
@@ -91,19 +100,21 @@ def arguments_of(command):
         if word == "-include" and words and words[0].endswith("/cmake_pch.hxx"):
             precompiled.append(pathlib.Path(words.pop(0)))
         else:
-            kept.append(word)
+            kept.append(command["file"] if word == command.get("given") else word)
     return kept, precompiled
 
 
 def sources_of(commands, build):
     """{source: the project's files that it was last made from}."""
     made_from, sources = dependencies(build), {}
+    every_source = {pathlib.Path(command["file"]) for command in commands}
     for command in commands:
         words, precompiled = arguments_of(command)
         read = set(made_from.get(words[words.index("-o") + 1], ()))
         for header in precompiled:
             read |= made_from.get(f"{header.relative_to(build)}.gch", set())
-        sources[pathlib.Path(command["file"])] = read
+        source = pathlib.Path(command["file"])
+        sources[source] = read and (read - every_source) | {source}   # a batch has read the others of it, too
     return sources
 
 

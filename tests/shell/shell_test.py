@@ -7,91 +7,17 @@ usage: shell_test.py PMXBOARD
 Where the machine gives out no terminals the tests are skipped, exit code 77.
 """
 
-import fcntl
 import os
 import pathlib
-import pty
 import re
-import select
-import struct
 import sys
 import tempfile
-import termios
-import time
 import unittest
 
-SKIPPED = 77
-PATIENCE = 60  # seconds; reached only when something is wrong
+from terminal import (CTRL_A, CTRL_C, CTRL_D, CTRL_E, CTRL_R, CTRL_U, DOWN, ENTER, PROMPT, RIGHT, SKIPPED, TAB, UP,
+                      Terminal, no_terminals)
+
 PROGRAM = ""
-TAB, UP, DOWN, RIGHT, ENTER = "\t", "\x1b[A", "\x1b[B", "\x1b[C", "\r"
-CTRL_A, CTRL_C, CTRL_D, CTRL_E, CTRL_R, CTRL_U = "\x01", "\x03", "\x04", "\x05", "\x12", "\x15"
-PROMPT = "pmx> "
-
-
-class Terminal:
-    """A shell on a terminal of its own."""
-
-    def __init__(self, home, *arguments, columns=80, rows=24, **environment):
-        variables = {name: value for name, value in os.environ.items()
-                     if name not in ("XDG_STATE_HOME", "PMXBOARD_HISTORY", "EDITRC")}
-        variables |= {"TERM": "xterm", "HOME": str(home), "NO_COLOR": "1"}
-        for name, value in environment.items():
-            if value is None:
-                variables.pop(name, None)
-            else:
-                variables[name] = value
-        self.seen = ""    # all that the terminal got
-        self.behind = 0   # what has been waited for lies before this
-        self.process, self.terminal = pty.fork()
-        if self.process == 0:
-            try:
-                # The size has to be there before the first look at it.
-                fcntl.ioctl(1, termios.TIOCSWINSZ, struct.pack("HHHH", rows, columns, 0, 0))
-                os.execve(PROGRAM, [PROGRAM, "shell", *arguments], variables)
-            finally:
-                os._exit(127)
-
-    def type(self, *keys):
-        os.write(self.terminal, "".join(keys).encode())
-
-    def read_on(self):
-        """More of what the shell writes; false when it has ended."""
-        if not select.select([self.terminal], [], [], PATIENCE)[0]:
-            raise AssertionError(f"nothing came in {PATIENCE} s; all of it:\n{self.seen!r}")
-        try:
-            data = os.read(self.terminal, 65536)
-        except OSError:  # the other end is closed
-            return False
-        self.seen += data.decode(errors="replace")
-        return bool(data)
-
-    def wait_for(self, text):
-        """Wait until the text appears behind what was waited for before; what came until then, the text included."""
-        limit = time.monotonic() + PATIENCE
-        while (found := self.seen.find(text, self.behind)) < 0:
-            if time.monotonic() > limit or not self.read_on():
-                raise AssertionError(f"no {text!r} in {self.seen[self.behind:]!r}")
-        until = self.seen[self.behind:found + len(text)]
-        self.behind = found + len(text)
-        # The prompt is there a moment before the editor has the keys; until then Ctrl-D is the terminal's own.
-        while text.endswith(PROMPT) and termios.tcgetattr(self.terminal)[3] & termios.ICANON:
-            if time.monotonic() > limit:
-                raise AssertionError("the editor does not begin")
-            time.sleep(0.001)
-        return until
-
-    def command(self, *keys):
-        """Type a line and wait for the next prompt; what came in between."""
-        self.type(*keys, ENTER)
-        self.wait_for("\n")
-        return self.wait_for(PROMPT).replace("\r\n", "\n")
-
-    def end(self):
-        """Read the rest; the exit code."""
-        while self.read_on():
-            pass
-        os.close(self.terminal)
-        return os.waitstatus_to_exitcode(os.waitpid(self.process, 0)[1])
 
 
 class Shell(unittest.TestCase):
@@ -102,7 +28,7 @@ class Shell(unittest.TestCase):
         self.history = self.home / ".local/state/pmxboard/history"
 
     def start(self, *arguments, **environment):
-        terminal = Terminal(self.home, *arguments, **environment)
+        terminal = Terminal(PROGRAM, self.home, *arguments, **environment)
         terminal.wait_for(PROMPT)
         return terminal
 
@@ -293,16 +219,6 @@ class Shell(unittest.TestCase):
         shell.type(line, CTRL_A, CTRL_E)
         self.assertIn("  = 1\n", shell.command())
         self.leave(shell)
-
-
-def no_terminals():
-    """Why there can be no terminal here; nothing when there can."""
-    try:
-        for end in pty.openpty():
-            os.close(end)
-    except OSError as error:
-        return str(error)
-    return None
 
 
 def main():

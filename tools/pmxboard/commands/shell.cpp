@@ -16,6 +16,7 @@
 #include "tools/pmxboard/prompt/completion.h"
 #include "tools/pmxboard/prompt/editor.h"
 #include "tools/pmxboard/prompt/help.h"
+#include "tools/pmxboard/text/printable.h"
 #include "tools/pmxboard/view/output.h"
 
 namespace pmxboard
@@ -127,14 +128,18 @@ bool is_terminal()
     return isatty(STDIN_FILENO) == 1 && isatty(STDOUT_FILENO) == 1;
 }
 
-/** The history's place, made where it does not exist; empty when it cannot be. */
+/** The history's place, made where it does not exist; empty when it cannot be, which is told. */
 std::filesystem::path usable_history()
 {
     const std::filesystem::path file = history_file();
     std::error_code error;
     if (file.has_parent_path())
         std::filesystem::create_directories(file.parent_path(), error);
-    return error ? std::filesystem::path() : file;
+    if (!error)
+        return file;
+    const std::string why = "cannot make " + file.parent_path().string() + ": " + error.message();
+    std::cerr << "pmxboard: no history is kept: " << printable(why, longest_message) << '\n';
+    return {};
 }
 
 void greet(const std::string& board)

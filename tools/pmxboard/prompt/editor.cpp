@@ -14,6 +14,7 @@
 
 #include <algorithm>
 #include <cstdio>
+#include <cstdlib>
 
 #include "tools/pmxboard/prompt/help.h"
 #include "tools/pmxboard/prompt/history_file.h"
@@ -48,6 +49,12 @@ private:
 
 constexpr int kept_lines = 1000;
 
+/** Whether the editor can show a line: one that is no text of the user's language hides all that are older. */
+bool is_shown(const std::string& line)
+{
+    return std::mbstowcs(nullptr, line.c_str(), 0) != static_cast<std::size_t>(-1);
+}
+
 class Editor : public LineSource
 {
 public:
@@ -58,7 +65,10 @@ public:
         history(m_history, &event, H_SETSIZE, kept_lines);
         history(m_history, &event, H_SETUNIQUE, 1);
         for (const std::string& line : m_kept.lines())
-            history(m_history, &event, H_ENTER, line.c_str());
+        {
+            if (is_shown(line))
+                history(m_history, &event, H_ENTER, line.c_str());
+        }
 
         m_editor = el_init("pmxboard", stdin, stdout, stderr);
         el_set(m_editor, EL_CLIENTDATA, this);

@@ -8,6 +8,8 @@
 #include <string>
 #include <vector>
 
+#include "board/files.h"
+
 namespace pmxboard
 {
 
@@ -24,10 +26,12 @@ public:
     void add(const std::string& line);
 
 private:
-    void load(std::size_t most);
-    void shorten(std::size_t size_when_read) const;
+    void load();
+    void append(const std::string& entry) const;
+    void give_up(const board::files::FileError& why);
 
-    std::filesystem::path m_file; ///< empty as well when it is somebody else's: that is told, and left alone
+    std::filesystem::path m_file; ///< empty as well when it cannot be used: that is told, and it is left alone
+    std::size_t m_most;
     std::vector<std::string> m_lines;
     std::string m_last;
 };

@@ -23,6 +23,10 @@ import re
 import subprocess
 import sys
 
+sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))
+
+import whole_file  # noqa: E402
+
 WIDTH = 110
 ANY_LINES = "  ..."
 MARK = "-- example --"
@@ -170,11 +174,11 @@ def main():
         text = arguments.document.read_text(encoding="utf-8")
         lacking = uncalled(text, arguments.header) if arguments.header else []
         if arguments.fix and lacking:
-            arguments.document.write_text(added(text, lacking, tool), encoding="utf-8")
+            whole_file.write(arguments.document, added(text, lacking, tool))
             lacking = []
         wrong, text = checked(arguments.document, tool)
         if arguments.fix and wrong:
-            arguments.document.write_text(text, encoding="utf-8")
+            whole_file.write(arguments.document, text)
             wrong, _ = checked(arguments.document, tool)
         wrong += [f"{arguments.document.name}:{text.count(chr(10))}: no example calls {name}" for name in lacking]
         if wrong:

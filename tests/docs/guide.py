@@ -11,6 +11,10 @@ import re
 import subprocess
 import sys
 
+sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))
+
+import whole_file  # noqa: E402
+
 TABLE = re.compile(r"^\| (?:Command|Expectation) \|.*\n(?:\|.*\n)+", re.M)
 
 FORMATS = re.compile(r"--trace-format (\S+)")
@@ -40,7 +44,7 @@ def main():
     if len(written) != 2 or len(told) != 2:
         sys.exit(f"{path}: {len(told)} tables, and the tool writes {len(written)}; there are two")
     if renew:
-        guide.write_text(TABLE.sub(lambda _: written.pop(0), text), encoding="utf-8")
+        whole_file.write(guide, TABLE.sub(lambda _: written.pop(0), text))
         return 0
     formats = stale_formats(path, text, tool)
     for complaint in formats:

@@ -12,6 +12,10 @@ import subprocess
 import sys
 import tempfile
 
+sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))
+
+import whole_file  # noqa: E402
+
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 HEADERS = ("src/system/inc", "src/driver/inc", "src/driver/private_inc")
 # What the target's objects are compiled with, as far as it shows at the interface; and all types, used or not.
@@ -50,12 +54,12 @@ def differences(committed, found):
 def main():
     committed, shipped, skeleton, compiler = [word for word in sys.argv[1:] if word != "--renew"]
     headers = [ROOT / header for header in HEADERS]
-    if "--renew" in sys.argv[1:]:
-        dump(committed, [shipped], pathlib.Path(skeleton), compiler, headers)
-        return 0
     with tempfile.TemporaryDirectory() as directory:
         found = pathlib.Path(directory) / "interface.xml"
         dump(found, [shipped], pathlib.Path(skeleton), compiler, headers)
+        if "--renew" in sys.argv[1:]:
+            whole_file.write(committed, found.read_text(encoding="utf-8"))
+            return 0
         told = differences(committed, found)
     print(told + "The interface is not the committed one. If that is meant: CONTRIBUTING.md, Versions." if told
           else "the interface is the committed one")

@@ -12,9 +12,10 @@ import re
 import subprocess
 import sys
 
-sys.path.insert(0, str(pathlib.Path(__file__).parent))
+sys.path[:0] = [str(pathlib.Path(__file__).parent), str(pathlib.Path(__file__).resolve().parents[2] / "cmake")]
 
 from list_suites import Unreadable, suites  # noqa: E402
+import whole_file  # noqa: E402
 
 HEADING = """# How many tests there are, program by program, and how many of ctest's: a test that vanishes is noticed.
 # tests/inventory/inventory.py --renew writes this list.
@@ -70,7 +71,7 @@ def main():
     path = pathlib.Path(path)
     found = counted(build, programs)
     if renew:
-        path.write_text(HEADING + "".join(f"{name} {number}\n" for name, number in found.items()), encoding="utf-8")
+        whole_file.write(path, HEADING + "".join(f"{name} {number}\n" for name, number in found.items()))
         return 0
     try:
         expected = read(path.read_text(encoding="utf-8"))

@@ -12,6 +12,10 @@ import re
 import subprocess
 import sys
 
+sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))
+
+import whole_file  # noqa: E402
+
 TAG = "SPDX-License-" + "Identifier:"  # apart, so that nobody takes this for a licence of its own
 LICENCE = f"{TAG} MIT OR GPL-2.0-only"
 COMMENTS = {".c": "// {}", ".cpp": "// {}", ".h": "// {}", ".h.in": "// {}", ".s.in": "/* {} */", ".md": "<!-- {} -->"}
@@ -70,7 +74,7 @@ def complaints(root, fix=False):
         if has_line(text, line):
             continue
         if fix:
-            (root / name).write_text(with_line(text, line), encoding="utf-8")
+            whole_file.write(root / name, with_line(text, line))
         else:
             yield f"{name}:1: does not say its licence: {line}   (tests/licence/lines.py --fix writes it)"
 

@@ -15,6 +15,10 @@ import subprocess
 import sys
 from concurrent.futures import ThreadPoolExecutor
 
+sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))
+
+import whole_file  # noqa: E402
+
 LIST = pathlib.Path(__file__).with_name("trace_hashes.txt")
 HEADING = "# SHA-256 of each scenario's trace. check_traces.py --renew writes it, when traces are meant to change.\n"
 
@@ -72,7 +76,7 @@ def main():
     complaints = [complaint for _, complaint in results.values() if complaint]
     if arguments.renew and not complaints:
         lines = [f"{digest}  {name}\n" for name, digest in sorted(found.items())]
-        arguments.list.write_text(HEADING + "".join(lines), encoding="utf-8")
+        whole_file.write(arguments.list, HEADING + "".join(lines))
     else:
         complaints += compare(found, read_list(arguments.list))
     for complaint in complaints:

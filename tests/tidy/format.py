@@ -15,7 +15,10 @@ import subprocess
 import sys
 from concurrent.futures import ThreadPoolExecutor
 
-from tidy import CODE, files
+sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))
+
+import whole_file  # noqa: E402
+from tidy import CODE, files  # noqa: E402
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 MOST_LINES = 20  # of one file's differences
@@ -47,7 +50,7 @@ def main():
     for path, old, new in differing:
         name = path.relative_to(ROOT).as_posix()
         if "--fix" in sys.argv[1:]:
-            path.write_text(new, encoding="utf-8")
+            whole_file.write(path, new)
             print(f"{name}: rewritten")
             continue
         lines = list(difflib.unified_diff(old.splitlines(), new.splitlines(), name, "formatted", "", "", 0, ""))

@@ -30,6 +30,7 @@ import goals as goal_list  # noqa: E402
 import instructions  # noqa: E402
 import paths as path_list  # noqa: E402
 import signatures  # noqa: E402
+import whole_file  # noqa: E402
 from tools import ToolError, run_binary  # noqa: E402
 
 ROOT = signatures.ROOT
@@ -59,8 +60,8 @@ def goal_complaints(card):
 
 def write_card(card):
     goals, explanations = goals_and_explanations()
-    DATA.write_text(cards.as_json(card), encoding="utf-8")
-    DOCUMENT.write_text(cards.render(card, goals, explanations), encoding="utf-8")
+    whole_file.write(DATA, cards.as_json(card))
+    whole_file.write(DOCUMENT, cards.render(card, goals, explanations))
     for name, value, text in cards.five_figures(card, goals):
         print(f"{name}: {value} ({text.replace('`', '')})")
     return goal_complaints(card)

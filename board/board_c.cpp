@@ -8,26 +8,50 @@
 
 #include "board/board.h"
 
-int board_c_power_on(const char* szBoard)
+namespace
+{
+
+/** Whether the action was done; a C program has nobody who catches, so what went wrong is told here. */
+template <typename Action>
+bool is_done(const Action& action) noexcept
 {
     try
     {
-        board::power_on(board::load_description(szBoard));
-        return 0;
+        action();
+        board::meanwhiles::rethrow_failure();
+        return true;
     }
     catch (const std::exception& error)
     {
         std::fprintf(stderr, "%s\n", error.what());
+    }
+    catch (...)
+    {
+        std::fputs("something unknown went wrong\n", stderr);
+    }
+    return false;
+}
+
+} // namespace
+
+int board_c_power_on(const char* szBoard)
+{
+    if (szBoard == nullptr)
+    {
+        std::fputs("no board is named\n", stderr);
         return -1;
     }
+    return is_done([szBoard] { board::power_on(board::load_description(szBoard)); }) ? 0 : -1;
 }
 
 void board_c_show_console(int iShown)
 {
-    if (iShown != 0)
-        board::set_console([](std::string_view text) { std::fwrite(text.data(), 1, text.size(), stdout); });
-    else
-        board::set_console({});
+    is_done([iShown] {
+        if (iShown != 0)
+            board::set_console([](std::string_view text) { std::fwrite(text.data(), 1, text.size(), stdout); });
+        else
+            board::set_console({});
+    });
 }
 
 void board_c_console_level(int iLevel)
@@ -37,7 +61,7 @@ void board_c_console_level(int iLevel)
 
 void board_c_advance(unsigned uMilliseconds)
 {
-    board::advance(std::chrono::milliseconds(uMilliseconds));
+    is_done([uMilliseconds] { board::advance(std::chrono::milliseconds(uMilliseconds)); });
 }
 
 unsigned board_c_asserts(void)

@@ -22,7 +22,8 @@ void board_c_show_console(int iShown);
  *  @param iLevel  0 to 9 */
 void board_c_console_level(int iLevel);
 
-/** Let virtual time pass: timers that run out call their expiry functions.
+/** Let virtual time pass: timers that run out call their expiry functions. What goes wrong with the board itself, since
+ *  the last such call, too, is told on the standard error output.
  *  @param uMilliseconds  how much */
 void board_c_advance(unsigned uMilliseconds);
 

@@ -110,6 +110,7 @@ void print(std::string_view text)
 extern "C" {
 
 void PMX_IsLog(INT32 i4Level, const CHAR* szFormat, ...)
+try
 {
     BOARD_CALL(PMX_IsLog, i4Level, text(szFormat));
     std::va_list values;
@@ -123,8 +124,10 @@ void PMX_IsLog(INT32 i4Level, const CHAR* szFormat, ...)
     else
         ++console_state.held_back;
 }
+BOARD_CALL_END(PMX_IsLog)
 
 void Printf(const CHAR* szFormat, ...)
+try
 {
     BOARD_CALL(Printf, text(szFormat));
     std::va_list values;
@@ -134,8 +137,10 @@ void Printf(const CHAR* szFormat, ...)
     boardCall.log(0, line, true);
     board::console::print(line);
 }
+BOARD_CALL_END(Printf)
 
 void UTIL_Printf(const CHAR* szFormat, ...)
+try
 {
     BOARD_CALL(UTIL_Printf, text(szFormat));
     std::va_list values;
@@ -145,8 +150,10 @@ void UTIL_Printf(const CHAR* szFormat, ...)
     boardCall.log(0, line, true);
     board::console::print(line);
 }
+BOARD_CALL_END(UTIL_Printf)
 
 void Assert(const CHAR* szExpression, const CHAR* szFile, INT32 i4Line)
+try
 {
     BOARD_CALL(Assert, text(szExpression), text(szFile), i4Line);
     boardCall.assertion();
@@ -155,5 +162,6 @@ void Assert(const CHAR* szExpression, const CHAR* szFile, INT32 i4Line)
     board::console::print("ASSERT " + std::string(shown(szExpression)) + ", " + shown(szFile) + ":" +
                           std::to_string(i4Line) + "\n");
 }
+BOARD_CALL_END(Assert)
 
 } // extern "C"

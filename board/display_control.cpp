@@ -36,7 +36,9 @@ Value state()
 } // namespace board::display_control
 
 void DCM_SetVideoPlaneDelay(INT32 i4Delay1, INT32 i4Delay2)
+try
 {
     BOARD_CALL(DCM_SetVideoPlaneDelay, i4Delay1, i4Delay2);
     display_control_state.video_plane_delay = { i4Delay1, i4Delay2 };
 }
+BOARD_CALL_END(DCM_SetVideoPlaneDelay)

@@ -123,6 +123,7 @@ Value state()
 extern "C" {
 
 INT32 get_part_id_by_name(const CHAR* szName)
+try
 {
     BOARD_CALL_R(get_part_id_by_name, text(szName));
     for (std::size_t id = 0; szName != nullptr && id < flash_state.partitions.size(); ++id)
@@ -132,8 +133,10 @@ INT32 get_part_id_by_name(const CHAR* szName)
     }
     return boardCall.answer(-1);
 }
+BOARD_CALL_END(get_part_id_by_name)
 
 INT32 i4NFBPartitionRead(INT32 i4PartId, UINT32 u4Offset, void* pvDest, UINT32 u4Count)
+try
 {
     BOARD_CALL_R(i4NFBPartitionRead, i4PartId, u4Offset, bytes(pvDest, u4Count), u4Count);
     auto& partitions = flash_state.partitions;
@@ -151,5 +154,6 @@ INT32 i4NFBPartitionRead(INT32 i4PartId, UINT32 u4Offset, void* pvDest, UINT32 u
     ++flash_state.failed_reads;
     return boardCall.fail(-1);
 }
+BOARD_CALL_END(i4NFBPartitionRead)
 
 } // extern "C"

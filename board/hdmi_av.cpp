@@ -179,6 +179,7 @@ void choose_resolution(std::optional<Resolution> resolution)
 } // namespace board::hdmi_av
 
 BOOL fgPmxDrvSetAvd(UINT32 u4Command, void* pvParameter, UINT32 u4Length)
+try
 {
     BOARD_CALL_R(fgPmxDrvSetAvd, u4Command, command_parameter(pvParameter, u4Command), u4Length);
     const auto command = find_command(u4Command);
@@ -190,8 +191,10 @@ BOOL fgPmxDrvSetAvd(UINT32 u4Command, void* pvParameter, UINT32 u4Length)
         board::display_part::resolution_change();
     return boardCall.answer(TRUE);
 }
+BOARD_CALL_END(fgPmxDrvSetAvd)
 
 BOOL fgPmxDrvGetAvdInfo(UINT32 u4Query, void* pvParameter)
+try
 {
     BOARD_CALL_R(fgPmxDrvGetAvdInfo, u4Query, query_parameter(pvParameter, u4Query));
     if (u4Query != PMX_GET_VALID_RES_AND_VFREQ || pvParameter == nullptr)
@@ -202,39 +205,52 @@ BOOL fgPmxDrvGetAvdInfo(UINT32 u4Query, void* pvParameter)
     query->u2ValidAutoVfreq = chosen ? chosen->frequency : query->u2VsyncFreq;
     return boardCall.answer(TRUE);
 }
+BOARD_CALL_END(fgPmxDrvGetAvdInfo)
 
 INT32 i4GetHotPlugStatus(void)
+try
 {
     BOARD_CALL_R(i4GetHotPlugStatus);
     return boardCall.answer(hdmi_av_state.sink_plugged ? 1 : 0);
 }
+BOARD_CALL_END(i4GetHotPlugStatus)
 
 BOOL fgIsHotPlugChgRes(void)
+try
 {
     BOARD_CALL_R(fgIsHotPlugChgRes);
     return boardCall.answer(hdmi_av_state.resolution_requested ? TRUE : FALSE);
 }
+BOARD_CALL_END(fgIsHotPlugChgRes)
 
 void vPostChgRes(UCHAR ucMode)
+try
 {
     BOARD_CALL(vPostChgRes, ucMode);
     hdmi_av_state.posted_resolution = ucMode;
 }
+BOARD_CALL_END(vPostChgRes)
 
 void vPostChgInputCS(DRV_PMX_COLOR_SPACE_T eColorSpace)
+try
 {
     BOARD_CALL(vPostChgInputCS, eColorSpace);
     hdmi_av_state.posted_colour_space = eColorSpace;
 }
+BOARD_CALL_END(vPostChgInputCS)
 
 void vSendAvdNotifyScomResChgOK(void)
+try
 {
     BOARD_CALL(vSendAvdNotifyScomResChgOK);
     ++hdmi_av_state.change_ok_notices;
 }
+BOARD_CALL_END(vSendAvdNotifyScomResChgOK)
 
 void vSetCcirOutBeforeMixer(BOOL fgBeforeMixer)
+try
 {
     BOARD_CALL(vSetCcirOutBeforeMixer, fgBeforeMixer);
     hdmi_av_state.ccir_before_mixer = fgBeforeMixer != 0;
 }
+BOARD_CALL_END(vSetCcirOutBeforeMixer)

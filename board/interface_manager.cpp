@@ -95,6 +95,7 @@ void operation_ends(const std::string& operation)
 extern "C" {
 
 INT32 i4ImRegisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, const void* pvIf, void* pvTag)
+try
 {
     BOARD_CALL_R(i4ImRegisterInterface2, u2CompType, u2CompId, u4IfId, object(pvIf), tag(pvTag));
     const Key key{ u2CompType, u2CompId, u4IfId };
@@ -105,8 +106,10 @@ INT32 i4ImRegisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, 
     }
     return boardCall.answer(interface_manager_state.try_emplace(key, Interface{ pvIf, pvTag }).second ? 0 : -1);
 }
+BOARD_CALL_END(i4ImRegisterInterface2)
 
 INT32 i4ImUnregisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId)
+try
 {
     BOARD_CALL_R(i4ImUnregisterInterface2, u2CompType, u2CompId, u4IfId);
     const Key key{ u2CompType, u2CompId, u4IfId };
@@ -119,8 +122,10 @@ INT32 i4ImUnregisterInterface2(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId
     interface_manager_state.erase(found);
     return boardCall.answer(0);
 }
+BOARD_CALL_END(i4ImUnregisterInterface2)
 
 INT32 i4ImQueryInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void** ppvIf, void** ppvTag)
+try
 {
     BOARD_CALL_R(i4ImQueryInterface, u2CompType, u2CompId, u4IfId, object(ppvIf), tag(ppvTag));
     const Key key{ u2CompType, u2CompId, u4IfId };
@@ -137,8 +142,10 @@ INT32 i4ImQueryInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void
     *ppvTag = found->second.tag;
     return boardCall.answer(0);
 }
+BOARD_CALL_END(i4ImQueryInterface)
 
 INT32 i4ImReleaseInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void* pvTag)
+try
 {
     BOARD_CALL_ACTING(i4ImReleaseInterface, u2CompType, u2CompId, u4IfId, tag(pvTag));
     const Key key{ u2CompType, u2CompId, u4IfId };
@@ -164,5 +171,6 @@ INT32 i4ImReleaseInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, vo
     --found->second.held;
     return boardCall.answer(0);
 }
+BOARD_CALL_END(i4ImReleaseInterface)
 
 } // extern "C"

@@ -6,6 +6,7 @@
 #include <stdexcept>
 #include <utility>
 
+#include "board/contained.h"
 #include "board/devices.h"
 #include "board/recorder.h"
 #include "board/threads.h"
@@ -26,7 +27,7 @@ struct Meanwhiles
 {
     std::vector<Script> scripts;
     std::function<void(const TraceEntry&)> every_call;
-    std::vector<std::exception_ptr> failures;
+    std::exception_ptr failure; ///< the first one
 };
 
 Meanwhiles& meanwhiles_state()
@@ -35,27 +36,14 @@ Meanwhiles& meanwhiles_state()
     return instance;
 }
 
-/** Nothing that is thrown here may reach the layer: it has no unwind tables. */
-void contain(const std::function<void()>& action)
-{
-    try
-    {
-        action();
-    }
-    catch (...)
-    {
-        meanwhiles_state().failures.push_back(std::current_exception());
-    }
-}
-
 void carry_out(const Script& script)
 {
     const auto act = [action = script.action] {
         const trace::By scope("meanwhile");
-        contain(action);
+        contained(action);
     };
     if (script.as_thread)
-        contain([&] { threads::run(script.armed.name, act); });
+        contained([&] { threads::run(script.armed.name, act); });
     else
         act();
 }
@@ -72,7 +60,40 @@ std::vector<Script> take_due(std::string_view function)
     return due;
 }
 
+/** The same exception, that says which function it has kept from its work. */
+std::exception_ptr with_function(const char* function)
+{
+    try
+    {
+        throw;
+    }
+    catch (const std::exception& error)
+    {
+        return std::make_exception_ptr(
+            std::runtime_error(std::string(function) + " could not do its work: " + error.what()));
+    }
+    catch (...)
+    {
+        return std::current_exception();
+    }
+}
+
 } // namespace
+
+void keep_failure(const char* function) noexcept
+{
+    std::exception_ptr& failure = meanwhiles_state().failure;
+    if (failure)
+        return;
+    try
+    {
+        failure = function == nullptr ? std::current_exception() : with_function(function);
+    }
+    catch (...) // no memory for the words either
+    {
+        failure = std::current_exception();
+    }
+}
 
 void meanwhile(std::string function, unsigned n, std::function<void()> action, MeanwhileAs as)
 {
@@ -115,14 +136,13 @@ void forget_all()
 
 void rethrow_failure()
 {
-    const std::vector<std::exception_ptr> failures = std::exchange(meanwhiles_state().failures, {});
-    if (!failures.empty())
-        std::rethrow_exception(failures.front());
+    if (const std::exception_ptr failure = std::exchange(meanwhiles_state().failure, nullptr))
+        std::rethrow_exception(failure);
 }
 
 void forget_failures()
 {
-    meanwhiles_state().failures.clear();
+    meanwhiles_state().failure = nullptr;
 }
 
 void call_ends(std::string_view function, std::uint64_t sequence)
@@ -137,10 +157,12 @@ void call_ends(std::string_view function, std::uint64_t sequence)
     const TraceEntry* const entry = entry_of(sequence);
     if (entry == nullptr)
         return;
+    const trace::By scope("meanwhile");
+    const auto hook = meanwhiles_state().every_call;
+    const TraceEntry copy = *entry;
     threads::Context& context = threads::context();
     context.in_hook = true;
-    const trace::By scope("meanwhile");
-    contain([hook = meanwhiles_state().every_call, copy = *entry] { hook(copy); });
+    contained([&] { hook(copy); });
     context.in_hook = false;
 }
 

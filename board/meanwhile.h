@@ -47,7 +47,8 @@ std::vector<Armed> armed();
 void forget(std::string_view function);
 void forget_all();
 
-/** Throw what the first action that failed threw, and forget all such failures. */
+/** Throw what the first action that failed threw, or the first platform function that could not do its work, and forget
+ *  all such failures. */
 void rethrow_failure();
 void forget_failures();
 

@@ -278,54 +278,69 @@ Value state()
 } // namespace board::mixer
 
 void PMX_HalSetMode(UCHAR ucPmxId, UCHAR ucMode)
+try
 {
     BOARD_CALL(PMX_HalSetMode, ucPmxId, ucMode);
     if (is_mixer(ucPmxId))
         mixer_state.mode = ucMode;
 }
+BOARD_CALL_END(PMX_HalSetMode)
 
 void PMX_HalSetScalerMode(UCHAR ucMode)
+try
 {
     BOARD_CALL(PMX_HalSetScalerMode, ucMode);
     mixer_state.scaler_mode = ucMode;
 }
+BOARD_CALL_END(PMX_HalSetScalerMode)
 
 void PMX_HalReset(UCHAR ucPmxId)
+try
 {
     BOARD_CALL(PMX_HalReset, ucPmxId);
     if (is_mixer(ucPmxId))
         ++mixer_state.resets;
 }
+BOARD_CALL_END(PMX_HalReset)
 
 void PMX_HalScalerReset(UCHAR ucPmxId)
+try
 {
     BOARD_CALL(PMX_HalScalerReset, ucPmxId);
     if (is_mixer(ucPmxId))
         ++mixer_state.scaler_resets;
 }
+BOARD_CALL_END(PMX_HalScalerReset)
 
 void PMX_HalSetTvType(UCHAR ucPmxId, UCHAR ucTvType)
+try
 {
     BOARD_CALL(PMX_HalSetTvType, ucPmxId, ucTvType);
     if (is_mixer(ucPmxId))
         mixer_state.tv_type = ucTvType;
 }
+BOARD_CALL_END(PMX_HalSetTvType)
 
 void PMX_HalClockSet(UINT32 u4ClockId, UINT32 u4On)
+try
 {
     BOARD_CALL(PMX_HalClockSet, u4ClockId, u4On);
     if (u4ClockId < mixer_state.clocks.size())
         mixer_state.clocks[u4ClockId] = u4On != 0;
 }
+BOARD_CALL_END(PMX_HalClockSet)
 
 void PMX_HalSetBg(UCHAR ucPmxId, UINT32 u4BgColor)
+try
 {
     BOARD_CALL(PMX_HalSetBg, ucPmxId, u4BgColor);
     if (is_mixer(ucPmxId))
         mixer_state.background = u4BgColor;
 }
+BOARD_CALL_END(PMX_HalSetBg)
 
 void PMX_HalPlaneOrder(UCHAR ucPmxId, UINT32 u4Number, const UINT32* pu4PlaneOrder)
+try
 {
     BOARD_CALL(PMX_HalPlaneOrder, ucPmxId, u4Number, array(pu4PlaneOrder, PLANES));
     if (!is_mixer(ucPmxId) || pu4PlaneOrder == nullptr)
@@ -334,15 +349,19 @@ void PMX_HalPlaneOrder(UCHAR ucPmxId, UINT32 u4Number, const UINT32* pu4PlaneOrd
     std::copy_n(pu4PlaneOrder, PLANES, stacking.order.begin());
     mixer_state.stacking = stacking;
 }
+BOARD_CALL_END(PMX_HalPlaneOrder)
 
 void PMX_HalInitPlaneOrder(UCHAR ucPmxId)
+try
 {
     BOARD_CALL(PMX_HalInitPlaneOrder, ucPmxId);
     if (is_mixer(ucPmxId))
         mixer_state.selectors = IDENTITY;
 }
+BOARD_CALL_END(PMX_HalInitPlaneOrder)
 
 INT32 PMX_HalSetPlaneOrder(UCHAR ucPmxId, const UINT8* pu1PlnSel, INT32* pi4PlnDelay)
+try
 {
     BOARD_CALL_R(PMX_HalSetPlaneOrder, ucPmxId, array(pu1PlnSel, PLANES), array(pi4PlnDelay, PLANES));
     if (!is_mixer(ucPmxId) || pu1PlnSel == nullptr || pi4PlnDelay == nullptr)
@@ -354,8 +373,10 @@ INT32 PMX_HalSetPlaneOrder(UCHAR ucPmxId, const UINT8* pu1PlnSel, INT32* pi4PlnD
     std::copy(delays.begin(), delays.end(), pi4PlnDelay);
     return boardCall.answer(0);
 }
+BOARD_CALL_END(PMX_HalSetPlaneOrder)
 
 INT32 PMX_HalGetPlaneOrder(UCHAR ucPmxId, UINT8* pu1PlnSel)
+try
 {
     BOARD_CALL_R(PMX_HalGetPlaneOrder, ucPmxId, array(pu1PlnSel, PLANES));
     if (!is_mixer(ucPmxId) || pu1PlnSel == nullptr)
@@ -363,189 +384,247 @@ INT32 PMX_HalGetPlaneOrder(UCHAR ucPmxId, UINT8* pu1PlnSel)
     std::copy(mixer_state.selectors.begin(), mixer_state.selectors.end(), pu1PlnSel);
     return boardCall.answer(0);
 }
+BOARD_CALL_END(PMX_HalGetPlaneOrder)
 
 void vPmxMixPlane(UCHAR ucPmxId, UCHAR ucPlane)
+try
 {
     BOARD_CALL(vPmxMixPlane, ucPmxId, ucPlane);
     mix(ucPmxId, ucPlane, true);
 }
+BOARD_CALL_END(vPmxMixPlane)
 
 void vPmxNotMixPlane(UCHAR ucPmxId, UCHAR ucPlane)
+try
 {
     BOARD_CALL(vPmxNotMixPlane, ucPmxId, ucPlane);
     mix(ucPmxId, ucPlane, false);
 }
+BOARD_CALL_END(vPmxNotMixPlane)
 
 BOOL fgPmxHalMixPlane(UCHAR ucPmxId, UCHAR ucPlane)
+try
 {
     BOARD_CALL_R(fgPmxHalMixPlane, ucPmxId, ucPlane);
     const bool mixed = is_mixer(ucPmxId) && ucPlane < PLANES && mixer_state.mixed[ucPlane];
     return boardCall.answer(mixed ? TRUE : FALSE);
 }
+BOARD_CALL_END(fgPmxHalMixPlane)
 
 void PMX_HalSwapPlane1_2(UCHAR ucPmxId, UINT32 u4Swap)
+try
 {
     BOARD_CALL(PMX_HalSwapPlane1_2, ucPmxId, u4Swap);
     swap(ucPmxId, SWAP_1_2, u4Swap);
 }
+BOARD_CALL_END(PMX_HalSwapPlane1_2)
 
 void PMX_HalSwapPlane3_4(UCHAR ucPmxId, UINT32 u4Swap)
+try
 {
     BOARD_CALL(PMX_HalSwapPlane3_4, ucPmxId, u4Swap);
     swap(ucPmxId, SWAP_3_4, u4Swap);
 }
+BOARD_CALL_END(PMX_HalSwapPlane3_4)
 
 void PMX_HalSwapPlane6_7(UCHAR ucPmxId, UINT32 u4Swap)
+try
 {
     BOARD_CALL(PMX_HalSwapPlane6_7, ucPmxId, u4Swap);
     swap(ucPmxId, SWAP_6_7, u4Swap);
 }
+BOARD_CALL_END(PMX_HalSwapPlane6_7)
 
 void PMX_HalSwapPlane4_7(UCHAR ucPmxId, UINT32 u4Swap)
+try
 {
     BOARD_CALL(PMX_HalSwapPlane4_7, ucPmxId, u4Swap);
     swap(ucPmxId, SWAP_4_7, u4Swap);
 }
+BOARD_CALL_END(PMX_HalSwapPlane4_7)
 
 void PMX_HalSwapPlane1_3(UCHAR ucPmxId, UINT32 u4Swap)
+try
 {
     BOARD_CALL(PMX_HalSwapPlane1_3, ucPmxId, u4Swap);
     swap(ucPmxId, SWAP_1_3, u4Swap);
 }
+BOARD_CALL_END(PMX_HalSwapPlane1_3)
 
 void PMX_HalSwapPlane5_8(UCHAR ucPmxId, UINT32 u4Swap)
+try
 {
     BOARD_CALL(PMX_HalSwapPlane5_8, ucPmxId, u4Swap);
     swap(ucPmxId, SWAP_5_8, u4Swap);
 }
+BOARD_CALL_END(PMX_HalSwapPlane5_8)
 
 BOOL fgPmxHalSwapPlane1_2(UCHAR ucPmxId)
+try
 {
     BOARD_CALL_R(fgPmxHalSwapPlane1_2, ucPmxId);
     return boardCall.answer(is_swapped(ucPmxId, SWAP_1_2));
 }
+BOARD_CALL_END(fgPmxHalSwapPlane1_2)
 
 BOOL fgPmxHalSwapPlane3_4(UCHAR ucPmxId)
+try
 {
     BOARD_CALL_R(fgPmxHalSwapPlane3_4, ucPmxId);
     return boardCall.answer(is_swapped(ucPmxId, SWAP_3_4));
 }
+BOARD_CALL_END(fgPmxHalSwapPlane3_4)
 
 BOOL fgPmxHalSwapPlane6_7(UCHAR ucPmxId)
+try
 {
     BOARD_CALL_R(fgPmxHalSwapPlane6_7, ucPmxId);
     return boardCall.answer(is_swapped(ucPmxId, SWAP_6_7));
 }
+BOARD_CALL_END(fgPmxHalSwapPlane6_7)
 
 BOOL fgPmxHalSwapPlane4_7(UCHAR ucPmxId)
+try
 {
     BOARD_CALL_R(fgPmxHalSwapPlane4_7, ucPmxId);
     return boardCall.answer(is_swapped(ucPmxId, SWAP_4_7));
 }
+BOARD_CALL_END(fgPmxHalSwapPlane4_7)
 
 BOOL fgPmxHalSwapPlane1_3(UCHAR ucPmxId)
+try
 {
     BOARD_CALL_R(fgPmxHalSwapPlane1_3, ucPmxId);
     return boardCall.answer(is_swapped(ucPmxId, SWAP_1_3));
 }
+BOARD_CALL_END(fgPmxHalSwapPlane1_3)
 
 BOOL fgPmxHalSwapPlane5_8(UCHAR ucPmxId)
+try
 {
     BOARD_CALL_R(fgPmxHalSwapPlane5_8, ucPmxId);
     return boardCall.answer(is_swapped(ucPmxId, SWAP_5_8));
 }
+BOARD_CALL_END(fgPmxHalSwapPlane5_8)
 
 void PMX_HalSelectVdoutCconv(UCHAR ucPmxId, UCHAR ucSelect)
+try
 {
     BOARD_CALL(PMX_HalSelectVdoutCconv, ucPmxId, ucSelect);
     if (is_mixer(ucPmxId))
         mixer_state.video_out_converter = ucSelect;
 }
+BOARD_CALL_END(PMX_HalSelectVdoutCconv)
 
 void PMX_HalSelectScalerCconv(UCHAR ucPmxId, UCHAR ucSelect)
+try
 {
     BOARD_CALL(PMX_HalSelectScalerCconv, ucPmxId, ucSelect);
     if (is_mixer(ucPmxId))
         mixer_state.scaler_converter = ucSelect;
 }
+BOARD_CALL_END(PMX_HalSelectScalerCconv)
 
 void PMX_HalSetCC_A(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucDirection)
+try
 {
     BOARD_CALL(PMX_HalSetCC_A, ucPmxId, ucEnable, ucDirection);
     if (is_mixer(ucPmxId))
         mixer_state.cc_a = Converter{ ucEnable, ucDirection };
 }
+BOARD_CALL_END(PMX_HalSetCC_A)
 
 void PMX_HalSetScaler709601(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucDirection)
+try
 {
     BOARD_CALL(PMX_HalSetScaler709601, ucPmxId, ucEnable, ucDirection);
     if (is_mixer(ucPmxId))
         mixer_state.scaler_709_601 = Converter{ ucEnable, ucDirection };
 }
+BOARD_CALL_END(PMX_HalSetScaler709601)
 
 void PMX_HalSetActiveZone(UCHAR ucPmxId, UCHAR ucMode)
+try
 {
     BOARD_CALL(PMX_HalSetActiveZone, ucPmxId, ucMode);
     if (is_mixer(ucPmxId))
         mixer_state.active_zone = ucMode;
 }
+BOARD_CALL_END(PMX_HalSetActiveZone)
 
 void PMX_HalSetCBWidth(UCHAR ucPmxId, UINT8 u1Width)
+try
 {
     BOARD_CALL(PMX_HalSetCBWidth, ucPmxId, u1Width);
     if (is_mixer(ucPmxId))
         mixer_state.colour_bar_width = u1Width;
 }
+BOARD_CALL_END(PMX_HalSetCBWidth)
 
 void PMX_HalEnableCB(UCHAR ucPmxId)
+try
 {
     BOARD_CALL(PMX_HalEnableCB, ucPmxId);
     if (is_mixer(ucPmxId))
         mixer_state.colour_bar = true;
 }
+BOARD_CALL_END(PMX_HalEnableCB)
 
 void PMX_HalDisableCB(UCHAR ucPmxId)
+try
 {
     BOARD_CALL(PMX_HalDisableCB, ucPmxId);
     if (is_mixer(ucPmxId))
         mixer_state.colour_bar = false;
 }
+BOARD_CALL_END(PMX_HalDisableCB)
 
 void PMX_HalEnableMute(UCHAR ucPmxId)
+try
 {
     BOARD_CALL(PMX_HalEnableMute, ucPmxId);
     if (is_mixer(ucPmxId))
         mixer_state.muted = true;
 }
+BOARD_CALL_END(PMX_HalEnableMute)
 
 void PMX_HalDisableMute(UCHAR ucPmxId)
+try
 {
     BOARD_CALL(PMX_HalDisableMute, ucPmxId);
     if (is_mixer(ucPmxId))
         mixer_state.muted = false;
 }
+BOARD_CALL_END(PMX_HalDisableMute)
 
 void PMX_HalSetDelay(UCHAR ucVdoId, UCHAR ucADJ_F, UINT16 u2HDelay, UINT16 u2VDelay)
+try
 {
     BOARD_CALL(PMX_HalSetDelay, ucVdoId, ucADJ_F, u2HDelay, u2VDelay);
     mixer_state.delays[ucVdoId] = { ucADJ_F, u2HDelay, u2VDelay };
 }
+BOARD_CALL_END(PMX_HalSetDelay)
 
 void PMX_HalSetBrightness(UCHAR ucPmxId, UCHAR ucBrightness)
+try
 {
     BOARD_CALL(PMX_HalSetBrightness, ucPmxId, ucBrightness);
     if (is_mixer(ucPmxId))
         mixer_state.brightness = ucBrightness;
 }
+BOARD_CALL_END(PMX_HalSetBrightness)
 
 void PMX_HalSetContrast(UCHAR ucPmxId, UCHAR ucContrast)
+try
 {
     BOARD_CALL(PMX_HalSetContrast, ucPmxId, ucContrast);
     if (is_mixer(ucPmxId))
         mixer_state.contrast = ucContrast;
 }
+BOARD_CALL_END(PMX_HalSetContrast)
 
 void PMX_HalSetGamma(UCHAR ucPmxId, UCHAR ucEnable, const UCHAR* pucCurve)
+try
 {
     BOARD_CALL(PMX_HalSetGamma, ucPmxId, ucEnable, array(pucCurve, GAMMA_POINTS));
     if (!is_mixer(ucPmxId))
@@ -555,8 +634,10 @@ void PMX_HalSetGamma(UCHAR ucPmxId, UCHAR ucEnable, const UCHAR* pucCurve)
     if (pucCurve != nullptr)
         std::copy_n(pucCurve, GAMMA_POINTS, mixer_state.gamma_curve.emplace().begin());
 }
+BOARD_CALL_END(PMX_HalSetGamma)
 
 void PMX_HalSetDigitalOut(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucProprietaryMode, UCHAR ucDigitalBit)
+try
 {
     BOARD_CALL(PMX_HalSetDigitalOut, ucPmxId, ucEnable, ucProprietaryMode, ucDigitalBit);
     if (!is_mixer(ucPmxId))
@@ -565,48 +646,63 @@ void PMX_HalSetDigitalOut(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucProprietaryMode
     mixer_state.digital_out.mode = ucProprietaryMode;
     mixer_state.digital_out.bits = ucDigitalBit;
 }
+BOARD_CALL_END(PMX_HalSetDigitalOut)
 
 void PMX_HalSetDigitalOutRgb(UCHAR ucPmxId, UCHAR ucDigitalRgb)
+try
 {
     BOARD_CALL(PMX_HalSetDigitalOutRgb, ucPmxId, ucDigitalRgb);
     if (is_mixer(ucPmxId))
         mixer_state.digital_out.rgb = ucDigitalRgb;
 }
+BOARD_CALL_END(PMX_HalSetDigitalOutRgb)
 
 void PMX_HalSetDigitalOutPhase(UCHAR ucPmxId, UINT32 u4Phase)
+try
 {
     BOARD_CALL(PMX_HalSetDigitalOutPhase, ucPmxId, u4Phase);
     if (is_mixer(ucPmxId))
         mixer_state.digital_out.phase = u4Phase;
 }
+BOARD_CALL_END(PMX_HalSetDigitalOutPhase)
 
 void PMX_HalSetDigitalOutDrv(UINT32 u4Drving)
+try
 {
     BOARD_CALL(PMX_HalSetDigitalOutDrv, u4Drving);
     mixer_state.digital_out.drive = u4Drving;
 }
+BOARD_CALL_END(PMX_HalSetDigitalOutDrv)
 
 void PMX_VsyncInit(void)
+try
 {
     BOARD_CALL(PMX_VsyncInit);
     mixer_state.vsync_initialised = true;
 }
+BOARD_CALL_END(PMX_VsyncInit)
 
 void PMX_VsyncStop(void)
+try
 {
     BOARD_CALL(PMX_VsyncStop);
     mixer_state.vsync_initialised = false;
     mixer_state.vsync_enabled = false;
 }
+BOARD_CALL_END(PMX_VsyncStop)
 
 void PMX_VsyncEnable(void)
+try
 {
     BOARD_CALL(PMX_VsyncEnable);
     mixer_state.vsync_enabled = true;
 }
+BOARD_CALL_END(PMX_VsyncEnable)
 
 void PMX_VsyncDisable(void)
+try
 {
     BOARD_CALL(PMX_VsyncDisable);
     mixer_state.vsync_enabled = false;
 }
+BOARD_CALL_END(PMX_VsyncDisable)

@@ -135,6 +135,7 @@ Value state()
 extern "C" {
 
 INT32 x_sema_create(HANDLE_T* phSema, X_SEMA_TYPE_T eType, UINT32 u4InitValue)
+try
 {
     BOARD_CALL_R(x_sema_create, phSema, eType, u4InitValue);
     if (phSema == nullptr || !creatable(eType, u4InitValue))
@@ -147,8 +148,10 @@ INT32 x_sema_create(HANDLE_T* phSema, X_SEMA_TYPE_T eType, UINT32 u4InitValue)
     os_state.semaphores[*phSema] = { eType, u4InitValue };
     return boardCall.answer(OSR_OK);
 }
+BOARD_CALL_END(x_sema_create)
 
 INT32 x_sema_lock(HANDLE_T hSema, X_SEMA_OPTION_T eOption)
+try
 {
     BOARD_CALL_R(x_sema_lock, hSema, eOption);
     Semaphore* semaphore = find_semaphore(hSema, "x_sema_lock");
@@ -169,8 +172,10 @@ INT32 x_sema_lock(HANDLE_T hSema, X_SEMA_OPTION_T eOption)
     semaphore->holder = board::threads::context().number;
     return boardCall.answer(OSR_OK);
 }
+BOARD_CALL_END(x_sema_lock)
 
 INT32 x_sema_unlock(HANDLE_T hSema)
+try
 {
     BOARD_CALL_ACTING(x_sema_unlock, hSema);
     Semaphore* const semaphore = find_semaphore(hSema, "x_sema_unlock");
@@ -192,8 +197,10 @@ INT32 x_sema_unlock(HANDLE_T hSema)
     board::threads::given(hSema);
     return boardCall.answer_or_fault(OSR_OK);
 }
+BOARD_CALL_END(x_sema_unlock)
 
 INT32 x_sema_delete(HANDLE_T hSema)
+try
 {
     BOARD_CALL_R(x_sema_delete, hSema);
     if (find_semaphore(hSema, "x_sema_delete") == nullptr)
@@ -206,8 +213,10 @@ INT32 x_sema_delete(HANDLE_T hSema)
     os_state.semaphores.erase(hSema);
     return boardCall.answer(OSR_OK);
 }
+BOARD_CALL_END(x_sema_delete)
 
 INT32 x_vsnprintf(CHAR* szBuffer, size_t zSize, const CHAR* szFormat, va_list rArgs)
+try
 {
     BOARD_CALL_R(x_vsnprintf, text(szBuffer, zSize), zSize, text(szFormat), values(rArgs));
     if (szBuffer == nullptr || zSize == 0)
@@ -222,5 +231,6 @@ INT32 x_vsnprintf(CHAR* szBuffer, size_t zSize, const CHAR* szFormat, va_list rA
     szBuffer[copied] = '\0';
     return boardCall.answer(static_cast<INT32>(formatted.text.size()));
 }
+BOARD_CALL_END(x_vsnprintf)
 
 } // extern "C"

@@ -71,30 +71,39 @@ Value state()
 } // namespace board::osd_planes
 
 void OSD_BASE_SetDisplayMode(UCHAR ucMode)
+try
 {
     BOARD_CALL(OSD_BASE_SetDisplayMode, ucMode);
     osd_planes_state.display_mode = ucMode;
 }
+BOARD_CALL_END(OSD_BASE_SetDisplayMode)
 
 void OSD_BASE_SetFlag_PMXChangeResDone(void)
+try
 {
     BOARD_CALL(OSD_BASE_SetFlag_PMXChangeResDone);
     ++osd_planes_state.resolution_changes_done;
 }
+BOARD_CALL_END(OSD_BASE_SetFlag_PMXChangeResDone)
 
 void OSDSetColorSpace(UCHAR ucColorSpace)
+try
 {
     BOARD_CALL(OSDSetColorSpace, ucColorSpace);
     osd_planes_state.colour_space = ucColorSpace;
 }
+BOARD_CALL_END(OSDSetColorSpace)
 
 void OSD_RNG_Set_Xvycc_En(BOOL fgEnable)
+try
 {
     BOARD_CALL(OSD_RNG_Set_Xvycc_En, fgEnable);
     osd_planes_state.full_range_conversion = fgEnable != 0;
 }
+BOARD_CALL_END(OSD_RNG_Set_Xvycc_En)
 
 INT32 _i4OSD_SetPosOffset(INT32* pi4Offset)
+try
 {
     BOARD_CALL_R(_i4OSD_SetPosOffset, input(pi4Offset, PLANES_WITH_OFFSET));
     if (pi4Offset == nullptr)
@@ -102,17 +111,22 @@ INT32 _i4OSD_SetPosOffset(INT32* pi4Offset)
     std::copy_n(pi4Offset, PLANES_WITH_OFFSET, osd_planes_state.position_offsets.emplace().begin());
     return boardCall.answer(DONE);
 }
+BOARD_CALL_END(_i4OSD_SetPosOffset)
 
 INT32 _i4Osd5Out(BOOL fgOn, UCHAR ucCvbsMode)
+try
 {
     BOARD_CALL_R(_i4Osd5Out, fgOn, ucCvbsMode);
     osd_planes_state.osd5 = Osd5Route{ fgOn != 0, ucCvbsMode, false };
     return boardCall.answer(DONE);
 }
+BOARD_CALL_END(_i4Osd5Out)
 
 INT32 _i4Osd5Out_CVBSOnly(BOOL fgOn, UCHAR ucCvbsMode)
+try
 {
     BOARD_CALL_R(_i4Osd5Out_CVBSOnly, fgOn, ucCvbsMode);
     osd_planes_state.osd5 = Osd5Route{ fgOn != 0, ucCvbsMode, true };
     return boardCall.answer(DONE);
 }
+BOARD_CALL_END(_i4Osd5Out_CVBSOnly)

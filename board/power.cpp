@@ -91,6 +91,7 @@ Value state()
 extern "C" {
 
 int register_pm_ops(const PM_OPERATIONS_T* prOps)
+try
 {
     BOARD_CALL_R(register_pm_ops, object(prOps));
     auto& registered = power_state.registered;
@@ -106,11 +107,14 @@ int register_pm_ops(const PM_OPERATIONS_T* prOps)
         registered.push_back(prOps);
     return boardCall.answer(0);
 }
+BOARD_CALL_END(register_pm_ops)
 
 int unregister_pm_ops(const PM_OPERATIONS_T* prOps)
+try
 {
     BOARD_CALL_R(unregister_pm_ops, object(prOps));
     return boardCall.answer(std::erase(power_state.registered, prOps) == 0 ? -1 : 0);
 }
+BOARD_CALL_END(unregister_pm_ops)
 
 } // extern "C"

@@ -166,6 +166,7 @@ Value state()
 extern "C" {
 
 UINT32 x_reg_read32(UINT32 u4Address)
+try
 {
     BOARD_CALL_R(x_reg_read32, u4Address);
     if (!reachable(u4Address, "x_reg_read32"))
@@ -173,8 +174,10 @@ UINT32 x_reg_read32(UINT32 u4Address)
     ++registers_state.reads;
     return boardCall.answer(word_at(u4Address));
 }
+BOARD_CALL_END(x_reg_read32)
 
 void x_reg_write32(UINT32 u4Address, UINT32 u4Value)
+try
 {
     BOARD_CALL(x_reg_write32, u4Address, u4Value);
     if (!reachable(u4Address, "x_reg_write32"))
@@ -185,5 +188,6 @@ void x_reg_write32(UINT32 u4Address, UINT32 u4Value)
     if (u4Address == control_a || u4Address == synthesiser || u4Address == control_b)
         follow_pll(u4Address, before, u4Value);
 }
+BOARD_CALL_END(x_reg_write32)
 
 } // extern "C"

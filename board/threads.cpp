@@ -8,6 +8,7 @@
 #include <thread>
 #include <utility>
 
+#include "board/contained.h"
 #include "board/devices.h"
 #include "board/trace.h"
 
@@ -78,7 +79,7 @@ void be_thread(Thread& self, const std::function<void()>& function)
         std::unique_lock lock(threads.mutex);
         threads.handed_over.wait(lock, [&] { return threads.running == &self; });
     }
-    function();
+    contained(function);
     const std::lock_guard lock(threads.mutex);
     self.done = true;
     threads.running = self.resumer;

@@ -30,7 +30,7 @@ struct Context
 Context& context();
 
 /** Run a function as a thread of its own; returns when that is done, or waits. The name is for reports. Throws
- *  std::system_error when the system has no thread to give; no exception may leave the function. */
+ *  std::system_error when the system has no thread to give; what the function throws is contained, see contained.h. */
 void run(std::string name, std::function<void()> function);
 
 /** The running thread, which is not number 0, waits until somebody gives this semaphore. False when nobody ever will:

@@ -185,6 +185,7 @@ void clear_alarm()
 extern "C" {
 
 INT32 x_timer_create(HANDLE_T* phTimer)
+try
 {
     BOARD_CALL_R(x_timer_create, phTimer);
     if (phTimer == nullptr)
@@ -196,8 +197,10 @@ INT32 x_timer_create(HANDLE_T* phTimer)
     timers_state.timers[*phTimer] = {};
     return boardCall.answer(OSR_OK);
 }
+BOARD_CALL_END(x_timer_create)
 
 INT32 x_timer_start(HANDLE_T hTimer, UINT32 u4DelayMs, X_TIMER_FLAG_T eFlag, x_timer_cb_fct pfCallback, void* pvArg)
+try
 {
     BOARD_CALL_R(x_timer_start, hTimer, u4DelayMs, eFlag, pfCallback, ignored(pvArg));
     Timer* const timer = find_timer(hTimer, "x_timer_start");
@@ -219,8 +222,10 @@ INT32 x_timer_start(HANDLE_T hTimer, UINT32 u4DelayMs, X_TIMER_FLAG_T eFlag, x_t
     *timer = { true, timers_state.now + interval, interval, eFlag, pfCallback, pvArg, ++timers_state.starts };
     return boardCall.answer(OSR_OK);
 }
+BOARD_CALL_END(x_timer_start)
 
 INT32 x_timer_stop(HANDLE_T hTimer)
+try
 {
     BOARD_CALL_R(x_timer_stop, hTimer);
     Timer* const timer = find_timer(hTimer, "x_timer_stop");
@@ -229,8 +234,10 @@ INT32 x_timer_stop(HANDLE_T hTimer)
     timer->running = false;
     return boardCall.answer(OSR_OK);
 }
+BOARD_CALL_END(x_timer_stop)
 
 INT32 x_timer_delete(HANDLE_T hTimer)
+try
 {
     BOARD_CALL_R(x_timer_delete, hTimer);
     if (find_timer(hTimer, "x_timer_delete") == nullptr)
@@ -238,8 +245,10 @@ INT32 x_timer_delete(HANDLE_T hTimer)
     timers_state.timers.erase(hTimer);
     return boardCall.answer(OSR_OK);
 }
+BOARD_CALL_END(x_timer_delete)
 
 void x_thread_delay(UINT32 u4DelayMs)
+try
 {
     BOARD_CALL(x_thread_delay, u4DelayMs);
     if (board::os::in_timer_context())
@@ -247,5 +256,6 @@ void x_thread_delay(UINT32 u4DelayMs)
     else
         pass(std::chrono::milliseconds(u4DelayMs));
 }
+BOARD_CALL_END(x_thread_delay)
 
 } // extern "C"

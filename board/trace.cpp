@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <utility>
 
+#include "board/contained.h"
 #include "board/devices.h"
 #include "board/recorder.h"
 #include "board/threads.h"
@@ -106,7 +107,7 @@ By::By(std::string name) : m_name(std::move(name)), m_before(threads::context().
 
 By::~By()
 {
-    look();
+    contained(look);
     threads::context().by = m_before;
 }
 
@@ -124,9 +125,9 @@ Operation::~Operation()
 {
     if (!m_outermost)
         return;
-    look();
+    contained(look);
     if (--recorder().operations_running == 0)
-        interface_manager::operation_ends(threads::context().operation);
+        contained([] { interface_manager::operation_ends(threads::context().operation); });
     threads::context().operation.clear();
     threads::context().operation_running = false;
 }

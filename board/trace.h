@@ -3,17 +3,21 @@
  *  Every platform call, typed, in order. A platform function records itself and is a fault point in one line:
  *
  *      void TVE_SetEnable(UINT32 u4Tve, BOOL fgEnable)
+ *      try
  *      {
  *          BOARD_CALL(TVE_SetEnable, u4Tve, fgEnable);
  *          …update the model…
  *      }
+ *      BOARD_CALL_END(TVE_SetEnable)
  *
  *      INT32 x_timer_stop(HANDLE_T hTimer)
+ *      try
  *      {
  *          BOARD_CALL_R(x_timer_stop, hTimer);          // answers and leaves here when a fault is scripted
  *          …
  *          return boardCall.answer(OSR_OK);             // records the result
  *      }
+ *      BOARD_CALL_END(x_timer_stop)                     // what went wrong here ends here: the answer is a failure's
  *
  *  Arguments: numbers, enumerations and names of functions are recorded as they are; a pointer to a changeable number
  *  (HANDLE_T*, INT32*) is an output and is recorded by what it points to when the call ends. Other pointers are

@@ -116,19 +116,22 @@ CallRecord::CallRecord(const CallSite& site, std::vector<CallArgument> arguments
 
 CallRecord::~CallRecord()
 {
-    if (m_power_on == recorder().power_on)
-    {
+    contained([this] {
+        if (m_power_on != recorder().power_on)
+            return;
         write_outputs();
         trace::look();
         meanwhiles::call_ends(m_site.function, m_sequence);
-    }
+    });
     threads::Context& context = threads::context();
     context.by = m_by_before;
     if (m_power_on != recorder().power_on)
         return;
     --context.depth;
-    if (const TraceEntry* const entry = entry_of(m_sequence))
-        finished(*entry);
+    contained([this] {
+        if (const TraceEntry* const entry = entry_of(m_sequence))
+            finished(*entry);
+    });
 }
 
 void CallRecord::write_outputs()

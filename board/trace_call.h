@@ -5,6 +5,7 @@
  *      BOARD_CALL         functions without a result
  *      BOARD_CALL_R       functions with one: a scripted fault answers instead of acting
  *      BOARD_CALL_ACTING  functions that act also when a fault answers: they end in return boardCall.answer_or_fault(…)
+ *      BOARD_CALL_END     behind the function's block: no exception leaves it; see contained.h
  *
  *  Arguments, by their own tokens: a number, an enumeration, a function, a pointer to a changeable number (an output,
  *  read when the call ends), or one of the wrappers in trace_arguments. An output that a fault or boardCall.fail(…)
@@ -21,6 +22,7 @@
 #include <type_traits>
 #include <vector>
 
+#include "board/contained.h"
 #include "board/names.h"
 #include "board/value.h"
 
@@ -311,3 +313,10 @@ public:
     BOARD_CALL_ACTING(function __VA_OPT__(, ) __VA_ARGS__); \
     if (boardCall.fault())                                  \
     return boardCall.fault_answer()
+
+#define BOARD_CALL_END(function)                                      \
+    catch (...)                                                       \
+    {                                                                 \
+        ::board::keep_failure(#function);                             \
+        return ::board::failed_answer<BOARD_CALL_RESULT(function)>(); \
+    }

@@ -140,6 +140,7 @@ Value state()
 
 UINT32 TVE_SetFmtEx(UINT32 u4Tve, UCHAR ucMainFmt, UCHAR ucVFreq, UCHAR ucTargetFmt, BOOL fgEnable, BOOL fgHD,
                     UINT8 fgOSD5)
+try
 {
     BOARD_CALL_R(TVE_SetFmtEx, u4Tve, ucMainFmt, ucVFreq, ucTargetFmt, fgEnable, fgHD, fgOSD5);
     Encoder* target = encoder(u4Tve);
@@ -149,83 +150,110 @@ UINT32 TVE_SetFmtEx(UINT32 u4Tve, UCHAR ucMainFmt, UCHAR ucVFreq, UCHAR ucTarget
     target->enabled = fgEnable != 0;
     return boardCall.answer(TVE_SET_OK);
 }
+BOARD_CALL_END(TVE_SetFmtEx)
 
 void TVE_SetEnable(UINT32 u4Tve, BOOL fgEnable)
+try
 {
     BOARD_CALL(TVE_SetEnable, u4Tve, fgEnable);
     if (Encoder* target = encoder(u4Tve))
         target->enabled = fgEnable != 0;
 }
+BOARD_CALL_END(TVE_SetEnable)
 
 void TVE_SetMuteCtrol(BOOL fgFmtChange, UCHAR ucCavFmt, UCHAR ucCvbsFmt, BOOL fgHD, UINT8 fgOSD5)
+try
 {
     BOARD_CALL(TVE_SetMuteCtrol, fgFmtChange, ucCavFmt, ucCvbsFmt, fgHD, fgOSD5);
     tv_encoder_state.mute_control = MuteControl{ fgFmtChange != 0, ucCavFmt, ucCvbsFmt, fgHD != 0, fgOSD5 };
 }
+BOARD_CALL_END(TVE_SetMuteCtrol)
 
 void TVE_SetBlackScreen(UINT32 u4Tve, BOOL fgOn)
+try
 {
     BOARD_CALL(TVE_SetBlackScreen, u4Tve, fgOn);
     if (Encoder* target = encoder(u4Tve))
         target->black_screen = fgOn != 0;
 }
+BOARD_CALL_END(TVE_SetBlackScreen)
 
 void TVE_SetBrightness(UCHAR ucValue)
+try
 {
     BOARD_CALL(TVE_SetBrightness, ucValue);
     tv_encoder_state.brightness = ucValue;
 }
+BOARD_CALL_END(TVE_SetBrightness)
 
 void TVE_SetContrast(UCHAR ucValue)
+try
 {
     BOARD_CALL(TVE_SetContrast, ucValue);
     tv_encoder_state.contrast = ucValue;
 }
+BOARD_CALL_END(TVE_SetContrast)
 
 void TVE_SetHue(UCHAR ucValue)
+try
 {
     BOARD_CALL(TVE_SetHue, ucValue);
     tv_encoder_state.hue = ucValue;
 }
+BOARD_CALL_END(TVE_SetHue)
 
 void TVE_SetSaturation(UCHAR ucValue)
+try
 {
     BOARD_CALL(TVE_SetSaturation, ucValue);
     tv_encoder_state.saturation = ucValue;
 }
+BOARD_CALL_END(TVE_SetSaturation)
 
 void TVE_SetSharpness(UCHAR ucValue)
+try
 {
     BOARD_CALL(TVE_SetSharpness, ucValue);
     tv_encoder_state.sharpness = ucValue;
 }
+BOARD_CALL_END(TVE_SetSharpness)
 
 void TVE_SetBlackLvl(UCHAR ucCAVEn, UCHAR ucCVBSEn)
+try
 {
     BOARD_CALL(TVE_SetBlackLvl, ucCAVEn, ucCVBSEn);
     tv_encoder_state.black_level = BlackLevel{ ucCAVEn, ucCVBSEn };
 }
+BOARD_CALL_END(TVE_SetBlackLvl)
 
 void TVE_CVBSSetup_En(BOOL fgEnable)
+try
 {
     BOARD_CALL(TVE_CVBSSetup_En, fgEnable);
     tv_encoder_state.composite_setup = fgEnable != 0;
 }
+BOARD_CALL_END(TVE_CVBSSetup_En)
 
 void TVE_CVBSPal60_En(BOOL fgEnable)
+try
 {
     BOARD_CALL(TVE_CVBSPal60_En, fgEnable);
     tv_encoder_state.composite_pal60 = fgEnable != 0;
 }
+BOARD_CALL_END(TVE_CVBSPal60_En)
 
 void TVE_Identify_Mediatype(UCHAR ucMediaType)
+try
 {
     BOARD_CALL(TVE_Identify_Mediatype, ucMediaType);
     tv_encoder_state.media_type = ucMediaType;
 }
+BOARD_CALL_END(TVE_Identify_Mediatype)
 
 void TVE_SetAspectRatio(TVE_ASPECT_RATIO_T eAspect)
+try
 {
     BOARD_CALL(TVE_SetAspectRatio, eAspect);
     tv_encoder_state.aspect = eAspect;
 }
+BOARD_CALL_END(TVE_SetAspectRatio)

@@ -124,46 +124,60 @@ void release_graphics()
 } // namespace board::video_planes
 
 void VDP_SetTvFormat(UCHAR ucMode, BOOL fgChanged)
+try
 {
     BOARD_CALL(VDP_SetTvFormat, ucMode, fgChanged);
     video_planes_state.tv_format = TvFormat{ ucMode, fgChanged != 0 };
 }
+BOARD_CALL_END(VDP_SetTvFormat)
 
 void VDP_GlobalOutputChange(void)
+try
 {
     BOARD_CALL(VDP_GlobalOutputChange);
     ++video_planes_state.output_changes;
 }
+BOARD_CALL_END(VDP_GlobalOutputChange)
 
 void VDP_VsyncSendCmd(UINT32 u4VdpIdx, UINT32 u4Cmd)
+try
 {
     BOARD_CALL(VDP_VsyncSendCmd, u4VdpIdx, u4Cmd);
     if (Plane* target = plane_at(u4VdpIdx))
         target->commands.push_back(u4Cmd);
 }
+BOARD_CALL_END(VDP_VsyncSendCmd)
 
 void VDP_SetClearVideo(UCHAR ucVdpId, UCHAR ucY, UCHAR ucU, UCHAR ucV)
+try
 {
     BOARD_CALL(VDP_SetClearVideo, ucVdpId, ucY, ucU, ucV);
     if (Plane* target = plane_at(ucVdpId))
         target->clear_video = Colour{ ucY, ucU, ucV };
 }
+BOARD_CALL_END(VDP_SetClearVideo)
 
 VDP_ENABLE_T VDP_GetHwEnable(UCHAR ucVdpId)
+try
 {
     BOARD_CALL_R(VDP_GetHwEnable, ucVdpId);
     const Plane* target = plane_at(ucVdpId);
     return boardCall.answer(target != nullptr ? target->hw_enable : VDP_DISABLED);
 }
+BOARD_CALL_END(VDP_GetHwEnable)
 
 void VDP_EnableCC(BOOL fgEnable)
+try
 {
     BOARD_CALL(VDP_EnableCC, fgEnable);
     video_planes_state.closed_caption = fgEnable != 0;
 }
+BOARD_CALL_END(VDP_EnableCC)
 
 BOOL fgVdpIsWaitforSyncCtrl(void)
+try
 {
     BOARD_CALL_R(fgVdpIsWaitforSyncCtrl);
     return boardCall.answer(video_planes_state.waiting_for_sync ? TRUE : FALSE);
 }
+BOARD_CALL_END(fgVdpIsWaitforSyncCtrl)

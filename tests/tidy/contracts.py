@@ -94,10 +94,13 @@ def check_all_pointers(root):
 
 
 def check_board(root):
-    """Every platform function of the board records itself first, under its own name and with all its arguments."""
-    functions = {}
+    """Every platform function of the board records itself first, under its own name and with all its arguments, and
+    ends with what lets no exception leave it."""
+    functions, ended = {}, set()
     for path in sorted((root / "board").glob("*.cpp")):
-        for function in Source(path.read_text(encoding="utf-8")).functions():
+        text = path.read_text(encoding="utf-8")
+        ended |= set(re.findall(r"^\}\nBOARD_CALL_END\((\w+)\)$", text, re.M))
+        for function in Source(text).functions():
             functions[function.name] = (path.relative_to(root).as_posix(), function)
     if not functions:
         return
@@ -113,6 +116,8 @@ def check_board(root):
                 yield name, function.line, f"{function.name}: the first statement is not its BOARD_CALL"
             elif match.group(2) != function.name:
                 yield name, function.line, f"{function.name}: recorded as {match.group(2)}"
+            elif function.name not in ended:
+                yield name, function.line, f"{function.name}: its block ends without BOARD_CALL_END({function.name})"
             elif declaration.has_result == (match.group(1) == "BOARD_CALL"):
                 yield name, function.line, f"{function.name}: {match.group(1)} does not fit its result"
             else:

@@ -78,6 +78,7 @@ class Source:
 def _classify(head, inside_code):
     """(kind, name) of the block that follows the given text."""
     head = re.sub(r'\bextern\s*"[^"]*"', "extern_language", head)
+    head = re.sub(r"\bBOARD_CALL_END\s*\(\w+\)", " ", head)  # the end of the function before
     head = re.sub(r"\[\[.*?\]\]|\b(alignas|noexcept|requires|DRV_ENUM)\s*\([^()]*\)", " ", head)
     if re.search(r"\b(namespace|extern_language)\b[^()]*$", head):
         return "namespace", ""

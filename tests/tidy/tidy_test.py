@@ -23,8 +23,8 @@ CLEAN = {
               "#ifdef __cplusplus\n}\n#endif\n",
     LAYER: "/** Start.\n *  @context any */\nPMX_API void PMX_Init(void);\n",
     "src/driver/pmx/pmx_if.cpp": "void PMX_Init(void)\n{\n    TVE_Black(0); // before the first picture\n}\n",
-    "board/tv_encoder.cpp": "UINT32 TVE_Black(UINT32 u4Tve)\n{\n"
-                            "    BOARD_CALL_R(TVE_Black, u4Tve);\n    return 1;\n}\n",
+    "board/tv_encoder.cpp": "UINT32 TVE_Black(UINT32 u4Tve)\ntry\n{\n"
+                            "    BOARD_CALL_R(TVE_Black, u4Tve);\n    return 1;\n}\nBOARD_CALL_END(TVE_Black)\n",
 }
 
 
@@ -209,14 +209,16 @@ class Tidy(unittest.TestCase):
         self.assertIn("with the same parameters", "".join(self.found(files=files)))
 
     def test_the_board_records_every_call(self):
-        def board(body):
+        def board(body, end="BOARD_CALL_END(TVE_Black)"):
             return {"name": "board/tv_encoder.cpp",
-                    "content": f"UINT32 TVE_Black(UINT32 u4Tve)\n{{\n    {body}\n}}\n"}
+                    "content": f"UINT32 TVE_Black(UINT32 u4Tve)\ntry\n{{\n    {body}\n}}\n{end}\n"}
 
         self.refused("the first statement is not", **board("return 1;"))
         self.refused("recorded as TVE_White", **board("BOARD_CALL_R(TVE_White, u4Tve);"))
         self.refused("does not fit its result", **board("BOARD_CALL(TVE_Black, u4Tve);"))
         self.refused("u4Tve is not recorded", **board("BOARD_CALL_R(TVE_Black);"))
+        for end in ("", "BOARD_CALL_END(TVE_White)"):
+            self.refused("ends without BOARD_CALL_END(TVE_Black)", **board("BOARD_CALL_R(TVE_Black, u4Tve);", end))
         self.refused("the board does not have it", "board/tv_encoder.cpp", "void other()\n{\n}\n")
 
 

@@ -141,7 +141,16 @@ private:
         return CC_EOF;
     }
 
-    static unsigned char on_complete(EditLine* editor, int) { return self(editor).complete_word(); }
+    /** The library that calls it is no C++. */
+    static unsigned char on_complete(EditLine* editor, int)
+    try
+    {
+        return self(editor).complete_word();
+    }
+    catch (const std::exception&)
+    {
+        return CC_REFRESH_BEEP;
+    }
 
     unsigned char complete_word()
     {

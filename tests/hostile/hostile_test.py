@@ -350,18 +350,45 @@ class Interrupts(Directory):
             for left in self.left_behind():
                 (self.place / left).unlink()
 
+    def ended_while_it_traces(self, number):
+        """What it said, and the trace that stays behind, if any; the file that it was for is as it was."""
+        kept = self.write("trace", b"before")
+        process = subprocess.Popen([PROGRAM, "run", "--trace-file", kept, "-"], stdin=subprocess.PIPE,
+                                   stdout=subprocess.PIPE, stderr=subprocess.PIPE, cwd=self.place)
+        process.stdin.write(b"PMX_Init\nPMX_SetTvType 0 0\n")
+        process.stdin.flush()
+        while b"PMX_SetTvType" not in process.stdout.readline():
+            pass
+        process.send_signal(number)
+        _, said = process.communicate(timeout=PATIENCE)
+        self.assertNotEqual(0, process.returncode)
+        self.assertEqual((b"before", []), (kept.read_bytes(), self.left_behind()))
+        left = list(self.place.glob("trace.unfinished-*"))
+        content = "".join(path.read_text() for path in left)
+        for path in left:
+            path.unlink()
+        return said.decode(), [path.name for path in left], content
+
     def test_interrupted_while_it_traces(self):
-        for number in (signal.SIGINT, signal.SIGTERM):
-            kept = self.write("trace", b"before")
-            process = subprocess.Popen([PROGRAM, "run", "--trace-file", kept, "-"], stdin=subprocess.PIPE,
-                                       stdout=subprocess.PIPE, cwd=self.place)
-            process.stdin.write(b"PMX_Init\n")
-            process.stdin.flush()
-            process.stdout.readline()
-            process.send_signal(number)
-            process.communicate(timeout=PATIENCE)
-            self.assertEqual(-number, process.returncode)
-            self.assertEqual((b"before", []), (kept.read_bytes(), self.left_behind()))
+        self.assertEqual(("", [], ""), self.ended_while_it_traces(signal.SIGINT))
+
+    def test_the_trace_of_a_run_that_somebody_ends_is_kept(self):
+        for number in (signal.SIGTERM, signal.SIGHUP, signal.SIGQUIT, signal.SIGKILL, signal.SIGSEGV):
+            said, left, content = self.ended_while_it_traces(number)
+            self.assertEqual(1, len(left), number)
+            self.assertIn("x_sema_create(1, X_SEMA_TYPE_MUTEX, 1) = 0\n", content)
+            if number not in (signal.SIGKILL, signal.SIGSEGV):  # what a checked build says of the latter is its own
+                self.assertEqual(f"pmxboard: what was written until then is in {self.place / left[0]}\n", said)
+
+    def test_the_trace_of_what_cannot_be_read_on_is_kept(self):
+        lines = self.write("long.pmx", b"PMX_Init\n" + b"x" * (2 << 20))
+        for form in ("text", "jsonl", "chrome"):
+            trace = self.place / form
+            ended = self.run_tool("run", "--trace-format", form, "--trace-file", trace, lines)
+            self.check(ended, form, codes=(2,))
+            self.assertIn(f"{lines}:2: a line is longer than", ended.stderr.decode())
+            self.assertIn("x_sema_create", trace.read_text())
+        json.loads(trace.read_text())
 
     def test_many_writers_of_one_file(self):
         kept = self.write("kept", self.state.read_bytes())

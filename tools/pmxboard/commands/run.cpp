@@ -83,17 +83,29 @@ int run_traced(const RunOptions& run, OutputOptions output)
     std::unique_ptr<NewFile> trace_file;
     if (!run.trace_file.empty())
     {
-        trace_file = std::make_unique<NewFile>(run.trace_file);
+        trace_file = std::make_unique<NewFile>(run.trace_file, NewFile::Over::OutputsAlone, NewFile::Unfinished::Kept);
         output.trace_to = &trace_file->stream();
     }
     const TraceOptions how{ run.verbose, output.colour, trace_file != nullptr };
     auto trace = trace_form(run.trace_format).make(how, trace_file ? trace_file->stream() : std::cout);
     output.trace = trace.get();
-    const int code = run_each(run, opened, output);
-    trace.reset(); // what it still has to write
-    if (trace_file)
-        trace_file->commit();
-    return code;
+    const auto complete = [&] {
+        trace.reset(); // what it still has to write
+        if (trace_file)
+            trace_file->commit();
+    };
+    try
+    {
+        const int code = run_each(run, opened, output);
+        complete();
+        return code;
+    }
+    catch (...) // a scenario that cannot be read on: what happened until then is worth as much
+    {
+        if (trace)
+            complete();
+        throw;
+    }
 }
 
 } // namespace

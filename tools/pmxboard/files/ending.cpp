@@ -23,6 +23,8 @@ struct Temporary
 {
     std::atomic<pid_t> owner{ 0 }; ///< 0: the place is free
     char name[PATH_MAX] = {};
+    void (*write_rest)(void* writer) = nullptr;
+    void* writer = nullptr;
 };
 
 Temporary temporaries[4];
@@ -33,39 +35,74 @@ constexpr int interrupts[] = { SIGINT, SIGTERM, SIGHUP, SIGQUIT };
 constexpr int code_of_signal = 128; ///< as shells have it
 constexpr int code_of_failed_step = 1;
 
+/* What follows runs in signal handlers: system calls alone. */
+
 void say(const char* text)
 {
     [[maybe_unused]] const ssize_t ignored = write(STDERR_FILENO, text, std::strlen(text));
 }
 
-/* What follows runs in signal handlers: system calls alone. */
-
-void remove_temporaries()
+/** What somebody else has written, without what a terminal would obey. */
+void say_foreign(const char* text)
 {
-    for (Temporary& temporary : temporaries)
+    char line[1024];
+    std::size_t size = 0;
+    unsigned char before = 0;
+    for (; *text != '\0' && size + 1 < sizeof line; ++text)
+    {
+        const auto byte = static_cast<unsigned char>(*text);
+        const bool is_control = byte < ' ' || byte == 0x7F || (byte >= 0x80 && byte < 0xA0 && before <= 0xC2);
+        line[size++] = is_control ? '?' : *text;
+        before = byte;
+    }
+    line[size] = '\0';
+    say(line);
+}
+
+void remove(const Temporary& temporary)
+{
+    unlink(temporary.name);
+}
+
+void keep_what_can_be_kept(const Temporary& temporary)
+{
+    if (temporary.write_rest == nullptr)
+    {
+        remove(temporary);
+        return;
+    }
+    temporary.write_rest(temporary.writer);
+    say("pmxboard: what was written until then is in ");
+    say_foreign(temporary.name);
+    say("\n");
+}
+
+void for_each_temporary(void (*action)(const Temporary&))
+{
+    for (const Temporary& temporary : temporaries)
     {
         if (temporary.owner == getpid())
-            unlink(temporary.name);
+            action(temporary);
     }
 }
 
 void on_closed_pipe(int number)
 {
-    remove_temporaries();
+    for_each_temporary(remove);
     _exit(code_of_signal + number);
 }
 
 void on_interrupt(int number)
 {
-    remove_temporaries();
+    // Ctrl-C is for somebody who wants none of it.
+    for_each_temporary(number == SIGINT ? remove : keep_what_can_be_kept);
     signal(number, SIG_DFL);
     raise(number);
 }
 
 void on_breakdown(int number)
 {
-    remove_temporaries();
-    say(current_place);
+    say_foreign(current_place);
     say(": the step broke the program down: ");
     say(number == SIGSEGV   ? "memory that is not there (SIGSEGV)"
         : number == SIGBUS  ? "memory that is not there (SIGBUS)"
@@ -73,6 +110,7 @@ void on_breakdown(int number)
         : number == SIGABRT ? "it gave up (SIGABRT)"
                             : "a signal");
     say("\n");
+    for_each_temporary(keep_what_can_be_kept);
     _exit(code_of_failed_step);
 }
 
@@ -116,8 +154,7 @@ void use_another_stack()
 /** An exception that nobody catches: it met code that knows none. */
 [[noreturn]] void on_uncaught()
 {
-    remove_temporaries();
-    say(current_place);
+    say_foreign(current_place);
     say(": the step broke the program down: ");
     try
     {
@@ -127,13 +164,14 @@ void use_another_stack()
     }
     catch (const std::exception& error)
     {
-        say(error.what());
+        say_foreign(error.what());
     }
     catch (...)
     {
         say("something unknown was thrown");
     }
     say("\n");
+    for_each_temporary(keep_what_can_be_kept);
     _exit(code_of_failed_step);
 }
 
@@ -188,13 +226,15 @@ void end_as_it_comes()
     std::set_terminate(std::abort);
 }
 
-void remember_temporary(const char* name)
+void remember_temporary(const char* name, void (*write_rest)(void* writer), void* writer)
 {
     for (Temporary& temporary : temporaries)
     {
         if (temporary.owner != 0 || std::strlen(name) >= sizeof temporary.name)
             continue;
         std::strcpy(temporary.name, name);
+        temporary.write_rest = write_rest;
+        temporary.writer = writer;
         temporary.owner = getpid();
         return;
     }

@@ -18,8 +18,10 @@ void set_place(std::string_view place);
 /** In a copy of the process that is to die as it would by itself: its parent tells it. */
 void end_as_it_comes();
 
-/** An unfinished file, to be removed when the program is ended. There are few at a time. */
-void remember_temporary(const char* name);
+/** An unfinished file, to be removed when the program is ended. There are few at a time. One whose rest can be written
+ *  is kept, and told, when the program breaks down or somebody else ends it: it shows how far things went.
+ *  @param write_rest  of system calls alone: it runs in a signal handler; null: the file is removed in any case */
+void remember_temporary(const char* name, void (*write_rest)(void* writer) = nullptr, void* writer = nullptr);
 void forget_temporary(const char* name);
 
 } // namespace pmxboard

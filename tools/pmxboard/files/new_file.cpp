@@ -61,7 +61,7 @@ private:
     char m_part[65536];
 };
 
-NewFile::NewFile(const std::string& name, Over over) : m_name(name), m_over(over), m_target(name)
+NewFile::NewFile(const std::string& name, Over over, Unfinished unfinished) : m_name(name), m_over(over), m_target(name)
 {
     struct stat status
     {
@@ -82,7 +82,7 @@ NewFile::NewFile(const std::string& name, Over over) : m_name(name), m_over(over
         // What may not be written is not replaced either.
         if (exists && access(name.c_str(), W_OK) != 0)
             failed(errno);
-        create_beside();
+        create_beside(unfinished);
         if (exists)
             fchmod(m_buffer->file(), status.st_mode & 07777u);
     }
@@ -125,7 +125,7 @@ void NewFile::refuse_input() const
 }
 
 /** A file beside the one that it is to become, for only within a directory a name passes on at once. */
-void NewFile::create_beside()
+void NewFile::create_beside(Unfinished unfinished)
 {
     std::error_code error;
     const std::filesystem::path real = std::filesystem::weakly_canonical(m_name, error);
@@ -136,6 +136,9 @@ void NewFile::create_beside()
     m_target = std::filesystem::is_symlink(given, error) ? real.string() : m_name;
     const std::filesystem::path directory = std::filesystem::path(m_target).parent_path();
     std::string temporary = (directory.empty() ? "." : directory.string()) + "/.pmxboard-XXXXXX";
+    const bool is_kept = unfinished == Unfinished::Kept;
+    if (is_kept)
+        temporary = m_target + ".unfinished-XXXXXX";
     const int file = mkostemp(temporary.data(), O_CLOEXEC);
     if (file < 0)
         failed(errno);
@@ -144,7 +147,8 @@ void NewFile::create_beside()
     fchmod(file, 0666u & ~mask);
     m_buffer = std::make_unique<Buffer>(file);
     m_temporary = std::move(temporary);
-    remember_temporary(m_temporary.c_str());
+    const auto write_rest = [](void* buffer) { static_cast<Buffer*>(buffer)->pubsync(); };
+    remember_temporary(m_temporary.c_str(), is_kept ? +write_rest : nullptr, m_buffer.get());
 }
 
 void NewFile::failed(int error) const

@@ -22,8 +22,16 @@ public:
         Anything
     };
 
+    /** What becomes of it when the program is ended before it is complete. */
+    enum class Unfinished
+    {
+        Removed,
+        Kept ///< beside it, under a name that says so, unless it is ended by Ctrl-C: see remember_temporary()
+    };
+
     /** Throws board::files::FileError. */
-    explicit NewFile(const std::string& name, Over over = Over::OutputsAlone);
+    explicit NewFile(const std::string& name, Over over = Over::OutputsAlone,
+                     Unfinished unfinished = Unfinished::Removed);
     ~NewFile();
     NewFile(const NewFile&) = delete;
     NewFile& operator=(const NewFile&) = delete;
@@ -36,7 +44,7 @@ private:
     class Buffer;
 
     void refuse_input() const;
-    void create_beside();
+    void create_beside(Unfinished unfinished);
     [[noreturn]] void failed(int error) const;
 
     std::string m_name; ///< as the user wrote it

@@ -44,8 +44,15 @@ bool asks_for_changes(std::istream& lines)
         return true;
     }
     bool found = false;
-    for (std::string text; !found && board::files::next_line(lines, text);)
-        found = mentions_changes(text);
+    try
+    {
+        for (std::string text; !found && board::files::next_line(lines, text);)
+            found = mentions_changes(text);
+    }
+    catch (const board::files::FileError&)
+    {
+        found = false; // told when its turn comes
+    }
     lines.clear();
     lines.seekg(begin);
     return found;
@@ -86,10 +93,11 @@ bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOpt
         diagnostics << location() << presentable(error.what()) << '\n';
         return false;
     }
-    catch (const board::files::FileError&) // the scenario itself cannot be read any further
+    catch (const board::files::FileError& error) // the scenario itself cannot be read any further
     {
         output.flush();
-        throw;
+        ++number;
+        throw board::files::FileError(location() + error.what());
     }
     catch (const std::exception& error)
     {

@@ -3,8 +3,8 @@
 
 import random
 
-DEEP = 75_000
-LONG = 300_000
+DEEP = 30_000    # deeper than any stack, where each level is a call
+LONG = 100_000
 
 
 def shapes():
@@ -20,9 +20,9 @@ def shapes():
         "no UTF-8": b"\xff\xfe\xc0\x80\xed\xa0\x80 \xf5\n",
         "terminal": b"\x1b]0;title\x07\x1b[2J\x9b31m\xc2\x9b1m\x7f\r\x08\n",
         "one long line": b"x" * LONG + b"\n",
-        "longest line": b"x" * (2 << 20),
+        "longest line": b"x" * ((1 << 20) + 2),
         "no end": b"PMX_Init",
-        "many lines": b"# nothing\n" * 50_000,
+        "many lines": b"# nothing\n" * 10_000,
         "many words": b"a " * LONG + b"\n",
         "returns": b"PMX_Init\rPMX_Stop\r\n",
     }

@@ -15,7 +15,7 @@ import subprocess
 import sys
 from concurrent.futures import ThreadPoolExecutor
 
-sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))
+sys.path.append(str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))  # behind this directory, which has contracts, too
 
 import whole_file  # noqa: E402
 from tidy import CODE, files  # noqa: E402

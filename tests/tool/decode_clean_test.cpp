@@ -23,7 +23,11 @@ TEST(DecodeClean, TimeStampsAreReadWhateverTheirForm)
     EXPECT_EQ("12:34:56.789", stamp_of("12:34:56.789 PMX_Init").text);
     EXPECT_DOUBLE_EQ(45296.789, stamp_of("12:34:56,789 PMX_Init").seconds.value_or(0));
     EXPECT_EQ("", stamp_of("PMX_Init").text);
+    EXPECT_EQ("12:34:56", stamp_of("ttyS0 12:34:56: PMX_Init").text);
+    EXPECT_EQ("5.25", stamp_of("(  5.25) PMX_Init").text);
     EXPECT_EQ("", stamp_of("HDMI(1, RES_480I)").text);
+    for (const char* other : { "x1.12:34:56", "112:34:56", "12:34:5", "v 5.25 x", "[5.25x]", "[5.]", "12:34:" })
+        EXPECT_EQ("", stamp_of(other).text) << other;
 }
 
 TEST(DecodeClean, APrefixDoesNotEndInAWord)

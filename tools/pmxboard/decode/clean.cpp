@@ -3,7 +3,8 @@
 
 #include <algorithm>
 #include <cctype>
-#include <regex>
+#include <charconv>
+#include <optional>
 
 #include "tools/pmxboard/decode/pattern.h"
 
@@ -16,15 +17,86 @@ constexpr std::size_t longest_sequence = 64; ///< what is longer is rubbish, and
 constexpr std::size_t stamp_within = 48;
 
 constexpr char escape = '\x1b';
+constexpr char bell = '\a';
+constexpr std::string_view digits = "0123456789";
+
+// Every line of a log comes through here, and nearly every one has a time stamp: regular expressions would take longer
+// than the recognition of all texts.
+
+bool is_between(char c, char first, char last)
+{
+    return c >= first && c <= last;
+}
 
 /** The length of the terminal sequence at the beginning, which is an escape. */
 std::size_t sequence_length(std::string_view text)
 {
-    static const std::regex sequence("\x1b(?:\\[[ -?]*[@-~]|\\][^\a]*\a|[ -~])?");
     text = text.substr(0, longest_sequence);
-    std::cmatch found;
-    std::regex_search(text.data(), text.data() + text.size(), found, sequence, std::regex_constants::match_continuous);
-    return static_cast<std::size_t>(found.length());
+    const char kind = text.size() > 1 ? text[1] : bell;
+    if (kind == '[')
+    {
+        const auto is_parameter = [](char c) { return is_between(c, ' ', '?'); };
+        const auto end = std::find_if_not(text.begin() + 2, text.end(), is_parameter);
+        return end != text.end() && is_between(*end, '@', '~') ? static_cast<std::size_t>(end - text.begin()) + 1 : 2;
+    }
+    if (const std::size_t end = text.find(bell); kind == ']' && end != text.npos)
+        return end + 1;
+    return is_between(kind, ' ', '~') ? 2 : 1;
+}
+
+/** How many digits stand at the beginning. */
+std::size_t digits_in(std::string_view text)
+{
+    return std::min(text.find_first_not_of(digits), text.size());
+}
+
+/** The length of a fraction at the beginning, with its point, which is one of these characters; 0 for none. */
+std::size_t fraction_length(std::string_view text, std::string_view points)
+{
+    if (text.empty() || points.find(text.front()) == points.npos)
+        return 0;
+    const std::size_t count = digits_in(text.substr(1));
+    return count == 0 ? 0 : 1 + count;
+}
+
+double number_in(std::string_view text)
+{
+    double number = 0;
+    std::from_chars(text.data(), text.data() + text.size(), number);
+    return number;
+}
+
+/** A clock's time at the beginning: 12:30:45, with or without a fraction. */
+std::optional<Stamp> clock_at(std::string_view text)
+{
+    constexpr std::string_view shape = "00:00:00";
+    if (text.size() < shape.size() || text[2] != ':' || text[5] != ':' || digits_in(text) != 2 ||
+        digits_in(text.substr(3)) != 2 || digits_in(text.substr(6)) < 2)
+        return {};
+    std::string clock(text.substr(0, shape.size() + fraction_length(text.substr(shape.size()), ".,")));
+    const std::string_view written = clock;
+    std::string seconds(written.substr(6));
+    std::replace(seconds.begin(), seconds.end(), ',', '.');
+    return Stamp{ clock,
+                  number_in(written.substr(0, 2)) * 3600 + number_in(written.substr(3, 2)) * 60 + number_in(seconds) };
+}
+
+/** Seconds at the beginning: a decimal number that nothing goes on with. */
+std::optional<Stamp> seconds_at(std::string_view text)
+{
+    const std::size_t whole = digits_in(text);
+    const std::size_t length = whole + fraction_length(text.substr(whole), ".");
+    const bool is_alone = length == text.size() || std::string_view(" ]):").find(text[length]) != text.npos;
+    if (length == whole || !is_alone)
+        return {};
+    return Stamp{ std::string(text.substr(0, length)), number_in(text.substr(0, length)) };
+}
+
+/** Whether such a number may stand behind this: at the beginning of a line, or in a bracket. */
+bool is_before_seconds(std::string_view before)
+{
+    const std::size_t last = before.find_last_not_of(' ');
+    return last == before.npos || std::string_view("[(>").find(before[last]) != before.npos;
 }
 
 /** The trace of `pmxboard run` shows a text in quotes, with its line end written out. */
@@ -62,19 +134,21 @@ std::string clean(std::string_view line)
 
 Stamp stamp_of(std::string_view line)
 {
-    // A clock's time anywhere; a decimal number at the beginning or in a bracket.
-    static const std::regex time("(?:^|[^0-9.])(([0-9]{2}):([0-9]{2}):([0-9]{2}(?:[.,][0-9]+)?))|"
-                                 "(?:^|[\\[(>]) *([0-9]+\\.[0-9]+)(?=[ \\]):]|$)");
     line = line.substr(0, stamp_within);
-    std::cmatch found;
-    if (line.find("  LOG") != line.npos || // a trace, whose console lines have no times
-        !std::regex_search(line.data(), line.data() + line.size(), found, time))
+    if (line.find("  LOG") != line.npos) // a trace, whose console lines have no times
         return {};
-    if (found[5].matched)
-        return { found.str(5), std::stod(found.str(5)) };
-    std::string seconds = found.str(4);
-    std::replace(seconds.begin(), seconds.end(), ',', '.');
-    return { found.str(1), std::stod(found.str(2)) * 3600 + std::stod(found.str(3)) * 60 + std::stod(seconds) };
+    for (std::size_t at = line.find_first_of(digits); at < line.size(); at = line.find_first_of(digits, at))
+    {
+        const std::string_view number = line.substr(at);
+        const std::string_view before = line.substr(0, at);
+        const std::optional<Stamp> clock = before.ends_with('.') ? std::nullopt : clock_at(number);
+        if (clock)
+            return *clock;
+        if (const auto seconds = is_before_seconds(before) ? seconds_at(number) : std::nullopt)
+            return *seconds;
+        at += digits_in(number);
+    }
+    return {};
 }
 
 bool is_prefix(std::string_view before)

@@ -42,6 +42,8 @@ Whole longest_at_begin(std::string_view line)
         return best;
     for (const Pattern* const pattern : patterns_of(line.front()))
     {
+        if (!line.starts_with(pattern->lead))
+            continue;
         const Match found = match(pattern->format, line);
         if (found.state == Match::State::Whole && found.end > best.match.end)
             best = { pattern, found };

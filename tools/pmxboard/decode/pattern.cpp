@@ -71,7 +71,7 @@ std::vector<Pattern> compile_all()
         const bool told_by_its_file = text.level == level_assertion && text.format.size() < short_expression;
         const bool twin = !all.empty() && all.back().format == format;
         if (!told_by_its_file && !twin)
-            all.push_back({ &text, format, is_weak(text, format) });
+            all.push_back({ &text, format, format.substr(0, format.find('%')), is_weak(text, format) });
     }
     return all;
 }

@@ -17,6 +17,7 @@ struct Pattern
 {
     const Text* text;
     std::string_view format; ///< what the console shows of it
+    std::string_view lead;   ///< its own characters before the first value: most lines fail there
     bool weak;               ///< so short or plain that a foreign line may hold it by chance
 };
 

@@ -354,8 +354,14 @@ std::span<const Text> texts()
 
 bool has(std::string_view list, std::string_view item)
 {
-    const std::vector<std::string_view> items = split(list);
-    return std::find(items.begin(), items.end(), item) != items.end();
+    while (!list.empty())
+    {
+        const std::string_view first = list.substr(0, list.find(','));
+        if (board::tokens::trim(first) == item)
+            return true;
+        list.remove_prefix(std::min(first.size() + 1, list.size()));
+    }
+    return false;
 }
 
 } // namespace pmxboard::decode

@@ -146,7 +146,7 @@ std::string bit_words(std::uint32_t word, const Bits& bits, const std::string& e
 }
 
 /** The modes that hang on each bit: `720p 60 Hz (and 3D 720p 60 Hz, top and bottom)`. */
-Bits modes_by_bit()
+Bits collect_modes_by_bit()
 {
     std::map<unsigned, std::vector<std::string>> modes;
     for (const record_view::ModeRow& mode : record_view::mode_rows())
@@ -160,6 +160,12 @@ Bits modes_by_bit()
         const std::string others = joined({ names.begin() + 1, names.end() }, ", ");
         words[bit] = others.empty() ? names.front() : names.front() + " (and " + others + ")";
     }
+    return words;
+}
+
+const Bits& modes_by_bit()
+{
+    static const Bits words = collect_modes_by_bit(); // the table is constant, and a log may have many reports
     return words;
 }
 

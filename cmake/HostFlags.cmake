@@ -5,7 +5,8 @@ add_library(pmx_host INTERFACE)
 target_compile_features(pmx_host INTERFACE cxx_std_20)
 target_compile_options(pmx_host INTERFACE
     -Werror -Wall -Wextra -Wpedantic -Wshadow -Wundef -Wformat=2 -Wcast-qual -Wpointer-arith -Wvla
-    "$<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor;-Woverloaded-virtual;-Wextra-semi;-Wno-restrict>" -fno-pie)
+    "$<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor;-Woverloaded-virtual;-Wextra-semi>"
+    $<$<COMPILE_LANG_AND_ID:CXX,GNU>:-Wno-restrict> -fno-pie)
 if(CMAKE_CROSSCOMPILING)
     # All of a program comes of one compiler: that it once passed some parameters otherwise is of no interest.
     target_compile_options(pmx_host INTERFACE -Wno-psabi)
@@ -16,6 +17,11 @@ target_compile_definitions(pmx_host INTERFACE PMX_SOURCE_DIR="${PROJECT_SOURCE_D
 target_include_directories(pmx_host INTERFACE ${PROJECT_SOURCE_DIR})
 target_link_libraries(pmx_host INTERFACE pmx_headers)
 
+# Who builds the fuzz targets elsewhere has compiler flags of his own, and an engine.
+set(PMX_FUZZ_FLAGS "-fsanitize=fuzzer-no-link,address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer"
+    CACHE STRING "What a build for fuzzing is compiled and linked with")
+set(PMX_FUZZ_ENGINE -fsanitize=fuzzer CACHE STRING "What a fuzz target is linked with")
+
 set(PMX_SANITIZE_FLAGS "")
 if(PMX_SANITIZE)
     set(sanitizers address,undefined)
@@ -25,6 +31,9 @@ if(PMX_SANITIZE)
         set(sanitizers undefined)
     endif()
     set(PMX_SANITIZE_FLAGS -fsanitize=${sanitizers} -fno-sanitize-recover=all -fno-omit-frame-pointer)
+    if(PMX_SANITIZE STREQUAL FUZZ)
+        separate_arguments(PMX_SANITIZE_FLAGS UNIX_COMMAND "${PMX_FUZZ_FLAGS}")
+    endif()
     if(NOT PMX_SANITIZE STREQUAL LAYER)
         target_compile_options(pmx_host INTERFACE ${PMX_SANITIZE_FLAGS})
     endif()

@@ -29,5 +29,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     const auto forms = pmxboard::trace_forms();
     const std::string lines = fuzz::harmless({ reinterpret_cast<const char*>(data), size });
     run_traced(lines, forms[size % forms.size()]);
+    if (size % 4 == 0)
+        fuzz::must(fuzz::run(lines).people == fuzz::run(lines).people, "power-on makes everything as good as new");
     return 0;
 }

@@ -24,15 +24,17 @@ LOGS = sorted(pathlib.Path("tests/decode").glob("*.log"))
 # A state is large: a few tell all that there is in one.
 STATES = 4
 LONGEST_ENTRY = 60
+# Of a scenario that is not met: a test of its own tells that, and what it has shown is a seed all the same.
+FAILED_STEP = 1
 
 
 class Tool:
     def __init__(self, program):
         self.program = str(pathlib.Path(program).resolve())
 
-    def output(self, *arguments, **options):
+    def output(self, *arguments, may_fail=False, **options):
         run = subprocess.run([self.program, *arguments], capture_output=True, check=False, **options)
-        if run.returncode != 0:
+        if run.returncode != 0 and not (may_fail and run.returncode == FAILED_STEP):
             sys.exit(f"pmxboard {' '.join(map(str, arguments))}: {run.stderr.decode(errors='replace')}")
         return run.stdout
 
@@ -63,8 +65,9 @@ def states(tool):
         for path in SCENARIOS[:STATES]:
             into = pathlib.Path(directory, path.stem + ".json")
             tool.output("run", "--quiet", "-", input=path.read_bytes() + f'\nsave "{into}"\n'.encode(),
-                        cwd=path.parent)
-            saved.append((path.stem, into.read_bytes()))
+                        cwd=path.parent, may_fail=True)
+            if into.exists():
+                saved.append((path.stem, into.read_bytes()))
     yield from saved
     for (one, older), (other, newer) in zip(saved, saved[1:]):
         yield f"{one}-{other}", older + b"\0" + newer
@@ -90,7 +93,7 @@ def images(tool):
 
 def console_of(tool, path):
     """A trace has all that the layer prints, whatever the console's level is."""
-    return tool.output("run", path)
+    return tool.output("run", path, may_fail=True)
 
 
 def logs(tool):

@@ -243,9 +243,8 @@ TEST_F(MixerFormat, SetModeEx_AllDisabledAndHdmisModeRefused_WarnsAndRefuses)
         LOG9 "CVBS(0, RES_480I)\n"
         LOG9 "CCIR(0, 0, 0, 0)\n"
         LOG9 "OSD5(0)\n"
-        LOG0 "[PMX] Warning: Disable All output, set fmt as 50.\n"
-    )") + refused_change +
-                 lowered);
+    )") + "LOG0 \"[PMX] Warning: Disable All output, set fmt as " +
+                 std::to_string(RES_2160P_4096) + ".\\n\"\n" + refused_change + lowered);
     EXPECT_RECORD_UNCHANGED(before);
 }
 

@@ -109,7 +109,7 @@ class Reading(unittest.TestCase):
         self.refused("pi4OsdDisabled: /**< as FUNCTION */", self.operations)
 
     def test_an_enumerator_has_its_name(self):
-        self.change(SLOTS, "    RES_AUTO = 52\n", "    RES_AUTO = 52,\n    RES_TRY = 53\n")
+        self.change(SLOTS, "    RES_480I = 0,\n", "    RES_TRY = 200,\n    RES_480I = 0,\n")
         self.assertIn('{ Family::ResolutionMode, static_cast<std::int64_t>(RES_TRY), "RES_TRY" },', self.names())
 
     def test_a_constant_of_a_family_has_its_name(self):

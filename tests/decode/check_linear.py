@@ -13,7 +13,7 @@ import sys
 import tempfile
 
 CAPTURED = pathlib.Path(__file__).with_name("player.log").read_bytes()
-FEW = 100_000  # bytes
+FEW = 50_000  # bytes
 MOST_TIMES = 2.1  # as many instructions for twice the bytes
 MOST_A_LINE = 40_000  # instructions, of a line of the captured log, story and all
 

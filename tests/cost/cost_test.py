@@ -219,6 +219,15 @@ class Check(unittest.TestCase):
             self.assertEqual(1, len(self.complaints(lambda now, kind=kind: now["paths"][0].update({kind: 0}))))
             self.assertEqual(1, len(self.complaints(lambda now, kind=kind: now["paths"][0].update({kind: 4}))))
 
+    def test_an_operation_that_the_card_lacks_is_told_with_its_place(self):
+        self.assertEqual([], list(check.operations(card(), {"PMX_A": "layer.h:1"})))
+        self.assertEqual(["layer.h:2: the card has no PMX_B"],
+                         list(check.operations(card(), {"PMX_A": "layer.h:1", "PMX_B": "layer.h:2"})))
+
+    def test_the_header_tells_where_operations_are(self):
+        self.assertEqual(set(signatures.operations()), set(signatures.places()))
+        self.assertRegex(signatures.places()["PMX_Init"], r"drv_pmx\.h:\d+$")
+
     def test_paths_that_came_and_went(self):
         self.assertEqual(["PMX_A only: measured no more, and still on the card"],
                          self.complaints(lambda now: now["paths"].clear()))

@@ -15,6 +15,11 @@ def _grew(what, old, new):
         yield f"{what}: {old} has grown to {new}"
 
 
+def operations(old, places):
+    """Operations that the card was made without; it cannot be drawn with them."""
+    yield from (f"{place}: the card has no {name}" for name, place in places.items() if name not in old["functions"])
+
+
 def calls(old, new):
     """What a platform sees of each path: it changes only with intent."""
     before, now = ({_key(path): path for path in card["paths"]} for card in (old, new))

@@ -71,6 +71,8 @@ def check_card(card):
     """Everything that is wrong with the committed card."""
     old = json.loads(DATA.read_text(encoding="utf-8"))
     goals, explanations = goals_and_explanations()
+    if missing := list(check.operations(old, signatures.places())):
+        return missing
     complaints, notes = check.all_of(old, card)
     if DOCUMENT.read_text(encoding="utf-8") != cards.render(old, goals, explanations):
         complaints.append("docs/cost.md is not what docs/cost.json, the goals and the explanations make")

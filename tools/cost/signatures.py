@@ -120,6 +120,12 @@ def operations():
     return {declared.name: _function(declared) for declared in listed}
 
 
+def places():
+    """Where each of them is declared."""
+    header = platform_functions.LAYER_HEADER
+    return {declared.name: f"{header}:{declared.line}" for declared in platform_functions.functions(ROOT / header)}
+
+
 @functools.cache
 def platform():
     """What the layer needs, by name, and the one function of a video plane's table."""

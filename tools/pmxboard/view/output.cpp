@@ -148,7 +148,7 @@ void Output::write_console(std::string_view text)
             m_console_line += c;
             continue;
         }
-        if (people() != nullptr)
+        if (people() != nullptr && !m_trace->stands_for_console())
             *people() << "  | " << printable_lines(m_console_line) << '\n';
         m_console_line.clear();
     }

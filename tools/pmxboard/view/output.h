@@ -14,6 +14,7 @@
 #include "board/trace.h"
 #include "board/value.h"
 #include "tools/pmxboard/functions/operation.h"
+#include "tools/pmxboard/text/layout.h"
 #include "tools/pmxboard/text/paint.h"
 #include "tools/pmxboard/view/trace_filter.h"
 #include "tools/pmxboard/view/trace_sink.h"
@@ -46,8 +47,15 @@ public:
     void imagine(std::ostream& to);
     /** Whether stores are shown whatever the scenario says. */
     bool shows_stores() const { return m_options.stores; }
+    /** Whether people see anything but failures. */
+    bool for_people() const { return people() != nullptr; }
+    /** Whether a run is only told in short. */
+    bool is_short() const { return m_trace->stands_for_console(); }
     /** Whether a program reads the standard output, as JSON lines. */
     bool for_programs() const { return is_machine_read() && m_trace->has_lines(); }
+
+    /** How a text for people is to look. */
+    Look look() const { return { text_width(), m_options.colour }; }
 
     void powered_on() { m_trace->powered_on(); }
     void operation_begins(const std::string& name) { m_trace->operation_begins(name); }

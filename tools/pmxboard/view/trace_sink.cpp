@@ -10,6 +10,7 @@
 #include "tools/pmxboard/text/paint.h"
 #include "tools/pmxboard/text/printable.h"
 #include "tools/pmxboard/view/chrome_trace.h"
+#include "tools/pmxboard/view/summary_trace.h"
 
 namespace pmxboard
 {
@@ -82,6 +83,8 @@ std::span<const TraceForm> trace_forms()
           [](const TraceOptions&, std::ostream&) { return std::make_unique<JsonTrace>(); } },
         { "chrome", "for chrome://tracing and Perfetto's viewer",
           [](const TraceOptions&, std::ostream& to) { return std::make_unique<ChromeTrace>(to); } },
+        { "summary", "what each command did, in short",
+          [](const TraceOptions& options, std::ostream& to) { return std::make_unique<SummaryTrace>(options, to); } },
         { "off", "", [](const TraceOptions&, std::ostream&) { return std::make_unique<NoTrace>(); } },
     };
     return all;

@@ -37,6 +37,8 @@ public:
 
     /** Whether programs read it: then nothing for people stands in the same stream. */
     virtual bool is_for_programs() const { return true; }
+    /** Whether it tells of the console's lines, too, which then are not shown. */
+    virtual bool stands_for_console() const { return false; }
     /** Whether each line stands for itself, so that others may stand between. */
     virtual bool has_lines() const { return false; }
 };

@@ -36,7 +36,7 @@ class BashCompletion(unittest.TestCase):
 
     def test_subcommands(self):
         self.assertLessEqual({"run", "state", "shell", "ops", "modes", "decode"}, self.completed(""))
-        self.assertEqual({"state", "shell"}, self.completed("s"))
+        self.assertEqual({"state", "status", "shell"}, self.completed("s"))
 
     def test_options(self):
         self.assertLessEqual({"--trace-format", "--only", "--op", "-q", "--quiet", "--color", "--colour"},

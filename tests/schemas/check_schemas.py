@@ -31,6 +31,7 @@ diff
 diff mixer
 state
 state ucMode arOutputConf
+status
 """
 
 
@@ -56,6 +57,7 @@ def of_looks(tool, directory):
     run(tool, "run", "-q", "-", text="\n".join(steps))
     found += [("state", json.loads(run(tool, "state", "--json", newer, *paths)))
               for paths in ((), ("ucMode",), ("mixer", "arPortInfo[2]", "registers.words"))]
+    found += [("status", json.loads(run(tool, "status", "--json", name))) for name in (older, newer)]
     found += [("diff", json.loads(run(tool, "state", "--json", older, other))) for other in (older, newer)]
     return found
 

@@ -65,21 +65,23 @@ class SchemasRefuse(unittest.TestCase):
         self.assertTrue(complaint.startswith(where), f"{name}: {complaint!r} does not begin with {where}")
 
     def test_what_the_tool_writes_is_accepted(self):
-        self.assertEqual({"trace", "state", "diff", "ops", "modes", "decode"}, {name for name, _ in self.written})
+        self.assertEqual({"trace", "state", "status", "diff", "ops", "modes", "decode"},
+                         {name for name, _ in self.written})
         for name, document in self.written:
             self.assertEqual("", self.schemas.complaint(name, document))
 
     def test_a_key_more_or_less_in_any_line_of_a_trace(self):
         lines = [document for name, document in self.written if name == "trace"]
-        self.assertEqual({"call", "log", "state", "diff", "what-if"}, {line["kind"] for line in lines})
+        self.assertEqual({"call", "log", "state", "status", "diff", "what-if"}, {line["kind"] for line in lines})
         for line in lines:
-            self.refused("trace", {**line, "colour": "red"}, "$: Additional properties")
+            refusal = "Unevaluated" if line["kind"] == "status" else "Additional"
+            self.refused("trace", {**line, "colour": "red"}, f"$: {refusal} properties")
             for key in line.keys() - {"result", "level", "thread"}:
                 self.refused("trace", {name: value for name, value in line.items() if name != key}, "$: '")
             self.refused("trace", {**line, "kind": "shout"}, "$.kind: 'shout' is not one of")
 
     def test_a_key_more_anywhere_but_among_what_the_layer_names(self):
-        for name in ("diff", "modes", "decode", "ops"):
+        for name in ("diff", "status", "modes", "decode", "ops"):
             document = cut(self.of(name))
             for path in places(document):
                 if {"values", "report", "fields"} & set(path):

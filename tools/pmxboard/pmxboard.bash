@@ -57,6 +57,7 @@ _pmxboard_argument()
     local tool=$1 sub=$2 word=$3
     case $sub in
     run) _pmxboard_files "$word" '*.pmx' ;;
+    status) _pmxboard_files "$word" '*.json' ;;
     state)
         _pmxboard_files "$word" '*.json'
         _pmxboard_take "$word" < <("$tool" complete "state $word" 2>/dev/null) ;;

@@ -113,6 +113,18 @@ void add_state(CLI::App& app, Chosen& chosen)
     sub->callback([state, &chosen] { chosen = [state] { return show_state(*state); }; });
 }
 
+void add_status(CLI::App& app, Chosen& chosen)
+{
+    const auto status = std::make_shared<StatusOptions>();
+    CLI::App* const sub =
+        app.add_subcommand("status", "Show what a saved state means: outputs, planes, whether graphics wait.");
+    sub->add_option("FILE", status->file, "A state that a scenario saved; - reads the standard input")->required();
+    sub->add_flag("--json", status->json, "JSON for programs");
+    add_colour(sub, status->colour);
+    sub->footer(status_examples);
+    sub->callback([status, &chosen] { chosen = [status] { return show_status(*status); }; });
+}
+
 void add_shell(CLI::App& app, Chosen& chosen)
 {
     const auto shell = std::make_shared<ShellOptions>();
@@ -217,6 +229,7 @@ int run_command_line(int count, const char* const* arguments)
     Chosen chosen;
     add_run(app, chosen);
     add_state(app, chosen);
+    add_status(app, chosen);
     add_shell(app, chosen);
     add_guide(app, chosen);
     add_ops(app, chosen);

@@ -61,6 +61,16 @@ const char* const state_examples = R"(Examples:
 The keys are described in docs/board.md.
 Exit codes: 0 done or equal, 1 different, 2 wrong usage or no such state.)";
 
+const char* const status_examples = R"(Examples:
+  printf 'PMX_Init\nstatus\nsave now.json\n' | pmxboard run --trace-format summary -
+      show it in a scenario, and save the state
+  pmxboard status now.json
+      show it later, of the saved state
+  pmxboard status --json now.json | grep '"disagreements"'
+      the same for a program: here, whether record and hardware disagree
+
+Exit codes: 0 done, 2 wrong usage or no such state.)";
+
 const char* const shell_examples = R"(Examples:
   pmxboard shell
       a prompt: Tab completes, help tells more, Ctrl-D ends

@@ -11,6 +11,7 @@ extern const char* const overview_examples;
 
 extern const char* const run_examples;
 extern const char* const state_examples;
+extern const char* const status_examples;
 extern const char* const shell_examples;
 extern const char* const ops_examples;
 extern const char* const modes_examples;

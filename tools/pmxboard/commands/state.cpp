@@ -9,6 +9,7 @@
 #include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/state/dump.h"
 #include "tools/pmxboard/state/paths.h"
+#include "tools/pmxboard/state/status.h"
 #include "tools/pmxboard/text/paint.h"
 #include "tools/pmxboard/text/printable.h"
 
@@ -97,6 +98,22 @@ int compare(const StateOptions& options)
 }
 
 } // namespace
+
+int show_status(const StatusOptions& options)
+{
+    try
+    {
+        const StateDump dump = load(options.file);
+        const Status status = status_of(dump.state, dump.board);
+        const Look look{ text_width(), wants_colour(options.colour) };
+        std::cout << (options.json ? to_json(status) + "\n" : to_text(status, StatusPart::All, look));
+        return exit_done;
+    }
+    catch (const std::runtime_error& error)
+    {
+        return usage_error(error.what());
+    }
+}
 
 int show_state(const StateOptions& options)
 {

@@ -9,6 +9,16 @@
 namespace pmxboard
 {
 
+struct StatusOptions
+{
+    std::string file;
+    bool json = false;
+    std::string colour = "auto";
+};
+
+/** `pmxboard status`: what a saved state means. The exit code. */
+int show_status(const StatusOptions& options);
+
 struct StateOptions
 {
     std::string file;

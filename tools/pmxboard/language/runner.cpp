@@ -9,6 +9,8 @@
 #include "tools/pmxboard/files/ending.h"
 #include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/state/now.h"
+#include "tools/pmxboard/state/status.h"
 #include "tools/pmxboard/text/printable.h"
 
 namespace pmxboard
@@ -56,6 +58,15 @@ bool asks_for_changes(std::istream& lines)
     lines.clear();
     lines.seekg(begin);
     return found;
+}
+
+/** Who reads a run and not its state would take the record's word. */
+void note_disagreements(Output& output)
+{
+    if (!output.for_people())
+        return;
+    for (const std::string& disagreement : status_of(whole_state(), {}).disagreements)
+        output.remark("note: " + disagreement);
 }
 
 } // namespace
@@ -106,7 +117,8 @@ bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOpt
                     << "repeat: " << printable(scenario.repeat) << '\n';
         return false;
     }
-    if (session.expectations() != 0)
+    note_disagreements(output);
+    if (session.expectations() != 0 && !output.is_short())
         output.text(printable(file) + ": " + std::to_string(session.expectations()) + " expectations met\n");
     return true;
 }

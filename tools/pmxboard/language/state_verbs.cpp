@@ -11,6 +11,7 @@
 #include "tools/pmxboard/state/dump.h"
 #include "tools/pmxboard/state/now.h"
 #include "tools/pmxboard/state/paths.h"
+#include "tools/pmxboard/state/status.h"
 #include "tools/pmxboard/text/printable.h"
 #include "tools/record_view/record_view.h"
 
@@ -48,6 +49,17 @@ void show_state(Session& session, const Words& words)
         values.emplace_back("", whole_state());
     const std::string json = paths.empty() ? to_json(dump_of_now()) : to_json(dump_of_now().board, values);
     session.output().shown(line_for_programs(values), words.has("--json") ? json + "\n" : to_text(values));
+}
+
+void show_status(Session& session, const Words& words)
+{
+    const Status status = status_of(whole_state(), board::description().name);
+    const StatusPart part = words.has("outputs")    ? StatusPart::Outputs
+                            : words.has("planes")   ? StatusPart::Planes
+                            : words.has("graphics") ? StatusPart::Graphics
+                                                    : StatusPart::All;
+    session.output().shown(to_json_line(status), words.has("--json") ? to_json(status) + "\n"
+                                                                     : to_text(status, part, session.output().look()));
 }
 
 void show_changes(Session& session, const Words& words)
@@ -98,6 +110,13 @@ void poke(Session&, const Words& words)
 std::vector<Verb> state_verbs()
 {
     return {
+        { "status",
+          { { "status [outputs|planes|graphics] [--json]",
+              "show what each output shows, what each plane is fed with, whether graphics are held back and until "
+              "when, "
+              "and where record and hardware disagree; or one of these",
+              show_status } },
+          true },
         { "state",
           { { "state [PATH…] [--json]", "show what board and layer hold, or parts of it", show_state } },
           true },

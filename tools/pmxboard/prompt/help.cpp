@@ -77,6 +77,30 @@ std::string slot_text(const Operation& slot, const Look& look)
     return text + "\n";
 }
 
+/** What people ask for who do not know its name. */
+struct Topic
+{
+    std::string_view word;
+    std::string_view text;
+};
+
+constexpr std::string_view about_waiting =
+    "Graphics leave the picture when a mode change finds the display part switching the sink, so that nobody sees them "
+    "jump. They come back when it has switched and says so by PMX_SetFormatChangeFlag, or after ten seconds, when the "
+    "display timer runs out; while the video plane waits for its sync control, when that calls PMX_SetOsdEnable.";
+
+constexpr Topic topics[] = { { "wait", about_waiting }, { "graphics", about_waiting } };
+
+std::string topic_text(const Topic& topic, const Look& look)
+{
+    return look.bold(topic.word) + "\n" + wrapped(topic.text, look.width, 2, 2) +
+           "  status graphics    whether they wait now, since when, until when and for whom\n"
+           "  status             the same, and what outputs and planes show\n"
+           "  display-part …     how long the display part takes\n"
+           "  advance 3s         let time pass\n"
+           "  For example: scenarios/first-look.pmx\n";
+}
+
 } // namespace
 
 std::vector<std::string_view> help_words()
@@ -88,6 +112,8 @@ std::vector<std::string_view> help_words()
         words.push_back(function.name);
     for (const Operation& slot : ipmx_slots())
         words.push_back(slot.name);
+    for (const Topic& topic : topics)
+        words.push_back(topic.word);
     const auto& constants = board::names::all();
     words.insert(words.end(), constants.begin(), constants.end());
     return words;
@@ -103,6 +129,11 @@ std::string help_on(const std::string& word, const Look& look)
         return platform_text(word, look);
     if (const Operation* const slot = find(ipmx_slots(), word))
         return slot_text(*slot, look);
+    for (const Topic& topic : topics)
+    {
+        if (topic.word == word)
+            return topic_text(topic, look);
+    }
     if (const auto number = board::names::number_of(word))
         return constant_text(word, *number, look);
     if (record_view::has(word))

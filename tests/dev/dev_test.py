@@ -22,7 +22,7 @@ takes_two_users = unittest.skipIf(os.geteuid() != 0, "takes two users")
 
 class Place(TreeTest):
     def runs_in(self, tree, **how):
-        self.expect(0, f"ran in {tree}: run {tree}/scenarios/cold-boot.pmx\n", "run", **how)
+        self.expect(0, f"ran in {tree}: run --trace-format summary {tree}/scenarios/first-look.pmx\n", "run", **how)
 
     def test_from_any_folder(self):
         (self.tree / "docs").mkdir()

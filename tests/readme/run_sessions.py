@@ -6,7 +6,8 @@ usage: run_sessions.py [--most N] DOCUMENT TOOL
 
 In a ```console block, `$ COMMAND` is typed at the shell and `pmx> COMMAND` at the prompt of the `pmxboard shell` before
 it. The lines behind a command are what it shows, all of it; `…` stands for any number of lines. The commands of a block
-run in a directory of their own; build/release/pmxboard is the given tool there. With --most, no block may hold more
+run in a directory of their own, with an empty build folder and the document's scenarios at hand; build/release/pmxboard
+is the given tool there. With --most, no block may hold more
 commands.
 """
 
@@ -117,6 +118,8 @@ def main():
         with tempfile.TemporaryDirectory() as directory:
             (pathlib.Path(directory) / "bin").mkdir()
             (pathlib.Path(directory) / "bin/pmxboard").symlink_to(options.tool.resolve())
+            (pathlib.Path(directory) / "build").mkdir()
+            (pathlib.Path(directory) / "scenarios").symlink_to(options.document.resolve().parent / "scenarios")
             environment = {**os.environ, "PATH": f"{directory}/bin:{os.environ['PATH']}", "HOME": directory}
             wrong = list(complaints(commands, directory, environment))
         if len(commands) > options.most:

@@ -21,6 +21,8 @@ class RunSessions(unittest.TestCase):
             root = pathlib.Path(directory)
             (root / "README.md").write_text(text, encoding="utf-8")
             (root / "tool").write_text(TOOL)
+            (root / "scenarios").mkdir()
+            (root / "scenarios/here.pmx").touch()
             (root / "tool").chmod(0o755)
             result = subprocess.run([sys.executable, RUNNER, *options, root / "README.md", root / "tool"],
                                     capture_output=True, text=True, check=False)
@@ -28,7 +30,8 @@ class RunSessions(unittest.TestCase):
 
     def test_good(self):
         code, text = self.run_document("```console\n$ pmxboard 0\none\n…\nthree\n…\n$ pmxboard shell\npmx> a\ndid a\n"
-                                       "pmx> b\n…\n$ ls a b\na\nb\n```\n```sh\nfalse\n```\n", "--most", "5")
+                                       "pmx> b\n…\n$ ls a b scenarios build\na\nb\n\nbuild:\n\nscenarios:\n"
+                                       "here.pmx\n```\n```sh\nfalse\n```\n", "--most", "5")
         self.assertEqual(0, code, text)
         self.assertIn("5 commands, 0 failures", text)
 

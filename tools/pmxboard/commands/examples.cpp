@@ -7,6 +7,8 @@ namespace pmxboard
 const char* const overview_examples = R"(Examples:
   pmxboard run scenarios/cold-boot.pmx
       start the mixer on the default board and watch every platform call
+  pmxboard run --trace-format summary scenarios/first-look.pmx
+      see in short what a change of the output does, and what it shows then
   pmxboard modes
       see the resolution modes
   pmxboard ops PMX_SetModeEx

@@ -178,8 +178,11 @@ bool Value::matches(std::string_view token) const
     }
     if (!token.starts_with('{'))
         return false;
-    const auto members = tokens::split(tokens::inside(token, '{', '}'));
-    if (members.size() != m_items.size())
+    auto members = tokens::split(tokens::inside(token, '{', '}'));
+    const bool leaves_out = std::erase_if(members, [](std::string_view member) {
+                                return member == "…" || member == "..." || member == "as before";
+                            }) != 0;
+    if (members.size() > m_items.size() || (members.size() < m_items.size() && !leaves_out))
         return false;
     return std::all_of(members.begin(), members.end(), [this](std::string_view member) {
         const std::size_t equals = member.find('=');

@@ -56,7 +56,7 @@ public:
     /** For people: RES_480P, 0x108080, "text", [1, 2], {a=1}, null. */
     std::string to_text() const;
     /** Whether a token written by a person means this value: a number in any base, a symbolic name, "*", a quoted text
-     *  with escapes, a list or record of such tokens. */
+     *  with escapes, a list or record of such tokens; a record may leave members out where "…" or "..." stands. */
     bool matches(std::string_view token) const;
     /** JSON, in the form that json.h describes. indent < 0: on one line. */
     std::string to_json(int indent = -1) const;

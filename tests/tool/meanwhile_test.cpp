@@ -250,7 +250,7 @@ TEST(ThreadVerb, WaitsForTheMutex_AndTheTraceSaysSo)
                           "expect call i4ImReleaseInterface(...)\nexpect next x_sema_unlock(1) = 0\n"
                           "expect next NOTICE thread \"i4Pmx_Connect goes on\"\nexpect next LOG8 \"Tp,Id=176,1\\n\"\n"
                           "expect next LOG8 \"Comp(3) connect\\n\"\nexpect next x_sema_unlock(1) = 0\n"
-                          "expect next NOTICE meanwhile \"= 0x71000000\"\nexpect no-more\n"
+                          "expect next NOTICE meanwhile \"= PMX_PORT_DONE\"\nexpect no-more\n"
                           "expect state arPortInfo[3].fgConnected 1\nexpect misuses 0\nexpect asserts 0"));
 }
 

@@ -67,7 +67,7 @@ TEST(Operations, List_ArrivesItemByItem)
 {
     const auto operation = pmxboard::operation<take_order>("take_order", { "ucPmxId", { "pu4PlaneOrder", 8 } });
     const auto outcome = call(operation, { "0", "[7, 6, 5, 4, 3, 2, 1, 0x105]" });
-    EXPECT_EQ("0xF1000002", outcome.result->to_text());
+    EXPECT_EQ("PMX_NO_SUCH_PORT", outcome.result->to_text());
     EXPECT_EQ(7u, seen_order[0]);
     EXPECT_EQ(0x105u, seen_order[7]);
     call(operation, { "0", "null" });
@@ -97,7 +97,7 @@ TEST(Operations, Outputs_AreNotWritten_AndReported)
     ASSERT_EQ(2u, outcome.outputs.size());
     EXPECT_EQ("pucSmall", outcome.outputs[0].name);
     EXPECT_EQ("254", outcome.outputs[0].value->to_text());
-    EXPECT_EQ("65538", outcome.outputs[1].value->to_text());
+    EXPECT_EQ("0x10002", outcome.outputs[1].value->to_text());
 }
 
 TEST(Operations, Output_LeftAlone_IsUntouched)

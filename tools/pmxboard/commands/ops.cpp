@@ -74,12 +74,8 @@ std::string list_text(const std::vector<const Contract*>& listed, const Look& lo
         section = contract->section;
         std::string line = "  " + std::string(contract->name);
         line.append(longest + 4 - line.size(), ' ').append(first_sentence(contract->brief));
-        if (columns_of(line) > look.width)
-        {
-            line.resize(line.rfind(' ', look.width - 2));
-            line += " …";
-        }
-        text += line + "\n";
+        // Whoever searches through a pipe wants the line whole.
+        text += is_on_screen() ? wrapped(line, look.width, 0, static_cast<unsigned>(longest + 4)) : line + "\n";
     }
     return text;
 }

@@ -57,7 +57,7 @@ void show_event(std::ostream& out, const Event& event, std::size_t range_width, 
         lead += padded_left(event.time, time_width) + "  ";
     const std::string mark = event.problem ? "! " : "";
     const std::string head = behind(lead, mark + event.operation + ": " + event.title, 2);
-    out << options.paint(lead, Colour::Grey) << options.paint(head, event.problem ? Colour::Yellow : Colour::Bold)
+    out << options.paint(lead, Colour::Grey) << options.paint(head, event.problem ? Colour::Magenta : Colour::Bold)
         << '\n';
 
     const auto indent = static_cast<unsigned>(lead.size() + 2);
@@ -191,7 +191,7 @@ void show_comparison(std::ostream& out, const Comparison& comparison, const Show
     const Departure& departure = *comparison.departure;
     const std::string where = departure.found ? "line " + std::to_string(departure.found->line) : "its end";
     const std::string title = against + " departs at " + where + ": " + std::string(kind_words(departure.kind));
-    out << options.paint(behind("", title, 2), Colour::Yellow) << '\n';
+    out << options.paint(behind("", title, 2), Colour::Magenta) << '\n';
     show_field(out, "agreement", agreement);
     show_field(out, "expected",
                departure.expected ? departure.expected->item.shown : "nothing more: the scenario is over");

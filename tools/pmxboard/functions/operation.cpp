@@ -160,4 +160,16 @@ PMX_RESOLUTION_T RecordKind<PMX_RESOLUTION_T>::from(const Value& value)
     return filled<PMX_RESOLUTION_T>(value);
 }
 
+board::Value yielded(board::names::Family family, std::int64_t number)
+{
+    constexpr std::int64_t large = 0xFFFF;
+    std::string_view name = board::names::name_of(family, number);
+    for (const std::string_view general : board::names::all())
+    {
+        if (name.empty() && number > large && board::names::number_of(general) == number && general_constant(general))
+            name = general;
+    }
+    return board::Value::number(number, name, number > large ? board::Value::Base::Hex : board::Value::Base::Decimal);
+}
+
 } // namespace pmxboard

@@ -108,6 +108,10 @@ const std::vector<Operation>& neighbours();
 /** Functions of the table that the mixer registers; the tag stands first. */
 const std::vector<Operation>& ipmx_slots();
 
+/** A number that a function answers or writes, by its name in the family or, of a large one, by the name that goes with
+ *  any number: PMX_PORT_DONE. Large ones are packed, and read in hexadecimal. */
+board::Value yielded(board::names::Family family, std::int64_t number);
+
 /** What an output holds before the call; a function that leaves it so has not written it. */
 constexpr unsigned char untouched_byte = 0xA5;
 
@@ -176,8 +180,7 @@ struct Argument<T*>
         const auto value = static_cast<std::int64_t>(number);
         outcome.outputs.push_back({ parameter.name, std::nullopt });
         if (number != untouched())
-            outcome.outputs.back().value =
-                board::Value::number(value, board::names::name_of(parameter.kind.family, value));
+            outcome.outputs.back().value = yielded(parameter.kind.family, value);
     }
 
     static Parameter describe(std::string_view owner, const ParameterName& name)
@@ -319,8 +322,7 @@ Outcome call_with(const Function& function, const Operation& operation, const Va
     else
     {
         const auto number = static_cast<std::int64_t>(function(std::get<I>(arguments).passed...));
-        const auto base = number > 0xFFFF ? board::Value::Base::Hex : board::Value::Base::Decimal;
-        outcome.result = board::Value::number(number, board::names::name_of(operation.result_family, number), base);
+        outcome.result = yielded(operation.result_family, number);
     }
     (std::get<I>(arguments).report(operation.parameters[I], outcome), ...);
     return outcome;

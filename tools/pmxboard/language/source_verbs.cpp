@@ -14,7 +14,6 @@ namespace pmxboard
 namespace
 {
 
-using board::Value;
 using board::sources::Id;
 
 Id source_in(const Words& words, std::string_view place)
@@ -38,8 +37,7 @@ board::sources::Size size_in(const Words& words)
 
 void answer(Session& session, UINT32 result)
 {
-    const auto base = result > 0xFFFF ? Value::Base::Hex : Value::Base::Decimal;
-    session.set_outcome("source", { Value::number(result, {}, base), {} });
+    session.set_outcome("source", { yielded(board::names::Family::None, result), {} });
 }
 
 void connect(Session& session, const Words& words)

@@ -124,19 +124,20 @@ std::vector<Change> changes_at(const std::vector<Change>& all, const std::vector
 
 std::string to_text(const std::vector<Change>& all)
 {
+    const unsigned width = text_width();
     std::string text;
     for (const Change& change : all)
     {
         const std::string older = text_of(change.older);
         const std::string newer = text_of(change.newer);
         const std::size_t values = older.size() + 3 + newer.size(); // the arrow is one column on the screen
-        if (2 + change.path.size() + 2 + values <= usual_width)
+        if (2 + change.path.size() + 2 + values <= width)
             text += "  " + change.path + "  " + older + " → " + newer + "\n";
-        else if (6 + values <= usual_width)
+        else if (6 + values <= width)
             text += "  " + change.path + "\n      " + older + " → " + newer + "\n";
         else
-            text += "  " + change.path + "\n      " + folded(std::string(6, ' ') + older, 8).substr(6) + "\n    → " +
-                    folded(std::string(6, ' ') + newer, 8).substr(6) + "\n";
+            text += "  " + change.path + "\n      " + folded(std::string(6, ' ') + older, 8, width).substr(6) +
+                    "\n    → " + folded(std::string(6, ' ') + newer, 8, width).substr(6) + "\n";
     }
     return text;
 }

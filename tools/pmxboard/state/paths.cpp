@@ -42,7 +42,7 @@ std::string tree(const board::Value& value, std::size_t indent)
         const board::Value& member = value.items()[i];
         const std::string head = std::string(indent, ' ') + (is_list ? item_step(i) : value.keys()[i]);
         const std::string line = head + " = " + member.to_text();
-        if (member.items().empty() || line.size() <= usual_width)
+        if (member.items().empty() || line.size() <= text_width())
             text += line + "\n";
         else
             text += head + "\n" + tree(member, indent + 2);

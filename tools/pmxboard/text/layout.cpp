@@ -9,10 +9,15 @@
 namespace pmxboard
 {
 
+bool is_on_screen()
+{
+    return isatty(STDOUT_FILENO) == 1;
+}
+
 unsigned text_width()
 {
     winsize window{};
-    if (isatty(STDOUT_FILENO) != 1 || ioctl(STDOUT_FILENO, TIOCGWINSZ, &window) != 0 || window.ws_col == 0)
+    if (!is_on_screen() || ioctl(STDOUT_FILENO, TIOCGWINSZ, &window) != 0 || window.ws_col == 0)
         return usual_width;
     return std::clamp(static_cast<unsigned>(window.ws_col), 40u, 100u);
 }
@@ -62,7 +67,7 @@ std::string in_columns(const std::vector<std::string>& words, unsigned width)
     return text;
 }
 
-std::string folded(const std::string& line, std::size_t indent)
+std::string folded(const std::string& line, std::size_t indent, unsigned width)
 {
     std::string lines;
     std::size_t begin = 0;
@@ -73,7 +78,7 @@ std::string folded(const std::string& line, std::size_t indent)
         if (line[i] == '"' && (i == 0 || line[i - 1] != '\\'))
             quoted = !quoted;
         const std::size_t column = i - begin + (begin == 0 ? 0 : indent);
-        if (column >= usual_width && comma > begin)
+        if (column >= width && comma > begin)
         {
             lines += line.substr(begin, comma - begin) + '\n' + std::string(indent, ' ');
             begin = comma + 1;

@@ -34,8 +34,10 @@ std::size_t columns_of(std::string_view text);
 std::string wrapped(std::string_view text, unsigned width, unsigned indent, unsigned hanging);
 /** Words in columns, downwards, as a directory is listed. */
 std::string in_columns(const std::vector<std::string>& words, unsigned width);
-/** A call's or a value's line broken behind commas where it is too long for the screen; texts stay whole. What follows
- *  is indented. */
-std::string folded(const std::string& line, std::size_t indent);
+/** A call's or a value's line broken behind commas where it is longer than this; texts stay whole. What follows is
+ *  indented. */
+std::string folded(const std::string& line, std::size_t indent, unsigned width);
+/** Whether a person reads the standard output on a screen, and no program or file gets it. */
+bool is_on_screen();
 
 } // namespace pmxboard

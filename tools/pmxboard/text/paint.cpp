@@ -10,7 +10,8 @@ namespace pmxboard
 namespace
 {
 
-constexpr const char* codes[] = { "\x1b[1m", "\x1b[32m", "\x1b[33m", "\x1b[90m" }; ///< by Colour
+/** By Colour. Yellow is not seen on a light screen, grey not on a dark one. */
+constexpr const char* codes[] = { "\x1b[1m", "\x1b[32m", "\x1b[35m", "\x1b[90m" };
 constexpr const char* end_of_paint = "\x1b[0m";
 
 } // namespace

@@ -13,7 +13,7 @@ enum class Colour
 {
     Bold,
     Green,
-    Yellow,
+    Magenta,
     Grey
 };
 

@@ -52,7 +52,7 @@ void Output::command(std::string_view line)
 void Output::expectation(std::string_view line)
 {
     if (people() != nullptr && m_options.verbose)
-        *people() << m_paint("> " + printable_lines(line), Colour::Grey) << '\n';
+        *people() << "> " + printable_lines(line) << '\n';
 }
 
 void Output::outcome(const Outcome& outcome)
@@ -81,7 +81,7 @@ void Output::remark(std::string_view text)
 {
     flush();
     if (people() != nullptr)
-        *people() << m_paint(printable_lines(text), Colour::Yellow) << '\n';
+        *people() << m_paint(printable_lines(text), Colour::Magenta) << '\n';
 }
 
 void Output::shown(const std::string& json_line, std::string_view text)

@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <cstdio>
 #include <iterator>
+#include <map>
 #include <stdexcept>
 
 #include "tools/pmxboard/text/layout.h"
@@ -18,6 +19,21 @@ namespace
 {
 
 using board::TraceEntry;
+using board::Value;
+
+/** "{…, u2_Vfreq=60}": what differs between two records with the same members. */
+std::string changes_in(const Value& older, const Value& newer)
+{
+    if (older == newer)
+        return "{as before}";
+    std::string text = "{…";
+    for (std::size_t i = 0; i < newer.keys().size(); ++i)
+    {
+        if (!(older.items()[i] == newer.items()[i]))
+            text += ", " + newer.keys()[i] + "=" + newer.items()[i].to_text();
+    }
+    return text + "}";
+}
 
 /** A line a call, for people. */
 class TextTrace : public TraceSink
@@ -32,27 +48,55 @@ public:
         return shown && !on_console ? line_of(entry) + "\n" : std::string();
     }
 
+    void command(std::string_view) override { m_last_records.clear(); }
     bool is_for_programs() const override { return false; }
 
 private:
-    std::string line_of(const TraceEntry& entry) const
+    /** A long record that a call of the command had before, and this one again, by what has changed in it. */
+    TraceEntry shortened(const TraceEntry& entry)
+    {
+        constexpr std::size_t long_record = 40;
+        TraceEntry shorter = entry;
+        for (board::TraceArgument& argument : shorter.arguments)
+        {
+            if (argument.value.kind() != Value::Kind::Record || argument.value.to_text().size() <= long_record)
+                continue;
+            auto& last = m_last_records[entry.function + "." + argument.name];
+            const Value now = argument.value;
+            if (last.keys() == now.keys())
+                argument.value = Value::symbol(changes_in(last, now));
+            last = now;
+        }
+        return shorter;
+    }
+
+    std::string line_of(const TraceEntry& entry)
     {
         char time[32];
         std::snprintf(time, sizeof time, "%9llu.%03u  ", static_cast<unsigned long long>(entry.time_us / 1000),
                       static_cast<unsigned>(entry.time_us % 1000));
         const std::string lead = time + std::string(2 * static_cast<std::size_t>(entry.depth), ' ');
-        const std::string line = lead + printable_lines(m_options.verbose ? entry.named() : entry.brief()) +
-                                 (entry.faulted ? "  (scripted)" : "");
+        const std::string line = lead + printable_lines(text_of(entry)) + (entry.faulted ? "  (scripted)" : "");
         if (m_options.apart)
             return line;
         const bool is_remarkable =
             entry.faulted || entry.kind == TraceEntry::Kind::Notice || entry.kind == TraceEntry::Kind::Assert;
         const bool is_call = entry.kind == TraceEntry::Kind::Call;
-        return m_paint(is_call ? folded(line, lead.size() + 4) : line, is_remarkable ? Colour::Yellow : Colour::Grey);
+        const std::string shown = is_call ? folded(line, lead.size() + 4, text_width()) : line;
+        return is_remarkable ? m_paint(shown, Colour::Magenta) : shown;
+    }
+
+    std::string text_of(const TraceEntry& entry)
+    {
+        if (m_options.verbose)
+            return entry.named();
+        // What runs inside a call is told before it, and shown behind it: it is no "before".
+        return m_options.apart || entry.depth > 0 ? entry.brief() : shortened(entry).brief();
     }
 
     TraceOptions m_options;
     Paint m_paint;
+    std::map<std::string, Value> m_last_records; ///< of this command, by function and argument
 };
 
 /** One JSON object a line. */

@@ -38,7 +38,9 @@ TEST(Completion, FirstWord_OperationsAndVerbs)
                                                     "PMX_SetCVBSPal60", "PMX_SetClosedCaptionOnOff"));
     EXPECT_THAT(candidates("po"), ElementsAre("power-on", "poke"));
     EXPECT_THAT(candidates("  po"), ElementsAre("power-on", "poke"));
-    EXPECT_THAT(candidates("pmx_"), IsEmpty());
+    EXPECT_THAT(candidates("PMX_setcb"), ElementsAre("PMX_SetCBEnable"));
+    EXPECT_EQ(candidates("PMX_"), candidates("pmx_")) << "nobody has to care for capital letters";
+    EXPECT_THAT(candidates("pmy_"), IsEmpty());
     EXPECT_THAT(complete("q", 1, { ".", { "quit" } }).candidates, ElementsAre("quit"));
 }
 
@@ -50,6 +52,25 @@ TEST(Completion, ReplacesTheWordUpToTheCursor)
     EXPECT_EQ("PMX_TV_TYPE_", middle.common());
     EXPECT_THAT(complete("po", 99).candidates, ElementsAre("power-on", "poke"));
     EXPECT_EQ("", Completion{}.common());
+}
+
+TEST(Completion, TellsWhichArgumentIsBeingWritten)
+{
+    const auto argument = [](std::string_view line) { return complete(line, line.size()).argument; };
+    EXPECT_EQ("", argument("PMX_Set"));
+    EXPECT_EQ("ucTvType: one of the TV types", argument("PMX_SetTvType 0 "));
+    EXPECT_EQ("prOutConf[1].eResMode: one of the resolution modes", argument("PMX_SetModeEx 0 [ [0], [1, RES_"));
+    EXPECT_EQ("prOutConf[2].fgOutputEnable: a number of 8 bits", argument("PMX_SetModeEx 0 [ [0], [1, 3], {"));
+    EXPECT_EQ("prOutConf: a list of 4", argument("PMX_SetModeEx 0 "));
+    EXPECT_EQ("ucVFreq: a number of 8 bits", argument("PMX_SetModeEx 0 [[0],[0],[0],[0]] "));
+}
+
+TEST(Completion, OutputsInShort)
+{
+    EXPECT_THAT(candidates("outputs "), ElementsAre("digital=", "hdmi=", "component=", "composite=", "cvbs="));
+    EXPECT_THAT(candidates("outputs hdmi=720p"), ElementsAre("720p60", "720p50"));
+    EXPECT_EQ(13u, complete("outputs hdmi=720P", 17).begin);
+    EXPECT_THAT(candidates("outputs hdmi=off cvbs=48"), Contains("480i"));
 }
 
 TEST(Completion, Arguments_ByTheirFamily)

@@ -123,7 +123,7 @@ TEST(MeanwhileVerb, WrongLines_AreRefusedWhereTheyStand)
     const std::string usage = "here.pmx:1: write: meanwhile [as thread] FUNCTION [on N] COMMAND, meanwhile [as thread] "
                               "FUNCTION [on N] request "
                               "OUTPUT MODE|on|off, meanwhile FUNCTION off, or meanwhile off; OUTPUT is digital, hdmi, "
-                              "component or composite\n";
+                              "component or composite (cvbs)\n";
     for (const char* const line :
          { "meanwhile", "meanwhile PMX_HalSetBg", "meanwhile PMX_HalSetBg on", "meanwhile PMX_HalSetBg on 1",
            "meanwhile as thread", "meanwhile as thread PMX_HalSetBg" })

@@ -104,7 +104,7 @@ TEST(Modes, Table_HasEveryModeIn80Columns)
     {
         ASSERT_TRUE(std::getline(lines, line)) << number;
         EXPECT_LE(pmxboard::columns_of(line), 80u) << line;
-        EXPECT_THAT(line, testing::HasSubstr("  " + std::string(mode_row(number).name) + " "));
+        EXPECT_THAT(line, testing::HasSubstr(" " + std::string(mode_row(number).name) + " "));
     }
     EXPECT_FALSE(std::getline(lines, line)) << line;
 }
@@ -112,6 +112,7 @@ TEST(Modes, Table_HasEveryModeIn80Columns)
 TEST(Modes, NumbersAndNames_AreTheSame)
 {
     EXPECT_EQ(modes_shown({ "10" }).out, modes_shown({ "RES_1080I60HZ" }).out);
+    EXPECT_EQ(modes_shown({ "10" }).out, modes_shown({ "1080i60" }).out);
     EXPECT_EQ(modes_shown({ "0x0A" }, true).out, modes_shown({ "RES_1080I60HZ" }, true).out);
     EXPECT_EQ(pmxboard::exit_done, modes_shown({ "10", "RES_480P" }).code);
     EXPECT_THAT(modes_shown({ "10", "RES_480P" }).out,
@@ -127,7 +128,7 @@ TEST(Modes, ANumberWithoutMode_IsSaidToBeNone)
 
 TEST(Modes, UnknownNames_AreRefusedWithTheNearest)
 {
-    const Shown near = modes_shown({ "RES_1080I60" });
+    const Shown near = modes_shown({ "RES_1080I61HZ" });
     EXPECT_EQ(pmxboard::exit_usage, near.code);
     EXPECT_EQ("", near.out);
     EXPECT_THAT(near.err, testing::HasSubstr("did you mean RES_1080I60HZ"));
@@ -144,6 +145,7 @@ TEST(Modes, Json_IsAListWithStableKeys)
     "has_row": 1,
     "width": 640,
     "height": 480,
+    "refresh": "60",
     "progressive": 1,
     "hd_output": 0,
     "tv_encoder_hd": 0,

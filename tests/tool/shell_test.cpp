@@ -151,7 +151,7 @@ TEST_F(Shell, Color_IsChosen)
 {
     EXPECT_THAT(run("shell --color always", "PMX_Init\n").out, HasSubstr("\x1b[1m> PMX_Init"));
     EXPECT_THAT(run("ops --color always PMX_Stop", "").out, HasSubstr("\x1b[1mPMX_Stop"));
-    EXPECT_THAT(run("modes --colour always", "").out, HasSubstr("\x1b[1m no  mode"));
+    EXPECT_THAT(run("modes --colour always", "").out, HasSubstr("\x1b[1m no mode"));
     EXPECT_THAT(run("modes", "").out, Not(HasSubstr("\x1b")));
     EXPECT_EQ(2, run("ops --color perhaps", "").code);
 }

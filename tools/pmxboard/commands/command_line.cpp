@@ -173,7 +173,7 @@ void add_modes(CLI::App& app, Chosen& chosen)
     const auto modes = std::make_shared<ModesOptions>();
     CLI::App* const sub =
         app.add_subcommand("modes", "The resolution modes, with all that the layer decides from them.");
-    sub->add_option("NAME", modes->modes, "Modes, by name or number");
+    sub->add_option("NAME", modes->modes, "Modes, by name, in short (720p50) or by number");
     sub->add_flag("--json", modes->json, "JSON for programs");
     add_colour(sub, modes->colour);
     sub->footer(modes_examples);

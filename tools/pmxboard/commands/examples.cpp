@@ -104,15 +104,16 @@ Exit codes: 0 done, 2 wrong usage.)";
 const char* const modes_examples = R"(Examples:
   pmxboard modes
       every mode, one line each
-  pmxboard modes RES_1080I60HZ 38
-      all about some of them, by name or number
+  pmxboard modes 720p50 RES_1080I60HZ 38
+      all about some of them, in short, by name or number
   pmxboard modes --json RES_480P
       for programs, always a list
 
-Columns: prog, reported as progressive; HD, reported as HD output; tve, HD for
-the TV encoders; cap, the capability bit that admits it; colour, its group; bar,
-width of the colour bar; pll, family of the video PLL's word; boot, the TV type
-with which the boot loader may leave it. Oddities are the layer's own.
+Columns: Hz, as its name tells; prg, reported as progressive; HD, reported as HD
+output; tve, HD for the TV encoders; cap, the capability bit that admits it; CS,
+its colour group; bar, width of the colour bar; pll, family of the video PLL's
+word; boot, the TV type with which the boot loader may leave it. Oddities are
+the layer's own.
 Exit codes: 0 done, 2 wrong usage.)";
 
 const char* const decode_examples = R"(Examples:

@@ -5,7 +5,7 @@
 
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/functions/errors.h"
-#include "tools/pmxboard/functions/kind.h"
+#include "tools/pmxboard/functions/mode_names.h"
 #include "tools/pmxboard/prompt/about_mode.h"
 
 namespace pmxboard
@@ -19,10 +19,9 @@ using record_view::ModeRow;
 /** The numbers that were asked for. Throws LineError. */
 std::vector<unsigned> read_modes(const std::vector<std::string>& words)
 {
-    const Kind kind{ .bits = 8, .family = board::names::Family::ResolutionMode, .names = {}, .members = {} };
     std::vector<unsigned> numbers;
     for (const std::string& word : words)
-        numbers.push_back(static_cast<unsigned>(read_value(kind, word, "mode").as_number()));
+        numbers.push_back(read_mode(word));
     return numbers;
 }
 

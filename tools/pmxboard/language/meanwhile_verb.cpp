@@ -19,8 +19,6 @@ namespace pmxboard
 namespace
 {
 
-constexpr std::string_view outputs[] = { "digital", "hdmi", "component", "composite" }; ///< by index
-
 /** What the caller of a mode change writes into its own request while that runs. */
 struct Request
 {
@@ -29,18 +27,10 @@ struct Request
     PMX_RESOLUTION_MODE_T mode{}; ///< unless it is a switch
 };
 
-std::size_t read_output(const std::string& name)
-{
-    const auto output = std::find(std::begin(outputs), std::end(outputs), name);
-    if (output == std::end(outputs))
-        throw LineError("there is no output " + name + did_you_mean(name, { std::begin(outputs), std::end(outputs) }));
-    return static_cast<std::size_t>(output - std::begin(outputs));
-}
-
 Request read_request(const Words& words)
 {
     Request request;
-    request.output = read_output(words.at("OUTPUT"));
+    request.output = output_called(words.at("OUTPUT"));
     if (words.has("MODE"))
         request.mode = static_cast<PMX_RESOLUTION_MODE_T>(
             named_number(words.at("MODE"), "the request's mode", board::names::Family::ResolutionMode));

@@ -42,6 +42,11 @@ bool is_size(std::string_view word)
     return read_size(word).has_value();
 }
 
+bool is_setting(std::string_view word)
+{
+    return word.find('=') != word.npos;
+}
+
 bool is_of_video(std::string_view word)
 {
     return !word.starts_with("osd");
@@ -114,7 +119,8 @@ const std::vector<Place>& places()
         { "OSD", is_of_osd, "osd0…osd5" },
         { "ORDER", nullptr, "an order of planes, such as 0x76543210" },
         { "D", nullptr, "the delay of a plane, plane 1 first" },
-        { "OUTPUT", nullptr, "digital, hdmi, component or composite" },
+        { "SETTING", is_setting, "OUTPUT=MODE or OUTPUT=off, such as hdmi=720p50" },
+        { "OUTPUT", nullptr, "digital, hdmi, component or composite (cvbs)" },
         { "LINE", nullptr, "such as FUNCTION(ARGUMENT, …) = RESULT or SET FIELD OLD → NEW" },
         { "PATH", is_no_option, "" },
         { "COMMAND", begins_command, "" },
@@ -127,7 +133,7 @@ const std::vector<Verb>& verbs()
 {
     static const std::vector<Verb> all = [] {
         std::vector<Verb> joined;
-        for (const auto& verbs_of : { board_verbs, device_verbs, source_verbs, state_verbs, what_if_verbs,
+        for (const auto& verbs_of : { output_verbs, board_verbs, device_verbs, source_verbs, state_verbs, what_if_verbs,
                                       meanwhile_verbs, view_verbs, neighbour_verbs, expectation_verbs })
         {
             for (Verb& verb : verbs_of())

@@ -75,11 +75,15 @@ std::chrono::microseconds read_time(const std::string& word);
 /** `1920x1080`: width and height; nothing when it is something else. */
 std::optional<std::pair<std::int32_t, std::int32_t>> read_size(std::string_view word);
 
+/** The index of an output: `digital`, `hdmi`, `component`, or `composite`, which is also `cvbs`. Throws LineError. */
+std::size_t output_called(const std::string& name);
+
 /* The verbs by what they are about. */
 
 std::vector<Verb> board_verbs();
 std::vector<Verb> device_verbs();
 std::vector<Verb> source_verbs();
+std::vector<Verb> output_verbs();
 std::vector<Verb> state_verbs();
 std::vector<Verb> what_if_verbs();
 std::vector<Verb> meanwhile_verbs();

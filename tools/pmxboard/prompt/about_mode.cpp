@@ -5,6 +5,8 @@
 #include <cstdio>
 #include <utility>
 
+#include "tools/pmxboard/functions/mode_names.h"
+
 namespace pmxboard
 {
 namespace
@@ -41,6 +43,12 @@ std::string size_text(const ModeRow& mode)
     return std::to_string(mode.width) + "x" + std::to_string(mode.height);
 }
 
+std::string refresh_text(const ModeRow& mode)
+{
+    const std::string refresh = refresh_of(mode.name);
+    return refresh.empty() ? "-" : refresh;
+}
+
 Value number(unsigned value)
 {
     return Value::number(value);
@@ -51,13 +59,13 @@ Value number(unsigned value)
 std::string mode_table_text(const std::vector<ModeRow>& modes, const Look& look)
 {
     std::string text =
-        look.bold(" no  mode                           size prog HD tve    cap colour bar pll boot") + "\n";
+        look.bold(" no mode                           size     Hz prg HD tve    cap CS bar pll boot") + "\n";
     for (const ModeRow& mode : modes)
-        text +=
-            formatted("%3u  %-25s %9s %4s %2s %3s %6s %6s %3u %3s %4s\n", mode.number, std::string(mode.name).c_str(),
-                      size_text(mode).c_str(), mode.is_progressive ? "yes" : "-", mode.is_hd_out ? "HD" : "-",
-                      mode.is_tve_hd ? "HD" : "-", capability_text(mode).c_str(), short_colour(mode.colour),
-                      mode.colour_bar, mode.pll_60 ? "60" : "50", mode.boot ? std::to_string(*mode.boot).c_str() : "-");
+        text += formatted("%3u %-25s %9s %6s %3s %2s %3s %6s %2s %3u %3s %4s\n", mode.number,
+                          std::string(mode.name).c_str(), size_text(mode).c_str(), refresh_text(mode).c_str(),
+                          mode.is_progressive ? "yes" : "-", mode.is_hd_out ? "HD" : "-", mode.is_tve_hd ? "HD" : "-",
+                          capability_text(mode).c_str(), short_colour(mode.colour), mode.colour_bar,
+                          mode.pll_60 ? "60" : "50", mode.boot ? std::to_string(*mode.boot).c_str() : "-");
     return text;
 }
 
@@ -68,6 +76,7 @@ std::string mode_text(const ModeRow& mode, const Look& look)
                                                 : std::string(mode.name) + " (" + std::to_string(mode.number) + ")";
     const std::pair<const char*, std::string> lines[] = {
         { "size", std::to_string(mode.width) + " x " + std::to_string(mode.height) },
+        { "refresh", refresh_of(mode.name).empty() ? "its name does not tell" : refresh_of(mode.name) + " Hz" },
         { "reported progressive", yes_or_no(mode.is_progressive) },
         { "reported HD output", yes_or_no(mode.is_hd_out) },
         { "HD for the TV encoders", yes_or_no(mode.is_tve_hd) },
@@ -103,6 +112,7 @@ Value json_of(const ModeRow& mode)
         .add("has_row", number(mode.has_row))
         .add("width", number(mode.width))
         .add("height", number(mode.height))
+        .add("refresh", refresh_of(mode.name).empty() ? Value::null() : Value::text(refresh_of(mode.name)))
         .add("progressive", number(mode.is_progressive))
         .add("hd_output", number(mode.is_hd_out))
         .add("tv_encoder_hd", number(mode.is_tve_hd))

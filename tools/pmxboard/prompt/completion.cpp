@@ -2,9 +2,11 @@
 #include "tools/pmxboard/prompt/completion.h"
 
 #include <algorithm>
+#include <cctype>
 #include <set>
 
 #include "board/board.h"
+#include "tools/pmxboard/functions/mode_names.h"
 #include "tools/pmxboard/language/session.h"
 #include "tools/pmxboard/language/verbs.h"
 #include "tools/pmxboard/prompt/completion_values.h"
@@ -65,6 +67,7 @@ struct Part
 {
     std::size_t begin = 0; ///< in the word
     std::vector<std::string> candidates;
+    std::string argument = {};
 };
 
 template <typename Names>
@@ -84,7 +87,7 @@ Part of_arguments(const Operation& operation, std::span<const std::string> words
         if (place++ == words.size() - 1)
         {
             const ValuePart value = value_candidates(parameter, words.back());
-            return { value.begin, value.candidates };
+            return { value.begin, value.candidates, value.place };
         }
     }
     return {};
@@ -201,6 +204,18 @@ constexpr Filling fillings[] = {
       [](Part& part, const auto&, const auto&) {
           add(part, std::vector<std::string>{ "digital", "hdmi", "component", "composite" });
       } },
+    { "SETTING",
+      [](Part& part, const auto& words, const auto&) {
+          const std::size_t equals = words.back().find('=');
+          if (equals == std::string::npos)
+              add(part, std::vector<std::string>{ "digital=", "hdmi=", "component=", "composite=", "cvbs=" });
+          else
+          {
+              part.begin = equals + 1;
+              part.candidates.emplace_back("off");
+              add(part, short_mode_names());
+          }
+      } },
     { "ARGUMENT",
       [](Part& part, const auto& words, const auto&) {
           if (words[0] == "expect")
@@ -225,6 +240,7 @@ void fill(Part& part, std::string_view place, const std::vector<std::string>& wo
         Part filled;
         filling.add(filled, words, where);
         part.begin = std::max(part.begin, filled.begin);
+        part.argument = filled.argument;
         add(part, filled.candidates);
     }
 }
@@ -273,23 +289,43 @@ Part of_line(const std::vector<std::string>& words, const CompletionPlace& place
     return part;
 }
 
+bool begins_so(std::string_view candidate, std::string_view begun)
+{
+    return candidate.starts_with(begun);
+}
+
+bool begins_so_in_any_case(std::string_view candidate, std::string_view begun)
+{
+    const auto same = [](unsigned char one, unsigned char other) { return std::tolower(one) == std::tolower(other); };
+    return candidate.size() >= begun.size() && std::equal(begun.begin(), begun.end(), candidate.begin(), same);
+}
+
+std::set<std::string> fitting_among(const std::vector<std::string>& candidates, std::string_view begun,
+                                    bool (*fits)(std::string_view, std::string_view))
+{
+    std::set<std::string> fitting;
+    for (const std::string& candidate : candidates)
+    {
+        if (!candidate.empty() && fits(candidate, begun))
+            fitting.insert(candidate);
+    }
+    return fitting;
+}
+
 } // namespace
 
 Completion complete(std::string_view line, std::size_t cursor, const CompletionPlace& place)
 {
     const Written written = written_until(line.substr(0, std::min(cursor, line.size())));
     if (written.is_comment)
-        return { std::min(cursor, line.size()), {} };
+        return { std::min(cursor, line.size()), {}, {} };
     const std::string& word = written.words.back();
     const Part part = of_line(written.words, place);
     const std::string_view begun = std::string_view(word).substr(std::min(part.begin, word.size()));
-    std::set<std::string> fitting;
-    for (const std::string& candidate : part.candidates)
-    {
-        if (candidate.starts_with(begun) && !candidate.empty())
-            fitting.insert(candidate);
-    }
-    Completion completion{ written.last_begin + std::min(part.begin, word.size()), {} };
+    std::set<std::string> fitting = fitting_among(part.candidates, begun, begins_so);
+    if (fitting.empty())
+        fitting = fitting_among(part.candidates, begun, begins_so_in_any_case);
+    Completion completion{ written.last_begin + std::min(part.begin, word.size()), {}, part.argument };
     // In the order in which they were found: modes by number, arguments as declared.
     for (const std::string& candidate : part.candidates)
     {

@@ -16,7 +16,9 @@ namespace pmxboard
 struct Completion
 {
     std::size_t begin = 0;               ///< what stands from here to the cursor is replaced
-    std::vector<std::string> candidates; ///< in order, none twice; each begins with what it replaces
+    std::vector<std::string> candidates; ///< in order, none twice; each begins with what it replaces, or, where none
+                                         ///< does, with the same letters, small or capital
+    std::string argument;                ///< which argument is being written; empty where that is none
 
     /** What all candidates begin with. */
     std::string common() const;

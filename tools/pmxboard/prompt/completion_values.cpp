@@ -60,6 +60,39 @@ Candidates for_kind(const Kind* kind, const std::string& name, bool may_be_null)
     return candidates;
 }
 
+std::string path_to(const Parameter& parameter, const std::vector<Open>& opened)
+{
+    std::string path = parameter.name;
+    for (const Open& open : opened)
+    {
+        if (open.kind == nullptr)
+            break;
+        if (open.kind->form == Kind::Form::List)
+            path += "[" + std::to_string(open.index) + "]";
+        else if (open.index < open.kind->names.size())
+            path += "." + open.kind->names[open.index];
+    }
+    return path;
+}
+
+std::string what_is(const Kind* kind)
+{
+    if (kind == nullptr)
+        return "there is no more of it";
+    if (kind->form == Kind::Form::Text)
+        return "a text in quotes";
+    if (kind->form == Kind::Form::List)
+        return "a list of " + std::to_string(kind->count);
+    if (kind->form == Kind::Form::Record)
+        return "a record";
+    for (const auto& [family, title] : board::names::families())
+    {
+        if (family == kind->family)
+            return "one of the " + std::string(title);
+    }
+    return "a number of " + std::to_string(kind->bits) + " bits";
+}
+
 } // namespace
 
 Candidates number_names(Family family, std::string_view name)
@@ -102,7 +135,8 @@ ValuePart value_candidates(const Parameter& parameter, std::string_view word)
         if (!open.empty())
             kind = kind_of_item(open.back(), name);
     }
-    ValuePart part{ begin, for_kind(kind, name, open.empty() && parameter.may_be_null) };
+    ValuePart part{ begin, for_kind(kind, name, open.empty() && parameter.may_be_null),
+                    path_to(parameter, open) + ": " + what_is(kind) };
     if (!open.empty() && open.back().kind != nullptr && !is_named && open.back().kind->form == Kind::Form::Record)
     {
         for (const std::string& field : open.back().kind->names)

@@ -21,6 +21,7 @@ struct ValuePart
 {
     std::size_t begin = 0; ///< in the word
     Candidates candidates;
+    std::string place; ///< "prOutConf[1].eResMode: one of the resolution modes"
 };
 ValuePart value_candidates(const Parameter& parameter, std::string_view word);
 

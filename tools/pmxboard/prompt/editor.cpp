@@ -18,6 +18,7 @@
 
 #include "tools/pmxboard/prompt/help.h"
 #include "tools/pmxboard/prompt/history_file.h"
+#include "tools/pmxboard/text/layout.h"
 #endif
 
 namespace pmxboard
@@ -159,19 +160,37 @@ private:
         const auto cursor = static_cast<std::size_t>(info->cursor - info->buffer);
         const Completion completion = m_options.complete(line, cursor);
         if (completion.candidates.empty())
-            return CC_REFRESH_BEEP;
+            return tell(completion.argument);
 
         const std::string written = line.substr(completion.begin, cursor - completion.begin);
-        std::string insert = completion.common().substr(written.size());
+        const std::string common = completion.common();
+        // What was written in small letters is replaced as well.
+        const bool is_replaced = common.size() >= written.size() && !common.starts_with(written);
+        std::string insert = is_replaced ? common : common.substr(std::min(written.size(), common.size()));
         const bool single = completion.candidates.size() == 1;
         const bool at_blank = cursor < line.size() && line[cursor] == ' ';
         if (single && is_whole(completion.candidates[0]) && !at_blank)
             insert += ' ';
+        if (is_replaced)
+            el_deletestr(m_editor, static_cast<int>(columns_of(written)));
         if (!insert.empty())
             el_insertstr(m_editor, insert.c_str());
         if (single || !insert.empty())
             return CC_REFRESH;
+        std::fputc('\n', stdout);
+        if (!completion.argument.empty())
+            std::fprintf(stdout, "%s\n", completion.argument.c_str());
         list(completion.candidates);
+        return CC_REDISPLAY;
+    }
+
+    /** Where nothing can be completed, at least what is to be written there. */
+    static unsigned char tell(const std::string& argument)
+    {
+        if (argument.empty())
+            return CC_REFRESH_BEEP;
+        std::fprintf(stdout, "\n%s\n", argument.c_str());
+        std::fflush(stdout);
         return CC_REDISPLAY;
     }
 
@@ -182,7 +201,6 @@ private:
         const bool known = ioctl(STDOUT_FILENO, TIOCGWINSZ, &window) == 0 && window.ws_col != 0 && window.ws_row != 0;
         const std::string text = in_columns(candidates, known ? window.ws_col : 80u);
         const auto lines = std::count(text.begin(), text.end(), '\n');
-        std::fputc('\n', stdout);
         if (lines >= (known ? window.ws_row : 24))
         {
             std::fprintf(stdout, "%zu candidates; show them all? (y or n) ", candidates.size());

@@ -76,7 +76,8 @@ TEST(ScenarioErrors, Printf_TakesNoConversions)
 TEST(ScenarioErrors, Verbs_ShowHowTheyAreWritten)
 {
     EXPECT_EQ("here.pmx:1: write: power-on [BOARD]\n", diagnostics("power-on a b"));
-    EXPECT_EQ("here.pmx:1: write: flash PARTITION FILE, or flash PARTITION off\n", diagnostics("flash x"));
+    EXPECT_EQ("here.pmx:1: write: flash PARTITION FILE, or flash PARTITION off\n",
+              diagnostics("flash x"));
     const std::string fault = "here.pmx:1: write: fault FUNCTION ANSWER [on N|from N|always], or fault FUNCTION off\n";
     for (const char* const wrong :
          { "fault", "fault x_timer_create", "fault x_timer_create -1 on", "fault x_timer_create -1 at 3",
@@ -142,9 +143,9 @@ TEST(ScenarioErrors, MissingImageAndBoard)
 TEST(ScenarioErrors, Expectations)
 {
     EXPECT_BEGINNING("here.pmx:1: no expectation resul; did you mean result", "expect resul 1");
-    EXPECT_EQ(
-        "here.pmx:1: expect what? result, out, call, next, no-more, none, log, console, state, asserts or misuses\n",
-        diagnostics("expect"));
+    EXPECT_EQ("here.pmx:1: expect what? result, out, call, next, at, after, no-more, none, log, console, state, "
+              "asserts or misuses\n",
+              diagnostics("expect"));
     EXPECT_EQ("here.pmx:1: no operation has run yet\n", diagnostics("expect result 1"));
     EXPECT_EQ("here.pmx:1: no operation has run yet\n", diagnostics("expect out pucMode 1"));
     EXPECT_EQ("here.pmx:2: PMX_Stop has no result\n", diagnostics("PMX_Stop\nexpect result 1"));

@@ -85,7 +85,7 @@ _pmxboard()
         _pmxboard_take "$word" < <("$tool" complete "power-on $word" 2>/dev/null)
         _pmxboard_files "$word" '*.toml' ;;
     --against) _pmxboard_files "$word" '*.pmx' ;;
-    --trace-file) _pmxboard_files "$word" '*' ;;
+    --trace-file | --junit) _pmxboard_files "$word" '*' ;;
     --trace-format | --color | --colour) _pmxboard_take "$word" < <(_pmxboard_values "$tool" "$sub" "$previous") ;;
     *)
         if [[ $word == -* ]]

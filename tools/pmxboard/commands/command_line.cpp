@@ -55,6 +55,20 @@ std::string folded_help(const CLI::App* app, const std::string& name, CLI::AppFo
     return text;
 }
 
+/** --only and --op; see TraceFilter. */
+void add_filter(CLI::App* sub, std::vector<std::string>& only, std::vector<std::string>& operations)
+{
+    sub->add_option("--only", only,
+                    "Show only platform functions whose names begin so, and stores for SET; it may be repeated")
+        ->delimiter(',')
+        ->allow_extra_args(false)
+        ->type_name("PREFIX[,PREFIX]");
+    sub->add_option("--op", operations, "Show only what these operations of the layer cause; it may be repeated")
+        ->delimiter(',')
+        ->allow_extra_args(false)
+        ->type_name("NAME[,NAME]");
+}
+
 /* One function for each sub-command: its options, and what it does with them. */
 
 void add_run(CLI::App& app, Chosen& chosen)
@@ -81,16 +95,11 @@ void add_run(CLI::App& app, Chosen& chosen)
         ->type_name(types);
     sub->add_option("--trace-file", run->trace_file, "Write the trace there instead of among the rest")
         ->type_name("FILE");
+    sub->add_flag("-k,--keep-going", run->keep_going, "Go on behind what fails, and tell all of it");
+    sub->add_option("--junit", run->junit, "Write what became of each scenario there, as XML for build servers")
+        ->type_name("FILE");
     sub->add_flag("--stores", run->stores, "Show what is stored into the layer's record between two calls");
-    sub->add_option("--only", run->only,
-                    "Show only platform functions whose names begin so, and stores for SET; it may be repeated")
-        ->delimiter(',')
-        ->allow_extra_args(false)
-        ->type_name("PREFIX[,PREFIX]");
-    sub->add_option("--op", run->operations, "Show only what these operations of the layer cause; it may be repeated")
-        ->delimiter(',')
-        ->allow_extra_args(false)
-        ->type_name("NAME[,NAME]");
+    add_filter(sub, run->only, run->operations);
     add_colour(sub, run->colour);
     sub->add_flag("-q,--quiet", run->quiet, "Show failures only");
     sub->add_flag("-v,--verbose", run->verbose, "Show arguments by name, and expectations");

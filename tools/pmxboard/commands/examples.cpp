@@ -26,6 +26,8 @@ const char* const run_examples = R"(Examples:
       start the mixer on the default board and watch every platform call
   pmxboard run --quiet scenarios/*.pmx && echo fine
       run scenarios as tests: only failures are shown
+  pmxboard run --quiet --keep-going --junit verdicts.xml scenarios/s*.pmx
+      run all of them whatever fails, and write the verdicts for a build server
   printf 'PMX_Init\nPMX_GetMode 0\n' | pmxboard run -
       try something out
   pmxboard run --only TVE_,VDP_ --op PMX_SetModeEx scenarios/fifth-osd.pmx

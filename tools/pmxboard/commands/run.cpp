@@ -9,6 +9,7 @@
 #include "board/board.h"
 #include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
+#include "tools/pmxboard/commands/junit.h"
 #include "tools/pmxboard/files/new_file.h"
 #include "tools/pmxboard/language/runner.h"
 #include "tools/pmxboard/text/paint.h"
@@ -64,16 +65,19 @@ Opened open_all(const RunOptions& run)
 }
 
 /** Each scenario on a board of its own; the exit code. */
-int run_each(const RunOptions& run, const Opened& opened, const OutputOptions& output)
+int run_each(const RunOptions& run, const Opened& opened, const OutputOptions& output, std::vector<Verdict>& verdicts)
 {
-    for (std::size_t i = 0; i < run.files.size(); ++i)
+    int code = exit_done;
+    for (std::size_t i = 0; i < run.files.size() && (code == exit_done || run.keep_going); ++i)
     {
         const std::string& file = run.files[i];
-        const Scenario scenario{ file, run.board.empty() ? "default" : run.board, repeat_command(run, file) };
+        Verdict& verdict = verdicts.emplace_back(Verdict{ file, {} });
+        const Scenario scenario{ file, run.board.empty() ? "default" : run.board, repeat_command(run, file),
+                                 run.keep_going, &verdict.failures };
         if (!run_scenario(*opened[i], scenario, output, std::cerr))
-            return exit_failed;
+            code = exit_failed;
     }
-    return exit_done;
+    return code;
 }
 
 /** The same, with the trace where it is wanted. Throws FileError. */
@@ -94,10 +98,13 @@ int run_traced(const RunOptions& run, OutputOptions output)
         if (trace_file)
             trace_file->commit();
     };
+    std::vector<Verdict> verdicts;
     try
     {
-        const int code = run_each(run, opened, output);
+        const int code = run_each(run, opened, output, verdicts);
         complete();
+        if (!run.junit.empty())
+            write_file(run.junit, to_junit(verdicts));
         return code;
     }
     catch (...) // a scenario that cannot be read on: what happened until then is worth as much

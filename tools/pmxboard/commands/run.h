@@ -18,6 +18,8 @@ struct RunOptions
     std::string colour = "auto";
     std::vector<std::string> only;
     std::vector<std::string> operations;
+    std::string junit; ///< a file for the verdicts, as JUnit writes them
+    bool keep_going = false;
     bool stores = false;
     bool quiet = false;
     bool verbose = false;

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include <algorithm>
 #include <cctype>
+#include <chrono>
 
 #include "board/board.h"
 #include "tools/pmxboard/functions/errors.h"
@@ -183,6 +184,34 @@ void expect_next(Session& session, const Words& words)
     session.set_cursor(next + 1);
 }
 
+/** The moment of the entry that was matched last. */
+std::chrono::microseconds moment_of_match(const Session& session)
+{
+    if (session.cursor() == 0)
+        throw LineError("whose time? An expect call or expect next stands before it");
+    return std::chrono::microseconds(session.window().at(session.cursor() - 1).time_us);
+}
+
+/** "about": a tenth of it earlier or later, and a millisecond at least. */
+void check_time(const Words& words, std::chrono::microseconds found)
+{
+    const std::chrono::microseconds wanted = read_time(words.at("TIME"));
+    const std::chrono::microseconds slack =
+        words.has("about") ? std::max(wanted / 10, std::chrono::microseconds(1000)) : std::chrono::microseconds(0);
+    if (found < wanted - slack || found > wanted + slack)
+        not_met(words.line().from(1), std::to_string(found.count()) + "us");
+}
+
+void expect_at(Session& session, const Words& words)
+{
+    check_time(words, moment_of_match(session));
+}
+
+void expect_after(Session& session, const Words& words)
+{
+    check_time(words, moment_of_match(session) - session.begun());
+}
+
 void expect_no_more(Session& session, const Words&)
 {
     const auto window = session.window();
@@ -284,6 +313,11 @@ std::vector<Verb> expectation_verbs()
             { "expect call LINE", "an entry behind the last one that was matched is this one; others may stand between",
               expect_call },
             { "expect next LINE", "the very next entry is this one", expect_next },
+            { "expect at [about] TIME",
+              "the entry that was matched last began at this time since power-on; `about`, a tenth of it earlier or "
+              "later, and a millisecond at least",
+              expect_at },
+            { "expect after [about] TIME", "it began so long after the command", expect_after },
             { "expect no-more", "nothing stands behind the last one that was matched", expect_no_more },
             { "expect none FUNCTION", "the platform function was not called", expect_none },
             { "expect log LEVEL \"text\"", "`PMX_IsLog` was called so, whether the console showed it or not",

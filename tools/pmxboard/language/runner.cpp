@@ -28,7 +28,9 @@ bool mentions_changes(const std::string& text)
 try
 {
     const Line line(text);
-    return std::find(line.words().begin(), line.words().end(), "diff") != line.words().end();
+    // Nobody looks ahead into what a scenario includes.
+    return std::any_of(line.words().begin(), line.words().end(),
+                       [](const std::string& word) { return word == "diff" || word == "include"; });
 }
 catch (const LineError&)
 {
@@ -69,6 +71,68 @@ void note_disagreements(Output& output)
         output.remark("note: " + disagreement);
 }
 
+/** The line of this place. One that cannot be read ends the run; what was shown until then is shown. */
+bool next_line(std::istream& lines, std::string& text, Output& output, const std::string& place)
+try
+{
+    return board::files::next_line(lines, text);
+}
+catch (const board::files::FileError& error)
+{
+    output.flush();
+    throw board::files::FileError(place + ": " + error.what());
+}
+
+/** What a scenario does not do as it says. */
+class Failures
+{
+public:
+    Failures(const Scenario& scenario, Output& output, std::ostream& diagnostics)
+        : m_scenario(scenario), m_output(output), m_diagnostics(diagnostics)
+    {
+    }
+
+    bool any() const { return m_any; }
+
+    /** Do something; whether the scenario goes on behind it. */
+    template <typename Step>
+    bool hold(const std::string& place, const Step& step)
+    {
+        try
+        {
+            step();
+            return true;
+        }
+        catch (const LineError& error)
+        {
+            tell(place, error.what());
+        }
+        catch (const std::exception& error)
+        {
+            tell(place, error.what());
+            if (!m_scenario.keep_going)
+                m_diagnostics << "repeat: " << printable(m_scenario.repeat) << '\n';
+        }
+        return m_scenario.keep_going;
+    }
+
+private:
+    void tell(const std::string& place, const char* what)
+    {
+        m_any = true;
+        m_output.flush();
+        const std::string message = place + ": " + presentable(what);
+        m_diagnostics << message << '\n';
+        if (m_scenario.failures != nullptr)
+            m_scenario.failures->push_back(message);
+    }
+
+    const Scenario& m_scenario;
+    Output& m_output;
+    std::ostream& m_diagnostics;
+    bool m_any = false;
+};
+
 } // namespace
 
 std::string presentable(std::string_view message)
@@ -82,44 +146,26 @@ bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOpt
     Output output(options);
     Session session(output, scenario.board, directory_of(scenario.name));
     session.watch_changes(scenario.name == "-" || asks_for_changes(lines));
-    const std::string file = scenario.name == "-" ? "<stdin>" : scenario.name;
+    const std::string file = printable(scenario.name == "-" ? "<stdin>" : scenario.name);
     if (options.trace != nullptr)
         options.trace->scenario(file);
+    Failures failures(scenario, output, diagnostics);
     unsigned number = 0;
-    const auto location = [&] { return printable(file) + ":" + std::to_string(number) + ": "; };
-    try
+    const auto place = [&] { return file + ":" + std::to_string(number); };
+    bool goes_on = true;
+    for (std::string text; goes_on && next_line(lines, text, output, file + ":" + std::to_string(number + 1));)
     {
-        std::string text;
-        while (board::files::next_line(lines, text))
-        {
-            ++number;
-            set_place(printable(file) + ":" + std::to_string(number));
-            session.run_line(text);
-        }
-        session.finish();
-    }
-    catch (const LineError& error)
-    {
-        output.flush();
-        diagnostics << location() << presentable(error.what()) << '\n';
-        return false;
-    }
-    catch (const board::files::FileError& error) // the scenario itself cannot be read any further
-    {
-        output.flush();
         ++number;
-        throw board::files::FileError(location() + error.what());
+        set_place(place());
+        goes_on = failures.hold(place(), [&] { session.run_line(text); });
     }
-    catch (const std::exception& error)
-    {
-        output.flush();
-        diagnostics << location() << presentable(error.what()) << '\n'
-                    << "repeat: " << printable(scenario.repeat) << '\n';
+    if (goes_on)
+        failures.hold(place(), [&] { session.finish(); });
+    if (failures.any())
         return false;
-    }
     note_disagreements(output);
     if (session.expectations() != 0 && !output.is_short())
-        output.text(printable(file) + ": " + std::to_string(session.expectations()) + " expectations met\n");
+        output.text(file + ": " + std::to_string(session.expectations()) + " expectations met\n");
     return true;
 }
 

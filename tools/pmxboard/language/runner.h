@@ -6,6 +6,7 @@
 #include <iosfwd>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "tools/pmxboard/view/output.h"
 
@@ -14,9 +15,11 @@ namespace pmxboard
 
 struct Scenario
 {
-    std::string name;   ///< as the user wrote it; "-" for the standard input
-    std::string board;  ///< for `power-on` without a name
-    std::string repeat; ///< the command that runs it again
+    std::string name;                             ///< as the user wrote it; "-" for the standard input
+    std::string board;                            ///< for `power-on` without a name
+    std::string repeat;                           ///< the command that runs it again
+    bool keep_going = false;                      ///< what is wrong or fails is told, and the next line carried out
+    std::vector<std::string>* failures = nullptr; ///< where each is told as well
 };
 
 /** Whether every line was carried out and every expectation met. What was not is said on `diagnostics`, with file and

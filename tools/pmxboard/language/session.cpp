@@ -6,6 +6,7 @@
 
 #include "board/board.h"
 #include "board/console.h"
+#include "board/files.h"
 #include "board/threads.h"
 #include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/language/verbs.h"
@@ -246,6 +247,7 @@ void Session::begin_window()
     m_window_begin = board::trace::entries().size();
     m_window_end = std::string::npos;
     m_cursor = 0;
+    m_begun = board::now();
     m_console_begin = board::console::printed();
     m_console_end = std::string::npos;
 }
@@ -312,6 +314,60 @@ void Session::check_meanwhiles() const
     const auto& first = armed.front();
     throw StepFailed(first.name + ": never happened; " + first.function + " was called " + std::to_string(first.calls) +
                      " times since");
+}
+
+void Session::include(const std::string& name)
+{
+    constexpr std::size_t deepest = 8; // so that the way to a mistake can be told
+    const std::filesystem::path path = file(name);
+    std::error_code ignored;
+    const std::filesystem::path really = std::filesystem::weakly_canonical(path, ignored);
+    if (std::find(m_included.begin(), m_included.end(), really) != m_included.end())
+        throw LineError(path.string() + " includes itself");
+    if (m_included.size() == deepest)
+        throw LineError("files include each other more than " + std::to_string(deepest) + " deep");
+    const std::filesystem::path directory = std::exchange(m_directory, path.parent_path());
+    m_included.push_back(really);
+    try
+    {
+        run_file(path.string(), file_name(name));
+    }
+    catch (...)
+    {
+        m_included.pop_back();
+        m_directory = directory;
+        throw;
+    }
+    m_included.pop_back();
+    m_directory = directory;
+}
+
+/** What goes wrong is told with the place. */
+void Session::run_file(const std::string& path, const std::string& name)
+{
+    unsigned number = 0;
+    const auto place = [&] { return name + ":" + std::to_string(number) + ": "; };
+    try
+    {
+        const auto lines = board::files::open_lines(path);
+        for (std::string text; board::files::next_line(*lines, text);)
+        {
+            ++number;
+            run_line(text);
+        }
+    }
+    catch (const LineError& error)
+    {
+        throw LineError(place() + error.what());
+    }
+    catch (const board::files::FileError& error)
+    {
+        throw LineError(error.what());
+    }
+    catch (const StepFailed& error)
+    {
+        throw StepFailed(place() + error.what());
+    }
 }
 
 void Session::finish()

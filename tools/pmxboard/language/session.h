@@ -3,6 +3,7 @@
  *  A scenario that runs: it carries lines out, one after the other, and remembers what expectations look at. */
 #pragma once
 
+#include <chrono>
 #include <cstdint>
 #include <filesystem>
 #include <iosfwd>
@@ -33,6 +34,9 @@ public:
 
     /** Carry out one line. Throws LineError or StepFailed. */
     void run_line(std::string_view text);
+    /** Carry out the lines of another file; names of files in it are relative to it. Throws LineError or StepFailed
+     *  with the file and the line in front. */
+    void include(const std::string& name);
     /** The scenario ends. Throws StepFailed when the board found a misuse that no line expected. */
     void finish();
 
@@ -82,12 +86,15 @@ public:
     void set_cursor(std::size_t cursor) { m_cursor = cursor; }
     /** What the last command printed on the console. */
     std::string console_window() const;
+    /** When the last command began, since power-on. */
+    std::chrono::microseconds begun() const { return m_begun; }
     void expect_misuses(unsigned count) { m_misuses_expected = count; }
 
 private:
     void run_command(const Line& line);
     void carry_out(const Line& line);
     void check_meanwhiles() const;
+    void run_file(const std::string& path, const std::string& name);
     /** A scenario that does not begin with power-on has a board all the same. */
     void need_power(std::string_view command);
     void check_misuses() const;
@@ -111,6 +118,8 @@ private:
     std::size_t m_window_begin = 0;
     std::size_t m_window_end = 0;
     std::size_t m_cursor = 0;
+    std::chrono::microseconds m_begun{};
+    std::vector<std::filesystem::path> m_included; ///< the files that are being carried out, each within the one before
     std::size_t m_console_begin = 0;
     std::size_t m_console_end = 0;
 };

@@ -23,6 +23,13 @@ std::vector<Verb> view_verbs()
               [](Session& session, const Words&) { session.watch_stores(true); } },
             { "stores off", "or no more", [](Session& session, const Words&) { session.watch_stores(false); } } },
           true },
+        { "include",
+          { { "include FILE",
+              "carry out the lines of another file, named relative to this one; expectations behind it look at its "
+              "last "
+              "command",
+              [](Session& session, const Words& words) { session.include(words.at("FILE")); } } },
+          true },
         { "print",
           { { "print \"text\"", "show a text",
               [](Session& session, const Words& words) {

@@ -1,0 +1,113 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
+// Scenarios that include others, that go on behind what fails, and what they expect of times.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+
+#include "program_run.h"
+#include "scenario_run.h"
+#include "tools/pmxboard/commands/junit.h"
+
+namespace
+{
+
+using tool_test::diagnostics;
+using tool_test::run;
+
+class Include : public ProgramRun
+{
+protected:
+    void write(const std::string& name, const std::string& lines) const { std::ofstream(file(name)) << lines; }
+    Ended run_file(const std::string& options, const std::string& name) const
+    {
+        return run("run " + options + " '" + file(name) + "'");
+    }
+};
+
+TEST_F(Include, CarriesOutTheLinesOfAnotherFile)
+{
+    std::filesystem::create_directory(m_directory / "below");
+    write("below/start.pmx", "PMX_Init\ninclude set.pmx\n");
+    write("below/set.pmx", "PMX_SetTvType 0 PMX_TV_TYPE_PAL\n");
+    write("main.pmx", "include below/start.pmx\nexpect result 1\nexpect state ucTvType PMX_TV_TYPE_PAL\n"
+                      "include below/set.pmx\nexpect next PMX_HalSetTvType(0, PMX_TV_TYPE_PAL)\ndiff\n");
+    const Ended ended = run_file("", "main.pmx");
+    EXPECT_EQ(0, ended.code) << ended.err;
+    EXPECT_NE(std::string::npos, ended.out.find("> include below/start.pmx\n> PMX_Init\n")) << ended.out;
+}
+
+TEST_F(Include, AnError_HasTheChainOfPlaces)
+{
+    write("main.pmx", "PMX_Init\ninclude one.pmx\n");
+    write("one.pmx", "# nothing\n\ninclude two.pmx\n");
+    write("two.pmx", "PMX_GetMode 0\nexpect result 0\n");
+    const Ended ended = run_file("-q", "main.pmx");
+    EXPECT_EQ(1, ended.code);
+    EXPECT_EQ(file("main.pmx") + ":2: one.pmx:3: two.pmx:2: expected result 0, found 1",
+              ended.err.substr(0, ended.err.find('\n')));
+    write("two.pmx", "PMX_GetMod 0\n");
+    EXPECT_NE(std::string::npos, run_file("-q", "main.pmx").err.find("two.pmx:1: no command PMX_GetMod; did you mean"));
+}
+
+TEST_F(Include, Loops_Depth_AndFilesThatAreNotThere)
+{
+    write("main.pmx", "include main2.pmx\n");
+    write("main2.pmx", "include main.pmx\n");
+    EXPECT_NE(std::string::npos, run_file("", "main.pmx").err.find("main2.pmx includes itself"));
+    for (int i = 0; i < 20; ++i)
+        write("deep" + std::to_string(i) + ".pmx", "include deep" + std::to_string(i + 1) + ".pmx\n");
+    EXPECT_NE(std::string::npos, run_file("", "deep0.pmx").err.find("files include each other more than 8 deep"));
+    write("none.pmx", "include no.pmx\n");
+    const Ended none = run_file("", "none.pmx");
+    EXPECT_EQ(1, none.code);
+    EXPECT_NE(std::string::npos, none.err.find("none.pmx:1: ")) << none.err;
+    EXPECT_EQ("here.pmx:1: include carries out many lines; each meanwhile is one command\n",
+              diagnostics("meanwhile PMX_HalSetBg include none.pmx"));
+}
+
+TEST_F(Include, AtThePrompt_ItRunsAFile)
+{
+    write("lines.pmx", "PMX_Init\nPMX_GetMode 0\n");
+    const Ended ended = run("shell", "include " + file("lines.pmx") + "\nexpect out pucMode RES_1080P60HZ\n");
+    EXPECT_EQ(0, ended.code) << ended.err;
+}
+
+TEST_F(Include, KeepGoing_TellsAllFailures_OfAllScenarios)
+{
+    write("bad.pmx", "PMX_GetMode 0\nexpect result 0\nPMX_Gett\nexpect result 1\nexpect result 7\n");
+    write("good.pmx", "PMX_GetMode 0\nexpect result 1\n");
+    const Ended ended =
+        run("run -q -k --junit '" + file("verdicts.xml") + "' '" + file("bad.pmx") + "' '" + file("good.pmx") + "'");
+    EXPECT_EQ(1, ended.code);
+    EXPECT_EQ(3, std::count(ended.err.begin(), ended.err.end(), '\n')) << ended.err;
+    const std::string xml = content(file("verdicts.xml"));
+    EXPECT_NE(std::string::npos, xml.find("<testsuite name=\"scenarios\" tests=\"2\" failures=\"1\">")) << xml;
+    EXPECT_NE(std::string::npos, xml.find("bad.pmx:5: expected result 7, found 1\n")) << xml;
+    EXPECT_NE(std::string::npos, xml.find("good.pmx\"/>")) << xml;
+    EXPECT_EQ(2, run("run -q --junit /no/such/place '" + file("good.pmx") + "'").code);
+}
+
+TEST(Junit, WhatAFailureQuotes_IsEscaped)
+{
+    const std::string xml = pmxboard::to_junit({ { "a<b>&\"c\x1b", { "x < 1\x01" } } });
+    EXPECT_NE(std::string::npos, xml.find("name=\"a&lt;b&gt;&amp;&quot;c\\x1B\"")) << xml;
+    EXPECT_NE(std::string::npos, xml.find("message=\"x &lt; 1\\x01\">x &lt; 1\\x01\n</failure>")) << xml;
+}
+
+TEST(ExpectTimes, ExactAndAbout)
+{
+    const std::string lines = "PMX_Init\nPMX_SetFormatChangeTimer 10000\nadvance 12s\n"
+                              "expect call NOTICE expiry \"timer 2: _PMX_TmrIsr\"\n";
+    EXPECT_EQ("", diagnostics(lines + "expect at 10002ms\nexpect after 10s\nexpect at about 9500ms\n"
+                                      "expect at about 11s\nexpect after about 10s"));
+    EXPECT_EQ("here.pmx:5: expected at 10s, found 10002000us\nrepeat: pmxboard run here.pmx\n",
+              diagnostics(lines + "expect at 10s"));
+    EXPECT_EQ("here.pmx:5: expected after about 9s, found 10000000us\nrepeat: pmxboard run here.pmx\n",
+              diagnostics(lines + "expect after about 9s"));
+    EXPECT_EQ("", diagnostics("PMX_Init\nPMX_GetMode 0\nPMX_SetTvType 0 3\nexpect next PMX_HalSetTvType(...)\n"
+                              "expect at about 1001us\nexpect after about 1ms"));
+    EXPECT_EQ("here.pmx:2: whose time? An expect call or expect next stands before it\n",
+              diagnostics("PMX_Init\nexpect at 1s"));
+}
+
+} // namespace

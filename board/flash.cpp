@@ -1,7 +1,10 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Flash partitions: each is an image file, read anew at every call.
+#include "board/flash.h"
+
 #include <algorithm>
 #include <fstream>
+#include <optional>
 #include <stdexcept>
 #include <vector>
 
@@ -14,11 +17,14 @@
 namespace
 {
 
+using board::Value;
+
 struct Partition
 {
     std::string name; ///< empty: removed, so that the ids of the others stay
     std::filesystem::path image;
     unsigned reads = 0;
+    std::optional<std::uint32_t> word{}; ///< in place of an image
 };
 
 struct Flash
@@ -53,10 +59,61 @@ catch (const std::exception&)
     return false;
 }
 
+std::vector<char> bytes_of(std::uint32_t word)
+{
+    std::vector<char> bytes;
+    for (unsigned shift = 0; shift < 32; shift += 8)
+        bytes.push_back(static_cast<char>(word >> shift & 0xFF));
+    return bytes;
+}
+
+bool read_word(std::uint32_t word, UINT32 offset, UINT32 count, void* into)
+{
+    const std::vector<char> bytes = bytes_of(word);
+    if (std::uintmax_t{ offset } + count > bytes.size())
+        return false;
+    std::copy_n(bytes.begin() + offset, count, static_cast<char*>(into));
+    return true;
+}
+
+bool read_partition(const Partition& partition, UINT32 offset, UINT32 count, void* into)
+{
+    return partition.word ? read_word(*partition.word, offset, count, into)
+                          : read_image(partition.image, offset, count, into);
+}
+
+Value size_of(const Partition& partition)
+{
+    if (partition.word)
+        return Value::number(sizeof *partition.word);
+    std::error_code error;
+    const auto size = std::filesystem::file_size(partition.image, error);
+    return error ? Value::null() : Value::number(static_cast<std::int64_t>(size));
+}
+
+std::string image_of(const Partition& partition)
+{
+    return partition.word ? "word " + Value::number(*partition.word, {}, Value::Base::Hex).to_text()
+                          : partition.image.string();
+}
+
 } // namespace
 
 namespace board
 {
+
+void set_flash_word(std::string partition, std::uint32_t word)
+{
+    if (partition.empty())
+        throw std::invalid_argument("a flash partition has a name");
+    auto& partitions = flash_state.partitions;
+    const auto found = std::find_if(partitions.begin(), partitions.end(),
+                                    [&](const Partition& known) { return known.name == partition; });
+    if (found != partitions.end())
+        found->word = word;
+    else
+        partitions.push_back({ std::move(partition), {}, 0, word });
+}
 
 void set_flash(std::string partition, std::filesystem::path image)
 {
@@ -75,9 +132,12 @@ void set_flash(std::string partition, std::filesystem::path image)
             *found = {};
     }
     else if (found != partitions.end())
+    {
         found->image = std::move(image);
+        found->word.reset();
+    }
     else
-        partitions.push_back({ std::move(partition), std::move(image) });
+        partitions.push_back({ std::move(partition), std::move(image), 0, {} });
 }
 
 namespace flash
@@ -89,7 +149,7 @@ void power_on(const Description& description)
     for (const auto& [name, image] : description.flash)
     {
         files::note_input(image);
-        flash_state.partitions.push_back({ name, image });
+        flash_state.partitions.push_back({ name, image, 0, {} });
     }
 }
 
@@ -101,13 +161,11 @@ Value state()
         const Partition& partition = flash_state.partitions[id];
         if (partition.name.empty())
             continue;
-        std::error_code error;
-        const auto size = std::filesystem::file_size(partition.image, error);
         Value value;
         value.add("id", Value::number(static_cast<std::int64_t>(id)));
         value.add("name", Value::text(partition.name));
-        value.add("image", Value::text(partition.image.string()));
-        value.add("size", error ? Value::null() : Value::number(static_cast<std::int64_t>(size)));
+        value.add("image", Value::text(image_of(partition)));
+        value.add("size", size_of(partition));
         value.add("reads", Value::number(partition.reads));
         partitions.push_back(std::move(value));
     }
@@ -146,7 +204,7 @@ try
     // The result has to be able to tell the number of bytes.
     const bool readable = pvDest != nullptr && u4Count <= 0x7FFFFFFFu && i4PartId >= 0 && id < partitions.size() &&
                           !partitions[id].name.empty();
-    if (readable && read_image(partitions[id].image, u4Offset, u4Count, pvDest))
+    if (readable && read_partition(partitions[id], u4Offset, u4Count, pvDest))
     {
         ++partitions[id].reads;
         return boardCall.answer(static_cast<INT32>(u4Count));

@@ -76,7 +76,7 @@ TEST(ScenarioErrors, Printf_TakesNoConversions)
 TEST(ScenarioErrors, Verbs_ShowHowTheyAreWritten)
 {
     EXPECT_EQ("here.pmx:1: write: power-on [BOARD]\n", diagnostics("power-on a b"));
-    EXPECT_EQ("here.pmx:1: write: flash PARTITION FILE, or flash PARTITION off\n",
+    EXPECT_EQ("here.pmx:1: write: flash PARTITION FILE, flash PARTITION word NUMBER, or flash PARTITION off\n",
               diagnostics("flash x"));
     const std::string fault = "here.pmx:1: write: fault FUNCTION ANSWER [on N|from N|always], or fault FUNCTION off\n";
     for (const char* const wrong :

@@ -4,6 +4,7 @@
 #include <limits>
 
 #include "board/board.h"
+#include "board/flash.h"
 #include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/functions/kind.h"
 #include "tools/pmxboard/language/session.h"
@@ -33,6 +34,12 @@ catch (const std::invalid_argument& error)
 void put_flash(Session& session, const Words& words)
 {
     set_flash(words.at("PARTITION"), session.file(words.at("FILE")));
+}
+
+void put_word(Session&, const Words& words)
+{
+    const auto word = named_number(words.at("NUMBER"), "the word", board::names::Family::ResolutionMode);
+    board::set_flash_word(words.at("PARTITION"), word);
 }
 
 /** Only a partition that is there can be removed. */
@@ -114,6 +121,10 @@ std::vector<Verb> board_verbs()
               power_on } } },
         { "flash",
           { { "flash PARTITION FILE", "put an image, a file relative to the scenario, into a partition", put_flash },
+            { "flash PARTITION word NUMBER",
+              "put a 32-bit word there, and nothing behind it: `flash fast_init_param word 0x0C`, or a mode by its "
+              "name",
+              put_word },
             { "flash PARTITION off", "remove the partition", remove_flash } } },
         { "fault",
           { { "fault FUNCTION ANSWER [on N|from N|always]",

@@ -141,6 +141,7 @@ void add_shell(CLI::App& app, Chosen& chosen)
         app.add_subcommand("shell", "The scenario language at a prompt, or line by line from a pipe.");
     sub->add_option("--board", shell->board, "Board to power on: a name under boards/, a directory or a .toml file")
         ->type_name("NAME|FILE");
+    add_filter(sub, shell->only, shell->operations);
     add_colour(sub, shell->colour);
     sub->add_flag("-q,--quiet", shell->quiet, "Show failures only");
     sub->add_flag("-v,--verbose", shell->verbose, "Show arguments by name, and expectations");

@@ -5,14 +5,18 @@
 
 #include <cstdlib>
 #include <iostream>
+#include <memory>
+#include <set>
 
 #include "board/board.h"
 #include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/files/ending.h"
+#include "tools/pmxboard/files/new_file.h"
 #include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/language/runner.h"
 #include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/language/verbs.h"
 #include "tools/pmxboard/prompt/completion.h"
 #include "tools/pmxboard/prompt/editor.h"
 #include "tools/pmxboard/prompt/help.h"
@@ -24,19 +28,23 @@ namespace pmxboard
 namespace
 {
 
-const std::vector<std::string> shell_words = { "help", "quit", "exit" };
+const std::vector<std::string> shell_words = { "help", "break", "record", "quit", "exit" };
 
 /** The lines of one shell, carried out one after the other. */
 class Shell
 {
 public:
-    Shell(const ShellOptions& options, bool interactive)
-        : m_interactive(interactive), m_output(output_options(options, interactive)),
+    Shell(const ShellOptions& options, LineSource& lines, bool interactive)
+        : m_lines(lines), m_interactive(interactive), m_output(output_options(options, interactive)),
           m_session(m_output, options.board.empty() ? "default" : options.board, "."), m_look{
               text_width(), wants_colour(options.colour)
           }
     {
     }
+
+    ~Shell() { board::at_every_call({}); }
+    Shell(const Shell&) = delete;
+    Shell& operator=(const Shell&) = delete;
 
     /** Before the first line: completion looks into the board. */
     void power_on() { m_session.power_on({}); }
@@ -57,10 +65,7 @@ public:
                     throw LineError("write: " + line.word(0));
                 return false;
             }
-            if (line.word(0) == "help")
-                help(line);
-            else
-                m_session.run_line(text);
+            carry_out(line, text);
         }
         catch (const std::exception& error)
         {
@@ -75,8 +80,9 @@ public:
         try
         {
             m_session.finish();
+            end_record();
         }
-        catch (const StepFailed& error)
+        catch (const std::runtime_error& error)
         {
             report(error.what());
             return exit_failed;
@@ -93,7 +99,120 @@ private:
         output.colour = wants_colour(shell.colour);
         output.echo = !interactive;
         output.to = &std::cout;
+        output.filter = { shell.only, shell.operations };
         return output;
+    }
+
+    void carry_out(const Line& line, const std::string& text)
+    {
+        const std::string& word = line.word(0);
+        if (word == "help")
+            help(line);
+        else if (word == "break")
+            set_break(line);
+        else if (word == "record")
+            record(line);
+        else
+        {
+            watch_calls();
+            m_session.run_line(text);
+            keep(line);
+        }
+    }
+
+    /* Breakpoints: the layer stops at the end of a platform call, when the device has acted. */
+
+    void set_break(const Line& line)
+    {
+        if (line.size() > 2)
+            throw LineError("write: break FUNCTION, break off, or break");
+        if (line.size() == 1)
+        {
+            for (const std::string& function : m_breaks)
+                m_output.text("  " + function + "\n");
+            return;
+        }
+        if (line.word(1) == "off")
+        {
+            m_breaks.clear();
+            return;
+        }
+        need_platform_function(line.word(1));
+        m_breaks.insert(line.word(1));
+    }
+
+    /** Power-on takes it back. */
+    void watch_calls()
+    {
+        if (m_breaks.empty())
+            board::at_every_call({});
+        else
+            board::at_every_call([this](const board::TraceEntry& entry) { stop_at(entry); });
+    }
+
+    void stop_at(const board::TraceEntry& entry)
+    {
+        if (!m_breaks.contains(entry.function) || m_session.imagines())
+            return;
+        std::cout << "stopped in " << printable_lines(entry.brief()) << "; continue goes on\n";
+        while (const std::optional<std::string> text = m_lines.read())
+        {
+            ++m_number;
+            if (!run_stopped(*text))
+                return;
+        }
+    }
+
+    /** A line while the layer is stopped; false when it goes on. Nothing that is thrown may reach the layer. */
+    bool run_stopped(const std::string& text)
+    {
+        try
+        {
+            const Line line(text);
+            if (line.empty())
+                return true;
+            if (line.word(0) == "continue")
+                return false;
+            if (line.word(0) == "help")
+                help(line);
+            else if (line.word(0) == "break")
+                set_break(line);
+            else
+                m_session.run_stopped(line);
+        }
+        catch (const std::exception& error)
+        {
+            report(error.what());
+        }
+        return true;
+    }
+
+    /* What was typed, as a scenario. */
+
+    void record(const Line& line)
+    {
+        if (line.size() != 2)
+            throw LineError("write: record FILE, or record off");
+        end_record();
+        if (line.word(1) != "off")
+            m_record = std::make_unique<NewFile>(file_name(line.word(1)));
+    }
+
+    void end_record()
+    {
+        if (const auto record = std::move(m_record))
+            record->commit();
+    }
+
+    /** A line that was carried out, and what an operation answered. */
+    void keep(const Line& line)
+    {
+        if (!m_record)
+            return;
+        m_record->stream() << line.from(0) << '\n';
+        const auto& result = m_session.last_outcome().result;
+        if (find(operations(), line.word(0)) != nullptr && result)
+            m_record->stream() << "expect result " << result->to_text() << '\n';
     }
 
     void help(const Line& line)
@@ -115,7 +234,10 @@ private:
         std::cerr << presentable(message) << '\n';
     }
 
+    LineSource& m_lines;
     bool m_interactive;
+    std::set<std::string> m_breaks; ///< functions of the platform
+    std::unique_ptr<NewFile> m_record;
     Output m_output;
     Session m_session;
     Look m_look;
@@ -173,15 +295,17 @@ int run_shell(const ShellOptions& options)
     {
         return usage_error(error.what());
     }
+    if (const std::string wrong = TraceFilter{ options.only, options.operations }.complaint(); !wrong.empty())
+        return usage_error(wrong);
     const bool interactive = is_terminal();
-    Shell shell(options, interactive);
-    shell.power_on();
-    if (interactive)
-        greet(options.board);
     const auto complete_here = [](std::string_view line, std::size_t cursor) {
         return complete(line, cursor, { ".", shell_words });
     };
     const auto lines = interactive ? make_editor({ "pmx> ", usable_history(), complete_here }) : make_plain_source();
+    Shell shell(options, *lines, interactive);
+    shell.power_on();
+    if (interactive)
+        greet(options.board);
     try
     {
         std::optional<std::string> line;

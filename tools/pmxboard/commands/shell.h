@@ -7,6 +7,7 @@
 #include <filesystem>
 #include <iosfwd>
 #include <string>
+#include <vector>
 
 namespace pmxboard
 {
@@ -15,6 +16,8 @@ struct ShellOptions
 {
     std::string board;
     std::string colour = "auto";
+    std::vector<std::string> only;
+    std::vector<std::string> operations;
     bool quiet = false;
     bool verbose = false;
 };

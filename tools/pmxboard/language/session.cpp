@@ -133,6 +133,19 @@ void Session::run_meanwhile(const Line& line)
         board::trace::notice("meanwhile", text);
 }
 
+void Session::run_stopped(const Line& line)
+{
+    const std::string& name = line.word(0);
+    const Command command = find_command(name);
+    const bool looks = command.verb != nullptr && command.verb->only_looks;
+    if (name == "expect" || name == "power-on" || name == "include" || name == "what-if")
+        throw LineError(name + " waits until the layer has gone on: continue");
+    if (looks)
+        carry_out(line);
+    else
+        run_meanwhile(line);
+}
+
 bool Session::is_meanwhile()
 {
     return meanwhile_outcome != nullptr;

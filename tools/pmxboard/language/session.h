@@ -66,6 +66,8 @@ public:
     bool watches_stores() const { return m_watches_stores; }
     /** Carry a command out from inside a platform call: what it does is the running command's, its outcome a notice. */
     void run_meanwhile(const Line& line);
+    /** The same at a breakpoint: verbs that look show what they see in the middle of the call. */
+    void run_stopped(const Line& line);
     /** Whether such a command is running. */
     static bool is_meanwhile();
 

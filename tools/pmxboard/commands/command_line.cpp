@@ -3,6 +3,7 @@
 
 #include <functional>
 #include <iostream>
+#include <optional>
 #include <sstream>
 
 // The one place of the tool that knows the argument parser: it compiles slowly.
@@ -20,6 +21,7 @@
 #include "tools/pmxboard/prompt/help.h"
 #include "tools/pmxboard/text/layout.h"
 #include "tools/pmxboard/text/printable.h"
+#include "tools/pmxboard/text/suggest.h"
 #include "tools/pmxboard/view/trace_sink.h"
 
 namespace pmxboard
@@ -226,6 +228,25 @@ int told(const CLI::App& app, const CLI::ParseError& error)
     return is_help ? exit_done : exit_usage;
 }
 
+/** A first word that is no sub-command, which the parser would not name; the exit code. */
+std::optional<int> misspelt(const CLI::App& app, int count, const char* const* arguments)
+{
+    const std::string word = count > 1 ? arguments[1] : "";
+    std::vector<std::string> names;
+    std::string told;
+    for (const CLI::App* const sub : app.get_subcommands([](const CLI::App*) { return true; }))
+    {
+        if (word.empty() || word.starts_with('-') || sub->get_name() == word)
+            return std::nullopt;
+        if (sub->get_group().empty()) // hidden
+            continue;
+        names.push_back(sub->get_name());
+        told += (told.empty() ? "" : ", ") + sub->get_name();
+    }
+    const std::string nearest = did_you_mean(word, { names.begin(), names.end() });
+    return usage_error("no sub-command " + word + (nearest.empty() ? "; there are " + told : nearest));
+}
+
 } // namespace
 
 int run_command_line(int count, const char* const* arguments)
@@ -245,6 +266,8 @@ int run_command_line(int count, const char* const* arguments)
     add_ops(app, chosen);
     add_modes(app, chosen);
     add_decode(app, chosen);
+    if (const auto code = misspelt(app, count, arguments))
+        return *code;
     try
     {
         app.parse(count, arguments);

@@ -35,7 +35,9 @@ std::string constant_text(const std::string& name, std::int64_t number, const Lo
                 "  " + std::to_string(board::names::number_of(other).value_or(0)) + "  " + std::string(other) + "\n";
         return text;
     }
-    return look.bold(name) + " = " + std::to_string(number) + ", and goes with any number\n";
+    const bool is_packed = number > 0xFFFF;
+    const auto base = is_packed ? board::Value::Base::Hex : board::Value::Base::Decimal;
+    return look.bold(name) + " = " + board::Value::number(number, {}, base).to_text() + ", and goes with any number\n";
 }
 
 /** Without the marks of code. */

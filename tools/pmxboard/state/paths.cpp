@@ -50,6 +50,22 @@ std::string tree(const board::Value& value, std::size_t indent)
     return text;
 }
 
+/** For a path that begins as a member of the state does: what that has. */
+std::string members_like(const Value& state, std::string_view path)
+{
+    const std::string_view first = path.substr(0, path.find_first_of(".["));
+    for (std::size_t i = 0; i < state.keys().size() && !first.empty(); ++i)
+    {
+        if (!state.keys()[i].starts_with(first) || state.items()[i].keys().empty())
+            continue;
+        std::string text;
+        for (const std::string& key : state.items()[i].keys())
+            text += (text.empty() ? "; " + state.keys()[i] + " has " : ", ") + key;
+        return text;
+    }
+    return {};
+}
+
 } // namespace
 
 std::string item_step(std::size_t index)
@@ -88,7 +104,8 @@ Value part_of(const Value& state, const std::string& written)
         if (const Value* const members = state.find(group))
             collect_paths(*members, {}, paths);
     }
-    throw LineError("no state " + written + did_you_mean(path, { paths.begin(), paths.end() }));
+    const std::string near = did_you_mean(path, { paths.begin(), paths.end() });
+    throw LineError("no state " + written + (near.empty() ? members_like(state, path) : near));
 }
 
 std::string to_text(const NamedValues& values)

@@ -2,6 +2,7 @@
 #include "tools/pmxboard/view/trace_filter.h"
 
 #include <algorithm>
+#include <map>
 #include <string_view>
 
 #include "tools/pmxboard/functions/operation.h"
@@ -45,6 +46,25 @@ std::string nearest_beginnings(std::string_view beginning, const std::vector<std
     return did_you_mean(beginning, beginnings);
 }
 
+/** "TVE_", "VDP_": what several names begin with, up to their first underscore. */
+std::string usual_beginnings(const std::vector<std::string_view>& names)
+{
+    std::map<std::string_view, unsigned> counts;
+    for (const std::string_view name : names)
+    {
+        if (const std::size_t end = name.find('_', 1); end != name.npos && end > 1)
+            ++counts[name.substr(0, end + 1)];
+    }
+    constexpr unsigned several = 3;
+    std::string text;
+    for (const auto& [beginning, count] : counts)
+    {
+        if (count > several)
+            text.append(text.empty() ? "" : ", ").append(beginning);
+    }
+    return "; many begin with " + text;
+}
+
 bool is_so_called(const board::TraceEntry& entry, const std::string& beginning)
 {
     switch (entry.kind)
@@ -77,7 +97,13 @@ std::string TraceFilter::complaint() const
         const bool is_known = !beginning.empty() && std::any_of(functions.begin(), functions.end(),
                                                                 [&](auto name) { return name.starts_with(beginning); });
         if (!is_known)
-            return "no platform function begins with \"" + beginning + "\"" + nearest_beginnings(beginning, functions);
+        {
+            constexpr std::size_t telling = 4; // every three letters are near to some others
+            return "no platform function begins with \"" + beginning + "\"" +
+                   (beginning.empty()            ? std::string()
+                    : beginning.size() < telling ? usual_beginnings(functions)
+                                                 : nearest_beginnings(beginning, functions));
+        }
     }
     const auto known = operation_names();
     for (const std::string& name : operations)

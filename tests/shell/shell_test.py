@@ -51,6 +51,34 @@ class Shell(unittest.TestCase):
         self.assertIn("ucTvType = PMX_TV_TYPE_PAL", shell.command("state ucTvT", TAB))
         self.leave(shell)
 
+    def test_tab_does_not_care_for_capital_letters(self):
+        shell = self.start()
+        shell.type("pmx_settvt", TAB)
+        shell.wait_for("PMX_SetTvType ")
+        self.assertIn("  = 1\n", shell.command("0 pmx_tv_type_p", TAB))
+        self.assertIn("ucTvType = PMX_TV_TYPE_PAL", shell.command("state ucTvType"))
+        self.leave(shell)
+
+    def test_tab_tells_which_argument_is_being_written(self):
+        shell = self.start()
+        shell.type("PMX_SetModeEx 0 [ [0], [1, RES_", TAB)
+        shell.wait_for("prOutConf[1].eResMode: one of the resolution modes\r\n")
+        shell.type(CTRL_C)
+        shell.wait_for(PROMPT)
+        shell.type("PMX_SetHue 0 ", TAB)
+        shell.wait_for("ucHue: a number of 8 bits\r\n")
+        shell.type(CTRL_C)
+        shell.wait_for(PROMPT)
+        self.leave(shell)
+
+    def test_a_breakpoint_gives_the_prompt_back(self):
+        shell = self.start()
+        shell.command("break PMX_HalSetTvType")
+        self.assertIn("stopped in PMX_HalSetTvType(0, PMX_TV_TYPE_PAL)", shell.command("PMX_SetTvType 0 3"))
+        self.assertIn("ucTvType = PMX_TV_TYPE_PAL", shell.command("state ucTvType"))
+        self.assertIn("  = 1\n", shell.command("continue"))
+        self.leave(shell)
+
     def test_tab_in_the_middle_of_a_line(self):
         shell = self.start()
         self.assertIn("  = 1\n", shell.command("SetTvType 0 3", CTRL_A, "PMX_"))

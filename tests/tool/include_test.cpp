@@ -12,7 +12,6 @@ namespace
 {
 
 using tool_test::diagnostics;
-using tool_test::run;
 
 class Include : public ProgramRun
 {

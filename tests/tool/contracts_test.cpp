@@ -175,4 +175,13 @@ TEST(Help, InColumns_RunsDownwards)
     EXPECT_EQ("", pmxboard::in_columns({}, 80));
 }
 
+TEST(FieldTexts, AreTheHeadersOwn)
+{
+    using pmxboard::text_of_field;
+    EXPECT_EQ("master enable, as given", text_of_field("PMX_CONF_T", "ucEnable"));
+    EXPECT_EQ("plane id at each position of the stack", text_of_field("PMX_CONF_T", "aucPlaneOrder"));
+    EXPECT_EQ("", text_of_field("PMX_CONF_T", "pvTag1"));
+    EXPECT_EQ("", text_of_field("PMX_CONF_T", "ucNothing"));
+}
+
 } // namespace

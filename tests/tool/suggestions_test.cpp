@@ -19,16 +19,22 @@ TEST(Suggestions, ForWhatIsNearNothing)
         << filter.complaint();
 }
 
-class Misspelt : public ProgramRun
+class Told : public ProgramRun
 {
 };
 
-TEST_F(Misspelt, SubCommand_IsAnsweredWithTheNearest)
+TEST_F(Told, AMisspeltSubCommand_WithTheNearest)
 {
     EXPECT_EQ("pmxboard: no sub-command rn; did you mean run?\n", run("rn").err);
     EXPECT_EQ(2, run("rn").code);
     EXPECT_NE(std::string::npos, run("frobnicate x").err.find("; there are run, state, status, shell, "));
     EXPECT_EQ("PMX_PORT_DONE = 0x71000000, and goes with any number\n", run("shell", "help PMX_PORT_DONE\n").out);
+}
+
+TEST_F(Told, AField_WithWhatItHolds)
+{
+    EXPECT_EQ("ucEnable, a field of the layer: 0 to 255\n  master enable, as given\n",
+              run("shell", "help ucEnable\n").out);
 }
 
 } // namespace

@@ -36,6 +36,17 @@ const std::vector<Contract>& contracts();
 /** Null pointer when no header declares it. */
 const Contract* contract_of(std::string_view function);
 
+/** What a header says of a field. */
+struct FieldText
+{
+    std::string_view record;
+    std::string_view field;
+    std::string_view text;
+};
+const std::vector<FieldText>& field_texts();
+/** Empty when the header says nothing of it. */
+std::string_view text_of_field(std::string_view record, std::string_view field);
+
 /** The first sentence of a text, without its full stop. */
 std::string_view first_sentence(std::string_view text);
 

@@ -64,6 +64,8 @@ std::string field_text(const std::string& path, const Look& look)
         return text + "; state " + path + " shows it\n";
     const record_view::FieldType type = record_view::type_of(path);
     text += ": " + std::to_string(type.range().lowest) + " to " + std::to_string(type.range().highest) + "\n";
+    if (const std::string_view told = text_of_field(type.record, type.member); !told.empty())
+        text += wrapped(told, look.width, 2, 2);
     std::string names;
     for (const std::string_view name : names_in(board::names::family_of(type.record, type.member)))
         names.append(names.empty() ? "" : ", ").append(name);

@@ -56,6 +56,13 @@ TEST_F(Include, Loops_Depth_AndFilesThatAreNotThere)
     for (int i = 0; i < 20; ++i)
         write("deep" + std::to_string(i) + ".pmx", "include deep" + std::to_string(i + 1) + ".pmx\n");
     EXPECT_NE(std::string::npos, run_file("", "deep0.pmx").err.find("files include each other more than 8 deep"));
+    for (int i = 0; i < 7; ++i)
+    {
+        const std::string line = "include grow" + std::to_string(i + 1) + ".pmx\n";
+        write("grow" + std::to_string(i) + ".pmx", line + line + line + line + line);
+    }
+    write("grow7.pmx", "# nothing\n");
+    EXPECT_NE(std::string::npos, run_file("-q", "grow0.pmx").err.find("one include leads to more than 1000 files"));
     write("none.pmx", "include no.pmx\n");
     const Ended none = run_file("", "none.pmx");
     EXPECT_EQ(1, none.code);

@@ -339,6 +339,11 @@ void Session::include(const std::string& name)
         throw LineError(path.string() + " includes itself");
     if (m_included.size() == deepest)
         throw LineError("files include each other more than " + std::to_string(deepest) + " deep");
+    // Files that include each other twice would grow without end.
+    constexpr unsigned most = 1000;
+    m_includes = m_included.empty() ? 1 : m_includes + 1;
+    if (m_includes > most)
+        throw LineError("one include leads to more than " + std::to_string(most) + " files");
     const std::filesystem::path directory = std::exchange(m_directory, path.parent_path());
     m_included.push_back(really);
     try

@@ -121,6 +121,7 @@ private:
     std::size_t m_window_end = 0;
     std::size_t m_cursor = 0;
     std::chrono::microseconds m_begun{};
+    unsigned m_includes = 0;                       ///< since the outermost of them began
     std::vector<std::filesystem::path> m_included; ///< the files that are being carried out, each within the one before
     std::size_t m_console_begin = 0;
     std::size_t m_console_end = 0;

@@ -75,7 +75,8 @@ def states(good):
     found["text of controls"] = head + b'"a":"\\u001b[31m\\u009b\\u007f"}}'
     found["long key"] = head + b'"' + b"k" * LONG + b'":1}}'
     found["cut"] = good[:len(good) // 2]
-    found["another version"] = good.replace(b'"version": 1', b'"version": 99')
+    for version in (b"99", b"0", b"-1", b'"1"', b"1.0", b"null", b"[]", b"99999999999999999999"):
+        found[f"version {version.decode()}"] = good.replace(b'"version": 1', b'"version": ' + version)
     return found
 
 

@@ -167,7 +167,9 @@ class Inputs(Directory):
         self.try_all(contents.scenario_lines(), ("run", "shell", "against"))
 
     def test_saved_states(self):
-        self.try_all(contents.states(self.state.read_bytes()), ("state", "state -", "state two"))
+        found = contents.states(self.state.read_bytes())
+        self.assertNotIn(self.state.read_bytes(), found.values(), "as it was")
+        self.try_all(found, ("state", "state -", "state two"))
 
     def test_board_files(self):
         self.try_all(contents.boards(), ("board", "power-on"))
@@ -249,6 +251,23 @@ class Inputs(Directory):
         quoted = str(name).replace('"', '\\"')
         self.good("run", "-q", "-", stdin=f"PMX_Init\nsave \"{quoted}\"\nflash boot \"{quoted}\"\n".encode())
         self.good("state", "-q", name)
+
+    def test_names_that_look_like_something_else(self):
+        for name in ("-x.pmx", "--help", "--", "-", " ", "*", "$(x)", "%n%s", "'", '"', "#", "\\", "\u202e", "\u2028"):
+            self.write(name, b"PMX_Init\nfoo\n")
+            for file in (("--", name), (f"./{name}",)):
+                ended = self.run_tool("run", "-q", *file)
+                self.check(ended, name, codes=(1,) if name != "-" or file[0] != "--" else (0,))
+            self.check(self.run_tool("shell", stdin=f"power-on {name}\nflash a {name}\n".encode()), name)
+
+    def test_streams_that_are_closed(self):
+        for closed in ((0,), (2,), (0, 1), (0, 2), (1, 2), (0, 1, 2)):
+            for arguments in (("run", self.scenario), ("shell",)):
+                ended = self.run_tool(*arguments, stdin=b"PMX_Init\n",
+                                      prepare=lambda which=closed: [os.close(file) for file in which])
+                wanted = 2 if 1 in closed or 0 in closed and arguments == ("shell",) else 0
+                self.assertEqual(wanted, ended.returncode, (closed, arguments))
+                self.assertNotIn(b"Sanitizer", ended.stderr)
 
     def test_environment(self):
         strange = ("", "/", "/dev/null", "/dev/full", "no/such", "\x1b[31m", "x" * 5_000, LONGEST_NAME)

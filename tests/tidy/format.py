@@ -15,7 +15,8 @@ import subprocess
 import sys
 from concurrent.futures import ThreadPoolExecutor
 
-sys.path.append(str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))  # behind this directory, which has contracts, too
+# Behind this folder, which has a module contracts as well.
+sys.path.append(str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))
 
 import whole_file  # noqa: E402
 from tidy import CODE, files  # noqa: E402

@@ -415,7 +415,7 @@ class Interrupts(Directory):
         kept = self.write("kept", self.state.read_bytes())
         lines = self.write("saving.pmx", self.saving(kept))
         chance = random.Random(7)
-        for number in (signal.SIGKILL, signal.SIGINT, signal.SIGTERM, signal.SIGHUP) * (5 * ROUNDS):
+        for number in (signal.SIGKILL, signal.SIGINT, signal.SIGTERM, signal.SIGHUP) * (4 * ROUNDS):
             process = subprocess.Popen([PROGRAM, "run", "-q", lines], cwd=self.place, stderr=subprocess.PIPE)
             time.sleep(chance.uniform(0.005, 0.08))
             process.send_signal(number)
@@ -470,13 +470,13 @@ class Interrupts(Directory):
 
     def test_many_writers_of_one_file(self):
         kept = self.write("kept", self.state.read_bytes())
-        lines = self.write("saving.pmx", self.saving(kept, 60))
-        writers = [subprocess.Popen([PROGRAM, "run", "-q", lines], cwd=self.place) for _ in range(6)]
+        lines = self.write("saving.pmx", self.saving(kept, 40))
+        writers = [subprocess.Popen([PROGRAM, "run", "-q", lines], cwd=self.place) for _ in range(4)]
         reads = 0
         while any(writer.poll() is None for writer in writers):
             json.loads(kept.read_text())
             reads += 1
-        self.assertEqual([0] * 6, [writer.wait() for writer in writers])
+        self.assertEqual([0] * 4, [writer.wait() for writer in writers])
         self.assertLess(10, reads)
         self.assertEqual([], self.left_behind())
 

@@ -7,6 +7,11 @@ target_compile_options(pmx_host INTERFACE
     -Werror -Wall -Wextra -Wpedantic -Wshadow -Wundef -Wformat=2 -Wcast-qual -Wpointer-arith -Wvla
     "$<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor;-Woverloaded-virtual;-Wextra-semi>"
     $<$<COMPILE_LANG_AND_ID:CXX,GNU>:-Wno-restrict> -fno-pie)
+# What a source hides of another one that is compiled with it is no fault.
+set(is_batched "$<COMPILE_LANGUAGE:CXX>,$<BOOL:$<TARGET_PROPERTY:UNITY_BUILD>>")
+target_compile_options(pmx_host INTERFACE
+    "$<$<AND:${is_batched}>:-Wno-shadow>"
+    "$<$<AND:${is_batched},$<CXX_COMPILER_ID:GNU>>:-Wshadow=local;-Wno-subobject-linkage>")
 if(CMAKE_CROSSCOMPILING)
     # All of a program comes of one compiler: that it once passed some parameters otherwise is of no interest.
     target_compile_options(pmx_host INTERFACE -Wno-psabi)
@@ -47,14 +52,12 @@ set(PMX_PRECOMPILED
     <stdexcept> <string> <string_view> <utility> <vector>)
 
 # Sources that are compiled together, so that the headers that all of them include are read once: a quarter of the work.
-# Two sources of a library must not give the same name to two things, then, wherever they stand; what one of them hides
-# of another one is no fault.
+# Two sources of a library must not give the same name to two things, then, wherever they stand.
 set(PMX_BATCH 8 CACHE STRING "Sources of board, tool and tests that are compiled together; 1: each alone")
 
 function(pmx_in_batches name)
     if(PMX_BATCH GREATER 1)
         set_target_properties(${name} PROPERTIES UNITY_BUILD ON UNITY_BUILD_BATCH_SIZE ${PMX_BATCH})
-        target_compile_options(${name} PRIVATE -Wno-shadow -Wno-subobject-linkage)
     endif()
 endfunction()
 

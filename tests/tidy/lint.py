@@ -21,6 +21,7 @@ from concurrent.futures import ThreadPoolExecutor
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 RULES = [ROOT / ".clang-tidy", ROOT / "tests/.clang-tidy", pathlib.Path(__file__).resolve()]
+NOT_FOR_ONE_SOURCE = ("-Winvalid-pch", "-fpch-preprocess", "-Wno-shadow", "-Wshadow=local", "-Wno-subobject-linkage")
 MAIN_LINES = ("refs/remotes/origin/main", "@{upstream}")  # the first that is there
 
 
@@ -79,8 +80,8 @@ def to_look_at(sources, root):
 def commands_of(build):
     """How the build compiles every file of the project; a generated file is nobody's to clean up."""
     commands = json.loads((build / "compile_commands.json").read_text(encoding="utf-8"))
-    return [{**command, "file": file, "given": command["file"]} for command in commands for file in compiled_with(command)
-            if not pathlib.Path(file).is_relative_to(build)]
+    return [{**command, "file": file, "given": command["file"]}
+            for command in commands for file in compiled_with(command) if not pathlib.Path(file).is_relative_to(build)]
 
 
 def compiled_with(command):
@@ -93,7 +94,7 @@ def compiled_with(command):
 
 def arguments_of(command):
     """How a source is compiled, and the headers that it was given precompiled; clang-tidy reads those themselves."""
-    words = [word for word in shlex.split(command["command"]) if word not in ("-Winvalid-pch", "-fpch-preprocess")]
+    words = [word for word in shlex.split(command["command"]) if word not in NOT_FOR_ONE_SOURCE]
     kept, precompiled = [], []
     while words:
         word = words.pop(0)

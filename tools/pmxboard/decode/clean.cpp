@@ -18,7 +18,6 @@ constexpr std::size_t stamp_within = 48;
 
 constexpr char escape = '\x1b';
 constexpr char bell = '\a';
-constexpr std::string_view digits = "0123456789";
 
 // Every line of a log comes through here, and nearly every one has a time stamp: regular expressions would take longer
 // than the recognition of all texts.

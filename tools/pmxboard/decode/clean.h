@@ -10,6 +10,8 @@
 namespace pmxboard::decode
 {
 
+constexpr std::string_view digits = "0123456789";
+
 /** A line without terminal sequences and control characters. */
 std::string clean(std::string_view line);
 

@@ -19,7 +19,6 @@ constexpr unsigned broken_within = 2;  ///< foreign lines that may stand within 
 
 constexpr std::string_view command_echo = "> ";
 constexpr std::string_view traced_assertion = "  Assert(\""; ///< the console shows it, too
-constexpr std::string_view digits = "0123456789";
 
 std::string_view before(std::string_view line, std::size_t from, std::size_t at)
 {

@@ -44,8 +44,8 @@ std::size_t value_length(char conversion, std::string_view line)
     const bool hex = conversion == 'x';
     const std::size_t lead = hex ? std::min(line.find_first_not_of(' '), most_blanks) : line.starts_with('-');
     const std::size_t begin = std::min(lead, line.size());
-    const std::size_t digits = run_length(line.substr(begin), hex ? is_hex : is_digit, most_digits);
-    return digits == 0 ? 0 : begin + digits;
+    const std::size_t length = run_length(line.substr(begin), hex ? is_hex : is_digit, most_digits);
+    return length == 0 ? 0 : begin + length;
 }
 
 /** Whether a line may have ended within a value. */

@@ -19,10 +19,10 @@ using board::names::Family;
 constexpr const char* unknown = "?";
 
 /** `60`, `23_976`, and `23976` as the 4K mode has it. */
-std::string frequency_words(std::string digits)
+std::string frequency_words(std::string written)
 {
-    std::replace(digits.begin(), digits.end(), '_', '.');
-    return (digits == "23976" ? "23.976" : digits) + " Hz";
+    std::replace(written.begin(), written.end(), '_', '.');
+    return (written == "23976" ? "23.976" : written) + " Hz";
 }
 
 /** A mode's name without RES_, in words; empty when it is not made like one. */

@@ -20,7 +20,7 @@ constexpr unsigned planes = 8;
 constexpr unsigned first_held = 3;
 constexpr unsigned last_held = 7;
 
-enum Output : std::size_t
+enum OutputIndex : std::size_t
 {
     digital,
     hdmi,
@@ -63,7 +63,8 @@ std::string item(const std::string& list, std::size_t index)
 }
 
 /** What HDMI or the digital port was told last. */
-OutputStatus told_of(const View& view, Output output, const std::string& command, const char* enable, const char* mode)
+OutputStatus told_of(const View& view, OutputIndex output, const std::string& command, const char* enable,
+                     const char* mode)
 {
     OutputStatus status;
     status.name = output_names[output];
@@ -90,7 +91,7 @@ OutputStatus status_of_port(const View& view)
     return status;
 }
 
-OutputStatus status_of_encoder(const View& view, Output output)
+OutputStatus status_of_encoder(const View& view, OutputIndex output)
 {
     const std::string encoder = item("tv_encoder.encoders", output == component ? 0 : 1);
     OutputStatus status;
@@ -255,7 +256,7 @@ bool set_by_one_mode(const View& view)
     return view.is_on(std::string(sent_to_hdmi) + ".ucCCIROutMode");
 }
 
-void compare_output(Disagreements& found, const View& view, Output index, const OutputStatus& output)
+void compare_output(Disagreements& found, const View& view, OutputIndex index, const OutputStatus& output)
 {
     const std::string entry = item("record.arOutputConf", index);
     const bool wanted = view.is_on(entry + ".fgOutputEnable");
@@ -297,7 +298,7 @@ Disagreements disagreements_of(const View& view, const std::vector<OutputStatus>
     compare_orders(found, view);
     if (!view.is_on("record.fgSetModeCalled") || set_by_one_mode(view))
         return found;
-    for (const Output output : { digital, hdmi, component, composite })
+    for (const OutputIndex output : { digital, hdmi, component, composite })
         compare_output(found, view, output, outputs[output]);
     return found;
 }

@@ -85,7 +85,10 @@ class Board:
 
     @property
     def libraries(self):
-        return [self.build / library for library in LIBRARIES]
+        """What the tool is linked from, with the line editor's library where the build has found it."""
+        line_editor = re.search(r"^LIBEDIT_LIBRARY:FILEPATH=(/.*)$", self._cache, re.M)
+        return [*(self.build / library for library in LIBRARIES), "-ltomlplusplus",
+                *(line_editor.groups() if line_editor else ())]
 
 
 def reachable(core, made):
@@ -105,7 +108,6 @@ def record(paths, board, layer, made, objects):
     for name, text in (("wrappers", source), ("recorder", TOOL / "recorder.cpp")):
         run(*compiler("g++"), *host, "-w", "-c", text, "-o", made / f"{name}.o")
     run("g++", "-no-pie", *board.flags, made / "recorder.o", made / "wrappers.o", layer, *board.libraries,
-        "-ltomlplusplus",
         *(f"-Wl,--wrap={name}" for name in wrappers.wrapped()), "-o", made / "recorder")
     told = "".join("\n".join([f"path {i}", *path.lines]) + "\n" for i, path in enumerate(paths))
     try:

@@ -90,7 +90,46 @@ TEST_F(Include, KeepGoing_TellsAllFailures_OfAllScenarios)
     EXPECT_NE(std::string::npos, xml.find("<testsuite name=\"scenarios\" tests=\"2\" failures=\"1\">")) << xml;
     EXPECT_NE(std::string::npos, xml.find("bad.pmx:5: expected result 7, found 1\n")) << xml;
     EXPECT_NE(std::string::npos, xml.find("good.pmx\"/>")) << xml;
-    EXPECT_EQ(2, run("run -q --junit /no/such/place '" + file("good.pmx") + "'").code);
+    const Ended nowhere = run("run --junit /no/such/place '" + file("good.pmx") + "'");
+    EXPECT_EQ(2, nowhere.code);
+    EXPECT_EQ("", nowhere.out) << "told before anything runs";
+}
+
+TEST_F(Include, AScenarioThatCannotBeReadOn_IsOneVerdictOfSeveral)
+{
+    write("long.pmx", "PMX_Init\n" + std::string((std::size_t{ 1 } << 20) + 1, 'x') + "\nPMX_GetMode 0\n");
+    write("good.pmx", "PMX_Init\n");
+    const std::string outputs =
+        "--junit '" + file("verdicts.xml") + "' --trace-format jsonl --trace-file '" + file("trace.jsonl") + "' ";
+    const std::string files = "'" + file("long.pmx") + "' '" + file("good.pmx") + "'";
+    const Ended stopped = run("run " + outputs + files);
+    EXPECT_EQ(2, stopped.code);
+    EXPECT_EQ("pmxboard: " + file("long.pmx") + ":2: a line is longer",
+              stopped.err.substr(0, stopped.err.find(" than")));
+    EXPECT_NE(std::string::npos, content(file("verdicts.xml")).find("tests=\"1\" failures=\"1\""));
+    const std::string trace = content(file("trace.jsonl"));
+    EXPECT_FALSE(trace.empty());
+    EXPECT_EQ(2, run("run -k " + outputs + files).code);
+    EXPECT_NE(std::string::npos, content(file("verdicts.xml")).find("tests=\"2\" failures=\"1\""));
+    EXPECT_NE(std::string::npos, content(file("verdicts.xml")).find("long.pmx:2: a line is longer"));
+    EXPECT_LT(trace.size(), content(file("trace.jsonl")).size()) << "the other scenario's trace";
+    EXPECT_EQ(2, run("run -k --junit '" + file("verdicts.xml") + "' --trace-file /dev/full " + files).code);
+    EXPECT_NE(std::string::npos, content(file("verdicts.xml")).find("tests=\"2\" failures=\"1\""));
+}
+
+TEST_F(Include, TraceAndVerdicts_AreTwoFiles)
+{
+    write("good.pmx", "PMX_GetMode 0\n");
+    write("one", "");
+    std::filesystem::create_symlink(file("one"), file("other"));
+    for (const char* const junit : { "one", "./one", "other" })
+    {
+        const Ended ended =
+            run("run --trace-file '" + file("one") + "' --junit '" + file(junit) + "' '" + file("good.pmx") + "'");
+        EXPECT_EQ(2, ended.code);
+        EXPECT_EQ("pmxboard: --trace-file and --junit both name " + file(junit) + "\n", ended.err);
+    }
+    EXPECT_EQ(0, run("run -q --trace-file /dev/null --junit /dev/null '" + file("good.pmx") + "'").code);
 }
 
 TEST(Junit, WhatAFailureQuotes_IsEscaped)

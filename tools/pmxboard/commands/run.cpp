@@ -2,6 +2,7 @@
 #include "tools/pmxboard/commands/run.h"
 
 #include <algorithm>
+#include <filesystem>
 #include <iostream>
 #include <istream>
 #include <memory>
@@ -36,11 +37,26 @@ std::string repeat_command(const RunOptions& run, const std::string& file)
     return "pmxboard run " + (run.board.empty() ? "" : "--board " + shell_word(run.board) + " ") + shell_word(file);
 }
 
+/** Whether two names lead to one file, of which only what is written last would be left. */
+bool is_one_file(const std::string& one, const std::string& other)
+{
+    namespace fs = std::filesystem;
+    std::error_code error;
+    if (one.empty() || other.empty() || (fs::exists(one, error) && !fs::is_regular_file(one, error)))
+        return false;
+    const auto real = [&error](const std::string& name) {
+        return fs::weakly_canonical(fs::absolute(name, error), error);
+    };
+    return real(one) == real(other) && !error;
+}
+
 /** What is wrong with the command line; empty when nothing is. */
 std::string complaint(const RunOptions& run, const OutputOptions& output)
 {
     if (std::count(run.files.begin(), run.files.end(), "-") > 1)
         return "the standard input holds one scenario only";
+    if (is_one_file(run.trace_file, run.junit))
+        return "--trace-file and --junit both name " + run.junit;
     try
     {
         if (!run.board.empty())
@@ -64,55 +80,70 @@ Opened open_all(const RunOptions& run)
     return opened;
 }
 
-/** Each scenario on a board of its own; the exit code. */
+/** One scenario on a board of its own; the exit code. */
+int run_one(std::istream& lines, const Scenario& scenario, const OutputOptions& output)
+try
+{
+    return run_scenario(lines, scenario, output, std::cerr) ? exit_done : exit_failed;
+}
+catch (const board::files::FileError& error) // what happened until then is worth as much, and so are the others
+{
+    scenario.failures->push_back(presentable(error.what()));
+    return usage_error(error.what());
+}
+
+/** Each of them; the exit code. */
 int run_each(const RunOptions& run, const Opened& opened, const OutputOptions& output, std::vector<Verdict>& verdicts)
 {
     int code = exit_done;
+    verdicts.reserve(run.files.size());
     for (std::size_t i = 0; i < run.files.size() && (code == exit_done || run.keep_going); ++i)
     {
         const std::string& file = run.files[i];
         Verdict& verdict = verdicts.emplace_back(Verdict{ file, {} });
         const Scenario scenario{ file, run.board.empty() ? "default" : run.board, repeat_command(run, file),
                                  run.keep_going, &verdict.failures };
-        if (!run_scenario(*opened[i], scenario, output, std::cerr))
-            code = exit_failed;
+        code = std::max(code, run_one(*opened[i], scenario, output));
     }
     return code;
 }
 
-/** The same, with the trace where it is wanted. Throws FileError. */
+std::unique_ptr<NewFile> open_output(const std::string& name, NewFile::Unfinished unfinished)
+{
+    return name.empty() ? nullptr : std::make_unique<NewFile>(name, NewFile::Over::OutputsAlone, unfinished);
+}
+
+/** The exit code. */
+int complete(NewFile* file)
+try
+{
+    if (file != nullptr)
+        file->commit();
+    return exit_done;
+}
+catch (const board::files::FileError& error)
+{
+    return usage_error(error.what());
+}
+
+/** The same, with trace and verdicts where they are wanted; neither goes without the other. Throws FileError for what
+ *  cannot be opened, before anything runs. */
 int run_traced(const RunOptions& run, OutputOptions output)
 {
     const Opened opened = open_all(run);
-    std::unique_ptr<NewFile> trace_file;
-    if (!run.trace_file.empty())
-    {
-        trace_file = std::make_unique<NewFile>(run.trace_file, NewFile::Over::OutputsAlone, NewFile::Unfinished::Kept);
+    const auto trace_file = open_output(run.trace_file, NewFile::Unfinished::Kept);
+    const auto junit_file = open_output(run.junit, NewFile::Unfinished::Removed);
+    if (trace_file)
         output.trace_to = &trace_file->stream();
-    }
     const TraceOptions how{ run.verbose, output.colour, trace_file != nullptr };
     auto trace = trace_form(run.trace_format).make(how, trace_file ? trace_file->stream() : std::cout);
     output.trace = trace.get();
-    const auto complete = [&] {
-        trace.reset(); // what it still has to write
-        if (trace_file)
-            trace_file->commit();
-    };
     std::vector<Verdict> verdicts;
-    try
-    {
-        const int code = run_each(run, opened, output, verdicts);
-        complete();
-        if (!run.junit.empty())
-            write_file(run.junit, to_junit(verdicts));
-        return code;
-    }
-    catch (...) // a scenario that cannot be read on: what happened until then is worth as much
-    {
-        if (trace)
-            complete();
-        throw;
-    }
+    const int code = run_each(run, opened, output, verdicts);
+    trace.reset(); // what it still has to write
+    if (junit_file)
+        junit_file->stream() << to_junit(verdicts);
+    return std::max({ code, complete(trace_file.get()), complete(junit_file.get()) });
 }
 
 } // namespace

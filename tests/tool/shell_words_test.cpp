@@ -52,6 +52,47 @@ TEST_F(ShellWords, Record_IsAScenario)
     EXPECT_EQ("PMX_Stop\n", content(scenario)) << "the end of the lines is the end of the record";
 }
 
+TEST_F(ShellWords, Record_IsThere_HoweverTheShellEnds)
+{
+    const std::string scenario = file("kept.pmx");
+    const Ended misused = run("shell -q", "record " + scenario + "\nPMX_Init\nneighbour x_reg_write32 3 0\n");
+    EXPECT_EQ(1, misused.code);
+    EXPECT_NE(std::string::npos, misused.err.find("misused"));
+    EXPECT_EQ("PMX_Init\nneighbour x_reg_write32 3 0\n", content(scenario));
+    const std::string too_long((std::size_t{ 1 } << 20) + 1, 'x');
+    EXPECT_EQ(2, run("shell -q", "record " + scenario + "\nPMX_Stop\n" + too_long + "\nPMX_Init\n").code);
+    EXPECT_EQ("PMX_Stop\n", content(scenario));
+}
+
+TEST_F(ShellWords, Record_HoldsNothingThatIsTypedAtABreakpoint)
+{
+    const std::string scenario = file("kept.pmx");
+    const Ended ended = run("shell -q", "PMX_Init\nrecord " + scenario +
+                                            "\nbreak PMX_HalSetTvType\nPMX_SetTvType 0 3\npoke ucHue 7\ncontinue\n"
+                                            "expect result 7\n");
+    EXPECT_EQ(1, ended.code);
+    EXPECT_EQ("PMX_SetTvType 0 3\nexpect result 1\n", content(scenario)) << "nor a line that failed";
+}
+
+TEST_F(ShellWords, Break_WhereTheLinesCannotBeReadOn_IsNoFailedStep)
+{
+    const std::string too_long((std::size_t{ 1 } << 20) + 1, 'x');
+    const Ended ended = run("shell", "PMX_Init\nbreak PMX_HalSetMode\noutputs hdmi=720p50\n" + too_long + "\n");
+    EXPECT_EQ(2, ended.code);
+    EXPECT_EQ("pmxboard: a line is longer", ended.err.substr(0, ended.err.find(" than"))) << ended.err;
+    EXPECT_NE(std::string::npos, ended.out.find("stopped in PMX_HalSetMode"));
+    EXPECT_TRUE(ended.out.ends_with("  = 1\n")) << "the layer goes on: " << ended.out;
+}
+
+TEST_F(ShellWords, Break_ShowsWhatLedThere)
+{
+    const std::string shown =
+        run("shell", "PMX_Init\nPMX_SetFormatChangeTimer 10000\nbreak vPmxMixPlane\nadvance 10s\n").out;
+    const std::size_t stopped = shown.find("stopped in vPmxMixPlane(0, DRV_PMX_PLANE_4)");
+    ASSERT_NE(std::string::npos, stopped) << shown;
+    EXPECT_LT(shown.find("  vPmxMixPlane(0, DRV_PMX_PLANE_3)\n"), stopped) << shown;
+}
+
 TEST_F(ShellWords, FiltersAsARunHasThem)
 {
     const std::string shown = run("shell --only PMX_HalSet --op PMX_Init", "PMX_Init\nPMX_SetTvType 0 3\n").out;

@@ -4,6 +4,7 @@
 #include <unistd.h>
 
 #include <cstdlib>
+#include <exception>
 #include <iostream>
 #include <memory>
 #include <set>
@@ -49,7 +50,8 @@ public:
     /** Before the first line: completion looks into the board. */
     void power_on() { m_session.power_on({}); }
 
-    /** Carry a line out; false when it ends the shell. */
+    /** Carry a line out; false when it ends the shell. Throws FileError when the lines behind it, read while the layer
+     *  was stopped, cannot be read on. */
     bool run(const std::string& text)
     {
         ++m_number;
@@ -71,26 +73,35 @@ public:
         {
             report(error.what());
         }
+        if (m_unreadable)
+            std::rethrow_exception(m_unreadable);
         return true;
     }
 
-    /** The end of all lines; the exit code. */
+    /** The end of all lines, or of those that can be read; the exit code. */
     int finish()
     {
-        try
-        {
-            m_session.finish();
-            end_record();
-        }
-        catch (const std::runtime_error& error)
-        {
-            report(error.what());
-            return exit_failed;
-        }
-        return m_failed && !m_interactive ? exit_failed : exit_done;
+        // The record first: it holds what led to what is wrong at the end.
+        const bool is_kept = hold([this] { end_record(); });
+        const bool is_right = hold([this] { m_session.finish(); });
+        return is_kept && is_right && (!m_failed || m_interactive) ? exit_done : exit_failed;
     }
 
 private:
+    /** Do something, or tell why not. */
+    template <typename Step>
+    bool hold(const Step& step)
+    try
+    {
+        step();
+        return true;
+    }
+    catch (const std::exception& error)
+    {
+        report(error.what());
+        return false;
+    }
+
     static OutputOptions output_options(const ShellOptions& shell, bool interactive)
     {
         OutputOptions output;
@@ -114,7 +125,6 @@ private:
             record(line);
         else
         {
-            watch_calls();
             m_session.run_line(text);
             keep(line);
         }
@@ -133,15 +143,16 @@ private:
             return;
         }
         if (line.word(1) == "off")
-        {
             m_breaks.clear();
-            return;
+        else
+        {
+            need_platform_function(line.word(1));
+            m_breaks.insert(line.word(1));
         }
-        need_platform_function(line.word(1));
-        m_breaks.insert(line.word(1));
+        watch_calls();
     }
 
-    /** Power-on takes it back. */
+    /** Through every power-on, until there is nothing to stop at. */
     void watch_calls()
     {
         if (m_breaks.empty())
@@ -152,15 +163,28 @@ private:
 
     void stop_at(const board::TraceEntry& entry)
     {
-        if (!m_breaks.contains(entry.function) || m_session.imagines())
+        if (!m_breaks.contains(entry.function) || m_session.imagines() || m_unreadable)
             return;
+        m_output.flush(); // what led here
         std::cout << "stopped in " << printable_lines(entry.brief()) << "; continue goes on\n";
-        while (const std::optional<std::string> text = m_lines.read())
+        while (const std::optional<std::string> text = read_stopped())
         {
             ++m_number;
             if (!run_stopped(*text))
                 return;
         }
+    }
+
+    /** The next line; none where none can be read, which is told when the layer is through. */
+    std::optional<std::string> read_stopped()
+    try
+    {
+        return m_lines.read();
+    }
+    catch (const board::files::FileError&)
+    {
+        m_unreadable = std::current_exception();
+        return std::nullopt;
     }
 
     /** A line while the layer is stopped; false when it goes on. Nothing that is thrown may reach the layer. */
@@ -195,7 +219,8 @@ private:
             throw LineError("write: record FILE, or record off");
         end_record();
         if (line.word(1) != "off")
-            m_record = std::make_unique<NewFile>(file_name(line.word(1)));
+            m_record = std::make_unique<NewFile>(file_name(line.word(1)), NewFile::Over::OutputsAlone,
+                                                 NewFile::Unfinished::Kept);
     }
 
     void end_record()
@@ -243,6 +268,7 @@ private:
     Look m_look;
     unsigned m_number = 0;
     bool m_failed = false;
+    std::exception_ptr m_unreadable; ///< why no line came while the layer was stopped
 };
 
 bool is_terminal()
@@ -319,7 +345,9 @@ int run_shell(const ShellOptions& options)
     }
     catch (const board::files::FileError& error)
     {
-        return usage_error(error.what());
+        const int code = usage_error(error.what());
+        shell.finish();
+        return code;
     }
     return shell.finish();
 }

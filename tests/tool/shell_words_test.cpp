@@ -93,6 +93,13 @@ TEST_F(ShellWords, Break_ShowsWhatLedThere)
     EXPECT_LT(shown.find("  vPmxMixPlane(0, DRV_PMX_PLANE_3)\n"), stopped) << shown;
 }
 
+TEST_F(ShellWords, Help_OnTheShellsOwnWords)
+{
+    const std::string shown = run("shell", "help record break\n").out;
+    EXPECT_NE(std::string::npos, shown.find("record\n  record FILE keeps")) << shown;
+    EXPECT_NE(std::string::npos, shown.find("break\n  break FUNCTION stops")) << shown;
+}
+
 TEST_F(ShellWords, FiltersAsARunHasThem)
 {
     const std::string shown = run("shell --only PMX_HalSet --op PMX_Init", "PMX_Init\nPMX_SetTvType 0 3\n").out;

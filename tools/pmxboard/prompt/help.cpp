@@ -86,6 +86,7 @@ struct Topic
 {
     std::string_view word;
     std::string_view text;
+    std::string_view more; ///< lines as they stand
 };
 
 constexpr std::string_view about_waiting =
@@ -93,16 +94,30 @@ constexpr std::string_view about_waiting =
     "jump. They come back when it has switched and says so by PMX_SetFormatChangeFlag, or after ten seconds, when the "
     "display timer runs out; while the video plane waits for its sync control, when that calls PMX_SetOsdEnable.";
 
-constexpr Topic topics[] = { { "wait", about_waiting }, { "graphics", about_waiting } };
+constexpr std::string_view looking_at_waiting =
+    "  status graphics    whether they wait now, since when, until when and for whom\n"
+    "  status             the same, and what outputs and planes show\n"
+    "  display-part …     how long the display part takes\n"
+    "  advance 3s         let time pass\n"
+    "  For example: scenarios/first-look.pmx\n";
+
+constexpr std::string_view about_break =
+    "break FUNCTION stops the layer at the end of each call of a platform function, where lines are carried out until "
+    "continue. break off forgets all such functions, break lists them. At the prompt and in its pipe alone.";
+
+constexpr std::string_view about_record =
+    "record FILE keeps the lines that are carried out from here on, with what operations answered, as a scenario; "
+    "record off, or the end of the shell, ends it. A line that fails is not in it, nor one that is typed at a "
+    "breakpoint: meanwhile FUNCTION on N COMMAND says the same in a scenario.";
+
+constexpr Topic topics[] = { { "wait", about_waiting, looking_at_waiting },
+                             { "graphics", about_waiting, looking_at_waiting },
+                             { "break", about_break, "" },
+                             { "record", about_record, "" } };
 
 std::string topic_text(const Topic& topic, const Look& look)
 {
-    return look.bold(topic.word) + "\n" + wrapped(topic.text, look.width, 2, 2) +
-           "  status graphics    whether they wait now, since when, until when and for whom\n"
-           "  status             the same, and what outputs and planes show\n"
-           "  display-part …     how long the display part takes\n"
-           "  advance 3s         let time pass\n"
-           "  For example: scenarios/first-look.pmx\n";
+    return look.bold(topic.word) + "\n" + wrapped(topic.text, look.width, 2, 2) + std::string(topic.more);
 }
 
 } // namespace

@@ -7,6 +7,7 @@
 #include "program_run.h"
 #include "scenario_run.h"
 #include "tools/pmxboard/commands/junit.h"
+#include "tools/pmxboard/files/ending.h"
 
 namespace
 {
@@ -71,6 +72,36 @@ TEST_F(Include, Loops_Depth_AndFilesThatAreNotThere)
               diagnostics("meanwhile PMX_HalSetBg include none.pmx"));
 }
 
+TEST_F(Include, AFileThatCannotBeReadOn_HasTheChainOfPlaces)
+{
+    write("main.pmx", "PMX_Init\ninclude one.pmx\n");
+    write("one.pmx", "# nothing\ninclude two.pmx\n");
+    write("two.pmx", "PMX_GetMode 0\n" + std::string((std::size_t{ 1 } << 20) + 1, 'x') + "\n");
+    const Ended ended = run_file("-q", "main.pmx");
+    EXPECT_EQ(1, ended.code);
+    EXPECT_EQ(file("main.pmx") + ":2: one.pmx:2: two.pmx:2: a line is longer",
+              ended.err.substr(0, ended.err.find(" than")));
+}
+
+TEST_F(Include, WithinAnotherFile_TheProgramKnowsWhereItIs)
+{
+    write("one.pmx", "PMX_GetMode 0\nexpect result 0\n");
+    diagnostics("PMX_Init\ninclude " + file("one.pmx"));
+    EXPECT_EQ("here.pmx:2: " + file("one.pmx") + ":2", pmxboard::current_place()) << "where it ended";
+    write("one.pmx", "PMX_GetMode 0\n");
+    EXPECT_EQ("", diagnostics("PMX_Init\ninclude " + file("one.pmx")));
+    EXPECT_EQ("here.pmx:2", pmxboard::current_place()) << "back again";
+}
+
+TEST_F(Include, NamesThatCannotBeFollowed_DoNotIncludeThemselves)
+{
+    std::filesystem::create_symlink(file("loop"), file("loop"));
+    write("main.pmx", "include loop\n");
+    const std::string told = run_file("-q", "main.pmx").err;
+    EXPECT_NE(std::string::npos, told.find("cannot read ")) << told;
+    EXPECT_EQ(std::string::npos, told.find("includes itself")) << told;
+}
+
 TEST_F(Include, AtThePrompt_ItRunsAFile)
 {
     write("lines.pmx", "PMX_Init\nPMX_GetMode 0\n");
@@ -93,6 +124,17 @@ TEST_F(Include, KeepGoing_TellsAllFailures_OfAllScenarios)
     const Ended nowhere = run("run --junit /no/such/place '" + file("good.pmx") + "'");
     EXPECT_EQ(2, nowhere.code);
     EXPECT_EQ("", nowhere.out) << "told before anything runs";
+}
+
+TEST_F(Include, KeepGoing_TakesAnIncludeForOneLine)
+{
+    write("main.pmx", "include wrong.pmx\nexpect result 7\n");
+    write("wrong.pmx", "PMX_GetMode 0\nexpect result 3\nexpect result 4\nPMX_Stop\n");
+    const Ended ended = run_file("-q -k", "main.pmx");
+    EXPECT_EQ(1, ended.code);
+    EXPECT_EQ(file("main.pmx") + ":1: wrong.pmx:2: expected result 3, found 1\n" + file("main.pmx") +
+                  ":2: expected result 7, found 1\n",
+              ended.err);
 }
 
 TEST_F(Include, AScenarioThatCannotBeReadOn_IsOneVerdictOfSeveral)

@@ -28,7 +28,7 @@ struct Temporary
 };
 
 Temporary temporaries[4];
-char current_place[512] = "pmxboard";
+char place_now[512] = "pmxboard";
 
 constexpr int breakdowns[] = { SIGSEGV, SIGBUS, SIGFPE, SIGILL, SIGABRT, SIGTRAP, SIGSYS };
 constexpr int interrupts[] = { SIGINT, SIGTERM, SIGHUP, SIGQUIT };
@@ -102,7 +102,7 @@ void on_interrupt(int number)
 
 void on_breakdown(int number)
 {
-    say_foreign(current_place);
+    say_foreign(place_now);
     say(": the step broke the program down: ");
     say(number == SIGSEGV   ? "memory that is not there (SIGSEGV)"
         : number == SIGBUS  ? "memory that is not there (SIGBUS)"
@@ -154,7 +154,7 @@ void use_another_stack()
 /** An exception that nobody catches: it met code that knows none. */
 [[noreturn]] void on_uncaught()
 {
-    say_foreign(current_place);
+    say_foreign(place_now);
     say(": the step broke the program down: ");
     try
     {
@@ -212,9 +212,14 @@ void end_in_order()
 
 void set_place(std::string_view place)
 {
-    const std::size_t size = std::min(place.size(), sizeof current_place - 1);
-    std::memcpy(current_place, place.data(), size);
-    current_place[size] = '\0';
+    const std::size_t size = std::min(place.size(), sizeof place_now - 1);
+    std::memcpy(place_now, place.data(), size);
+    place_now[size] = '\0';
+}
+
+std::string current_place()
+{
+    return place_now;
 }
 
 void end_as_it_comes()

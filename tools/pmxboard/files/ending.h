@@ -3,6 +3,7 @@
  *  How the program ends when something ends it: in good order, and with a line that says where it was. */
 #pragma once
 
+#include <string>
 #include <string_view>
 
 namespace pmxboard
@@ -14,6 +15,7 @@ void end_in_order();
 
 /** Where the program is: what a breakdown is told with. */
 void set_place(std::string_view place);
+std::string current_place();
 
 /** In a copy of the process that is to die as it would by itself: its parent tells it. */
 void end_as_it_comes();

@@ -2,12 +2,15 @@
 #include "tools/pmxboard/language/session.h"
 
 #include <algorithm>
+#include <istream>
+#include <memory>
 #include <utility>
 
 #include "board/board.h"
 #include "board/console.h"
 #include "board/files.h"
 #include "board/threads.h"
+#include "tools/pmxboard/files/ending.h"
 #include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/language/verbs.h"
 #include "tools/pmxboard/state/now.h"
@@ -22,6 +25,17 @@ namespace
 
 /** Where the outcome of a command goes that runs inside a platform call, in each thread; null when none does. */
 thread_local Outcome* meanwhile_outcome = nullptr;
+
+/** Throws LineError: it is the line that names the file. */
+std::unique_ptr<std::istream> open_included(const std::string& path)
+try
+{
+    return board::files::open_lines(path);
+}
+catch (const board::files::FileError& error)
+{
+    throw LineError(error.what());
+}
 
 /** An outcome in a notice: "= 1, *pucMode = RES_480P". */
 std::string outcome_text(const Outcome& outcome)
@@ -333,8 +347,10 @@ void Session::include(const std::string& name)
 {
     constexpr std::size_t deepest = 8; // so that the way to a mistake can be told
     const std::filesystem::path path = file(name);
-    std::error_code ignored;
-    const std::filesystem::path really = std::filesystem::weakly_canonical(path, ignored);
+    std::error_code error;
+    std::filesystem::path really = std::filesystem::weakly_canonical(path, error);
+    if (error)
+        really = path; // told when it is opened
     if (std::find(m_included.begin(), m_included.end(), really) != m_included.end())
         throw LineError(path.string() + " includes itself");
     if (m_included.size() == deepest)
@@ -363,29 +379,27 @@ void Session::include(const std::string& name)
 /** What goes wrong is told with the place. */
 void Session::run_file(const std::string& path, const std::string& name)
 {
-    unsigned number = 0;
-    const auto place = [&] { return name + ":" + std::to_string(number) + ": "; };
+    const auto lines = open_included(path);
+    const std::string from = current_place();
+    unsigned number = 1;
+    const auto place = [&] { return name + ":" + std::to_string(number); };
     try
     {
-        const auto lines = board::files::open_lines(path);
-        for (std::string text; board::files::next_line(*lines, text);)
+        for (std::string text; board::files::next_line(*lines, text); ++number)
         {
-            ++number;
+            set_place(from + ": " + place());
             run_line(text);
         }
     }
     catch (const LineError& error)
     {
-        throw LineError(place() + error.what());
+        throw LineError(place() + ": " + error.what());
     }
-    catch (const board::files::FileError& error)
+    catch (const std::exception& error)
     {
-        throw LineError(error.what());
+        throw StepFailed(place() + ": " + error.what());
     }
-    catch (const StepFailed& error)
-    {
-        throw StepFailed(place() + error.what());
-    }
+    set_place(from);
 }
 
 void Session::finish()

@@ -137,6 +137,16 @@ TEST_F(Include, KeepGoing_TakesAnIncludeForOneLine)
               ended.err);
 }
 
+TEST_F(Include, AScenarioWithoutCommands_HasNoNoteOfTheOneBefore)
+{
+    write("a.pmx", "PMX_Init\nfault fgPmxDrvSetAvd 0 always\noutputs hdmi=720p50\n");
+    write("empty.pmx", "# nothing\n");
+    const std::string a = "'" + file("a.pmx") + "' ";
+    const std::string alone = run("run " + a).out;
+    EXPECT_NE(std::string::npos, alone.find("note: ")) << alone;
+    EXPECT_EQ(alone, run("run " + a + "'" + file("empty.pmx") + "'").out);
+}
+
 TEST_F(Include, AScenarioThatCannotBeReadOn_IsOneVerdictOfSeveral)
 {
     write("long.pmx", "PMX_Init\n" + std::string((std::size_t{ 1 } << 20) + 1, 'x') + "\nPMX_GetMode 0\n");

@@ -41,6 +41,8 @@ public:
     void finish();
 
     unsigned expectations() const { return m_expectations; }
+    /** Whether the board is this session's: until then it holds what another one has left. */
+    bool is_powered() const { return m_powered; }
 
     /** Whether the state is kept before each command, for `diff`. It is, unless a scenario that never asks for the
      *  differences turns it off. */

@@ -70,6 +70,7 @@ TEST(Output, CallTooLongForTheScreen_IsBrokenBehindCommas)
 TEST(Output, ALongRecord_IsShownOnce_AndThenAsWhatChanged)
 {
     const std::string lines = "PMX_Init\nPMX_SetModeEx 0 [ [0], [1, 8], [1, 2], [1, 0] ] 60 0 0\n"
+                              "expect call fgPmxDrvSetAvd(PMX_SET_VIDEO_PLL, {as before}, *)\n" // any record
                               "expect call fgPmxDrvSetAvd(PMX_SET_CCIR_RES_CHG, {as before}, 1) = 1\n"
                               "expect call fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, {fgHdmiOutEnable=1, ...}, 1) = 1\n"
                               "PMX_SetHdmiDeepColor 0 1\n";

@@ -458,6 +458,19 @@ class Interrupts(Directory):
             if number not in (signal.SIGKILL, signal.SIGSEGV):  # what a checked build says of the latter is its own
                 self.assertEqual(f"pmxboard: what was written until then is in {self.place / left[0]}\n", said)
 
+    def test_the_record_of_a_shell_that_somebody_ends_is_kept(self):
+        process = subprocess.Popen([PROGRAM, "shell"], stdin=subprocess.PIPE, stdout=subprocess.PIPE,
+                                   stderr=subprocess.PIPE, cwd=self.place)
+        process.stdin.write(b"record kept\nPMX_Init\nPMX_SetTvType 0 0\n")
+        process.stdin.flush()
+        while b"PMX_SetTvType" not in process.stdout.readline():
+            pass
+        process.send_signal(signal.SIGTERM)
+        _, said = process.communicate(timeout=PATIENCE)
+        left, = self.place.glob("kept*")
+        self.assertEqual(f"pmxboard: what was written until then is in {left.name}\n", said.decode())
+        self.assertEqual("PMX_Init\n", left.read_text()[:9])
+
     def test_the_trace_of_what_cannot_be_read_on_is_kept(self):
         lines = self.write("long.pmx", b"PMX_Init\n" + b"x" * (2 << 20))
         for form in ("text", "jsonl", "chrome"):

@@ -103,7 +103,7 @@ constexpr std::string_view looking_at_waiting =
 
 constexpr std::string_view about_break =
     "break FUNCTION stops the layer at the end of each call of a platform function, where lines are carried out until "
-    "continue. break off forgets all such functions, break lists them. At the prompt and in its pipe alone.";
+    "continue. break off forgets all such functions, break lists them. In the shell alone; a scenario has meanwhile.";
 
 constexpr std::string_view about_record =
     "record FILE keeps the lines that are carried out from here on, with what operations answered, as a scenario; "

@@ -4,18 +4,20 @@
 
 import os
 import pathlib
+import re
 import resource
 import signal
 import stat
 import subprocess
 import sys
 import tempfile
-import time
 import unittest
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 MODULES = ROOT / "cmake"
 WRITE = "import sys; sys.dont_write_bytecode = True; import whole_file; whole_file.write(sys.argv[1], {})"
+# As far as one line tells.
+WRITING = re.compile(r"""\.write_(?:text|bytes)\(|\bopen\((?:[^()]|\([^()]*\))*["'][wax]b?\+?["']""")
 
 
 class WholeFile(unittest.TestCase):
@@ -26,9 +28,9 @@ class WholeFile(unittest.TestCase):
         self.file = self.place / "file"
         self.file.write_text("before")
 
-    def start(self, text, path=None, **options):
-        return subprocess.Popen([sys.executable, "-c", WRITE.format(text), path or self.file], stderr=subprocess.PIPE,
-                                env={**os.environ, "PYTHONPATH": str(MODULES)}, **options)
+    def start(self, text, path=None, before="", **options):
+        return subprocess.Popen([sys.executable, "-c", before + WRITE.format(text), path or self.file],
+                                stderr=subprocess.PIPE, env={**os.environ, "PYTHONPATH": str(MODULES)}, **options)
 
     def is_alone(self):
         self.assertEqual([self.file], [path for path in self.place.iterdir() if path.name.startswith((".", "file"))])
@@ -57,21 +59,36 @@ class WholeFile(unittest.TestCase):
         self.assertEqual((1, "before"), (failed.returncode, self.file.read_text()))
         self.is_alone()
 
-    def test_killed_at_any_moment_it_is_whole(self):
-        for number in range(6):
-            writer = self.start("'x' * 5_000_000")
-            time.sleep(0.02 * number)
+    def test_killed_when_all_is_written_it_is_as_it_was(self):
+        for last in ("fsync", "replace"):  # what is still to come
+            stopping = f"import os; os.{last} = lambda *_: os.kill(os.getpid(), {int(signal.SIGSTOP)}); "
+            writer = self.start("'x' * 5_000_000", before=stopping)
+            self.addCleanup(writer.kill)
+            _, status = os.waitpid(writer.pid, os.WUNTRACED)
+            self.assertTrue(os.WIFSTOPPED(status), f"{last} is not called")
+            beside, = (path for path in self.place.iterdir() if path != self.file)
+            self.assertEqual((5_000_000, "before"), (beside.stat().st_size, self.file.read_text()), last)
             writer.kill()
             writer.communicate()
-            self.assertIn(self.file.read_text(), ("before", "x" * 5_000_000))
+            self.assertEqual("before", self.file.read_text(), last)
+            beside.unlink()
 
     def test_whoever_renews_a_file_writes_it_so(self):
         listed = subprocess.run(["git", "-C", ROOT, "ls-files", "*.py"], capture_output=True, text=True, check=True)
-        renewing = [name for name in listed.stdout.split() if not name.endswith("_test.py")
-                    and any(word in (ROOT / name).read_text(encoding="utf-8") for word in ("--fix", "--renew"))]
+        sources = {name: (ROOT / name).read_text(encoding="utf-8") for name in listed.stdout.split()
+                   if not name.endswith("_test.py")}
+        renewing = {name: source for name, source in sources.items()
+                    if any(word in source for word in ("--fix", "--renew"))}
         self.assertLess(5, len(renewing))
-        for name in renewing:
-            self.assertNotIn(".write_text(", (ROOT / name).read_text(encoding="utf-8"), name)
+        for name, source in renewing.items():
+            self.assertIsNone(WRITING.search(source), name)
+
+    def test_what_writes_is_found(self):
+        for line in ("path.write_text(text)", "path.write_bytes(b'')", "open(path, 'w')", 'path.open("wb")',
+                     'open(path(1), mode="w", encoding="utf-8")'):
+            self.assertTrue(WRITING.search(line), line)
+        for line in ("open(path)", 'open(path, "rb")', "whole_file.write(path, text)", 'open(path).read(), "w"'):
+            self.assertFalse(WRITING.search(line), line)
 
 
 if __name__ == "__main__":

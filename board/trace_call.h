@@ -15,6 +15,7 @@
 #include <cstdarg>
 #include <cstddef>
 #include <cstdint>
+#include <exception>
 #include <functional>
 #include <optional>
 #include <string>
@@ -225,6 +226,8 @@ public:
 protected:
     void set_result(std::int64_t result, bool faulted);
     void leave_outputs_alone() { m_outputs_unchanged = true; }
+    /** An exception leaves the call. */
+    bool is_broken_off() const { return std::uncaught_exceptions() > m_exceptions; }
 
 private:
     void write_outputs();
@@ -235,6 +238,7 @@ private:
     std::uint64_t m_power_on;
     std::optional<std::int64_t> m_fault;
     std::string_view m_by_before; ///< who stored before the call
+    int m_exceptions = std::uncaught_exceptions();
     bool m_outputs_unchanged = false;
 };
 
@@ -250,6 +254,14 @@ class Call : public CallRecord
 {
 public:
     using CallRecord::CallRecord;
+    Call(const Call&) = delete;
+    Call& operator=(const Call&) = delete;
+    /** What BOARD_CALL_END answers is in the trace, too. */
+    ~Call()
+    {
+        if (is_broken_off())
+            contained([this] { fail(failed_answer<Result>()); });
+    }
 
     /** Record the result and hand it back. */
     Result answer(Result result)

@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <new>
+#include <stdexcept>
 #include <string>
 
 #include "board/board.h"
@@ -89,6 +90,18 @@ TEST_F(Contained, CallThatCannotEnd_HasItsAnswer)
     EXPECT_EQ(OSR_OK, x_timer_create(&timer));
     EXPECT_NE(0u, timer);
     EXPECT_EQ("std::bad_alloc", kept());
+}
+
+TEST_F(Contained, CallThatBreaksOff_HasItsAnswerInTheTrace)
+{
+    board::set_console([](std::string_view) { throw std::runtime_error("no paper"); }); // for a misuse
+    EXPECT_EQ(-1, x_timer_create(nullptr));
+    EXPECT_EQ(-1, x_sema_create(nullptr, X_SEMA_TYPE_MUTEX, 1));
+    const auto& entries = board::trace::entries();
+    ASSERT_EQ(2u, entries.size());
+    EXPECT_EQ("x_timer_create(null) = -1", entries[0].brief());
+    EXPECT_EQ("x_sema_create(null, X_SEMA_TYPE_MUTEX, 1) = -1", entries[1].brief());
+    EXPECT_EQ("x_timer_create could not do its work: no paper", kept());
 }
 
 TEST_F(Contained, FailedCall_LeavesTheNestingAsItWas)

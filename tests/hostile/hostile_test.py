@@ -428,9 +428,9 @@ class Interrupts(Directory):
             for left in self.left_behind():
                 (self.place / left).unlink()
 
-    def ended_while_it_traces(self, number):
+    def ended_while_it_traces(self, number, name="trace"):
         """What it said, and the trace that stays behind, if any; the file that it was for is as it was."""
-        kept = self.write("trace", b"before")
+        kept = self.write(name, b"before")
         process = subprocess.Popen([PROGRAM, "run", "--trace-file", kept, "-"], stdin=subprocess.PIPE,
                                    stdout=subprocess.PIPE, stderr=subprocess.PIPE, cwd=self.place)
         process.stdin.write(b"PMX_Init\nPMX_SetTvType 0 0\n")
@@ -440,12 +440,12 @@ class Interrupts(Directory):
         process.send_signal(number)
         _, said = process.communicate(timeout=PATIENCE)
         self.assertNotEqual(0, process.returncode)
-        self.assertEqual((b"before", []), (kept.read_bytes(), self.left_behind()))
-        left = list(self.place.glob("trace.unfinished-*"))
+        left = list(self.place.glob("*.unfinished-*"))
         content = "".join(path.read_text() for path in left)
         for path in left:
             path.unlink()
-        return said.decode(), [path.name for path in left], content
+        self.assertEqual((b"before", []), (kept.read_bytes(), self.left_behind()))
+        return os.fsdecode(said), [path.name for path in left], content
 
     def test_interrupted_while_it_traces(self):
         self.assertEqual(("", [], ""), self.ended_while_it_traces(signal.SIGINT))
@@ -470,6 +470,13 @@ class Interrupts(Directory):
         left, = self.place.glob("kept*")
         self.assertEqual(f"pmxboard: what was written until then is in {left.name}\n", said.decode())
         self.assertEqual("PMX_Init\n", left.read_text()[:9])
+
+    def test_the_name_of_a_trace_that_is_kept_is_fit_for_a_terminal(self):
+        for name, shown in (("\u2013 \u0441 \u4e00", "\u2013 \u0441 \u4e00"), ("a\u009bb\tc", "a?b?c"),
+                            (os.fsdecode(b"a\x9b\xe2b"), "a?\udce2b")):
+            said, left, _ = self.ended_while_it_traces(signal.SIGTERM, name)
+            self.assertEqual(1, len(left), name)
+            self.assertIn(f"/{shown}.unfinished-", said)
 
     def test_the_trace_of_what_cannot_be_read_on_is_kept(self):
         lines = self.write("long.pmx", b"PMX_Init\n" + b"x" * (2 << 20))

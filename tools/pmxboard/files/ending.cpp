@@ -42,17 +42,29 @@ void say(const char* text)
     [[maybe_unused]] const ssize_t ignored = write(STDERR_FILENO, text, std::strlen(text));
 }
 
+/** How many bytes belong to a character of UTF-8 behind its first one. */
+unsigned bytes_behind(unsigned char first)
+{
+    return first < 0xC2 || first > 0xF4 ? 0 : first >= 0xF0 ? 3 : first >= 0xE0 ? 2 : 1;
+}
+
 /** What somebody else has written, without what a terminal would obey. */
 void say_foreign(const char* text)
 {
     char line[1024];
     std::size_t size = 0;
+    unsigned open = 0; // bytes that the character which has begun still lacks
     unsigned char before = 0;
     for (; *text != '\0' && size + 1 < sizeof line; ++text)
     {
         const auto byte = static_cast<unsigned char>(*text);
-        const bool is_control = byte < ' ' || byte == 0x7F || (byte >= 0x80 && byte < 0xA0 && before <= 0xC2);
-        line[size++] = is_control ? '?' : *text;
+        const bool goes_on = open > 0 && (byte & 0xC0) == 0x80;
+        const bool is_of_two = goes_on && before == 0xC2;
+        const bool is_high_control = byte >= 0x80 && byte < 0xA0 && (!goes_on || is_of_two);
+        if (is_high_control && is_of_two)
+            --size;
+        line[size++] = byte < ' ' || byte == 0x7F || is_high_control ? '?' : *text;
+        open = goes_on ? open - 1 : bytes_behind(byte);
         before = byte;
     }
     line[size] = '\0';

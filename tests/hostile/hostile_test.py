@@ -478,6 +478,16 @@ class Interrupts(Directory):
             self.assertEqual(1, len(left), name)
             self.assertIn(f"/{shown}.unfinished-", said)
 
+    def test_a_trace_may_have_the_longest_name(self):
+        longest = os.pathconf(self.place, "PC_NAME_MAX")
+        for size in (longest - 18, longest - 17, longest):
+            self.good("run", "-q", "--trace-file", self.place / ("n" * size), self.scenario)
+            self.assertIn(b"x_sema_create", (self.place / ("n" * size)).read_bytes())
+        said, left, _ = self.ended_while_it_traces(signal.SIGTERM, "\u00e9" * (longest // 2))
+        self.assertEqual(1, len(left))
+        self.assertTrue(left[0].startswith("\u00e9" * ((longest - 18) // 2) + ".unfinished-"))
+        self.assertIn(left[0], said)
+
     def test_the_trace_of_what_cannot_be_read_on_is_kept(self):
         lines = self.write("long.pmx", b"PMX_Init\n" + b"x" * (2 << 20))
         for form in ("text", "jsonl", "chrome"):

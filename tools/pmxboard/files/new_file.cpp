@@ -6,6 +6,7 @@
 #include <unistd.h>
 
 #include <cerrno>
+#include <climits>
 #include <cstdlib>
 #include <cstring>
 #include <filesystem>
@@ -18,6 +19,28 @@ namespace pmxboard
 {
 
 using board::files::FileError;
+
+namespace
+{
+
+/** Beside what it is to become, under its name. Of a name that leaves no room for more, the end is left out. */
+std::string unfinished_beside(const std::filesystem::path& target, const std::string& directory)
+{
+    constexpr std::string_view ending = ".unfinished-XXXXXX";
+    std::string name = target.filename().string();
+    const long limit = pathconf(directory.c_str(), _PC_NAME_MAX);
+    const std::size_t longest = limit < 0 ? NAME_MAX : static_cast<std::size_t>(limit);
+    if (name.size() <= longest && name.size() + ending.size() > longest)
+    {
+        std::size_t size = longest - ending.size();
+        while (size > 0 && (static_cast<unsigned char>(name[size]) & 0xC0) == 0x80) // in the middle of a character
+            --size;
+        name.resize(size);
+    }
+    return std::filesystem::path(target).replace_filename(name.append(ending)).string();
+}
+
+} // namespace
 
 /** Writes to a file and remembers the first failure. */
 class NewFile::Buffer : public std::streambuf
@@ -135,11 +158,10 @@ void NewFile::create_beside(Unfinished unfinished)
     const std::filesystem::path given(m_name);
     // A link to nothing yet, or a plain name.
     m_target = std::filesystem::is_symlink(given, error) ? real.string() : m_name;
-    const std::filesystem::path directory = std::filesystem::path(m_target).parent_path();
-    std::string temporary = (directory.empty() ? "." : directory.string()) + "/.pmxboard-XXXXXX";
+    const std::filesystem::path parent = std::filesystem::path(m_target).parent_path();
+    const std::string directory = parent.empty() ? "." : parent.string();
     const bool is_kept = unfinished == Unfinished::Kept;
-    if (is_kept)
-        temporary = m_target + ".unfinished-XXXXXX";
+    std::string temporary = is_kept ? unfinished_beside(m_target, directory) : directory + "/.pmxboard-XXXXXX";
     const int file = mkostemp(temporary.data(), O_CLOEXEC);
     if (file < 0)
         failed(errno);

@@ -24,6 +24,7 @@ import tempfile
 import threading
 import time
 import unittest
+import xml.etree.ElementTree
 
 sys.path.insert(0, str(pathlib.Path(__file__).parent))
 
@@ -388,6 +389,15 @@ class Outputs(Directory):
             self.check(ended, name, codes=(2,))
             self.assertIn(b"this run reads it", ended.stderr)
             self.assertEqual(size, program.stat().st_size)
+
+    def test_verdicts_are_xml_whatever_they_quote(self):
+        verdicts = self.place / "verdicts.xml"
+        for odd in ("\ufffe", "\uffff", "\U0001ffff", "\x01", "\x1b[m", "\u0085", "]]>", "<&\"'>",
+                    os.fsdecode(b"\xff\xed\xa0\x80")):
+            scenario = self.write(f"odd{odd}", os.fsencode(f"{odd}\n"))
+            self.check(self.run_tool("run", "-q", "-k", "--junit", verdicts, scenario), odd, codes=(1,))
+            failure, = xml.etree.ElementTree.parse(verdicts).getroot().iter("failure")
+            self.assertIn(":1: ", failure.text)
 
     def test_a_replaced_file_keeps_what_is_its_own(self):
         kept, link = self.write("kept", b"before"), self.place / "link"

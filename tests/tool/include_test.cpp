@@ -191,6 +191,13 @@ TEST(Junit, WhatAFailureQuotes_IsEscaped)
     EXPECT_NE(std::string::npos, xml.find("message=\"x &lt; 1\\x01\">x &lt; 1\\x01\n</failure>")) << xml;
 }
 
+TEST(Junit, WhatIsNoCharacter_IsWrittenOut)
+{
+    const std::string xml = pmxboard::to_junit({ { "a\uFFFE", { "b\uFFFF\uFFFD" } } });
+    EXPECT_NE(std::string::npos, xml.find("name=\"a\\xEF\\xBF\\xBE\"")) << xml;
+    EXPECT_NE(std::string::npos, xml.find("message=\"b\\xEF\\xBF\\xBF\uFFFD\"")) << xml;
+}
+
 TEST(ExpectTimes, ExactAndAbout)
 {
     const std::string lines = "PMX_Init\nPMX_SetFormatChangeTimer 10000\nadvance 12s\n"

@@ -35,12 +35,12 @@ Character first_character(std::string_view bytes)
     return overlong || surrogate || code > 0x10FFFF ? Character{} : Character{ code, length };
 }
 
-/** Characters that a terminal acts on, or that nobody sees. */
+/** Characters that a terminal acts on, that nobody sees, or that are none, which XML does not take. */
 bool is_control(char32_t code)
 {
     return code < 0x20 || (code >= 0x7F && code < 0xA0) || code == 0xAD || (code >= 0x200B && code <= 0x200F) ||
            (code >= 0x2028 && code <= 0x202E) || (code >= 0x2060 && code <= 0x206F) || code == 0xFEFF ||
-           (code >= 0xFFF0 && code <= 0xFFFB) || (code >= 0xE0000 && code <= 0xE0FFF);
+           (code >= 0xFFF0 && code <= 0xFFFB) || (code & 0xFFFE) == 0xFFFE || (code >= 0xE0000 && code <= 0xE0FFF);
 }
 
 /** East Asian characters and pictures take two columns. */

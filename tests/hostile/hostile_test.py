@@ -122,7 +122,8 @@ class Directory(unittest.TestCase):
             self.assertTrue(ended.stderr.strip(), f"{what}: nothing is said")
 
     def left_behind(self):
-        return [path.name for path in self.place.iterdir() if path.name.startswith(".pmxboard")]
+        return [path.name for path in self.place.iterdir()
+                if path.name.startswith(".pmxboard") or ".unfinished-" in path.name]
 
 
 class Inputs(Directory):

@@ -121,7 +121,8 @@ def shell_lines(tool):
         for begin in range(0, len(lines), 4):
             yield f"{path.stem}-{begin}", b"\n".join(lines[begin:begin + 4])
     for number, word in enumerate(tool.lines("complete", "")):
-        yield f"word-{number}", f"{word}\nhelp {word}\n{word} ".encode()
+        # Small letters complete, too.
+        yield f"word-{number}", f"{word[:-1].lower()}\n{word}\nhelp {word}\n{word} ".encode()
 
 
 def quoted(entry):

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 // Any text is what somebody types at the prompt: lines are taken apart, completed, explained and kept, not carried out.
 #include <algorithm>
+#include <cctype>
 #include <cstddef>
 #include <cstdint>
 #include <string>
@@ -23,13 +24,19 @@ using namespace pmxboard;
 constexpr std::size_t most_lines = 4;
 constexpr std::size_t most_words = 8;
 
+bool begins_in_any_case(std::string_view candidate, std::string_view replaced)
+{
+    const auto same = [](unsigned char one, unsigned char other) { return std::tolower(one) == std::tolower(other); };
+    return candidate.size() >= replaced.size() && std::equal(replaced.begin(), replaced.end(), candidate.begin(), same);
+}
+
 void complete_at(std::string_view line, std::size_t cursor)
 {
     const Completion found = complete(line, cursor, { fuzz::place(), { "help", "quit", "exit" } });
     fuzz::must(found.begin <= cursor, "what is replaced stands before the cursor");
     const std::string_view replaced = line.substr(found.begin, cursor - found.begin);
     for (const std::string& candidate : found.candidates)
-        fuzz::must(candidate.starts_with(replaced), "a candidate begins with what it replaces");
+        fuzz::must(begins_in_any_case(candidate, replaced), "a candidate begins with what it replaces, in any case");
     const std::string common = found.common();
     for (const std::string& candidate : found.candidates)
         fuzz::must(candidate.starts_with(common), "a candidate begins with what is common to all");

@@ -59,6 +59,12 @@ bool leads_out(std::string_view line)
     return has(line, "..") || has(line, "\\") || has(line, " /") || has(line, "\t/") || has(line, "\"/");
 }
 
+/** Lines that are included would not have come through here. */
+bool includes(std::string_view line)
+{
+    return has(line, "include");
+}
+
 } // namespace
 
 std::string harmless(std::string_view bytes)
@@ -70,7 +76,8 @@ std::string harmless(std::string_view bytes)
         const std::string_view line = bytes.substr(0, bytes.find('\n'));
         bytes.remove_prefix(std::min(line.size() + 1, bytes.size()));
         const bool is_copy = has(line, "what-if");
-        if (has(line, "save") || leads_out(line) || takes_long(line) || (is_copy && ++copies > most_copies))
+        if (has(line, "save") || includes(line) || leads_out(line) || takes_long(line) ||
+            (is_copy && ++copies > most_copies))
             continue;
         kept.append(line).append(1, '\n');
     }

@@ -14,6 +14,7 @@
 #include "tools/pmxboard/state/dump.h"
 #include "tools/pmxboard/state/now.h"
 #include "tools/pmxboard/state/paths.h"
+#include "tools/pmxboard/state/status.h"
 
 namespace
 {
@@ -30,8 +31,18 @@ catch (const DumpError&)
     return {};
 }
 
+void tell_status(const StateDump& dump)
+{
+    const Status status = status_of(dump.state, dump.board);
+    for (const StatusPart part : { StatusPart::All, StatusPart::Outputs, StatusPart::Planes, StatusPart::Graphics })
+        fuzz::must_be_fit(to_text(status, part, {}));
+    fuzz::must_be_json(to_json(status));
+    fuzz::must_be_json(to_json_line(status));
+}
+
 void look_at(const StateDump& dump)
 {
+    tell_status(dump);
     fuzz::must_be_fit(to_text(NamedValues{ { "", dump.state } }));
     const std::string written = to_json(dump);
     const std::optional<StateDump> again = read(written);

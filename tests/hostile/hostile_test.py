@@ -141,6 +141,7 @@ class Inputs(Directory):
         yield "state", ("state", file), b""
         yield "state -", ("state", "--json", "-"), content
         yield "state two", ("state", self.state, file, ), b""
+        yield "status", ("status", file), b""
         yield "decode", ("decode", "-v", file), b""
         if len(content) < HUGE:  # the same reader
             yield "decode json", ("decode", "--json", "-"), content
@@ -149,6 +150,7 @@ class Inputs(Directory):
         yield "board", ("run", "--board", toml, self.scenario), b""
         yield "power-on", ("run", "-"), f"power-on {toml}\nPMX_Init\n".encode()
         yield "image", ("run", "-"), image
+        yield "include", ("run", "-"), f"include {file}\n".encode()
 
     def try_all(self, found, ways=None):
         """Each in one of the ways, or in all that there are."""
@@ -163,22 +165,22 @@ class Inputs(Directory):
 
     def test_nesting_without_end(self):
         self.try_all(contents.brackets(), ("run", "state", "board", "decode", "against"))
-        self.try_all(contents.brackets(), ("state -", "shell", "power-on"))
+        self.try_all(contents.brackets(), ("state -", "shell", "power-on", "include", "status"))
 
     def test_lines_of_scenarios(self):
-        self.try_all(contents.scenario_lines(), ("run", "shell", "against"))
+        self.try_all(contents.scenario_lines(), ("run", "shell", "against", "include"))
 
     def test_saved_states(self):
         found = contents.states(self.state.read_bytes())
         self.assertNotIn(self.state.read_bytes(), found.values(), "as it was")
-        self.try_all(found, ("state", "state -", "state two"))
+        self.try_all(found, ("state", "state -", "state two", "status"))
 
     def test_board_files(self):
         self.try_all(contents.boards(), ("board", "power-on"))
 
     def test_right_but_for_a_few_bytes(self):
         lines = pathlib.Path("scenarios/picture-in-picture.pmx").read_bytes()
-        for good, ways in ((lines, ("run", "shell")), (self.state.read_bytes(), ("state", "state two")),
+        for good, ways in ((lines, ("run", "shell")), (self.state.read_bytes(), ("state", "state two", "status")),
                            (self.board.read_bytes(), ("board",)),
                            (self.log.read_bytes(), ("decode", "against hostile"))):
             self.try_all(contents.mutations(good, 40 * ROUNDS, len(good)), ways)
@@ -194,12 +196,12 @@ class Inputs(Directory):
         self.addCleanup(closed.chmod, stat.S_IRWXU)
         for name in ("missing", "directory", loop, loop / "board.toml", LONGEST_NAME, LONGEST_NAME + "/x", "",
                      closed / "board.toml", "/proc/self/mem", "/dev/zero", "\x1b[31m\n", "a" * 5_000):
-            for arguments in (("run", "-q", name), ("state", name), ("state", self.state, f"{name}/"),
+            for arguments in (("run", "-q", name), ("state", name), ("state", self.state, f"{name}/"), ("status", name),
                               ("decode", name), ("decode", self.log, "--against", name),
                               ("run", "--board", name, self.scenario), ("shell", "--board", name)):
                 if name == "" and {"--board", "--against"} & set(arguments):
                     continue  # as if nothing was said
-                if name == "/dev/zero" and "--board" not in arguments and "state" not in arguments:
+                if name == "/dev/zero" and "--board" not in arguments and not {"state", "status"} & set(arguments):
                     continue  # a quarter of a gigabyte, which takes its time
                 self.check(self.run_as_nobody(*arguments), f"{name!r}: {arguments[0]}", codes=(2,))
 
@@ -296,8 +298,9 @@ class Outputs(Directory):
                     ("modes", "--json"), ("guide",), ("complete", "PMX_"), ("run", self.scenario),
                     ("run", "--trace-format", "jsonl", self.scenario),
                     ("run", "--trace-format", "chrome", self.scenario), ("state", self.state),
-                    ("state", "--json", self.state), ("shell",), ("decode", self.log), ("decode", "--json", self.log),
-                    ("decode", "--texts"), ("decode", self.log, "--against", self.scenario))
+                    ("state", "--json", self.state), ("status", self.state), ("status", "--json", self.state),
+                    ("shell",), ("decode", self.log), ("decode", "--json", self.log), ("decode", "--texts"),
+                    ("decode", self.log, "--against", self.scenario))
 
     def run_into(self, arguments, output, **options):
         return subprocess.run([PROGRAM, *map(str, arguments)], input=b"PMX_Init\n", stdout=output,
@@ -331,6 +334,9 @@ class Outputs(Directory):
             yield ("run", "--trace-format", form, "--trace-file", name, self.scenario), b"", 2
         yield ("run", "-"), save, 1
         yield ("shell",), save, 1
+        # What is more than the limit of the full disk.
+        yield ("shell",), f"record {name}\n".encode() + b"PMX_GetMode 0\n" * 40, 1
+        yield ("run", "-q", "--junit", name, *[self.scenario] * 10), b"", 2
 
     def test_a_full_disk(self):
         kept = self.place / "kept"

@@ -71,6 +71,7 @@ TEST(Completion, OutputsInShort)
     EXPECT_THAT(candidates("outputs hdmi=720p"), ElementsAre("720p60", "720p50"));
     EXPECT_EQ(13u, complete("outputs hdmi=720P", 17).begin);
     EXPECT_THAT(candidates("outputs hdmi=off cvbs=48"), Contains("480i"));
+    EXPECT_THAT(candidates("meanwhile TVE_SetEnable request c"), ElementsAre("component", "composite", "cvbs"));
 }
 
 TEST(Completion, Arguments_ByTheirFamily)

@@ -80,13 +80,11 @@ void set_outputs(Session& session, const Words& words)
 
 std::size_t output_called(const std::string& name)
 {
-    static constexpr std::array<std::string_view, 5> names = { "digital", "hdmi", "component", "composite", "cvbs" };
-    for (std::size_t output = 0; output < names.size(); ++output)
-    {
-        if (names[output] == name)
-            return std::min<std::size_t>(output, 3);
-    }
-    throw LineError("there is no output " + name + did_you_mean(name, { names.begin(), names.end() }));
+    const auto found = std::find(output_words.begin(), output_words.end(), name);
+    if (found == output_words.end())
+        throw LineError("there is no output " + name +
+                        did_you_mean(name, { output_words.begin(), output_words.end() }));
+    return std::min(static_cast<std::size_t>(found - output_words.begin()), output_words.size() - 2);
 }
 
 std::vector<Verb> output_verbs()

@@ -4,6 +4,7 @@
  *  means, and what it does. Usage, completion, help and the guide's tables come from there. */
 #pragma once
 
+#include <array>
 #include <chrono>
 #include <cstdint>
 #include <optional>
@@ -75,6 +76,8 @@ std::chrono::microseconds read_time(const std::string& word);
 /** `1920x1080`: width and height; nothing when it is something else. */
 std::optional<std::pair<std::int32_t, std::int32_t>> read_size(std::string_view word);
 
+/** What outputs are called, by index; the last name is another one of the last output. */
+inline constexpr std::array<std::string_view, 5> output_words = { "digital", "hdmi", "component", "composite", "cvbs" };
 /** The index of an output: `digital`, `hdmi`, `component`, or `composite`, which is also `cvbs`. Throws LineError. */
 std::size_t output_called(const std::string& name);
 

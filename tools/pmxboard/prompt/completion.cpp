@@ -200,21 +200,19 @@ constexpr Filling fillings[] = {
     { "NAME", [](Part& part, const auto&, const auto&) { add(part, source_names("")); } },
     { "VDP", [](Part& part, const auto&, const auto&) { add(part, source_names("vdp")); } },
     { "OSD", [](Part& part, const auto&, const auto&) { add(part, source_names("osd")); } },
-    { "OUTPUT",
-      [](Part& part, const auto&, const auto&) {
-          add(part, std::vector<std::string>{ "digital", "hdmi", "component", "composite" });
-      } },
+    { "OUTPUT", [](Part& part, const auto&, const auto&) { add(part, output_words); } },
     { "SETTING",
       [](Part& part, const auto& words, const auto&) {
           const std::size_t equals = words.back().find('=');
           if (equals == std::string::npos)
-              add(part, std::vector<std::string>{ "digital=", "hdmi=", "component=", "composite=", "cvbs=" });
-          else
           {
-              part.begin = equals + 1;
-              part.candidates.emplace_back("off");
-              add(part, short_mode_names());
+              for (const std::string_view output : output_words)
+                  part.candidates.push_back(std::string(output) + "=");
+              return;
           }
+          part.begin = equals + 1;
+          part.candidates.emplace_back("off");
+          add(part, short_mode_names());
       } },
     { "ARGUMENT",
       [](Part& part, const auto& words, const auto&) {

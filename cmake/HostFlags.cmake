@@ -51,7 +51,7 @@ set(PMX_PRECOMPILED
     <algorithm> <chrono> <filesystem> <fstream> <functional> <iostream> <map> <memory> <optional> <span> <sstream>
     <stdexcept> <string> <string_view> <utility> <vector>)
 
-# Sources that are compiled together, so that the headers that all of them include are read once: a quarter of the work.
+# Sources that are compiled together, so that the headers that all of them include are read once.
 # Two sources of a library must not give the same name to two things, then, wherever they stand.
 set(PMX_BATCH 8 CACHE STRING "Sources of board, tool and tests that are compiled together; 1: each alone")
 

@@ -32,6 +32,7 @@ static void vLogConflict(const UINT8* pu1PlnSel)
         {
             if (pu1PlnSel[i] == pu1PlnSel[j])
             {
+                PMX_NOTE(SOURCE_TWICE, pu1PlnSel[i], i << 4 | j);
                 PMX_IsLog(9, "Plane[%d] and Plane[%d] connect to the same input source!\n", i, j);
                 return;
             }
@@ -81,7 +82,7 @@ UINT32 PMX_SetArbPlaneOrder(UCHAR ucPmxId, UINT32 u4PlaneOrder)
     prConf->u4PlaneOrder = u4PlaneOrder; // stays if the hardware refuses: the next read-back warns of the difference
     memset(i4PlnDelay, 0, sizeof i4PlnDelay);
     if (PMX_HalSetPlaneOrder(ucPmxId, u1PlnSel, i4PlnDelay) != 0)
-        return 0;
+        return PMX_WHY(ORDER_REFUSED, 0);
 
     vCompensate(pu1Nominal, i4PlnDelay);
     return 1;
@@ -95,7 +96,7 @@ UINT32 PMX_GetArbPlaneOrder(UCHAR ucPmxId, UINT32* pu4PlaneOrder)
     memset(u1PlnSel, 0, sizeof u1PlnSel);
     PMX_IsLog(9, "[PMX%d] Start to Get PlaneOrder.\n", ucPmxId);
     if (PMX_HalGetPlaneOrder(ucPmxId, u1PlnSel) != 0)
-        return 0;
+        return PMX_WHY(ORDER_UNREAD, 0);
 
     UINT32 u4Hardware = 0;
     for (UINT32 k = 0; k < PMX_PLANE_NUM; k++)

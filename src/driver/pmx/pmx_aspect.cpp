@@ -19,7 +19,7 @@ static BOOL fgSignalHdmi(UINT32 u4AspectRatio)
 static UINT32 u4ApplyNormal(UINT32 u4AspectRatio, const CHAR* szDone)
 {
     if (fgSignalHdmi(u4AspectRatio) == FALSE)
-        return 0;
+        return PMX_WHY(HDMI_REFUSED, 0, PMX_CHG_HDMI_VIDEO_ASPECT_RATIO, u4AspectRatio);
 
     VDP_GlobalOutputChange();
     PMX_IS_LOG_TEXT(9, szDone);
@@ -29,7 +29,7 @@ static UINT32 u4ApplyNormal(UINT32 u4AspectRatio, const CHAR* szDone)
 UINT32 PMX_SetAspectRatio(UCHAR ucPmxId, UINT32 u4AspectRatio)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     PMX_IsLog(9, "PMX_ID(%d), Aspect Ratio(%d)\n", ucPmxId, (INT32)u4AspectRatio);
     prPmxConf()->u4AspectRatio = u4AspectRatio; // before HDMI is asked: a refusal leaves it new
@@ -39,7 +39,7 @@ UINT32 PMX_SetAspectRatio(UCHAR ucPmxId, UINT32 u4AspectRatio)
 UINT32 PMX_SetAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgApplyOnNext)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     PMX_CONF_T* prConf = prPmxConf();
     PMX_IsLog(9, "[EX] PMX_ID(%d), Aspect Ratio(%d), Apply On Next(%d)\n", ucPmxId, (INT32)u4AspectRatio,
@@ -62,12 +62,12 @@ UINT32 PMX_SetAspectRatioNext(UCHAR ucPmxId)
 {
     PMX_CONF_T* prConf = prPmxConf();
     if (prConf->fgAspNext == FALSE)
-        return prConf->u4AspectRatio;
+        return PMX_WHY(NOTHING_WAITS, prConf->u4AspectRatio, prConf->u4AspectRatio);
 
     prConf->fgAspNext = FALSE;
     prConf->u4AspectRatio = prConf->u4AspNext;
     if (ucPmxId == 0 && fgSignalHdmi(prConf->u4AspectRatio) == FALSE)
-        return 0;
+        return PMX_WHY(HDMI_REFUSED, 0, PMX_CHG_HDMI_VIDEO_ASPECT_RATIO, prConf->u4AspectRatio);
 
     VDP_GlobalOutputChange();
     return prConf->u4AspectRatio;
@@ -118,7 +118,7 @@ static const SIGNALLING_T* prSignallingOf(UINT32 u4AspectRatio)
 UINT32 PMX_SetDigestAspectRatioEx(UCHAR ucPmxId, UINT32 u4AspectRatio, BOOL fgDigestEnable)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     PMX_CONF_T* prConf = prPmxConf();
     PMX_IsLog(0, "[EX] PMX_ID(%d), Digest Aspect Ratio(%d), Digest mode enable(%d)\n", ucPmxId, (INT32)u4AspectRatio,

@@ -59,7 +59,7 @@ void vSetPLLGP_HDMIDDS(BYTE bResIndex)
 UINT32 PMX_SetTvType(UCHAR ucPmxId, UCHAR ucTvType)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     prPmxConf()->ucTvType = ucTvType;
     PMX_HalSetTvType(ucPmxId, ucTvType);

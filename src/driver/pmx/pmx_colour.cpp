@@ -35,11 +35,15 @@ void PMX_ColorSpaceSetup(DRV_PMX_COLOR_SPACE_T eMixerOutCS, UCHAR ucOutputMode)
 
     UINT8 u1Colour = prPmxModeRow(ucOutputMode)->u1Colour;
     if (u1Colour == PMX_COLOUR_NONE) // the converters keep what they were set to
+    {
+        PMX_NOTE(NO_STANDARD, ucOutputMode);
         return;
+    }
 
     // The mixer is never set up for RGB, although the enumeration has it.
     if (eMixerOutCS > DRV_PMX_CS_YCBCR_709)
     {
+        PMX_NOTE(COLOUR_SPACE, eMixerOutCS);
         PMX_IsLog(5, "Invalid Color Space Id\n");
         Assert("0", __FILE__, __LINE__);
         return;

@@ -10,7 +10,10 @@
 void PMX_Printf(INT32 level, const char* format_string, ...)
 {
     if (level < 0 || level > 31 || (PMX_debug_level & (1u << level)) == 0)
+    {
+        PMX_NOTE(PRINT_LEVEL, level, PMX_debug_level);
         return;
+    }
 
     CHAR szBuffer[PRINT_BUFFER_SIZE];
     va_list rArgs;

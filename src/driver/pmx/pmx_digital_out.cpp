@@ -23,12 +23,15 @@ void vPmxProgramDigitalOut(void)
 UINT32 PMX_SetDigitalOutEnable(UCHAR ucPmxId, UCHAR ucEnable)
 {
     if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_BIT_DIGITAL_OUT))
-        return 0;
+        return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId),
+                              PMX_WHY(FEATURE_BIT, 0, PMX_CAP_BIT_DIGITAL_OUT, prPmxConf()->u4Capability));
 
     PMX_CONF_T* prConf = prPmxConf();
     prConf->ucDigitalOut = ucEnable;
     if (prConf->ucEnable != 0)
         vPmxProgramDigitalOut();
+    else
+        PMX_NOTE(STORED_ALONE);
     return 1;
 }
 
@@ -40,21 +43,25 @@ UINT32 PMX_GetDigitalOutEnable(UCHAR ucPmxId, UCHAR* pucEnable)
 UINT32 PMX_SetDigitalOutPara(UCHAR ucPmxId, UCHAR ucDigitalBit, UCHAR ucProprietaryMode)
 {
     if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_BIT_DIGITAL_OUT))
-        return 0;
+        return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId),
+                              PMX_WHY(FEATURE_BIT, 0, PMX_CAP_BIT_DIGITAL_OUT, prPmxConf()->u4Capability));
 
     PMX_CONF_T* prConf = prPmxConf();
     prConf->ucDigitalBit = ucDigitalBit;
     prConf->ucProprietaryMode = ucProprietaryMode;
     if (prConf->ucEnable != 0)
         vPmxProgramDigitalOut();
+    else
+        PMX_NOTE(STORED_ALONE);
     return 1;
 }
 
 UINT32 PMX_SetDigitalOutPhase(UCHAR ucPmxId, UINT32 u4Phase)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
+    PMX_NOTE(CLOCK_AT_ONCE, u4Phase);
     PMX_HalSetDigitalOutPhase(0, u4Phase);
     prPmxConf()->u4Phase = (UCHAR)u4Phase; // the record keeps 8 bits, the hardware got them all
     return 1;
@@ -69,13 +76,13 @@ UINT32 PMX_SetDigitalOutDrv(UINT32 u4Drving)
 UINT32 PMX_SetDigitalOutRgb(UCHAR ucPmxId, UCHAR ucRgb)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     // Stored and programmed before it is looked at: only HDMI has no code for a value above the last.
     prPmxConf()->ucDigitalRgb = ucRgb;
     PMX_HalSetDigitalOutRgb(0, ucRgb);
     if (ucRgb >= sizeof HDMI_COLOR_MODES)
-        return 0;
+        return PMX_WHY(COLOUR_FORMAT, 0, ucRgb);
 
     UINT8 ucColorMode = HDMI_COLOR_MODES[ucRgb];
     fgPmxDrvSetAvd(PMX_CHG_HDMI_COLOR_SPACE, &ucColorMode, 1);

@@ -7,7 +7,8 @@
 UINT32 PMX_GetOutSize(UCHAR ucPmxId, UINT32* pu4Width, UINT32* pu4Height)
 {
     if (ucPmxId != 0 || pu4Width == nullptr || pu4Height == nullptr)
-        return 0;
+        return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId),
+                              PMX_WHY(NULL_POINTER, 0, pu4Width == nullptr ? 2 : 3));
 
     const PMX_MODE_ROW_T* prRow = prPmxModeRow(prPmxConf()->ucMode);
     *pu4Width = prRow->u2Width;
@@ -41,7 +42,7 @@ static bool fgIsTvSystemFreq(UINT16 u2VSyncFreq)
 UINT32 PMX_SetTVSystem(UCHAR ucPmxId, UINT16 u2VSyncFreq, BOOL fgTvSysAuto)
 {
     if (ucPmxId != 0 || !fgIsTvSystemFreq(u2VSyncFreq))
-        return 0;
+        return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId), PMX_WHY(TV_SYSTEM, 0, u2VSyncFreq));
 
     PMX_SET_TV_SYS_PARAMETER_T rTvSys;
     memset(&rTvSys, 0, sizeof rTvSys); // the driver gets every byte, the one without a name too
@@ -55,14 +56,14 @@ UINT32 PMX_ChkSupportedRes(UCHAR ucPmxId, UCHAR ucChkRes, UINT16 u2VSyncFreq, UC
                            UINT16* ucSupportedAutoVsyncFreg)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T rValid;
     memset(&rValid, 0, sizeof rValid); // the answers, and the bytes without a name
     rValid.u4ResCheck = ucChkRes;
     rValid.u2VsyncFreq = u2VSyncFreq;
     if (fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, &rValid) == FALSE)
-        return 0;
+        return PMX_WHY(NO_HDMI_ANSWER, 0, ucChkRes, u2VSyncFreq);
 
     *ucSupportedAutoRes = (UCHAR)rValid.u4ValidAutoRes;
     *ucSupportedAutoVsyncFreg = rValid.u2ValidAutoVfreq;
@@ -72,9 +73,11 @@ UINT32 PMX_ChkSupportedRes(UCHAR ucPmxId, UCHAR ucChkRes, UINT16 u2VSyncFreq, UC
 UINT32 PMX_SetHdmiDeepColor(UCHAR ucPmxId, UCHAR ucDeepColor)
 {
     if (ucPmxId != 0) // success for an unknown mixer: the one operation of this file that answers so
-        return 1;
+        return PMX_WHY(MIXER_ID, 1, ucPmxId);
 
-    return fgPmxDrvSetAvd(PMX_CHG_DEEP_COLOR_BIT, &ucDeepColor, 1) != FALSE;
+    return fgPmxDrvSetAvd(PMX_CHG_DEEP_COLOR_BIT, &ucDeepColor, 1) != FALSE
+               ? 1u
+               : PMX_WHY(HDMI_REFUSED, 0u, PMX_CHG_DEEP_COLOR_BIT, ucDeepColor);
 }
 
 void PMX_RecordUiResAuto(BOOL fgIsAuto)

@@ -24,6 +24,8 @@ UINT32 PMX_SetFormatChangeFlag(BOOL bIsFormatChange)
         PMX_SetOsdEnableFlag(TRUE);
         if (fgVdpIsWaitforSyncCtrl() == FALSE) // else the OSD planes wait for PMX_SetOsdEnable
             PMX_SetOsdEnable();
+        else
+            PMX_NOTE(AWAITS_VIDEO);
     }
     return 1;
 }
@@ -40,9 +42,14 @@ UINT32 PMX_SetOsdEnable(void)
     PMX_IsLog(0, "PMX_SetOsdEnable.\n");
     if (prPmxStatus()->fgPmxEnabeOsdFlag != FALSE)
     {
+        PMX_NOTE(MIXED_AGAIN);
         for (UCHAR ucPlane = PMX_OSD_PLANE_FIRST; ucPlane <= PMX_OSD_PLANE_LAST; ucPlane++)
             vPmxMixPlane(0, ucPlane);
         PMX_SetOsdEnableFlag(FALSE);
+    }
+    else
+    {
+        PMX_NOTE(NOTHING_OWED);
     }
     return 1;
 }
@@ -50,6 +57,7 @@ UINT32 PMX_SetOsdEnable(void)
 /* Nobody stops it when the display part answers in time: graphics that are back are then mixed once again. */
 void _PMX_TmrIsr(HANDLE_T, void*)
 {
+    PMX_NOTE(TIMED_OUT);
     PMX_IsLog(0, "PMX timeout.\n");
     prPmxStatus()->fgTimerAlreadySet = FALSE;
     PMX_SetFormatChangeFlag(FALSE);
@@ -59,11 +67,17 @@ UINT32 PMX_SetFormatChangeTimer(UINT32 u4TimeInterval)
 {
     PMX_IsLog(0, "Display Format Change Timer Set.\n");
     if (x_timer_stop(prPmxStatus()->hPMXTimer) != OSR_OK)
+    {
+        PMX_NOTE(NO_TIMER);
         Assert("x_timer_stop(_arPmxDispPartStatus.hPMXTimer) == OSR_OK", __FILE__, __LINE__);
+    }
     if (x_timer_start(prPmxStatus()->hPMXTimer, u4TimeInterval, X_TIMER_FLAG_ONCE, _PMX_TmrIsr, nullptr) != OSR_OK)
+    {
+        PMX_NOTE(NO_TIMER);
         Assert("x_timer_start(_arPmxDispPartStatus.hPMXTimer, u4TimeInterval, X_TIMER_FLAG_ONCE, _PMX_TmrIsr, NULL)"
                "==OSR_OK",
                __FILE__, __LINE__);
+    }
     return 1;
 }
 

@@ -23,7 +23,7 @@ constinit UINT32 PMX_debug_level = 0;
 UINT32 u4PmxGiveByte(UCHAR ucPmxId, UCHAR ucValue, UCHAR* pucValue)
 {
     if (ucPmxId != 0 || pucValue == nullptr)
-        return 0;
+        return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId), PMX_WHY(NULL_POINTER, 0, 2));
 
     *pucValue = ucValue;
     return 1;
@@ -32,7 +32,7 @@ UINT32 u4PmxGiveByte(UCHAR ucPmxId, UCHAR ucValue, UCHAR* pucValue)
 UINT32 u4PmxGiveWord(UCHAR ucPmxId, UINT32 u4Value, UINT32* pu4Value)
 {
     if (ucPmxId != 0 || pu4Value == nullptr)
-        return 0;
+        return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId), PMX_WHY(NULL_POINTER, 0, 2));
 
     *pu4Value = u4Value;
     return 1;
@@ -40,7 +40,8 @@ UINT32 u4PmxGiveWord(UCHAR ucPmxId, UINT32 u4Value, UINT32* pu4Value)
 
 UINT32 u4PmxGiveFeatureByte(UCHAR ucPmxId, UINT32 u4CapBit, UCHAR ucValue, UCHAR* pucValue)
 {
-    return fgPmxHasCap(u4CapBit) ? u4PmxGiveByte(ucPmxId, ucValue, pucValue) : 0;
+    return fgPmxHasCap(u4CapBit) ? u4PmxGiveByte(ucPmxId, ucValue, pucValue)
+                                 : PMX_WHY(FEATURE_BIT, 0, u4CapBit, prPmxConf()->u4Capability);
 }
 
 /* Default record */

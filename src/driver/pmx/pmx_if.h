@@ -8,6 +8,7 @@
 #include "drv_av_d.h"
 #include "drv_if_pmx.h"
 #include "drv_if_vdp.h"
+#include "pmx_why.h"
 #include "x_typedef.h"
 
 #define PMX_PORT_NUM 8  /* input ports */
@@ -190,14 +191,14 @@ static inline bool fgPmxHasCap(UINT32 u4CapBit)
 static inline UINT32 u4PmxVdpPort(UCHAR ucVdpId)
 {
     if (ucVdpId > 3)
-        return PMX_PORT_NUM;
+        return PMX_WHY(NO_PORT, PMX_PORT_NUM, PMX_COMP_TYPE_VDP, ucVdpId);
     return ucVdpId == 0 ? PMX_PORT_VDP_MAIN : PMX_PORT_VDP_SUB;
 }
 
 /* The port of an OSD plane; PMX_PORT_NUM when there is no such plane. */
 static inline UINT32 u4PmxOsdPort(UCHAR ucOsdId)
 {
-    return ucOsdId > 5 ? PMX_PORT_NUM : PMX_PORT_OSD_FIRST + ucOsdId;
+    return ucOsdId > 5 ? PMX_WHY(NO_PORT, PMX_PORT_NUM, PMX_COMP_TYPE_OSD, ucOsdId) : PMX_PORT_OSD_FIRST + ucOsdId;
 }
 
 /* The mixer id that an IPMX tag carries. */
@@ -227,8 +228,8 @@ void vPmxUnlock(void);
  * The phase is the caller's. */
 void vPmxProgramDigitalOut(void);
 
-/* Answer a getter: store the value where the caller wants it and return 1; return 0, and store nothing, for a mixer id
- * other than 0 or a null pointer. */
+/* Answer a getter: store the value where the caller wants it, who hands the pointer over as second argument, and return
+ * 1; return 0, and store nothing, for a mixer id other than 0 or a null pointer. */
 UINT32 u4PmxGiveByte(UCHAR ucPmxId, UCHAR ucValue, UCHAR* pucValue);
 UINT32 u4PmxGiveWord(UCHAR ucPmxId, UINT32 u4Value, UINT32* pu4Value);
 /* The same, but 0 as well when the capability word lacks the bit. */

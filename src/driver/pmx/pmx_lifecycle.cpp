@@ -14,7 +14,10 @@ void PMX_Init(void)
 {
     PMX_IsLog(1, "PMX_Init\n");
     if (_PmxInitiated != 0)
+    {
+        PMX_NOTE(STARTED_ALREADY);
         return;
+    }
     _PmxInitiated = 1; // before anything can fail: a second call must not create a second mutex
 
     INT32 i4Ret = x_sema_create(&MutexPMX, X_SEMA_TYPE_MUTEX, 1);
@@ -45,14 +48,20 @@ static UCHAR ucTakeBootMode(PMX_CONF_T* prConf)
     if ((u1Flags & PMX_MODE_BOOT_50) != 0)
         return PMX_TV_TYPE_PAL;
     if ((u1Flags & PMX_MODE_BOOT_60) == 0)
+    {
+        PMX_NOTE(BOOT_MODE, prConf->ucMode);
         prConf->ucMode = RES_480P;
+    }
     return PMX_TV_TYPE_NTSC;
 }
 
 void PMX_Reset(UCHAR ucPmxId)
 {
     if (ucPmxId != 0)
+    {
+        PMX_NOTE(MIXER_ID, ucPmxId);
         return;
+    }
 
     volatile PMX_DISPLAY_PART_STATUS_T* prStatus = prPmxStatus();
     prStatus->fgPmxEnabeOsdFlag = FALSE;
@@ -101,7 +110,10 @@ void PMX_Uninit(void)
 {
     PMX_IsLog(1, "PMX_Uninit\n");
     if (_PmxInitiated != 1)
+    {
+        PMX_NOTE(NOT_STARTED, _PmxInitiated);
         return;
+    }
 
     unregister_pm_ops(&pmx_pm_ops);
     vStopAndUnregister();
@@ -126,9 +138,13 @@ INT32 i4PMX_Uninit(UINT32 u4Case)
             if (x_sema_delete(MutexPMX) == OSR_OK)
                 MutexPMX = 0;
             else
-                i4Ret = -1;
+                i4Ret = PMX_WHY(MUTEX_STAYS, -1, MutexPMX);
         }
         _PmxInitiated = 0;
+    }
+    else
+    {
+        PMX_NOTE(NOT_STARTED, _PmxInitiated);
     }
     PMX_IsLog(1, "i4PMX_Uninit return %d\n", i4Ret);
     return i4Ret;
@@ -143,6 +159,10 @@ void PMX_Stop(void)
     {
         _PmxInitiated = 0;
         PMX_VsyncStop();
+    }
+    else
+    {
+        PMX_NOTE(NOT_STARTED, _PmxInitiated);
     }
 }
 
@@ -164,6 +184,7 @@ INT32 i4PmxRegisterIM(UINT16 u2CompType, UINT16 u2CompId)
 {
     void* pvTag = (void*)(size_t)u2CompId; // what the IPMX functions decode their mixer id from
     INT32 i4Ret = i4ImRegisterInterface2(u2CompType, u2CompId, IID_IPMX, &_rPMXIF, pvTag);
+    PMX_NOTE_IF(i4Ret < 0, NOT_REGISTERED, i4Ret);
     if (i4Ret < 0)
         PMX_IsLog(9, "Fail to register IID_IPMX of PMX Comp %d\n", u2CompId);
     return i4Ret;
@@ -172,6 +193,7 @@ INT32 i4PmxRegisterIM(UINT16 u2CompType, UINT16 u2CompId)
 INT32 i4PmxUnregisterIM(UINT16 u2CompType, UINT16 u2CompId)
 {
     INT32 i4Ret = i4ImUnregisterInterface2(u2CompType, u2CompId, IID_IPMX);
+    PMX_NOTE_IF(i4Ret < 0, NOT_REGISTERED, i4Ret);
     if (i4Ret < 0) // one text for both: it says register here too
         PMX_IsLog(9, "Fail to register IID_IPMX of PMX Comp %d\n", u2CompId);
     return i4Ret;
@@ -185,11 +207,11 @@ UINT32 PMX_GetCap(UCHAR ucPmxId, UINT32* pu4Cap)
 UINT32 PMX_SetEnable(UCHAR ucPmxId, UCHAR ucEnable)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     PMX_CONF_T* prConf = prPmxConf();
     if (ucEnable == prConf->ucEnable)
-        return 1;
+        return PMX_WHY(SAME_VALUE, 1, ucEnable);
 
     if (ucEnable != 0)
     {
@@ -216,6 +238,7 @@ UINT32 PMX_GetEnable(UCHAR ucPmxId, UCHAR* pucEnable)
 static bool fgInSecondPlane(UCHAR ucPmxId, UCHAR ucVdpId)
 {
     UCHAR ucSecond = fgPmxHalSwapPlane1_2(ucPmxId) != FALSE ? 0 : 1;
+    PMX_NOTE_IF(ucVdpId != ucSecond, NOT_IN_SECOND, ucVdpId, ucSecond);
     return ucVdpId == ucSecond;
 }
 

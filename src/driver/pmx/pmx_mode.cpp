@@ -13,7 +13,11 @@ UINT32 PMX_CheckCap(UCHAR, UCHAR ucMode)
 {
     UINT8 u1CapBit = prPmxModeRow(ucMode)->u1CapBit;
     if (u1CapBit >= PMX_CAP_ALWAYS)
+    {
+        PMX_NOTE_IF(u1CapBit == PMX_CAP_NEVER, MODE_NEVER, ucMode);
         return u1CapBit == PMX_CAP_ALWAYS;
+    }
+    PMX_NOTE_IF(!fgPmxHasCap(u1CapBit), MODE_BIT, u1CapBit, prPmxConf()->u4Capability);
     return fgPmxHasCap(u1CapBit);
 }
 
@@ -37,7 +41,7 @@ void vPmxFinishModeChange(PMX_SET_HDMI_RES_PARAMETER_T* prResData)
 UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     PMX_IsLog(9, "SetMode, %s\n", szPmxModeName(ucMode));
     if (PMX_CheckCap(ucPmxId, ucMode) == 0)
@@ -47,9 +51,12 @@ UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
     OSD_BASE_SetDisplayMode(ucMode);
     if (ucMode == prConf->ucMode && ucVFreq == prConf->ucVfreq && prConf->fgSetModeCalled != FALSE)
     {
+        PMX_NOTE(SAME_FORMAT, FALSE, FALSE);
         VDP_SetTvFormat(ucMode, FALSE);
         return 1;
     }
+    PMX_NOTE(FORMAT_WAS, prConf->ucMode, prConf->ucVfreq);
+    PMX_NOTE(FULL_CHANGE, ucMode, ucVFreq);
     prConf->ucMode = ucMode;
     prConf->ucVfreq = ucVFreq;
     prConf->fgSetModeCalled = TRUE;

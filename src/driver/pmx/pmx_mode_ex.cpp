@@ -65,9 +65,13 @@ static UCHAR ucChooseFormat(const PMX_RESOLUTION_T* prOutConf)
     for (UINT32 i = 0; i < PMX_OUTPUT_NUM; i++)
     {
         if (prOutConf[i].fgOutputEnable != FALSE)
+        {
+            PMX_NOTE(FORMAT_FROM_OUTPUT, i, (UCHAR)prOutConf[i].eResMode);
             return (UCHAR)prOutConf[i].eResMode;
+        }
     }
     PMX_RESOLUTION_MODE_T eHdmiMode = prOutConf[PMX_OUTPUT_HDMI].eResMode;
+    PMX_NOTE(FORMAT_FROM_OFF, (UCHAR)eHdmiMode);
     PMX_IsLog(0, "[PMX] Warning: Disable All output, set fmt as %d.\n", (INT32)eHdmiMode);
     return (UCHAR)eHdmiMode;
 }
@@ -119,6 +123,7 @@ static void vStoreOutputs(const REQUEST_T* pr)
 /* Find what changed, bit by bit in front of what overwrites it, and store the request. HDMI is asked in between. */
 static CHANGES_T rFindChangesAndStore(const REQUEST_T* pr)
 {
+    PMX_NOTE(FORMAT_WAS, prPmxConf()->ucMode, prPmxConf()->ucVfreq);
     bool fgFmtChange = fgFormatDiffers(pr);
     vStoreFormat(pr);
 
@@ -129,6 +134,7 @@ static CHANGES_T rFindChangesAndStore(const REQUEST_T* pr)
 
     if (_fgBootUp == TRUE) // the record does not tell what the boot loader set: the first call leaves nothing out
     {
+        PMX_NOTE(AFTER_BOOT);
         fgFmtChange = true;
         _fgBootUp = FALSE;
     }
@@ -198,6 +204,7 @@ static void vApplyFullChange(const REQUEST_T* pr)
 {
     const PMX_CONF_T* prConf = prPmxConf();
 
+    PMX_NOTE(FULL_CHANGE, pr->ucFmtMode, pr->ucVFreq);
     if (_PmxTestOsd == FALSE)
     {
         PMX_IsLog(1, "PMX Start to set OSD Display mode:%d.\n", pr->ucFmtMode);
@@ -225,6 +232,7 @@ static void vApplyFullChange(const REQUEST_T* pr)
 
 static void vApplySameFormat(const REQUEST_T* pr, bool fgHdmiChange, bool fgTveChange)
 {
+    PMX_NOTE(SAME_FORMAT, fgHdmiChange, fgTveChange);
     PMX_SET_HDMI_RES_PARAMETER_T stResData;
     vFillResData(&stResData, pr);
     if (fgHdmiChange)
@@ -251,6 +259,7 @@ static bool fgDisplayPartAnswers(bool fgHdmiExist)
 /* Take graphics out of the picture until the display part, or the timer, brings them back. */
 static void vHoldGraphicsBack(void)
 {
+    PMX_NOTE(HELD_BACK, DISPLAY_PART_TIMEOUT_MS);
     PMX_IsLog(0, "[PMX] VDP_SetClearVideo & Not Mix OSD..\n");
     VDP_SetClearVideo(0, 0, 0x80, 0x80); // black
     for (UCHAR ucPlane = PMX_OSD_PLANE_FIRST; ucPlane <= PMX_OSD_PLANE_LAST; ucPlane++)
@@ -263,7 +272,7 @@ UINT32 PMX_SetModeEx(UCHAR ucPmxId, PMX_RESOLUTION_T* prOutConf, UCHAR ucVFreq, 
                      UINT8 fgOSD5)
 {
     if (ucPmxId != 0 || prOutConf == nullptr)
-        return 0;
+        return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId), PMX_WHY(NULL_POINTER, 0, 2));
 
     // Read once: the video PLL sleeps further down, and the caller may have other plans by then.
     PMX_RESOLUTION_T arOutConf[PMX_OUTPUT_NUM];
@@ -305,6 +314,8 @@ UINT32 PMX_SetModeEx(UCHAR ucPmxId, PMX_RESOLUTION_T* prOutConf, UCHAR ucVFreq, 
     bool fgHdmiExist = rChanges.fgFmtChange || rChanges.fgHdmiChange; // HDMI was sent a resolution change
     if (!fgDisplayPartAnswers(fgHdmiExist))
     {
+        PMX_NOTE_IF(fgHdmiExist || prPmxStatus()->fgTimerAlreadySet != FALSE, NO_SINK);
+        PMX_NOTE_IF(!fgHdmiExist && prPmxStatus()->fgTimerAlreadySet == FALSE, HDMI_AS_IT_WAS);
         PMX_IsLog(0, "[PMX] fgHdmiExist:%d, Not wait display part...\n", fgHdmiExist);
         PMX_SetFormatChangeFlag(FALSE);
     }

@@ -48,13 +48,13 @@ static constexpr ADJUSTMENT_T SHARPNESS = { .szTrace = "[PMX] Seting Sharpness: 
 static bool fgTakeAdjustment(const ADJUSTMENT_T* prAdjustment, UCHAR ucPmxId, UCHAR ucValue, UCHAR bSetTVE)
 {
     if (ucPmxId != 0)
-        return false;
+        return PMX_WHY(MIXER_ID, false, ucPmxId);
 
     PMX_IS_LOG_TEXT(8, prAdjustment->szTrace, bSetTVE, ucValue);
     if (!fgPmxHasCap(prAdjustment->u1CapBit))
     {
         PMX_IS_LOG_TEXT(8, prAdjustment->szRefusal, bSetTVE, ucValue);
-        return false;
+        return PMX_WHY(FEATURE_BIT, false, prAdjustment->u1CapBit, prPmxConf()->u4Capability);
     }
     if (bSetTVE != 0)
         prPmxConf()->*prAdjustment->pucStored = ucValue;
@@ -212,7 +212,8 @@ void d_PMX_GetSharpness(UCHAR* pucSharpness)
 UINT32 PMX_SetGamma(UCHAR ucPmxId, UCHAR ucGamma)
 {
     if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_BIT_GAMMA))
-        return 0;
+        return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId),
+                              PMX_WHY(FEATURE_BIT, 0, PMX_CAP_BIT_GAMMA, prPmxConf()->u4Capability));
 
     prPmxConf()->ucGamma = ucGamma; // as given, also when no curve has this number and gamma is off
     const UCHAR* pucCurve = ucGamma >= 1 && ucGamma <= PMX_GAMMA_CURVE_NUM ? aucGammaCurve[ucGamma - 1] : nullptr;
@@ -233,7 +234,8 @@ UINT32 PMX_GetGammaNs(UCHAR ucPmxId, UCHAR* pucGammaNs)
 UINT32 PMX_SetBlackLv(UCHAR ucPmxId, UCHAR ucCAVEn, UCHAR ucCVBSEn)
 {
     if (ucPmxId != 0 || !fgPmxHasCap(PMX_CAP_BIT_BLACK_LEVEL))
-        return 0;
+        return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId),
+                              PMX_WHY(FEATURE_BIT, 0, PMX_CAP_BIT_BLACK_LEVEL, prPmxConf()->u4Capability));
 
     PMX_IsLog(8, "TVE Set Black Lv, CAV(%d), CVBS(%d)\n", ucCAVEn, ucCVBSEn);
     TVE_SetBlackLvl(ucCAVEn, ucCVBSEn);
@@ -245,7 +247,11 @@ UINT32 PMX_SetBlackLv(UCHAR ucPmxId, UCHAR ucCAVEn, UCHAR ucCVBSEn)
 UINT32 PMX_GetBlackLv(UCHAR ucPmxId, UCHAR* pucCAVEn, UCHAR* pucCVBSEn)
 {
     if (ucPmxId != 0 || pucCAVEn == nullptr || pucCVBSEn == nullptr || !fgPmxHasCap(PMX_CAP_BIT_BLACK_LEVEL))
-        return 0;
+        return PMX_WHY_EITHER(
+            ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId),
+            PMX_WHY_EITHER(pucCAVEn == nullptr || pucCVBSEn == nullptr,
+                           PMX_WHY(NULL_POINTER, 0, pucCAVEn == nullptr ? 2 : 3),
+                           PMX_WHY(FEATURE_BIT, 0, PMX_CAP_BIT_BLACK_LEVEL, prPmxConf()->u4Capability)));
 
     const PMX_CONF_T* prConf = prPmxConf();
     *pucCAVEn = prConf->ucCAVBlackLv;
@@ -277,7 +283,7 @@ UINT32 PMX_SetCVBSPal60(BOOL fgEnable)
 UINT32 PMX_SetMediaType(UCHAR ucPmxId, UCHAR ucMediaType)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     TVE_Identify_Mediatype(ucMediaType);
     return 1;

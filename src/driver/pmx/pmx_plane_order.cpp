@@ -10,7 +10,7 @@
 UINT32 PMX_SetBg(UCHAR ucPmxId, UINT32 u4BgColor)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     prPmxConf()->u4BgColor = u4BgColor;
     PMX_HalSetBg(ucPmxId, u4BgColor);
@@ -20,7 +20,7 @@ UINT32 PMX_SetBg(UCHAR ucPmxId, UINT32 u4BgColor)
 UINT32 PMX_SetPlaneOrderArray(UCHAR ucPmxId, const UINT32* pu4PlaneOrder)
 {
     if (ucPmxId != 0 || pu4PlaneOrder == nullptr)
-        return 0;
+        return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId), PMX_WHY(NULL_POINTER, 0, 2));
 
     for (UINT32 i = 0; i < PMX_PLANE_NUM; i++)
         prPmxConf()->aucPlaneOrder[i] = (UCHAR)pu4PlaneOrder[i];
@@ -33,7 +33,7 @@ UINT32 PMX_SetPlaneOrderArray(UCHAR ucPmxId, const UINT32* pu4PlaneOrder)
 UINT32 PMX_SetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR ucPlaneOrder)
 {
     if (ucPmxId != 0 || ucPlaneOrder >= PMX_PLANE_NUM)
-        return 0;
+        return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId), PMX_WHY(POSITION, 0, ucPlaneOrder));
 
     PMX_CONF_T* prConf = prPmxConf();
     prConf->aucPlaneOrder[ucPlaneOrder] = ucVdpId;
@@ -44,7 +44,7 @@ UINT32 PMX_SetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR ucPlaneOrder)
 UINT32 PMX_GetPlaneOrder(UCHAR ucPmxId, UCHAR ucVdpId, UCHAR* pucPlaneOrder)
 {
     if (ucPmxId != 0 || pucPlaneOrder == nullptr)
-        return 0;
+        return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId), PMX_WHY(NULL_POINTER, 0, 2));
 
     UCHAR ucPosition = 0;
     while (ucPosition < PMX_PLANE_NUM && prPmxConf()->aucPlaneOrder[ucPosition] != ucVdpId)
@@ -90,7 +90,7 @@ UINT32 PMX_VdpGetPlanePosition(UCHAR ucPmxId, UCHAR ucVdpHwId)
 
     PMX_IsLog(5, "Invalid VDP Id\n");
     Assert("0", __FILE__, __LINE__);
-    return DRV_PMX_PLANE_1;
+    return PMX_WHY(NO_VIDEO_PLANE, DRV_PMX_PLANE_1, ucVdpHwId);
 }
 
 INT32 i4PmxGetPlanePosition(void* pvTag, UCHAR ucVdpHwId)

@@ -24,7 +24,7 @@ UINT32 u4PmxCompId2LocalId(UINT16 u2CompType, UINT16 u2CompId)
         return u4PmxOsdPort((UCHAR)u2CompId);
     // Only an unknown type is worth a message, not an unknown number of a known one.
     PMX_IsLog(8, "COMP ID to LOCAL ID Fail, CompType = %d, CompId = %d\n", u2CompType, u2CompId);
-    return PMX_PORT_NUM;
+    return PMX_WHY(NO_PORT, PMX_PORT_NUM, u2CompType, u2CompId);
 }
 
 /* The port that a component changes; null when there is no such port, or no such mixer. The source events look at it
@@ -32,7 +32,10 @@ UINT32 u4PmxCompId2LocalId(UINT16 u2CompType, UINT16 u2CompId)
 static volatile PMX_PORT_INFO_T* prPortToChange(UINT16 u2ThisCompId, UINT32 u4LocalId)
 {
     if (u2ThisCompId != 0 || u4LocalId >= PMX_PORT_NUM)
+    {
+        PMX_NOTE_IF(u4LocalId < PMX_PORT_NUM, MIXER_ID, u2ThisCompId); // else the port's own reason was told
         return nullptr;
+    }
     return &prPmxConf()->arPortInfo[u4LocalId];
 }
 

@@ -37,7 +37,7 @@ UINT32 PMX_VdpEnabled(UCHAR ucPmxId, UCHAR ucVdpId, INT32 i4SrcWidth, INT32 i4Sr
         return 0;
     PMX_PORT_INFO_T* prPort = &prPmxConf()->arPortInfo[u4Port];
     if (prPort->fgConnected == FALSE)
-        return 0;
+        return PMX_WHY(NOT_CONNECTED, 0, ucVdpId, u4Port);
 
     prPort->fgEnabled = TRUE;
     prPort->eInputColorMode = DRV_GFX_COLOR_MODE_YCBCR;
@@ -103,6 +103,7 @@ UINT32 PMX_OsdEnabled(UCHAR, UCHAR ucOsdId, INT32 i4SrcWidth, INT32 i4SrcHeight,
         DRV_PMX_COLOR_SPACE_T eSrcCS = eColorSpaceOfSize(i4SrcWidth, i4SrcHeight);
         prPort->eInputColorMode = DRV_GFX_COLOR_MODE_YCBCR;
         prPort->eSrcColorSpace = eSrcCS;
+        PMX_NOTE(MASTER_FROM_PORT, eSrcCS, u4Port);
         prConf->eMasterColorSpace = eSrcCS;
         PMX_IsLog(8,
                   eSrcCS == DRV_PMX_CS_YCBCR_709 ? "OSD_%d's Src Color Space = DRV_PMX_CS_YCBCR_709\n"
@@ -111,10 +112,18 @@ UINT32 PMX_OsdEnabled(UCHAR, UCHAR ucOsdId, INT32 i4SrcWidth, INT32 i4SrcHeight,
     }
     else // a port that had YCbCr graphics goes on counting as such
     {
+        PMX_NOTE(RGB_NOT_COUNTED, u4Port);
         PMX_IsLog(8, "OSD_%d's Src Color Space = DRV_PMX_CS_RGB\n", ucOsdId);
     }
     if (prConf->eMasterColorSpace != eOldCS)
+    {
+        PMX_NOTE(MASTER_CHANGES, eOldCS, prConf->eMasterColorSpace);
         vAnnounceMasterColorSpace();
+    }
+    else
+    {
+        PMX_NOTE(MASTER_STAYS, eOldCS);
+    }
     return 1;
 }
 
@@ -140,29 +149,46 @@ UINT32 PMX_DecideMasterColorSpace(UCHAR ucPmxId)
     if (prPort[PMX_PORT_VDP_MAIN].fgEnabled != FALSE)
     {
         eCandidate = prPort[PMX_PORT_VDP_MAIN].eSrcColorSpace;
+        PMX_NOTE(MASTER_FROM_PORT, eCandidate, PMX_PORT_VDP_MAIN);
         PMX_IsLog(8, "[PMX] VDP_COMP_1 enabled and Color Space is %d.\n", (INT32)eCandidate);
     }
     if (prPort[PMX_PORT_VDP_SUB].fgEnabled != FALSE && prPort[PMX_PORT_VDP_SUB].ucLumaKey != 0 &&
         fgPmxHalMixPlane(ucPmxId, DRV_PMX_PLANE_2) != FALSE)
     {
         eCandidate = prPort[PMX_PORT_VDP_SUB].eSrcColorSpace;
+        PMX_NOTE(MASTER_FROM_PORT, eCandidate, PMX_PORT_VDP_SUB);
         PMX_IsLog(8, "[PMX] VDP_COMP_2 enabled and Color Space is %d.\n", (INT32)eCandidate);
+    }
+    else
+    {
+        PMX_NOTE_IF(prPort[PMX_PORT_VDP_SUB].fgEnabled != FALSE, SECOND_NOT_COUNTED,
+                    prPort[PMX_PORT_VDP_SUB].ucLumaKey);
     }
     for (UINT32 i = PMX_PORT_OSD_FIRST; i < PMX_PORT_NUM; i++)
     {
         if (prPort[i].fgEnabled != FALSE && prPort[i].eInputColorMode == DRV_GFX_COLOR_MODE_YCBCR)
         {
             eCandidate = prPort[i].eSrcColorSpace;
+            PMX_NOTE(MASTER_FROM_PORT, eCandidate, i);
             PMX_IsLog(8, "[PMX] Gfx enabled and Color Space is %d.\n", (INT32)eCandidate);
+        }
+        else
+        {
+            PMX_NOTE_IF(prPort[i].fgEnabled != FALSE, RGB_NOT_COUNTED, i);
         }
     }
 
     if (eCandidate != prConf->eMasterColorSpace)
     {
+        PMX_NOTE(MASTER_CHANGES, prConf->eMasterColorSpace, eCandidate);
         PMX_IsLog(8, "[PMX] Master Color Space change from %d to %d.\n", (INT32)prConf->eMasterColorSpace,
                   (INT32)eCandidate);
         prConf->eMasterColorSpace = eCandidate;
         vAnnounceMasterColorSpace();
+    }
+    else
+    {
+        PMX_NOTE(MASTER_STAYS, eCandidate);
     }
     return 1;
 }
@@ -177,6 +203,7 @@ static void vInformVdp(UINT16 u2CompType, UINT16 u2CompId)
     PMX_IsLog(8, "Inform Vdp CS(%d)\n", (INT32)prConf->eMasterColorSpace);
     if (i4ImQueryInterface(u2CompType, u2CompId, IID_IVdp, &pvIf, &pvTag) < 0)
     {
+        PMX_NOTE(NO_TABLE, u2CompType, u2CompId);
         PMX_IsLog(5, "Query VDP Interface Fail!\n");
         Assert("0", __FILE__, __LINE__);
         return; // nothing was obtained that could be called or given back
@@ -202,20 +229,20 @@ void PMX_InformVdpColorSpace(UCHAR)
 
 INT32 i4PmxOsdEnabled(void*, INT32, INT32, DRV_GFX_COLOR_MODE_T)
 {
-    return 1;
+    return PMX_WHY(INERT, 1);
 }
 
 INT32 i4PmxOsdDisabled(void*)
 {
-    return 1;
+    return PMX_WHY(INERT, 1);
 }
 
 INT32 i4PmxVdpEnabled(void*, INT32, INT32)
 {
-    return 1;
+    return PMX_WHY(INERT, 1);
 }
 
 INT32 i4PmxVdpDisabled(void*)
 {
-    return 1;
+    return PMX_WHY(INERT, 1);
 }

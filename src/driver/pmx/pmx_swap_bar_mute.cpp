@@ -11,7 +11,7 @@
 UINT32 PMX_SetSwapEnable(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucSwapMode)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     UINT32 u4Swap = ucEnable != 0;
     switch (ucSwapMode)
@@ -40,7 +40,7 @@ UINT32 PMX_SetSwapEnable(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucSwapMode)
         PMX_IsLog(8, "Plane 5_8 Swap\n");
         PMX_HalSwapPlane5_8(0, u4Swap);
         break;
-    default: break;
+    default: PMX_NOTE(SWAP_MODE, ucSwapMode); break;
     }
     return 1;
 }
@@ -48,7 +48,7 @@ UINT32 PMX_SetSwapEnable(UCHAR ucPmxId, UCHAR ucEnable, UCHAR ucSwapMode)
 UINT32 PMX_GetSwapEnable(UCHAR ucPmxId, UCHAR* pucEnable, UCHAR ucSwapMode)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     switch (ucSwapMode)
     {
@@ -58,7 +58,7 @@ UINT32 PMX_GetSwapEnable(UCHAR ucPmxId, UCHAR* pucEnable, UCHAR ucSwapMode)
     case 4: *pucEnable = fgPmxHalSwapPlane4_7(0); break;
     case 5: *pucEnable = fgPmxHalSwapPlane1_3(0); break;
     case 6: *pucEnable = fgPmxHalSwapPlane5_8(0); break;
-    default: break;
+    default: PMX_NOTE(SWAP_MODE, ucSwapMode); break;
     }
     return 1;
 }
@@ -66,11 +66,11 @@ UINT32 PMX_GetSwapEnable(UCHAR ucPmxId, UCHAR* pucEnable, UCHAR ucSwapMode)
 UINT32 PMX_SetCBEnable(UCHAR ucPmxId, UCHAR ucEnable)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     PMX_CONF_T* prConf = prPmxConf();
     if (ucEnable == prConf->ucCBEnable)
-        return 1;
+        return PMX_WHY(SAME_VALUE, 1, ucEnable);
 
     if (ucEnable != 0)
     {
@@ -106,11 +106,11 @@ UINT32 PMX_GetCBEnable(UCHAR ucPmxId, UCHAR* pucEnable)
 UINT32 PMX_SetMuteEnable(UCHAR ucPmxId, UCHAR ucEnable)
 {
     if (ucPmxId != 0)
-        return 0;
+        return PMX_WHY(MIXER_ID, 0, ucPmxId);
 
     PMX_CONF_T* prConf = prPmxConf();
     if (ucEnable == prConf->ucMuteEnable)
-        return 1;
+        return PMX_WHY(SAME_VALUE, 1, ucEnable);
 
     if (ucEnable != 0)
     {

@@ -121,18 +121,21 @@ bool has_name(const Table& from, const ElfW(Sym) & symbol, std::string_view name
            from.names[symbol.st_name + name.size()] == '\0';
 }
 
-} // namespace
-
-bool available()
+/** See prefer(). */
+std::string& preferred()
 {
-    return !table().symbols.empty();
+    static std::string prefix;
+    return prefix;
 }
 
-std::optional<Symbol> find(std::string_view name)
+std::map<const void*, std::string_view>& known_names()
 {
-    if (!available())
-        throw std::runtime_error("this executable was stripped: without its symbol table nothing can be found in it; "
-                                 "build it without -s and without strip");
+    static std::map<const void*, std::string_view> known;
+    return known;
+}
+
+std::optional<Symbol> find_exactly(std::string_view name)
+{
     std::optional<Symbol> found;
     bool ambiguous = false;
     for (const ElfW(Sym) & symbol : table().symbols)
@@ -150,9 +153,54 @@ std::optional<Symbol> find(std::string_view name)
     return found;
 }
 
+} // namespace
+
+bool available()
+{
+    return !table().symbols.empty();
+}
+
+std::optional<Symbol> find(std::string_view name)
+{
+    if (!available())
+        throw std::runtime_error("this executable was stripped: without its symbol table nothing can be found in it; "
+                                 "build it without -s and without strip");
+    if (prefers())
+    {
+        if (const auto found = find_exactly(preferred() + std::string(name)))
+            return found;
+    }
+    return find_exactly(name);
+}
+
+void for_each(std::string_view prefix,
+              const std::function<void(std::string_view rest, Symbol symbol, bool is_function)>& told)
+{
+    for (const ElfW(Sym) & symbol : table().symbols)
+    {
+        if (!is_defined(symbol))
+            continue;
+        const std::string_view name = name_of(table(), symbol);
+        if (name.starts_with(prefix))
+            told(name.substr(prefix.size()), { table().address(symbol), symbol.st_size },
+                 (symbol.st_info & 0xF) == STT_FUNC);
+    }
+}
+
+void prefer(std::string_view prefix)
+{
+    preferred() = prefix;
+    known_names().clear();
+}
+
+bool prefers()
+{
+    return !preferred().empty();
+}
+
 std::string_view name_at(const void* address)
 {
-    static std::map<const void*, std::string_view> known;
+    auto& known = known_names();
     if (const auto found = known.find(address); found != known.end())
         return found->second;
     std::string_view name;
@@ -165,6 +213,8 @@ std::string_view name_at(const void* address)
         if (is_global(symbol))
             break;
     }
+    if (prefers() && name.starts_with(preferred()))
+        name.remove_prefix(preferred().size());
     return known[address] = name;
 }
 

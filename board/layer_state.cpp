@@ -20,6 +20,7 @@ constexpr std::string_view objects[] = { "_arPmxConf",  "bComp0OnTop",   "_arPmx
 
 struct Image
 {
+    std::string_view name;
     executable_symbols::Symbol object;
     std::vector<unsigned char> content;
 };
@@ -56,7 +57,7 @@ try
         }
         std::vector<unsigned char> content(object->size);
         copy_unchecked(content.data(), static_cast<const unsigned char*>(object->address), object->size);
-        load.images.push_back({ *object, std::move(content) });
+        load.images.push_back({ name, *object, std::move(content) });
     }
     if (!load.images.empty() && !missing.empty())
         load.error = "the layer in this executable lacks " + missing;
@@ -77,7 +78,11 @@ void restore()
     if (!as_loaded.error.empty())
         throw std::runtime_error(as_loaded.error);
     for (const Image& image : as_loaded.images)
-        copy_unchecked(static_cast<unsigned char*>(image.object.address), image.content.data(), image.content.size());
+    {
+        void* const object =
+            executable_symbols::prefers() ? executable_symbols::find(image.name)->address : image.object.address;
+        copy_unchecked(static_cast<unsigned char*>(object), image.content.data(), image.content.size());
+    }
 }
 
 } // namespace board::layer_state

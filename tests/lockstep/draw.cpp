@@ -230,8 +230,12 @@ Arguments draw_arguments(Random& random, const Operation& operation, Image& stat
     Arguments arguments = caller_arguments(operation);
     for (std::size_t i = 0; i < caller_size; ++i)
         state[caller_offset() + i] = 0xC3;
+    const bool all_off = random.once_in(32); // by chance alone four outputs hardly ever are
     for (const Field& field : array_fields(operation))
-        set(state, field, draw_value(random, field.name, field.size));
+    {
+        const bool is_off = all_off && field.name.ends_with("fgOutputEnable");
+        set(state, field, is_off ? 0 : draw_value(random, field.name, field.size));
+    }
 
     const bool one_place = random.once_in(16);
     for (unsigned i = 0; i < operation.function.count; ++i)

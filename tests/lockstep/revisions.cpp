@@ -1,12 +1,9 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Runs two layers side by side over random operations, and counts by kind what they do differently. */
 #include <iostream>
-#include <string>
 #include <vector>
 
-#include "tests/lockstep/draw.h"
-#include "tests/lockstep/findings.h"
-#include "tests/lockstep/options.h"
+#include "tests/lockstep/random_runs.h"
 
 namespace
 {
@@ -27,50 +24,6 @@ Runs N random operations in both layers; many once more with a neighbour that ch
   --all                show every kind of difference in full, not the first one alone
 )";
 
-std::vector<unsigned> common_operations(const std::string& wanted)
-{
-    std::vector<unsigned> common;
-    for (unsigned i = 0; i < operation_count; ++i)
-    {
-        const Operation& operation = operations[i];
-        if (!wanted.empty() && operation.function.name != wanted)
-            continue;
-        if (operation.entries[0] != nullptr && operation.entries[1] != nullptr)
-            common.push_back(i);
-        else
-            std::cout << operation.function.name << " is not in both layers\n";
-    }
-    return common;
-}
-
-void run_all(const Options& options, const std::vector<unsigned>& offered, Findings& findings)
-{
-    Random random(options.seed);
-    Image state = started_state();
-    for (std::uint64_t i = 0; i < options.count; ++i)
-    {
-        if (random.once_in(4))
-            state = started_state();
-        if (!random.once_in(4))
-            draw_state(random, state);
-        Trial trial;
-        trial.operation = &operations[offered[random.below(offered.size())]];
-        trial.arguments = draw_arguments(random, *trial.operation, state);
-        trial.before = state;
-        trial.surroundings.seed = random.next();
-        trial.surroundings.calm = random.once_in(2);
-        const std::string name = "operation " + std::to_string(i);
-        findings.run(trial, name);
-        const auto calls = static_cast<unsigned>(findings.trace(0).calls.size());
-        if (options.disturbed && calls != 0 && random.once_in(2))
-        {
-            trial.surroundings.disturbance = draw_disturbance(random, *trial.operation, calls);
-            findings.run(trial, name);
-        }
-        state = findings.trace(1).after;
-    }
-}
-
 } // namespace
 
 int main(int count, char** words)
@@ -83,7 +36,7 @@ int main(int count, char** words)
         return 2;
     }
     Findings findings(options.comparison);
-    run_all(options, offered, findings);
+    run_random(options, offered, findings);
     std::cout << options.count << " operations, " << findings.disturbed() << " of them again with a neighbour; "
               << findings.calls() << " calls compared\n"
               << findings.report(options.all);

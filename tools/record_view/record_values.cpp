@@ -8,6 +8,7 @@
 #include "board/executable_symbols.h"
 #include "board/names.h"
 #include "tools/record_view/record_layout.h"
+#include "tools/record_view/record_view.h"
 
 namespace record_view
 {
@@ -38,12 +39,22 @@ Value number_at(const Node& node, const unsigned char* at)
                          reads_best_in_hex(node.name) ? Value::Base::Hex : Value::Base::Decimal);
 }
 
+std::map<const Object*, unsigned char*>& known_addresses()
+{
+    static std::map<const Object*, unsigned char*> known;
+    return known;
+}
+
 } // namespace
+
+void look_again()
+{
+    known_addresses().clear();
+}
 
 unsigned char* address_of(const Object& object)
 {
-    static std::map<const Object*, unsigned char*> known;
-    unsigned char*& address = known[&object];
+    unsigned char*& address = known_addresses()[&object];
     if (address != nullptr)
         return address;
 

@@ -28,6 +28,9 @@ public:
     using std::invalid_argument::invalid_argument;
 };
 
+/** Forget where the objects are: they are looked up anew. For whoever puts another layer in the place of the first. */
+void look_again();
+
 /** Everything, by name: {record={…}, status={…}, module={…}}. A null pointer is null; numbers carry their names. */
 board::Value state();
 

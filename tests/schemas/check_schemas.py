@@ -26,6 +26,10 @@ from schemas import Dialect, Schemas  # noqa: E402
 LOOKS = """PMX_Init
 what-if PMX_GetTvType 0
 what-if PMX_SetTvType 0 3
+explain PMX_SetMode 0 48 24 0
+explain PMX_SetBrightness 3 1 1
+why mode
+why osd
 PMX_SetCBEnable 0 1
 diff
 diff mixer

@@ -72,7 +72,8 @@ class SchemasRefuse(unittest.TestCase):
 
     def test_a_key_more_or_less_in_any_line_of_a_trace(self):
         lines = [document for name, document in self.written if name == "trace"]
-        self.assertEqual({"call", "log", "state", "status", "diff", "what-if"}, {line["kind"] for line in lines})
+        self.assertEqual({"call", "log", "state", "status", "diff", "what-if", "explanation"},
+                         {line["kind"] for line in lines})
         for line in lines:
             refusal = "Unevaluated" if line["kind"] == "status" else "Additional"
             self.refused("trace", {**line, "colour": "red"}, f"$: {refusal} properties")

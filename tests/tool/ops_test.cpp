@@ -108,6 +108,9 @@ Store and program the TV type.
 Returns  PMX_SET_OK; 0 for a mixer id other than 0
 Called   from any thread that may sleep; takes no lock
 
+May do less, and explain why
+  MIXER_ID            there is no mixer N: the one mixer is 0
+
 Example
   PMX_Init
   PMX_SetTvType 0 PMX_TV_TYPE_PAL

@@ -98,6 +98,7 @@ void add_run(CLI::App& app, Chosen& chosen)
     sub->add_option("--trace-file", run->trace_file, "Write the trace there instead of among the rest")
         ->type_name("FILE");
     sub->add_flag("-k,--keep-going", run->keep_going, "Go on behind what fails, and tell all of it");
+    sub->add_flag("--explain", run->explain, "Tell why what is refused is refused, and what would be accepted");
     sub->add_option("--junit", run->junit, "Write what became of each scenario there, as XML for build servers")
         ->type_name("FILE");
     sub->add_flag("--stores", run->stores, "Show what is stored into the layer's record between two calls");

@@ -101,8 +101,12 @@ int run_each(const RunOptions& run, const Opened& opened, const OutputOptions& o
     {
         const std::string& file = run.files[i];
         Verdict& verdict = verdicts.emplace_back(Verdict{ file, {} });
-        const Scenario scenario{ file, run.board.empty() ? "default" : run.board, repeat_command(run, file),
-                                 run.keep_going, &verdict.failures };
+        const Scenario scenario{ file,
+                                 run.board.empty() ? "default" : run.board,
+                                 repeat_command(run, file),
+                                 run.keep_going,
+                                 run.explain,
+                                 &verdict.failures };
         code = std::max(code, run_one(*opened[i], scenario, output));
     }
     return code;

@@ -20,6 +20,7 @@ struct RunOptions
     std::vector<std::string> operations;
     std::string junit; ///< a file for the verdicts, as JUnit writes them
     bool keep_going = false;
+    bool explain = false;
     bool stores = false;
     bool quiet = false;
     bool verbose = false;

@@ -41,6 +41,7 @@ public:
               text_width(), wants_colour(options.colour)
           }
     {
+        m_session.explain_commands(true);
     }
 
     ~Shell() { board::at_every_call({}); }
@@ -125,9 +126,23 @@ private:
             record(line);
         else
         {
-            m_session.run_line(text);
+            run_line(line, text);
             keep(line);
         }
+    }
+
+    void run_line(const Line& line, const std::string& text)
+    try
+    {
+        m_session.run_line(text);
+    }
+    catch (const StepFailed& failure)
+    {
+        const auto& explanation = m_session.explanation();
+        if (line.word(0) != "expect" || !explanation || explanation->reasons.empty())
+            throw;
+        report(failure.what());
+        m_output.text(to_text(*explanation, m_look));
     }
 
     /* Breakpoints: the layer stops at the end of a platform call, when the device has acted. */

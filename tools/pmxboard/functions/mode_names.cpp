@@ -76,6 +76,12 @@ std::string short_name_of(std::string_view mode)
     return name;
 }
 
+std::string full_name_of(unsigned mode)
+{
+    const std::string_view name = board::names::name_of(Family::ResolutionMode, mode);
+    return name.empty() ? std::to_string(mode) : std::string(name);
+}
+
 std::vector<std::string> short_mode_names()
 {
     std::vector<std::string> names;

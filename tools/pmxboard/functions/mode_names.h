@@ -16,7 +16,9 @@ std::string refresh_of(std::string_view mode);
 
 /** The short name of a mode: 720p50 of RES_720P50HZ. */
 std::string short_name_of(std::string_view mode);
-/** Of every mode, by number. */
+/** The full name of a mode: RES_720P50HZ; its number when it has none. */
+std::string full_name_of(unsigned mode);
+/** The short name of every mode, by number. */
 std::vector<std::string> short_mode_names();
 
 /** The mode of a short name, with or without its refresh where there is no other, in small or capital letters; of its

@@ -17,8 +17,6 @@ namespace pmxboard
 namespace
 {
 
-using board::names::Family;
-
 /** By output; nothing for one that is off. */
 using Modes = std::array<std::optional<unsigned>, 4>;
 
@@ -33,20 +31,14 @@ void read_setting(const std::string& setting, Modes& modes, std::array<bool, 4>&
         modes[output] = read_mode(mode);
 }
 
-std::string name_of_mode(unsigned mode)
-{
-    const std::string_view name = board::names::name_of(Family::ResolutionMode, mode);
-    return name.empty() ? std::to_string(mode) : std::string(name);
-}
-
 /** The mixer runs what the first output runs that is on; the layer is told whole pictures a second. */
 std::string frequency_of(const Modes& modes)
 {
     for (const auto& mode : modes)
     {
-        const std::string refresh = mode ? refresh_of(name_of_mode(*mode)) : std::string();
+        const std::string refresh = mode ? refresh_of(full_name_of(*mode)) : std::string();
         if (mode && refresh.empty())
-            throw LineError("the name of " + name_of_mode(*mode) +
+            throw LineError("the name of " + full_name_of(*mode) +
                             " does not tell its frequency; PMX_SetModeEx takes both");
         if (mode)
             return refresh.substr(0, refresh.find('.'));
@@ -59,7 +51,7 @@ std::string call_for(const Modes& modes)
 {
     std::string outputs;
     for (const auto& mode : modes)
-        outputs += (outputs.empty() ? "[" : ", [") + (mode ? "1, " + name_of_mode(*mode) : std::string("0")) + "]";
+        outputs += (outputs.empty() ? "[" : ", [") + (mode ? "1, " + full_name_of(*mode) : std::string("0")) + "]";
     return "PMX_SetModeEx 0 [ " + outputs + " ] " + frequency_of(modes) + " DRV_NON_EXT_CHIP 0";
 }
 

@@ -6,8 +6,10 @@
 #include <ostream>
 
 #include "board/files.h"
+#include "board/threads.h"
 #include "tools/pmxboard/files/ending.h"
 #include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/apart.h"
 #include "tools/pmxboard/language/session.h"
 #include "tools/pmxboard/state/now.h"
 #include "tools/pmxboard/state/status.h"
@@ -83,12 +85,56 @@ catch (const board::files::FileError& error)
     throw board::files::FileError(place + ": " + error.what());
 }
 
+/** Carry the lines out once more, in a copy of the process, as far as a command, and tell why that does what it does.
+ *  Empty when there is nothing to tell. */
+std::string explained_again(const Scenario& scenario, std::size_t command)
+try
+{
+    OutputOptions options;
+    options.quiet = true;
+    Output output(options);
+    Session session(output, scenario.board, directory_of(scenario.name));
+    session.explain_command(command);
+    const auto lines = board::files::open_lines(scenario.name);
+    for (std::string text; session.commands() < command && board::files::next_line(*lines, text);)
+    {
+        try
+        {
+            session.run_line(text);
+        }
+        catch (const std::exception&)
+        {
+            continue; // it was told the first time
+        }
+    }
+    const auto& explanation = session.explanation();
+    return explanation && !explanation->reasons.empty() ? to_text(*explanation, Look{ text_width(), false })
+                                                        : std::string();
+}
+catch (const std::exception&)
+{
+    return {}; // the failure itself has been told
+}
+
+std::string why(const Scenario& scenario, const Session& session)
+try
+{
+    if (scenario.name == "-" || session.commands() == 0 || !board::threads::waiting().empty())
+        return {};
+    const Apart apart = run_apart([&](std::ostream&) { return explained_again(scenario, session.commands()); });
+    return apart.death.empty() ? apart.answer : std::string();
+}
+catch (const std::exception&)
+{
+    return {}; // the failure itself has been told
+}
+
 /** What a scenario does not do as it says. */
 class Failures
 {
 public:
-    Failures(const Scenario& scenario, Output& output, std::ostream& diagnostics)
-        : m_scenario(scenario), m_output(output), m_diagnostics(diagnostics)
+    Failures(const Scenario& scenario, const Session& session, Output& output, std::ostream& diagnostics)
+        : m_scenario(scenario), m_session(session), m_output(output), m_diagnostics(diagnostics)
     {
     }
 
@@ -110,6 +156,7 @@ public:
         catch (const std::exception& error)
         {
             tell(place, error.what());
+            explain();
             if (!m_scenario.keep_going)
                 m_diagnostics << "repeat: " << printable(m_scenario.repeat) << '\n';
         }
@@ -127,10 +174,20 @@ private:
             m_scenario.failures->push_back(message);
     }
 
+    /** The last command before the failure; of the first few, for each takes another run. */
+    void explain()
+    {
+        constexpr unsigned most_explained = 3;
+        if (!m_scenario.explain && m_explained++ < most_explained)
+            m_diagnostics << why(m_scenario, m_session);
+    }
+
     const Scenario& m_scenario;
+    const Session& m_session;
     Output& m_output;
     std::ostream& m_diagnostics;
     bool m_any = false;
+    unsigned m_explained = 0;
 };
 
 } // namespace
@@ -149,7 +206,8 @@ bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOpt
     const std::string file = printable(scenario.name == "-" ? "<stdin>" : scenario.name);
     if (options.trace != nullptr)
         options.trace->scenario(file);
-    Failures failures(scenario, output, diagnostics);
+    session.explain_commands(scenario.explain, scenario.explain);
+    Failures failures(scenario, session, output, diagnostics);
     unsigned number = 0;
     const auto place = [&] { return file + ":" + std::to_string(number); };
     bool goes_on = true;

@@ -19,6 +19,7 @@ struct Scenario
     std::string board;                            ///< for `power-on` without a name
     std::string repeat;                           ///< the command that runs it again
     bool keep_going = false;                      ///< what is wrong or fails is told, and the next line carried out
+    bool explain = false;                         ///< what is refused is explained, whatever becomes of it
     std::vector<std::string>* failures = nullptr; ///< where each is told as well
 };
 

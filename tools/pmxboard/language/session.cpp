@@ -86,6 +86,7 @@ void Session::run_line(std::string_view text)
         return;
     }
     m_output.command(line.from(0));
+    const std::size_t commands_before = m_commands;
     try
     {
         run_command(line);
@@ -97,6 +98,8 @@ void Session::run_line(std::string_view text)
         throw;
     }
     m_output.flush();
+    if (m_shows_explanations && m_commands != commands_before && m_explanation && m_explanation->refusal() != nullptr)
+        m_output.shown(to_json_line(*m_explanation), to_text(*m_explanation, m_output.look()));
 }
 
 void Session::run_command(const Line& line)
@@ -108,6 +111,7 @@ void Session::run_command(const Line& line)
     {
         forget_the_past();
         remember(line);
+        explain_ahead(line);
     }
     begin_window();
     carry_out(line);
@@ -188,6 +192,33 @@ void Session::remember(const Line& line)
     m_before.reset();
     if (m_watches && m_powered)
         m_before = whole_state();
+}
+
+/** While everything is as the command will find it. A command that cannot be explained is carried out all the same. */
+void Session::explain_ahead(const Line& line)
+{
+    if (imagines())
+        return;
+    ++m_commands;
+    m_explanation.reset();
+    if (!m_explains || line.word(0) == "include" || (m_explained_alone && *m_explained_alone != m_commands))
+        return;
+    try
+    {
+        m_explanation = explain(*this, line.from(0));
+        if (const Reason* const refusal = m_explanation->refusal(); refusal != nullptr && m_shows_explanations)
+            m_output.refusal(sentence_of(*refusal));
+    }
+    catch (const std::exception&)
+    {
+        m_explanation.reset(); // the command itself will tell what is wrong
+    }
+}
+
+void Session::forget_outcome()
+{
+    m_last_operation.clear();
+    m_last_outcome = {};
 }
 
 std::vector<Change> Session::changes() const

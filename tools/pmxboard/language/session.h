@@ -15,6 +15,7 @@
 #include "board/trace.h"
 #include "board/value.h"
 #include "tools/pmxboard/functions/operation.h"
+#include "tools/pmxboard/language/explanation.h"
 #include "tools/pmxboard/language/line.h"
 #include "tools/pmxboard/state/diff.h"
 #include "tools/pmxboard/view/output.h"
@@ -79,6 +80,25 @@ public:
     /** Carry a line out in a process that is about to end: its effects are nobody's. */
     void imagine(std::string_view text, std::ostream& shown);
     bool imagines() const { return m_imagined != 0; }
+    void forget_outcome();
+
+    /** Whether each command is explained before it is carried out, for `why`; and whether what was refused is shown
+     *  without asking. That takes a copy of the process for each. */
+    void explain_commands(bool on, bool shown = false)
+    {
+        m_explains = on;
+        m_shows_explanations = shown;
+    }
+    /** The same for one command alone, counted from 1. */
+    void explain_command(std::size_t number)
+    {
+        m_explains = true;
+        m_explained_alone = number;
+    }
+    /** How many commands have run that did not only look. */
+    std::size_t commands() const { return m_commands; }
+    /** Of the last command that did not only look; nothing when none was explained. */
+    const std::optional<Explanation>& explanation() const { return m_explanation; }
 
     /* For expectations */
 
@@ -103,6 +123,7 @@ private:
     void need_power(std::string_view command);
     void check_misuses() const;
     void remember(const Line& line);
+    void explain_ahead(const Line& line);
     static void forget_the_past();
 
     Output& m_output;
@@ -115,6 +136,11 @@ private:
     bool m_watches = true;
     unsigned m_imagined = 0; ///< what-if within what-if
     bool m_watches_stores = false;
+    bool m_explains = false;
+    bool m_shows_explanations = false;
+    std::optional<std::size_t> m_explained_alone;
+    std::size_t m_commands = 0;
+    std::optional<Explanation> m_explanation;
     std::string m_last_command;
     std::optional<board::Value> m_before; ///< the state that the last command found; not for power-on
     std::string m_last_operation;

@@ -134,7 +134,7 @@ const std::vector<Verb>& verbs()
     static const std::vector<Verb> all = [] {
         std::vector<Verb> joined;
         for (const auto& verbs_of : { output_verbs, board_verbs, device_verbs, source_verbs, state_verbs, what_if_verbs,
-                                      meanwhile_verbs, view_verbs, neighbour_verbs, expectation_verbs })
+                                      why_verbs, meanwhile_verbs, view_verbs, neighbour_verbs, expectation_verbs })
         {
             for (Verb& verb : verbs_of())
                 joined.push_back(std::move(verb));

@@ -89,6 +89,7 @@ std::vector<Verb> source_verbs();
 std::vector<Verb> output_verbs();
 std::vector<Verb> state_verbs();
 std::vector<Verb> what_if_verbs();
+std::vector<Verb> why_verbs();
 std::vector<Verb> meanwhile_verbs();
 std::vector<Verb> view_verbs();
 std::vector<Verb> neighbour_verbs();

@@ -6,6 +6,7 @@
 
 #include "tools/pmxboard/functions/kind.h"
 #include "tools/pmxboard/functions/operation_examples.h"
+#include "tools/pmxboard/reasons/reason.h"
 
 namespace pmxboard
 {
@@ -95,6 +96,36 @@ std::string result_and_context(const Contract& contract, const Look& look)
     return text;
 }
 
+/** Each reason once, by its first place. */
+std::vector<ReasonPlace> different_reasons_of(std::string_view operation)
+{
+    std::vector<ReasonPlace> different;
+    for (const ReasonPlace& place : reasons_of(operation))
+    {
+        if (std::none_of(different.begin(), different.end(),
+                         [&](const ReasonPlace& other) { return other.number == place.number; }))
+            different.push_back(place);
+    }
+    return different;
+}
+
+/** Why the operation may refuse, and what it may tell of its decisions. */
+std::string reasons_text(std::string_view operation, const Look& look)
+{
+    constexpr unsigned column = 22;
+    std::string refusals;
+    std::string notes;
+    for (const ReasonPlace& place : different_reasons_of(operation))
+    {
+        const ReasonRow& row = row_of(place.number);
+        std::string line = "  " + std::string(row.name);
+        line.append(column > line.size() ? column - line.size() : 1, ' ').append(general_sentence_of(row));
+        (row.class_of == PMX_REASON_CLASS_NOTE ? notes : refusals) += wrapped(line, look.width, 0, column);
+    }
+    return (refusals.empty() ? "" : "\nMay do less, and explain why\n" + refusals) +
+           (notes.empty() ? "" : "\nMay explain what it decides\n" + notes);
+}
+
 Value json_of(const Kind& kind)
 {
     Value value;
@@ -123,6 +154,22 @@ Value json_of(const Kind& kind)
         .add("names", Value::list(std::move(names)));
 }
 
+Value reasons_json(std::string_view operation)
+{
+    std::vector<Value> list;
+    for (const ReasonPlace& place : different_reasons_of(operation))
+    {
+        const ReasonRow& row = row_of(place.number);
+        list.push_back(Value()
+                           .add("id", Value::number(row.number))
+                           .add("name", Value::text(std::string(row.name)))
+                           .add("class", Value::text(std::string(row.class_name)))
+                           .add("text", Value::text(general_sentence_of(row)))
+                           .add("place", Value::text(std::string(place.file) + ":" + std::to_string(place.line))));
+    }
+    return Value::list(std::move(list));
+}
+
 Value text_or_null(std::string_view text)
 {
     return text.empty() ? Value::null() : Value::text(std::string(text));
@@ -143,7 +190,7 @@ std::string operation_text(const Operation& operation, const Look& look)
     text += operation.parameters.empty() ? "" : "\n";
     for (const Parameter& parameter : operation.parameters)
         text += argument_text(parameter, meaning_of(*contract, parameter.name), column, look);
-    text += "\n" + result_and_context(*contract, look);
+    text += "\n" + result_and_context(*contract, look) + reasons_text(operation.name, look);
     if (const OperationExample* const example = example_of(operation.name))
     {
         text += "\nExample\n";
@@ -203,6 +250,7 @@ Value json_of(const Contract& contract, const Operation* operation)
         .add("arguments", Value::list(std::move(arguments)))
         .add("returns", text_or_null(contract.result))
         .add("context", text_or_null(contract.context))
+        .add("reasons", reasons_json(contract.name))
         .add("example", example != nullptr ? Value::text(std::string(example->line)) : Value::null())
         .add("example_needs", Value::list(std::move(before)));
     return record;

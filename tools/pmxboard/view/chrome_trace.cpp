@@ -97,7 +97,15 @@ void ChromeTrace::operation_ends(const Outcome& outcome)
     release();
     show(states_now());
     advance_to(static_cast<std::uint64_t>(board::now().count()));
-    end_operation(to_json(outcome));
+    std::string arguments = to_json(outcome);
+    if (!m_refusal.empty())
+    {
+        arguments.pop_back();
+        arguments +=
+            (arguments.size() > 1 ? "," : "") + ("\"reason\":" + board::Value::text(m_refusal).to_json()) + "}";
+    }
+    m_refusal.clear();
+    end_operation(arguments);
 }
 
 void ChromeTrace::settle()

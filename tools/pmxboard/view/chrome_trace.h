@@ -31,6 +31,7 @@ public:
     void scenario(const std::string& name) override;
     void powered_on() override;
     void command(std::string_view line) override { m_command = line; }
+    void refusal(const std::string& sentence) override { m_refusal = sentence; }
     void operation_begins(const std::string& name) override;
     void operation_ends(const Outcome& outcome) override;
     void settle() override;
@@ -75,6 +76,7 @@ private:
     std::uint64_t m_tick = 0; ///< nanoseconds
     std::string m_command;
     std::string m_operation;
+    std::string m_refusal;         ///< of the operation that runs, where it is known
     bool m_stores_named = false;   ///< their lane, in this process
     bool m_operation_told = false; ///< by operation_begins, not found out from an entry
     std::vector<Finished> m_waiting;

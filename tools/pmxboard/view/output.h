@@ -58,6 +58,7 @@ public:
     Look look() const { return { text_width(), m_options.colour }; }
 
     void powered_on() { m_trace->powered_on(); }
+    void refusal(const std::string& sentence) { m_trace->refusal(sentence); }
     void operation_begins(const std::string& name) { m_trace->operation_begins(name); }
     void command(std::string_view line);
     void expectation(std::string_view line);

@@ -28,6 +28,8 @@ public:
     virtual void scenario(const std::string&) {}
     virtual void powered_on() {}
     virtual void command(std::string_view) {}
+    /** Why the operation that begins next will refuse. */
+    virtual void refusal(const std::string&) {}
     virtual void operation_begins(const std::string&) {}
     virtual void operation_ends(const Outcome&) {}
     /** The command is done: everything that it began has ended. */

@@ -1,0 +1,220 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
+#include "tools/pmxboard/language/explanation.h"
+
+#include <algorithm>
+#include <ostream>
+
+#include "board/board.h"
+#include "board/json.h"
+#include "board/threads.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/apart.h"
+#include "tools/pmxboard/language/session.h"
+#include "tools/pmxboard/reasons/twin.h"
+#include "tools/pmxboard/text/printable.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+using board::Json;
+
+/** As many requests are tried as an 8-bit argument has values, and some. */
+constexpr std::size_t most_tries = 300;
+
+/** What became of a command, on its way from one process to another. */
+Json packed(const std::string& kind, const std::string& message, const Session& session)
+{
+    Json reasons = Json::array();
+    for (const Reason& reason : told_reasons())
+        reasons.push_back({ reason.number, reason.a, reason.b, reason.file, reason.line, reason.function });
+    const Outcome& outcome = session.last_outcome();
+    return { { "kind", kind },
+             { "message", message },
+             { "operation", session.last_operation() },
+             { "outcome", to_json(outcome) },
+             { "answer", outcome.result ? outcome.result->to_text() : std::string() },
+             { "reasons", reasons } };
+}
+
+Json carried_out(Session& session, const std::string& command, std::ostream& shown)
+{
+    forget_told_reasons();
+    session.forget_outcome();
+    try
+    {
+        session.imagine(command, shown);
+        return packed("done", {}, session);
+    }
+    catch (const LineError& error)
+    {
+        return packed("wrong line", error.what(), session);
+    }
+    catch (const std::exception& error)
+    {
+        return packed("failed", error.what(), session);
+    }
+}
+
+/** Nobody reads it. */
+class Nowhere : public std::streambuf
+{
+protected:
+    int_type overflow(int_type c) override { return traits_type::not_eof(c); }
+};
+
+/** Carry commands out, one after the other, and tell what the last one did. In a copy of its own: the next one finds
+ *  everything as it was. */
+Json tried(Session& session, const std::vector<std::string>& commands)
+{
+    const Apart apart = run_apart([&](std::ostream&) {
+        Nowhere nowhere;
+        std::ostream shown(&nowhere);
+        Json last;
+        for (const std::string& command : commands)
+            last = carried_out(session, command, shown);
+        return board::written(last);
+    });
+    if (apart.death.empty() && !apart.answer.empty())
+        return Json::parse(apart.answer);
+    return { { "kind", "failed" }, { "message", "it would end the program: " + apart.death },
+             { "operation", "" },  { "outcome", "null" },
+             { "answer", "" },     { "reasons", Json::array() } };
+}
+
+Explanation unpacked(const std::string& command, const Json& json)
+{
+    Explanation explanation;
+    explanation.command = command;
+    explanation.operation = json.at("operation");
+    explanation.outcome = json.at("outcome");
+    explanation.answer = json.at("answer");
+    for (const Json& reason : json.at("reasons"))
+        explanation.reasons.push_back({ static_cast<PMX_REASON_T>(reason.at(0).get<int>()), reason.at(1), reason.at(2),
+                                        reason.at(3), reason.at(4), reason.at(5) });
+    if (json.at("kind") == "failed")
+        explanation.failure = json.at("message");
+    return explanation;
+}
+
+bool is_accepted(const std::string& command, const Json& json)
+{
+    return json.at("kind") == "done" && unpacked(command, json).refusal() == nullptr;
+}
+
+/** In the copy that the twin was led into. */
+std::string explained_there(Session& session, const std::string& command)
+{
+    lead_in_twin();
+    board::at_every_call({}); // nobody stops there
+    session.watch_stores(session.watches_stores());
+    Json answer = tried(session, { command });
+    answer["accepted"] = Json::array();
+    if (answer.at("kind") == "wrong line")
+        return board::written(answer);
+    const auto near = requests_near(unpacked(command, answer));
+    for (std::size_t i = 0; i < std::min(near.size(), most_tries); ++i)
+    {
+        if (is_accepted(command, tried(session, near[i])))
+        {
+            answer["accepted"] = near[i];
+            break;
+        }
+    }
+    return board::written(answer);
+}
+
+std::string line_of(const std::string& begin, const std::string& text, const Look& look)
+{
+    constexpr unsigned column = 11;
+    std::string line = "  " + begin;
+    line.append(column > line.size() ? column - line.size() : 1, ' ');
+    return wrapped(line + printable(text), look.width, 0, column);
+}
+
+} // namespace
+
+const Reason* Explanation::refusal() const
+{
+    // A failure on the way that stopped nothing stands before the one that did.
+    const auto found = std::find_if(reasons.rbegin(), reasons.rend(), is_refusal);
+    return found == reasons.rend() ? nullptr : &*found;
+}
+
+Explanation explain(Session& session, const std::string& command)
+{
+    if (const auto waiting = board::threads::waiting(); !waiting.empty())
+        throw StepFailed("explain copies the process, and a thread that waits cannot be copied: " + waiting.front());
+    session.output().flush();
+    find_twin();
+    const Apart apart = run_apart([&](std::ostream&) {
+        try
+        {
+            return explained_there(session, command);
+        }
+        catch (const std::exception& error)
+        {
+            return board::written(Json{ { "impossible", error.what() } });
+        }
+    });
+    if (!apart.death.empty() || apart.answer.empty())
+        throw StepFailed("the copy in which the command was to be explained ended: " + apart.death);
+    const Json answer = Json::parse(apart.answer);
+    if (answer.contains("impossible"))
+        throw StepFailed(answer.at("impossible").get<std::string>());
+    if (answer.at("kind") == "wrong line")
+        throw LineError(answer.at("message").get<std::string>());
+    Explanation explanation = unpacked(command, answer);
+    explanation.accepted = answer.at("accepted").get<std::vector<std::string>>();
+    return explanation;
+}
+
+std::string to_text(const Explanation& explanation, const Look& look)
+{
+    const Reason* const refusal = explanation.refusal();
+    const std::string what = explanation.operation.empty() ? explanation.command : explanation.operation;
+    const std::string with_answer = what + (explanation.answer.empty() ? "" : " = " + explanation.answer);
+    const bool has_refused = refusal != nullptr && row_of(refusal->number).class_of != PMX_REASON_CLASS_SAME;
+    std::string text = explanation.headline.empty() ? line_of(refusal == nullptr ? "done:"
+                                                              : has_refused      ? "refused:"
+                                                                                 : "nothing:",
+                                                              with_answer, look)
+                                                    : line_of(explanation.headline + ":", explanation.answer, look);
+    std::string begin = "because";
+    for (const Reason& reason : explanation.reasons)
+    {
+        text += line_of(begin, sentence_of(reason) + (&reason == refusal ? "" : "  (" + place_of(reason) + ")"), look);
+        begin = refusal != nullptr && &reason >= refusal ? "then" : "and";
+        if (&reason == refusal)
+        {
+            text += line_of("at", place_of(reason), look);
+            text += line_of("so", std::string(row_of(reason.number).advice), look);
+        }
+    }
+    if (!explanation.failure.empty())
+        text += line_of("but", explanation.failure, look);
+    for (const std::string& command : explanation.accepted)
+        text += line_of(&command == explanation.accepted.data() ? "accepted:" : "", command, look);
+    return text;
+}
+
+std::string to_json_line(const Explanation& explanation)
+{
+    const Reason* const refusal = explanation.refusal();
+    Json reasons = Json::array();
+    for (const Reason& reason : explanation.reasons)
+        reasons.push_back(board::json_of(json_of(reason)));
+    const Json line = { { "kind", "explanation" },
+                        { "command", printable(explanation.command) },
+                        { "operation", explanation.operation },
+                        { "outcome", Json::parse(explanation.outcome) },
+                        { "reason", refusal != nullptr ? board::json_of(json_of(*refusal)) : Json() },
+                        { "advice", refusal != nullptr ? Json(row_of(refusal->number).advice) : Json() },
+                        { "reasons", reasons },
+                        { "accepted", explanation.accepted },
+                        { "failure", explanation.failure.empty() ? Json() : Json(printable(explanation.failure)) } };
+    return board::written(line);
+}
+
+} // namespace pmxboard

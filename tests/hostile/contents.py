@@ -44,13 +44,14 @@ def scenario_lines():
     numbers = (b"1e400", b"-1", b"99999999999999999999999", b"0x", b"nan", b"4294967296", b"'", b'"', b'"\\x"')
     patterns = (b"advance %bs", b"loglevel %b", b"poke ucMode %b", b"state arOutputConf[%b]", b"fault x_sema_lock %b",
                 b"PMX_SetModeEx %b", b"sink valid %b %b", b"expect %b", b"source vdp%b start", b"flash %b %b",
-                b"what-if %b", b"meanwhile %b", b"power-on %b", b"neighbour %b", b"print %b", b"PMX_Printf 1 %b",
-                b"help %b", b"stores %b", b"state %b")
+                b"what-if %b", b"explain %b", b"why %b", b"meanwhile %b", b"power-on %b", b"neighbour %b",
+                b"print %b", b"PMX_Printf 1 %b", b"help %b", b"stores %b", b"state %b")
     found = {}
     for pattern in patterns:
         for number in numbers:
             line = pattern.replace(b"%b", number)
             found[line.decode()] = b"PMX_Init\n" + line + b"\n"
+    found["explain without end"] = b"explain " * 900 + b"PMX_Init\n"
     found["what-if without end"] = b"what-if " * 900 + b"PMX_Init\n"
     found["meanwhile without end"] = b"meanwhile x_sema_lock " * 400 + b"PMX_Init\n"
     found["expect deep"] = b"PMX_Init\nexpect call f(" + b"[" * DEEP + b"]" * DEEP + b")\n"

@@ -119,7 +119,8 @@ catch (const std::exception&)
 std::string why(const Scenario& scenario, const Session& session)
 try
 {
-    if (scenario.name == "-" || session.commands() == 0 || !board::threads::waiting().empty())
+    if (session.commands() == 0 || !board::threads::waiting().empty() ||
+        !std::filesystem::is_regular_file(scenario.name)) // a pipe has nothing to be read again
         return {};
     const Apart apart = run_apart([&](std::ostream&) { return explained_again(scenario, session.commands()); });
     return apart.death.empty() ? apart.answer : std::string();

@@ -96,7 +96,8 @@ constexpr std::string_view about_waiting =
 
 constexpr std::string_view looking_at_waiting =
     "  status graphics    whether they wait now, since when, until when and for whom\n"
-    "  status             the same, and what outputs and planes show\n"
+    "  why osd            the same, and for which request\n"
+    "  status             what outputs and planes show, too\n"
     "  display-part …     how long the display part takes\n"
     "  advance 3s         let time pass\n"
     "  For example: scenarios/first-look.pmx\n";

@@ -145,6 +145,8 @@ void find_twin()
 void lead_in_twin()
 {
     const Ways& known = ways();
+    if (board::executable_symbols::prefers())
+        return; // it is there: an explanation of an explanation
     for (const auto& [original, twin] : known.objects)
     {
         // Tables are equal, and read-only. A checked build pads what it compiled.

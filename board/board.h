@@ -4,6 +4,10 @@
  *  the board's own world run by turns, see threads.h. */
 #pragma once
 
+#if __cplusplus < 202002L
+#error "the board's headers are C++20: compile with -std=c++20; C programs include board/board_c.h"
+#endif
+
 #include <array>
 #include <chrono>
 #include <cstdint>
@@ -18,6 +22,7 @@
 
 #include "board/display_part.h"
 #include "board/hdmi_av.h"
+#include "board/installed_header.h"
 #include "board/meanwhile.h"
 #include "board/mixer.h"
 #include "board/trace.h"
@@ -55,7 +60,8 @@ std::vector<std::string> boards_by_name();
  *  directory. Relative paths in it are relative to the file. Unknown keys are errors. Throws DescriptionError. */
 Description load_description(const std::filesystem::path& board);
 
-/** Where named boards are looked up; the project's boards/ unless set. */
+/** Where named boards are looked up; unless set, the folder share/pmx/boards of the installation whose headers the
+ *  program was compiled with, or of a folder above the program. */
 void set_boards_directory(std::filesystem::path directory);
 
 /** Make the board as good as new, any number of times in a process: devices, clock, trace, faults, and the layer's own

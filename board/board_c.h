@@ -5,6 +5,8 @@
 #ifndef BOARD_C_H
 #define BOARD_C_H
 
+#include "board/installed_header.h"
+
 #ifdef __cplusplus
 extern "C" {
 #endif

@@ -3,6 +3,7 @@
 #include <limits>
 #include <toml++/toml.h>
 
+#include "board/boards_directory.h"
 #include "board/devices.h"
 #include "board/files.h"
 #include "board/names.h"
@@ -14,13 +15,7 @@ namespace
 
 std::filesystem::path& boards_directory()
 {
-    static std::filesystem::path directory = [] {
-        // Beside an installed tool, else the project's own.
-        std::error_code none;
-        const std::filesystem::path tool = std::filesystem::read_symlink("/proc/self/exe", none);
-        const std::filesystem::path installed = tool.parent_path() / "../share/pmx/boards";
-        return !none && std::filesystem::is_directory(installed, none) ? installed : PMX_SOURCE_DIR "/boards";
-    }();
+    static std::filesystem::path directory = found_boards_directory();
     return directory;
 }
 
@@ -336,7 +331,8 @@ std::filesystem::path find_file(const std::filesystem::path& board)
     }
     const std::vector<std::string> known = boards_by_name();
     throw DescriptionError("no such board: " + board.string() +
-                           suggestion(board.string(), { known.begin(), known.end() }));
+                           (known.empty() ? "; there is none in " + boards_directory().string()
+                                          : suggestion(board.string(), { known.begin(), known.end() })));
 }
 
 } // namespace

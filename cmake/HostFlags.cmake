@@ -12,6 +12,10 @@ set(is_batched "$<COMPILE_LANGUAGE:CXX>,$<BOOL:$<TARGET_PROPERTY:UNITY_BUILD>>")
 target_compile_options(pmx_host INTERFACE
     "$<$<AND:${is_batched}>:-Wno-shadow>"
     "$<$<AND:${is_batched},$<CXX_COMPILER_ID:GNU>>:-Wshadow=local;-Wno-subobject-linkage>")
+# What is handed to others does not tell where it was made, in debug information neither.
+target_compile_options(pmx_host INTERFACE
+    "$<$<CONFIG:Release,RelWithDebInfo,MinSizeRel>:-ffile-prefix-map=${PROJECT_SOURCE_DIR}/=>"
+    "$<$<CONFIG:Release,RelWithDebInfo,MinSizeRel>:-ffile-prefix-map=${PROJECT_BINARY_DIR}=build>")
 if(CMAKE_CROSSCOMPILING)
     # All of a program comes of one compiler: that it once passed some parameters otherwise is of no interest.
     target_compile_options(pmx_host INTERFACE -Wno-psabi)

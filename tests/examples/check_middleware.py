@@ -21,17 +21,20 @@ LINES = [
 ]
 
 
-def main():
-    run = subprocess.run(sys.argv[1:], capture_output=True, text=True, check=False)
+def check(command):
+    """Ends the program where the example does not do what it should."""
+    run = subprocess.run(command, capture_output=True, text=True, check=False)
     sys.stderr.write(run.stderr)
     if run.returncode != 0:
-        print(f"exit code {run.returncode}")
-        return 1
+        sys.exit(f"exit code {run.returncode}")
     printed = iter(run.stdout.splitlines())
     for line in LINES:
         if line not in printed:
-            print(f"not printed, or too early: {line}")
-            return 1
+            sys.exit(f"not printed, or too early: {line}")
+
+
+def main():
+    check(sys.argv[1:])
     return 0
 
 

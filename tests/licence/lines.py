@@ -18,7 +18,8 @@ import whole_file  # noqa: E402
 
 TAG = "SPDX-License-" + "Identifier:"  # apart, so that nobody takes this for a licence of its own
 LICENCE = f"{TAG} MIT OR GPL-2.0-only"
-COMMENTS = {".c": "// {}", ".cpp": "// {}", ".h": "// {}", ".h.in": "// {}", ".s.in": "/* {} */", ".md": "<!-- {} -->"}
+COMMENTS = {".c": "// {}", ".cpp": "// {}", ".h": "// {}", ".h.in": "// {}", ".s.in": "/* {} */", ".pc.in": "# {}",
+            ".md": "<!-- {} -->"}
 HASH = {".bash", ".clang-format", ".clang-tidy", ".cmake", ".gitignore", ".pmx", ".py", ".sh", ".supp", ".toml",
         ".txt", "Doxyfile", "dev", "run"}
 LICENCES = ("LICENSE", "LICENSES/*")

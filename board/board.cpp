@@ -3,6 +3,7 @@
 
 #include "board/devices.h"
 #include "board/layer_state.h"
+#include "board/replaced.h"
 #include "board/threads.h"
 
 namespace board
@@ -69,7 +70,23 @@ Value state()
     Value value;
     for (const Device& device : devices)
         value.add(std::string(device.name), device.state());
+    std::vector<Value> replaced;
+    for (std::string& function : replaced_functions())
+        replaced.push_back(Value::symbol(std::move(function)));
+    if (!replaced.empty())
+        value.add("replaced", Value::list(std::move(replaced)));
     return value;
+}
+
+std::vector<std::string> replaced_functions()
+{
+    std::vector<std::string> replaced;
+    for (const replaced::Function& function : replaced::functions())
+    {
+        if (function.linked != function.own)
+            replaced.emplace_back(function.name);
+    }
+    return replaced;
 }
 
 unsigned misuses()

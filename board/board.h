@@ -97,8 +97,13 @@ int resume();
 
 /** Everything that the devices hold, by device: os, console, flash, registers, interface_manager, power, mixer,
  *  tv_encoder, video_planes, osd_planes, sources, hdmi_av, display_part, display_control. Stable keys; numbers with
- *  their names. */
+ *  their names. Where replaced_functions() has any, they stand there as replaced: what those would have set is as it
+ *  was at power-on. */
 Value state();
+
+/** The platform functions for which this program has functions of its own in place of the board's, in the headers'
+ *  order; see replaced.h. */
+std::vector<std::string> replaced_functions();
 
 /** Number of reports since power-on. */
 unsigned asserts(); ///< through Assert

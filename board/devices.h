@@ -74,6 +74,9 @@ Value state();
 
 namespace mixer
 {
+/** How many values stand behind pointers to them. */
+inline constexpr unsigned PLANES = 8;
+inline constexpr unsigned GAMMA_POINTS = 9;
 void power_on(const Description& description);
 Value state();
 } // namespace mixer
@@ -92,6 +95,8 @@ Value state();
 
 namespace osd_planes
 {
+/** How many values stand behind a pointer to them. */
+inline constexpr unsigned PLANES_WITH_OFFSET = 5;
 void power_on(const Description& description);
 Value state();
 } // namespace osd_planes
@@ -104,6 +109,9 @@ Value state();
 
 namespace hdmi_av
 {
+/** What a command's parameter, or a query's, is recorded as. */
+CallArgument command_parameter(const void* parameter, std::uint32_t command);
+CallArgument query_parameter(void* parameter, std::uint32_t query);
 void power_on(const Description& description);
 Value state();
 } // namespace hdmi_av

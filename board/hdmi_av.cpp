@@ -15,7 +15,6 @@
 namespace
 {
 
-using board::CallArgument;
 using board::Value;
 using board::names::Family;
 
@@ -100,21 +99,6 @@ Value content(const Command& command, const void* parameter)
     return board::named(command.family, *static_cast<const UINT8*>(parameter));
 }
 
-CallArgument command_parameter(const void* pvParameter, UINT32 u4Command)
-{
-    const auto command = find_command(u4Command);
-    if (command == COMMANDS.end() || pvParameter == nullptr)
-        return board::trace_arguments::ignored(pvParameter);
-    return { content(*command, pvParameter) };
-}
-
-CallArgument query_parameter(void* pvParameter, UINT32 u4Query)
-{
-    if (u4Query != PMX_GET_VALID_RES_AND_VFREQ)
-        return board::trace_arguments::ignored(pvParameter);
-    return board::trace_arguments::record(static_cast<PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T*>(pvParameter));
-}
-
 Value reported(const std::array<Value, COMMANDS.size()>& parameters)
 {
     Value value = Value::record({});
@@ -159,6 +143,21 @@ Value state()
                            { "ccir_before_mixer", setting(av.ccir_before_mixer) } });
 }
 
+CallArgument command_parameter(const void* parameter, std::uint32_t number)
+{
+    const auto command = find_command(number);
+    if (command == COMMANDS.end() || parameter == nullptr)
+        return trace_arguments::ignored(parameter);
+    return { content(*command, parameter) };
+}
+
+CallArgument query_parameter(void* parameter, std::uint32_t query)
+{
+    if (query != PMX_GET_VALID_RES_AND_VFREQ)
+        return trace_arguments::ignored(parameter);
+    return trace_arguments::record(static_cast<PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T*>(parameter));
+}
+
 void plug(bool plugged)
 {
     trace::notice("plug", plugged ? "HDMI sink plugged in" : "HDMI sink unplugged");
@@ -177,6 +176,9 @@ void choose_resolution(std::optional<Resolution> resolution)
 }
 
 } // namespace board::hdmi_av
+
+using board::hdmi_av::command_parameter;
+using board::hdmi_av::query_parameter;
 
 BOOL fgPmxDrvSetAvd(UINT32 u4Command, void* pvParameter, UINT32 u4Length)
 try

@@ -18,10 +18,10 @@ namespace
 {
 
 using board::Value;
+using board::mixer::GAMMA_POINTS;
+using board::mixer::PLANES;
 using board::names::Family;
 
-constexpr unsigned PLANES = 8;
-constexpr unsigned GAMMA_POINTS = 9;
 constexpr INT32 REFUSED = -1;
 
 enum Swap : unsigned

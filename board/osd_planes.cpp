@@ -14,8 +14,8 @@ namespace
 
 using board::Value;
 using board::names::Family;
+using board::osd_planes::PLANES_WITH_OFFSET;
 
-constexpr unsigned PLANES_WITH_OFFSET = 5;
 constexpr INT32 DONE = 0;
 constexpr INT32 OSD_REFUSED = -1;
 

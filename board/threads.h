@@ -24,6 +24,7 @@ struct Context
     std::string_view by = "outside"; ///< who stores now: an operation, a platform function, …
     unsigned expiry_functions = 0;   ///< of timers, that run in it
     bool in_hook = false;            ///< of every call
+    std::string_view replacement{};  ///< the platform function in whose place a program's own one runs
 };
 
 /** The context of the thread that runs. */

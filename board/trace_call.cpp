@@ -98,9 +98,12 @@ CallSite::CallSite(std::string_view function_name, std::string_view tokens)
 }
 
 CallRecord::CallRecord(const CallSite& site, std::vector<CallArgument> arguments)
-    : m_site(site), m_arguments(std::move(arguments)), m_power_on(recorder().power_on),
-      m_fault(faults::due(site.function)), m_by_before(threads::context().by)
+    : m_site(site), m_is_handed_on(threads::context().replacement == site.function), m_arguments(std::move(arguments)),
+      m_sequence(0), m_power_on(recorder().power_on), m_by_before(threads::context().by)
 {
+    if (m_is_handed_on)
+        return;
+    m_fault = faults::due(site.function);
     trace::look();
     TraceEntry& entry = add_entry(TraceEntry::Kind::Call, site.function);
     m_sequence = entry.sequence;
@@ -116,6 +119,8 @@ CallRecord::CallRecord(const CallSite& site, std::vector<CallArgument> arguments
 
 CallRecord::~CallRecord()
 {
+    if (m_is_handed_on)
+        return;
     contained([this] {
         if (m_power_on != recorder().power_on)
             return;

@@ -5,7 +5,8 @@
  *      BOARD_CALL         functions without a result
  *      BOARD_CALL_R       functions with one: a scripted fault answers instead of acting
  *      BOARD_CALL_ACTING  functions that act also when a fault answers: they end in return boardCall.answer_or_fault(…)
- *      BOARD_CALL_END     behind the function's block: no exception leaves it; see contained.h
+ *      BOARD_CALL_END     behind the function's block: no exception leaves it, see contained.h, and a program may have
+ *                         a function of its own in its place, see replaced.h
  *
  *  Arguments, by their own tokens: a number, an enumeration, a function, a pointer to a changeable number (an output,
  *  read when the call ends), or one of the wrappers in trace_arguments. An output that a fault or boardCall.fail(…)
@@ -233,6 +234,7 @@ private:
     void write_outputs();
 
     const CallSite& m_site;
+    bool m_is_handed_on; ///< recorded already, by the call of what stands in its place
     std::vector<CallArgument> m_arguments;
     std::uint64_t m_sequence;
     std::uint64_t m_power_on;
@@ -326,9 +328,18 @@ public:
     if (boardCall.fault())                                  \
     return boardCall.fault_answer()
 
-#define BOARD_CALL_END(function)                                      \
+#define BOARD_CALL_CONTAINED(function)                                \
     catch (...)                                                       \
     {                                                                 \
         ::board::keep_failure(#function);                             \
         return ::board::failed_answer<BOARD_CALL_RESULT(function)>(); \
     }
+
+#define BOARD_PRAGMA(words) _Pragma(#words)
+
+/** A definition that gives way to any other one, however many sources are compiled together, and that can be reached
+ *  by a second name all the same. */
+#define BOARD_CALL_END(function)   \
+    BOARD_CALL_CONTAINED(function) \
+    BOARD_PRAGMA(weak function)    \
+    extern "C" decltype(function) board_##function __attribute__((alias(#function)));

@@ -13,6 +13,8 @@ foreach(name pmx pmx-board)
     configure_file(cmake/${name}.pc.in ${name}.pc @ONLY)
     install(FILES ${PROJECT_BINARY_DIR}/${name}.pc DESTINATION lib/pkgconfig)
 endforeach()
+install(FILES ${PROJECT_BINARY_DIR}/board/board_functions.h DESTINATION include/pmx/board)
+install(FILES ${PROJECT_BINARY_DIR}/board/recorded_calls.txt DESTINATION lib/pmx)
 install(DIRECTORY board/ DESTINATION include/pmx/board FILES_MATCHING PATTERN "*.h")
 install(TARGETS pmx_board pmxboard ARCHIVE DESTINATION lib/pmx RUNTIME DESTINATION bin)
 install(DIRECTORY boards scenarios examples DESTINATION share/pmx

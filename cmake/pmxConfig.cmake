@@ -37,7 +37,7 @@ if(board IN_LIST pmx_FIND_COMPONENTS)
         set_target_properties(pmx::board PROPERTIES
             IMPORTED_LOCATION "${PMX_PREFIX}/lib/pmx/libpmx_board.a"
             INTERFACE_LINK_LIBRARIES "${PMX_TOML_LIBRARY};stdc++;Threads::Threads"
-            INTERFACE_LINK_OPTIONS -no-pie
+            INTERFACE_LINK_OPTIONS "-no-pie;LINKER:@${PMX_PREFIX}/lib/pmx/recorded_calls.txt"
             INTERFACE_INCLUDE_DIRECTORIES "${PMX_PREFIX}/include/pmx")
         get_property(languages GLOBAL PROPERTY ENABLED_LANGUAGES)
         if(CXX IN_LIST languages)

@@ -149,10 +149,20 @@ def compiler_alone(user):
     demand(user.version, run("pkg-config", "--modversion", "pmx-board", env=user.environment), "pkg-config")
 
 
+def own_functions(user):
+    """Platform functions of a program's own: all of a driver's, and a single one."""
+    defined = run("nm", "--defined-only", user.prefix / "lib/pmx/libpmx_board.a")
+    for option in (user.prefix / "lib/pmx/recorded_calls.txt").read_text(encoding="utf-8").split():
+        demand(f" W {option.partition('=')[2]}\n", defined, "functions that give way")
+    place = user.built(HERE / "programs")
+    for program in ("whole_driver", "one_function"):
+        run(place / program)
+
+
 def use(cmake, prefix, version, flags):
     with tempfile.TemporaryDirectory() as folder:
         user = User(cmake, pathlib.Path(prefix), version, flags, pathlib.Path(folder))
-        for part in (examples, own_projects, refused, compiler_alone):
+        for part in (examples, own_projects, refused, compiler_alone, own_functions):
             part(user)
 
 
@@ -176,6 +186,7 @@ def install_and_use(cmake, build, version, flags):
         (folder / "checks").mkdir()
         for check in (HERE / "check_use.py", root / "tests/examples/check_middleware.py"):
             shutil.copy(check, folder / "checks")
+        shutil.copytree(HERE / "programs", folder / "checks/programs")
         hidden = hiding(root)
         done = subprocess.run([*hidden, sys.executable, str(folder / "checks/check_use.py"), "--here", cmake,
                                str(folder / "unpacked"), version, flags], check=False, cwd=folder)

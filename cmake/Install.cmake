@@ -16,7 +16,7 @@ endforeach()
 install(FILES ${PROJECT_BINARY_DIR}/board/board_functions.h DESTINATION include/pmx/board)
 install(FILES ${PROJECT_BINARY_DIR}/board/recorded_calls.txt DESTINATION lib/pmx)
 install(DIRECTORY board/ DESTINATION include/pmx/board FILES_MATCHING PATTERN "*.h")
-install(TARGETS pmx_board pmxboard ARCHIVE DESTINATION lib/pmx RUNTIME DESTINATION bin)
+install(TARGETS pmx_board_whole pmxboard ARCHIVE DESTINATION lib/pmx RUNTIME DESTINATION bin)
 install(DIRECTORY boards scenarios examples DESTINATION share/pmx
     PATTERN port_skeleton.py EXCLUDE PATTERN __pycache__ EXCLUDE)
 install(FILES ${PMX_PORT_SKELETON} DESTINATION share/pmx/examples)

@@ -107,6 +107,12 @@ bool is_global(const ElfW(Sym) & symbol)
     return (symbol.st_info >> 4) != STB_LOCAL;
 }
 
+/** What gives way to another definition; it may have a second name, which is not what people call it. */
+bool is_weak(const ElfW(Sym) & symbol)
+{
+    return (symbol.st_info >> 4) == STB_WEAK;
+}
+
 std::string_view name_of(const Table& from, const ElfW(Sym) & symbol)
 {
     if (symbol.st_name >= from.names_size)
@@ -210,7 +216,7 @@ std::string_view name_at(const void* address)
             continue;
         if (name.empty() || is_global(symbol))
             name = name_of(table(), symbol);
-        if (is_global(symbol))
+        if (is_weak(symbol))
             break;
     }
     if (prefers() && name.starts_with(preferred()))

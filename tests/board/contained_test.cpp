@@ -168,11 +168,12 @@ TEST_F(Contained, CProgram_IsTold)
     testing::internal::CaptureStderr();
     EXPECT_EQ(-1, board_c_power_on(nullptr));
     EXPECT_EQ(-1, board_c_power_on("no such board"));
+    EXPECT_EQ(0, board_c_power_on("default"));
     board::set_console([](std::string_view) { throw std::runtime_error("no paper"); });
     Printf("text");
     board_c_advance(1);
     const std::string told = testing::internal::GetCapturedStderr();
-    EXPECT_NE(std::string::npos, told.find("no board is named\n")) << told;
+    EXPECT_NE(std::string::npos, told.find("no board is given\n")) << told;
     EXPECT_NE(std::string::npos, told.find("no such board")) << told;
     EXPECT_NE(std::string::npos, told.find("Printf could not do its work: no paper\n")) << told;
 }

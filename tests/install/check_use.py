@@ -115,6 +115,7 @@ class User:
 def examples(user):
     place = user.built(user.prefix / "share/pmx/examples")
     check_middleware.check([place / "middleware"])
+    run("ctest", "--test-dir", place, "--no-tests=error")
 
 
 def own_projects(user):
@@ -141,9 +142,10 @@ def refused(user):
 
 def compiler_alone(user):
     place = user.written("alone", {"test.cpp": OWN_TEST, "port.c": OWN_PORT})
-    for name in ("middleware.c", "port_skeleton.c"):
+    for name in ("middleware.c", "middleware_test.c", "port_skeleton.c"):
         shutil.copy(user.prefix / "share/pmx/examples" / name, place)
     check_middleware.check([user.compiled("cc", place / "middleware.c", "pmx-board")])
+    run(user.compiled("cc", place / "middleware_test.c", "pmx-board"))
     run(user.compiled("c++ -std=c++20", place / "test.cpp", "pmx-board"))
     run(user.compiled("cc", place / "port.c", "pmx"))
     demand(user.version, run("pkg-config", "--modversion", "pmx-board", env=user.environment), "pkg-config")

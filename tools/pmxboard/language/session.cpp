@@ -318,6 +318,12 @@ void Session::end_window()
     m_console_end = board::console::printed();
 }
 
+void Session::open_window()
+{
+    m_window_end = std::string::npos;
+    m_console_end = std::string::npos;
+}
+
 std::vector<board::TraceEntry> Session::window() const
 {
     const auto& all = board::trace::entries();

@@ -63,6 +63,8 @@ public:
     /** What the command does from here on, or did until here, is what expectations look at. */
     void begin_window();
     void end_window();
+    /** What is done by others from here on is looked at as well, behind what the last command did. */
+    void open_window();
 
     /** Have stores in the trace from now on, where expectations see them; or no more. */
     void watch_stores(bool on);

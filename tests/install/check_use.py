@@ -11,6 +11,7 @@ Ends with 77 when all is well as far as it could be looked at, but the system di
 
 import os
 import pathlib
+import re
 import shlex
 import shutil
 import subprocess
@@ -151,6 +152,24 @@ def compiler_alone(user):
     demand(user.version, run("pkg-config", "--modversion", "pmx-board", env=user.environment), "pkg-config")
 
 
+# "…, in `player.c`:" and what stands in the block below it.
+FILE = re.compile(r"`([\w.]+)`[^`\n]*(?:\n[^`\n]+)*:\n\n```(?:c|cmake)\n(.*?)^```$", re.DOTALL | re.MULTILINE)
+COMMANDS = re.compile(r"^```shell\n(.*?)^```$", re.DOTALL | re.MULTILINE)
+
+
+def guide(user):
+    """The guide's files, and its commands one after the other."""
+    text = (user.prefix / "share/doc/pmx/testing.md").read_text(encoding="utf-8")
+    files = dict(FILE.findall(text))
+    commands = COMMANDS.findall(text)
+    if len(files) != text.count("```c\n") + text.count("```cmake\n") or len(commands) < 4:
+        sys.exit(f"testing.md: not every file has a name: {', '.join(files)}; {len(commands)} blocks of commands")
+    flags = " ".join(user.flags)
+    compiler = f'cc() {{ command cc {flags} "$@"; }}\n'
+    run("bash", "-euo", "pipefail", "-c", compiler + "".join(commands), cwd=user.written("guide", files),
+        env={**os.environ, "PMX": str(user.prefix), "CFLAGS": flags, "LDFLAGS": flags})
+
+
 def own_functions(user):
     """Platform functions of a program's own: all of a driver's, and a single one."""
     defined = run("nm", "--defined-only", user.prefix / "lib/pmx/libpmx_board.a")
@@ -164,7 +183,7 @@ def own_functions(user):
 def use(cmake, prefix, version, flags):
     with tempfile.TemporaryDirectory() as folder:
         user = User(cmake, pathlib.Path(prefix), version, flags, pathlib.Path(folder))
-        for part in (examples, own_projects, refused, compiler_alone, own_functions):
+        for part in (examples, own_projects, refused, compiler_alone, own_functions, guide):
             part(user)
 
 

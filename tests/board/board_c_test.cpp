@@ -254,28 +254,4 @@ TEST_F(BoardC, InsideACall_WhatWouldEndItIsRefused)
     EXPECT_EQ(0, board_c_expect("call TVE_SetEnable(1, 1)"));
 }
 
-/** In a process that has not powered a board on. */
-[[noreturn]] void use_without_power()
-{
-    long long number = 0;
-    BOARD_C_ENTRY_T entry;
-    int failed = board_c_finish() + board_c_do("sink unplug") + board_c_advance(1) + board_c_forget() +
-                 board_c_expect("no-more") + board_c_count("TVE_SetEnable(...)") + board_c_entry(0, &entry) +
-                 board_c_argument_number(0, "u4Tve", &number) + board_c_print_entries() +
-                 board_c_state_number("ucMode", &number) +
-                 board_c_meanwhile("TVE_SetEnable", 1, 0, look_inside, nullptr);
-    if (board_c_argument(0, "u4Tve") != nullptr || board_c_state("ucMode") != nullptr || board_c_console() != nullptr)
-        failed = 0;
-    failed += static_cast<int>(board_c_entries());
-    std::fprintf(stderr, "%d failed: %s\n", failed, board_c_error());
-    std::exit(0);
-}
-
-TEST(BoardCDeathTest, WithoutPower_EverythingSaysSo)
-{
-    testing::FLAGS_gtest_death_test_style = "threadsafe";
-    EXPECT_EXIT(use_without_power(), testing::ExitedWithCode(0),
-                "-11 failed: the board has no power: board_c_power_on comes first");
-}
-
 } // namespace

@@ -3,8 +3,8 @@
 """What a project elsewhere does with an installation: finds it, builds the examples and programs of its own, runs them.
 The installation has been moved since it was made, and the tree that it was made from cannot be seen.
 
-usage: check_use.py CMAKE BUILD_DIRECTORY VERSION FLAGS
-       check_use.py --here CMAKE PREFIX VERSION FLAGS     this installation, with what can be seen
+usage: check_use.py CMAKE BUILD_DIRECTORY VERSION
+       check_use.py --here CMAKE PREFIX VERSION     this installation, with what can be seen
 
 Ends with 77 when all is well as far as it could be looked at, but the system did not let the tree be hidden.
 """
@@ -78,11 +78,9 @@ def demand(what, text, place):
 class User:
     """Somebody with a folder of his own and an installation."""
 
-    def __init__(self, cmake, prefix, version, flags, folder):
+    def __init__(self, cmake, prefix, version, folder):
         self.cmake, self.prefix, self.version, self.folder = cmake, prefix, version, folder
-        self.flags = flags.split()
-        self.options = ["-G", "Ninja", f"-DCMAKE_PREFIX_PATH={prefix}", f"-DCMAKE_EXE_LINKER_FLAGS={flags}",
-                        f"-DCMAKE_C_FLAGS=-Wall -Wextra -Werror {flags}", f"-DCMAKE_CXX_FLAGS={flags}"]
+        self.options = ["-G", "Ninja", f"-DCMAKE_PREFIX_PATH={prefix}", "-DCMAKE_C_FLAGS=-Wall -Wextra -Werror"]
         self.environment = {**os.environ, "PKG_CONFIG_PATH": str(prefix / "lib/pkgconfig")}
 
     def written(self, name, files):
@@ -109,7 +107,7 @@ class User:
         """By the compiler alone, with what pkg-config says."""
         flags = run("pkg-config", "--cflags", "--libs", package, env=self.environment).split()
         program = source.with_suffix("")
-        run(*shlex.split(compiler), source, *more, "-o", program, *self.flags, *flags)
+        run(*shlex.split(compiler), source, *more, "-o", program, *flags)
         return program
 
 
@@ -164,26 +162,24 @@ def guide(user):
     commands = COMMANDS.findall(text)
     if len(files) != text.count("```c\n") + text.count("```cmake\n") or len(commands) < 4:
         sys.exit(f"testing.md: not every file has a name: {', '.join(files)}; {len(commands)} blocks of commands")
-    flags = " ".join(user.flags)
-    compiler = f'cc() {{ command cc {flags} "$@"; }}\n'
-    run("bash", "-euo", "pipefail", "-c", compiler + "".join(commands), cwd=user.written("guide", files),
-        env={**os.environ, "PMX": str(user.prefix), "CFLAGS": flags, "LDFLAGS": flags})
+    run("bash", "-euo", "pipefail", "-c", "".join(commands), cwd=user.written("guide", files),
+        env={**os.environ, "PMX": str(user.prefix)})
 
 
-def own_functions(user):
-    """Platform functions of a program's own: all of a driver's, and a single one."""
+def programs(user):
+    """Platform functions of a program's own, all of a driver's and a single one; and a board without power."""
     defined = run("nm", "--defined-only", user.prefix / "lib/pmx/libpmx_board.a")
     for option in (user.prefix / "lib/pmx/recorded_calls.txt").read_text(encoding="utf-8").split():
         demand(f" W {option.partition('=')[2]}\n", defined, "functions that give way")
     place = user.built(HERE / "programs")
-    for program in ("whole_driver", "one_function"):
+    for program in ("whole_driver", "one_function", "no_power"):
         run(place / program)
 
 
-def use(cmake, prefix, version, flags):
+def use(cmake, prefix, version):
     with tempfile.TemporaryDirectory() as folder:
-        user = User(cmake, pathlib.Path(prefix), version, flags, pathlib.Path(folder))
-        for part in (examples, own_projects, refused, compiler_alone, own_functions, guide):
+        user = User(cmake, pathlib.Path(prefix), version, pathlib.Path(folder))
+        for part in (examples, own_projects, refused, compiler_alone, programs, guide):
             part(user)
 
 
@@ -197,7 +193,7 @@ def hiding(root):
     return []
 
 
-def install_and_use(cmake, build, version, flags):
+def install_and_use(cmake, build, version):
     root = HERE.parents[1]
     with tempfile.TemporaryDirectory() as directory:
         folder = pathlib.Path(directory)
@@ -210,7 +206,7 @@ def install_and_use(cmake, build, version, flags):
         shutil.copytree(HERE / "programs", folder / "checks/programs")
         hidden = hiding(root)
         done = subprocess.run([*hidden, sys.executable, str(folder / "checks/check_use.py"), "--here", cmake,
-                               str(folder / "unpacked"), version, flags], check=False, cwd=folder)
+                               str(folder / "unpacked"), version], check=False, cwd=folder)
     if done.returncode == 0 and not hidden:
         print("the tree could be seen: this system lets nobody mount over it")
         return SKIPPED

@@ -1,7 +1,8 @@
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 # find_package(pmx 1): pmx::layer is the object that ships, with its headers; pmx::board the virtual board under it, for
 # programs in C and C++. Whoever has no use for one of them names the other: COMPONENTS layer.
-get_filename_component(PMX_PREFIX "${CMAKE_CURRENT_LIST_DIR}/../../.." ABSOLUTE)
+get_filename_component(PMX_PREFIX "${CMAKE_CURRENT_LIST_DIR}" REALPATH)   # /lib may be a link to /usr/lib
+get_filename_component(PMX_PREFIX "${PMX_PREFIX}/../../.." ABSOLUTE)
 
 if(NOT pmx_FIND_COMPONENTS)
     set(pmx_FIND_COMPONENTS layer board)

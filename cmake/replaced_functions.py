@@ -6,9 +6,10 @@ functions of their own; see board/replaced.h.
 usage: replaced_functions.py OUTPUT DEVICE...
 
 OUTPUT is one of
-    ….cpp   records the calls of such functions, and knows which of them there are
-    ….h     declares the board's functions by their second names
-    ….txt   has the linker lead calls through the recording
+    replaced_functions.cpp   records the calls of such functions, and knows which of them there are
+    board_functions.h        declares the board's functions by their second names
+    weak_functions.h         has the board's functions give way, for a compiler that wants to know it beforehand
+    recorded_calls.txt       has the linker lead calls through the recording
 """
 
 import pathlib
@@ -111,8 +112,11 @@ std::span<const Function> functions()
 """
 
 
+def includes():
+    return "\n".join(f'#include "{pathlib.PurePath(name).name}"' for name in PLATFORM_HEADERS)
+
+
 def header(listed):
-    includes = "\n".join(f'#include "{pathlib.PurePath(name).name}"' for name in PLATFORM_HEADERS)
     declared = "\n".join(f"{function.result} board_{function.name}({function.declared});" for function in listed)
     return f"""// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Written from the platform headers when the board is built: the board's platform functions by their second names. A
@@ -121,7 +125,7 @@ def header(listed):
 #ifndef BOARD_FUNCTIONS_H
 #define BOARD_FUNCTIONS_H
 
-{includes}
+{includes()}
 
 #ifdef __cplusplus
 extern "C" {{
@@ -137,6 +141,10 @@ extern "C" {{
 """
 
 
+def weak(listed):
+    return includes() + "\n" + "".join(f"#pragma weak {function.name}\n" for function in listed)
+
+
 def linker_options(listed):
     return "".join(f"--wrap={function.name}\n" for function in listed if function.name not in OF_THE_CONSOLE)
 
@@ -144,9 +152,9 @@ def linker_options(listed):
 def main():
     output, *devices = map(pathlib.Path, sys.argv[1:])
     listed = [function for name in PLATFORM_HEADERS for function in functions(ROOT / name)]
-    texts = {".cpp": lambda: source(listed, devices), ".h": lambda: header(listed),
-             ".txt": lambda: linker_options(listed)}
-    output.write_text(texts[output.suffix](), encoding="utf-8")
+    texts = {"replaced_functions.cpp": lambda: source(listed, devices), "board_functions.h": lambda: header(listed),
+             "weak_functions.h": lambda: weak(listed), "recorded_calls.txt": lambda: linker_options(listed)}
+    output.write_text(texts[output.name](), encoding="utf-8")
 
 
 if __name__ == "__main__":

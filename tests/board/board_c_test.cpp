@@ -195,6 +195,9 @@ TEST_F(BoardC, BadInput_IsTold)
     refused(board_c_do("  # nothing"), "no command is given");
     refused(board_c_do("advance 1s\nadvance 1s"), "one command at a time");
     refused(board_c_do("sink unplugg"), "sink unplug");
+    refused(board_c_do(std::string(100000, 'x').c_str()), "no command xxx");
+    EXPECT_GT(1000u, std::string(board_c_error()).size());
+    refused(board_c_do("\xFF\x1B"), "no command \\xFF\\x1B");
     refused(board_c_do("PMX_Inti"), "PMX_Init");
     refused(board_c_do("fault TVE_SetEnable 1"), "has no result");
     refused(board_c_do("power-on nowhere"), "no such board: nowhere");

@@ -13,6 +13,7 @@
 #include "board/board.h"
 #include "board/threads.h"
 #include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/runner.h"
 #include "tools/pmxboard/language/session.h"
 #include "tools/pmxboard/language/verbs.h"
 #include "tools/pmxboard/state/now.h"
@@ -39,8 +40,8 @@ std::string& last_error()
 
 void tell(const char* what)
 {
-    last_error() = what;
-    std::fprintf(stderr, "%s\n", pmxboard::printable(what).c_str());
+    last_error() = pmxboard::presentable(what);
+    std::fprintf(stderr, "%s\n", last_error().c_str());
 }
 
 /** Whether the action was done; a C program has nobody who catches, so what went wrong is told here. */

@@ -149,6 +149,11 @@ const char* board_c_state(const char* szPath);
  *  @return 0; -1 when there is nothing, or no number */
 int board_c_state_number(const char* szPath, long long* pi8Number);
 
+/** Read what the state means, as the verb status shows it: outputs, planes, graphics, disagreements of record and
+ *  hardware.
+ *  @return lines of at most 80 columns; null without power */
+const char* board_c_status(void);
+
 /** Ask whether this program has a platform function of its own in place of the board's.
  *  @param szFunction  the platform function
  *  @return 0 the board's; 1 the program's; -1 when there is no such function */

@@ -113,6 +113,10 @@ TEST_F(BoardC, State_IsReadFromBoardAndLayer)
     TVE_SetEnable(1, TRUE);
     EXPECT_STREQ("1", board_c_state("tv_encoder.encoders[1].enabled"));
     EXPECT_STREQ("RES_1080P60HZ", board_c_state("ucMode"));
+    const std::string status = board_c_status();
+    EXPECT_EQ(0u, status.find("Board default, 2 ms after power-on\n")) << status;
+    EXPECT_NE(std::string::npos, status.find("RES_1080P60HZ")) << status;
+    EXPECT_EQ(std::string::npos, status.find("Not the board's own")) << status;
     long long number = 0;
     EXPECT_EQ(0, board_c_state_number("record.ucMode", &number));
     EXPECT_EQ(RES_1080P60HZ, number);

@@ -172,7 +172,11 @@ def programs(user):
     for option in (user.prefix / "lib/pmx/recorded_calls.txt").read_text(encoding="utf-8").split():
         demand(f" W {option.partition('=')[2]}\n", defined, "functions that give way")
     place = user.built(HERE / "programs")
-    for program in ("whole_driver", "one_function", "no_power"):
+    saved = user.folder / "own driver.json"
+    run(place / "whole_driver", saved)
+    for reader in (("status",), ("status", "--json"), ("state",), ("state", "--json")):
+        demand("TVE_SetFmtEx", run(user.prefix / "bin/pmxboard", *reader, saved), " ".join(reader))
+    for program in ("one_function", "no_power"):
         run(place / program)
 
 

@@ -160,6 +160,21 @@ TEST(Status, WhatADriverTookBefore_IsWhatTheOutputShows)
               status.disagreements);
 }
 
+TEST(Status, FunctionsThatAreNotTheBoards_AreNamedAndNotComparedWith)
+{
+    after("PMX_Init\npoke ucMode RES_480P");
+    Value state = pmxboard::whole_state();
+    EXPECT_EQ(1u, status_of(state, "default").disagreements.size());
+    EXPECT_EQ(std::string::npos, pmxboard::to_json(status_of(state, "default")).find("replaced"));
+    state.add("replaced", Value::list({ Value::symbol("TVE_SetHue"), Value::symbol("x_timer_stop") }));
+    const Status status = status_of(state, "default");
+    EXPECT_EQ(std::vector<std::string>{}, status.disagreements);
+    EXPECT_EQ(R"(["TVE_SetHue","x_timer_stop"])", Json::parse(pmxboard::to_json(status)).at("replaced").dump());
+    EXPECT_TRUE(to_text(status, StatusPart::All, {})
+                    .ends_with("Not the board's own, so that what they have set is not known here\n"
+                               "  TVE_SetHue, x_timer_stop\n"));
+}
+
 TEST(Status, OneModeOnAllOutputs_LeavesTheirRecord_AndThatIsNoDisagreement)
 {
     const Status status = after("PMX_Init\nPMX_SetMode 0 RES_720P50HZ 50 0");

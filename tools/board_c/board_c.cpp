@@ -17,6 +17,7 @@
 #include "tools/pmxboard/language/session.h"
 #include "tools/pmxboard/language/verbs.h"
 #include "tools/pmxboard/state/now.h"
+#include "tools/pmxboard/state/status.h"
 #include "tools/pmxboard/text/printable.h"
 
 namespace
@@ -340,6 +341,17 @@ int board_c_state_number(const char* szPath, long long* pi8Number)
         need_place(pi8Number, "the number");
         *pi8Number = number_of(pmxboard::state_at(given(szPath, "path")), szPath);
     });
+}
+
+const char* board_c_status(void)
+{
+    static std::string text;
+    const bool is_read = is_done([] {
+        session();
+        const auto status = pmxboard::status_of(pmxboard::whole_state(), board::description().name);
+        text = pmxboard::to_text(status, pmxboard::StatusPart::All, {});
+    });
+    return is_read ? text.c_str() : nullptr;
 }
 
 int board_c_is_replaced(const char* szFunction)

@@ -41,6 +41,7 @@ int main(void)
     vFails("print_entries", board_c_print_entries() == -1);
     vFails("state", board_c_state("ucMode") == NULL);
     vFails("state_number", board_c_state_number("ucMode", &i8Number) == -1);
+    vFails("status", board_c_status() == NULL);
     vFails("console", board_c_console() == NULL);
     board_c_show_console(1);
     board_c_console_level(9);

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 // All functions of the TV encoder driver are the program's own.
 #include "bench.h"
+#include "board/board_c.h"
 #include "own_encoder.h"
 
 namespace
@@ -58,13 +59,28 @@ void state_says_whose_it_is()
            "the board's own device has been set");
 }
 
+/** For people, for programs, and in a state that somebody else reads. */
+void status_says_whose_it_is(const char* file)
+{
+    demand(board_c_power_on("default") == 0 && board_c_do("PMX_Init") == 0, board_c_error());
+    set_mode();
+    const std::string status = board_c_status();
+    demand(status.find("Not the board's own") != status.npos && status.find("TVE_SetFmtEx") != status.npos, status);
+    demand(status.find("disagree") == status.npos, status);
+    demand(std::string(board_c_state("replaced[0]")) == "TVE_SetFmtEx" && board_c_is_replaced("TVE_SetHue") == 1,
+           "the state does not say whose the functions are");
+    demand(board_c_do((std::string("save \"") + file + "\"").c_str()) == 0, board_c_error());
+    demand(board_c_finish() == 0, board_c_error());
+}
+
 } // namespace
 
-int main()
+int main(int, char** arguments)
 {
     calls_arrive_and_are_recorded();
     answers_are_the_drivers_own();
     faults_answer_in_its_place();
     meanwhiles_happen_in_its_calls();
     state_says_whose_it_is();
+    status_says_whose_it_is(arguments[1]);
 }

@@ -325,7 +325,10 @@ Status status_of(const Value& state, const std::string& board)
     for (unsigned plane = 0; plane < planes; ++plane)
         status.planes.push_back(status_of_plane(view, plane, ports[plane]));
     status.graphics = graphics_of(view);
-    if (status.initialised)
+    const Value replaced = view.at("replaced");
+    for (const Value& function : replaced.items())
+        status.replaced.push_back(function.string());
+    if (status.initialised && status.replaced.empty())
         status.disagreements = disagreements_of(view, status.outputs);
     return status;
 }

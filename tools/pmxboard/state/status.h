@@ -84,6 +84,7 @@ struct Status
     std::vector<std::string> swaps; ///< "1 and 2"
     GraphicsStatus graphics;
     std::vector<std::string> disagreements; ///< of the record with the devices, a sentence each
+    std::vector<std::string> replaced;      ///< platform functions that are not the board's: nobody compares, then
 };
 
 /** A state that lacks something, as a stranger's may, tells nothing of it. */

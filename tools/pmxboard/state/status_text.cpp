@@ -187,6 +187,17 @@ std::string disagreements_text(const Status& status, const Look& look)
     return text.empty() ? text : look.bold("The record and the hardware disagree") + "\n" + text;
 }
 
+std::string replaced_text(const Status& status, const Look& look)
+{
+    std::string text;
+    for (const std::string& function : status.replaced)
+        text += (text.empty() ? "" : ", ") + function;
+    if (text.empty())
+        return text;
+    return look.bold("Not the board's own, so that what they have set is not known here") + "\n" +
+           wrapped(printable(text), look.width, 2, 2);
+}
+
 std::string all_text(const Status& status, const Look& look)
 {
     return look.bold("Board " + printable(status.board)) + ", " + moment(status.now_us) + " after power-on\n" +
@@ -290,6 +301,15 @@ Json json_of(const Status& status)
              { "disagreements", status.disagreements } };
 }
 
+/** With what only few programs have. */
+Json whole_json_of(const Status& status)
+{
+    Json json = json_of(status);
+    if (!status.replaced.empty())
+        json["replaced"] = status.replaced;
+    return json;
+}
+
 } // namespace
 
 std::string to_text(const Status& status, StatusPart part, const Look& look)
@@ -301,20 +321,20 @@ std::string to_text(const Status& status, StatusPart part, const Look& look)
     case StatusPart::Graphics: return graphics_text(status, look);
     case StatusPart::All: break;
     }
-    return all_text(status, look);
+    return all_text(status, look) + replaced_text(status, look);
 }
 
 std::string to_json(const Status& status)
 {
     Json json = { { "schema", "pmxboard-status" }, { "version", status_schema_version } };
-    json.update(json_of(status));
+    json.update(whole_json_of(status));
     return board::written(json, 2);
 }
 
 std::string to_json_line(const Status& status)
 {
     Json json = { { "kind", "status" }, { "version", status_schema_version } };
-    json.update(json_of(status));
+    json.update(whole_json_of(status));
     return board::written(json);
 }
 

@@ -121,7 +121,7 @@ def own_projects(user):
     cpp = user.built(user.project("default_cpp", "CXX", "test.cpp", OWN_TEST))
     demand("PMX_HalSetMode(0, RES_1080P60HZ)", run(cpp / "user"), "C++ as a compiler takes it by default")
     both = user.built(user.project("c_and_cpp", "C CXX", "test.c", NO_BOARD))
-    demand("no such board: nobody; there are: default", run(both / "user"), "a board that does not exist")
+    demand("no such board: nobody; there are: ", run(both / "user"), "a board that does not exist")
     own = user.project("port", "C", "port.c", OWN_PORT, more="COMPONENTS layer", targets="pmx::layer")
     shutil.copy(user.prefix / "share/pmx/examples/port_skeleton.c", own)
     run(user.built(own) / "user")

@@ -33,6 +33,7 @@ constexpr Device devices[] = {
     { "hdmi_av", hdmi_av::power_on, hdmi_av::state },
     { "display_part", display_part::power_on, display_part::state },
     { "display_control", display_control::power_on, display_control::state },
+    { "faults", faults::power_on, faults::state }, // behind the clock, which they may last by
 };
 
 struct Board
@@ -52,7 +53,8 @@ void power_on(const Description& wanted)
         mixer::check_order(arrangement.order);
     threads::end_all();
     meanwhiles::forget_all();
-    faults::power_on(given);
+    for (const Fault& fault : given.faults)
+        faults::check(fault);
     layer_state::restore();
     board_state = { given, 0 };
     for (const Device& device : devices)

@@ -2,9 +2,11 @@
 // The one place of the board that knows the TOML library: it compiles slowly.
 #include <limits>
 #include <toml++/toml.h>
+#include <tuple>
 
 #include "board/boards_directory.h"
 #include "board/devices.h"
+#include "board/duration.h"
 #include "board/files.h"
 #include "board/names.h"
 
@@ -212,7 +214,19 @@ void read_display_part(const File& file, const toml::node& node, Description& de
     }
 }
 
-/** When a fault answers: one of on, from and always; without any of them the first call. */
+std::chrono::microseconds time_at(const File& file, const toml::node& node, const std::string& key)
+try
+{
+    if (const auto time = read_duration(text_at(file, node, key)))
+        return *time;
+    file.wrong(node.source(), key + " has to be a time: 10s, 500ms or 2us");
+}
+catch (const std::invalid_argument& error)
+{
+    file.wrong(node.source(), error.what());
+}
+
+/** When a fault answers: one of on, from, for and always; without any of them the first call. */
 void read_moment(const File& file, const toml::table& table, Fault& fault)
 {
     unsigned given = 0;
@@ -233,8 +247,30 @@ void read_moment(const File& file, const toml::table& table, Fault& fault)
         fault.when = Fault::When::Always;
         ++given;
     }
+    if (const toml::node* const node = table.get("for"))
+    {
+        fault.time = time_at(file, *node, "for of a fault");
+        fault.when = Fault::When::For;
+        ++given;
+    }
     if (given > 1)
-        file.wrong(table.source(), "a fault takes one of on, from and always");
+        file.wrong(table.source(), "a fault takes one of on, from, for and always");
+}
+
+/** What a fault sets outputs to: a number, or a text as a scenario has it. */
+void read_outputs(const File& file, const toml::table& table, Fault& fault)
+{
+    const toml::node* const node = table.get("outputs");
+    if (node == nullptr)
+        return;
+    if (!node->is_table())
+        file.wrong(node->source(), "outputs of a fault has to be a table: { phTimer = 7 }");
+    for (const auto& [key, value] : *node->as_table())
+    {
+        const std::string name(key.str());
+        fault.outputs.push_back({ name, value.is_integer() ? std::to_string(value.as_integer()->get())
+                                                           : text_at(file, value, "the output " + name) });
+    }
 }
 
 Fault read_fault(const File& file, const toml::node& node)
@@ -242,18 +278,19 @@ Fault read_fault(const File& file, const toml::node& node)
     const toml::table* const table = node.as_table();
     if (table == nullptr)
         file.wrong(node.source(), "a fault has to be a table: [[fault]]");
-    check_keys(file, *table, { "function", "answer", "on", "from", "always" }, " in [[fault]]");
+    check_keys(file, *table, { "function", "answer", "on", "from", "for", "always", "outputs" }, " in [[fault]]");
     const toml::node* const function = table->get("function");
     const toml::node* const answer = table->get("answer");
     if (function == nullptr || answer == nullptr)
         file.wrong(table->source(), "a fault needs function and answer");
     Fault fault;
-    fault.function = text_at(file, *function, "function of a fault");
     fault.answer = number_at(file, *answer, "answer of a fault", std::numeric_limits<std::int32_t>::min(),
                              std::numeric_limits<std::uint32_t>::max());
     read_moment(file, *table, fault);
+    read_outputs(file, *table, fault);
     try
     {
+        std::tie(fault.function, fault.arguments) = faults::read_call(text_at(file, *function, "function of a fault"));
         faults::check(fault);
     }
     catch (const std::invalid_argument& error)

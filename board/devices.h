@@ -137,10 +137,11 @@ void power_on();
 namespace faults
 {
 void power_on(const Description& description);
+Value state();
 /** Throws std::invalid_argument when a fault cannot be scripted: see faults::set. */
 void check(const Fault& fault);
-/** Counts a call that begins; the answer when a scripted fault is due. */
-std::optional<std::int64_t> due(std::string_view function);
+/** Counts a call that begins; the fault that is due. */
+std::optional<Fault> due(const TraceEntry& call);
 } // namespace faults
 
 /** "; did you mean X, Y?" with the platform functions whose names are nearest, or nothing. */

@@ -127,7 +127,10 @@ BOARD_CALL_END(i4ImUnregisterInterface2)
 INT32 i4ImQueryInterface(UINT16 u2CompType, UINT16 u2CompId, UINT32 u4IfId, void** ppvIf, void** ppvTag)
 try
 {
-    BOARD_CALL_R(i4ImQueryInterface, u2CompType, u2CompId, u4IfId, object(ppvIf), tag(ppvTag));
+    BOARD_CALL_ACTING(i4ImQueryInterface, u2CompType, u2CompId, u4IfId, object(ppvIf), tag(ppvTag));
+    // A success without a table would have the caller jump to nowhere: such an answer needs one that is there.
+    if (boardCall.fault() && static_cast<INT32>(boardCall.fault()->answer) < 0)
+        return boardCall.fault_answer();
     const Key key{ u2CompType, u2CompId, u4IfId };
     if (ppvIf == nullptr || ppvTag == nullptr)
     {
@@ -136,11 +139,16 @@ try
     }
     const auto found = interface_manager_state.find(key);
     if (found == interface_manager_state.end())
+    {
+        if (boardCall.fault())
+            board::trace::notice("fault", "i4ImQueryInterface: there is no table of " + key_text(key) +
+                                              " to succeed with, and the query fails");
         return boardCall.fail(-1);
+    }
     ++found->second.held;
     *ppvIf = const_cast<void*>(found->second.table);
     *ppvTag = found->second.tag;
-    return boardCall.answer(0);
+    return boardCall.answer_or_fault(0);
 }
 BOARD_CALL_END(i4ImQueryInterface)
 

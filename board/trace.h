@@ -25,6 +25,7 @@
  *  u4Count), record(prRecord), ignored(pvArg). */
 #pragma once
 
+#include <chrono>
 #include <cstdint>
 #include <functional>
 #include <memory>
@@ -33,6 +34,7 @@
 #include <string>
 #include <string_view>
 #include <type_traits>
+#include <utility>
 #include <vector>
 
 #include "board/value.h"
@@ -171,32 +173,64 @@ struct Fault
     {
         On,   ///< the n-th call from now alone
         From, ///< the n-th call from now and every later one
-        Always
+        Always,
+        For ///< every call for a time of the board's clock
+    };
+    /** What an output is set to, written as in a scenario: "7", "[0x0C, 0]", "{u4ValidAutoRes=RES_480P}". */
+    struct Output
+    {
+        std::string name;
+        std::string value;
     };
 
     std::string function;
     std::int64_t answer = 0;
     When when = When::On;
     unsigned n = 1;
+    std::string arguments{};          ///< "PMX_SET_HDMI_RES_CHG, ...": calls with these alone; empty: all of them
+    std::chrono::microseconds time{}; ///< of When::For
+    std::vector<Output> outputs{};    ///< the others are left alone
 };
 
 namespace faults
 {
 
-/** Script a fault; a later one for the same function replaces it. Throws std::invalid_argument when there is no such
- *  function or it has no result; the message names the nearest valid ones. */
+/** Script a fault; a later one for the same function and arguments replaces it. Of several that are due at a call the
+ *  one that was set last answers. Throws std::invalid_argument when there is no such function, argument or output, or
+ *  the function has no result; the message names the nearest valid ones. */
 void set(const Fault& fault);
+/** Take back all faults of a function. */
 void clear(std::string_view function);
+/** Take back the one for these arguments, written as they were. */
+void clear(std::string_view function, std::string_view arguments);
 void clear_all();
 std::vector<Fault> active();
 
+/** "fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, ...)" taken apart: the function, and what stands in the brackets. Throws
+ *  std::invalid_argument when they do not close. */
+std::pair<std::string, std::string> read_call(std::string_view written);
+/** As a scenario has it: "x_timer_create -1 on 2 phTimer=7". */
+std::string to_text(const Fault& fault);
+
 } // namespace faults
+
+/** A parameter of a platform function. */
+struct PlatformParameter
+{
+    std::string_view name;
+    bool is_number; ///< handed over by value
+    bool is_read;   ///< the call says what it holds
+    bool is_output;
+    /** Refuses what cannot be put into the output, as std::invalid_argument. Null: nobody but the function can. */
+    void (*check)(std::string_view written);
+};
 
 /** A platform function of the headers. */
 struct PlatformFunction
 {
     std::string_view name;
     bool has_result;
+    std::span<const PlatformParameter> parameters; ///< but those that vary
 };
 /** All of them, generated from the headers when the board is built. */
 std::span<const PlatformFunction> platform_functions();

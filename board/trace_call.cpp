@@ -103,7 +103,6 @@ CallRecord::CallRecord(const CallSite& site, std::vector<CallArgument> arguments
 {
     if (m_is_handed_on)
         return;
-    m_fault = faults::due(site.function);
     trace::look();
     TraceEntry& entry = add_entry(TraceEntry::Kind::Call, site.function);
     m_sequence = entry.sequence;
@@ -112,6 +111,7 @@ CallRecord::CallRecord(const CallSite& site, std::vector<CallArgument> arguments
         if (!m_arguments[i].left_out)
             entry.arguments.push_back({ site.parameters[i].name, dressed(m_arguments[i].value, site.parameters[i]) });
     }
+    contained([&] { m_fault = faults::due(entry); });
     threads::Context& context = threads::context();
     ++context.depth;
     context.by = site.function;
@@ -155,6 +155,20 @@ void CallRecord::write_outputs()
             recorded->value =
                 unchanged ? Value::symbol("<unchanged>") : dressed(argument.at_end(), m_site.parameters[i]);
         ++recorded;
+    }
+}
+
+void CallRecord::put_fault_outputs()
+{
+    for (const Fault::Output& output : m_fault->outputs)
+    {
+        for (std::size_t i = 0; i < m_arguments.size(); ++i)
+        {
+            if (m_site.parameters[i].name != output.name || !m_arguments[i].put)
+                continue;
+            m_arguments[i].put(output.value);
+            m_arguments[i].unchanged_by_failure = false;
+        }
     }
 }
 
@@ -203,7 +217,9 @@ CallArgument trace_arguments::text(char* buffer, std::size_t size)
                      return Value::null();
                  return Value::text(std::string(buffer, strnlen(buffer, size)));
              },
-             true };
+             true,
+             false,
+             [buffer, size](std::string_view written) { outputs::put_text(buffer, size, written); } };
 }
 
 } // namespace board

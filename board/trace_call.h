@@ -3,7 +3,7 @@
  *  How a platform function records itself; included by trace.h, whose first comment shows the use.
  *
  *      BOARD_CALL         functions without a result
- *      BOARD_CALL_R       functions with one: a scripted fault answers instead of acting
+ *      BOARD_CALL_R       functions with one: a scripted fault answers instead of acting, and sets outputs as told
  *      BOARD_CALL_ACTING  functions that act also when a fault answers: they end in return boardCall.answer_or_fault(…)
  *      BOARD_CALL_END     behind the function's block: no exception leaves it, see contained.h, and a program may have
  *                         a function of its own in its place, see replaced.h
@@ -26,6 +26,7 @@
 
 #include "board/contained.h"
 #include "board/names.h"
+#include "board/outputs.h"
 #include "board/value.h"
 
 #include "drv_av_d.h"
@@ -44,6 +45,8 @@ struct CallArgument
     std::function<Value()> at_end{};   ///< an output: what it points to when the call ends
     bool unchanged_by_failure = false; ///< not worth reading when the call left it alone
     bool left_out = false;             ///< does not appear in the trace
+    /** An output: puts there what somebody wrote for it, unless the pointer is null. */
+    std::function<void(std::string_view)> put{};
 };
 
 namespace trace_arguments
@@ -80,7 +83,11 @@ CallArgument array(T* numbers, std::size_t count)
     if constexpr (std::is_const_v<T>)
         return { list_value(numbers, count) };
     else
-        return { {}, [numbers, count] { return list_value(numbers, count); }, true };
+        return { {},
+                 [numbers, count] { return list_value(numbers, count); },
+                 true,
+                 false,
+                 [numbers, count](std::string_view written) { outputs::put_list(numbers, count, written); } };
 }
 
 /** A list of numbers that goes in through a pointer to changeable ones. */
@@ -97,7 +104,11 @@ inline CallArgument bytes(const void* data, std::size_t count)
 }
 inline CallArgument bytes(void* data, std::size_t count)
 {
-    return { {}, [data, count] { return bytes(static_cast<const void*>(data), count).value; }, true };
+    return { {},
+             [data, count] { return bytes(static_cast<const void*>(data), count).value; },
+             true,
+             false,
+             [data, count](std::string_view written) { outputs::put_bytes(data, count, written); } };
 }
 
 /** A text that goes in. */
@@ -118,7 +129,9 @@ template <typename T>
     requires(!std::is_const_v<T>)
 CallArgument record(T* changeable)
 {
-    return { {}, [changeable] { return changeable == nullptr ? Value::null() : to_value(*changeable); } };
+    return { changeable == nullptr ? Value::null() : to_value(*changeable),
+             [changeable] { return changeable == nullptr ? Value::null() : to_value(*changeable); }, false, false,
+             [changeable](std::string_view written) { outputs::put_record(changeable, written); } };
 }
 
 /** A small number that travels in a pointer. */
@@ -128,7 +141,11 @@ inline CallArgument tag(const void* tag)
 }
 inline CallArgument tag(void** out)
 {
-    return { {}, [out] { return out == nullptr ? Value::null() : tag(static_cast<const void*>(*out)).value; }, true };
+    return { {},
+             [out] { return out == nullptr ? Value::null() : tag(static_cast<const void*>(*out)).value; },
+             true,
+             false,
+             [out](std::string_view written) { outputs::put_tag(out, written); } };
 }
 
 /** An object by name. */
@@ -180,7 +197,11 @@ CallArgument call_argument(const T& given)
         {
             static_assert(trace_arguments::Numeric<Target> && !std::is_const_v<Target> && !std::is_same_v<Target, char>,
                           "wrap this pointer, as trace_arguments says");
-            return { {}, [given] { return given == nullptr ? Value::null() : trace_arguments::number_value(*given); } };
+            return { {},
+                     [given] { return given == nullptr ? Value::null() : trace_arguments::number_value(*given); },
+                     false,
+                     false,
+                     [given](std::string_view written) { outputs::put_number(given, written); } };
         }
     }
 }
@@ -217,8 +238,8 @@ public:
     CallRecord(const CallRecord&) = delete;
     CallRecord& operator=(const CallRecord&) = delete;
 
-    /** The scripted answer that is due. */
-    const std::optional<std::int64_t>& fault() const { return m_fault; }
+    /** The scripted fault that is due. */
+    const std::optional<Fault>& fault() const { return m_fault; }
     /** The call was a console print. */
     void log(std::int32_t level, std::string text, bool shown);
     /** The call was a failed assertion. */
@@ -227,6 +248,8 @@ public:
 protected:
     void set_result(std::int64_t result, bool faulted);
     void leave_outputs_alone() { m_outputs_unchanged = true; }
+    /** What the fault says of outputs; the others stay as they are. */
+    void put_fault_outputs();
     /** An exception leaves the call. */
     bool is_broken_off() const { return std::uncaught_exceptions() > m_exceptions; }
 
@@ -238,7 +261,7 @@ private:
     std::vector<CallArgument> m_arguments;
     std::uint64_t m_sequence;
     std::uint64_t m_power_on;
-    std::optional<std::int64_t> m_fault;
+    std::optional<Fault> m_fault;
     std::string_view m_by_before; ///< who stored before the call
     int m_exceptions = std::uncaught_exceptions();
     bool m_outputs_unchanged = false;
@@ -288,7 +311,8 @@ public:
     {
         if (!fault())
             return answer(result);
-        const auto answered = static_cast<Result>(*fault());
+        put_fault_outputs();
+        const auto answered = static_cast<Result>(fault()->answer);
         set_result(static_cast<std::int64_t>(answered), true);
         return answered;
     }

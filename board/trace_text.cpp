@@ -116,13 +116,14 @@ bool call_matches(const TraceEntry& entry, const CallLine& call)
         return false;
     if (!call.result.empty() && !(entry.result && entry.result->matches(call.result)))
         return false;
-    if (call.arguments.size() == 1 && call.arguments.front() == "...")
-        return true;
     const std::size_t shown = entry.arguments.size() - (entry.kind == TraceEntry::Kind::Assert ? 1 : 0);
-    return call.arguments.size() == shown &&
-           std::equal(
-               call.arguments.begin(), call.arguments.end(), entry.arguments.begin(),
-               [](std::string_view token, const TraceArgument& argument) { return argument_matches(argument, token); });
+    const bool is_open = !call.arguments.empty() && (call.arguments.back() == "..." || call.arguments.back() == "…");
+    const std::size_t told = call.arguments.size() - (is_open ? 1 : 0);
+    if (told > shown || (told < shown && !is_open))
+        return false;
+    return std::equal(
+        call.arguments.begin(), call.arguments.begin() + static_cast<std::ptrdiff_t>(told), entry.arguments.begin(),
+        [](std::string_view token, const TraceArgument& argument) { return argument_matches(argument, token); });
 }
 
 } // namespace

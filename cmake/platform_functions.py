@@ -1,18 +1,11 @@
-#!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
-"""Reads the functions that the headers declare, and writes the table of platform functions that the board is built
-with.
-
-usage: platform_functions.py OUTPUT     the table behind board::platform_functions()
-
-As a module: functions(path) yields what one header declares, function_pointers(path) the types of functions that are
-called through a pointer, and parts(contract) takes a contract to pieces.
+"""Reads the functions that the headers declare: functions(path) yields those of one header, function_pointers(path) the
+types of functions that are called through a pointer, and parts(contract) takes a contract to pieces.
 """
 
 import dataclasses
 import pathlib
 import re
-import sys
 
 ROOT = pathlib.Path(__file__).resolve().parent.parent
 # The headers behind which the rest of the stack stands, and the one that the layer itself offers.
@@ -115,36 +108,3 @@ def parts(contract):
         else:
             single[tag[1]] = body
     return joined(text[:tags[0].start()] if tags else text), parameters, single["return"], single["context"]
-
-
-def table(listed):
-    rows = "\n".join(f'    {{ "{function.name}", {str(function.has_result).lower()} }},' for function in listed)
-    return f"""// Written from the platform headers when the board is built.
-#include "board/trace.h"
-
-namespace board
-{{
-
-std::span<const PlatformFunction> platform_functions()
-{{
-    static constexpr PlatformFunction FUNCTIONS[] = {{
-{rows}
-    }};
-    return FUNCTIONS;
-}}
-
-}} // namespace board
-"""
-
-
-def main():
-    listed = [function for header in PLATFORM_HEADERS for function in functions(ROOT / header)]
-    names = [function.name for function in listed]
-    twice = sorted({name for name in names if names.count(name) > 1})
-    if twice or not listed:
-        sys.exit("declared twice: " + ", ".join(twice) if twice else "the headers declare no function")
-    pathlib.Path(sys.argv[1]).write_text(table(listed), encoding="utf-8")
-
-
-if __name__ == "__main__":
-    main()

@@ -21,7 +21,7 @@ TEST_F(Board, State_HasEveryDeviceInOrder)
 {
     EXPECT_EQ((std::vector<std::string>{ "os", "console", "flash", "registers", "interface_manager", "power", "mixer",
                                          "tv_encoder", "video_planes", "osd_planes", "sources", "hdmi_av",
-                                         "display_part", "display_control" }),
+                                         "display_part", "display_control", "faults" }),
               board::state().keys());
 }
 

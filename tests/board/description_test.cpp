@@ -277,13 +277,39 @@ TEST_F(BoardFile, FaultsThatCannotBeScripted)
     EXPECT_EQ("/player/board.toml:4: from of a fault has to be a whole number", fault("from = \"1\"\n"));
     EXPECT_EQ("/player/board.toml:4: always of a fault can only be true; leave it out, or use on or from",
               fault("always = false\n"));
-    EXPECT_EQ("/player/board.toml:1: a fault takes one of on, from and always", fault("on = 1\nfrom = 1\n"));
+    EXPECT_EQ("/player/board.toml:1: a fault takes one of on, from, for and always", fault("on = 1\nfrom = 1\n"));
     EXPECT_EQ("/player/board.toml:2: no platform function is called x_sema_lok; did you mean x_sema_lock?",
               wrong("[[fault]]\nfunction = \"x_sema_lok\"\nanswer = -1\n"));
     EXPECT_EQ("/player/board.toml:2: PMX_HalReset has no result that a fault could answer",
               wrong("[[fault]]\nfunction = \"PMX_HalReset\"\nanswer = -1\n").substr(0, 76));
     EXPECT_EQ("/player/board.toml:3: answer of a fault has to be -2147483648 to 4294967295",
               wrong("[[fault]]\nfunction = \"x_sema_lock\"\nanswer = 4294967296\n"));
+}
+
+TEST_F(BoardFile, Fault_WithArgumentsTimeAndOutputs)
+{
+    const Description description =
+        load("[[fault]]\nfunction = \"i4NFBPartitionRead(*, 0, ...)\"\nanswer = 4\nfor = \"5s\"\n"
+             "outputs = { pvDest = \"[0x0C, 0]\" }\n[[fault]]\nfunction = \"x_timer_create\"\nanswer = 0\n"
+             "outputs = { phTimer = 7 }\n");
+    ASSERT_EQ(2u, description.faults.size());
+    EXPECT_EQ("i4NFBPartitionRead(*, 0, ...) 4 for 5s pvDest=[0x0C, 0]", board::faults::to_text(description.faults[0]));
+    EXPECT_EQ("x_timer_create 0 phTimer=7", board::faults::to_text(description.faults[1]));
+}
+
+TEST_F(BoardFile, FaultsWhoseArgumentsOrOutputsCannotBeMeant)
+{
+    const auto fault = [this](const std::string& call, const std::string& rest) {
+        return wrong("[[fault]]\nfunction = \"" + call + "\"\nanswer = -1\n" + rest);
+    };
+    EXPECT_EQ("/player/board.toml:2: x_sema_lock has 2 arguments (hSema, eOption), not 1; ... stands for the rest",
+              fault("x_sema_lock(1)", ""));
+    EXPECT_EQ("/player/board.toml:4: for of a fault has to be a time: 10s, 500ms or 2us",
+              fault("x_sema_lock", "for = \"5\"\n"));
+    EXPECT_EQ("/player/board.toml:4: outputs of a fault has to be a table: { phTimer = 7 }",
+              fault("x_timer_create", "outputs = 7\n"));
+    EXPECT_EQ("/player/board.toml:2: x_timer_create has no output hTimer; it has phTimer",
+              fault("x_timer_create", "outputs = { hTimer = 7 }\n"));
 }
 
 TEST_F(BoardFile, MissingImages_AndTextThatIsNoToml)

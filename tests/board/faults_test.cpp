@@ -1,9 +1,16 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "device_test.h"
 
+#include <algorithm>
+#include <array>
+#include <chrono>
 #include <stdexcept>
+#include <tuple>
 
+#include "drv_av_d.h"
+#include "drv_if.h"
 #include "drv_vdp.h"
+#include "pmx_hal.h"
 #include "u_os.h"
 
 namespace
@@ -40,11 +47,177 @@ protected:
 
 using Answers = std::vector<INT32>;
 
-TEST_F(Faults, TableThatNobodyHandsOut_IsRefused)
+TEST_F(Faults, QueryThatSucceeds_HasATable)
 {
-    for (const std::int64_t answer : { 0, 1, 0x7FFFFFFF })
-        EXPECT_TRUE(refusal({ "i4ImQueryInterface", answer }).starts_with("i4ImQueryInterface hands out a table"));
-    EXPECT_EQ("accepted", refusal({ "i4ImQueryInterface", 0xFFFFFFFF })) << "-1 in 32 bits";
+    static const int table = 0;
+    ASSERT_EQ(0, i4ImRegisterInterface2(1, 2, IID_IVdp, &table, nullptr));
+    void* interface = nullptr;
+    void* tag = nullptr;
+    board::faults::set({ "i4ImQueryInterface", 5, When::Always });
+    EXPECT_EQ(5, i4ImQueryInterface(1, 2, IID_IVdp, &interface, &tag));
+    EXPECT_EQ(&table, interface);
+    EXPECT_EQ(0, i4ImReleaseInterface(1, 2, IID_IVdp, tag));
+
+    interface = nullptr;
+    EXPECT_EQ(-1, i4ImQueryInterface(1, 3, IID_IVdp, &interface, &tag)) << "there is none to succeed with";
+    EXPECT_EQ(nullptr, interface);
+    EXPECT_EQ(1, std::ranges::count(board::trace::entries(), "fault", &board::TraceEntry::function));
+
+    board::faults::set({ "i4ImQueryInterface", 0xFFFFFFFF });
+    EXPECT_EQ(-1, i4ImQueryInterface(1, 2, IID_IVdp, &interface, &tag)) << "-1 in 32 bits is a failure";
+    EXPECT_EQ(nullptr, interface);
+}
+
+/** A fault with arguments and outputs. */
+Fault fault_of(const std::string& call, std::int64_t answer, When when = When::Always,
+               std::vector<Fault::Output> outputs = {})
+{
+    Fault fault;
+    std::tie(fault.function, fault.arguments) = board::faults::read_call(call);
+    fault.answer = answer;
+    fault.when = when;
+    fault.outputs = std::move(outputs);
+    return fault;
+}
+
+TEST_F(Faults, Arguments_TellTheCallsThatAreMeant)
+{
+    board::faults::set(fault_of("get_part_id_by_name(\"other\")", 5));
+    board::faults::set(fault_of("i4NFBPartitionRead(*, u4Offset=7, ...)", 5));
+    EXPECT_EQ(-1, get_part_id_by_name("none"));
+    EXPECT_EQ(5, get_part_id_by_name("other"));
+    EXPECT_EQ(-1, i4NFBPartitionRead(0, 6, nullptr, 4));
+    EXPECT_EQ(5, i4NFBPartitionRead(0, 7, nullptr, 4));
+
+    UINT8 value = 1;
+    board::faults::set(fault_of("fgPmxDrvSetAvd(PMX_SET_HDMI_HUE, ...)", 0));
+    EXPECT_EQ(TRUE, fgPmxDrvSetAvd(PMX_SET_HDMI_CONTRAST, &value, 1));
+    EXPECT_EQ(FALSE, fgPmxDrvSetAvd(PMX_SET_HDMI_HUE, &value, 1));
+
+    PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T query{ RES_480P, 60, 0, 0 };
+    board::faults::set(fault_of("fgPmxDrvGetAvdInfo(*, {u4ResCheck=RES_480P, ...})", 0));
+    EXPECT_EQ(FALSE, fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, &query)) << "what the call says goes in";
+    query.u4ResCheck = RES_576P;
+    EXPECT_EQ(TRUE, fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, &query));
+}
+
+TEST_F(Faults, Arguments_EachHaveAFaultOfTheirOwn)
+{
+    board::faults::set(fault_of("get_part_id_by_name", 1));
+    board::faults::set(fault_of("get_part_id_by_name(\"a\")", 2));
+    board::faults::set(fault_of("get_part_id_by_name(\"b\")", 3, When::On));
+    EXPECT_EQ(1, get_part_id_by_name("none"));
+    EXPECT_EQ(2, get_part_id_by_name("a")) << "the one that was set last";
+    EXPECT_EQ(3, get_part_id_by_name("b")) << "counted by the calls that are meant";
+    EXPECT_EQ(1, get_part_id_by_name("b"));
+    board::faults::clear("get_part_id_by_name", "\"a\"");
+    EXPECT_EQ(1, get_part_id_by_name("a"));
+    EXPECT_EQ(1u, board::faults::active().size());
+    board::faults::clear("get_part_id_by_name");
+    EXPECT_TRUE(board::faults::active().empty());
+}
+
+TEST_F(Faults, For_LastsForATimeOfTheBoardsClock)
+{
+    board::advance(std::chrono::seconds(1));
+    Fault fault = fault_of("get_part_id_by_name", 7, When::For);
+    fault.time = std::chrono::seconds(5);
+    board::faults::set(fault);
+    EXPECT_EQ((Answers{ 7, 7 }), ask(2));
+    board::advance(std::chrono::microseconds(4'999'999));
+    EXPECT_EQ((Answers{ 7 }), ask(1));
+    board::advance(std::chrono::microseconds(1));
+    EXPECT_TRUE(board::faults::active().empty());
+    EXPECT_EQ((Answers{ -1 }), ask(1));
+
+    board::Description description;
+    description.faults = { fault };
+    board::power_on(description);
+    board::advance(std::chrono::seconds(4));
+    EXPECT_EQ((Answers{ 7 }), ask(1)) << "from power-on";
+}
+
+TEST_F(Faults, Outputs_AreSetAndTheOthersLeftAlone)
+{
+    HANDLE_T handle = 0;
+    board::faults::set(fault_of("x_timer_create", 0, When::On, { { "phTimer", "77" } }));
+    EXPECT_EQ(OSR_OK, x_timer_create(&handle));
+    EXPECT_EQ(77u, handle);
+    EXPECT_EQ("x_timer_create(77) = 0", last_call());
+
+    std::array<UINT8, 4> bytes{ 9, 9, 9, 9 };
+    board::faults::set(fault_of("i4NFBPartitionRead", 4, When::On, { { "pvDest", "[0x0C, 1]" } }));
+    EXPECT_EQ(4, i4NFBPartitionRead(0, 0, bytes.data(), 4));
+    EXPECT_EQ((std::array<UINT8, 4>{ 0x0C, 1, 9, 9 }), bytes);
+    board::faults::set(fault_of("i4NFBPartitionRead", 1, When::On, { { "pvDest", "[1, 2, 3]" } }));
+    EXPECT_EQ(1, i4NFBPartitionRead(0, 0, bytes.data(), 1));
+    EXPECT_EQ((std::array<UINT8, 4>{ 1, 1, 9, 9 }), bytes) << "as many as there is room for";
+
+    const std::array<UINT8, 8> order{ 0, 1, 2, 3, 4, 5, 6, 7 };
+    std::array<INT32, 8> delays{};
+    board::faults::set(
+        fault_of("PMX_HalSetPlaneOrder", 0, When::On, { { "pi4PlnDelay", "[-1, 2, 3, 4, 5, 6, 7, 8]" } }));
+    PMX_HalSetPlaneOrder(0, order.data(), delays.data());
+    EXPECT_EQ((std::array<INT32, 8>{ -1, 2, 3, 4, 5, 6, 7, 8 }), delays);
+
+    PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T query{ RES_480P, 60, 1, 2 };
+    board::faults::set(
+        fault_of("fgPmxDrvGetAvdInfo", 1, When::On, { { "pvParameter", "{u4ValidAutoRes=RES_720P60HZ}" } }));
+    EXPECT_EQ(TRUE, fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, &query));
+    EXPECT_EQ(static_cast<UINT32>(RES_720P60HZ), query.u4ValidAutoRes);
+    EXPECT_EQ(2, query.u2ValidAutoVfreq) << "a field that is left out stays as it is";
+
+    board::faults::set(fault_of("x_timer_create", 0, When::On, { { "phTimer", "77" } }));
+    EXPECT_EQ(OSR_OK, x_timer_create(nullptr)) << "a null pointer takes nothing";
+}
+
+TEST_F(Faults, ArgumentsAndOutputs_AreRefusedWithTheReason)
+{
+    const auto of = [](const std::string& call, std::vector<Fault::Output> outputs = {}) {
+        return refusal(fault_of(call, 0, When::Always, std::move(outputs)));
+    };
+    EXPECT_EQ("x_sema_lock has 2 arguments (hSema, eOption), not 1; ... stands for the rest", of("x_sema_lock(1)"));
+    EXPECT_EQ("accepted", of("x_sema_lock(1, ...)"));
+    EXPECT_EQ("x_sema_lock: here stands hSema, not hTimer", of("x_sema_lock(hTimer=1, ...)"));
+    EXPECT_TRUE(of("fgPmxDrvSetAvd(PMX_SET_HDMI_HUI, ...)").ends_with("did you mean PMX_SET_HDMI_HUE?"));
+    EXPECT_EQ("x_sema_create: phSema is an output, and says nothing when the call begins; write *",
+              of("x_sema_create(7, ...)"));
+    EXPECT_EQ("fgPmxDrvSetAvd: pvParameter: a record's field is written NAME=VALUE, not 1",
+              of("fgPmxDrvSetAvd(*, {1}, *)"));
+    EXPECT_EQ("x_timer_create has no output hTimer; it has phTimer", of("x_timer_create", { { "hTimer", "1" } }));
+    EXPECT_EQ("x_sema_lock has no output hSema", of("x_sema_lock", { { "hSema", "1" } }));
+    EXPECT_EQ("i4ImQueryInterface: ppvIf is the address of something, and a fault has none to hand out",
+              of("i4ImQueryInterface", { { "ppvIf", "0" } }));
+    EXPECT_EQ("PMX_HalGetPlaneOrder: pu1PlnSel: it takes 8 items, not 1",
+              of("PMX_HalGetPlaneOrder", { { "pu1PlnSel", "[1]" } }));
+    EXPECT_EQ("i4NFBPartitionRead: pvDest: 256 does not fit into 8 bits",
+              of("i4NFBPartitionRead", { { "pvDest", "[256]" } }));
+    EXPECT_TRUE(of("fgPmxDrvGetAvdInfo", { { "pvParameter", "{u4ValidAutoRe=1}" } })
+                    .ends_with("there is no field u4ValidAutoRe; did you mean u4ValidAutoRes?"));
+    EXPECT_TRUE(of("fgPmxDrvGetAvdInfo", { { "pvParameter", "{u4ValidAutoRes=PMX_TV_TYPE_PAL}" } })
+                    .find("PMX_TV_TYPE_PAL is neither a number nor a name that goes here") != std::string::npos);
+    EXPECT_EQ("x_vsnprintf: szBuffer: a text stands in double quotes: text",
+              of("x_vsnprintf", { { "szBuffer", "text" } }));
+    Fault fault = fault_of("x_timer_stop", -1, When::For);
+    EXPECT_EQ("a fault of x_timer_stop lasts for some time", refusal(fault));
+    EXPECT_THROW(board::faults::read_call("x_timer_stop(1"), std::invalid_argument);
+    EXPECT_THROW(board::faults::read_call("x_timer_stop(1) = 0"), std::invalid_argument);
+}
+
+TEST_F(Faults, ToText_IsAsAScenarioHasIt)
+{
+    Fault fault = fault_of("x_timer_create(...)", -1, When::On, { { "phTimer", "7" } });
+    EXPECT_EQ("x_timer_create -1 phTimer=7", board::faults::to_text(fault));
+    fault = fault_of("VDP_GetHwEnable(1)", VDP_HIDDEN, When::From);
+    fault.n = 2;
+    EXPECT_EQ("VDP_GetHwEnable(1) VDP_HIDDEN from 2", board::faults::to_text(fault));
+    fault.when = When::For;
+    fault.time = std::chrono::milliseconds(1500);
+    EXPECT_EQ("VDP_GetHwEnable(1) VDP_HIDDEN for 1500ms", board::faults::to_text(fault));
+    board::faults::set(fault);
+    EXPECT_EQ("[{call=\"VDP_GetHwEnable(1)\", answer=VDP_HIDDEN, when=\"for 1500ms\", calls=0, until_us=1500000, "
+              "outputs={}}]",
+              board::faults::state().to_text());
 }
 
 TEST_F(Faults, On_AnswersThatCallAlone)

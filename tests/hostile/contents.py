@@ -94,6 +94,9 @@ def boards():
         "key of controls": b'"\\u001b[31m" = 1\n',
         "image of controls": b'[flash]\n"a" = "\\u001b[31m"\n',
         "image far away": b'[flash]\na = "' + b"x/" * 2_000 + b'"\n',
+        "faulted call": b'[[fault]]\nfunction = "x_sema_lock(' + b"[" * 1_000 + b'"\nanswer = 0\n',
+        "fault's output": b'[[fault]]\nfunction = "x_sema_create"\nanswer = 0\noutputs = { phSema = "' +
+                          b"[" * 1_000 + b'" }\n',
         "fault without table": b'[[fault]]\nfunction = "i4ImQueryInterface"\nanswer = 0\nalways = true\n',
         "many arrangements": b"[[mixer.arrangement]]\n" * 10_000,
     }

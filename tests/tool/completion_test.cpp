@@ -115,7 +115,10 @@ TEST(Completion, Verbs_ByTheirUsage)
     EXPECT_THAT(candidates("source v"), ElementsAre("vdp0", "vdp1", "vdp2", "vdp3"));
     EXPECT_THAT(candidates("source osd1 start 10x10 "), ElementsAre("ycbcr", "rgb"));
     EXPECT_THAT(candidates("source vdp1 start 10x10 "), ElementsAre("luma"));
-    EXPECT_THAT(candidates("fault x_sema_lock 1 "), ElementsAre("on", "from", "always"));
+    EXPECT_THAT(candidates("fault x_sema_lock 1 "), ElementsAre("on", "from", "for", "always"));
+    EXPECT_THAT(candidates("fault x_timer_create 1 always "), ElementsAre("phTimer="));
+    EXPECT_THAT(candidates("fault x_sema_lock(1, X_SEMA_OPTION_N"), ElementsAre("X_SEMA_OPTION_NOWAIT"));
+    EXPECT_THAT(candidates("fault VDP_GetHwEnable(1) VDP_H"), ElementsAre("VDP_HIDDEN"));
     EXPECT_THAT(candidates("fault x_sema_lock of"), ElementsAre("off"));
     EXPECT_THAT(candidates("plane-delay "), ElementsAre("order"));
     EXPECT_THAT(candidates("state --"), ElementsAre("--json"));

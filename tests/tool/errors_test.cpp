@@ -78,10 +78,14 @@ TEST(ScenarioErrors, Verbs_ShowHowTheyAreWritten)
     EXPECT_EQ("here.pmx:1: write: power-on [BOARD]\n", diagnostics("power-on a b"));
     EXPECT_EQ("here.pmx:1: write: flash PARTITION FILE, flash PARTITION word NUMBER, or flash PARTITION off\n",
               diagnostics("flash x"));
-    const std::string fault = "here.pmx:1: write: fault FUNCTION ANSWER [on N|from N|always], or fault FUNCTION off\n";
+    const std::string fault =
+        "here.pmx:1: write: fault FUNCTION ANSWER [on N|from N|for TIME|always] [PARAMETER=VALUE…], fault FUNCTION "
+        "off, "
+        "fault off, or fault; TIME is 10s, 500ms or 2us; PARAMETER=VALUE is an output, such as phTimer=7, "
+        "pvDest=[0x0C, 0] or pvParameter={u2ValidAutoVfreq=50}\n";
     for (const char* const wrong :
-         { "fault", "fault x_timer_create", "fault x_timer_create -1 on", "fault x_timer_create -1 at 3",
-           "fault x_timer_create -1 always 3", "fault x_timer_create -1 on 3 4" })
+         { "fault x_timer_create", "fault x_timer_create -1 on", "fault x_timer_create -1 at 3",
+           "fault x_timer_create -1 always 3", "fault x_timer_create -1 on 3 4", "fault x_timer_create -1 for ever" })
         EXPECT_EQ(fault, diagnostics(wrong)) << wrong;
     for (const char* const wrong : { "advance", "advance 10", "advance s", "advance 1h", "advance -1s", "advance 1 s" })
         EXPECT_EQ("here.pmx:1: write: advance TIME; TIME is 10s, 500ms or 2us\n", diagnostics(wrong)) << wrong;

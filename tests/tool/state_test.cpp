@@ -65,7 +65,7 @@ TEST(StateVerb, AsJson_HasASchema)
     EXPECT_EQ("pmxboard-state", all.at("schema"));
     EXPECT_EQ(1, all.at("version"));
     EXPECT_EQ("default", all.at("board"));
-    EXPECT_EQ(17u, all.at("state").size());
+    EXPECT_EQ(18u, all.at("state").size());
     EXPECT_EQ((Json{ { "value", 12 }, { "name", "RES_1080P60HZ" } }), all.at("state").at("record").at("ucMode"));
     EXPECT_EQ((Json{ { "value", 0x108080 }, { "hex", "0x108080" } }), all.at("state").at("record").at("u4BgColor"));
     EXPECT_EQ((Json{ { "symbol", "_rPMXIF" } }),

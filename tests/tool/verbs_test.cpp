@@ -15,6 +15,7 @@
 namespace
 {
 
+using tool_test::behind_last;
 using tool_test::diagnostics;
 using tool_test::run;
 
@@ -70,6 +71,46 @@ TEST(Verbs, Fault_FromTheNthCall_UntilItIsTakenBack)
                   "PMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 7\n"
                   "PMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 7\n"
                   "fault get_part_id_by_name off\nPMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 0"));
+}
+
+TEST(Verbs, Fault_OfTheCallsThatAreMeant)
+{
+    EXPECT_EQ("", diagnostics("PMX_Init\nfault fgPmxDrvSetAvd(PMX_SET_HDMI_HUE, ...) FALSE always\n"
+                              "neighbour vPostChgRes RES_480P\nfault x_timer_stop(*) -1 for 5s\n"
+                              "expect state faults[0].call \"fgPmxDrvSetAvd(PMX_SET_HDMI_HUE, ...)\"\n"
+                              "expect state faults[1].until_us 5002000\nadvance 5s\n"
+                              "fault i4NFBPartitionRead 4 pvDest=[0x0C, 0, 0, 0]\nPMX_GetHDMIDefaultRes\n"
+                              "expect result RES_1080P60HZ\n"
+                              "expect call i4NFBPartitionRead(0, ...) = 4\n"
+                              "fault fgPmxDrvSetAvd(PMX_SET_HDMI_HUE, ...) off\nexpect state faults []"));
+}
+
+TEST(Verbs, Fault_ListsThemAsTheyAreTyped)
+{
+    EXPECT_EQ("  no faults\n", behind_last(run("power-on\nfault").shown));
+    const std::string faults = "fault x_timer_create -1 on 2 phTimer=7\n"
+                               "fault VDP_GetHwEnable(1) VDP_HIDDEN always\n"
+                               "fault x_sema_lock(*, X_SEMA_OPTION_WAIT) 1 for 500ms\n";
+    EXPECT_EQ("  fault x_timer_create -1 on 2 phTimer=7\n  fault VDP_GetHwEnable(1) VDP_HIDDEN always\n"
+              "  fault x_sema_lock(*, X_SEMA_OPTION_WAIT) 1 for 500ms\n",
+              behind_last(run(faults + "fault").shown));
+    EXPECT_EQ("  no faults\n", behind_last(run(faults + "fault off\nfault").shown));
+}
+
+TEST(Verbs, Fault_ArgumentsThatCannotBeMeant)
+{
+    EXPECT_EQ("here.pmx:1: x_sema_lock has 2 arguments (hSema, eOption), not 1; ... stands for the rest\n",
+              diagnostics("fault x_sema_lock(1) 0"));
+    EXPECT_EQ("here.pmx:1: x_timer_create: phTimer: x is neither a number nor a name that goes here\n",
+              diagnostics("fault x_timer_create 0 phTimer=x"));
+}
+
+TEST(Verbs, Fault_QueryThatSucceedsWithoutATable_DoesNotEndTheTool)
+{
+    EXPECT_EQ(
+        "",
+        diagnostics("PMX_Init\nfault i4ImRegisterInterface2 -1 always\nfault i4ImQueryInterface 0 always\n"
+                    "source vdp0 start 1920x1080\nsource vdp0 size 720x576\nexpect call i4ImQueryInterface(...) = -1"));
 }
 
 TEST(Verbs, Fault_Always)

@@ -2,6 +2,7 @@
 // Verbs for the board as a whole: power, flash, faults, time, the console.
 #include <algorithm>
 #include <limits>
+#include <tuple>
 
 #include "board/board.h"
 #include "board/flash.h"
@@ -9,6 +10,7 @@
 #include "tools/pmxboard/functions/kind.h"
 #include "tools/pmxboard/language/session.h"
 #include "tools/pmxboard/language/verbs.h"
+#include "tools/pmxboard/text/printable.h"
 #include "tools/pmxboard/text/suggest.h"
 
 namespace pmxboard
@@ -55,11 +57,23 @@ void remove_flash(Session&, const Words& words)
     set_flash(name, {});
 }
 
+/** FUNCTION, alone or with the arguments of the calls that are meant. */
+std::pair<std::string, std::string> faulted_call(const Words& words)
+try
+{
+    auto call = board::faults::read_call(words.at("FUNCTION"));
+    need_platform_function(call.first);
+    return call;
+}
+catch (const std::invalid_argument& error)
+{
+    throw LineError(error.what());
+}
+
 void set_fault(Session&, const Words& words)
 {
     board::Fault scripted;
-    scripted.function = words.at("FUNCTION");
-    need_platform_function(scripted.function);
+    std::tie(scripted.function, scripted.arguments) = faulted_call(words);
     const std::string& answer = words.at("ANSWER");
     scripted.answer = read_number(board::names::family_of(scripted.function, "result"), answer, "the answer");
     if (scripted.answer < std::numeric_limits<std::int32_t>::min() ||
@@ -67,10 +81,18 @@ void set_fault(Session&, const Words& words)
         throw LineError("the answer has 32 bits, and " + answer + " does not fit");
     scripted.when = words.has("always") ? board::Fault::When::Always
                     : words.has("from") ? board::Fault::When::From
+                    : words.has("for")  ? board::Fault::When::For
                                         : board::Fault::When::On;
     if (words.has("N"))
         scripted.n = static_cast<unsigned>(
             number_in(words.at("N"), "the call's number", 1, std::numeric_limits<std::int32_t>::max()));
+    if (words.has("TIME"))
+        scripted.time = read_time(words.at("TIME"));
+    for (const std::string& setting : words.all("PARAMETER=VALUE"))
+    {
+        const std::size_t equals = setting.find('=');
+        scripted.outputs.push_back({ setting.substr(0, equals), setting.substr(equals + 1) });
+    }
     try
     {
         board::faults::set(scripted);
@@ -83,8 +105,25 @@ void set_fault(Session&, const Words& words)
 
 void clear_fault(Session&, const Words& words)
 {
-    need_platform_function(words.at("FUNCTION"));
-    board::faults::clear(words.at("FUNCTION"));
+    const auto [function, arguments] = faulted_call(words);
+    if (arguments.empty())
+        board::faults::clear(function);
+    else
+        board::faults::clear(function, arguments);
+}
+
+void clear_faults(Session&, const Words&)
+{
+    board::faults::clear_all();
+}
+
+/** As they can be typed again. */
+void list_faults(Session& session, const Words&)
+{
+    std::string text;
+    for (const board::Fault& fault : board::faults::active())
+        text += "  fault " + board::faults::to_text(fault) + "\n";
+    session.output().text(text.empty() ? "  no faults\n" : printable_lines(text));
 }
 
 void advance(Session&, const Words& words)
@@ -127,11 +166,15 @@ std::vector<Verb> board_verbs()
               put_word },
             { "flash PARTITION off", "remove the partition", remove_flash } } },
         { "fault",
-          { { "fault FUNCTION ANSWER [on N|from N|always]",
+          { { "fault FUNCTION ANSWER [on N|from N|for TIME|always] [PARAMETER=VALUE…]",
               "let a platform function answer instead of acting: at the n-th call from now (the next, when nothing is "
-              "said), from it on, or always",
+              "said), from it on, for a time, or always; and set its outputs. `FUNCTION(ARGUMENT, ...)` means the "
+              "calls "
+              "that an expectation of this form would meet",
               set_fault },
-            { "fault FUNCTION off", "take it back", clear_fault } } },
+            { "fault FUNCTION off", "take it back; without arguments, all of this function", clear_fault },
+            { "fault off", "take all faults back", clear_faults },
+            { "fault", "list them", list_faults } } },
         { "advance",
           { { "advance TIME", "let virtual time pass: `10s`, `500ms` or `2us`; timers run out at their moment",
               advance } } },

@@ -121,6 +121,8 @@ const std::vector<Place>& places()
         { "D", nullptr, "the delay of a plane, plane 1 first" },
         { "SETTING", is_setting, "OUTPUT=MODE or OUTPUT=off, such as hdmi=720p50" },
         { "OUTPUT", nullptr, "digital, hdmi, component or composite (cvbs)" },
+        { "PARAMETER=VALUE", is_setting,
+          "an output, such as phTimer=7, pvDest=[0x0C, 0] or pvParameter={u2ValidAutoVfreq=50}" },
         { "LINE", nullptr, "such as FUNCTION(ARGUMENT, …) = RESULT or SET FIELD OLD → NEW" },
         { "PATH", is_no_option, "" },
         { "COMMAND", begins_command, "" },

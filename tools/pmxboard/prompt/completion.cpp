@@ -117,6 +117,20 @@ Part of_arguments_behind_a_name(const std::vector<std::string>& words)
     return {};
 }
 
+/** Within the bracket of a platform function. */
+Part of_call_arguments(const std::string& word)
+{
+    Part part;
+    const std::size_t at = word.find_last_of("(, ");
+    if (word.find('(') == word.npos || at == word.npos)
+        return part;
+    part.begin = at + 1;
+    const std::string function = word.substr(0, word.find('('));
+    const auto index = static_cast<std::size_t>(std::count(word.begin(), word.end(), ','));
+    add(part, platform_argument_names(function, index));
+    return part;
+}
+
 /** An expectation's LINE: a platform function and its bracket. */
 Part of_trace_line(const std::vector<std::string>& words)
 {
@@ -128,15 +142,7 @@ Part of_trace_line(const std::vector<std::string>& words)
         add(part, std::vector<std::string>{ "LOG0", "LOG1", "LOG5", "LOG8", "LOG9", "NOTICE", "SET" });
         return part;
     }
-    const std::string& word = words.back();
-    const std::size_t at = word.find_last_of("(, ");
-    if (word.find('(') == word.npos || at == word.npos)
-        return part;
-    part.begin = at + 1;
-    const std::string function = word.substr(0, word.find('('));
-    const auto index = static_cast<std::size_t>(std::count(word.begin(), word.end(), ','));
-    add(part, platform_argument_names(function, index));
-    return part;
+    return of_call_arguments(words.back());
 }
 
 /** A store's field and values. */
@@ -175,14 +181,22 @@ constexpr Filling fillings[] = {
     { "PARTITION", [](Part& part, const auto&, const auto&) { add(part, partition_names()); } },
     { "FUNCTION",
       [](Part& part, const auto& words, const auto&) {
+          if (words[0] == "fault" && words.back().find('(') != std::string::npos)
+          {
+              part = of_call_arguments(words.back());
+              return;
+          }
           add(part, words[0] == "fault"       ? faultable_names()
                     : words[0] == "neighbour" ? neighbour_names()
                                               : platform_names());
       } },
     { "ANSWER",
       [](Part& part, const auto& words, const auto&) {
-          add(part, names_and_general(board::names::family_of(before_last(words), "result")));
+          const std::string& call = before_last(words);
+          add(part, names_and_general(board::names::family_of(call.substr(0, call.find('(')), "result")));
       } },
+    { "PARAMETER=VALUE", [](Part& part, const auto& words,
+                            const auto&) { add(part, settable_outputs(words[1].substr(0, words[1].find('(')))); } },
     { "PATH", [](Part& part, const auto& words, const auto&) { add(part, path_candidates(words.back())); } },
     { "FIELD", [](Part& part, const auto& words, const auto&) { add(part, field_candidates(words.back())); } },
     { "VALUE",

@@ -164,6 +164,20 @@ Candidates faultable_names()
     return names;
 }
 
+Candidates settable_outputs(std::string_view function)
+{
+    Candidates names;
+    for (const auto& known : board::platform_functions())
+    {
+        for (const auto& parameter : known.parameters)
+        {
+            if (known.name == function && parameter.check != nullptr)
+                names.push_back(std::string(parameter.name) + "=");
+        }
+    }
+    return names;
+}
+
 Candidates neighbour_names()
 {
     const auto names = names_of(neighbours());

@@ -40,6 +40,9 @@ Candidates names_and_general(board::names::Family family);
 /** Names for an argument of a platform function. */
 Candidates platform_argument_names(std::string_view function, std::size_t index);
 
+/** What a fault may set: "phTimer=". */
+Candidates settable_outputs(std::string_view function);
+
 /** The next step of a path into board and layer, or into the layer's record alone: "mixer." goes on. */
 Candidates path_candidates(std::string_view begun);
 Candidates field_candidates(std::string_view begun);

@@ -25,6 +25,7 @@
 #include "board/installed_header.h"
 #include "board/meanwhile.h"
 #include "board/mixer.h"
+#include "board/sources.h"
 #include "board/trace.h"
 #include "board/value.h"
 
@@ -37,13 +38,18 @@ struct Description
     std::string name = "bare";
     int console_level = 1;                               ///< PMX_IsLog prints lines of this level and below
     std::map<std::string, std::filesystem::path> flash;  ///< partition name to image file
+    std::map<std::string, std::uint32_t> flash_words;    ///< partition name to the one word that it holds
     bool sink_plugged = true;                            ///< an HDMI sink is plugged in at power-on
     bool resolution_requested = false;                   ///< a hot-plug event wants the HDMI resolution sent again
     std::optional<hdmi_av::Resolution> valid_resolution; ///< what the HDMI driver would choose; nothing: what is asked
-    display_part::Behaviour display_part;                ///< what the display part does with a resolution change
-    mixer::PlaneDelays plane_delay{};                    ///< delay that the hardware reports for each mixer plane
-    std::vector<mixer::Arrangement> arrangements;        ///< arrangements of the planes that have other delays
-    std::vector<Fault> faults;                           ///< in force from power-on
+    std::vector<hdmi_av::Resolution> sink_modes;  ///< what the sink takes, the one it likes best first; none: anything
+    display_part::Behaviour display_part;         ///< what the display part does with a resolution change
+    mixer::PlaneDelays plane_delay{};             ///< delay that the hardware reports for each mixer plane
+    std::vector<mixer::Arrangement> arrangements; ///< arrangements of the planes that have other delays
+    std::optional<std::uint32_t> capability;      ///< what the product's mixer can; nothing: what the layer says
+    bool waiting_for_sync = false;                ///< the video plane driver waits for its sync control
+    std::vector<sources::Start> sources;          ///< what connects when the mixer has started
+    std::vector<Fault> faults;                    ///< in force from power-on
 };
 
 /** A board file that cannot be used: file, line where known, what is wrong. */

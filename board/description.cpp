@@ -95,11 +95,45 @@ const toml::table* table_at(const File& file, const toml::table& root, std::stri
     return node->as_table();
 }
 
+std::uint32_t resolution_mode_at(const File& file, const toml::node& node, const std::string& key)
+{
+    const std::string text = text_at(file, node, key);
+    std::vector<std::string_view> modes;
+    for (const std::string_view name : names::all())
+    {
+        const std::int64_t number = names::number_of(name).value();
+        if (names::name_of(names::Family::ResolutionMode, number) != name)
+            continue;
+        if (name == text)
+            return static_cast<std::uint32_t>(number);
+        modes.push_back(name);
+    }
+    file.wrong(node.source(), "no resolution mode is called " + text + suggestion(text, modes));
+}
+
+/** { word = "RES_576P" }, or a number. */
+std::uint32_t flash_word_at(const File& file, const toml::table& table, const std::string& partition)
+{
+    check_keys(file, table, { "word" }, " in flash partition " + partition);
+    const toml::node* const word = table.get("word");
+    if (word == nullptr)
+        file.wrong(table.source(), "flash partition " + partition + " needs an image, or a word");
+    const std::string what = "the word of flash partition " + partition;
+    if (word->is_string())
+        return resolution_mode_at(file, *word, what);
+    return static_cast<std::uint32_t>(number_at(file, *word, what, 0, std::numeric_limits<std::uint32_t>::max()));
+}
+
 void read_flash(const File& file, const toml::table& flash, Description& description)
 {
     for (const auto& [key, value] : flash)
     {
         const std::string name(key.str());
+        if (value.is_table())
+        {
+            description.flash_words[name] = flash_word_at(file, *value.as_table(), name);
+            continue;
+        }
         const auto image = file.path.parent_path() / text_at(file, value, "the image of flash partition " + name);
         if (name.empty())
             file.wrong(key.source(), "a flash partition has a name");
@@ -156,6 +190,9 @@ void read_arrangement(const File& file, const toml::node& node, Description& des
 
 void read_mixer(const File& file, const toml::table& mixer, Description& description)
 {
+    if (const toml::node* const capability = mixer.get("capability"))
+        description.capability = static_cast<std::uint32_t>(
+            number_at(file, *capability, "capability of the mixer", 0, std::numeric_limits<std::uint32_t>::max()));
     if (const toml::node* const delay = mixer.get("plane_delay"))
         description.plane_delay = plane_delays_at(file, *delay, "plane_delay");
     const toml::node* const node = mixer.get("arrangement");
@@ -168,20 +205,33 @@ void read_mixer(const File& file, const toml::table& mixer, Description& descrip
         read_arrangement(file, item, description);
 }
 
-std::uint32_t resolution_mode_at(const File& file, const toml::node& node, const std::string& key)
+hdmi_av::Resolution resolution_at(const File& file, const toml::table& table, const std::string& key)
 {
-    const std::string text = text_at(file, node, key);
-    std::vector<std::string_view> modes;
-    for (const std::string_view name : names::all())
+    const toml::node* const resolution = table.get("resolution");
+    const toml::node* const frequency = table.get("frequency");
+    if (resolution == nullptr || frequency == nullptr)
+        file.wrong(table.source(), key + " needs resolution and frequency");
+    const auto mode = resolution_mode_at(file, *resolution, "resolution of " + key);
+    return { mode, static_cast<std::uint16_t>(number_at(file, *frequency, "frequency of " + key, 0, 65535)) };
+}
+
+/** As many as there are modes, in both families of refresh rates, are enough. */
+void read_sink_modes(const File& file, const toml::node& node, Description& description)
+{
+    constexpr std::size_t most = 128;
+    const toml::array* const list = node.as_array();
+    if (list == nullptr || list->empty() || list->size() > most)
+        file.wrong(node.source(), "modes of hdmi has to be a list of 1 to " + std::to_string(most) +
+                                      " tables: { resolution = \"RES_720P60HZ\", frequency = 60 }");
+    if (description.valid_resolution)
+        file.wrong(node.source(), "hdmi takes valid or modes: what is valid is chosen whatever is asked");
+    for (const toml::node& item : *list)
     {
-        const std::int64_t number = names::number_of(name).value();
-        if (names::name_of(names::Family::ResolutionMode, number) != name)
-            continue;
-        if (name == text)
-            return static_cast<std::uint32_t>(number);
-        modes.push_back(name);
+        if (!item.is_table())
+            file.wrong(item.source(), "a mode of hdmi has to be a table: { resolution = …, frequency = … }");
+        check_keys(file, *item.as_table(), { "resolution", "frequency" }, " in modes of hdmi");
+        description.sink_modes.push_back(resolution_at(file, *item.as_table(), "a mode of hdmi"));
     }
-    file.wrong(node.source(), "no resolution mode is called " + text + suggestion(text, modes));
 }
 
 void read_hdmi(const File& file, const toml::table& hdmi, Description& description)
@@ -190,16 +240,86 @@ void read_hdmi(const File& file, const toml::table& hdmi, Description& descripti
         description.sink_plugged = switch_at(file, *plugged, "plugged of hdmi");
     if (const toml::node* const wanted = hdmi.get("request_resolution"))
         description.resolution_requested = switch_at(file, *wanted, "request_resolution of hdmi");
-    const toml::table* const valid = table_at(file, hdmi, "valid", { "resolution", "frequency" });
-    if (valid == nullptr)
-        return;
-    const toml::node* const resolution = valid->get("resolution");
-    const toml::node* const frequency = valid->get("frequency");
-    if (resolution == nullptr || frequency == nullptr)
-        file.wrong(valid->source(), "valid of hdmi needs resolution and frequency");
-    const auto mode = resolution_mode_at(file, *resolution, "resolution of valid");
-    description.valid_resolution = { mode, static_cast<std::uint16_t>(
-                                               number_at(file, *frequency, "frequency of valid", 0, 65535)) };
+    if (const toml::table* const valid = table_at(file, hdmi, "valid", { "resolution", "frequency" }))
+        description.valid_resolution = resolution_at(file, *valid, "valid of hdmi");
+    if (const toml::node* const modes = hdmi.get("modes"))
+        read_sink_modes(file, *modes, description);
+}
+
+/** A table of its own for each, and no name twice. */
+sources::Id source_id_at(const File& file, const toml::table& table, const Description& description)
+{
+    const toml::node* const node = table.get("name");
+    if (node == nullptr)
+        file.wrong(table.source(), "a source needs a name");
+    const std::string name = text_at(file, *node, "name of a source");
+    const auto& known = sources::names();
+    if (std::find(known.begin(), known.end(), name) == known.end())
+        file.wrong(node->source(), "there is no source " + name + suggestion(name, known));
+    for (const sources::Start& other : description.sources)
+    {
+        if (sources::name_of(other.id) == name)
+            file.wrong(node->source(), name + " stands here twice");
+    }
+    return sources::find(name);
+}
+
+/** { width = 1920, height = 1080 } */
+sources::Size size_at(const File& file, const toml::node& node)
+{
+    constexpr std::int64_t most = 65535;
+    if (!node.is_table())
+        file.wrong(node.source(), "size of a source has to be a table: { width = 1920, height = 1080 }");
+    const toml::table& table = *node.as_table();
+    check_keys(file, table, { "width", "height" }, " in size of a source");
+    const toml::node* const width = table.get("width");
+    const toml::node* const height = table.get("height");
+    if (width == nullptr || height == nullptr)
+        file.wrong(node.source(), "size of a source needs width and height");
+    return { static_cast<INT32>(number_at(file, *width, "width of a source", 1, most)),
+             static_cast<INT32>(number_at(file, *height, "height of a source", 1, most)) };
+}
+
+DRV_GFX_COLOR_MODE_T colour_at(const File& file, const toml::node& node)
+{
+    const std::string colour = text_at(file, node, "colour of a source");
+    if (colour != "rgb" && colour != "ycbcr")
+        file.wrong(node.source(), "colour of a source is rgb or ycbcr, not " + colour);
+    return colour == "rgb" ? DRV_GFX_COLOR_MODE_RGB : DRV_GFX_COLOR_MODE_YCBCR;
+}
+
+void read_source(const File& file, const toml::node& node, Description& description)
+{
+    const toml::table* const table = node.as_table();
+    if (table == nullptr)
+        file.wrong(node.source(), "a source has to be a table: [[source]]");
+    check_keys(file, *table, { "name", "size", "luma_key", "colour" }, " in [[source]]");
+    sources::Start start{ source_id_at(file, *table, description) };
+    const bool is_video = start.id.type == sources::Id::Type::VideoPlane;
+    const toml::node* const luma_key = table->get("luma_key");
+    const toml::node* const colour = table->get("colour");
+    if (const toml::node* const size = table->get("size"))
+        start.size = size_at(file, *size);
+    if (luma_key != nullptr && (!is_video || !start.size))
+        file.wrong(luma_key->source(), "a luma key goes with a video plane that has a size");
+    if (luma_key != nullptr)
+        start.luma_key = static_cast<UCHAR>(number_at(file, *luma_key, "luma_key of a source", 0, 255));
+    if (colour != nullptr && (is_video || !start.size))
+        file.wrong(colour->source(), "a colour goes with an OSD plane that has a size");
+    if (!is_video && start.size && colour == nullptr)
+        file.wrong(table->source(), "an OSD plane that has a size needs a colour: rgb or ycbcr");
+    if (colour != nullptr)
+        start.colour_mode = colour_at(file, *colour);
+    description.sources.push_back(start);
+}
+
+void read_sources(const File& file, const toml::node& node, Description& description)
+{
+    const toml::array* const list = node.as_array();
+    if (list == nullptr)
+        file.wrong(node.source(), "source has to be a list of tables: [[source]]");
+    for (const toml::node& item : *list)
+        read_source(file, item, description);
 }
 
 void read_display_part(const File& file, const toml::node& node, Description& description)
@@ -311,7 +431,8 @@ void read_faults(const File& file, const toml::node& node, Description& descript
 
 Description read(const File& file, const toml::table& root)
 {
-    check_keys(file, root, { "name", "console", "flash", "hdmi", "display_part", "mixer", "fault" }, "");
+    check_keys(file, root,
+               { "name", "console", "flash", "hdmi", "display_part", "mixer", "video_planes", "source", "fault" }, "");
     Description description;
     description.name = file.path.parent_path().filename().string();
     if (const toml::node* const name = root.get("name"))
@@ -323,15 +444,23 @@ Description read(const File& file, const toml::table& root)
     }
     if (const toml::table* const flash = table_at(file, root, "flash", {}))
         read_flash(file, *flash, description);
-    if (const toml::table* const hdmi = table_at(file, root, "hdmi", { "plugged", "request_resolution", "valid" }))
+    if (const toml::table* const hdmi =
+            table_at(file, root, "hdmi", { "plugged", "request_resolution", "valid", "modes" }))
         read_hdmi(file, *hdmi, description);
     if (const toml::table* const part = table_at(file, root, "display_part", { "answer" }))
     {
         if (const toml::node* const answer = part->get("answer"))
             read_display_part(file, *answer, description);
     }
-    if (const toml::table* const mixer = table_at(file, root, "mixer", { "plane_delay", "arrangement" }))
+    if (const toml::table* const mixer = table_at(file, root, "mixer", { "capability", "plane_delay", "arrangement" }))
         read_mixer(file, *mixer, description);
+    if (const toml::table* const planes = table_at(file, root, "video_planes", { "waiting_for_sync" }))
+    {
+        if (const toml::node* const waiting = planes->get("waiting_for_sync"))
+            description.waiting_for_sync = switch_at(file, *waiting, "waiting_for_sync of video_planes");
+    }
+    if (const toml::node* const sources = root.get("source"))
+        read_sources(file, *sources, description);
     if (const toml::node* const faults = root.get("fault"))
         read_faults(file, *faults, description);
     return description;

@@ -151,6 +151,10 @@ void power_on(const Description& description)
         files::note_input(image);
         flash_state.partitions.push_back({ name, image, 0, {} });
     }
+    for (const auto& [name, word] : description.flash_words)
+        flash_state.partitions.push_back({ name, {}, 0, word });
+    std::sort(flash_state.partitions.begin(), flash_state.partitions.end(),
+              [](const Partition& one, const Partition& other) { return one.name < other.name; });
 }
 
 Value state()

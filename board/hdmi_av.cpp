@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <array>
 #include <string>
+#include <vector>
 
 #include "board/device_values.h"
 #include "board/devices.h"
@@ -71,6 +72,7 @@ struct HdmiAv
     bool resolution_requested = false;
     std::array<Value, COMMANDS.size()> parameters; ///< of each command's last call
     std::optional<board::hdmi_av::Resolution> chosen_resolution;
+    std::vector<board::hdmi_av::Resolution> sink_modes; ///< none: it takes anything
     std::optional<UCHAR> posted_resolution;
     std::optional<DRV_PMX_COLOR_SPACE_T> posted_colour_space;
     unsigned change_ok_notices = 0;
@@ -109,12 +111,34 @@ Value reported(const std::array<Value, COMMANDS.size()>& parameters)
     return value;
 }
 
+/** What the driver would choose for a sink; what was set for all questions goes before what the sink takes. */
+board::hdmi_av::Resolution choice(board::hdmi_av::Resolution asked)
+{
+    if (hdmi_av_state.chosen_resolution)
+        return *hdmi_av_state.chosen_resolution;
+    const auto& modes = hdmi_av_state.sink_modes;
+    if (modes.empty())
+        return asked;
+    const auto taken = std::find_if(modes.begin(), modes.end(), [&](const board::hdmi_av::Resolution& mode) {
+        return mode.mode == asked.mode && mode.frequency == asked.frequency;
+    });
+    return taken != modes.end() ? *taken : modes.front();
+}
+
 Value reported(const std::optional<board::hdmi_av::Resolution>& resolution)
 {
     if (!resolution)
         return Value::null();
     return Value::record({ { "mode", board::named(Family::ResolutionMode, resolution->mode) },
                            { "frequency", Value::number(resolution->frequency) } });
+}
+
+Value reported(const std::vector<board::hdmi_av::Resolution>& resolutions)
+{
+    std::vector<Value> values;
+    for (const board::hdmi_av::Resolution& resolution : resolutions)
+        values.push_back(reported(std::optional(resolution)));
+    return Value::list(std::move(values));
 }
 
 } // namespace
@@ -128,6 +152,7 @@ void power_on(const Description& description)
     hdmi_av_state.sink_plugged = description.sink_plugged;
     hdmi_av_state.resolution_requested = description.resolution_requested;
     hdmi_av_state.chosen_resolution = description.valid_resolution;
+    hdmi_av_state.sink_modes = description.sink_modes;
 }
 
 Value state()
@@ -137,6 +162,7 @@ Value state()
                            { "resolution_requested", flag(av.resolution_requested) },
                            { "commands", reported(av.parameters) },
                            { "chosen_resolution", reported(av.chosen_resolution) },
+                           { "sink_modes", reported(av.sink_modes) },
                            { "posted_resolution", setting(av.posted_resolution, Family::ResolutionMode) },
                            { "posted_colour_space", setting(av.posted_colour_space, Family::ColorSpace) },
                            { "change_ok_notices", Value::number(av.change_ok_notices) },
@@ -202,9 +228,9 @@ try
     if (u4Query != PMX_GET_VALID_RES_AND_VFREQ || pvParameter == nullptr)
         return boardCall.answer(FALSE);
     auto* query = static_cast<PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T*>(pvParameter);
-    const auto& chosen = hdmi_av_state.chosen_resolution;
-    query->u4ValidAutoRes = chosen ? chosen->mode : query->u4ResCheck;
-    query->u2ValidAutoVfreq = chosen ? chosen->frequency : query->u2VsyncFreq;
+    const board::hdmi_av::Resolution chosen = choice({ query->u4ResCheck, query->u2VsyncFreq });
+    query->u4ValidAutoRes = chosen.mode;
+    query->u2ValidAutoVfreq = chosen.frequency;
     return boardCall.answer(TRUE);
 }
 BOARD_CALL_END(fgPmxDrvGetAvdInfo)

@@ -11,6 +11,7 @@
 
 #include "board/device_values.h"
 #include "board/devices.h"
+#include "board/layer_state.h"
 #include "board/trace.h"
 #include "pmx_hal.h"
 
@@ -355,8 +356,12 @@ void PMX_HalInitPlaneOrder(UCHAR ucPmxId)
 try
 {
     BOARD_CALL(PMX_HalInitPlaneOrder, ucPmxId);
-    if (is_mixer(ucPmxId))
-        mixer_state.selectors = IDENTITY;
+    if (!is_mixer(ucPmxId))
+        return;
+    mixer_state.selectors = IDENTITY;
+    // Behind a reset's default record, whose word is that of a mixer that can everything.
+    if (const auto& capability = board::description().capability)
+        board::layer_state::set_capability(*capability);
 }
 BOARD_CALL_END(PMX_HalInitPlaneOrder)
 

@@ -105,6 +105,9 @@ try
                                       "stopped and started again registers again");
     else
         registered.push_back(prOps);
+    // The last thing that the mixer does when it starts: from here on drivers of sources find it.
+    if (board::trace_arguments::object_value(prOps).string() == "pmx_pm_ops")
+        board::sources::mixer_has_started();
     return boardCall.answer(0);
 }
 BOARD_CALL_END(register_pm_ops)

@@ -5,6 +5,7 @@
 #include <array>
 #include <optional>
 #include <stdexcept>
+#include <utility>
 
 #include "board/device_values.h"
 #include "board/devices.h"
@@ -54,6 +55,7 @@ struct Sources
 {
     std::array<VideoPlane, VIDEO_PLANES> video;
     std::array<OsdPlane, OSD_PLANES> osd;
+    bool came = false;            ///< those of the board's description
     std::optional<Id> being_told; ///< a video plane whose pu4SetColorMode runs
     unsigned told_in = 0;         ///< in this thread
 };
@@ -394,6 +396,21 @@ UINT32 stop(Id id)
     }
     set_hardware(id, VDP_DISABLED);
     return answer;
+}
+
+void mixer_has_started()
+{
+    if (std::exchange(sources_state.came, true))
+        return;
+    for (const Start& start : description().sources)
+    {
+        if (!start.size)
+            connect(start.id);
+        else if (start.id.type == Id::Type::VideoPlane)
+            start_video(start.id.number, *start.size, start.luma_key);
+        else
+            start_graphics(start.id.number, *start.size, start.colour_mode);
+    }
 }
 
 void set_connects_back(unsigned plane, bool connects_back)

@@ -5,6 +5,7 @@
  *  video plane has its IVdp table published, keeps what it is told, and checks that it is told by the rules. */
 #pragma once
 
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -57,6 +58,17 @@ UINT32 resize(Id id, Size size);
 /** Deliver no more pictures; the plane's hardware is disabled.
  *  @return the mixer's answer */
 UINT32 stop(Id id);
+
+/** What a source does when the mixer has started. */
+struct Start
+{
+    Id id;
+    std::optional<Size> size{}; ///< of its pictures; nothing: it connects, and delivers none yet
+    UCHAR luma_key = 0;         ///< of a video plane
+    DRV_GFX_COLOR_MODE_T colour_mode = DRV_GFX_COLOR_MODE_RGB; ///< of an OSD plane
+};
+/** The mixer has started for the first time since power-on: the sources of the board's description come. */
+void mixer_has_started();
 
 /** Let a video plane break the rule that nobody connects from inside pu4SetColorMode. */
 void set_connects_back(unsigned plane, bool connects_back);

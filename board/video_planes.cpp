@@ -83,9 +83,10 @@ Value reported(const Plane& plane)
 namespace board::video_planes
 {
 
-void power_on(const Description&)
+void power_on(const Description& description)
 {
     video_planes_state = {};
+    video_planes_state.waiting_for_sync = description.waiting_for_sync;
 }
 
 Value state()

@@ -182,7 +182,7 @@ TEST_F(BoardFile, UnknownKeys_AreNamedWithFileLineAndTheNearestValidOne)
     EXPECT_EQ("/player/board.toml:1: no such key: nam; did you mean name?", wrong("nam = \"x\"\n"));
     EXPECT_EQ("/player/board.toml:3: no such key in [hdmi]: pluged; did you mean plugged?",
               wrong("\n[hdmi]\npluged = true\n"));
-    EXPECT_EQ("/player/board.toml:2: no such key in [mixer]: x; there are: plane_delay, arrangement",
+    EXPECT_EQ("/player/board.toml:2: no such key in [mixer]: x; there are: capability, plane_delay, arrangement",
               wrong("[mixer]\nx = 1\n"));
     EXPECT_EQ("/player/board.toml:2: no such key in [console]: lvl; did you mean level?",
               wrong("[console]\nlvl = 1\n"));
@@ -207,9 +207,9 @@ TEST_F(BoardFile, WrongTypesAndRanges)
         { "hdmi.valid = { resolution = \"RES_480P\" }\n", "valid of hdmi needs resolution and frequency" },
         { "hdmi.valid = { frequency = 60 }\n", "valid of hdmi needs resolution and frequency" },
         { "hdmi.valid = { resolution = 2, frequency = 60 }\n",
-          "resolution of valid has to be a text, and not an empty one" },
+          "resolution of valid of hdmi has to be a text, and not an empty one" },
         { "hdmi.valid = { resolution = \"RES_480P\", frequency = 65536 }\n",
-          "frequency of valid has to be 0 to 65535" },
+          "frequency of valid of hdmi has to be 0 to 65535" },
         { "hdmi.valid = { resolution = \"RES_480PP\", frequency = 60 }\n",
           "no resolution mode is called RES_480PP; did you mean RES_480P, RES_480I?" },
         { "display_part.answer = 3\n", "answer of display_part has to be a text, and not an empty one" },
@@ -310,6 +310,69 @@ TEST_F(BoardFile, FaultsWhoseArgumentsOrOutputsCannotBeMeant)
               fault("x_timer_create", "outputs = 7\n"));
     EXPECT_EQ("/player/board.toml:2: x_timer_create has no output hTimer; it has phTimer",
               fault("x_timer_create", "outputs = { hTimer = 7 }\n"));
+}
+
+TEST_F(BoardFile, Product)
+{
+    const Description description = load(R"(
+flash = { boot = { word = "RES_576P" }, other = { word = 0x1234 } }
+mixer.capability = 0xFFFFFFFF
+video_planes.waiting_for_sync = true
+hdmi.modes = [{ resolution = "RES_720P50HZ", frequency = 50 }, { resolution = "RES_576I", frequency = 50 }]
+[[source]]
+name = "vdp1"
+size = { width = 720, height = 576 }
+luma_key = 7
+[[source]]
+name = "osd2"
+size = { width = 1, height = 65535 }
+colour = "ycbcr"
+[[source]]
+name = "osd0"
+)");
+    EXPECT_EQ((std::map<std::string, std::uint32_t>{ { "boot", RES_576P }, { "other", 0x1234 } }),
+              description.flash_words);
+    EXPECT_EQ(0xFFFFFFFF, description.capability);
+    EXPECT_TRUE(description.waiting_for_sync);
+    ASSERT_EQ(2u, description.sink_modes.size());
+    EXPECT_EQ(UINT32{ RES_576I }, description.sink_modes[1].mode);
+    ASSERT_EQ(3u, description.sources.size());
+    EXPECT_EQ("vdp1", board::sources::name_of(description.sources[0].id));
+    EXPECT_EQ(576, description.sources[0].size->height);
+    EXPECT_EQ(7, description.sources[0].luma_key);
+    EXPECT_EQ(DRV_GFX_COLOR_MODE_YCBCR, description.sources[1].colour_mode);
+    EXPECT_FALSE(description.sources[2].size.has_value());
+}
+
+TEST_F(BoardFile, ProductsThatThereCannotBe)
+{
+    const std::pair<const char*, const char*> wrongs[] = {
+        { "flash = { boot = {} }\n", "flash partition boot needs an image, or a word" },
+        { "flash = { boot = { word = \"RES_57\" } }\n", "no resolution mode is called RES_57" },
+        { "flash = { boot = { word = -1 } }\n", "the word of flash partition boot has to be 0 to 4294967295" },
+        { "mixer.capability = -1\n", "capability of the mixer has to be 0 to 4294967295" },
+        { "video_planes.waiting_for_sync = 1\n", "waiting_for_sync of video_planes has to be true or false" },
+        { "hdmi.modes = []\n", "modes of hdmi has to be a list of 1 to 128 tables" },
+        { "hdmi.modes = [1]\n", "a mode of hdmi has to be a table" },
+        { "hdmi.modes = [{ resolution = \"RES_480P\" }]\n", "a mode of hdmi needs resolution and frequency" },
+        { "hdmi = { valid = { resolution = \"RES_480P\", frequency = 60 }, modes = [1] }\n",
+          "hdmi takes valid or modes: what is valid is chosen whatever is asked" },
+        { "source = 1\n", "source has to be a list of tables: [[source]]" },
+        { "[[source]]\n", "a source needs a name" },
+        { "source = [{ name = \"osd7\" }]\n", "there is no source osd7; did you mean " },
+        { "source = [{ name = \"osd0\" }, { name = \"osd0\" }]\n", "osd0 stands here twice" },
+        { "source = [{ name = \"osd0\", luma_key = 1 }]\n", "a luma key goes with a video plane that has a size" },
+        { "source = [{ name = \"vdp0\", colour = \"rgb\" }]\n", "a colour goes with an OSD plane that has a size" },
+        { "source = [{ name = \"osd0\", size = { width = 1, height = 1 } }]\n",
+          "an OSD plane that has a size needs a colour: rgb or ycbcr" },
+        { "source = [{ name = \"osd0\", colour = \"red\", size = { width = 1, height = 1 } }]\n",
+          "colour of a source is rgb or ycbcr, not red" },
+        { "source = [{ name = \"vdp0\", size = { width = 0, height = 1 } }]\n",
+          "width of a source has to be 1 to 65535" },
+        { "source = [{ name = \"vdp0\", size = { width = 1 } }]\n", "size of a source needs width and height" },
+    };
+    for (const auto& [text, complaint] : wrongs)
+        EXPECT_TRUE(wrong(text).starts_with(std::string("/player/board.toml:1: ") + complaint)) << text << wrong(text);
 }
 
 TEST_F(BoardFile, MissingImages_AndTextThatIsNoToml)

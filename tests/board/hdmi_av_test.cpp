@@ -2,6 +2,7 @@
 #include "board/hdmi_av.h"
 
 #include <string>
+#include <utility>
 
 #include "device_test.h"
 #include "drv_av_d.h"
@@ -21,9 +22,10 @@ constexpr const char* NO_COMMAND =
     "PMX_SET_EXT_EDGE_ENHANCEMENT=null, PMX_SET_EXT_DETAIL_ENHANCEMENT=null, PMX_SET_EXT_ZOOM_IMAGE=null, "
     "PMX_SET_EXT_GAMMA=null, PMX_SET_EXT_DEEP_COLOR=null}";
 
-const std::string HDMI_AS_NEW = std::string("{sink_plugged=1, resolution_requested=0, commands=") + NO_COMMAND +
-                                ", chosen_resolution=null, posted_resolution=null, posted_colour_space=null, "
-                                "change_ok_notices=0, ccir_before_mixer=null}";
+const std::string HDMI_AS_NEW =
+    std::string("{sink_plugged=1, resolution_requested=0, commands=") + NO_COMMAND +
+    ", chosen_resolution=null, sink_modes=[], posted_resolution=null, posted_colour_space=null, "
+    "change_ok_notices=0, ccir_before_mixer=null}";
 
 class HdmiAv : public DeviceTest
 {
@@ -84,6 +86,24 @@ TEST_F(HdmiAv, PowerOn_RequestAndChoiceAreAsTheBoardSays)
     EXPECT_EQ(50u, query.u2ValidAutoVfreq);
     power_on({});
     EXPECT_EQ(HDMI_AS_NEW, board::hdmi_av::state().to_text());
+}
+
+TEST_F(HdmiAv, PowerOn_TheSinkTakesTheModesThatTheBoardSays)
+{
+    board::Description description;
+    description.sink_modes = { { RES_720P50HZ, 50 }, { RES_576P, 50 } };
+    power_on(description);
+    EXPECT_EQ("[{mode=RES_720P50HZ, frequency=50}, {mode=RES_576P, frequency=50}]", now("sink_modes"));
+    const auto chosen_for = [](UINT32 mode, UINT16 frequency) {
+        PMX_GET_AVD_VALID_RES_AND_VFREQ_PARAMETER_T query{ mode, frequency, 0, 0 };
+        EXPECT_EQ(TRUE, fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, &query));
+        return std::pair(query.u4ValidAutoRes, query.u2ValidAutoVfreq);
+    };
+    EXPECT_EQ(std::pair(UINT32{ RES_576P }, UINT16{ 50 }), chosen_for(RES_576P, 50));
+    EXPECT_EQ(std::pair(UINT32{ RES_720P50HZ }, UINT16{ 50 }), chosen_for(RES_1080P60HZ, 60)) << "what it likes best";
+    EXPECT_EQ(std::pair(UINT32{ RES_720P50HZ }, UINT16{ 50 }), chosen_for(RES_576P, 60)) << "not at this frequency";
+    board::hdmi_av::choose_resolution(board::hdmi_av::Resolution{ RES_480P, 60 });
+    EXPECT_EQ(std::pair(UINT32{ RES_480P }, UINT16{ 60 }), chosen_for(RES_576P, 50)) << "whatever is asked";
 }
 
 TEST_F(HdmiAv, PowerOn_ForgetsEverything)

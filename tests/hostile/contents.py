@@ -97,6 +97,8 @@ def boards():
         "faulted call": b'[[fault]]\nfunction = "x_sema_lock(' + b"[" * 1_000 + b'"\nanswer = 0\n',
         "fault's output": b'[[fault]]\nfunction = "x_sema_create"\nanswer = 0\noutputs = { phSema = "' +
                           b"[" * 1_000 + b'" }\n',
+        "many sources": b'[[source]]\nname = "osd0"\n' * 10_000,
+        "many modes": b"hdmi.modes = [" + b'{resolution="RES_480P",frequency=60},' * 10_000 + b"]\n",
         "fault without table": b'[[fault]]\nfunction = "i4ImQueryInterface"\nanswer = 0\nalways = true\n',
         "many arrangements": b"[[mixer.arrangement]]\n" * 10_000,
     }

@@ -51,6 +51,21 @@ TEST(Status, AtStart_NothingIsSetYet)
               shown_by("PMX_Init\nstatus outputs"));
 }
 
+TEST(Status, Product_ShowsWhatItLacksAndWhatItsSinkTakes)
+{
+    const std::string shown = shown_by("power-on bedroom-player\nPMX_Init\nstatus");
+    EXPECT_TRUE(shown.starts_with("Board bedroom player, 2 ms after power-on\n"
+                                  "Mixer      RES_720P50HZ at 60 Hz, PMX_TV_TYPE_PAL, master enable off\n"
+                                  "  capability 0x3DEA30FF: refuses 23 modes, gamma, digital port, black level\n"))
+        << shown;
+    EXPECT_NE(std::string::npos,
+              shown.find("  HDMI sink: plugged in, takes RES_720P50HZ at 50 Hz, RES_1080I50HZ at 50 Hz,\n"
+                         "    RES_576P at 50 Hz, RES_576I at 50 Hz, RES_720P60HZ at 60 Hz\n"))
+        << shown;
+    EXPECT_NE(std::string::npos, shown.find("vdp0    720x576    YCbCr BT.601")) << shown;
+    EXPECT_NE(std::string::npos, shown.find("osd1    -          connected")) << shown;
+}
+
 TEST(Status, IsOneScreen)
 {
     const std::string text = shown_by(std::string("PMX_Init\nsource vdp0 start 1920x1080\ndisplay-part never\n") +

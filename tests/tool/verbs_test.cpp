@@ -38,6 +38,21 @@ TEST(Verbs, WithoutPowerOn_TheScenarioHasItsOwnBoard)
         << "an expectation must see the board of its own scenario, not that of the one before";
 }
 
+TEST(Verbs, PowerOn_OfAProduct)
+{
+    EXPECT_EQ("", diagnostics("power-on bedroom-player\nexpect state sources.vdp0.connected 0\nPMX_Init\n"
+                              "expect call PMX_HalSetMode(0, RES_720P50HZ)\n"
+                              "expect call NOTICE source \"vdp0 starts, 720x576, luma key 0\"\n"
+                              "expect call NOTICE source \"osd1 connects\"\n"
+                              "PMX_CheckCap 0 RES_1080P50HZ\nexpect result 0\n"
+                              "PMX_GetCap 0\nexpect out pu4Cap 0x3DEA30FF\n"
+                              "PMX_ChkSupportedRes 0 RES_1080P60HZ 60\nexpect out ucSupportedAutoRes RES_720P50HZ\n"
+                              "PMX_ChkSupportedRes 0 RES_576P 50\nexpect out ucSupportedAutoRes RES_576P\n"
+                              "PMX_Reset 0\nexpect state u4Capability 0x3DEA30FF\nexpect none i4ImQueryInterface\n"
+                              "PMX_Stop\nPMX_Init\nexpect call i4ImRegisterInterface2(...)\nexpect none x_sema_lock"))
+        << "sources come once";
+}
+
 TEST(Verbs, Flash_ReplacesAndRemovesAPartition)
 {
     EXPECT_EQ(

@@ -83,6 +83,14 @@ std::vector<ModeRow> mode_rows()
     return rows;
 }
 
+std::uint32_t default_capability()
+{
+    const auto symbol = board::executable_symbols::find("_arPmxConfDefault");
+    if (!symbol)
+        throw std::runtime_error("the layer's default record is not in this executable");
+    return static_cast<const PMX_CONF_T*>(symbol->address)->u4Capability;
+}
+
 std::map<unsigned, std::string> capability_features()
 {
     return { { PMX_CAP_BIT_GAMMA, "gamma" },           { PMX_CAP_BIT_BRIGHTNESS, "brightness" },

@@ -49,6 +49,9 @@ ModeRow mode_row(unsigned number);
 /** The modes that there are, by number. */
 std::vector<ModeRow> mode_rows();
 
+/** The capability word that a reset puts into the record. */
+std::uint32_t default_capability();
+
 /** What hangs on the bits of the capability word that are no modes', by bit. */
 std::map<unsigned, std::string> capability_features();
 

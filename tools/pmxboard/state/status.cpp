@@ -123,7 +123,7 @@ std::vector<OutputStatus> outputs_of(const View& view)
 SinkStatus sink_of(const View& view)
 {
     return { view.is_on("hdmi_av.sink_plugged"), view.at("hdmi_av.chosen_resolution.mode"),
-             view.at("hdmi_av.chosen_resolution.frequency") };
+             view.at("hdmi_av.chosen_resolution.frequency"), view.at("hdmi_av.sink_modes").items() };
 }
 
 struct Swap
@@ -317,6 +317,8 @@ Status status_of(const Value& state, const std::string& board)
     status.frequency = view.at("record.ucVfreq");
     status.tv_type = view.at("mixer.tv_type");
     status.colour_space = view.at("record.eMasterColorSpace");
+    if (const auto word = view.number("record.u4Capability"))
+        status.capability = static_cast<std::uint32_t>(*word);
     status.muted = view.is_on("mixer.muted");
     status.colour_bar = view.is_on("mixer.colour_bar.enabled");
     status.outputs = outputs_of(view);

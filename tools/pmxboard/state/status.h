@@ -34,6 +34,7 @@ struct SinkStatus
     bool plugged = false;
     board::Value takes_mode; ///< null: whatever it is asked about
     board::Value takes_frequency;
+    std::vector<board::Value> modes; ///< with their frequencies, the one it likes best first; none: any
 };
 
 struct PlaneStatus
@@ -76,6 +77,7 @@ struct Status
     board::Value frequency;
     board::Value tv_type;
     board::Value colour_space;
+    std::optional<std::uint32_t> capability;
     bool muted = false;
     bool colour_bar = false;
     std::vector<OutputStatus> outputs;

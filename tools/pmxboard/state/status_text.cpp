@@ -82,10 +82,43 @@ std::string mixer_text(const Status& status, const Look& look)
     return text + "\n";
 }
 
+/** What a product's mixer lacks that the layer would do for it. */
+std::string capability_text(const Status& status, const Look& look)
+{
+    const std::uint32_t all = record_view::default_capability();
+    if (!status.initialised || !status.capability || *status.capability == all)
+        return {};
+    const auto lacks = [&](unsigned bit) { return ((all & ~*status.capability) >> bit & 1) != 0; };
+    unsigned modes = 0;
+    for (const record_view::ModeRow& mode : record_view::mode_rows())
+        modes += mode.capability && lacks(*mode.capability) ? 1 : 0;
+    std::string text = "  capability " + Value::number(*status.capability, {}, Value::Base::Hex).to_text() +
+                       ": refuses " + std::to_string(modes) + (modes == 1 ? " mode" : " modes");
+    for (const auto& [bit, feature] : record_view::capability_features())
+        text += lacks(bit) ? ", " + feature : "";
+    return wrapped(text, look.width, 0, 4);
+}
+
+/** What a sink of its own kind takes, the one it likes best first. */
+std::string modes_text(const std::vector<Value>& modes)
+{
+    std::string text;
+    for (const Value& mode : modes)
+    {
+        const Value* const name = mode.find("mode");
+        const Value* const frequency = mode.find("frequency");
+        if (name != nullptr && frequency != nullptr)
+            text += (text.empty() ? "" : ", ") + name->to_text() + " at " + frequency->to_text() + " Hz";
+    }
+    return printable(text);
+}
+
 std::string sink_text(const SinkStatus& sink)
 {
     if (!sink.plugged)
         return "none is plugged in";
+    if (!is_there(sink.takes_mode) && !sink.modes.empty())
+        return "plugged in, takes " + modes_text(sink.modes);
     if (!is_there(sink.takes_mode))
         return "plugged in, takes any mode";
     return "plugged in, takes " + sink.takes_mode.to_text() + " at " + sink.takes_frequency.to_text() +
@@ -108,7 +141,7 @@ std::string outputs_text(const Status& status, const Look& look)
     std::string text = look.bold("Output      shows           size      Hz  colour") + "\n";
     for (const OutputStatus& output : status.outputs)
         text += output_text(output);
-    return text + "  HDMI sink: " + sink_text(status.sink) + "\n";
+    return text + wrapped("  HDMI sink: " + sink_text(status.sink), look.width, 0, 4);
 }
 
 std::string plane_text(const PlaneStatus& plane)
@@ -201,8 +234,8 @@ std::string replaced_text(const Status& status, const Look& look)
 std::string all_text(const Status& status, const Look& look)
 {
     return look.bold("Board " + printable(status.board)) + ", " + moment(status.now_us) + " after power-on\n" +
-           mixer_text(status, look) + outputs_text(status, look) + planes_text(status, look) +
-           graphics_text(status, look) + disagreements_text(status, look);
+           mixer_text(status, look) + capability_text(status, look) + outputs_text(status, look) +
+           planes_text(status, look) + graphics_text(status, look) + disagreements_text(status, look);
 }
 
 /* For programs. */
@@ -279,6 +312,9 @@ Json json_of(const Status& status)
     Json planes = Json::array();
     for (const PlaneStatus& plane : status.planes)
         planes.push_back(json_of(plane));
+    Json modes = Json::array();
+    for (const Value& mode : status.sink.modes)
+        modes.push_back(json_of(mode));
     const Json takes = is_there(status.sink.takes_mode) ? Json{ { "mode", json_of(status.sink.takes_mode) },
                                                                 { "frequency", json_of(status.sink.takes_frequency) } }
                                                         : Json();
@@ -291,11 +327,14 @@ Json json_of(const Status& status)
                  { "frequency", json_of(status.frequency) },
                  { "tv_type", json_of(status.tv_type) },
                  { "colour_space", json_of(status.colour_space) },
+                 { "capability",
+                   status.capability ? json_of(Value::number(*status.capability, {}, Value::Base::Hex)) : Json() },
                  { "muted", static_cast<int>(status.muted) },
                  { "colour_bar", static_cast<int>(status.colour_bar) },
                  { "swapped_planes", status.swaps } } },
              { "outputs", outputs },
-             { "sink", { { "plugged", static_cast<int>(status.sink.plugged) }, { "takes", takes } } },
+             { "sink",
+               { { "plugged", static_cast<int>(status.sink.plugged) }, { "takes", takes }, { "modes", modes } } },
              { "planes", planes },
              { "graphics", json_of(status.graphics) },
              { "disagreements", status.disagreements } };

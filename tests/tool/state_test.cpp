@@ -194,6 +194,30 @@ TEST(Dump, WhatLooksLikeANumber_IsOneOnlyAsAWhole)
         state.to_text());
 }
 
+TEST(Paths, ThatNearlyExist_AreAnsweredWithThoseThatDo)
+{
+    run("PMX_Init");
+    const Value state = pmxboard::whole_state();
+    const auto said = [&](const char* path) {
+        try
+        {
+            return pmxboard::part_of(state, path).to_text();
+        }
+        catch (const pmxboard::LineError& error)
+        {
+            return std::string(error.what());
+        }
+    };
+    EXPECT_EQ("no state hdmi.valid; did you mean hdmi_av.chosen_resolution?", said("hdmi.valid"));
+    EXPECT_EQ("no state hdmi_av.valid; did you mean hdmi_av.chosen_resolution?", said("hdmi_av.valid"));
+    EXPECT_EQ("no state hdmi.modes; did you mean hdmi_av.sink_modes?", said("hdmi.modes"));
+    EXPECT_EQ("no state mixer.capability; did you mean record.u4Capability?", said("mixer.capability"));
+    EXPECT_EQ("no state vdp0.size; did you mean sources.vdp0.size?", said("vdp0.size"));
+    EXPECT_EQ("no state plugged; did you mean hdmi_av.sink_plugged?", said("plugged"));
+    EXPECT_EQ("no state mixer.tvtype; did you mean mixer.tv_type?", said("mixer.tvtype"));
+    EXPECT_TRUE(said("display.nothing").starts_with("no state display.nothing; display_part has answer, "));
+}
+
 TEST(Paths, OfASavedState)
 {
     run("PMX_Init\npoke arOutputConf[1].eResMode RES_576P");

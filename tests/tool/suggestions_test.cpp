@@ -13,7 +13,7 @@ using tool_test::diagnostics;
 
 TEST(Suggestions, ForWhatIsNearNothing)
 {
-    EXPECT_NE(std::string::npos, diagnostics("state hdmi.valid").find("; hdmi_av has sink_plugged, "));
+    EXPECT_NE(std::string::npos, diagnostics("state hdmi.nothing").find("; hdmi_av has sink_plugged, "));
     const pmxboard::TraceFilter filter{ { "FOO" }, {} };
     EXPECT_EQ(0u, filter.complaint().find("no platform function begins with \"FOO\"; many begin with "))
         << filter.complaint();

@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "tools/pmxboard/state/paths.h"
 
+#include <algorithm>
 #include <string_view>
+#include <utility>
 
 #include "board/names.h"
 #include "tools/pmxboard/functions/errors.h"
@@ -48,6 +50,53 @@ std::string tree(const board::Value& value, std::size_t indent)
             text += head + "\n" + tree(member, indent + 2);
     }
     return text;
+}
+
+/** What a board file calls otherwise than the state does. */
+constexpr std::pair<std::string_view, std::string_view> keys_of_boards[] = {
+    { "hdmi.plugged", "hdmi_av.sink_plugged" },    { "hdmi.request_resolution", "hdmi_av.resolution_requested" },
+    { "hdmi.valid", "hdmi_av.chosen_resolution" }, { "hdmi.modes", "hdmi_av.sink_modes" },
+    { "mixer.capability", "record.u4Capability" },
+};
+
+/** The state that a board file's key is about, whether the device is called as there or as in the state. */
+std::string meant_by_key(std::string_view path)
+{
+    const std::string_view device = path.substr(0, path.find('.'));
+    const std::string_view rest = path.substr(device.size());
+    for (const auto& [key, state] : keys_of_boards)
+    {
+        const std::string_view key_device = key.substr(0, key.find('.'));
+        if (device.starts_with(key_device) && rest == key.substr(key_device.size()))
+            return "; did you mean " + std::string(state) + "?";
+    }
+    return {};
+}
+
+std::string_view last_step(std::string_view path)
+{
+    return path.substr(path.find_last_of('.') + 1);
+}
+
+/** The shortest paths that end with what was written, or with a name that holds it. */
+std::string paths_that_end_so(std::string_view path, const std::vector<std::string>& paths)
+{
+    constexpr std::size_t least = 3;
+    constexpr std::size_t most = 3;
+    std::vector<std::string_view> found;
+    for (const std::string& other : paths)
+    {
+        const bool is_end = other.ends_with("." + std::string(path));
+        const bool holds = path.find('.') == path.npos && last_step(other).find(path) != other.npos;
+        if (path.size() >= least && (is_end || holds))
+            found.push_back(other);
+    }
+    std::stable_sort(found.begin(), found.end(),
+                     [](std::string_view one, std::string_view other) { return one.size() < other.size(); });
+    std::string text;
+    for (std::size_t i = 0; i < std::min(found.size(), most); ++i)
+        text.append(text.empty() ? "; did you mean " : ", ").append(found[i]);
+    return text.empty() ? text : text + "?";
 }
 
 /** For a path that begins as a member of the state does: what that has. */
@@ -104,7 +153,11 @@ Value part_of(const Value& state, const std::string& written)
         if (const Value* const members = state.find(group))
             collect_paths(*members, {}, paths);
     }
-    const std::string near = did_you_mean(path, { paths.begin(), paths.end() });
+    std::string near = meant_by_key(path);
+    if (near.empty())
+        near = did_you_mean(path, { paths.begin(), paths.end() });
+    if (near.empty())
+        near = paths_that_end_so(path, paths);
     throw LineError("no state " + written + (near.empty() ? members_like(state, path) : near));
 }
 

@@ -70,9 +70,21 @@ static void vRefuse(void)
     vExpect("timers after unloading", 0, i4Timers());
 }
 
+/* A source connects and delivers: nobody hands out its table, and the layer calls none. */
+static void vMeetSources(void)
+{
+    PMX_Init();
+    vExpect("a video plane's connection", PMX_PORT_DONE,
+            (long)i4Pmx_Connect(PMX_COMP_TYPE_PMX, 0, PMX_COMP_TYPE_VDP, 0));
+    vExpect("its first size", 1, (long)PMX_VdpEnabled(0, 0, 1920, 1080, 0));
+    vExpect("another colour space", 1, (long)PMX_VdpEnabled(0, 0, 720, 576, 0));
+    vPortUnload();
+}
+
 int main(void)
 {
     vUnload();
+    vMeetSources();
     vRefuse();
     return i4Wrong != 0;
 }

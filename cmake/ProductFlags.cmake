@@ -1,15 +1,14 @@
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 # How the layer is compiled, in every preset alike: what ships is what was tested. Nothing of the build type enters.
 
-# The language that the product allows itself, on every target.
-set(PMX_PRODUCT_LANGUAGE
-    -std=c++20 -ffreestanding -fno-exceptions -fno-rtti -fno-threadsafe-statics -fno-use-cxa-atexit
-    -fvisibility=hidden -fno-pic -fno-pie)
+# The language that the product allows itself on every target, and what keeps the objects free of symbols and sections
+# that a stack does not provide for. In a file of its own, which is installed: a port hands it to its compiler as it is.
+set(layer_flags ${CMAKE_CURRENT_LIST_DIR}/../examples/layer.flags)
+set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${layer_flags})
+file(STRINGS ${layer_flags} PMX_PRODUCT_LANGUAGE)
 
-# What keeps the objects free of symbols and sections that a stack does not provide for, and of the names of the folders
-# in which they were made.
+# No names of the folders in which the objects were made.
 set(PMX_PRODUCT_CODE
-    -fno-stack-protector -fno-asynchronous-unwind-tables -fno-unwind-tables -U_FORTIFY_SOURCE
     -ffile-prefix-map=${PROJECT_SOURCE_DIR}/= -ffile-prefix-map=${PROJECT_BINARY_DIR}=build -g)
 
 # The 32-bit target. The headers hold the width of enumerations, whatever a compiler thinks, and the layer has no

@@ -1,9 +1,9 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
-"""Compiles the porting skeleton as C and links it with the object that ships: nothing but the kernel's own may stay
-open.
+"""Compiles the porting skeleton and the self-test of ports as C, for a machine without a library, and links both with
+the object that ships: nothing but the kernel's own may stay open.
 
-usage: check_port_skeleton.py SKELETON PMX_IF_OBJECT COMPILER...
+usage: check_port_skeleton.py SKELETON SELFTEST PMX_IF_OBJECT COMPILER...
 """
 
 import pathlib
@@ -17,24 +17,26 @@ INCLUDES = ["src/system/inc", "src/driver/inc", "src/driver/private_inc"]
 OF_THE_KERNEL = {"memcpy", "memset"}
 
 
-def open_symbols(source, shipped, compiler, directory):
-    skeleton, linked = directory / "skeleton.o", directory / "linked.o"
-    subprocess.run([compiler, *FLAGS, *(f"-I{ROOT / include}" for include in INCLUDES), "-c", source,
-                    "-o", skeleton], check=True)
-    subprocess.run(["ld", "-r", "-o", linked, shipped, skeleton], check=True)
+def open_symbols(sources, shipped, compiler, directory):
+    linked = directory / "linked.o"
+    compiled = [directory / f"{pathlib.Path(source).stem}.o" for source in sources]
+    for source, made in zip(sources, compiled):
+        subprocess.run([compiler, *FLAGS, *(f"-I{ROOT / include}" for include in INCLUDES), "-c", source, "-o", made],
+                       check=True)
+    subprocess.run(["ld", "-r", "-o", linked, shipped, *compiled], check=True)
     names = subprocess.run(["nm", "--undefined-only", "--format=posix", linked], check=True, capture_output=True,
                            text=True).stdout
     return {line.split()[0] for line in names.splitlines()}
 
 
 def main():
-    source, shipped, *compilers = sys.argv[1:]
+    skeleton, selftest, shipped, *compilers = sys.argv[1:]
     missing = set()
     with tempfile.TemporaryDirectory() as directory:
         for compiler in compilers:
-            missing |= open_symbols(source, shipped, compiler, pathlib.Path(directory)) - OF_THE_KERNEL
+            missing |= open_symbols([skeleton, selftest], shipped, compiler, pathlib.Path(directory)) - OF_THE_KERNEL
     for name in sorted(missing):
-        print(f"no body in the skeleton: {name}")
+        print(f"nobody has a body of {name}")
     return 1 if missing or not compilers else 0
 
 

@@ -78,6 +78,16 @@ def states(good):
     found["cut"] = good[:len(good) // 2]
     for version in (b"99", b"0", b"-1", b'"1"', b"1.0", b"null", b"[]", b"99999999999999999999"):
         found[f"version {version.decode()}"] = good.replace(b'"version": 1', b'"version": ' + version)
+    for what, steps in (("no list", b"1"), ("no version", b"{}"), ("no commands", b'{"version":1,"commands":[]}'),
+                        ("lost controls", b'{"version":1,"lost":"\\u001b[31m"}'),
+                        ("100000 commands",
+                         b'{"version":1,"commands":[' + b",".join([b'{"line":"x"}'] * 100_000) + b"]}"),
+                        ("command of controls", b'{"version":1,"commands":[{"line":"\\u001b[31m"}]}'),
+                        ("command that writes", b'{"version":1,"commands":[{"line":"save written"}]}'),
+                        ("command within itself", b'{"version":1,"commands":[{"line":"restore x"}]}'),
+                        ("directory of zero", b'{"version":1,"commands":[{"in":"\\u0000","line":"flash a b"}]}'),
+                        ("brackets", b'{"version":1,"commands":[{"line":"' + b"[" * DEEP + b'"}]}')):
+        found["steps, " + what] = head + b'"a":1},"steps":' + steps + b"}"
     return found
 
 

@@ -140,6 +140,7 @@ class Inputs(Directory):
         yield "shell", ("shell",), content
         yield "state", ("state", file), b""
         yield "state -", ("state", "--json", "-"), content
+        yield "restore", ("run", "-"), f"restore {file}\nPMX_Init\n".encode()
         yield "state two", ("state", self.state, file, ), b""
         yield "status", ("status", file), b""
         yield "decode", ("decode", "-v", file), b""
@@ -173,7 +174,10 @@ class Inputs(Directory):
     def test_saved_states(self):
         found = contents.states(self.state.read_bytes())
         self.assertNotIn(self.state.read_bytes(), found.values(), "as it was")
-        self.try_all(found, ("state", "state -", "state two", "status"))
+        self.try_all(found, ("state", "state -", "state two", "status", "restore"))
+        steps = {name: content for name, content in found.items() if name.startswith("steps")}
+        self.assertTrue(steps)
+        self.try_all(steps, ("restore",))
 
     def test_board_files(self):
         self.try_all(contents.boards(), ("board", "power-on"))

@@ -178,7 +178,7 @@ private:
 
     void stop_at(const board::TraceEntry& entry)
     {
-        if (!m_breaks.contains(entry.function) || m_session.imagines() || m_unreadable)
+        if (!m_breaks.contains(entry.function) || m_session.imagines() || m_session.is_restoring() || m_unreadable)
             return;
         m_output.flush(); // what led here
         std::cout << "stopped in " << printable_lines(entry.brief()) << "; continue goes on\n";

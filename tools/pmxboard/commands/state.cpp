@@ -22,7 +22,7 @@ constexpr int exit_differs = 1;
 
 StateDump load(const std::string& name)
 {
-    const std::string text = board::files::read_named(name, 16 * board::files::mebibyte);
+    const std::string text = board::files::read_named(name, largest_state);
     try
     {
         return read_dump(text);

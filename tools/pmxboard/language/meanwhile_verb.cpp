@@ -66,6 +66,8 @@ void check_command(const Line& command)
             "meanwhile takes a command that somebody else gives; each meanwhile stands on a line of its own");
     if (name == "power-on")
         throw LineError("power-on would take the board away from under the operation that is running");
+    if (name == "restore")
+        throw LineError("restore would take the board away from under the operation that is running");
     if (name == "include")
         throw LineError("include carries out many lines; each meanwhile is one command");
     if (found.verb->only_looks)

@@ -83,6 +83,8 @@ void Session::run_line(std::string_view text)
         need_power({});
         check_expectation(*this, line);
         ++m_expectations;
+        if (line.word(1) == "misuses")
+            keep_step(line);
         return;
     }
     m_output.command(line.from(0));
@@ -91,13 +93,21 @@ void Session::run_line(std::string_view text)
     {
         run_command(line);
     }
-    catch (...)
+    catch (const LineError&)
     {
         m_output.flush();
         board::meanwhiles::forget_failures(); // the first one that was told is enough
         throw;
     }
+    catch (...)
+    {
+        m_output.flush();
+        board::meanwhiles::forget_failures();
+        keep_step(line); // it has failed in the middle of what it did
+        throw;
+    }
     m_output.flush();
+    keep_step(line);
     if (m_shows_explanations && m_commands != commands_before && m_explanation && m_explanation->refusal() != nullptr)
         m_output.shown(to_json_line(*m_explanation), to_text(*m_explanation, m_output.look()));
 }
@@ -156,12 +166,26 @@ void Session::run_stopped(const Line& line)
     const std::string& name = line.word(0);
     const Command command = find_command(name);
     const bool looks = command.verb != nullptr && command.verb->only_looks;
-    if (name == "expect" || name == "power-on" || name == "include" || name == "what-if")
+    if (name == "expect" || name == "power-on" || name == "include" || name == "what-if" || name == "restore")
         throw LineError(name + " waits until the layer has gone on: continue");
-    if (looks)
-        carry_out(line);
-    else
-        run_meanwhile(line);
+    const Steps before = std::exchange(m_steps, {});
+    m_steps.begin({});
+    m_steps.lose("it was saved while the layer was stopped in the middle of a call");
+    try
+    {
+        if (looks)
+            carry_out(line);
+        else
+            run_meanwhile(line);
+    }
+    catch (...)
+    {
+        m_steps = before;
+        throw;
+    }
+    m_steps = before;
+    if (!looks)
+        m_steps.lose("a line was typed while the layer was stopped in the middle of a call");
 }
 
 bool Session::is_meanwhile()
@@ -290,6 +314,13 @@ void Session::power_on(const std::string& board)
         throw StepFailed(std::string("the board cannot be powered on: ") + wrong.what());
     }
     m_powered = true;
+    const Step step{ board.empty() ? std::string() : m_directory.string(), "power-on " + word_of_file(name) };
+    m_steps.begin(step);
+    // What is seen goes on through a power-on.
+    if (m_watches_stores)
+        m_steps.add({ step.directory, "stores on" });
+    if (!m_output.shows_trace())
+        m_steps.add({ step.directory, "trace off" });
     m_before.reset();
     m_output.powered_on();
     m_misuses_expected = 0;
@@ -345,6 +376,13 @@ std::string Session::console_window() const
 std::filesystem::path Session::file(const std::string& name) const
 {
     return m_directory / file_name(name);
+}
+
+std::string word_of_file(const std::string& name)
+{
+    const std::string quoted = board::quote(name);
+    const bool is_plain = quoted.size() == name.size() + 2 && name.find_first_of(" #[]{}()") == name.npos;
+    return is_plain ? name : quoted;
 }
 
 std::string file_name(const std::string& word)

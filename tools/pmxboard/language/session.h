@@ -18,6 +18,8 @@
 #include "tools/pmxboard/language/explanation.h"
 #include "tools/pmxboard/language/line.h"
 #include "tools/pmxboard/state/diff.h"
+#include "tools/pmxboard/state/dump.h"
+#include "tools/pmxboard/state/steps.h"
 #include "tools/pmxboard/view/output.h"
 
 namespace pmxboard
@@ -102,6 +104,13 @@ public:
     /** Of the last command that did not only look; nothing when none was explained. */
     const std::optional<Explanation>& explanation() const { return m_explanation; }
 
+    /** The commands that led here, as a saved state keeps them. */
+    const Steps& steps() const { return m_steps; }
+    /** Bring board and layer to a saved state by what led there; `name` is the file's, for messages. When they do not
+     *  lead there, nothing has changed. Throws StepFailed. */
+    void restore(const StateDump& dump, const std::string& name);
+    bool is_restoring() const { return m_restoring; }
+
     /* For expectations */
 
     const std::string& last_operation() const { return m_last_operation; }
@@ -123,6 +132,9 @@ private:
     void run_file(const std::string& path, const std::string& name);
     /** A scenario that does not begin with power-on has a board all the same. */
     void need_power(std::string_view command);
+    void run_step(const Step& step);
+    void run_steps(const StateDump& dump, const std::string& name);
+    void keep_step(const Line& line);
     void check_misuses() const;
     void remember(const Line& line);
     void explain_ahead(const Line& line);
@@ -136,6 +148,8 @@ private:
     unsigned m_misuses_expected = 0;
     std::string m_last_misuse;
     bool m_watches = true;
+    Steps m_steps;
+    bool m_restoring = false;
     unsigned m_imagined = 0; ///< what-if within what-if
     bool m_watches_stores = false;
     bool m_explains = false;
@@ -159,6 +173,8 @@ private:
 
 /** A file's name as a scenario writes it: with blanks it stands in double quotes. Throws LineError. */
 std::string file_name(const std::string& word);
+/** The other way round. */
+std::string word_of_file(const std::string& name);
 
 /** `expect …`. Throws StepFailed when it is not met. */
 void check_expectation(Session& session, const Line& line);

@@ -22,9 +22,9 @@ namespace
 
 using board::Value;
 
-StateDump dump_of_now()
+StateDump dump_of_now(const Session& session)
 {
-    return { board::description().name, whole_state() };
+    return { board::description().name, whole_state(), session.steps() };
 }
 
 std::string line_for_programs(const NamedValues& values)
@@ -47,7 +47,7 @@ void show_state(Session& session, const Words& words)
         values.emplace_back(path, state_at(path));
     if (paths.empty())
         values.emplace_back("", whole_state());
-    const std::string json = paths.empty() ? to_json(dump_of_now()) : to_json(dump_of_now().board, values);
+    const std::string json = paths.empty() ? to_json(dump_of_now(session)) : to_json(board::description().name, values);
     session.output().shown(line_for_programs(values), words.has("--json") ? json + "\n" : to_text(values));
 }
 
@@ -81,13 +81,33 @@ void save(Session& session, const Words& words)
     const std::string name = file_name(words.at("FILE"));
     try
     {
-        write_file(name, to_json(dump_of_now()) + "\n");
+        write_file(name, to_json(dump_of_now(session)) + "\n");
     }
     catch (const board::files::FileError& error)
     {
         throw StepFailed(error.what());
     }
     session.output().text("  saved to " + printable(name) + "\n");
+}
+
+void restore(Session& session, const Words& words)
+{
+    const std::string name = file_name(words.at("FILE"));
+    StateDump dump;
+    try
+    {
+        dump = read_dump(board::files::read(name, largest_state));
+    }
+    catch (const board::files::FileError& error)
+    {
+        throw StepFailed(error.what());
+    }
+    catch (const DumpError& error)
+    {
+        throw StepFailed(name + ": " + error.what());
+    }
+    session.restore(dump, name);
+    session.output().text("  restored from " + printable(name) + "\n");
 }
 
 void poke(Session&, const Words& words)
@@ -125,6 +145,11 @@ std::vector<Verb> state_verbs()
               show_changes } },
           true },
         { "save", { { "save FILE", "write the whole state to a file, relative to where the tool runs", save } }, true },
+        { "restore",
+          { { "restore FILE",
+              "bring board and layer to a saved state, by the commands that led there; the file is named relative to "
+              "where the tool runs",
+              restore } } },
         { "poke", { { "poke FIELD VALUE", "change the layer's record, for what no operation can set", poke } } },
     };
 }

@@ -5,6 +5,7 @@
 #include <limits>
 
 #include "board/json.h"
+#include "tools/pmxboard/state/paths.h"
 #include "tools/pmxboard/text/printable.h"
 
 namespace pmxboard
@@ -118,6 +119,74 @@ void check_schema(const Json& json)
         throw DumpError("it has no record \"state\"" + what);
 }
 
+Json json_of(const Steps& steps)
+{
+    Json json = { { "version", steps_version } };
+    if (!steps.lost().empty())
+    {
+        json["lost"] = steps.lost();
+        return json;
+    }
+    json["commands"] = Json::array();
+    for (const Step& step : steps.all())
+    {
+        Json one = Json::object();
+        if (!step.directory.empty())
+            one["in"] = step.directory;
+        one["line"] = step.line;
+        json["commands"].push_back(std::move(one));
+    }
+    return json;
+}
+
+Step step_of(const Json& json, std::size_t number)
+{
+    const bool is_step = json.is_object() && json.contains("line") && json.at("line").is_string() &&
+                         (!json.contains("in") || json.at("in").is_string());
+    if (!is_step)
+        throw DumpError("steps.commands" + item_step(number) + ": " + printable(board::written(json), 60) +
+                        " is no command");
+    return { json.contains("in") ? json.at("in").get<std::string>() : std::string(),
+             json.at("line").get<std::string>() };
+}
+
+/** Those that are kept in another way do not keep the state from being looked at. */
+Steps steps_of(const Json& all)
+{
+    Steps steps;
+    steps.begin({});
+    if (!all.contains("steps"))
+    {
+        steps.lose("it was saved without the commands that led to it");
+        return steps;
+    }
+    const Json& json = all.at("steps");
+    if (!json.is_object() || !json.contains("version") || !json.at("version").is_number_integer())
+        throw DumpError("steps: " + printable(board::written(json), 60) + " has no version");
+    if (json.at("version") != steps_version)
+    {
+        steps.lose("its commands are of version " + printable(board::written(json.at("version")), 20) +
+                   ", and this pmxboard reads " + std::to_string(steps_version));
+        return steps;
+    }
+    if (json.contains("lost") && json.at("lost").is_string())
+    {
+        steps.lose(printable(json.at("lost").get<std::string>(), 200));
+        return steps;
+    }
+    if (!json.contains("commands") || !json.at("commands").is_array() || json.at("commands").empty())
+        throw DumpError("steps: it has neither a list \"commands\" nor a text \"lost\"");
+    for (std::size_t i = 0; i < json.at("commands").size(); ++i)
+    {
+        Step step = step_of(json.at("commands")[i], i);
+        if (i == 0)
+            steps.begin(std::move(step));
+        else
+            steps.add(std::move(step));
+    }
+    return steps;
+}
+
 Json envelope(const char* schema)
 {
     return { { "schema", schema }, { "version", state_schema_version } };
@@ -130,6 +199,7 @@ std::string to_json(const StateDump& dump)
     Json json = envelope(state_schema);
     json["board"] = dump.board;
     json["state"] = json_of(dump.state);
+    json["steps"] = json_of(dump.steps);
     return board::written(json, 2);
 }
 
@@ -138,7 +208,8 @@ StateDump read_dump(std::string_view json)
     const Json all = parsed(json);
     check_schema(all);
     const bool has_name = all.contains("board") && all.at("board").is_string();
-    return { has_name ? all.at("board").get<std::string>() : std::string(), value_of(all.at("state"), "state") };
+    return { has_name ? all.at("board").get<std::string>() : std::string(), value_of(all.at("state"), "state"),
+             steps_of(all) };
 }
 
 std::string to_json(const std::string& board, const std::vector<std::pair<std::string, Value>>& values)

@@ -2,11 +2,15 @@
 /** @file
  *  The state as a file: JSON for programs, and to be looked at or compared later.
  *
- *      {"schema": "pmxboard-state", "version": 1, "board": "default", "state": {…}}
+ *      {"schema": "pmxboard-state", "version": 1, "board": "default", "state": {…}, "steps": {…}}
  *
- *  Values are in the form of board/json.h. */
+ *  Values are in the form of board/json.h. The steps are what the state can be restored by:
+ *
+ *      {"version": 1, "commands": [{"in": "scenarios", "line": "power-on default"}, …]}
+ *      {"version": 1, "lost": "why they do not lead there"} */
 #pragma once
 
+#include <cstddef>
 #include <stdexcept>
 #include <string>
 #include <string_view>
@@ -15,6 +19,7 @@
 
 #include "board/value.h"
 #include "tools/pmxboard/state/diff.h"
+#include "tools/pmxboard/state/steps.h"
 
 namespace pmxboard
 {
@@ -22,10 +27,14 @@ namespace pmxboard
 /** Counted up when the meaning of a key changes; keys may be added without that. */
 inline constexpr int state_schema_version = 1;
 
+/** A file has no more bytes. */
+inline constexpr std::size_t largest_state = std::size_t{ 16 } << 20;
+
 struct StateDump
 {
     std::string board; ///< its name
     board::Value state;
+    Steps steps{}; ///< that led there
 };
 
 /** A dump that cannot be used; the message says what is wrong, and where. */

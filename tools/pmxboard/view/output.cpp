@@ -30,7 +30,7 @@ bool Output::is_machine_read() const
 
 std::ostream* Output::people() const
 {
-    return m_options.quiet || is_machine_read() ? nullptr : m_options.to;
+    return m_hushed || m_options.quiet || is_machine_read() ? nullptr : m_options.to;
 }
 
 void Output::imagine(std::ostream& to)
@@ -42,8 +42,22 @@ void Output::imagine(std::ostream& to)
     m_trace_shown = true;
 }
 
+void Output::powered_on()
+{
+    if (!m_hushed)
+        m_trace->powered_on();
+}
+
+void Output::operation_begins(const std::string& name)
+{
+    if (!m_hushed)
+        m_trace->operation_begins(name);
+}
+
 void Output::command(std::string_view line)
 {
+    if (m_hushed)
+        return;
     m_trace->command(line);
     if (people() != nullptr && m_options.echo)
         *people() << m_paint("> " + printable_lines(line), Colour::Bold) << '\n';
@@ -57,6 +71,8 @@ void Output::expectation(std::string_view line)
 
 void Output::outcome(const Outcome& outcome)
 {
+    if (m_hushed)
+        return;
     m_trace->operation_ends(outcome);
     flush();
     if (people() == nullptr)
@@ -87,6 +103,8 @@ void Output::remark(std::string_view text)
 void Output::shown(const std::string& json_line, std::string_view text)
 {
     flush();
+    if (m_hushed)
+        return;
     if (for_programs())
         *m_options.to << json_line << '\n';
     else if (people() != nullptr)
@@ -110,6 +128,8 @@ void Output::imagined(std::string_view line, const std::string& written, const s
 
 void Output::entry(const board::TraceEntry& entry)
 {
+    if (m_hushed)
+        return;
     const bool is_read = m_options.trace_to != nullptr || m_trace->is_for_programs() || people() != nullptr;
     std::string line = m_trace->entry(entry, is_read && m_trace_shown && m_options.filter.shows(entry));
     if (entry.depth == 0)
@@ -122,6 +142,8 @@ void Output::entry(const board::TraceEntry& entry)
 
 void Output::console(std::string_view text)
 {
+    if (m_hushed)
+        return;
     const auto& entries = board::trace::entries();
     if (!entries.empty() && entries.back().depth > 0)
         m_nested.push_back({ true, std::string(text) });

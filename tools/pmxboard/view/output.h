@@ -42,9 +42,12 @@ public:
 
     /** Show or hide the trace from now on. */
     void show_trace(bool on) { m_trace_shown = on; }
+    bool shows_trace() const { return m_trace_shown; }
 
     /** From now on nothing is real: what would be done is shown there, whatever becomes of the trace otherwise. */
     void imagine(std::ostream& to);
+    /** Show nothing of what is done until this is taken back: it was seen before. */
+    void hush(bool on) { m_hushed = on; }
     /** Whether stores are shown whatever the scenario says. */
     bool shows_stores() const { return m_options.stores; }
     /** Whether people see anything but failures. */
@@ -57,9 +60,9 @@ public:
     /** How a text for people is to look. */
     Look look() const { return { text_width(), m_options.colour }; }
 
-    void powered_on() { m_trace->powered_on(); }
+    void powered_on();
     void refusal(const std::string& sentence) { m_trace->refusal(sentence); }
-    void operation_begins(const std::string& name) { m_trace->operation_begins(name); }
+    void operation_begins(const std::string& name);
     void command(std::string_view line);
     void expectation(std::string_view line);
     void outcome(const Outcome& outcome);
@@ -97,6 +100,7 @@ private:
     TraceSink* m_trace;
     std::unique_ptr<TraceSink> m_own_trace;
     bool m_trace_shown = true;
+    bool m_hushed = false;
     std::string m_console_line;
     std::vector<Nested> m_nested;
 };

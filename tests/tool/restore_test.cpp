@@ -1,0 +1,273 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
+// A session comes back to a saved state, and goes on as the one did that was saved.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <sstream>
+#include <string>
+#include <vector>
+
+#include "board/board.h"
+#include "program_run.h"
+#include "scenario_run.h"
+#include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/line.h"
+#include "tools/pmxboard/state/dump.h"
+#include "tools/pmxboard/state/now.h"
+
+namespace
+{
+
+using pmxboard::StateDump;
+using tool_test::behind_last;
+
+class Restore : public ProgramRun
+{
+protected:
+    /** A file that this process has read it does not write. */
+    std::string saved() const { return file(m_name + ".json"); }
+    std::string save() const { return "save " + saved() + "\n"; }
+    std::string restore() const { return "restore " + saved() + "\n"; }
+
+    /** Lines of a scenario of this name, with the trace as JSON lines. */
+    static tool_test::Run traced(const std::string& lines, const std::string& name)
+    {
+        std::istringstream in(lines);
+        std::ostringstream shown, trace, diagnostics;
+        const auto sink = pmxboard::trace_form("jsonl").make({ false, false, true }, trace);
+        pmxboard::OutputOptions options{ .trace = sink.get(), .to = &shown, .trace_to = &trace };
+        const bool done = pmxboard::run_scenario(in, { name, "default", "" }, options, diagnostics);
+        return { done, shown.str(), trace.str(), diagnostics.str() };
+    }
+
+    static std::string run_here(const std::string& lines) { return tool_test::diagnostics(lines); }
+
+    StateDump dump() const { return pmxboard::read_dump(content(saved())); }
+
+    std::string m_name = "saved";
+};
+
+std::vector<std::string> lines_of(const std::filesystem::path& file)
+{
+    std::ifstream in(file);
+    std::vector<std::string> lines;
+    for (std::string line; std::getline(in, line);)
+        lines.push_back(line);
+    return lines;
+}
+
+std::string joined(std::vector<std::string>::const_iterator begin, std::vector<std::string>::const_iterator end)
+{
+    std::string text;
+    for (; begin != end; ++begin)
+        text += *begin + "\n";
+    return text;
+}
+
+/** Where commands begin: an expectation belongs to the command before it. */
+bool begins_command(const std::string& text)
+{
+    const pmxboard::Line line(text);
+    return !line.empty() && line.word(0) != "expect";
+}
+
+TEST_F(Restore, EveryScenario_GoesOnBehindItAsBehindTheOriginal)
+{
+    unsigned scenarios = 0;
+    for (const auto& entry : std::filesystem::directory_iterator(PMX_SOURCE_DIR "/scenarios"))
+    {
+        if (entry.path().extension() != ".pmx")
+            continue;
+        const std::string name = entry.path().string();
+        const auto lines = lines_of(entry.path());
+        std::vector<std::size_t> commands;
+        for (std::size_t i = 0; i < lines.size(); ++i)
+        {
+            if (begins_command(lines[i]))
+                commands.push_back(i);
+        }
+        ASSERT_LT(1u, commands.size()) << name;
+        const auto middle = lines.begin() + static_cast<std::ptrdiff_t>(commands[commands.size() / 2]);
+        const std::string first = joined(lines.begin(), middle);
+        const std::string rest = joined(middle, lines.end());
+        m_name = entry.path().stem().string();
+        const tool_test::Run before = traced(first + save(), name);
+        ASSERT_TRUE(std::filesystem::exists(saved())) << name << before.diagnostics; // what is armed may fail its end
+        const tool_test::Run whole = traced(first + rest, name);
+        ASSERT_TRUE(whole.done) << name << whole.diagnostics;
+        const tool_test::Run restored = traced(restore() + rest, name);
+        EXPECT_TRUE(restored.done) << name << ": " << restored.diagnostics;
+        EXPECT_TRUE(whole.trace == before.trace + restored.trace) << name;
+        ++scenarios;
+    }
+    EXPECT_LT(40u, scenarios);
+}
+
+TEST_F(Restore, InAFreshProcess_NothingDiffers)
+{
+    const std::string first = "PMX_Init\nsource vdp0 start 1920x1080\ndisplay-part answer 3s\n"
+                              "outputs hdmi=1080p50\npoke ucSharpness 7\nfault x_timer_stop -1 from 2\nadvance 1s\n";
+    ASSERT_EQ(0, run("run -q -", first + save()).code);
+    const std::string again = file("again.json");
+    ASSERT_EQ(0, run("run -q -", restore() + "save " + again + "\n").code);
+    EXPECT_EQ(content(saved()), content(again));
+    EXPECT_EQ(0, run("state " + saved() + " " + again).code);
+    const Ended shell = run("shell", restore() + "diff\nadvance 2s\n");
+    EXPECT_EQ(0, shell.code) << shell.err;
+    EXPECT_NE(std::string::npos, shell.out.find("  restored from " + saved() + "\n")) << shell.out;
+    EXPECT_NE(std::string::npos, shell.out.find("  record.ucSharpness  0 → 7\n")) << "what restoring has changed";
+    EXPECT_NE(std::string::npos, shell.out.find("NOTICE display_part \"has switched\"")) << shell.out;
+    EXPECT_EQ(std::string::npos, shell.out.find("PMX_HalSetMode")) << "what led there is not shown again";
+}
+
+TEST_F(Restore, ExpectationsAndWhatIsArmedGoOn)
+{
+    EXPECT_EQ("", run_here("PMX_Init\nneighbour TVE_SetEnable 7 1\nstores on\n"
+                           "meanwhile PMX_HalSetTvType sink unplug\n" +
+                           save() + "PMX_SetTvType 0 PMX_TV_TYPE_PAL"));
+    EXPECT_EQ("", run_here(restore() + "expect no-more\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\n"
+                                       "expect call SET ucTvType * → PMX_TV_TYPE_PAL\n"
+                                       "expect state hdmi_av.sink_plugged 0"));
+    m_name = "misused";
+    EXPECT_EQ("",
+              run_here("fault x_sema_create 0 phSema=77\nPMX_Init\nsource vdp0 connect\nexpect misuses 2\n" + save()));
+    EXPECT_EQ("", run_here(restore() + "expect misuses 2")) << "a misuse that was expected stays so";
+    EXPECT_EQ("", run_here(restore())) << "and fails nothing at the end";
+}
+
+TEST_F(Restore, LinesThatFailed_AreCarriedOutAgain)
+{
+    std::ostringstream shown, diagnostics;
+    std::istringstream in("PMX_Init\nmeanwhile x_thread_delay request hdmi RES_480P\nPMX_Reset 0\n"
+                          "PMX_SetTvType 0 PMX_TV_TYPE_PAL\nnonsense\n" +
+                          save());
+    pmxboard::Scenario scenario{ "here.pmx", "default", "" };
+    scenario.keep_going = true;
+    EXPECT_FALSE(pmxboard::run_scenario(in, scenario, { .to = &shown }, diagnostics));
+    EXPECT_EQ(5u, dump().steps.all().size()) << "but for the one that was no line";
+    EXPECT_EQ("", run_here(restore() + "expect state ucTvType PMX_TV_TYPE_PAL"));
+}
+
+TEST_F(Restore, FilesAreFoundWhereTheLinesStood)
+{
+    std::ofstream(file("part.pmx")) << "power-on boards/plane-delays.toml\n"
+                                       "flash fast_init_param images/boot-576p.bin\nPMX_Init\n";
+    std::filesystem::create_directories(m_directory / "boards");
+    std::filesystem::create_directories(m_directory / "images");
+    std::filesystem::copy(PMX_SOURCE_DIR "/scenarios/boards/plane-delays.toml", m_directory / "boards");
+    std::filesystem::copy(PMX_SOURCE_DIR "/scenarios/images/boot-576p.bin", m_directory / "images");
+    EXPECT_EQ("", run_here("include " + file("part.pmx") + "\n" + save()));
+    EXPECT_EQ("", run_here(restore() + "expect state mixer.mode RES_576P"));
+    std::filesystem::remove(m_directory / "images/boot-576p.bin");
+    EXPECT_TRUE(run_here(restore()).starts_with(
+        "here.pmx:1: " + saved() + " cannot be restored: its command 2, flash fast_init_param images/boot-576p.bin: "))
+        << run_here(restore());
+}
+
+TEST_F(Restore, WhatLeadsElsewhere_IsRefused_AndNothingHasChanged)
+{
+    ASSERT_EQ("", run_here("PMX_Init\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\n" + save()));
+    const std::string good = content(saved());
+    const auto refused = [&](const std::string& what, const std::string& with) {
+        std::string changed = good;
+        changed.replace(changed.find(what), what.size(), with);
+        std::ofstream(saved()) << changed;
+        const auto outcome = tool_test::run("PMX_Init\nPMX_SetCBEnable 0 1\n" + restore());
+        EXPECT_EQ("1", pmxboard::state_at("ucCBEnable").to_text()) << "as before";
+        const std::string begin = "here.pmx:3: " + saved() + " cannot be restored: ";
+        EXPECT_TRUE(outcome.diagnostics.starts_with(begin)) << outcome.diagnostics;
+        return outcome.diagnostics.substr(std::min(begin.size(), outcome.diagnostics.size()));
+    };
+    EXPECT_EQ("its commands lead to another state: record.ucTvType becomes PMX_TV_TYPE_NTSC, and the file has "
+              "PMX_TV_TYPE_PAL; 1 more" +
+                  tool_test::repeat,
+              refused("PMX_SetTvType 0 PMX_TV_TYPE_PAL", "PMX_SetTvType 0 PMX_TV_TYPE_NTSC"));
+    EXPECT_EQ("its command 3, save x.json: it does nothing to a state" + tool_test::repeat,
+              refused("PMX_SetTvType 0 PMX_TV_TYPE_PAL", "save x.json"));
+    EXPECT_EQ("its command 3, restore x.json: it does nothing to a state" + tool_test::repeat,
+              refused("PMX_SetTvType 0 PMX_TV_TYPE_PAL", "restore x.json"));
+    EXPECT_TRUE(
+        refused("PMX_SetTvType 0 PMX_TV_TYPE_PAL", "PMX_SetTvTyp 0").starts_with("its command 3, PMX_SetTvTyp 0: "));
+    EXPECT_EQ("it was saved without the commands that led to it" + tool_test::repeat,
+              refused("\"steps\"", "\"stops\""));
+    const std::string steps = "\"steps\": {\n    \"version\": ";
+    EXPECT_EQ("its commands are of version 2, and this pmxboard reads 1" + tool_test::repeat,
+              refused(steps + "1", steps + "2"));
+}
+
+TEST_F(Restore, StatesThatNoLinesLeadTo_AreToldApart)
+{
+    ASSERT_EQ(
+        0, run("shell", "PMX_Init\nbreak PMX_HalSetTvType\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\n" + save() + "continue\n")
+               .code);
+    EXPECT_EQ("here.pmx:1: " + saved() +
+                  " cannot be restored: it was saved while the layer was stopped in the middle of a call" +
+                  tool_test::repeat,
+              run_here(restore()));
+    ASSERT_EQ(0, run("shell", "PMX_Init\nbreak PMX_HalSetTvType\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\nsink unplug\n"
+                              "continue\n" +
+                                  save())
+                     .code);
+    EXPECT_EQ("here.pmx:1: " + saved() +
+                  " cannot be restored: a line was typed while the layer was stopped in the middle of a call" +
+                  tool_test::repeat,
+              run_here(restore()));
+    EXPECT_EQ("here.pmx:1: restore would take the board away from under the operation that is running\n",
+              run_here("meanwhile x_sema_lock restore x.json"));
+    EXPECT_TRUE(run_here("restore no-such.json").starts_with("here.pmx:1: cannot read no-such.json"))
+        << run_here("restore no-such.json");
+}
+
+TEST_F(Restore, ABreakpointDoesNotStopIt)
+{
+    ASSERT_EQ("", run_here("PMX_Init\n" + save()));
+    const Ended ended = run("shell", "break x_timer_create\n" + restore() + "PMX_GetMode 0\n");
+    EXPECT_EQ(0, ended.code) << ended.err;
+    EXPECT_EQ(std::string::npos, ended.out.find("stopped in")) << ended.out;
+}
+
+TEST(Steps, AreBounded)
+{
+    pmxboard::Steps steps;
+    steps.begin({ "", "power-on" });
+    for (unsigned i = 0; i < 19'999; ++i)
+        steps.add({ "", "advance 1us" });
+    EXPECT_EQ("", steps.lost());
+    steps.add({ "", "advance 1us" });
+    EXPECT_EQ("more than 20000 commands, or very long ones, led to it since power-on", steps.lost());
+    EXPECT_TRUE(steps.all().empty());
+    steps.begin({ "", "power-on" });
+    EXPECT_EQ("", steps.lost());
+    steps.add({ "", std::string(5'000'000, 'x') });
+    EXPECT_NE("", steps.lost());
+}
+
+TEST(Steps, OfASavedState_AreReadOrRefused)
+{
+    const auto refused = [](const std::string& steps) {
+        try
+        {
+            return "taken: " + pmxboard::read_dump(
+                                   R"({"schema": "pmxboard-state", "version": 1, "state": {}, "steps": )" + steps + "}")
+                                   .steps.lost();
+        }
+        catch (const pmxboard::DumpError& error)
+        {
+            return std::string(error.what());
+        }
+    };
+    EXPECT_EQ("taken: ", refused(R"({"version": 1, "commands": [{"line": "power-on"}]})"));
+    EXPECT_EQ("taken: why", refused(R"({"version": 1, "lost": "why"})"));
+    EXPECT_EQ("steps: [] has no version", refused("[]"));
+    EXPECT_EQ("steps: it has neither a list \"commands\" nor a text \"lost\"", refused(R"({"version": 1})"));
+    EXPECT_EQ("steps: it has neither a list \"commands\" nor a text \"lost\"",
+              refused(R"({"version": 1, "commands": []})"));
+    EXPECT_EQ("steps.commands[0]: 1 is no command", refused(R"({"version": 1, "commands": [1]})"));
+    EXPECT_EQ("steps.commands[1]: {\"line\":1} is no command",
+              refused(R"({"version": 1, "commands": [{"line": "power-on"}, {"line": 1}]})"));
+}
+
+} // namespace

@@ -1,0 +1,43 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
+#include "tools/pmxboard/state/steps.h"
+
+#include <utility>
+
+namespace pmxboard
+{
+namespace
+{
+
+// A saved state stays one that can be read, and a restore one that somebody waits for.
+constexpr std::size_t most_steps = 20'000;
+constexpr std::size_t most_characters = std::size_t{ 4 } << 20;
+
+} // namespace
+
+void Steps::begin(Step step)
+{
+    m_all.clear();
+    m_characters = 0;
+    m_lost.clear();
+    add(std::move(step));
+}
+
+void Steps::add(Step step)
+{
+    if (!m_lost.empty())
+        return;
+    m_characters += step.directory.size() + step.line.size();
+    if (m_all.size() == most_steps || m_characters > most_characters)
+        lose("more than " + std::to_string(most_steps) + " commands, or very long ones, led to it since power-on");
+    else
+        m_all.push_back(std::move(step));
+}
+
+void Steps::lose(std::string why)
+{
+    m_all.clear();
+    if (m_lost.empty())
+        m_lost = std::move(why);
+}
+
+} // namespace pmxboard

@@ -8,8 +8,6 @@
 #include <vector>
 
 #include "board/executable_symbols.h"
-#include "board/trace.h"
-#include "src/driver/pmx/pmx_if.h"
 
 namespace board::layer_state
 {
@@ -85,15 +83,6 @@ void restore()
             executable_symbols::prefers() ? executable_symbols::find(image.name)->address : image.object.address;
         copy_unchecked(static_cast<unsigned char*>(object), image.content.data(), image.content.size());
     }
-}
-
-void set_capability(std::uint32_t word)
-{
-    const auto record = executable_symbols::find("_arPmxConf");
-    if (!record)
-        return;
-    const trace::By scope("board");
-    static_cast<PMX_CONF_T*>(record->address)->u4Capability = word;
 }
 
 } // namespace board::layer_state

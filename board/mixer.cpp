@@ -361,7 +361,10 @@ try
     mixer_state.selectors = IDENTITY;
     // Behind a reset's default record, whose word is that of a mixer that can everything.
     if (const auto& capability = board::description().capability)
+    {
+        const board::trace::By scope("board");
         board::layer_state::set_capability(*capability);
+    }
 }
 BOARD_CALL_END(PMX_HalInitPlaneOrder)
 

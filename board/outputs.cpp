@@ -2,7 +2,6 @@
 #include "board/outputs.h"
 
 #include <algorithm>
-#include <cstring>
 #include <stdexcept>
 #include <string>
 #include <utility>
@@ -119,8 +118,10 @@ void put_record(Record* there, std::string_view written)
 {
     Record scratch{};
     Record& record = there != nullptr ? *there : scratch;
-    for (const auto& [name, value] : members(written))
+    for (const auto& member : members(written))
     {
+        const std::string_view name = member.first; // clang takes no bindings into a lambda
+        const std::string_view value = member.second;
         bool found = false;
         std::vector<std::string_view> known;
         records::each_field(record, [&](std::string_view owner, std::string_view field, auto& place) {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
-#include "board/trace_call.h"
+#include "board/trace.h"
 
 #include "record_fields.h"
 

@@ -59,10 +59,10 @@ bool leads_out(std::string_view line)
     return has(line, "..") || has(line, "\\") || has(line, " /") || has(line, "\t/") || has(line, "\"/");
 }
 
-/** Lines that are included would not have come through here. */
+/** Lines that are included would not have come through here, nor those of a saved state. */
 bool includes(std::string_view line)
 {
-    return has(line, "include");
+    return has(line, "include") || has(line, "restore");
 }
 
 } // namespace

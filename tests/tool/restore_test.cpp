@@ -22,7 +22,6 @@ namespace
 {
 
 using pmxboard::StateDump;
-using tool_test::behind_last;
 
 class Restore : public ProgramRun
 {

@@ -282,10 +282,11 @@ TEST_F(DecodeProgram, Json_KeepsItsKeys)
 {
     const Ended ended = run("decode --json -", "[ 1.5] PMX_Stop\nforeign\n");
     EXPECT_EQ(0, ended.code);
-    EXPECT_EQ(R"({"log":"standard input","lines":2,"foreign":1,"cut":0,"level":1,
+    EXPECT_EQ(R"({"log":"standard input","lines":2,"foreign":1,"cut":0,"twice":0,"displaced":0,)"
+              R"("starts":0,"form":"console","level":1,
 "events":[
-{"operation":"PMX_Stop","first_line":1,"last_line":1,"time":"1.5","title":)"
-              R"("stopped: mutex, timer and registrations stay","details":[],"problem":0}],
+{"operation":"PMX_Stop","first_line":1,"last_line":1,"lines":[1],"time":"1.5","title":)"
+              R"("stopped: mutex, timer and registrations stay","details":[],"assumed":[],"problem":0,"kind":"call"}],
 "texts":[
 {"line":1,"last_line":1,"time":"1.5","text":"PMX_Stop","cut":"no","source":"log",)"
               R"("level":1,"operations":["PMX_Stop"],"step":"light stop","values":{}}],

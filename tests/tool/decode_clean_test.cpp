@@ -30,6 +30,16 @@ TEST(DecodeClean, TimeStampsAreReadWhateverTheirForm)
         EXPECT_EQ("", stamp_of(other).text) << other;
 }
 
+TEST(DecodeClean, OfSeveralTimeStamps_TheFinestIsMeant)
+{
+    EXPECT_EQ("12.345678", stamp_of("Nov 22 12:34:56 player kernel: [   12.345678] ").text);
+    EXPECT_EQ("12:34:56", stamp_of("Nov 22 12:34:56 player app[123]: ").text);
+    EXPECT_EQ("12:34:56.789012", stamp_of("2026-11-22T12:34:56.789012+00:00 [   12.345] ").text);
+    EXPECT_EQ("12.5", stamp_of("<6>[   12.5] ").text);
+    EXPECT_DOUBLE_EQ(13 * 3600, stamp_of("01:00:00 PM ").seconds.value_or(0));
+    EXPECT_DOUBLE_EQ(0, stamp_of("12:00:00 AM ").seconds.value_or(1));
+}
+
 TEST(DecodeClean, APrefixDoesNotEndInAWord)
 {
     for (const char* prefix : { "", "   ", "[ 1.5] ", "PMX: ", "10:00:00 AM ", "12.5 " })

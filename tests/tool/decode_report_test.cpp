@@ -129,7 +129,7 @@ TEST(DecodeReport, ModeAbove41_HasNoLine)
 {
     const auto words = words_of(output_line(0, "fgOutputEnable(1)") + output_line(0, "u4VFreq(50)") +
                                 ccir_line("eDgiFmt(CCIR_NON_USED)"));
-    expect_line(words, "output digital port: on, mode above 41, which has no line, 50 Hz");
+    expect_line(words, "output digital port: on, no line with a mode, as of those above 41");
 }
 
 TEST(DecodeReport, TwelveBitOutputFormat_IsNotTheInputs)

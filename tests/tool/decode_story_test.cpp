@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "tools/pmxboard/decode/story.h"
@@ -28,16 +29,17 @@ const std::string lines_held_back = "[   10.000300] [PMX] fgPMX_DisplayModeReady
                                     "[   10.000400] [PMX] VDP_SetClearVideo & Not Mix OSD..\r\n"
                                     "[   10.000500] Display Format Change Timer Set.\r\n";
 const std::string told_held_back =
-    "1-3 PMX_SetModeEx: a mode change, of which the log has the end | graphics held back until the display part has "
-    "switched | the display timer runs\n";
+    "1-3 PMX_SetModeEx: a mode change, of which the log has the end | graphics held back while the display part "
+    "switches | the display timer is set\n";
 
 TEST(DecodeStory, LogFromTheMiddle_ForeignLinesStampsColoursAndCarriageReturns_TellsItAllTheSame)
 {
     EXPECT_EQ(
         "2-2 PMX_SetFormatChangeFlag: the display part begins to switch: its flag is raised\n"
-        "4-7 PMX_SetModeEx: a mode change, of which the log has the end | graphics held back until the display part "
-        "has switched | the display timer runs\n"
-        "8-11 PMX_SetFormatChangeFlag: the display part has switched after 2.5 s | graphics are back\n",
+        "4-7 PMX_SetModeEx: a mode change, of which the log has the end | graphics held back while the display part "
+        "switches | the display timer is set\n"
+        "8-11 PMX_SetFormatChangeFlag: the display part's flag is lowered, as when it has switched, 2.5 s after line 6 "
+        "| graphics are back, 2.5 s after line 6\n",
         told("et OSD Display mode.\r\n"
              "\x1b[32m[   10.000100] Display Format Change :1.\x1b[0m\r\n"
              "[   10.000200] eth0: link up\r\n"
@@ -53,8 +55,8 @@ TEST(DecodeStory, LogFromTheMiddle_ForeignLinesStampsColoursAndCarriageReturns_T
 
 TEST(DecodeStory, TimerReleases_IsAProblem)
 {
-    EXPECT_EQ(told_held_back + "! 4-8 _PMX_TmrIsr: the timer runs out after 10.0 s: the display part has not answered "
-                               "| graphics are back\n",
+    EXPECT_EQ(told_held_back + "! 4-8 _PMX_TmrIsr: the timer runs out, 10.0 s after line 3: no answer of the display "
+                               "part stands before it | graphics are back, 10.0 s after line 2\n",
               told(lines_held_back + "[   20.000400] PMX timeout.\n"
                                      "[   20.000500] Display Format Change :0.\n"
                                      "[   20.000600] Set Osd Enable :1.\n"
@@ -64,9 +66,11 @@ TEST(DecodeStory, TimerReleases_IsAProblem)
 
 TEST(DecodeStory, VideoPlaneWaits_LetsGraphicsBackLater)
 {
-    EXPECT_EQ(told_held_back + "4-5 PMX_SetFormatChangeFlag: the display part has switched after 1.0 s | graphics go "
-                               "on waiting, for the video plane driver\n"
-                               "6-7 PMX_SetOsdEnable: graphics are back after 1.5 s: the video plane driver let them\n",
+    EXPECT_EQ(told_held_back + "4-5 PMX_SetFormatChangeFlag: the display part's flag is lowered, as when it has "
+                               "switched, 1.0 s after line 2 | nothing here lets graphics back, as when the video "
+                               "plane driver does so later\n"
+                               "6-7 PMX_SetOsdEnable: graphics return if they wait for it: the video plane driver lets "
+                               "them | graphics are back, 1.5 s after line 2\n",
               told(lines_held_back + "[   11.000400] Display Format Change :0.\n"
                                      "[   11.000500] Set Osd Enable :1.\n"
                                      "[   11.500400] PMX_SetOsdEnable.\n"
@@ -75,20 +79,22 @@ TEST(DecodeStory, VideoPlaneWaits_LetsGraphicsBackLater)
 
 TEST(DecodeStory, TimerOfAnEarlierChange_IsNoProblem)
 {
-    EXPECT_EQ("1-4 _PMX_TmrIsr: the timer of an earlier mode change runs out; graphics are back already\n",
-              told("PMX timeout.\nDisplay Format Change :0.\nSet Osd Enable :1.\nPMX_SetOsdEnable.\n"));
+    EXPECT_EQ("1-5 _PMX_TmrIsr: the timer runs out: no line before it has graphics wait for it | graphics are in the "
+              "mix\n",
+              told("PMX timeout.\nDisplay Format Change :0.\nSet Osd Enable :1.\nPMX_SetOsdEnable.\n"
+                   "Set Osd Enable :0.\n"));
 }
 
 TEST(DecodeStory, StillHeldBackAtTheEnd_IsSaid)
 {
-    EXPECT_EQ(told_held_back + "! 2-3 PMX_SetModeEx: graphics are still held back where the log ends\n",
+    EXPECT_EQ(told_held_back + "! 2-3 PMX_SetModeEx: nothing up to the log's end brings these graphics back\n",
               told(lines_held_back));
 }
 
 TEST(DecodeStory, NotWaited_FlagAndGraphicsBelongToTheModeChange)
 {
     EXPECT_EQ("1-6 PMX_SetModeEx: mode change requested (its outputs are logged at level 9) | no wait for the display "
-              "part\n",
+              "part: HDMI was sent no new resolution | graphics are in the mix\n",
               told("SetModeEx\n"
                    "[PMX] fgHdmiExist:0, Not wait display part...\n"
                    "Display Format Change :0.\n"
@@ -100,7 +106,9 @@ TEST(DecodeStory, NotWaited_FlagAndGraphicsBelongToTheModeChange)
 TEST(DecodeStory, ModeChange_NamesOutputsFormatAndFifthOsd)
 {
     EXPECT_EQ("1-9 PMX_SetModeEx: mode change requested: digital port off, HDMI 720p 50 Hz, component 576p, composite "
-              "576i; fifth OSD 2 | mixer format 720p 50 Hz\n",
+              "576i; fifth OSD 2 | mixer format 720p 50 Hz\n"
+              "9-9 : the log ends within a call: next comes \"PMX Finished to set OSD Display mode.\" of "
+              "PMX_SetModeEx\n",
               told("SetModeEx\nCCIR(0, RES_480I)\nHDMI(1, RES_720P50HZ)\nCAV (1, RES_576P)\nCVBS(1, RES_576I)\n"
                    "CCIR(0, 0, 0, 0)\nOSD5(2)\nHD Exist(1)\nPMX Start to set OSD Display mode:9.\n"));
 }
@@ -115,7 +123,8 @@ TEST(DecodeStory, AllOutputsOff_IsAProblem)
 TEST(DecodeStory, RefusedMode_SaysThatNothingWasSetAndThatTheFlagIsLowered)
 {
     EXPECT_EQ("! 1-6 PMX_SetModeEx: mode change requested (its outputs are logged at level 9) | refused by the "
-              "capability word; nothing was set, and the display part's flag is lowered, not set\n",
+              "capability word; nothing was set, and the display part's flag is lowered, not set | graphics are in "
+              "the mix\n",
               told("SetModeEx\n"
                    "[PMX] PMX_SetModeEx, PMX_CheckCap error, set format change flag, wait display part...\n"
                    "Display Format Change :0.\nSet Osd Enable :1.\nPMX_SetOsdEnable.\nSet Osd Enable :0.\n"));
@@ -123,8 +132,8 @@ TEST(DecodeStory, RefusedMode_SaysThatNothingWasSetAndThatTheFlagIsLowered)
 
 TEST(DecodeStory, SetModeThatDoesNothing_SaysWhatItMayBe)
 {
-    EXPECT_EQ("1-1 PMX_SetMode: one mode on all outputs: 1080p 60 Hz | no set-up follows: refused by the capability "
-              "word, or set already\n"
+    EXPECT_EQ("1-1 PMX_SetMode: one mode on all outputs: 1080p 60 Hz | no set-up stands behind it, as when it is "
+              "refused by the capability word or set already\n"
               "2-2 PMX_SetBrightness: brightness 150 for HDMI\n",
               told("SetMode, RES_1080P60HZ\n[PMX] Seting Brightness: 0,150.\n"));
 }
@@ -150,19 +159,139 @@ TEST(DecodeStory, EveryColourConversion_IsNamed)
 
 TEST(DecodeStory, SourceStarts_MasterColourSpaceAndColoursAreItsConsequence)
 {
-    EXPECT_EQ("1-7 PMX_VdpEnabled: video plane 0 starts | its pictures are BT.601 | master colour space changes from "
-              "BT.709 to BT.601 | a video plane is told BT.601 | colours for 480p from BT.601 | converter A off\n",
-              told("VDP_0 Enabled\nVDP_0's Src Color Space = DRV_PMX_CS_YCBCR_601\n"
-                   "[PMX] VDP_COMP_1 enabled and Color Space is 0.\n"
-                   "[PMX] Master Color Space change from 1 to 0.\nInform Vdp CS(0)\n"
-                   "Mode(2), eMixerOutCS(0)\nCC_A disable\n"));
+    EXPECT_EQ(
+        "1-8 PMX_VdpEnabled: video plane 0 starts | its pictures are BT.601 | master colour space changes from "
+        "BT.709 to BT.601 | a video plane is to be told BT.601 | colours for 480p from BT.601 | converter A off | "
+        "scaler's converter off (not used)\n",
+        told("VDP_0 Enabled\nVDP_0's Src Color Space = DRV_PMX_CS_YCBCR_601\n"
+             "[PMX] VDP_COMP_1 enabled and Color Space is 0.\n"
+             "[PMX] Master Color Space change from 1 to 0.\nInform Vdp CS(0)\n"
+             "Mode(2), eMixerOutCS(0)\nCC_A disable\nScaler CC disable, don't care\n"));
 }
 
 TEST(DecodeStory, Assertion_IsAProblemWithItsMeaning)
 {
-    EXPECT_EQ("! 1-3 PMX_VdpEnabled: video plane 0 starts | that video plane has no interface table and was passed "
-              "over | ASSERTION: a video plane has no interface table and was passed over\n",
-              told("VDP_0 Enabled\nQuery VDP Interface Fail!\nASSERT 0, src/driver/pmx/pmx_source.cpp:177\n"));
+    EXPECT_EQ(
+        "! 1-7 PMX_VdpEnabled: video plane 0 starts | its pictures are BT.601 | master colour space changes from "
+        "BT.709 to BT.601 | a video plane is to be told BT.601 | that video plane has no interface table and was "
+        "passed over | ASSERTION: a video plane has no interface table and was passed over | colours for 480p "
+        "from BT.601\n",
+        told("VDP_0 Enabled\nVDP_0's Src Color Space = DRV_PMX_CS_YCBCR_601\n"
+             "[PMX] Master Color Space change from 1 to 0.\nInform Vdp CS(0)\n"
+             "Query VDP Interface Fail!\nASSERT 0, src/driver/pmx/pmx_source.cpp:177\nMode(2), eMixerOutCS(0)\n"));
+}
+
+TEST(DecodeStory, NoSink_IsWhyNobodyIsWaitedFor)
+{
+    EXPECT_THAT(told("SetModeEx\n[PMX] fgHdmiExist:1, Not wait display part...\n"),
+                testing::HasSubstr("no wait for the display part: no sink is plugged in"));
+}
+
+TEST(DecodeStory, WholeSeconds_AreNotShownWithTenths)
+{
+    EXPECT_THAT(
+        told("12:00:00 [PMX] VDP_SetClearVideo & Not Mix OSD..\n12:00:00 Display Format Change Timer Set.\n"
+             "12:00:03 Display Format Change :0.\n"),
+        testing::HasSubstr("the display part's flag is lowered, as when it has switched, about 3 s after line 1"));
+}
+
+TEST(DecodeStory, OverMidnight_TimeGoesOn)
+{
+    EXPECT_THAT(told("23:59:59.500 [PMX] VDP_SetClearVideo & Not Mix OSD..\n"
+                     "23:59:59.500 Display Format Change Timer Set.\n00:00:01.500 Display Format Change :0.\n"),
+                testing::HasSubstr("2.0 s after line 1"));
+}
+
+const std::string lines_back = "Display Format Change :0.\nSet Osd Enable :1.\nPMX_SetOsdEnable.\nSet Osd Enable :0.\n";
+const std::string lines_start = "TESTPMX: Get pard ID:0.\nTESTPMX: Get Test Data :12, 0x       c.\n"
+                                "[PMX]_arPmxConf[ucPmxId].ucMode=12\n[PMX] create a timer \n";
+
+struct Start
+{
+    const char* what;
+    std::string lines;
+    const char* told;
+};
+
+TEST(DecodeStory, AStart_EndsAllThatWasBefore)
+{
+    const Start starts[] = {
+        { "boot loader", "U-Boot 2011.03 (Mar 01 2011)\n" + lines_back, "nothing before the new start brings" },
+        { "kernel", "[    0.000000] Linux version 2.6.35\n" + lines_back, "nothing before the new start brings" },
+        { "clock", "[    1.500000] Display Format Change :0.\n" + lines_back, "nothing before the new start brings" },
+        { "board", "> power-on\n" + lines_back, "nothing before the new start brings" },
+        { "layer", lines_start + lines_back, "nothing before this start-up brings" },
+    };
+    for (const Start& one : starts)
+    {
+        const std::string story = told(lines_held_back + one.lines);
+        EXPECT_THAT(story, testing::HasSubstr(one.told)) << one.what;
+        EXPECT_THAT(story, testing::HasSubstr("graphics are in the mix")) << one.what;
+        EXPECT_THAT(story, testing::Not(testing::HasSubstr("graphics are back"))) << one.what;
+    }
+}
+
+struct Hole
+{
+    std::string lines;
+    const char* what; ///< must stand there
+};
+
+TEST(DecodeStory, WhatCannotBe_IsNamedAGap)
+{
+    const Hole holes[] = {
+        { lines_held_back + "[   34.900000] PMX timeout.\n", "\"PMX timeout.\"" },
+        { lines_held_back + "[   15.000000] PMX timeout.\n", "another \"Display Format Change Timer Set.\"" },
+        { lines_held_back + "[   60.000000] eth0: link up\n", "\"PMX timeout.\"" },
+        { lines_start + "[PMX] fgPMX_DisplayModeReady is 1.\n", "\"Display Format Change :1\"" },
+        { lines_start + "PMX_SetOsdEnable.\nSet Osd Enable :0.\n", "\"Set Osd Enable :1\"" },
+        { lines_start + "[PMX] Master Color Space change from 0 to 1.\n", "another change of the master colour space" },
+        { lines_start + "HD Exist(1)\n", "what leads to \"HD Exist(1)\"" },
+        { lines_start + "SetModeEx\nCCIR(0, RES_480I)\nSetModeEx\n", "\"HDMI(%d, %s)\" of PMX_SetModeEx" },
+        { lines_start + "SetModeEx\nCCIR(0, RES_480I)\nDisplay Format Change Timer Set.\n", "\"HDMI(%d, %s)\"" },
+    };
+    for (const Hole& one : holes)
+        EXPECT_THAT(told(one.lines), testing::HasSubstr("missing")) << one.lines;
+    for (const Hole& one : holes)
+        EXPECT_THAT(told(one.lines), testing::HasSubstr(one.what)) << one.lines;
+}
+
+TEST(DecodeStory, BehindAGap_WhatLastedIsAssumed)
+{
+    const auto story = pmxboard::decode::tell(read_log("[PMX] VDP_SetClearVideo & Not Mix OSD..\n"
+                                                       "Display Format Change Timer Set.\nHD Exist(1)\n" +
+                                                       lines_back));
+    const Event& last = story.events.back();
+    EXPECT_EQ(std::vector<std::string>{ "graphics are in the mix" }, last.details);
+    EXPECT_EQ(std::vector<std::string>{ "graphics are back, after line 1" }, last.assumed);
+}
+
+TEST(DecodeStory, ADoubledLine_IsNotTwoEvents)
+{
+    EXPECT_EQ("1-1 PMX_Stop: stopped: mutex, timer and registrations stay\n",
+              told("[   1.000001] PMX_Stop\n[   1.000001] PMX_Stop\n"));
+    const std::string request = "SetModeEx\nSetModeEx\nCCIR(0, RES_480I)\nCCIR(0, RES_480I)\nHDMI(0, RES_480I)\n";
+    EXPECT_THAT(told(request), testing::StartsWith("1-5 PMX_SetModeEx: mode change requested: digital port off, HDMI "
+                                                   "off\n"));
+}
+
+TEST(DecodeStory, LinesOutOfOrder_AreTakenByTheirStamps)
+{
+    EXPECT_EQ(told_held_back, told("[   10.000300] [PMX] fgPMX_DisplayModeReady is 1.\n"
+                                   "[   10.000500] Display Format Change Timer Set.\n"
+                                   "[   10.000400] [PMX] VDP_SetClearVideo & Not Mix OSD..\n")
+                                  .substr(0, told_held_back.size()));
+}
+
+TEST(DecodeStory, ATraceInJsonLines_IsReadAsItsConsole)
+{
+    EXPECT_EQ("1-1 PMX_Stop: stopped: mutex, timer and registrations stay\n"
+              "2-2 : the system begins anew: nothing of what was lasts\n"
+              "2-2 PMX_Stop: stopped: mutex, timer and registrations stay\n",
+              told("{\"sequence\":7,\"time_us\":5,\"kind\":\"log\",\"level\":1,\"text\":\"PMX_Stop\\n\"}\n"
+                   "{\"sequence\":1,\"time_us\":0,\"kind\":\"log\",\"level\":1,\"text\":\"PMX_Stop\\n\"}\n"
+                   "{\"sequence\":2,\"time_us\":0,\"kind\":\"call\",\"function\":\"PMX_Stop\"}\n"
+                   "{\"sequence\":3,\"time_us\""));
 }
 
 TEST(DecodeStory, NothingOfTheLayer_NoEvents)

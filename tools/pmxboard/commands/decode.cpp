@@ -6,6 +6,7 @@
 #include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/decode/show.h"
+#include "tools/pmxboard/decode/trace_lines.h"
 #include "tools/pmxboard/text/paint.h"
 
 namespace pmxboard
@@ -25,6 +26,9 @@ decode::Comparison compared(const decode::Log& log, const DecodeOptions& options
 int decode_file(const DecodeOptions& options)
 {
     const std::string bytes = board::files::read_named(options.file);
+    if (decode::is_viewer_trace(bytes))
+        return usage_error(options.file + " is a trace for a viewer, which has no console; decode reads a log, or the "
+                                          "trace format jsonl");
     const decode::Log log = decode::read_log(bytes);
     std::optional<decode::Comparison> comparison;
     if (!options.against.empty())

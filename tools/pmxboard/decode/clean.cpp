@@ -14,7 +14,7 @@ namespace
 {
 
 constexpr std::size_t longest_sequence = 64; ///< what is longer is rubbish, and is not searched for its end
-constexpr std::size_t stamp_within = 48;
+constexpr std::size_t stamps_within = 96;    ///< of a line: several may stand there, with names between them
 
 constexpr char escape = '\x1b';
 constexpr char bell = '\a';
@@ -65,6 +65,21 @@ double number_in(std::string_view text)
     return number;
 }
 
+unsigned decimals_of(std::string_view number)
+{
+    const std::size_t point = number.find_first_of(".,");
+    return point == number.npos ? 0 : static_cast<unsigned>(number.size() - point - 1);
+}
+
+/** Twelve hours that stand behind a clock's time: 12 is the first of them. */
+double half_day(std::string_view behind, double hour)
+{
+    constexpr double hours = 12;
+    if (behind.starts_with(" PM"))
+        return hour < hours ? hour + hours : hour;
+    return behind.starts_with(" AM") && hour == hours ? 0 : hour;
+}
+
 /** A clock's time at the beginning: 12:30:45, with or without a fraction. */
 std::optional<Stamp> clock_at(std::string_view text)
 {
@@ -76,8 +91,10 @@ std::optional<Stamp> clock_at(std::string_view text)
     const std::string_view written = clock;
     std::string seconds(written.substr(6));
     std::replace(seconds.begin(), seconds.end(), ',', '.');
-    return Stamp{ clock,
-                  number_in(written.substr(0, 2)) * 3600 + number_in(written.substr(3, 2)) * 60 + number_in(seconds) };
+    const double hour = half_day(text.substr(clock.size()), number_in(written.substr(0, 2)));
+    const unsigned decimals = decimals_of(seconds);
+    return Stamp{ clock, hour * 3600 + number_in(written.substr(3, 2)) * 60 + number_in(seconds), Clock::Day,
+                  decimals };
 }
 
 /** Seconds at the beginning: a decimal number that nothing goes on with. */
@@ -88,14 +105,25 @@ std::optional<Stamp> seconds_at(std::string_view text)
     const bool is_alone = length == text.size() || std::string_view(" ]):").find(text[length]) != text.npos;
     if (length == whole || !is_alone)
         return {};
-    return Stamp{ std::string(text.substr(0, length)), number_in(text.substr(0, length)) };
+    return Stamp{ std::string(text.substr(0, length)), number_in(text.substr(0, length)), Clock::Seconds,
+                  decimals_of(text.substr(0, length)) };
 }
 
-/** Whether such a number may stand behind this: at the beginning of a line, or in a bracket. */
+/** Whether such a number may stand behind this: at the beginning of a line, or in a bracket of its own; behind a name a
+ *  bracket has a process's number. */
 bool is_before_seconds(std::string_view before)
 {
     const std::size_t last = before.find_last_not_of(' ');
-    return last == before.npos || std::string_view("[(>").find(before[last]) != before.npos;
+    if (last == before.npos || before[last] == '>')
+        return true;
+    return (before[last] == '[' || before[last] == '(') &&
+           (last == 0 || before[last - 1] == ' ' || before[last - 1] == '>');
+}
+
+/** Whether a second stamp tells the time better. A whole number beside a clock is something else. */
+bool is_finer(const Stamp& found, const Stamp& finest)
+{
+    return !finest.seconds || (found.decimals >= finest.decimals && (found.decimals != 0 || found.clock == Clock::Day));
 }
 
 /** The trace of `pmxboard run` shows a text in quotes, with its line end written out. */
@@ -131,23 +159,24 @@ std::string clean(std::string_view line)
     return text;
 }
 
-Stamp stamp_of(std::string_view line)
+Stamp stamp_of(std::string_view lead)
 {
-    line = line.substr(0, stamp_within);
-    if (line.find("  LOG") != line.npos) // a trace, whose console lines have no times
+    lead = lead.substr(0, stamps_within);
+    if (lead.find("  LOG") != lead.npos) // a trace, whose console lines have no times
         return {};
-    for (std::size_t at = line.find_first_of(digits); at < line.size(); at = line.find_first_of(digits, at))
+    Stamp finest;
+    for (std::size_t at = lead.find_first_of(digits); at < lead.size(); at = lead.find_first_of(digits, at))
     {
-        const std::string_view number = line.substr(at);
-        const std::string_view before = line.substr(0, at);
-        const std::optional<Stamp> clock = before.ends_with('.') ? std::nullopt : clock_at(number);
-        if (clock)
-            return *clock;
-        if (const auto seconds = is_before_seconds(before) ? seconds_at(number) : std::nullopt)
-            return *seconds;
-        at += digits_in(number);
+        const std::string_view number = lead.substr(at);
+        const std::string_view before = lead.substr(0, at);
+        std::optional<Stamp> found = before.ends_with('.') ? std::nullopt : clock_at(number);
+        if (!found && is_before_seconds(before))
+            found = seconds_at(number);
+        at += found ? found->text.size() : digits_in(number);
+        if (found && is_finer(*found, finest))
+            finest = std::move(*found);
     }
-    return {};
+    return finest;
 }
 
 bool is_prefix(std::string_view before)

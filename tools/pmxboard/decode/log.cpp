@@ -3,9 +3,11 @@
 
 #include <algorithm>
 #include <charconv>
+#include <numeric>
 
 #include "tools/pmxboard/decode/clean.h"
 #include "tools/pmxboard/decode/pattern.h"
+#include "tools/pmxboard/decode/trace_lines.h"
 
 namespace pmxboard::decode
 {
@@ -16,6 +18,9 @@ constexpr std::size_t longest_text = 200; ///< no text of the layer is longer, w
 constexpr std::size_t look_back = 64;
 constexpr std::size_t cut_literal = 8; ///< so many characters of a text tell which one was cut
 constexpr unsigned broken_within = 2;  ///< foreign lines that may stand within a text
+constexpr double exact_enough = 1e-5;  ///< seconds: two lines of one text with one stamp are one line
+constexpr std::size_t twice_within = 3;
+constexpr std::ptrdiff_t most_displaced = 32; ///< lines that a buffer lets another pass
 
 constexpr std::string_view command_echo = "> ";
 constexpr std::string_view traced_assertion = "  Assert(\""; ///< the console shows it, too
@@ -86,7 +91,9 @@ class Reader
 {
 public:
     void line(std::string_view bytes);
-    Log take() { return std::move(m_log); }
+    void is_trace() { m_log.form = Log::Form::Trace; }
+    void trace_line(std::string_view bytes);
+    Log take();
 
 private:
     struct Broken
@@ -103,12 +110,20 @@ private:
     void find_cut_end(std::string_view line, std::size_t from);
     void find_cut_begin(std::string_view line);
     Item& add(const Text& text, std::string_view shown);
+    void take_time(std::string_view line);
+    void keep_end();
+    void begin_anew();
+    void put_in_order();
+    void leave_out_what_stands_twice();
     void take_whole(Item& item, const Whole& whole);
 
     Log m_log;
     std::optional<Broken> m_broken;
     bool m_first = true;
-    std::string_view m_segment; ///< that is read
+    bool m_powers_on = false; ///< the entry of a trace that is read
+    Timeline m_timeline;
+    Stamp m_stamp; ///< of the line that is read
+    std::optional<Moment> m_moment;
 };
 
 void Reader::line(std::string_view bytes)
@@ -130,15 +145,23 @@ void Reader::line(std::string_view bytes)
         ++m_log.foreign;
 }
 
+/** An entry of a trace: what it printed stands there as on a console that shows every level. */
+void Reader::trace_line(std::string_view bytes)
+{
+    const TraceLine entry = read_trace_line(bytes);
+    m_powers_on = entry.powers_on;
+    line(entry.printed ? *entry.printed : bytes);
+}
+
 /** Whether a piece between two carriage returns has anything of the layer. */
 bool Reader::segment(const std::string& text)
 {
     const std::size_t items_before = m_log.items.size();
     const std::string_view line = std::string_view(text).substr(0, text.find_last_not_of(' ') + 1);
     bool found = false;
+    take_time(line);
     if (!line.starts_with(command_echo) && line.substr(0, longest_text).find(traced_assertion) == line.npos)
     {
-        m_segment = line;
         const std::size_t from = mend(text);
         const std::size_t end = scan(line, from);
         if (m_first && m_log.items.empty())
@@ -147,21 +170,113 @@ bool Reader::segment(const std::string& text)
         found = from != 0 || m_log.items.size() > items_before;
     }
     m_first = false;
+    if (!found && is_banner(line.substr(0, longest_text)))
+    {
+        begin_anew();
+        m_moment = m_timeline.take(m_stamp);
+        keep_end();
+    }
     if (!found)
         m_log.shown.push_back({ m_log.lines, {}, std::string(line.substr(0, longest_text)) });
     return found;
 }
 
+void Reader::take_time(std::string_view line)
+{
+    m_stamp = stamp_of(line);
+    if (m_powers_on)
+        begin_anew();
+    m_powers_on = false;
+    m_moment = m_timeline.take(m_stamp);
+    if (m_timeline.began_anew())
+    {
+        begin_anew();
+        m_moment = m_timeline.take(m_stamp);
+    }
+    keep_end();
+}
+
+void Reader::keep_end()
+{
+    if (m_moment)
+        m_log.end = m_moment;
+    m_log.end_boot = m_log.boots.size();
+}
+
+/** A boot shows in several ways, one behind the other. */
+void Reader::begin_anew()
+{
+    m_timeline.begin_anew();
+    const std::size_t first = m_log.boots.empty() ? 0 : m_log.boots.back().item;
+    if (m_log.items.size() == first)
+        return;
+    m_log.boots.push_back({ m_log.lines, m_stamp.text, m_log.items.size() });
+    m_broken.reset();
+}
+
+/** A buffer may have changed the order of lines; their stamps tell. */
+void Reader::put_in_order()
+{
+    const auto is_older = [this](std::size_t one, std::size_t other) {
+        const std::optional<double> time = between(m_log.items[one].moment, m_log.items[other].moment);
+        return time && *time > 0;
+    };
+    std::vector<std::size_t>& order = m_log.order;
+    for (std::size_t item = 0; item < m_log.items.size(); ++item)
+    {
+        auto place = order.end();
+        while (place != order.begin() && order.end() - place < most_displaced && is_older(item, *(place - 1)))
+            --place;
+        m_log.displaced += place == order.end() ? 0 : 1;
+        order.insert(place, item);
+    }
+}
+
+void Reader::leave_out_what_stands_twice()
+{
+    std::vector<std::size_t> once;
+    for (const std::size_t one : m_log.order)
+    {
+        const Item& item = m_log.items[one];
+        const auto is_same = [&](std::size_t other) {
+            const Item& before = m_log.items[other];
+            return item.moment && item.moment->exact <= exact_enough && item.moment == before.moment &&
+                   item.text == before.text && item.shown == before.shown && item.line != before.line;
+        };
+        const auto begin = once.end() - static_cast<std::ptrdiff_t>(std::min(once.size(), twice_within));
+        if (std::none_of(begin, once.end(), is_same))
+            once.push_back(one);
+        else
+            ++m_log.twice;
+    }
+    m_log.order = std::move(once);
+}
+
+Log Reader::take()
+{
+    if (m_log.form == Log::Form::Console)
+    {
+        put_in_order();
+        leave_out_what_stands_twice();
+    }
+    else // nothing is lost there, and virtual time stands still
+    {
+        m_log.order.resize(m_log.items.size());
+        std::iota(m_log.order.begin(), m_log.order.end(), std::size_t{ 0 });
+    }
+    return std::move(m_log);
+}
+
 Item& Reader::add(const Text& text, std::string_view shown)
 {
-    const Stamp stamp = stamp_of(m_segment);
     m_log.shown.push_back({ m_log.lines, m_log.items.size(), {} });
     Item& item = m_log.items.emplace_back();
     item.text = &text;
     item.line = m_log.lines;
     item.last_line = m_log.lines;
-    item.time = stamp.text;
-    item.seconds = stamp.seconds;
+    item.time = m_stamp.text;
+    item.moment = m_moment;
+    item.boot = m_log.boots.size();
     item.shown = shown;
     return item;
 }
@@ -285,10 +400,15 @@ void Reader::find_cut_begin(std::string_view line)
 
 std::string Item::value(std::string_view name) const
 {
-    const std::vector<std::string_view> names = split(text->values);
-    const auto found = std::find(names.begin(), names.end(), name);
-    const auto index = static_cast<std::size_t>(found - names.begin());
-    return index < values.size() ? values[index] : "";
+    std::string_view names = text->values;
+    for (const std::string& one : values)
+    {
+        const std::size_t length = std::min(names.find(','), names.size());
+        if (names.substr(0, length) == name)
+            return one;
+        names.remove_prefix(std::min(length + 1, names.size()));
+    }
+    return {};
 }
 
 std::optional<std::int64_t> Item::number(std::string_view name) const
@@ -299,10 +419,16 @@ std::optional<std::int64_t> Item::number(std::string_view name) const
 Log read_log(std::string_view bytes)
 {
     Reader reader;
+    const bool is_trace = is_trace_lines(bytes);
+    if (is_trace)
+        reader.is_trace();
     while (!bytes.empty())
     {
         const std::size_t end = std::min(bytes.find('\n'), bytes.size());
-        reader.line(bytes.substr(0, end));
+        if (is_trace)
+            reader.trace_line(bytes.substr(0, end));
+        else
+            reader.line(bytes.substr(0, end));
         bytes.remove_prefix(std::min(end + 1, bytes.size()));
     }
     return reader.take();

@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "tools/pmxboard/decode/texts.h"
+#include "tools/pmxboard/decode/timeline.h"
 
 namespace pmxboard::decode
 {
@@ -29,7 +30,8 @@ struct Item
     std::size_t line = 0;            ///< counted from 1
     std::size_t last_line = 0;       ///< where it ends, when something foreign broke it in two
     std::string time;                ///< the time stamp that stands before it, as written
-    std::optional<double> seconds;   ///< the same as a number
+    std::optional<Moment> moment;    ///< the same as a number
+    std::size_t boot = 0;            ///< how often the system had begun anew before
     Cut cut = Cut::None;
     std::string shown; ///< what the console showed of it
 
@@ -46,17 +48,40 @@ struct Shown
     std::string foreign;             ///< its beginning, fit for a terminal
 };
 
+/** Where the system began anew. */
+struct Boot
+{
+    std::size_t line = 0;
+    std::string time;
+    std::size_t item = 0; ///< the first behind it
+};
+
 struct Log
 {
+    /** What the bytes are. */
+    enum class Form
+    {
+        Console,
+        Trace ///< JSON lines of a run
+    };
+
+    Form form = Form::Console;
     std::vector<Item> items;
+    std::vector<std::size_t> order; ///< of the items, as they were printed, without those that stand twice
+    std::vector<Boot> boots;        ///< apart from what it begins with
+    std::size_t twice = 0;          ///< items that stand once more
+    std::size_t displaced = 0;      ///< items that stand behind younger ones
     std::vector<Shown> shown;
     std::size_t lines = 0;
     std::size_t foreign = 0; ///< lines without any text of the layer, empty ones apart
     std::size_t cut = 0;
-    std::optional<int> level; ///< the highest level of PMX_IsLog that it shows
+    std::optional<int> level;  ///< the highest level of PMX_IsLog that it shows
+    std::optional<Moment> end; ///< the last moment that a line tells, of whomever it is
+    std::size_t end_boot = 0;  ///< how often the system has begun anew
 };
 
-/** Any bytes are a log. The work grows with their number, however they are divided into lines. */
+/** Any bytes are a log, and a trace in JSON lines is read as what it is. The work grows with their number, however they
+ *  are divided into lines. */
 Log read_log(std::string_view bytes);
 
 /** A text of the layer as it was printed, alone on its line. Nothing: it is not one of the table. */

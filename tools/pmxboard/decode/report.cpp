@@ -170,7 +170,7 @@ void StatusReport::tell_record(std::vector<std::string>& lines) const
     }
     tell("rDrvExtScl", "external chip {rDrvExtScl}");
     if (!m_external_line && m_ports.back().contains("eSrcColorSpace") && !m_outputs.front().empty())
-        lines.push_back("external chip: no line, so DRV_RX_BYPASS_TX or a value without a name");
+        lines.push_back("external chip: no line, as of DRV_RX_BYPASS_TX or a value without a name");
     tell("fgForceMode", "force mode {fgForceMode:switch}; digest view {fgDigestEnable}, its ratio {u4DigestAsp}");
     tell("fgOSD5", "fifth OSD plane {fgOSD5}");
 }
@@ -235,7 +235,7 @@ void StatusReport::tell_ports(std::vector<std::string>& lines) const
 std::string StatusReport::mode_of(const Fields& output)
 {
     if (!output.contains("eReportedMode"))
-        return output.contains("u4VFreq") && output.contains("eDgiFmt") ? "mode above 41, which has no line"
+        return output.contains("u4VFreq") && output.contains("eDgiFmt") ? "no line with a mode, as of those above 41"
                                                                         : "mode not in the log";
     const std::string printed = output.get("eReportedMode");
     return output.say("{eReportedMode}") + (reported_mode(printed) == printed ? "" : " (reported as " + printed + ")");
@@ -253,7 +253,6 @@ void StatusReport::tell_outputs(std::vector<std::string>& lines) const
             continue;
         std::string line = "output " + std::string(output_names[i]) + ": " + output.say("{fgOutputEnable:switch}") +
                            ", " + mode_of(output);
-        line += output.say_if("u4VFreq", ", {u4VFreq} Hz");
         if (is_set("eDgiMode", "CCIR_INVALID") || is_set("eDgiFmt", "CCIR_NON_USED"))
             line += output.say(", digital input {eDgiMode} {eDgiFmt}");
         if (is_set("eDgoMode", "CCIR_INVALID") || is_set("eDgoFmt", "CCIR_NON_USED"))

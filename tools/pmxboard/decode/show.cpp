@@ -44,6 +44,14 @@ void show_summary(std::ostream& out, const Log& log, const ShowOptions& options)
     text += ", " + std::to_string(log.foreign) + " foreign";
     if (log.cut != 0)
         text += ", " + std::to_string(log.cut) + " cut";
+    if (log.twice != 0)
+        text += ", " + std::to_string(log.twice) + " twice";
+    if (log.displaced != 0)
+        text += ", " + std::to_string(log.displaced) + " out of order";
+    if (!log.boots.empty())
+        text += ", " + counted(log.boots.size(), "new start");
+    if (log.form == Log::Form::Trace)
+        text += "; a trace in JSON lines, read as the console of its run";
     out << wrapped(text, columns, 0, 2);
     if (log.items.empty())
         out << "Nothing in it comes from the mixer layer.\n";
@@ -56,7 +64,8 @@ void show_event(std::ostream& out, const Event& event, std::size_t range_width, 
     if (time_width != 0)
         lead += padded_left(event.time, time_width) + "  ";
     const std::string mark = event.problem ? "! " : "";
-    const std::string head = behind(lead, mark + event.operation + ": " + event.title, 2);
+    const std::string whose = event.operation.empty() ? "" : event.operation + ": ";
+    const std::string head = behind(lead, mark + whose + event.title, 2);
     out << options.paint(lead, Colour::Grey) << options.paint(head, event.problem ? Colour::Magenta : Colour::Bold)
         << '\n';
 
@@ -66,6 +75,8 @@ void show_event(std::ostream& out, const Event& event, std::size_t range_width, 
         paragraphs = event.report->words();
     if (!event.details.empty())
         paragraphs.push_back(joined(event.details, "; "));
+    if (!event.assumed.empty())
+        paragraphs.push_back("assumed, for lines are missing: " + joined(event.assumed, "; "));
     for (const std::string& paragraph : paragraphs)
         out << wrapped(paragraph, columns, indent, indent + 2);
 }

@@ -26,14 +26,18 @@ Json level_of(const Text& text)
 
 Json json_of(const Event& event)
 {
+    constexpr const char* kinds[] = { "call", "gap", "start" };
     Json json;
     json["operation"] = event.operation;
     json["first_line"] = event.first_line;
     json["last_line"] = event.last_line;
+    json["lines"] = event.lines;
     json["time"] = or_null(event.time);
     json["title"] = event.title;
     json["details"] = event.report ? event.report->words() : event.details;
+    json["assumed"] = event.assumed;
     json["problem"] = event.problem ? 1 : 0;
+    json["kind"] = kinds[static_cast<std::size_t>(event.kind)];
     if (event.report)
         json["report"] = event.report->json();
     return json;
@@ -102,7 +106,9 @@ void show_json(std::ostream& out, const Log& log, const Story& story, const std:
                const std::string& name)
 {
     out << "{\"log\":" << written(printable(name, name.size() * 4)) << ",\"lines\":" << log.lines
-        << ",\"foreign\":" << log.foreign << ",\"cut\":" << log.cut
+        << ",\"foreign\":" << log.foreign << ",\"cut\":" << log.cut << ",\"twice\":" << log.twice
+        << ",\"displaced\":" << log.displaced << ",\"starts\":" << log.boots.size()
+        << ",\"form\":" << (log.form == Log::Form::Trace ? "\"trace\"" : "\"console\"")
         << ",\"level\":" << (log.level ? std::to_string(*log.level) : "null") << ",\n\"events\":[";
     for (std::size_t i = 0; i < story.events.size(); ++i)
         out << (i == 0 ? "\n" : ",\n") << written(json_of(story.events[i]));

@@ -2,8 +2,11 @@
 #include "tools/pmxboard/decode/story.h"
 
 #include <algorithm>
+#include <cmath>
 #include <cstdio>
 
+#include "tools/pmxboard/decode/calls.h"
+#include "tools/pmxboard/decode/knowledge.h"
 #include "tools/pmxboard/decode/words.h"
 
 namespace pmxboard::decode
@@ -15,11 +18,12 @@ constexpr std::string_view mode_change = "PMX_SetModeEx";
 constexpr double one_call = 0.1; ///< seconds that a slow console may take between two lines of one call
 constexpr int detailed = 9;      ///< the level at which a mode setting logs what was asked for
 
-/** Graphics are out of the mix. */
-struct Held
+/** Something that lasts: graphics are out of the mix, the timer runs. */
+struct Lasting
 {
     std::size_t line;
-    std::optional<double> seconds;
+    std::optional<Moment> since;
+    bool sure = true; ///< no lines are missing since
 };
 
 /** What a per-output mode setting asked for. */
@@ -35,7 +39,7 @@ struct Request
 /** Takes the items one after the other, and folds them into events. */
 struct Teller
 {
-    explicit Teller(const Log& told) : log(told) {}
+    explicit Teller(const Log& told) : log(told), calls(read_calls(told)) {}
     Story tell();
 
     Event& event() { return story.events.back(); }
@@ -46,21 +50,36 @@ struct Teller
     void join_or_open(const Item& item, std::string detail);
     void close();
 
+    const Item& at(std::size_t other) const { return log.items[log.order[other]]; }
     bool is_next(Rule rule) const;
     bool is_later(const Item& item) const;
-    std::string held_for(const Item& item) const;
+    static std::string since(const Lasting& begin, const Item& item);
     std::string requested() const;
 
+    void take_damage();
+    Event& tell_place(Event::Kind kind, std::size_t line, std::string title);
+    void begin_anew(const Boot& boot);
+    void tell_gap(const Gap& gap);
+    void tell_left(std::size_t line, std::string title, bool problem);
+    void tell_back(const Item& item);
+
     const Log& log;
+    Calls calls;
+    std::size_t gaps_told = 0;
+    std::size_t twice_told = 0;
+    std::size_t boots_told = 0;
     Story story;
     bool open_now = false;
     std::vector<std::string_view> candidates; ///< which operations the open event may be
     std::vector<std::size_t> event_items;
-    std::size_t index = 0; ///< of the item that is taken
+    std::size_t index = 0; ///< the place of the item that is taken
     Rule last = nullptr;   ///< of the item before
     Request request;
-    std::optional<Held> held;
-    bool return_asked = false; ///< the open event says that graphics may return, and has not let them yet
+    std::optional<Lasting> held;
+    std::optional<Lasting> timer;
+    bool return_asked = false; ///< the open event says that graphics wait for their return, and has not let them yet
+    bool lets_return = false;  ///< the item before lets graphics return if they wait
+    bool returning = false;    ///< this one does
     unsigned asked = 0;        ///< how often in a row somebody asked whether graphics may be shown
 };
 
@@ -75,8 +94,18 @@ void Teller::open(const Item& item, std::vector<std::string_view> operations, st
     close();
     open_now = true;
     candidates = std::move(operations);
-    story.events.push_back({ {}, item.line, item.last_line, item.time, std::move(title), {}, item.text->problem, {} });
-    event_items = { index };
+    story.events.push_back({ {},
+                             item.line,
+                             item.last_line,
+                             { item.line },
+                             item.time,
+                             std::move(title),
+                             {},
+                             item.text->problem,
+                             Event::Kind::Call,
+                             {},
+                             {} });
+    event_items = { log.order[index] };
     request = {};
     return_asked = false;
     asked = 0;
@@ -86,9 +115,11 @@ void Teller::join(const Item& item, std::string detail)
 {
     if (joins(item))
         std::erase_if(candidates, [&](std::string_view one) { return !has(item.text->operations, one); });
+    event().first_line = std::min(event().first_line, item.line);
+    event().lines.push_back(item.line);
     event().last_line = std::max(event().last_line, item.last_line);
     event().problem = event().problem || item.text->problem;
-    event_items.push_back(index);
+    event_items.push_back(log.order[index]);
     if (!detail.empty())
         event().details.push_back(std::move(detail));
 }
@@ -115,32 +146,51 @@ void Teller::close()
     }
     if (closed.operation == mode_change && closed.title.empty())
         closed.title = requested();
-    else if (closed.operation == "PMX_SetMode" && closed.details.empty() && index < log.items.size())
-        closed.details.push_back("no set-up follows: refused by the capability word, or set already");
+    else if (closed.operation == "PMX_SetMode" && closed.details.empty() && index < log.order.size())
+        closed.details.push_back(
+            "no set-up stands behind it, as when it is refused by the capability word or set already");
     if (return_asked && held)
-        closed.details.push_back("graphics go on waiting, for the video plane driver");
+        closed.details.push_back(index < log.order.size()
+                                     ? "nothing here lets graphics back, as when the video plane driver does so later"
+                                     : "the log ends before it tells whether graphics return");
 }
 
 /** Whether the item behind this one has a rule. */
 bool Teller::is_next(Rule rule) const
 {
-    return index + 1 < log.items.size() && log.items[index + 1].text->rule == rule;
+    return index + 1 < log.order.size() && at(index + 1).text->rule == rule;
 }
 
 /** Whether so much time lies before an item that it was another call. */
 bool Teller::is_later(const Item& item) const
 {
-    const std::optional<double> before = index == 0 ? std::nullopt : log.items[index - 1].seconds;
-    return before && item.seconds && *item.seconds - *before > one_call;
+    const std::optional<double> passed = index == 0 ? std::nullopt : between(at(index - 1).moment, item.moment);
+    return passed && *passed > one_call + item.moment->exact;
 }
 
-std::string Teller::held_for(const Item& item) const
+/** How much later than what a line began: `, 2.5 s after line 5`. Stamps that are whole seconds tell no tenths. */
+std::string Teller::since(const Lasting& begin, const Item& item)
 {
-    if (!held || !held->seconds || !item.seconds || *item.seconds < *held->seconds)
-        return {};
-    char text[32];
-    std::snprintf(text, sizeof text, " after %.1f s", *item.seconds - *held->seconds);
-    return text;
+    const std::optional<double> passed = between(begin.since, item.moment);
+    const std::string after = " after line " + std::to_string(begin.line);
+    if (!passed || *passed < 0)
+        return "," + after;
+    const double exact = std::max(begin.since->exact, item.moment->exact);
+    char text[64];
+    std::snprintf(text, sizeof text, exact >= 1 ? ", about %.0f s" : ", %.1f s", *passed);
+    return text + after;
+}
+
+/** Graphics are mixed again. */
+void Teller::tell_back(const Item& item)
+{
+    if (!held || !held->sure)
+        event().details.push_back("graphics are in the mix");
+    else
+        event().details.push_back("graphics are back" + since(*held, item));
+    if (held && !held->sure)
+        event().assumed.push_back("graphics are back" + since(*held, item));
+    held.reset();
 }
 
 std::string Teller::requested() const
@@ -153,29 +203,104 @@ std::string Teller::requested() const
     return request.fifth.empty() ? title : title + "; fifth OSD " + request.fifth;
 }
 
+/** What stands on one line, and is no call. */
+Event& Teller::tell_place(Event::Kind kind, std::size_t line, std::string title)
+{
+    close();
+    Event told;
+    told.kind = kind;
+    told.first_line = line;
+    told.last_line = line;
+    told.lines = { line };
+    told.title = std::move(title);
+    story.events.push_back(std::move(told));
+    return event();
+}
+
+void Teller::tell_gap(const Gap& gap)
+{
+    if (gap.is_end)
+        tell_place(Event::Kind::Gap, at(gap.at - 1).line,
+                   "its call has no end in the log: missing, or out of order, is " + gap.what);
+    else if (gap.at >= log.order.size())
+        tell_place(Event::Kind::Gap, log.lines, "before the end others are missing: " + gap.what);
+    else
+        tell_place(Event::Kind::Gap, at(gap.at).line,
+                   "before this line others are missing, or out of order: " + gap.what)
+            .time = at(gap.at).time;
+    for (std::optional<Lasting>* lasting : { &held, &timer })
+    {
+        if (*lasting)
+            (*lasting)->sure = false;
+    }
+    last = nullptr;
+    returning = false;
+}
+
+/** Graphics that nothing brings back before something ends. */
+void Teller::tell_left(std::size_t line, std::string title, bool problem)
+{
+    Event left;
+    left.operation = mode_change;
+    left.first_line = held->line;
+    left.last_line = line;
+    left.lines = { held->line };
+    left.title = std::move(title);
+    left.problem = problem;
+    story.events.push_back(std::move(left));
+    held.reset();
+}
+
+void Teller::begin_anew(const Boot& boot)
+{
+    close();
+    if (held)
+        tell_left(boot.line, "nothing before the new start brings these graphics back", false);
+    timer.reset();
+    last = nullptr;
+    returning = false;
+    tell_place(Event::Kind::Start, boot.line, "the system begins anew: nothing of what was lasts").time = boot.time;
+}
+
+/** What the log has, or has not, before the next item. */
+void Teller::take_damage()
+{
+    const std::size_t boots = index < log.order.size() ? at(index).boot : log.end_boot;
+    for (; boots_told < boots; ++boots_told)
+        begin_anew(log.boots[boots_told]);
+    for (; gaps_told < calls.gaps.size() && calls.gaps[gaps_told].at <= index; ++gaps_told)
+        tell_gap(calls.gaps[gaps_told]);
+}
+
 Story Teller::tell()
 {
     for (const Item& item : log.items)
         story.operations.push_back(item.text->operations);
-    for (; index < log.items.size(); ++index)
+    for (; index < log.order.size(); ++index)
     {
-        const Item& item = log.items[index];
+        const Item& item = at(index);
+        take_damage();
+        if (twice_told < calls.twice.size() && calls.twice[twice_told] == index)
+        {
+            ++twice_told;
+            continue;
+        }
         if (item.cut != Item::Cut::None)
             continue;
+        lets_return = returning;
+        returning = item.text->is_assertion() && lets_return; // which are from within the call
         item.text->rule(*this, item);
         last = item.text->rule;
     }
     close();
+    take_damage();
     if (held)
-    {
-        Event left;
-        left.operation = mode_change;
-        left.first_line = held->line;
-        left.last_line = log.lines;
-        left.title = "graphics are still held back where the log ends";
-        left.problem = true;
-        story.events.push_back(std::move(left));
-    }
+        tell_left(log.lines,
+                  std::string(held->sure ? "" : "as far as its lines tell, ") + "nothing up to the log's end brings "
+                                                                                "these graphics back",
+                  true);
+    if (calls.unfinished)
+        tell_place(Event::Kind::Gap, log.lines, "the log ends within a call: next comes " + *calls.unfinished);
     return std::move(story);
 }
 
@@ -202,12 +327,6 @@ void rules::heads(Teller& story, const Item& item)
 void rules::goes_on(Teller& story, const Item& item)
 {
     story.join_or_open(item, tale_of(item));
-}
-
-void rules::ends(Teller& story, const Item& item)
-{
-    goes_on(story, item);
-    story.close();
 }
 
 namespace
@@ -266,55 +385,74 @@ void rules::flag(Teller& story, const Item& item)
 {
     const bool raised = item.value("fgPmxFormatChangeFlag") != "0";
     const bool part_of_mode_change = raised && story.is_open(mode_change) && !story.held;
+    const bool goes_on = (story.last == no_wait || story.last == timed_out) && !story.is_later(item);
     if (part_of_mode_change)
         story.join(item, "the display part begins to switch");
     else if (raised)
         story.open(item, { "PMX_SetFormatChangeFlag" }, "the display part begins to switch: its flag is raised");
-    else if (story.last == no_wait || story.last == timed_out)
+    else if (goes_on)
         story.join(item, {});
     else
         story.open(item, { "PMX_SetFormatChangeFlag" },
-                   story.held ? "the display part has switched" + story.held_for(item)
-                              : "the display part's flag is lowered");
+                   "the display part's flag is lowered, as when it has switched" +
+                       (story.held && story.held->sure ? Teller::since(*story.held, item) : ""));
 }
 
 void rules::held_back(Teller& story, const Item& item)
 {
     goes_on(story, item);
-    story.held = Held{ item.line, item.seconds };
+    story.held = Lasting{ item.line, item.moment };
 }
 
 void rules::timer_set(Teller& story, const Item& item)
 {
     goes_on(story, item);
+    story.timer = Lasting{ item.line, item.moment };
     if (story.is_open(mode_change)) // nothing of the call comes behind the timer
         story.close();
 }
 
 void rules::timed_out(Teller& story, const Item& item)
 {
-    story.open(item, { "_PMX_TmrIsr" },
-               story.held ? "the timer runs out" + story.held_for(item) + ": the display part has not answered"
-                          : "the timer of an earlier mode change runs out; graphics are back already");
+    std::string title = "the timer runs out";
+    const auto passed = story.timer ? between(story.timer->since, item.moment) : std::nullopt;
+    if (passed && fits_timer(*passed, item.moment->exact))
+        title += Teller::since(*story.timer, item);
+    title += story.held ? ": no answer of the display part stands before it"
+                        : ": no line before it has graphics wait for it";
+    story.open(item, { "_PMX_TmrIsr" }, title);
     story.event().problem = story.held.has_value();
+    story.timer.reset();
 }
 
 void rules::osd_flag(Teller& story, const Item& item)
 {
+    const bool waits = item.value("fgPmxEnabeOsdFlag") != "0";
+    const bool are_back = story.lets_return && !waits;
     story.join_or_open(item, {});
-    story.return_asked = item.value("fgPmxEnabeOsdFlag") != "0";
+    story.return_asked = waits;
+    if (are_back)
+        story.tell_back(item);
 }
 
 void rules::osd_back(Teller& story, const Item& item)
 {
     if (story.joins(item) && !story.is_later(item))
-        story.join(item, story.held ? "graphics are back" : "");
+        story.join(item, {});
     else
         story.open(item, { "PMX_SetOsdEnable" },
-                   story.held ? "graphics are back" + story.held_for(item) + ": the video plane driver let them"
-                              : "graphics may return, if they wait for it");
-    story.held.reset();
+                   "graphics return if they wait for it: the video plane driver lets them");
     story.return_asked = false;
+    story.returning = true;
+}
+
+void rules::starts(Teller& story, const Item& item)
+{
+    goes_on(story, item);
+    story.close();
+    if (story.held)
+        story.tell_left(item.line, "nothing before this start-up brings these graphics back", false);
+    story.timer.reset();
 }
 
 void rules::ready(Teller& story, const Item& item)
@@ -335,7 +473,7 @@ void rules::ready(Teller& story, const Item& item)
     else if (story.is_open("fgPMX_DisplayModeReady") && story.event().title.starts_with(title))
     {
         story.join(item, {});
-        story.event().title = title + " (" + std::to_string(++story.asked) + " times)";
+        story.event().title = title + " (" + std::to_string(++story.asked) + " lines)";
     }
     else
     {

@@ -16,13 +16,23 @@ namespace pmxboard::decode
 
 struct Event
 {
-    std::string operation; ///< where more than one is possible, the first of them
+    enum class Kind
+    {
+        Call,
+        Gap,  ///< the log has not what must stand there
+        Start ///< the system begins anew
+    };
+
+    std::string operation; ///< where more than one is possible, the first of them; of a call alone
     std::size_t first_line = 0;
     std::size_t last_line = 0;
-    std::string time; ///< of its first line
+    std::vector<std::size_t> lines; ///< that it stands on; between them may be those of others
+    std::string time;               ///< of its first line
     std::string title;
     std::vector<std::string> details;
     bool problem = false;
+    Kind kind = Kind::Call;
+    std::vector<std::string> assumed; ///< what is so if nothing of it is among the lines that are missing
     std::optional<StatusReport> report;
 };
 

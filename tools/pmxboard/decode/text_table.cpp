@@ -70,7 +70,7 @@ constexpr Text rows[] = {
       "what the boot loader left there", "the boot loader left {ucMode}" },
     { print, "[PMX]_arPmxConf[ucPmxId].ucMode=%d\n", "ucMode", FROM_START,
       "the boot loader's mode, before it is judged", "the reset starts from {ucMode}" },
-    { 0, "[PMX] create a timer \n", "", "PMX_Init", "the display timer exists", "display timer created", ends },
+    { 0, "[PMX] create a timer \n", "", "PMX_Init", "the display timer exists", "display timer created", starts },
     { 1, "PMX_Uninit\n", "", "PMX_Uninit", "shut-down begins", "shut-down", opens },
     { 1, "i4PMX_Uninit u4Case %d\n", "u4Case", "i4PMX_Uninit", "shut-down with a result begins",
       "shut-down, case {u4Case}", opens },
@@ -108,9 +108,9 @@ constexpr Text rows[] = {
     { 9, "Adjust PMX_ColorSpaceSetup call sequence.\n", "", FROM_MODE_EX,
       "mixer and scaler have the mode, colours follow", "" },
     { 0, "[PMX] fgHdmiExist:%d, Not wait display part...\n", "fgHdmiExist", FROM_MODE_EX, "nobody to wait for",
-      "no wait for the display part", no_wait },
+      "no wait for the display part: {fgHdmiExist:nobody}", no_wait },
     { 0, "[PMX] VDP_SetClearVideo & Not Mix OSD..\n", "", FROM_MODE_EX,
-      "the display part's flag is up: graphics leave the mix", "graphics held back until the display part has switched",
+      "the display part's flag is up: graphics leave the mix", "graphics held back while the display part switches",
       held_back },
     // Handshake
     { 0, "Display Format Change :%d.\n", "fgPmxFormatChangeFlag", FLAG, "the display part's flag is set to this", "",
@@ -120,7 +120,7 @@ constexpr Text rows[] = {
     { 0, "PMX_SetOsdEnable.\n", "", OSD_BACK, "graphics return to the mix if they wait for it", "", osd_back },
     { 0, "PMX timeout.\n", "", "_PMX_TmrIsr", "the display timer has run out", "", timed_out, problem },
     { 0, "Display Format Change Timer Set.\n", "", "PMX_SetFormatChangeTimer,PMX_SetModeEx", "the display timer starts",
-      "the display timer runs", timer_set },
+      "the display timer is set", timer_set },
     { 9, "[PMX] fgPMX_DisplayModeReady is %d.\n", "fgPmxFormatChangeFlag", "fgPMX_DisplayModeReady,PMX_SetModeEx",
       "the flag, whose opposite is the answer: 1 is not ready", "", ready },
     // Colour conversions
@@ -174,7 +174,7 @@ constexpr Text rows[] = {
     { 8, "[PMX] Master Color Space change from %d to %d.\n", "eColorSpace,eNewColorSpace", DECIDE, "the decision",
       "master colour space changes from {eColorSpace} to {eNewColorSpace}" },
     { 8, "Inform Vdp CS(%d)\n", "eColorSpace", INFORM, "a connected video plane is told",
-      "a video plane is told {eColorSpace}" },
+      "a video plane is to be told {eColorSpace}" },
     { 5, "Query VDP Interface Fail!\n", "", INFORM, "its interface table was not found",
       "that video plane has no interface table and was passed over", goes_on, problem },
     // Plane order, swaps, colour bar, mute

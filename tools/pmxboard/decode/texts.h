@@ -27,7 +27,7 @@ using Function = void(Teller& story, const Item& item);
 Function opens;   ///< an operation begins
 Function heads;   ///< begins an operation, unless it is part of the one that is running
 Function goes_on; ///< goes on with an operation
-Function ends;    ///< goes on with an operation that has nothing more to say
+Function starts;  ///< ends a start-up: what was before is over
 
 Function mode_ex;      ///< a per-output mode setting begins
 Function output;       ///< one of the four outputs that it asks for

@@ -108,8 +108,11 @@ TEST(DecodeAgainst, LineTooMany_IsFound)
 
 TEST(DecodeAgainst, SwappedLines_AreFound)
 {
-    const std::string log = captured();
-    const Comparison found = against(with_line(with_line(log, 12, line_of(log, 13)), 13, line_of(log, 12)));
+    std::string log = captured();
+    const std::size_t stamp = log.find(']', begin_of(log, 12)) - begin_of(log, 12) + 1; // stays where it is
+    log = with_line(with_line(log, 12, line_of(log, 12).substr(0, stamp) + line_of(log, 13).substr(stamp)), 13,
+                    line_of(log, 13).substr(0, stamp) + line_of(log, 12).substr(stamp));
+    const Comparison found = against(log);
     ASSERT_TRUE(found.departure);
     EXPECT_EQ(Departure::Kind::Swapped, found.departure->kind);
     EXPECT_EQ(12u, found.departure->found->line);
@@ -177,6 +180,34 @@ TEST(DecodeAgainst, LogGoesOnBehindTheScenario_ThatIsTooMany)
     EXPECT_EQ("PMX_Stop", operation_of(*found.departure));
 }
 
+TEST(DecodeAgainst, BehindTheFirstDeparture_ItGoesOn)
+{
+    const std::string log = with(with(captured(), "HDMI(1, RES_1080P60HZ)", "HDMI(1, RES_1080P50HZ)"), "CC_A disable",
+                                 "CC_A enable, 601->709");
+    const Comparison found = against(with_line(with_line(log, 13, ""), 12, "") + "PMX_Stop\nPMX_Stop\n");
+    ASSERT_TRUE(found.departure);
+    EXPECT_EQ(Departure::Kind::Value, found.departure->kind);
+    ASSERT_EQ(3u, found.further.size());
+    EXPECT_EQ(Departure::Kind::Missing, found.further[0].kind);
+    EXPECT_EQ(2u, found.further[0].count);
+    EXPECT_EQ("CAV (1, RES_480P)", found.further[0].expected->item.shown);
+    EXPECT_EQ(Departure::Kind::Different, found.further[1].kind);
+    EXPECT_EQ(Departure::Kind::Extra, found.further[2].kind);
+    EXPECT_EQ(2u, found.further[2].count);
+    EXPECT_EQ(16u, found.agreeing + found.agreeing_behind);
+}
+
+TEST(DecodeAgainst, ALongLog_IsComparedToItsEnd)
+{
+    std::string log;
+    for (int i = 0; i < 6000; ++i)
+        log += "VDP_1 Disabled\n";
+    const Comparison found = against(captured() + log + "PMX_Stop\n");
+    ASSERT_TRUE(found.departure);
+    EXPECT_EQ(Departure::Kind::Extra, found.departure->kind);
+    EXPECT_EQ(6001u, found.departure->count);
+}
+
 using DecodeProgram = ProgramRun;
 
 constexpr const char* compare_input = "decode --against scenarios/first-mode-after-boot.pmx -";
@@ -198,6 +229,15 @@ TEST_F(DecodeProgram, Departure_ExitsOneAndNamesEverything)
              "eResMode: RES_1080P60HZ (1080p 60 Hz) expected", "operation  PMX_SetModeEx",
              "first-mode-after-boot.pmx:" + mode_line() + ": PMX_SetModeEx 0" })
         EXPECT_NE(std::string::npos, ended.out.find(part)) << part << "\n" << ended.out;
+}
+
+TEST_F(DecodeProgram, SeveralDepartures_AreAllShownWithTheirSum)
+{
+    const std::string log = with(captured(), "HDMI(1, RES_1080P60HZ)", "HDMI(1, RES_1080P50HZ)");
+    const std::string shown = run(compare_input, with_line(log, 22, "")).out;
+    for (const char* const part : { "departs at line 11:", "and again at line 23: a line is missing",
+                                    "2 departures: 1 of other values, 1 of a line is missing; 18 lines agree" })
+        EXPECT_NE(std::string::npos, shown.find(part)) << part << "\n" << shown;
 }
 
 TEST_F(DecodeProgram, Level_LeavesOutDetailedLines)

@@ -200,7 +200,7 @@ void add_decode(CLI::App& app, Chosen& chosen)
         "decode", "Read a captured console log: what the layer did, and where it departs from a scenario.");
     sub->add_option("FILE", decode->file, "A log; - reads the standard input");
     sub->add_option("--against", decode->against,
-                    "Find the first departure from what the layer prints in this scenario")
+                    "Show where it departs from what the layer prints in this scenario")
         ->type_name("SCENARIO");
     sub->add_option("--level", decode->level,
                     "Compare lines of this level of PMX_IsLog and below; else the highest that the log shows")

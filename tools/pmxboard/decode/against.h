@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
- *  A log against what the layer prints in a scenario: where they part first. */
+ *  A log against what the layer prints in a scenario: where they part, and where they meet again. */
 #pragma once
 
 #include <optional>
@@ -44,6 +44,7 @@ struct Departure
     std::optional<Expected> expected; ///< nothing: the scenario is over
     std::optional<Item> found;        ///< what stands there; of a missing line what stands in its place
     std::vector<ValueDifference> values;
+    std::size_t count = 1; ///< lines in a row that are missing, or too many
 };
 
 /** The operation that it lies in: the one that ran in the scenario, or the one that prints such a text. */
@@ -56,12 +57,16 @@ struct Comparison
     std::size_t agreeing = 0;   ///< lines before the departure, or all
     std::size_t first_line = 0; ///< of the log, that agree; 0: none
     std::size_t last_line = 0;
-    std::size_t skipped = 0; ///< lines that the scenario prints before the log begins
-    std::size_t left = 0;    ///< lines that it prints after the log ends
-    std::optional<Departure> departure;
+    std::size_t skipped = 0;            ///< lines that the scenario prints before the log begins
+    std::size_t left = 0;               ///< lines that it prints after the log ends
+    std::optional<Departure> departure; ///< the first
+    std::vector<Departure> further;     ///< those behind it
+    std::size_t agreeing_behind = 0;    ///< lines that agree behind the first departure
+    bool is_whole = true;               ///< false: there are more departures than are looked for
 };
 
-/** Compare up to a level of PMX_IsLog: only what both can show. */
+/** Compare up to a level of PMX_IsLog: only what both can show. Where both agree the work grows with the lines; each of
+ *  the departures, of which at most a thousand are looked for, may cost an alignment of 256 lines with as many. */
 Comparison compare(const Log& log, const std::vector<Expected>& expected, int level);
 
 /** A scenario that cannot be run to its end. */

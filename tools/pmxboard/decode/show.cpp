@@ -2,7 +2,9 @@
 #include "tools/pmxboard/decode/show.h"
 
 #include <algorithm>
+#include <array>
 #include <ostream>
+#include <span>
 
 #include "board/value.h"
 #include "tools/pmxboard/decode/words.h"
@@ -137,17 +139,22 @@ void show_lines(std::ostream& out, const Log& log, const Story& story, const Sho
     }
 }
 
-std::string_view kind_words(Departure::Kind kind)
+constexpr std::size_t most_shown = 40; ///< departures, unless somebody wants every line
+
+constexpr std::string_view kinds[] = { "other values", "a line is missing", "a line too many", "another line",
+                                       "two lines are swapped" };
+
+std::string kind_words(const Departure& departure)
 {
-    switch (kind)
-    {
-    case Departure::Kind::Value: return "other values";
-    case Departure::Kind::Missing: return "a line is missing";
-    case Departure::Kind::Extra: return "a line too many";
-    case Departure::Kind::Different: return "another line";
-    case Departure::Kind::Swapped: return "two lines are swapped";
-    }
-    return "";
+    if (departure.count == 1)
+        return std::string(kinds[static_cast<std::size_t>(departure.kind)]);
+    return counted(departure.count, "line") +
+           (departure.kind == Departure::Kind::Missing ? " are missing" : " too many");
+}
+
+std::string place_of(const Departure& departure)
+{
+    return departure.found ? "line " + std::to_string(departure.found->line) : "its end";
 }
 
 void show_field(std::ostream& out, std::string_view name, std::string_view text)
@@ -155,6 +162,41 @@ void show_field(std::ostream& out, std::string_view name, std::string_view text)
     constexpr std::size_t width = 13;
     const std::string lead = "  " + std::string(name) + std::string(width - 2 - name.size(), ' ');
     out << lead << behind(lead, printable(text, 6 * columns), 0) << '\n';
+}
+
+void show_departure(std::ostream& out, const Departure& departure, const std::string& scenario)
+{
+    show_field(out, "expected",
+               departure.expected ? departure.expected->item.shown : "nothing more: the scenario is over");
+    if (departure.found)
+        show_field(out, departure.kind == Departure::Kind::Missing ? "instead" : "found", departure.found->shown);
+    for (const ValueDifference& value : departure.values)
+        show_field(out, "differs", value.name + ": " + value.expected + " expected, " + value.found + " found");
+    const Text* const text = departure.expected ? departure.expected->item.text : departure.found->text;
+    show_field(out, "operation", operation_of(departure) + ": " + std::string(text->step));
+    if (departure.expected)
+        show_field(out, "scenario",
+                   scenario + ":" + std::to_string(departure.expected->line) + ": " + departure.expected->command);
+}
+
+/** How many departures there are, of which kinds, and what agrees between them. */
+void show_sum(std::ostream& out, const Comparison& comparison, std::size_t shown)
+{
+    std::array<std::size_t, std::size(kinds)> count{};
+    ++count[static_cast<std::size_t>(comparison.departure->kind)];
+    for (const Departure& one : comparison.further)
+        ++count[static_cast<std::size_t>(one.kind)];
+    std::vector<std::string> parts;
+    for (std::size_t kind = 0; kind < count.size(); ++kind)
+    {
+        if (count[kind] != 0)
+            parts.push_back(std::to_string(count[kind]) + " of " + std::string(kinds[kind]));
+    }
+    std::string sum = counted(comparison.further.size() + 1, "departure") + ": " + joined(parts, ", ") + "; " +
+                      counted(comparison.agreeing + comparison.agreeing_behind, "line") + " agree";
+    if (shown < comparison.further.size())
+        sum += "; --verbose shows all";
+    out << wrapped(comparison.is_whole ? sum : sum + "; further ones are not looked for", columns, 0, 2);
 }
 
 } // namespace
@@ -199,23 +241,21 @@ void show_comparison(std::ostream& out, const Comparison& comparison, const Show
         show_field(out, "agreement", agreement);
         return;
     }
-    const Departure& departure = *comparison.departure;
-    const std::string where = departure.found ? "line " + std::to_string(departure.found->line) : "its end";
-    const std::string title = against + " departs at " + where + ": " + std::string(kind_words(departure.kind));
+    const std::string where = place_of(*comparison.departure);
+    const std::string title = against + " departs at " + where + ": " + kind_words(*comparison.departure);
     out << options.paint(behind("", title, 2), Colour::Magenta) << '\n';
     show_field(out, "agreement", agreement);
-    show_field(out, "expected",
-               departure.expected ? departure.expected->item.shown : "nothing more: the scenario is over");
-    if (departure.found)
-        show_field(out, departure.kind == Departure::Kind::Missing ? "instead" : "found", departure.found->shown);
-    for (const ValueDifference& value : departure.values)
-        show_field(out, "differs", value.name + ": " + value.expected + " expected, " + value.found + " found");
-    const Text* const text = departure.expected ? departure.expected->item.text : departure.found->text;
-    show_field(out, "operation", operation_of(departure) + ": " + std::string(text->step));
-    if (departure.expected)
-        show_field(out, "scenario",
-                   comparison.scenario + ":" + std::to_string(departure.expected->line) + ": " +
-                       departure.expected->command);
+    show_departure(out, *comparison.departure, comparison.scenario);
+    const std::size_t shown =
+        options.verbose ? comparison.further.size() : std::min(comparison.further.size(), most_shown);
+    for (const Departure& one : std::span(comparison.further).first(shown))
+    {
+        out << options.paint(behind("", "and again at " + place_of(one) + ": " + kind_words(one), 2), Colour::Magenta)
+            << '\n';
+        show_departure(out, one, comparison.scenario);
+    }
+    if (!comparison.further.empty())
+        show_sum(out, comparison, shown);
 }
 
 } // namespace pmxboard::decode

@@ -82,6 +82,7 @@ Json json_of(const Departure& departure)
     json["expected"] = departure.expected ? Json(departure.expected->item.shown) : Json();
     json["operation"] = operation_of(departure);
     json["scenario_line"] = departure.expected ? Json(departure.expected->line) : Json();
+    json["count"] = departure.count;
     json["values"] = Json::array();
     for (const ValueDifference& one : departure.values)
         json["values"].push_back({ { "name", one.name }, { "expected", one.expected }, { "found", one.found } });
@@ -97,6 +98,11 @@ Json json_of(const Comparison& comparison)
     json["skipped"] = comparison.skipped;
     json["left"] = comparison.left;
     json["departure"] = comparison.departure ? json_of(*comparison.departure) : Json();
+    json["further"] = Json::array();
+    for (const Departure& one : comparison.further)
+        json["further"].push_back(json_of(one));
+    json["agreeing_behind"] = comparison.agreeing_behind;
+    json["whole"] = comparison.is_whole ? 1 : 0;
     return json;
 }
 

@@ -481,6 +481,19 @@ def refused(held, event, _):
     return held.any(event, lambda boot, index: "PMX_CheckCap error" in boot[index].get("text", ""))
 
 
+def goes_on(held, event, words):
+    """Of a mode change: the line that is named and those of the event were printed by one call."""
+    begin = held.source(int(re.search(r"line (\d+)", words)[1]))
+    if event["operation"] != "PMX_SetModeEx":
+        return begin is not None
+    calls = {begin_of_change(held.boot_of(line), line.index) for _, line in held.sources(event)}
+    return begin is not None and calls == {begin_of_change(held.boot_of(begin), begin.index)}
+
+
+def without_begin(held, _event, _words):
+    return held.console.damaged
+
+
 def nothing_back_here(held, event, _):
     """The lines of the event have no return."""
     return not any(line.text == "PMX_SetOsdEnable." for _, line in held.sources(event)) or held.console.damaged
@@ -509,6 +522,8 @@ STATEMENTS = [(re.compile(pattern), test) for pattern, test in (
     (r"OSD plane \d+ stops", by_operation("PMX_OsdDisabled")),
     (r"refused by the capability word; nothing was set", refused),
     (r"nothing here lets graphics back", nothing_back_here),
+    (r"the call of line \d+ goes on", goes_on),
+    (r"a mode change, of which the log has the end", without_begin),
 )]
 
 

@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <array>
 #include <map>
+#include <numeric>
 #include <stdexcept>
 #include <string_view>
 
@@ -386,6 +387,7 @@ const Grammar& grammar_of(int level)
 struct Running
 {
     Places at;             ///< where it may be
+    std::size_t first = 0; ///< place of its first line
     std::size_t last = 0;  ///< place of its last line
     bool finished = false; ///< it may end there
 };
@@ -421,9 +423,10 @@ private:
     Knowledge m_knowledge;
     std::vector<Running> m_running; ///< the one that printed last at the end
     Calls m_calls;
-    bool m_goes_on = false; ///< the line that was taken is not the first of its call
-    bool m_anywhere = true; ///< the next line may stand in the middle of a call: the capture begins there
-    bool m_outer = true;    ///< a call may have been running there that has printed nothing since
+    std::size_t m_before = 0; ///< place of the line before that some call prints in a known order
+    bool m_goes_on = false;   ///< the line that was taken is not the first of its call
+    bool m_anywhere = true;   ///< the next line may stand in the middle of a call: the capture begins there
+    bool m_outer = true;      ///< a call may have been running there that has printed nothing since
 };
 
 /** What is missing at one place is one gap. */
@@ -474,9 +477,13 @@ void Follower::look(std::size_t place)
 Calls Follower::follow()
 {
     std::size_t boot = 0;
+    m_calls.is_known.resize(m_log.order.size());
+    m_calls.begins.resize(m_log.order.size());
+    std::iota(m_calls.begins.begin(), m_calls.begins.end(), std::size_t{ 0 });
     for (std::size_t place = 0; place < m_log.order.size(); ++place)
     {
         const Item& one = item(place);
+        m_calls.is_known[place] = m_grammar.knows(one);
         if (one.boot != boot)
         {
             m_running.clear(); // whatever ran is over
@@ -487,6 +494,8 @@ Calls Follower::follow()
             begin_anywhere(); // it may be any of several
         else if (m_grammar.knows(one))
             take(place);
+        if (m_grammar.knows(one))
+            m_before = place;
         if (one.cut == Item::Cut::None)
             look(place);
     }
@@ -532,7 +541,9 @@ void Follower::go_on_later(std::size_t place, Places at)
 {
     tell_gap(place, m_grammar.next_of(m_running.back().at));
     const bool finished = m_grammar.may_end(at);
-    m_running.back() = { std::move(at), place, finished };
+    const std::size_t first = m_running.back().first;
+    m_running.back() = { std::move(at), first, place, finished };
+    m_calls.begins[place] = first;
 }
 
 /** The beginning of a call is not in the log. */
@@ -547,7 +558,7 @@ void Follower::begin_within(std::size_t place)
     m_outer = m_outer && m_anywhere;
     give_up_all();
     const bool finished = m_grammar.may_end(at);
-    m_running.push_back({ std::move(at), place, finished });
+    m_running.push_back({ std::move(at), place, place, finished });
 }
 
 /** Whether a line goes on with a call that runs, the last one first. */
@@ -562,11 +573,18 @@ bool Follower::goes_on(std::size_t place)
         Places at = m_grammar.going_on(call.at, item(place));
         if (at.empty())
             continue;
-        if (call.finished) // then it may be another one's, too
-            merge(at, m_grammar.matching(m_grammar.begins(), item(place)));
+        if (call.finished) // then it may be another one's, and is when others came between
+        {
+            const Places begins = m_grammar.matching(m_grammar.begins(), item(place));
+            if (call.last != m_before && !begins.empty())
+                continue;
+            merge(at, begins);
+        }
+        const std::size_t first = call.first;
         m_running.erase(m_running.begin() + static_cast<std::ptrdiff_t>(back));
         const bool finished = m_grammar.may_end(at);
-        m_running.push_back({ std::move(at), place, finished });
+        m_running.push_back({ std::move(at), first, place, finished });
+        m_calls.begins[place] = first;
         return true;
     }
     return false;
@@ -604,7 +622,7 @@ void Follower::begin(std::size_t place, Places at)
         m_running.erase(m_running.begin());
     }
     const bool finished = m_grammar.may_end(at);
-    m_running.push_back({ std::move(at), place, finished });
+    m_running.push_back({ std::move(at), place, place, finished });
 }
 
 void Follower::begin_anywhere()

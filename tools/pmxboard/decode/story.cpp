@@ -48,6 +48,7 @@ struct Teller
     void open(const Item& item, std::vector<std::string_view> operations, std::string title);
     void join(const Item& item, std::string detail);
     void join_or_open(const Item& item, std::string detail);
+    bool go_on(const Item& item, const std::string& detail);
     void close();
 
     const Item& at(std::size_t other) const { return log.items[log.order[other]]; }
@@ -66,6 +67,7 @@ struct Teller
     const Log& log;
     Calls calls;
     std::size_t gaps_told = 0;
+    std::size_t gap_since = 0; ///< the place behind the last of them
     std::size_t twice_told = 0;
     std::size_t boots_told = 0;
     Story story;
@@ -128,8 +130,22 @@ void Teller::join_or_open(const Item& item, std::string detail)
 {
     if (joins(item))
         join(item, std::move(detail));
-    else
+    else if (!go_on(item, detail))
         open(item, split(item.text->operations), detail.empty() ? std::string(item.text->step) : std::move(detail));
+}
+
+/** Goes on with a call that another one has interrupted. */
+bool Teller::go_on(const Item& item, const std::string& detail)
+{
+    const std::size_t begin = calls.begins[index];
+    if (begin == index || gap_since > begin)
+        return false;
+    const Item& first = at(begin);
+    open(item, { split(first.text->operations).front() },
+         "the call of line " + std::to_string(first.line) + " goes on");
+    if (!detail.empty())
+        event().details.push_back(detail);
+    return true;
 }
 
 void Teller::close()
@@ -233,6 +249,7 @@ void Teller::tell_gap(const Gap& gap)
         if (*lasting)
             (*lasting)->sure = false;
     }
+    gap_since = gap.at;
     last = nullptr;
     returning = false;
 }
@@ -465,6 +482,10 @@ void rules::ready(Teller& story, const Item& item)
         story.join(item, {});
         if (is_ready)
             story.close();
+    }
+    else if (story.go_on(item, {}))
+    {
+        return;
     }
     else if (!is_ready && story.is_next(held_back)) // nobody but a mode change goes on so
     {

@@ -6,6 +6,7 @@
 
 #include "fuzz/support/holds.h"
 #include "tools/pmxboard/decode/show.h"
+#include "tools/pmxboard/decode/to_scenario.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
@@ -21,5 +22,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     std::ostringstream programs;
     show_json(programs, log, story, {}, options.name);
     fuzz::must_be_json(programs.str());
+    std::ostringstream scenario;
+    write_scenario(scenario, log, options.name);
+    fuzz::must_be_fit(scenario.str());
     return 0;
 }

@@ -266,11 +266,41 @@ TEST_F(DecodeProgram, WhatScenariosPrint_DoesNotDepartFromThem)
     }
 }
 
+TEST_F(DecodeProgram, ToScenario_WritesOneThatPrintsTheSame)
+{
+    const std::string made = run("decode --to-scenario -", captured()).out;
+    for (const char* const part : { "\npower-on\nloglevel 9\n", "\nPMX_Init\n",
+                                    "\nPMX_SetModeEx 0 [ [0, RES_480I], [1, RES_1080P60HZ], [1, RES_480P], [1, "
+                                    "RES_480I] ] 60 DRV_NON_EXT_CHIP 0\n" })
+        EXPECT_NE(std::string::npos, made.find(part)) << part << made;
+    std::ofstream(file("made.pmx")) << made;
+    const Ended ended = run("decode --against '" + file("made.pmx") + "' -", captured());
+    EXPECT_EQ(0, ended.code) << ended.out << ended.err;
+}
+
+TEST_F(DecodeProgram, ToScenario_SaysWhatTheLogLeavesOpen)
+{
+    const std::string low = "# The log has no line of level 9";
+    const std::string made = run("decode --to-scenario -", "Plane 1_2 Swap\nHD Exist(1)\n").out;
+    EXPECT_EQ(std::string::npos, made.find(low)) << made;
+    for (const char* const part : { "# whether swapped or swapped back",
+                                    "# line 2 belongs to a call that the log does not show: HD Exist(1)\n" })
+        EXPECT_NE(std::string::npos, made.find(part)) << part << made;
+    EXPECT_NE(std::string::npos, run("decode --to-scenario -", "PMX_Stop\n").out.find(low));
+}
+
+TEST_F(DecodeProgram, TraceForAViewer_IsRefusedByItsName)
+{
+    const Ended ended = run("decode -", "{\"displayTimeUnit\":\"ms\",\"traceEvents\":[\n");
+    EXPECT_EQ(2, ended.code);
+    EXPECT_NE(std::string::npos, ended.err.find("is a trace for a viewer")) << ended.err;
+}
+
 TEST_F(DecodeProgram, WrongUse_ExitsTwoWithAReason)
 {
     for (const char* const arguments :
-         { "decode", "decode no-such.log", "decode scenarios", "decode --level 9 -", "decode --color mauve -",
-           "decode --against scenarios/first-mode-after-boot.pmx -",
+         { "decode", "decode --to-scenario --json -", "decode no-such.log", "decode scenarios", "decode --level 9 -",
+           "decode --color mauve -", "decode --against scenarios/first-mode-after-boot.pmx -",
            "decode --against no-such.pmx tests/decode/player.log" })
     {
         const Ended ended = run(arguments, "nothing of the layer\n");

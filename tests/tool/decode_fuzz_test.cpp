@@ -9,6 +9,7 @@
 #include <sstream>
 
 #include "tools/pmxboard/decode/show.h"
+#include "tools/pmxboard/decode/to_scenario.h"
 #include "tools/pmxboard/text/printable.h"
 
 namespace
@@ -26,6 +27,7 @@ std::string everything_shown(const std::string& bytes)
     std::ostringstream out;
     decode::show_log(out, log, story, options);
     decode::show_json(out, log, story, {}, options.name);
+    decode::write_scenario(out, log, options.name);
     return out.str();
 }
 

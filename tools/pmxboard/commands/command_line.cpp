@@ -199,8 +199,7 @@ void add_decode(CLI::App& app, Chosen& chosen)
     CLI::App* const sub = app.add_subcommand(
         "decode", "Read a captured console log: what the layer did, and where it departs from a scenario.");
     sub->add_option("FILE", decode->file, "A log; - reads the standard input");
-    sub->add_option("--against", decode->against,
-                    "Show where it departs from what the layer prints in this scenario")
+    sub->add_option("--against", decode->against, "Show where it departs from what the layer prints in this scenario")
         ->type_name("SCENARIO");
     sub->add_option("--level", decode->level,
                     "Compare lines of this level of PMX_IsLog and below; else the highest that the log shows")
@@ -211,8 +210,11 @@ void add_decode(CLI::App& app, Chosen& chosen)
                     "Board for the scenario: a name under boards/, a directory or a .toml file")
         ->needs("--against")
         ->type_name("NAME|FILE");
+    sub->add_flag("--to-scenario", decode->to_scenario,
+                  "Write a scenario that prints the same, as far as the log tells")
+        ->excludes("--against");
     sub->add_flag("--texts", decode->texts, "Show every text that the layer prints, with operation and step");
-    sub->add_flag("--json", decode->json, "JSON for programs");
+    sub->add_flag("--json", decode->json, "JSON for programs")->excludes("--to-scenario");
     add_colour(sub, decode->colour);
     sub->add_flag("-q,--quiet", decode->quiet, "Show problems only; with --against a departure only");
     sub->add_flag("-v,--verbose", decode->verbose, "Show every line, with operation and step");

@@ -6,6 +6,7 @@
 #include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/decode/show.h"
+#include "tools/pmxboard/decode/to_scenario.h"
 #include "tools/pmxboard/decode/trace_lines.h"
 #include "tools/pmxboard/text/paint.h"
 
@@ -30,6 +31,11 @@ int decode_file(const DecodeOptions& options)
         return usage_error(options.file + " is a trace for a viewer, which has no console; decode reads a log, or the "
                                           "trace format jsonl");
     const decode::Log log = decode::read_log(bytes);
+    if (options.to_scenario)
+    {
+        decode::write_scenario(std::cout, log, options.file == "-" ? "the standard input" : options.file);
+        return exit_done;
+    }
     std::optional<decode::Comparison> comparison;
     if (!options.against.empty())
     {

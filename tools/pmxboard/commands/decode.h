@@ -17,6 +17,7 @@ struct DecodeOptions
     std::optional<int> level;
     std::string colour = "auto";
     bool texts = false;
+    bool to_scenario = false;
     bool json = false;
     bool quiet = false;
     bool verbose = false;

@@ -124,7 +124,9 @@ const char* const decode_examples = R"(Examples:
   pmxboard decode --verbose tests/decode/player.log
       every line first, with the operation and the step that it comes from
   pmxboard decode --against scenarios/first-mode-after-boot.pmx tests/decode/first-mode.log
-      where it departs first from what the layer prints in that situation
+      where it departs from what the layer prints in that situation
+  pmxboard decode --to-scenario tests/decode/first-mode.log >first-mode.pmx
+      a scenario that prints the same
   pmxboard run scenarios/display-part-never-answers.pmx | pmxboard decode -
       the story of a scenario
   pmxboard decode --json tests/decode/player.log >decoded.json

@@ -96,7 +96,20 @@ def console_of(tool, path):
     return tool.output("run", path, may_fail=True)
 
 
+def damaged(tool):
+    """What serial consoles and those who capture them make of a log, and what somebody takes for one."""
+    path = SCENARIOS[0].with_name("display-part-never-answers.pmx")
+    lines = console_of(tool, path).splitlines(keepends=True)
+    yield "reboot", b"".join([*lines[:-9], b"U-Boot 2011.03 (Mar 01 2011)\n", *lines])
+    yield "twice", b"".join(line + line for line in lines)
+    yield "displaced", b"".join(second + first for first, second in zip(lines[::2], lines[1::2]))
+    yield "stamped", b"".join(b"Nov 22 12:34:56 player kernel: [%12.6f] " % (1 + place / 1000) + line
+                              for place, line in enumerate(reversed(lines)))
+    yield "jsonl", tool.output("run", "--trace-format", "jsonl", path)
+
+
 def logs(tool):
+    yield from damaged(tool)
     for path in LOGS:
         yield path.stem, path.read_bytes()
     for path in SCENARIOS[::4]:

@@ -482,12 +482,13 @@ def refused(held, event, _):
 
 
 def goes_on(held, event, words):
-    """Of a mode change: the line that is named and those of the event were printed by one call."""
+    """Of a mode change: the line that is named and those of the event were printed by one call, unless some are lost
+    in between: then the call would have gone on so."""
     begin = held.source(int(re.search(r"line (\d+)", words)[1]))
     if event["operation"] != "PMX_SetModeEx":
         return begin is not None
     calls = {begin_of_change(held.boot_of(line), line.index) for _, line in held.sources(event)}
-    return begin is not None and calls == {begin_of_change(held.boot_of(begin), begin.index)}
+    return held.console.damaged or calls == {begin_of_change(held.boot_of(begin), begin.index)}
 
 
 def without_begin(held, _event, _words):
@@ -522,7 +523,7 @@ STATEMENTS = [(re.compile(pattern), test) for pattern, test in (
     (r"OSD plane \d+ stops", by_operation("PMX_OsdDisabled")),
     (r"refused by the capability word; nothing was set", refused),
     (r"nothing here lets graphics back", nothing_back_here),
-    (r"the call of line \d+ goes on", goes_on),
+    (r"goes on, as the call of line \d+ does", goes_on),
     (r"a mode change, of which the log has the end", without_begin),
 )]
 

@@ -245,7 +245,8 @@ TEST(DecodeStory, WhatCannotBe_IsNamedAGap)
         { lines_held_back + "[   60.000000] eth0: link up\n", "\"PMX timeout.\"" },
         { lines_start + "[PMX] fgPMX_DisplayModeReady is 1.\n", "\"Display Format Change :1\"" },
         { lines_start + "PMX_SetOsdEnable.\nSet Osd Enable :0.\n", "\"Set Osd Enable :1\"" },
-        { lines_start + "[PMX] Master Color Space change from 0 to 1.\n", "another change of the master colour space" },
+        { "CC_A disable\nPMX_Init\n" + lines_start + "[PMX] Master Color Space change from 0 to 1.\n",
+          "another change of the master colour space" },
         { lines_start + "HD Exist(1)\n", "what leads to \"HD Exist(1)\"" },
         { lines_start + "SetModeEx\nCCIR(0, RES_480I)\nSetModeEx\n", "\"HDMI(%d, %s)\" of PMX_SetModeEx" },
         { lines_start + "SetModeEx\nCCIR(0, RES_480I)\nDisplay Format Change Timer Set.\n", "\"HDMI(%d, %s)\"" },
@@ -254,6 +255,15 @@ TEST(DecodeStory, WhatCannotBe_IsNamedAGap)
         EXPECT_THAT(told(one.lines), testing::HasSubstr("missing")) << one.lines;
     for (const Hole& one : holes)
         EXPECT_THAT(told(one.lines), testing::HasSubstr(one.what)) << one.lines;
+}
+
+TEST(DecodeStory, ALevelThatIsRaised_IsNoGap)
+{
+    const std::string start = told("TESTPMX: Get pard ID:0.\nTESTPMX: Get Test Data :12, 0x       c.\n"
+                                   "[PMX]_arPmxConf[ucPmxId].ucMode=12\n[PMX] create a timer \nSetModeEx\n"
+                                   "[PMX] Master Color Space change from 0 to 1.\nMode(9), eMixerOutCS(1)\n"
+                                   "CC_A disable\nScaler CC disable\n");
+    EXPECT_THAT(start, testing::Not(testing::HasSubstr("missing")));
 }
 
 TEST(DecodeStory, BehindAGap_WhatLastedIsAssumed)
@@ -270,9 +280,10 @@ TEST(DecodeStory, ADoubledLine_IsNotTwoEvents)
 {
     EXPECT_EQ("1-1 PMX_Stop: stopped: mutex, timer and registrations stay\n",
               told("[   1.000001] PMX_Stop\n[   1.000001] PMX_Stop\n"));
-    const std::string request = "SetModeEx\nSetModeEx\nCCIR(0, RES_480I)\nCCIR(0, RES_480I)\nHDMI(0, RES_480I)\n";
-    EXPECT_THAT(told(request), testing::StartsWith("1-5 PMX_SetModeEx: mode change requested: digital port off, HDMI "
-                                                   "off\n"));
+    const std::string request =
+        "CC_A disable\nSetModeEx\nSetModeEx\nCCIR(0, RES_480I)\nCCIR(0, RES_480I)\nHDMI(0, RES_480I)\n";
+    EXPECT_THAT(told(request), testing::HasSubstr("2-6 PMX_SetModeEx: mode change requested: digital port off, HDMI "
+                                                  "off\n"));
 }
 
 TEST(DecodeStory, LinesOutOfOrder_AreTakenByTheirStamps)
@@ -281,6 +292,13 @@ TEST(DecodeStory, LinesOutOfOrder_AreTakenByTheirStamps)
                                    "[   10.000500] Display Format Change Timer Set.\n"
                                    "[   10.000400] [PMX] VDP_SetClearVideo & Not Mix OSD..\n")
                                   .substr(0, told_held_back.size()));
+}
+
+TEST(DecodeStory, ATraceWhoseFirstLineIsCut_IsOne)
+{
+    EXPECT_EQ(
+        "2-2 PMX_Stop: stopped: mutex, timer and registrations stay\n",
+        told("ogram\":0}\n{\"sequence\":7,\"time_us\":5,\"kind\":\"log\",\"level\":1,\"text\":\"PMX_Stop\\n\"}\n"));
 }
 
 TEST(DecodeStory, ATraceInJsonLines_IsReadAsItsConsole)

@@ -227,7 +227,7 @@ private:
     std::size_t m_call = 0;
 };
 
-/** All calls, as a console of some level shows them: what it does not print is passed over. */
+/** All calls, as a console shows them that prints at least some level: the rest may be passed over. */
 class Grammar
 {
 public:
@@ -250,56 +250,68 @@ public:
     Places going_on(const Places& at, const Item& item) const;
 
 private:
-    void pass_over(int level);
+    void pass_over();
+    bool is_silent(std::uint16_t place) const { return m_steps[place].text->level > m_level; }
 
+    int m_level;
     std::vector<Step> m_steps;
     Places m_begins;
     std::map<const Text*, Places> m_by_text;
 };
 
-Grammar::Grammar(int level)
+/** The steps of all calls, as they are printed at the highest level, and those that begin one. */
+struct Written
 {
-    CallReader reader(m_steps);
+    std::vector<Step> steps;
+    Places begins;
+};
+
+Written read_shapes()
+{
+    Written written;
+    CallReader reader(written.steps);
     for (std::size_t call = 0; call < std::size(call_shapes); ++call)
     {
         const Piece piece = reader.read(call_shapes[call].says, call);
-        merge(m_begins, piece.begins);
+        merge(written.begins, piece.begins);
         for (const std::uint16_t end : piece.ends)
-            m_steps[end].last = true;
+            written.steps[end].last = true;
     }
-    pass_over(level);
-    for (std::size_t place = 0; place < m_steps.size(); ++place)
-    {
-        if (m_steps[place].text->level <= level)
-            m_by_text[m_steps[place].text].push_back(static_cast<std::uint16_t>(place));
-    }
+    return written;
 }
 
-/** The steps behind what is not printed come directly. Lists are in order, so that one way back through them is enough:
- *  only what repeats leads back, and that is printed at one level. */
-void Grammar::pass_over(int level)
+Grammar::Grammar(int level) : m_level(level)
 {
-    const auto is_silent = [&](std::uint16_t place) { return m_steps[place].text->level > level; };
-    const auto printed = [&](const Places& places) {
-        Places kept;
+    static const Written written = read_shapes();
+    m_steps = written.steps;
+    m_begins = written.begins;
+    pass_over();
+    for (std::size_t place = 0; place < m_steps.size(); ++place)
+        m_by_text[m_steps[place].text].push_back(static_cast<std::uint16_t>(place));
+}
+
+/** The steps behind what need not be printed may come directly. Lists are in order, so that one way back through them
+ *  is enough: only what repeats leads back, and that to itself. */
+void Grammar::pass_over()
+{
+    const auto reached = [this](const Places& places) {
+        Places all = places;
         for (const std::uint16_t place : places)
         {
             if (is_silent(place))
-                merge(kept, m_steps[place].next);
-            else
-                merge(kept, { place });
+                merge(all, m_steps[place].next);
         }
-        return kept;
+        return all;
     };
     for (std::size_t back = m_steps.size(); back-- > 0;)
     {
         Step& step = m_steps[back];
-        step.last = step.last || std::any_of(step.next.begin(), step.next.end(),
-                                             [&](std::uint16_t next) { return is_silent(next) && m_steps[next].last; });
-        std::erase_if(step.next, [&](std::uint16_t next) { return next == back && is_silent(next); });
-        step.next = printed(step.next);
+        step.last = step.last || std::any_of(step.next.begin(), step.next.end(), [this](std::uint16_t next) {
+                        return is_silent(next) && m_steps[next].last;
+                    });
+        step.next = reached(step.next);
     }
-    m_begins = printed(m_begins);
+    m_begins = reached(m_begins);
 }
 
 /** Whether its first value is as a step wants it: `=1`, `~0`. */
@@ -366,6 +378,8 @@ std::string Grammar::next_of(const Places& at) const
     std::vector<std::string> shown;
     for (const std::uint16_t place : follow(at))
     {
+        if (is_silent(place))
+            continue;
         std::string text = "\"" + std::string(visible(m_steps[place].text->format)) + "\"";
         if (std::find(shown.begin(), shown.end(), text) == shown.end())
             shown.push_back(std::move(text));
@@ -396,11 +410,7 @@ struct Running
 class Follower
 {
 public:
-    explicit Follower(const Log& log)
-        : m_log(log), m_grammar(grammar_of(log.level.value_or(level_plain))),
-          m_knowledge(log.level.value_or(level_plain))
-    {
-    }
+    explicit Follower(const Log& log) : m_log(log), m_grammar(&grammar_of(level_plain)), m_knowledge(level_plain) {}
     Calls follow();
 
 private:
@@ -417,9 +427,12 @@ private:
     void tell_gap(std::size_t place, std::string what);
     void look(std::size_t place);
     bool is_in_mode_change() const;
+    void take_level(int level);
 
     const Log& m_log;
-    const Grammar& m_grammar;
+    int m_level = level_plain; ///< of the console, as far as the lines tell: who captures a log raises it
+    const Grammar* m_grammar;
+    const Grammar* m_lower = nullptr; ///< of the level that it had until this line
     Knowledge m_knowledge;
     std::vector<Running> m_running; ///< the one that printed last at the end
     Calls m_calls;
@@ -453,7 +466,7 @@ bool Follower::is_in_mode_change() const
 {
     if (m_running.empty())
         return false;
-    const std::string_view call = m_grammar.call_of(m_running.back().at);
+    const std::string_view call = m_grammar->call_of(m_running.back().at);
     return call == "PMX_SetModeEx" || call == "PMX_SetMode";
 }
 
@@ -474,6 +487,14 @@ void Follower::look(std::size_t place)
     }
 }
 
+void Follower::take_level(int level)
+{
+    m_lower = m_grammar;
+    m_level = std::max(m_level, level);
+    m_grammar = &grammar_of(m_level);
+    m_knowledge.set_level(m_level);
+}
+
 Calls Follower::follow()
 {
     std::size_t boot = 0;
@@ -483,18 +504,20 @@ Calls Follower::follow()
     for (std::size_t place = 0; place < m_log.order.size(); ++place)
     {
         const Item& one = item(place);
-        m_calls.is_known[place] = m_grammar.knows(one);
+        m_calls.is_known[place] = m_grammar->knows(one);
         if (one.boot != boot)
         {
+            m_level = level_plain;
             m_running.clear(); // whatever ran is over
             m_knowledge.forget();
         }
         boot = one.boot;
+        take_level(one.text->level);
         if (one.cut != Item::Cut::None)
             begin_anywhere(); // it may be any of several
-        else if (m_grammar.knows(one))
+        else if (m_grammar->knows(one))
             take(place);
-        if (m_grammar.knows(one))
+        if (m_grammar->knows(one))
             m_before = place;
         if (one.cut == Item::Cut::None)
             look(place);
@@ -506,7 +529,7 @@ Calls Follower::follow()
     }
     if (!m_running.empty() && !m_running.back().finished && m_log.end_boot == boot)
     {
-        m_calls.unfinished = m_grammar.next_of(m_running.back().at);
+        m_calls.unfinished = m_grammar->next_of(m_running.back().at);
         m_running.pop_back();
     }
     give_up_all();
@@ -523,9 +546,9 @@ void Follower::take(std::size_t place)
     if (m_goes_on)
         return;
     const bool expects_another = !m_running.empty() && !m_running.back().finished;
-    Places at = m_grammar.matching(m_grammar.begins(), one);
-    Places later =
-        expects_another && !at.empty() && m_grammar.is_part(at) ? m_grammar.later(m_running.back().at, one) : Places();
+    Places at = m_grammar->matching(m_grammar->begins(), one);
+    Places later = expects_another && !at.empty() && m_grammar->is_part(at) ? m_grammar->later(m_running.back().at, one)
+                                                                            : Places();
     if (stands_twice(place) && (expects_another || at.empty()))
         m_calls.twice.push_back(place);
     else if (!later.empty())
@@ -539,8 +562,8 @@ void Follower::take(std::size_t place)
 /** Lines of the call that runs are not in the log. */
 void Follower::go_on_later(std::size_t place, Places at)
 {
-    tell_gap(place, m_grammar.next_of(m_running.back().at));
-    const bool finished = m_grammar.may_end(at);
+    tell_gap(place, m_grammar->next_of(m_running.back().at));
+    const bool finished = m_grammar->may_end(at);
     const std::size_t first = m_running.back().first;
     m_running.back() = { std::move(at), first, place, finished };
     m_calls.begins[place] = first;
@@ -550,14 +573,14 @@ void Follower::go_on_later(std::size_t place, Places at)
 void Follower::begin_within(std::size_t place)
 {
     const Item& one = item(place);
-    Places at = m_grammar.every(one);
+    Places at = m_grammar->every(one);
     if (at.empty())
         return;
     if (!m_anywhere && !m_outer)
         tell_gap(place, "what leads to \"" + one.shown + "\"");
     m_outer = m_outer && m_anywhere;
     give_up_all();
-    const bool finished = m_grammar.may_end(at);
+    const bool finished = m_grammar->may_end(at);
     m_running.push_back({ std::move(at), place, place, finished });
 }
 
@@ -570,19 +593,21 @@ bool Follower::goes_on(std::size_t place)
         const std::optional<double> passed = between(item(call.last).moment, item(place).moment);
         if (passed && *passed > longest_pause)
             continue;
-        Places at = m_grammar.going_on(call.at, item(place));
+        Places at = m_grammar->going_on(call.at, item(place));
+        if (at.empty())
+            at = m_lower->going_on(call.at, item(place));
         if (at.empty())
             continue;
         if (call.finished) // then it may be another one's, and is when others came between
         {
-            const Places begins = m_grammar.matching(m_grammar.begins(), item(place));
+            const Places begins = m_grammar->matching(m_grammar->begins(), item(place));
             if (call.last != m_before && !begins.empty())
                 continue;
             merge(at, begins);
         }
         const std::size_t first = call.first;
         m_running.erase(m_running.begin() + static_cast<std::ptrdiff_t>(back));
-        const bool finished = m_grammar.may_end(at);
+        const bool finished = m_grammar->may_end(at);
         m_running.push_back({ std::move(at), first, place, finished });
         m_calls.begins[place] = first;
         return true;
@@ -602,7 +627,7 @@ bool Follower::stands_twice(std::size_t place) const
 
 void Follower::begin(std::size_t place, Places at)
 {
-    const std::string_view call = m_grammar.call_of(at);
+    const std::string_view call = m_grammar->call_of(at);
     if (call == start_up || call == boot_mode) // of another run, it may be: what ran was broken off
     {
         m_running.clear();
@@ -611,7 +636,7 @@ void Follower::begin(std::size_t place, Places at)
     for (std::size_t back = m_running.size(); back-- > 0;)
     {
         const std::optional<double> passed = between(item(m_running[back].last).moment, item(place).moment);
-        if (m_grammar.call_of(m_running[back].at) != call && !(passed && *passed > longest_pause))
+        if (m_grammar->call_of(m_running[back].at) != call && !(passed && *passed > longest_pause))
             continue;
         give_up(m_running[back]); // nobody calls it from two places at a time, and none takes so long
         m_running.erase(m_running.begin() + static_cast<std::ptrdiff_t>(back));
@@ -621,7 +646,7 @@ void Follower::begin(std::size_t place, Places at)
         give_up(m_running.front());
         m_running.erase(m_running.begin());
     }
-    const bool finished = m_grammar.may_end(at);
+    const bool finished = m_grammar->may_end(at);
     m_running.push_back({ std::move(at), place, place, finished });
 }
 
@@ -636,7 +661,7 @@ void Follower::give_up(const Running& call)
 {
     if (!call.finished)
     {
-        tell_gap(call.last + 1, m_grammar.next_of(call.at));
+        tell_gap(call.last + 1, m_grammar->next_of(call.at));
         m_calls.gaps.back().is_end = true;
     }
 }

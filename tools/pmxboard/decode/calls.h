@@ -26,8 +26,8 @@ struct Calls
 {
     std::vector<Gap> gaps;                 ///< in the order of the log
     std::vector<std::size_t> twice;        ///< places of lines that can only be there because lines were doubled
-    std::vector<std::size_t> begins;     ///< of each place that where its call begins, as far as the log has it
-    std::vector<bool> is_known;          ///< of each place, whether some call prints it in a known order
+    std::vector<std::size_t> begins;       ///< of each place that where its call begins, as far as the log has it
+    std::vector<bool> is_known;            ///< of each place, whether some call prints it in a known order
     std::optional<std::string> unfinished; ///< what must come behind the last line
 };
 

@@ -36,6 +36,15 @@ bool fits_timer(double seconds, double exact)
     return std::abs(seconds - timer_seconds) <= timer_slack + exact;
 }
 
+void Knowledge::set_level(int level)
+{
+    if (m_level < level_of_master && level >= level_of_master)
+        m_master.reset();
+    if (m_level < level_of_mode && level >= level_of_mode)
+        m_mode.reset();
+    m_level = level;
+}
+
 void Knowledge::forget()
 {
     *this = Knowledge(m_level);

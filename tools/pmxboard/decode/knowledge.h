@@ -24,6 +24,8 @@ class Knowledge
 public:
     /** @param level  the console's: what it does not print may have happened */
     explicit Knowledge(int level) : m_level(level) {}
+    /** It may be raised: what it did not show until then may have happened. */
+    void set_level(int level);
 
     /** Takes a line, and tells what must have stood before it; nothing when it fits. `goes_on`: it is not the first of
      *  its call; `in_mode_change`: the call sets a mode. */

@@ -142,7 +142,7 @@ bool Teller::go_on(const Item& item, const std::string& detail)
         return false;
     const Item& first = at(begin);
     open(item, { split(first.text->operations).front() },
-         "the call of line " + std::to_string(first.line) + " goes on");
+         "goes on, as the call of line " + std::to_string(first.line) + " does");
     if (!detail.empty())
         event().details.push_back(detail);
     return true;

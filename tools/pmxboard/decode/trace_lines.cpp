@@ -54,8 +54,14 @@ std::optional<std::string> printed_by(const board::Json& entry)
 
 bool is_trace_lines(std::string_view bytes)
 {
-    bytes.remove_prefix(std::min(bytes.find_first_not_of(" \r\n"), bytes.size()));
-    return bytes.starts_with(first_key);
+    constexpr int within = 3; // lines: the first may be cut, or somebody else's
+    for (int line = 0; line < within && !bytes.empty(); ++line)
+    {
+        if (bytes.starts_with(first_key))
+            return true;
+        bytes.remove_prefix(std::min(bytes.find('\n'), bytes.size() - 1) + 1);
+    }
+    return false;
 }
 
 bool is_viewer_trace(std::string_view bytes)

@@ -59,17 +59,32 @@ def layer_functions(sources):
     return bodies
 
 
-def reasons_of(operation, bodies):
-    """(reason, function, file, line) of all that an operation can give."""
-    reached, ahead, found = set(), [operation], []
+def reached_from(operation, bodies, stops=frozenset()):
+    """The functions that an operation calls, itself included; not beyond those that stop it."""
+    reached, ahead = set(), [operation]
     while ahead:
         name = ahead.pop()
-        if name in reached or name not in bodies:
+        if name in reached or name not in bodies or (name in stops and name != operation):
             continue
         reached.add(name)
-        own, calls = bodies[name]
-        found += [(reason, name, file, line) for reason, file, line in own]
-        ahead += sorted(calls)
+        ahead += sorted(bodies[name][1])
+    return reached
+
+
+def hands_on(operation, bodies, operations):
+    """The operation that another one is nothing but a call of, or itself."""
+    own, calls = bodies[operation]
+    called = sorted(calls & operations)
+    is_adaptor = operation.startswith(("i4Pmx", "d_PMX_")) and len(called) == 1 and not own
+    return called[0] if is_adaptor else operation
+
+
+def reasons_of(operation, bodies, operations):
+    """(reason, function, file, line, whether it is the operation's own) of all that an operation can give. Those of
+    another operation that it calls on its way are not its own."""
+    own = reached_from(hands_on(operation, bodies, operations), bodies, operations)
+    found = [(reason, name, file, line, name in own) for name in reached_from(operation, bodies)
+             for reason, file, line in bodies[name][0]]
     return sorted(found, key=lambda place: place[2:])
 
 
@@ -79,11 +94,12 @@ def main(output, *sources):
              "#include <map>", "", "namespace pmxboard", "{", "",
              "std::span<const ReasonPlace> reasons_of(std::string_view operation)", "{",
              "    static const std::map<std::string_view, std::vector<ReasonPlace>> places = {"]
+    operations = {function.name for function in functions(ROOT / LAYER_HEADER)}
     for function in functions(ROOT / LAYER_HEADER):
         if function.name not in bodies:
             raise SystemExit(f"{LAYER_HEADER}:{function.line}: {function.name} has no body in {LAYER}")
-        rows = "".join(f'\n            {{ PMX_REASON_{reason}, "{name}", "{file}", {line} }},'
-                       for reason, name, file, line in reasons_of(function.name, bodies))
+        rows = "".join(f'\n            {{ PMX_REASON_{reason}, "{name}", "{file}", {line}, {str(own).lower()} }},'
+                       for reason, name, file, line, own in reasons_of(function.name, bodies, operations))
         lines.append(f'        {{ "{function.name}", {{{rows} }} }},')
     lines += ["    };", "    const auto found = places.find(operation);",
               "    return found == places.end() ? std::span<const ReasonPlace>() : found->second;", "}", "",

@@ -75,7 +75,11 @@ def complaints(root):
     for name, number in named.items():
         if name not in known:
             yield f"{NUMBERS}: append \"{number} {name}\": a number that was given stays"
+    header = (root / HEADER).read_text(encoding="utf-8")
+    kinds_known = set(re.findall(r"X\((\w+)\)", header[header.index("PMX_REASON_KINDS"):header.index("PMX_REASONS_KNOWN")]))
     for _, name, _, kinds, sentence in table:
+        if not kinds_known.issuperset(kinds):
+            yield f"{HEADER}: {name}: its values are of no known kind: {kinds}"
         wanted = [SHOWN_AS.get(kind, "u") for kind in kinds if kind != "NONE"]
         if CONVERSION.findall(sentence) != wanted:
             yield f"{HEADER}: {name}: the sentence shows {CONVERSION.findall(sentence)}, its values are {wanted}"

@@ -4,6 +4,7 @@
 
 #include <unistd.h>
 
+#include <algorithm>
 #include <filesystem>
 #include <fstream>
 #include <set>
@@ -73,12 +74,12 @@ const Told each_reason[] = {
       { "PMX_SetMode 0 RES_1080I50HZ 50 0" } },
     { { "poke u4Capability 0x7FFBBFFF" },
       "PMX_SetMode 0 RES_1080P29_97HZ 29 0",
-      { "capability bit 14 is clear in 0x7FFBBFFF" },
+      { "capability bit 14 (RES_1080P29_97HZ, RES_3D_1080P23HZ_TB) is clear in 0x7FFBBFFF" },
       { "PMX_SetMode 0 RES_1080P30HZ 30 0" } },
     { { "poke u4Capability 0x7FFBFDFF" },
       "outputs hdmi=1080p50 composite=576i",
       { "output PMX_OUTPUT_HDMI (1) is the first that is on, and gives the mixer mode RES_1080P50HZ (13)",
-        "capability bit 9 is clear in 0x7FFBFDFF" },
+        "capability bit 9 (RES_1080P50HZ) is clear in 0x7FFBFDFF" },
       { "outputs hdmi=1080p60 composite=576i" } },
     { { "PMX_Init" },
       "PMX_SetModeEx 0 [[0],[0,RES_2160P],[0],[0]] 60 0 0",
@@ -92,13 +93,13 @@ const Told each_reason[] = {
     { {},
       "PMX_EnableVideoPlane 0 2",
       { "video plane 2 is not switched here: plane 1 sits in the second mixer plane" },
-      { "PMX_EnableVideoPlane 0 1" } },
+      {} },
     { {}, "PMX_Printf 3 \"text\"", { "level 3 is not admitted by the bits 0x00000000" }, {} },
     { {}, "PMX_Printf -1 \"text\"", { "level -1 is not admitted by the bits 0x00000000" }, {} },
     { {},
       "i4Pmx_Connect PMX_COMP_TYPE_PMX 0 PMX_COMP_TYPE_OSD 9",
       { "a component of type PMX_COMP_TYPE_OSD (176) with id 9 has no input port" },
-      { "i4Pmx_Connect PMX_COMP_TYPE_PMX 0 PMX_COMP_TYPE_OSD 5" } },
+      {} },
     { {},
       "PMX_VdpEnabled 0 1 720 576 1",
       { "nobody has connected video plane 1: port 1 (second video) is empty" },
@@ -116,7 +117,7 @@ const Told each_reason[] = {
       { "the mixer hardware cannot report its order" },
       {} },
     { {}, "PMX_SetPlaneOrder 0 1 8", { "there is no position 8: the last one is 7" }, { "PMX_SetPlaneOrder 0 1 7" } },
-    { {}, "PMX_GetSwapEnable 0 0", { "there is no swap 0: they are 1 to 6" }, { "PMX_GetSwapEnable 0 1" } },
+    { {}, "PMX_GetSwapEnable 0 0", { "there is no swap 0: they are 1 to 6" }, {} },
     { {},
       "PMX_SetTVSystem 0 59 1",
       { "no TV system has 59 Hz: they have 24, 25, 30, 50 or 60" },
@@ -137,14 +138,8 @@ const Told each_reason[] = {
       "PMX_SetDigitalOutRgb 0 5",
       { "HDMI has no code for colour format 5: the last one is 4" },
       { "PMX_SetDigitalOutRgb 0 PLA_MXR_DIGITAL_OUTPUT_FMT_FULL_RGB" } },
-    { {},
-      "PMX_SetExternalChipSetting 99 0",
-      { "the external chip has no setting 99" },
-      { "PMX_SetExternalChipSetting PLA_MXR_EXT_DEEP_COLOR 0" } },
-    { {},
-      "PMX_VdpGetPlanePosition 0 2",
-      { "the hardware has no video plane 2: they are 0 and 1" },
-      { "PMX_VdpGetPlanePosition 0 1" } },
+    { {}, "PMX_SetExternalChipSetting 99 0", { "the external chip has no setting 99" }, {} },
+    { {}, "PMX_VdpGetPlanePosition 0 2", { "the hardware has no video plane 2: they are 0 and 1" }, {} },
     { {},
       "PMX_ColorSpaceSetup DRV_PMX_CS_RGB RES_480P",
       { "the mixer is never set up for colour space DRV_PMX_CS_RGB (2)" },
@@ -175,8 +170,19 @@ const Told each_reason[] = {
       {} },
     { { "PMX_Init", "PMX_SetMode 0 RES_720P50HZ 50 0" },
       "PMX_SetMode 0 RES_720P50HZ 50 0",
-      { "the mixer's format stays (HDMI changed: 0, TV encoders changed: 0)" },
+      { "mode RES_720P50HZ (9) at 50 Hz is what runs already: nothing is programmed" },
       {} },
+    { { "PMX_Init", held }, held, { "the mixer's format stays (HDMI changed: 0, TV encoders changed: 0)" }, {} },
+    { { "PMX_Init", "source osd2 connect", "source osd2 start 720x576 ycbcr" },
+      "source osd2 start 720x576 rgb",
+      { "port 4 (OSD 2) goes on counting as YCbCr graphics, whatever it is given now" },
+      {} },
+    { { "PMX_Init" }, "PMX_SetGamma 0 99", { "no gamma curve has the number 99: gamma is off" }, {} },
+    { {},
+      "PMX_SetTVSystem 0 400 1",
+      { "no TV system has 400 Hz: they have 24, 25, 30, 50 or 60" },
+      { "PMX_SetTVSystem 0 60 1" } },
+    { {}, "PMX_SetPlaneOrder 0 8 8", { "there is no position 8: the last one is 7" }, { "PMX_SetPlaneOrder 0 8 7" } },
     { { "PMX_Init" }, held, { "the first setting after start-up programs everything" }, {} },
     { { "PMX_Init", "sink unplug" }, held, { "nobody is waited for: no sink is there" }, {} },
     { { "PMX_Init", held }, held, { "nobody is waited for: HDMI was sent no change, and no display timer runs" }, {} },
@@ -199,7 +205,7 @@ const Told each_reason[] = {
       {} },
     { { "PMX_Init", "source vdp0 connect" },
       "source vdp0 start 720x576",
-      { "colour space DRV_PMX_CS_YCBCR_601 (0) comes from port 0 (main video)",
+      { "colour space DRV_PMX_CS_YCBCR_601 (0) is what port 0 (main video) asks for, over those before it",
         "the master colour space changes from DRV_PMX_CS_YCBCR_709 (1) to DRV_PMX_CS_YCBCR_601 (0)" },
       {} },
     { { "PMX_Init", "source vdp1 connect" },
@@ -247,6 +253,15 @@ TEST_F(Explain, EachReason_IsToldWithItsValuesAndWithWhatWouldBeAccepted)
         EXPECT_EQ(next, told.sentences.size()) << "what is missing stands not in:" << all;
         EXPECT_EQ(explanation.accepted, told.accepted);
         EXPECT_EQ(explanation.failure, "");
+        // Whatever is told of an operation was announced by `ops`.
+        const auto announced = pmxboard::reasons_of(told.command.substr(0, told.command.find(' ')));
+        for (const pmxboard::Reason& reason : explanation.reasons)
+        {
+            EXPECT_TRUE(announced.empty() ||
+                        std::any_of(announced.begin(), announced.end(),
+                                    [&](const auto& place) { return place.number == reason.number; }))
+                << pmxboard::sentence_of(reason);
+        }
     }
     for (const pmxboard::ReasonRow& row : pmxboard::reason_rows())
         EXPECT_TRUE(seen.contains(row.number)) << row.name << " is told by none of these";
@@ -272,7 +287,7 @@ TEST_F(Explain, ShowsPathPlaceAdviceAndWhatIsAccepted)
               "  refused: PMX_SetModeEx = 0\n"
               "  because  output PMX_OUTPUT_HDMI (1) is the first that is on, and gives the\n"
               "           mixer mode RES_1080P50HZ (13)  ");
-    EXPECT_NE(shown.find("  and      capability bit 9 is clear in 0x7FFBFDFF\n"
+    EXPECT_NE(shown.find("  and      capability bit 9 (RES_1080P50HZ) is clear in 0x7FFBFDFF\n"
                          "  at       PMX_CheckCap, src/driver/pmx/pmx_mode.cpp:"),
               shown.npos)
         << shown;
@@ -308,6 +323,28 @@ TEST_F(Explain, WorksWhileStoresAreShown_AndAfterAnotherPowerOn)
     EXPECT_NE(shown_by("explain PMX_Stop").find("the layer is not started"), std::string::npos);
 }
 
+/* What somebody else was refused on the way is told, and is no refusal. */
+
+TEST_F(Explain, WhatWasDone_IsNotCalledRefused)
+{
+    carry_out({ "PMX_Init", "PMX_SetSwapEnable 0 1 1" });
+    EXPECT_EQ(pmxboard::explain(m_session, "PMX_Reset 0").refusal(), nullptr);
+    carry_out({ "power-on", "PMX_Init", "display-part answer 3s", "fault x_timer_stop -1" });
+    EXPECT_EQ(pmxboard::explain(m_session, held).refusal(), nullptr);
+    carry_out({ "power-on", "fault i4ImRegisterInterface2 -5" });
+    EXPECT_EQ(pmxboard::explain(m_session, "PMX_Init").refusal(), nullptr);
+}
+
+TEST_F(Explain, WhatWasHandedOn_IsARefusal)
+{
+    carry_out({ "PMX_Init" });
+    for (const char* const command :
+         { "PMX_SetMode 0 RES_2160P 60 0", "i4PmxSetMode 0 RES_2160P 60 0",
+           "i4Pmx_Connect PMX_COMP_TYPE_PMX 0 PMX_COMP_TYPE_OSD 9", "PMX_VdpEnabled 0 9 1 1 1",
+           "i4PmxEnableVideoPlane 0 2", "PMX_SetCBEnable 0 0", "PMX_Init" })
+        EXPECT_NE(pmxboard::explain(m_session, command).refusal(), nullptr) << command;
+}
+
 /* why */
 
 TEST_F(Explain, WhyExplainsTheLastCommandThatDidSomething)
@@ -329,7 +366,7 @@ TEST_F(Explain, WhyOsdTellsSinceWhenByWhomAndUntilWhen)
               "> why osd\n"
               "Graphics   held back since 4 ms by PMX_SetModeEx: planes 3 to 7 wait until the\n"
               "           display part answers at 3004 ms; the timer ends the wait at 10004 ms\n"
-              "Request    outputs digital=off hdmi=720p50 component=off composite=576i at 50 Hz\n");
+              "Record     outputs digital=off hdmi=720p50 component=off composite=576i at 50 Hz\n");
 }
 
 TEST_F(Explain, WhyModeTellsWhichOutputDecided)
@@ -353,7 +390,7 @@ TEST_F(Explain, WhyColourSpaceTellsWhoDelivers)
     carry_out({ "source vdp0 connect", "source vdp0 start 720x576" });
     const std::string shown = shown_by("why colour-space");
     EXPECT_NE(shown.find("  master:  DRV_PMX_CS_YCBCR_601\n"
-                         "  because  colour space DRV_PMX_CS_YCBCR_601 (0) comes from port 0 (main video)\n"),
+                         "  because  colour space DRV_PMX_CS_YCBCR_601 (0) is what port 0 (main video)\n"),
               shown.npos)
         << shown;
     carry_out({ "PMX_VdpDisabled 0 0", "poke eMasterColorSpace 1", "poke arPortInfo[0].fgEnabled 1" });

@@ -51,7 +51,7 @@ UINT32 PMX_SetMode(UCHAR ucPmxId, UCHAR ucMode, UCHAR ucVFreq, UINT8 fgOSD5)
     OSD_BASE_SetDisplayMode(ucMode);
     if (ucMode == prConf->ucMode && ucVFreq == prConf->ucVfreq && prConf->fgSetModeCalled != FALSE)
     {
-        PMX_NOTE(SAME_FORMAT, FALSE, FALSE);
+        PMX_NOTE(SAME_MODE, ucMode, ucVFreq);
         VDP_SetTvFormat(ucMode, FALSE);
         return 1;
     }

@@ -215,6 +215,7 @@ UINT32 PMX_SetGamma(UCHAR ucPmxId, UCHAR ucGamma)
         return PMX_WHY_EITHER(ucPmxId != 0, PMX_WHY(MIXER_ID, 0, ucPmxId),
                               PMX_WHY(FEATURE_BIT, 0, PMX_CAP_BIT_GAMMA, prPmxConf()->u4Capability));
 
+    PMX_NOTE_IF(ucGamma > PMX_GAMMA_CURVE_NUM, NO_CURVE, ucGamma);
     prPmxConf()->ucGamma = ucGamma; // as given, also when no curve has this number and gamma is off
     const UCHAR* pucCurve = ucGamma >= 1 && ucGamma <= PMX_GAMMA_CURVE_NUM ? aucGammaCurve[ucGamma - 1] : nullptr;
     PMX_HalSetGamma(0, pucCurve != nullptr, pucCurve);

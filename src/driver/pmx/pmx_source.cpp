@@ -112,7 +112,8 @@ UINT32 PMX_OsdEnabled(UCHAR, UCHAR ucOsdId, INT32 i4SrcWidth, INT32 i4SrcHeight,
     }
     else // a port that had YCbCr graphics goes on counting as such
     {
-        PMX_NOTE(RGB_NOT_COUNTED, u4Port);
+        PMX_NOTE_IF(prPort->eInputColorMode != DRV_GFX_COLOR_MODE_YCBCR, RGB_NOT_COUNTED, u4Port);
+        PMX_NOTE_IF(prPort->eInputColorMode == DRV_GFX_COLOR_MODE_YCBCR, COUNTS_AS_YCBCR, u4Port);
         PMX_IsLog(8, "OSD_%d's Src Color Space = DRV_PMX_CS_RGB\n", ucOsdId);
     }
     if (prConf->eMasterColorSpace != eOldCS)

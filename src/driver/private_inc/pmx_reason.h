@@ -139,7 +139,7 @@ extern "C" {
     X(43, MIXED_AGAIN,        NOTE,      NONE,         NONE,         \
        "graphics are mixed again") \
     X(44, MASTER_FROM_PORT,   NOTE,      COLOUR_SPACE, PORT,         \
-       "colour space %u comes from port %u") \
+       "colour space %u is what port %u asks for, over those before it") \
     X(45, SECOND_NOT_COUNTED, NOTE,      NUMBER,       NONE,         \
        "the second video does not count: it needs a luma key, which is %u, and to be mixed") \
     X(46, RGB_NOT_COUNTED,    NOTE,      PORT,         NONE,         \
@@ -155,7 +155,13 @@ extern "C" {
     X(51, BOOT_MODE,          NOTE,      MODE,         NONE,         \
        "mode %u is none to start with: 480p takes its place") \
     X(52, NO_TIMER,           NEIGHBOUR, NONE,         NONE,         \
-       "the operating system refused the display timer")
+       "the operating system refused the display timer") \
+    X(53, COUNTS_AS_YCBCR,    NOTE,      PORT,         NONE,         \
+       "port %u goes on counting as YCbCr graphics, whatever it is given now") \
+    X(54, NO_CURVE,           NOTE,      NUMBER,       NONE,         \
+       "no gamma curve has the number %u: gamma is off") \
+    X(55, SAME_MODE,          NOTE,      MODE,         NUMBER,       \
+       "mode %u at %u Hz is what runs already: nothing is programmed")
 // clang-format on
 
 /** The classes: PMX_REASON_CLASS_ and the name. */

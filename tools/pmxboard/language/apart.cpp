@@ -2,10 +2,12 @@
 #include "tools/pmxboard/language/apart.h"
 
 #include <sys/mman.h>
+#include <sys/prctl.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <cerrno>
+#include <csignal>
 #include <cstring>
 #include <ostream>
 #include <stdexcept>
@@ -25,7 +27,7 @@ public:
     MemoryFile() : m_file(memfd_create("pmxboard", MFD_CLOEXEC))
     {
         if (m_file < 0)
-            throw std::runtime_error(std::string("no memory for what-if: ") + std::strerror(errno));
+            throw std::runtime_error(std::string("no memory for a copy of the process: ") + std::strerror(errno));
     }
     ~MemoryFile() { close(m_file); }
     MemoryFile(const MemoryFile&) = delete;
@@ -87,6 +89,7 @@ private:
                               const MemoryFile& answer)
 {
     end_as_it_comes();
+    prctl(PR_SET_PDEATHSIG, SIGKILL); // nobody would hear what it finds
     MemoryStream buffer(shown);
     std::ostream stream(&buffer);
     const std::string text = function(stream);
@@ -110,14 +113,14 @@ Apart run_apart(const std::function<std::string(std::ostream& shown)>& function)
     const MemoryFile answer;
     const pid_t copy = fork();
     if (copy < 0)
-        throw std::runtime_error(std::string("no process for what-if: ") + std::strerror(errno));
+        throw std::runtime_error(std::string("no copy of the process: ") + std::strerror(errno));
     if (copy == 0)
         be_the_copy(function, shown, answer);
     int status = 0;
     while (waitpid(copy, &status, 0) < 0)
     {
         if (errno != EINTR)
-            throw std::runtime_error(std::string("lost the process of what-if: ") + std::strerror(errno));
+            throw std::runtime_error(std::string("lost the copy of the process: ") + std::strerror(errno));
     }
     return { shown.content(), answer.content(), death_of(status) };
 }

@@ -7,6 +7,7 @@
 #include "board/board.h"
 #include "board/json.h"
 #include "board/threads.h"
+#include "drv_pmx.h"
 #include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/language/apart.h"
 #include "tools/pmxboard/language/session.h"
@@ -20,9 +21,6 @@ namespace
 
 using board::Json;
 
-/** As many requests are tried as an 8-bit argument has values, and some. */
-constexpr std::size_t most_tries = 300;
-
 /** What became of a command, on its way from one process to another. */
 Json packed(const std::string& kind, const std::string& message, const Session& session)
 {
@@ -34,6 +32,7 @@ Json packed(const std::string& kind, const std::string& message, const Session& 
              { "message", message },
              { "operation", session.last_operation() },
              { "outcome", to_json(outcome) },
+             { "result", outcome.result ? Json(outcome.result->as_number()) : Json() },
              { "answer", outcome.result ? outcome.result->to_text() : std::string() },
              { "reasons", reasons } };
 }
@@ -78,9 +77,10 @@ Json tried(Session& session, const std::vector<std::string>& commands)
     });
     if (apart.death.empty() && !apart.answer.empty())
         return Json::parse(apart.answer);
-    return { { "kind", "failed" }, { "message", "it would end the program: " + apart.death },
-             { "operation", "" },  { "outcome", "null" },
-             { "answer", "" },     { "reasons", Json::array() } };
+    return { { "kind", "failed" },        { "message", "it would end the program: " + apart.death },
+             { "operation", "" },         { "outcome", "null" },
+             { "result", nullptr },       { "answer", "" },
+             { "reasons", Json::array() } };
 }
 
 Explanation unpacked(const std::string& command, const Json& json)
@@ -90,6 +90,8 @@ Explanation unpacked(const std::string& command, const Json& json)
     explanation.operation = json.at("operation");
     explanation.outcome = json.at("outcome");
     explanation.answer = json.at("answer");
+    if (json.at("result").is_number())
+        explanation.result = json.at("result").get<std::int64_t>();
     for (const Json& reason : json.at("reasons"))
         explanation.reasons.push_back({ static_cast<PMX_REASON_T>(reason.at(0).get<int>()), reason.at(1), reason.at(2),
                                         reason.at(3), reason.at(4), reason.at(5) });
@@ -104,7 +106,7 @@ bool is_accepted(const std::string& command, const Json& json)
 }
 
 /** In the copy that the twin was led into. */
-std::string explained_there(Session& session, const std::string& command)
+std::string explained_there(Session& session, const std::string& command, const Search& search)
 {
     lead_in_twin();
     board::at_every_call({}); // nobody stops there
@@ -113,8 +115,10 @@ std::string explained_there(Session& session, const std::string& command)
     answer["accepted"] = Json::array();
     if (answer.at("kind") == "wrong line")
         return board::written(answer);
-    const auto near = requests_near(unpacked(command, answer));
-    for (std::size_t i = 0; i < std::min(near.size(), most_tries); ++i)
+    const auto near =
+        search.tries == 0 ? std::vector<std::vector<std::string>>() : requests_near(unpacked(command, answer));
+    const auto end = std::chrono::steady_clock::now() + search.time;
+    for (std::size_t i = 0; i < std::min(near.size(), search.tries) && std::chrono::steady_clock::now() < end; ++i)
     {
         if (is_accepted(command, tried(session, near[i])))
         {
@@ -135,14 +139,27 @@ std::string line_of(const std::string& begin, const std::string& text, const Loo
 
 } // namespace
 
+/** Whether an operation gives a reason itself. */
+static bool is_own(const std::string& operation, const Reason& reason)
+{
+    const auto places = reasons_of(operation);
+    return std::any_of(places.begin(), places.end(), [&](const ReasonPlace& place) {
+        return place.number == reason.number && place.function == reason.function && place.own;
+    });
+}
+
 const Reason* Explanation::refusal() const
 {
-    // A failure on the way that stopped nothing stands before the one that did.
-    const auto found = std::find_if(reasons.rbegin(), reasons.rend(), is_refusal);
+    // What another operation was refused on the way stopped nothing, unless it was handed on.
+    const bool handed_on = result && operation != "i4PMX_Uninit" && (*result <= 0 || *result == PMX_NO_SUCH_PORT);
+    // A failure on the way stands before the one that did.
+    const auto found = std::find_if(reasons.rbegin(), reasons.rend(), [&](const Reason& reason) {
+        return is_refusal(reason) && (handed_on || is_own(operation, reason));
+    });
     return found == reasons.rend() ? nullptr : &*found;
 }
 
-Explanation explain(Session& session, const std::string& command)
+Explanation explain(Session& session, const std::string& command, const Search& search)
 {
     if (const auto waiting = board::threads::waiting(); !waiting.empty())
         throw StepFailed("explain copies the process, and a thread that waits cannot be copied: " + waiting.front());
@@ -151,7 +168,7 @@ Explanation explain(Session& session, const std::string& command)
     const Apart apart = run_apart([&](std::ostream&) {
         try
         {
-            return explained_there(session, command);
+            return explained_there(session, command, search);
         }
         catch (const std::exception& error)
         {

@@ -3,6 +3,8 @@
  *  Why a command does what it does: carried out by the layer that tells its reasons, in a copy of the process. */
 #pragma once
 
+#include <chrono>
+#include <cstdint>
 #include <optional>
 #include <string>
 #include <vector>
@@ -21,7 +23,8 @@ struct Explanation
     std::string command;
     std::string operation; ///< empty when the command called none
     std::string outcome;   ///< one JSON object, as a trace has it
-    std::string answer;    ///< the operation's result for people; empty without one
+    std::optional<std::int64_t> result;
+    std::string answer; ///< the operation's result for people; empty without one
     std::vector<Reason> reasons;
     std::vector<std::string> accepted; ///< what would be accepted instead: commands, one after the other
     std::string headline;              ///< instead of what became of the command
@@ -31,8 +34,18 @@ struct Explanation
     const Reason* refusal() const;
 };
 
+/** How long is looked for what would be accepted. */
+struct Search
+{
+    std::size_t tries = 0;
+    std::chrono::milliseconds time{};
+};
+inline constexpr Search thorough{ 500, std::chrono::seconds(10) };
+inline constexpr Search quick{ 100, std::chrono::milliseconds(500) };
+inline constexpr Search none{};
+
 /** Carry a command out in a copy. Throws LineError when it is none, and StepFailed when there can be no copy. */
-Explanation explain(Session& session, const std::string& command);
+Explanation explain(Session& session, const std::string& command, const Search& search = thorough);
 
 std::string to_text(const Explanation& explanation, const Look& look);
 /** A line of a trace. */

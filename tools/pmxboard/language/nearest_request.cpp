@@ -3,6 +3,7 @@
 // size and scan, then the nearest frequency, then the lower number; of another argument the nearest value.
 #include <algorithm>
 #include <cstdlib>
+#include <iterator>
 #include <set>
 #include <span>
 #include <tuple>
@@ -217,44 +218,48 @@ Requests settings_with_other_modes(const Line& line, const Explanation& explanat
 
 /* Other arguments */
 
-/** Numbers near one, within what an argument can hold. */
+/** Numbers near one, within what an argument can hold, the nearest first: neighbours, small numbers, and those that
+ *  have names. */
 std::vector<std::int64_t> numbers_near(std::int64_t number, const Kind& kind)
 {
-    constexpr std::int64_t farthest = 255;
+    constexpr std::int64_t neighbours = 64;
     const std::int64_t lowest = kind.is_signed ? -(std::int64_t{ 1 } << (kind.bits - 1)) : 0;
     const std::int64_t highest = (std::int64_t{ 1 } << (kind.is_signed ? kind.bits - 1 : kind.bits)) - 1;
-    std::vector<std::int64_t> near;
-    for (std::int64_t distance = 1; distance <= farthest; ++distance)
-    {
-        for (const std::int64_t other : { number - distance, number + distance })
-        {
-            if (other >= lowest && other <= highest)
-                near.push_back(other);
-        }
-    }
+    std::set<std::int64_t> all;
+    for (std::int64_t distance = 0; distance <= neighbours; ++distance)
+        all.insert({ number - distance, number + distance, distance });
     for (const std::string_view name : names_in(kind.family))
-        near.push_back(board::names::number_of(name).value_or(0));
-    near.push_back(0);
+        all.insert(board::names::number_of(name).value_or(0));
+    std::vector<std::int64_t> near;
+    std::copy_if(all.begin(), all.end(), std::back_inserter(near),
+                 [&](std::int64_t other) { return other != number && other >= lowest && other <= highest; });
+    std::stable_sort(near.begin(), near.end(),
+                     [&](std::int64_t a, std::int64_t b) { return std::abs(a - number) < std::abs(b - number); });
     return near;
 }
 
-/** The number in the place of the argument that the reason tells of. */
+/** Whether the wrong number is an amount, or one of a kind, of which another one serves as well. Another plane, port or
+ *  component is another thing. */
+bool is_replaceable(PMX_REASON_T reason)
+{
+    return reason == PMX_REASON_MIXER_ID || reason == PMX_REASON_POSITION || reason == PMX_REASON_TV_SYSTEM ||
+           reason == PMX_REASON_COLOUR_FORMAT || reason == PMX_REASON_COLOUR_SPACE;
+}
+
+/** Another number in the place of the argument that the reason tells of. */
 Requests calls_with_other_numbers(const WrittenCall& call, const Reason& refusal)
 {
-    // A component of a type that has ports has the wrong id.
-    const bool is_id =
-        refusal.number == PMX_REASON_NO_PORT && (refusal.a == PMX_COMP_TYPE_VDP || refusal.a == PMX_COMP_TYPE_OSD);
-    const std::uint32_t wrong = is_id ? refusal.b : refusal.a;
     Requests requests;
-    for (std::size_t i = 0; i < call.values.size() && requests.empty(); ++i)
+    for (std::size_t i = 0; i < call.values.size(); ++i)
     {
         const Parameter& parameter = call.operation->parameters[i];
-        // Every call has a mixer id, and it may have the same number.
+        const bool is_id = parameter.name == "ucPmxId";
         if (parameter.is_output || parameter.kind.form != Kind::Form::Number ||
-            (parameter.name == "ucPmxId" && refusal.number != PMX_REASON_MIXER_ID) ||
-            static_cast<std::uint32_t>(call.values[i].as_number()) != wrong)
+            is_id != (refusal.number == PMX_REASON_MIXER_ID) ||
+            static_cast<std::uint32_t>(call.values[i].as_number()) != refusal.a)
             continue;
-        for (const std::int64_t other : numbers_near(call.values[i].as_number(), parameter.kind))
+        for (const std::int64_t other :
+             is_id ? std::vector<std::int64_t>{ 0 } : numbers_near(call.values[i].as_number(), parameter.kind))
         {
             const std::string_view name = board::names::name_of(parameter.kind.family, other);
             requests.push_back({ with(call, { { i, name.empty() ? std::to_string(other) : std::string(name) } }) });
@@ -314,9 +319,7 @@ Requests near_of_call(const WrittenCall& call, const Explanation& explanation, c
             return calls_with_a_pointer(call, refusal);
         if (refusal.number == PMX_REASON_SOURCE_TWICE)
             return orders_without_doubles(call);
-        if (refusal.number == PMX_REASON_PRINT_LEVEL || refusal.number == PMX_REASON_INERT)
-            return {};
-        return calls_with_other_numbers(call, refusal);
+        return is_replaceable(refusal.number) ? calls_with_other_numbers(call, refusal) : Requests();
     case PMX_REASON_CLASS_NOTE:
     case PMX_REASON_CLASS_SAME:
     case PMX_REASON_CLASS_FEATURE:

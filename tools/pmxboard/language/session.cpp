@@ -218,18 +218,27 @@ void Session::remember(const Line& line)
         m_before = whole_state();
 }
 
+/** Whether a command calls the layer, and does nothing besides that a copy should not do, too: files are read once. */
+bool Session::leads_into_layer(const Line& line)
+{
+    static constexpr std::string_view verbs[] = { "outputs",      "ipmx",        "source",  "suspend", "resume",
+                                                  "display-part", "video-plane", "advance", "sink" };
+    return find_command(line.word(0)).operation != nullptr ||
+           std::find(std::begin(verbs), std::end(verbs), line.word(0)) != std::end(verbs);
+}
+
 /** While everything is as the command will find it. A command that cannot be explained is carried out all the same. */
 void Session::explain_ahead(const Line& line)
 {
-    if (imagines())
+    if (imagines() || m_restoring)
         return;
     ++m_commands;
     m_explanation.reset();
-    if (!m_explains || line.word(0) == "include" || (m_explained_alone && *m_explained_alone != m_commands))
+    if (!m_explains || !leads_into_layer(line) || (m_explained_alone && *m_explained_alone != m_commands))
         return;
     try
     {
-        m_explanation = explain(*this, line.from(0));
+        m_explanation = explain(*this, line.from(0), quick);
         if (const Reason* const refusal = m_explanation->refusal(); refusal != nullptr && m_shows_explanations)
             m_output.refusal(sentence_of(*refusal));
     }

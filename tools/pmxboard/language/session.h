@@ -137,6 +137,7 @@ private:
     void keep_step(const Line& line);
     void check_misuses() const;
     void remember(const Line& line);
+    static bool leads_into_layer(const Line& line);
     void explain_ahead(const Line& line);
     static void forget_the_past();
 

@@ -33,7 +33,8 @@ void explain_command(Session& session, const Words& words)
 void why_last(Session& session, const Words&)
 {
     if (!session.explanation())
-        throw LineError("no command has run that could be explained");
+        throw LineError("nothing is kept of the last command: why is for the shell and for run --explain; "
+                        "explain COMMAND tells everywhere");
     show(session, *session.explanation());
 }
 
@@ -62,15 +63,20 @@ void why_graphics(Session& session, const Words&)
     const Look look = session.output().look();
     std::string text = to_text(status, StatusPart::Graphics, look);
     if (status.graphics.state == GraphicsStatus::State::Held)
-        text += wrapped("Request    " + outputs_in_short() + " at " + stored("ucVfreq") + " Hz", look.width, 0, 11);
+        text += wrapped("Record     " + outputs_in_short() + " at " + stored("ucVfreq") + " Hz", look.width, 0, 11);
     session.output().shown(to_json_line(status), text);
 }
 
 /** What the layer would decide now, told as the reason of what it has decided. The twin tells the steps of what it
  *  does besides, too. */
-Explanation decided_anew(Session& session, const std::string& command, std::initializer_list<PMX_REASON_T> wanted)
+Explanation decided_anew(Session& session, const std::string& question, const std::string& command,
+                         std::initializer_list<PMX_REASON_T> wanted)
 {
-    Explanation explanation = explain(session, command);
+    Explanation explanation = explain(session, command, none);
+    explanation.command = question; // nobody has made that call, and it has no outcome
+    explanation.operation.clear();
+    explanation.result.reset();
+    explanation.outcome = "null";
     std::erase_if(explanation.reasons, [&](const Reason& reason) {
         return std::find(wanted.begin(), wanted.end(), reason.number) == wanted.end();
     });
@@ -80,7 +86,7 @@ Explanation decided_anew(Session& session, const std::string& command, std::init
 void why_mode(Session& session, const Words&)
 {
     Explanation explanation = decided_anew(
-        session,
+        session, "why mode",
         "PMX_SetModeEx 0 " + stored("arOutputConf") + " " + stored("ucVfreq") + " " + stored("rDrvExtScl") + " " +
             stored("fgOSD5"),
         { PMX_REASON_FORMAT_FROM_OUTPUT, PMX_REASON_FORMAT_FROM_OFF, PMX_REASON_MODE_BIT, PMX_REASON_MODE_NEVER });
@@ -102,7 +108,7 @@ void why_mode(Session& session, const Words&)
 
 void why_colour_space(Session& session, const Words&)
 {
-    Explanation explanation = decided_anew(session, "PMX_DecideMasterColorSpace 0",
+    Explanation explanation = decided_anew(session, "why colour-space", "PMX_DecideMasterColorSpace 0",
                                            { PMX_REASON_MASTER_FROM_PORT, PMX_REASON_SECOND_NOT_COUNTED,
                                              PMX_REASON_RGB_NOT_COUNTED, PMX_REASON_MASTER_CHANGES });
     explanation.headline = "master";

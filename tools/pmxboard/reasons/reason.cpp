@@ -50,6 +50,26 @@ std::string with_number(std::string_view name, std::uint32_t value)
     return name.empty() ? number : std::string(name) + " (" + number + ")";
 }
 
+/** What hangs on a bit: a feature, or modes, of which the first few say it. */
+std::string name_of_capability(std::uint32_t bit)
+{
+    constexpr unsigned most = 2;
+    const auto features = record_view::capability_features();
+    if (const auto feature = features.find(bit); feature != features.end())
+        return feature->second;
+    std::string names;
+    unsigned count = 0;
+    for (const record_view::ModeRow& row : record_view::mode_rows())
+    {
+        if (row.capability != bit)
+            continue;
+        if (++count > most)
+            return names + ", ...";
+        names.append(names.empty() ? "" : ", ").append(row.name);
+    }
+    return names;
+}
+
 std::string hexadecimal(std::string_view conversion, std::uint32_t value)
 {
     char text[16];
@@ -72,9 +92,8 @@ std::string shown(std::string_view kind, std::string_view conversion, std::uint3
         return with_number(board::names::name_of(Family::AvdCommand, value), value);
     if (kind == "CAP_BIT")
     {
-        const auto features = record_view::capability_features();
-        const auto feature = features.find(value);
-        return std::to_string(value) + (feature != features.end() ? " (" + feature->second + ")" : "");
+        const std::string name = name_of_capability(value);
+        return std::to_string(value) + (name.empty() ? "" : " (" + name + ")");
     }
     if (kind == "PORT")
         return std::to_string(value) + (value == 0   ? " (main video)"

@@ -3,6 +3,7 @@
  *  Why the layer refused or decided: what it told, and how that is said to people and programs. */
 #pragma once
 
+#include <array>
 #include <cstdint>
 #include <span>
 #include <string>
@@ -65,6 +66,7 @@ struct ReasonPlace
     std::string_view function;
     std::string_view file;
     unsigned line;
+    bool own; ///< and not another operation's that it calls on its way
 };
 /** The reasons that an operation can give, in the order of the sources; of the name of no operation: none. */
 std::span<const ReasonPlace> reasons_of(std::string_view operation);

@@ -76,7 +76,8 @@ def complaints(root):
         if name not in known:
             yield f"{NUMBERS}: append \"{number} {name}\": a number that was given stays"
     header = (root / HEADER).read_text(encoding="utf-8")
-    kinds_known = set(re.findall(r"X\((\w+)\)", header[header.index("PMX_REASON_KINDS"):header.index("PMX_REASONS_KNOWN")]))
+    kinds_known = header[header.index("PMX_REASON_KINDS"):header.index("PMX_REASONS_KNOWN")]
+    kinds_known = set(re.findall(r"X\((\w+)\)", kinds_known))
     for _, name, _, kinds, sentence in table:
         if not kinds_known.issuperset(kinds):
             yield f"{HEADER}: {name}: its values are of no known kind: {kinds}"

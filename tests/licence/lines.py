@@ -21,7 +21,7 @@ LICENCE = f"{TAG} MIT OR GPL-2.0-only"
 COMMENTS = {".c": "// {}", ".cpp": "// {}", ".h": "// {}", ".h.in": "// {}", ".s.in": "/* {} */", ".pc.in": "# {}",
             ".md": "<!-- {} -->"}
 HASH = {".bash", ".clang-format", ".clang-tidy", ".cmake", ".gitignore", ".pmx", ".py", ".sh", ".supp", ".toml",
-        ".txt", "Doxyfile", "dev", "run"}
+        ".txt", "Doxyfile", "Kbuild", "dev", "run"}
 LICENCES = ("LICENSE", "LICENSES/*")
 
 

@@ -154,6 +154,14 @@ class Caches(TreeTest):
         self.expect(0, f"cache {self.space}/my cache/ccache", "run", PMX_CACHE="my cache")
         self.assertFalse((self.tree / ".cache").exists())
 
+    def test_the_kernel_is_kept_there_too(self):
+        made = f"{self.tree}/build/kernel {self.tree}/build/release/pmxboard {self.tree}/build/arm-bare/kernel/pmx_if.o"
+        self.expect(0, f"kernel {self.tree}/.cache/kernel {made}\n", "kernel")
+        self.expect(0, f"kernel {self.space}/kept/kernel {made}\n", "kernel", PMX_CACHE="kept", CCACHE_DIR="/elsewhere")
+        self.expect(0, "", "clean")
+        self.assertTrue((self.tree / ".cache/kernel").is_dir())
+        self.expect(2, "kernel does not take: x", "kernel", "x")
+
     def test_the_users_own_is_used(self):
         self.expect(0, "cache /elsewhere", "run", CCACHE_DIR="/elsewhere")
         self.expect(0, "cache none", "run", CCACHE_CONFIGPATH="/elsewhere/ccache.conf")
@@ -338,7 +346,7 @@ class Usage(TreeTest):
         self.dev("test")
         built = [line.split()[2] for line in self.calls("cmake --preset")]
         self.assertEqual(["debug", "release", "arm-linux", "arm-bare"], built)
-        self.assertEqual(["CMakeLists.txt", "CMakePresets.json", "build", "dev", "packages.txt"],
+        self.assertEqual(["CMakeLists.txt", "CMakePresets.json", "build", "dev", "packages.txt", "tests"],
                          sorted(set(os.listdir(self.tree)) - {".cache"}))
         self.assertEqual(["stubs", "tree"], sorted(os.listdir(self.space)))
 

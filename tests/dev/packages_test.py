@@ -28,6 +28,8 @@ gcc-bare
 g++-linux   # why
 [test]
 gcovr
+[kernel]
+qemu
 [drawing]
 graphviz
 """
@@ -43,6 +45,7 @@ class Packages(TreeTest):
         for arguments, needed in ((("build", "arm-bare"), "python3 cmake gcc-bare"),
                                   (("build", "arm-linux"), "python3 cmake libx-dev g++-linux"),
                                   (("run",), "python3 cmake libx-dev g++"),
+                                  (("kernel",), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu"),
                                   (("docs",), ""),
                                   (("clean",), ""),
                                   (("help",), ""),

@@ -90,6 +90,10 @@ class TreeTest(unittest.TestCase):
             shutil.copy2(ROOT / file, tree)
         (tree / "CMakeLists.txt").write_text("cmake_minimum_required(VERSION 3.25)\n", encoding="utf-8")
         (tree / "CMakePresets.json").write_text("{}\n", encoding="utf-8")
+        kernel = tree / "tests/kernel/run.py"
+        kernel.parent.mkdir(parents=True)
+        kernel.write_text('#!/bin/bash\necho "kernel $*"\n', encoding="utf-8")
+        kernel.chmod(0o755)
         return tree
 
     def environment(self, **more):

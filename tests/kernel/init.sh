@@ -1,0 +1,50 @@
+#!/bin/sh
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+# The first and only program of the kernel under test. What it finds goes to the console, where run.py reads it.
+mount -t proc proc /proc
+mount -t sysfs sys /sys
+mount -t devtmpfs dev /dev 2>/dev/null
+mount -t debugfs debug /sys/kernel/debug
+dmesg -n 1
+files=/sys/kernel/debug/pmx
+
+load()
+{
+    insmod /pmx.ko "$@" || echo "WRONG insmod pmx.ko $*"
+}
+
+unload()
+{
+    rmmod pmx || echo "WRONG rmmod pmx"
+}
+
+# A scenario that powers on again gets a module that was never used.
+scenario()
+{
+    loaded=false
+    echo "SCENARIO $1"
+    while read -r line
+    do
+        if [ "$line" = POWER-ON ] && $loaded
+        then
+            cat "$files/trace"
+            unload
+            loaded=false
+        fi
+        $loaded || load start=0
+        loaded=true
+        [ "$line" = POWER-ON ] || echo "$line" >"$files/command" || echo "WRONG $line"
+    done <"/scenarios/$1"
+    cat "$files/trace"
+    unload
+    echo "END"
+}
+
+echo "BEGIN $(uname -r)"
+for file in /scenarios/*
+do
+    scenario "${file##*/}"
+done
+dmesg | grep -E 'BUG|WARNING:|Oops|scheduling while atomic|sleeping function|INFO: ' | sed 's/^/COMPLAINT /'
+echo "DONE $(cut -d' ' -f1 /proc/uptime)"
+poweroff -f

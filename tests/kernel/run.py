@@ -1,0 +1,218 @@
+#!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+"""Runs the port of linux/ in a real kernel, on an emulated 32-bit ARM machine, and holds what it does against the
+virtual board, line by line. Prints KTAP; ends with 1 when something differs, and with 77 when the kernel is not to be
+had.
+
+usage: run.py CACHE MADE PMXBOARD OBJECT
+    CACHE     folder in which the kernel is kept
+    MADE      folder for modules, consoles and what else is made
+    PMXBOARD  the tool
+    OBJECT    the layer as it ships for kernels
+"""
+
+import pathlib
+import re
+import shutil
+import subprocess
+import sys
+import time
+
+sys.dont_write_bytecode = True
+
+import debian  # noqa: E402
+import scenarios  # noqa: E402
+
+HERE = pathlib.Path(__file__).resolve().parent
+ROOT = HERE.parents[1]
+CROSS = "arm-linux-gnueabihf-"
+BOOT_SECONDS = 240
+SKIPPED = 77
+MEMORY_LIMIT = 4 * 1024 * 1024  # KB; the kernel's symbol reader can run away
+# A nanosecond is an instruction, and a sleep costs nothing: the same run every time.
+VIRTUAL_TIME = ["-icount", "shift=0,sleep=off"]
+APPLETS = ("sh", "mount", "cat", "cut", "grep", "sed", "dmesg", "insmod", "rmmod", "ls", "uname", "poweroff", "sleep",
+           "echo")
+
+
+class Failed(Exception):
+    """No comparison came about."""
+
+
+class Ktap:
+    """Verdicts, one a line, as kernel tests tell them."""
+
+    def __init__(self):
+        self.number, self.failures = 0, 0
+        print("KTAP version 1", flush=True)
+
+    def verdict(self, name, wrong=()):
+        self.number += 1
+        self.failures += bool(wrong)
+        for line in wrong:
+            print(f"# {line}")
+        print(f"{'not ok' if wrong else 'ok'} {self.number} {name}", flush=True)
+
+    def skip(self, name, reason):
+        self.number += 1
+        print(f"ok {self.number} {name} # SKIP {reason}", flush=True)
+
+    def end(self):
+        print(f"1..{self.number}")
+
+
+def run(*command, **how):
+    ran = subprocess.run([str(word) for word in command], capture_output=True, text=True, check=False, **how)
+    if ran.returncode != 0:
+        raise Failed(f"{' '.join(map(str, command))} ended with {ran.returncode}:\n{(ran.stdout + ran.stderr)[-3000:]}")
+    return ran.stdout
+
+
+def module(kernel, folder, *variables):
+    """Builds pmx.ko with recorders, and a module that imports from it."""
+    folder.mkdir(parents=True, exist_ok=True)
+    for link in folder.iterdir():
+        if link.is_symlink():
+            link.unlink()
+    for source in [*(ROOT / "linux").glob("*.[ch]"), *(HERE / "module").iterdir()]:
+        (folder / source.name).symlink_to(source)
+    run("bash", "-c", f'ulimit -v {MEMORY_LIMIT}; exec "$@"', "make", "make", "-s", "-j2", "-C", kernel.headers,
+        f"M={folder}", f"PMX={ROOT}", "ARCH=arm", f"CROSS_COMPILE={CROSS}", *variables, "modules")
+    if ".init_array" in run(f"{CROSS}readelf", "-SW", folder / "pmx.ko"):
+        raise Failed("pmx.ko has static constructors, which a kernel does not run")
+    return folder
+
+
+def image(kernel, modules, commands, made):
+    """The archive that the kernel boots from."""
+    root = made / "root"
+    shutil.rmtree(root, ignore_errors=True)
+    for name in ("bin", "proc", "sys", "dev", "scenarios"):
+        (root / name).mkdir(parents=True)
+    shutil.copy(kernel.busybox, root / "bin/busybox")
+    for applet in APPLETS:
+        (root / "bin" / applet).symlink_to("busybox")
+    shutil.copy(HERE / "init.sh", root / "init")
+    (root / "init").chmod(0o755)
+    for name in ("pmx.ko", "pmx_user.ko"):
+        run(f"{CROSS}strip", "--strip-debug", "-o", root / name, modules / name)
+    for name, lines in commands.items():
+        (root / "scenarios" / name).write_text("".join(line + "\n" for line in lines), encoding="utf-8")
+    archive = made / "root.cpio.gz"
+    run("bash", "-c", 'set -o pipefail; find . | cpio -o -H newc --quiet | gzip -1 >"$0"', archive, cwd=root)
+    return archive
+
+
+def boot(kernel, archive, console, *options):
+    """What the kernel's console showed."""
+    with console.open("wb") as shown:
+        try:
+            subprocess.run(["qemu-system-arm", "-M", "virt,highmem=off", "-cpu", "cortex-a15", "-m", "256",
+                            "-nographic", "-no-reboot", "-nic", "none", "-kernel", kernel.image, "-initrd", archive,
+                            "-append", "console=ttyAMA0 panic=-1", *options], stdin=subprocess.DEVNULL, stdout=shown,
+                           stderr=subprocess.STDOUT, timeout=BOOT_SECONDS, check=False)
+        except subprocess.TimeoutExpired:
+            pass  # told by what is missing
+    return console.read_text(encoding="utf-8", errors="replace").replace("\r", "").splitlines()
+
+
+def parsed(console):
+    """({scenario: (calls, results)}, what went wrong)"""
+    found, wrong, name = {}, [], None
+    for line in console:
+        if line.startswith("SCENARIO "):
+            name = line.split()[1]
+            found[name] = ([], [])
+        elif line == "END":
+            name = None
+        elif re.match(r"WRONG|COMPLAINT|Kernel panic", line):
+            wrong.append(line)
+            if name:
+                found[name][0].append(line)
+        elif name and line.startswith("| "):
+            found[name][0].append(line[2:])
+        elif name and line.startswith("= "):
+            found[name][1].append(line[2:])
+    if name:
+        wrong.append(f"the kernel went away in {name}")
+    if not any(line.startswith("DONE ") for line in console):
+        wrong.append("the kernel did not come to its end")
+    return found, wrong
+
+
+def differences(what, board, kernel):
+    """The first difference of two lists of lines, or nothing."""
+    if board == kernel:
+        return []
+    at = next((i for i, pair in enumerate(zip(board, kernel)) if pair[0] != pair[1]), min(len(board), len(kernel)))
+    return [f"{what} {at + 1} of {len(board)}, {len(kernel)} in the kernel",
+            f"  board:  {board[at] if at < len(board) else 'nothing more'}",
+            f"  kernel: {kernel[at] if at < len(kernel) else 'nothing more'}"]
+
+
+def compare(ktap, title, expected, console):
+    """A verdict for each scenario, and one for the boot."""
+    found, wrong = parsed(console)
+    lines = 0
+    for name, (calls, results) in expected.items():
+        if name not in found:
+            ktap.verdict(f"{title} {name}", ["it did not run"])
+            continue
+        lines += len(calls) + len(results)
+        ktap.verdict(f"{title} {name}", differences("call", calls, found[name][0]) +
+                     differences("result", results, found[name][1]))
+    if not expected or not lines:
+        wrong.append("nothing was compared")
+    ktap.verdict(f"{title} boot: {len(found)} scenarios, {lines} lines", wrong)
+
+
+def prepared(ktap, program):
+    """({scenario: commands}, {scenario: what the board makes of it})"""
+    commands, expected = {}, {}
+    for path in sorted((ROOT / "scenarios").glob("*.pmx")):
+        try:
+            commands[path.stem] = list(scenarios.commands(path))
+            expected[path.stem] = scenarios.on_the_board(program, path)
+        except scenarios.Unknown as unknown:
+            ktap.verdict(path.stem, [f"the kernel has no way to do this: {unknown}"])
+    return commands, expected
+
+
+def check_path(*paths):
+    """The kernel's build cannot be told of every folder."""
+    for path in paths:
+        refused = re.search(r"[\s:#$'\"\\\\]", str(path))
+        if refused:
+            raise Failed(f"the kernel's build does not work in {path}, for the {refused[0]} in that name")
+
+
+def compare_all(ktap, cache, made, program, shipped):
+    kernel = debian.kernel(cache)
+    built = module(kernel, made / "built")
+    ktap.verdict(f"pmx.ko built by the build of {kernel.release}")
+    module(kernel, made / "shipped", f"PMX_OBJECT={shipped}")
+    ktap.verdict("pmx.ko from the object that ships")
+    commands, expected = prepared(ktap, program)
+    archive = image(kernel, built, commands, made)
+    compare(ktap, "virtual time:", expected, boot(kernel, archive, made / "virtual.log", *VIRTUAL_TIME))
+
+
+def main():
+    paths = [pathlib.Path(word).resolve() for word in sys.argv[1:]]
+    began, skipped = time.monotonic(), False
+    ktap = Ktap()
+    try:
+        check_path(ROOT, *paths)
+        compare_all(ktap, *paths)
+    except debian.Unavailable as reason:
+        ktap.skip("kernel", str(reason).replace("\n", " "))
+        skipped = True
+    except Failed as reason:
+        ktap.verdict("kernel", str(reason).splitlines())
+    ktap.end()
+    print(f"# {time.monotonic() - began:.0f} s")
+    return 1 if ktap.failures else SKIPPED if skipped else 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())

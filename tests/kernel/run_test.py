@@ -1,0 +1,143 @@
+#!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+"""What compares a kernel with the board finds what differs, what is missing and what nobody ran; every scenario can be
+carried out in a kernel.
+
+usage: run_test.py PMXBOARD
+"""
+
+import contextlib
+import io
+import pathlib
+import re
+import sys
+import tempfile
+import unittest
+
+sys.dont_write_bytecode = True
+ROOT = pathlib.Path(__file__).resolve().parents[2]
+
+import debian  # noqa: E402
+import recorders  # noqa: E402
+import run  # noqa: E402
+import scenarios  # noqa: E402
+from platform_functions import PLATFORM_HEADERS, functions  # noqa: E402
+
+PMXBOARD = sys.argv.pop(1)
+COLD_BOOT = ROOT / "scenarios/cold-boot.pmx"
+
+
+def told(expected, console):
+    """What comparing prints, and how many verdicts say no."""
+    shown = io.StringIO()
+    with contextlib.redirect_stdout(shown):
+        ktap = run.Ktap()
+        run.compare(ktap, "t", expected, console)
+    return shown.getvalue(), ktap.failures
+
+
+class Comparison(unittest.TestCase):
+    @classmethod
+    def setUpClass(cls):
+        calls, results = scenarios.on_the_board(PMXBOARD, COLD_BOOT)
+        cls.expected = {"cold-boot": (calls, results)}
+        cls.console = ["noise", "SCENARIO cold-boot", *(f"| {line}" for line in calls),
+                       *(f"= {line}" for line in results), "END", "DONE 5.0"]
+
+    def test_the_same_is_the_same(self):
+        text, failures = told(self.expected, self.console)
+        self.assertEqual(0, failures, text)
+        self.assertRegex(text, r"ok 1 t cold-boot\nok 2 t boot: 1 scenarios, \d\d+ lines\n$")
+
+    def test_every_line_counts(self):
+        for at, line in enumerate(self.console):
+            if line[:2] not in ("| ", "= "):
+                continue
+            for other in ([line + "x"], [], [line, line]):
+                text, failures = told(self.expected, self.console[:at] + other + self.console[at + 1:])
+                self.assertEqual(1, failures, text)
+                self.assertIn("not ok 1 t cold-boot", text)
+
+    def test_a_changed_line_is_shown_beside_the_boards(self):
+        changed = [line.replace("x_sema_create(1, 2, 1) = 0", "x_sema_create(1, 1, 1) = 0") for line in self.console]
+        self.assertIn("#   board:  x_sema_create(1, 2, 1) = 0\n#   kernel: x_sema_create(1, 1, 1) = 0\n",
+                      told(self.expected, changed)[0])
+
+    def test_what_did_not_run(self):
+        self.assertIn("# it did not run", told(self.expected, ["DONE 5.0"])[0])
+        self.assertEqual(1, told({}, ["DONE 5.0"])[1])
+        self.assertIn("# the kernel did not come to its end", told(self.expected, self.console[:-1])[0])
+        self.assertIn("# the kernel went away in cold-boot", told(self.expected, self.console[:-2])[0])
+
+    def test_what_the_kernel_complains_of(self):
+        for line in ("COMPLAINT WARNING: x", "WRONG rmmod pmx", "Kernel panic - not syncing"):
+            text, failures = told(self.expected, [*self.console[:-1], line, self.console[-1]])
+            self.assertEqual(1, failures)
+            self.assertIn(f"# {line}\n", text)
+
+
+class Scenarios(unittest.TestCase):
+    def read(self, text):
+        with tempfile.TemporaryDirectory() as directory:
+            path = pathlib.Path(directory, "x.pmx")
+            path.write_text(text, encoding="utf-8")
+            return list(scenarios.commands(path))
+
+    def test_every_scenario_can_be_carried_out(self):
+        known = {function.name for function in recorders.operations()}
+        known |= set(re.findall(r'^    \{ "([\w-]+)", run_', (run.HERE / "module/scripts.c").read_text("utf-8"), re.M))
+        for path in sorted((ROOT / "scenarios").glob("*.pmx")):
+            verbs = {line.split()[0] for line in scenarios.commands(path)}
+            self.assertLessEqual(verbs, known | {"POWER-ON", "ipmx"}, path)
+
+    def test_names_and_records_are_numbers(self):
+        self.assertEqual(["PMX_SetModeEx 0 " + "0 0 0 0 0 0 0 " + "1 12 0 0 0 0 0 " * 2 + "1 0 0 0 0 0 0 60 0 0"],
+                         self.read("PMX_SetModeEx 0 [ [0], [1, RES_1080P60HZ], {fgOutputEnable=1, eResMode=12}, [1] ] "
+                                   "60 DRV_NON_EXT_CHIP 0   # why"))
+        self.assertEqual(["PMX_GetMode 0 null"], self.read("PMX_GetMode 0 null\nexpect result 0\n"))
+
+    def test_sleeps_in_a_row_are_one(self):
+        self.assertEqual(["sleep 1507", "PMX_Init", "sleep 6"],
+                         self.read("advance 1s\nexpect asserts 0\nadvance 501ms\nadvance 1us\nPMX_Init\nadvance 1ms\n"))
+
+    def test_what_is_unknown_is_refused(self):
+        for line in ("flush x", "PMX_GetMode NO_NAME", "advance soon", "poke no.field 1", "neighbour TVE_SetEnable 0 1",
+                     "meanwhile x_thread_delay expect asserts 0"):
+            with self.assertRaises(scenarios.Unknown, msg=line):
+                self.read(line)
+
+
+class Recorders(unittest.TestCase):
+    def test_every_platform_function_is_recorded(self):
+        declared = {function.name for header in PLATFORM_HEADERS for function in functions(ROOT / header)}
+        recorded = {function.name for function in recorders.recorded()}
+        self.assertEqual(declared, recorded | set(recorders.BY_HAND + recorders.NOT_RECORDED))
+        code = recorders.code()
+        for name in recorded:
+            self.assertIn(f" __wrap_{name}(", code)
+        self.assertLessEqual(recorders.SCRIPTED, recorded)
+
+
+class Kernel(unittest.TestCase):
+    def test_what_was_unpacked_for_another_place_is_not_used(self):
+        with tempfile.TemporaryDirectory() as directory:
+            folder = pathlib.Path(directory).resolve()
+            fetched, fetch = [], debian._fetch
+            debian._fetch = lambda place: fetched.append(place) or "1.2-x"
+            self.addCleanup(setattr, debian, "_fetch", fetch)
+            self.assertEqual("1.2-x", debian.kernel(folder).release)
+            self.assertEqual("1.2-x", debian.kernel(folder).release)
+            self.assertEqual([folder], fetched)
+            (folder / debian.USABLE).write_text("/elsewhere\n1.2-x\n", encoding="utf-8")
+            debian.kernel(folder)
+            self.assertEqual([folder, folder], fetched)
+
+    def test_folders_that_the_kernels_build_cannot_use(self):
+        for name in ("a b", "a:b", "a$b", "a'b", "a#b"):
+            with self.assertRaises(run.Failed):
+                run.check_path(pathlib.Path("/x") / name)
+        run.check_path(pathlib.Path("/x/a-b_c.d+e"))
+
+
+if __name__ == "__main__":
+    unittest.main()

@@ -45,6 +45,11 @@ for file in /scenarios/*
 do
     scenario "${file##*/}"
 done
+if [ -f /more.sh ]
+then
+    # shellcheck source=tests/kernel/real_time.sh
+    . /more.sh
+fi
 dmesg | grep -E 'BUG|WARNING:|Oops|scheduling while atomic|sleeping function|INFO: ' | sed 's/^/COMPLAINT /'
 echo "DONE $(cut -d' ' -f1 /proc/uptime)"
 poweroff -f

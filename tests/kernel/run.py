@@ -28,11 +28,15 @@ ROOT = HERE.parents[1]
 CROSS = "arm-linux-gnueabihf-"
 BOOT_SECONDS = 240
 SKIPPED = 77
+# In real time nobody waits longer than this, but once.
+LONGEST_WAIT_MS = 1000
+LONG_WAIT = "display-part-answers"
+CHECKS = 11  # of real_time.sh
 MEMORY_LIMIT = 4 * 1024 * 1024  # KB; the kernel's symbol reader can run away
 # A nanosecond is an instruction, and a sleep costs nothing: the same run every time.
 VIRTUAL_TIME = ["-icount", "shift=0,sleep=off"]
 APPLETS = ("sh", "mount", "cat", "cut", "grep", "sed", "dmesg", "insmod", "rmmod", "ls", "uname", "poweroff", "sleep",
-           "echo")
+           "echo", "sync")
 
 
 class Failed(Exception):
@@ -83,7 +87,7 @@ def module(kernel, folder, *variables):
     return folder
 
 
-def image(kernel, modules, commands, made):
+def image(kernel, modules, commands, made, more=None):
     """The archive that the kernel boots from."""
     root = made / "root"
     shutil.rmtree(root, ignore_errors=True)
@@ -98,6 +102,8 @@ def image(kernel, modules, commands, made):
         run(f"{CROSS}strip", "--strip-debug", "-o", root / name, modules / name)
     for name, lines in commands.items():
         (root / "scenarios" / name).write_text("".join(line + "\n" for line in lines), encoding="utf-8")
+    if more:
+        shutil.copy(more, root / "more.sh")
     archive = made / "root.cpio.gz"
     run("bash", "-c", 'set -o pipefail; find . | cpio -o -H newc --quiet | gzip -1 >"$0"', archive, cwd=root)
     return archive
@@ -166,6 +172,29 @@ def compare(ktap, title, expected, console):
     ktap.verdict(f"{title} boot: {len(found)} scenarios, {lines} lines", wrong)
 
 
+def checks(ktap, title, console):
+    """A verdict for each check that the kernel made behind the scenarios."""
+    made = [line.split(" ", 1) for line in console if re.match(r"RIGHT |WRONG .*: ", line)]
+    for verdict, what in made:
+        ktap.verdict(f"{title} {what.partition(': ')[0]}", [what] if verdict == "WRONG" else [])
+    if len(made) < CHECKS:
+        ktap.verdict(f"{title} {CHECKS} checks", [f"only {len(made)} were made"])
+
+
+def in_real_time(commands):
+    """(scenarios that a user waits for, those that are left out, with the reason)"""
+    chosen, left_out = {}, {}
+    for name, lines in commands.items():
+        slept = sum(int(line.rpartition("sleep ")[2]) for line in lines if re.search(r"(^|\w )sleep \d+$", line))
+        if any(line.startswith("poke ") for line in lines):
+            left_out[name] = "the object that ships keeps its record to itself"
+        elif slept > LONGEST_WAIT_MS and name != LONG_WAIT:
+            left_out[name] = f"waits for {slept} ms"
+        else:
+            chosen[name] = lines
+    return chosen, left_out
+
+
 def prepared(ktap, program):
     """({scenario: commands}, {scenario: what the board makes of it})"""
     commands, expected = {}, {}
@@ -190,11 +219,18 @@ def compare_all(ktap, cache, made, program, shipped):
     kernel = debian.kernel(cache)
     built = module(kernel, made / "built")
     ktap.verdict(f"pmx.ko built by the build of {kernel.release}")
-    module(kernel, made / "shipped", f"PMX_OBJECT={shipped}")
+    ready = module(kernel, made / "shipped", f"PMX_OBJECT={shipped}")
     ktap.verdict("pmx.ko from the object that ships")
     commands, expected = prepared(ktap, program)
     archive = image(kernel, built, commands, made)
     compare(ktap, "virtual time:", expected, boot(kernel, archive, made / "virtual.log", *VIRTUAL_TIME))
+    commands, left_out = in_real_time(commands)
+    archive = image(kernel, ready, commands, made, HERE / "real_time.sh")
+    console = boot(kernel, archive, made / "real.log")
+    compare(ktap, "real time:", {name: expected[name] for name in commands if name in expected}, console)
+    for name, reason in left_out.items():
+        ktap.skip(f"real time: {name}", reason)
+    checks(ktap, "real time:", console)
 
 
 def main():

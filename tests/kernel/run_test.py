@@ -76,6 +76,36 @@ class Comparison(unittest.TestCase):
             self.assertIn(f"# {line}\n", text)
 
 
+class RealTime(unittest.TestCase):
+    def told(self, console):
+        shown = io.StringIO()
+        with contextlib.redirect_stdout(shown):
+            ktap = run.Ktap()
+            run.checks(ktap, "t", console)
+        return shown.getvalue(), ktap.failures
+
+    def test_checks_that_fail_or_are_missing(self):
+        right = [f"RIGHT {number}" for number in range(run.CHECKS)]
+        self.assertEqual(0, self.told(["noise", *right])[1])
+        text, failures = self.told([*right[1:], "WRONG loads: [ 3 -eq 20 ]"])
+        self.assertEqual(1, failures)
+        self.assertIn(f"# loads: [ 3 -eq 20 ]\nnot ok {run.CHECKS} t loads\n", text)
+        self.assertIn(f"# only {run.CHECKS - 1} were made\n", self.told(right[1:])[0])
+
+    def test_the_number_of_checks_is_that_of_the_script(self):
+        script = (run.HERE / "real_time.sh").read_text(encoding="utf-8")
+        in_a_loop = re.search(r"for last in (.*)", script)[1].count("PMX_")
+        self.assertEqual(run.CHECKS, len(re.findall(r"^ +check ", script, re.M)) + in_a_loop - 1)
+
+    def test_long_waits_are_left_out_but_one(self):
+        chosen, left_out = run.in_real_time({
+            "short": ["sleep 900", "PMX_Init"], "long": ["sleep 600", "sleep 600"], "poke": ["poke 28 4 0"],
+            "inside": ["meanwhile 0 1 x_thread_delay sleep 10000"], run.LONG_WAIT: ["sleep 3005"]})
+        self.assertEqual(["short", run.LONG_WAIT], list(chosen))
+        self.assertEqual({"long", "poke", "inside"}, left_out.keys())
+        self.assertIn(run.LONG_WAIT, {path.stem for path in (ROOT / "scenarios").glob("*.pmx")})
+
+
 class Scenarios(unittest.TestCase):
     def read(self, text):
         with tempfile.TemporaryDirectory() as directory:

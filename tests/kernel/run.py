@@ -31,7 +31,7 @@ SKIPPED = 77
 # In real time nobody waits longer than this, but once.
 LONGEST_WAIT_MS = 1000
 LONG_WAIT = "display-part-answers"
-CHECKS = 11  # of real_time.sh
+CHECKS = 13  # of real_time.sh
 MEMORY_LIMIT = 4 * 1024 * 1024  # KB; the kernel's symbol reader can run away
 # A nanosecond is an instruction, and a sleep costs nothing: the same run every time.
 VIRTUAL_TIME = ["-icount", "shift=0,sleep=off"]

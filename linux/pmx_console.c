@@ -1,18 +1,18 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Console: text is put aside and a work item prints it, so that nobody waits for a serial line, the timer's context
  * least of all. */
+#include <linux/atomic.h>
 #include <linux/kfifo.h>
 #include <linux/module.h>
 #include <linux/printk.h>
-#include <linux/ratelimit.h>
 #include <linux/spinlock.h>
 #include <linux/workqueue.h>
 
 #include "pmx_port.h"
 #include "u_os.h"
 
-#define LONGEST_TEXT 256
-#define ASIDE 16384 /* a whole status report, and some */
+#define LONGEST_TEXT 512 /* as PMX_Printf makes them at most */
+#define ASIDE 16384      /* a whole status report, and some */
 
 static int loglevel = 1;
 module_param(loglevel, int, 0644);
@@ -20,7 +20,7 @@ MODULE_PARM_DESC(loglevel, "the highest level of PMX_IsLog that is printed; -1: 
 
 static STRUCT_KFIFO_REC_2(ASIDE) aside;
 static DEFINE_SPINLOCK(aside_lock);
-static unsigned int lost;
+static atomic_t lost;
 
 static void print_aside(struct work_struct* work)
 {
@@ -32,7 +32,7 @@ static void print_aside(struct work_struct* work)
         text[length] = '\0';
         printk(KERN_INFO "pmx: %s", text);
     }
-    length = xchg(&lost, 0);
+    length = atomic_xchg(&lost, 0);
     if (length)
         pr_warn("pmx: %u lines found no room and are lost\n", length);
 }
@@ -45,7 +45,7 @@ static void put_aside(const CHAR* format, va_list values)
     int length = vscnprintf(text, sizeof(text), format, values);
 
     if (length > 0 && !kfifo_in_spinlocked(&aside, text, length, &aside_lock))
-        lost++;
+        atomic_inc(&lost);
     schedule_work(&print_work);
 }
 

@@ -16,7 +16,7 @@ from tools import ToolError, compiler, in_parallel, run, write
 
 ROOT = signatures.ROOT
 TOOL = ROOT / "tools" / "cost"
-LIBRARIES = ("tools/libpmxboard_lib.a", "tools/librecord_view.a", "board/libpmx_board.a")
+LIBRARIES = ("tools/libpmxboard_language.a", "tools/librecord_view.a", "board/libpmx_board.a")
 
 
 @dataclasses.dataclass(frozen=True)

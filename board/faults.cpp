@@ -129,6 +129,9 @@ void check_outputs(const PlatformFunction& function, const Fault& fault)
 {
     for (const Fault::Output& output : fault.outputs)
     {
+        const auto of_this_name = [&](const Fault::Output& other) { return other.name == output.name; };
+        if (std::count_if(fault.outputs.begin(), fault.outputs.end(), of_this_name) > 1)
+            throw std::invalid_argument(fault.function + ": " + output.name + " is set twice");
         const PlatformParameter* const parameter = find_parameter(function, output.name);
         if (parameter == nullptr || !parameter->is_output)
         {

@@ -204,6 +204,7 @@ TEST_F(BoardC, BadInput_IsTold)
     refused(board_c_do("\xFF\x1B"), "no command \\xFF\\x1B");
     refused(board_c_do("PMX_Inti"), "PMX_Init");
     refused(board_c_do("fault TVE_SetEnable 1"), "has no result");
+    refused(board_c_do("fault x_timer_create -1 always phTimer=9 phTimer=8"), "phTimer is set twice");
     refused(board_c_do("power-on nowhere"), "no such board: nowhere");
     refused(board_c_do("state \"unclosed"), "");
     refused(board_c_expect(nullptr), "no expectation is given");

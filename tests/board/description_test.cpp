@@ -310,6 +310,7 @@ TEST_F(BoardFile, FaultsWhoseArgumentsOrOutputsCannotBeMeant)
               fault("x_timer_create", "outputs = 7\n"));
     EXPECT_EQ("/player/board.toml:2: x_timer_create has no output hTimer; it has phTimer",
               fault("x_timer_create", "outputs = { hTimer = 7 }\n"));
+    EXPECT_NE("nothing", fault("x_timer_create", "outputs = { phTimer = 7, phTimer = 8 }\n")) << "set twice";
 }
 
 TEST_F(BoardFile, Product)

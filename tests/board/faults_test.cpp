@@ -185,6 +185,8 @@ TEST_F(Faults, ArgumentsAndOutputs_AreRefusedWithTheReason)
     EXPECT_EQ("fgPmxDrvSetAvd: pvParameter: a record's field is written NAME=VALUE, not 1",
               of("fgPmxDrvSetAvd(*, {1}, *)"));
     EXPECT_EQ("x_timer_create has no output hTimer; it has phTimer", of("x_timer_create", { { "hTimer", "1" } }));
+    EXPECT_EQ("x_timer_create: phTimer is set twice", of("x_timer_create", { { "phTimer", "9" }, { "phTimer", "8" } }));
+    EXPECT_EQ(1u, board::faults::state().items().size()) << "the one that was accepted";
     EXPECT_EQ("x_sema_lock has no output hSema", of("x_sema_lock", { { "hSema", "1" } }));
     EXPECT_EQ("i4ImQueryInterface: ppvIf is the address of something, and a fault has none to hand out",
               of("i4ImQueryInterface", { { "ppvIf", "0" } }));

@@ -44,6 +44,15 @@ std::list<Script>& scripts()
     return instance;
 }
 
+/** Null pointer when the platform has none of this name. */
+const PlatformFunction* find_function(std::string_view name)
+{
+    const auto functions = platform_functions();
+    const auto found = std::find_if(functions.begin(), functions.end(),
+                                    [&](const PlatformFunction& function) { return function.name == name; });
+    return found == functions.end() ? nullptr : &*found;
+}
+
 std::string names_of(const PlatformFunction& function, bool (*wanted)(const PlatformParameter&))
 {
     std::string text;
@@ -96,6 +105,13 @@ void check_matcher(const std::string& function, const PlatformParameter& paramet
     }
 }
 
+[[noreturn]] void refuse_count(const PlatformFunction& function, std::size_t written)
+{
+    throw std::invalid_argument(std::string(function.name) + " has " + std::to_string(function.parameters.size()) +
+                                " arguments (" + names_of(function, [](const PlatformParameter&) { return true; }) +
+                                "), not " + std::to_string(written) + "; ... stands for the rest");
+}
+
 void check_arguments(const PlatformFunction& function, const Fault& fault)
 {
     if (fault.arguments.empty())
@@ -106,9 +122,7 @@ void check_arguments(const PlatformFunction& function, const Fault& fault)
         tokens.pop_back();
     const std::size_t count = function.parameters.size();
     if (tokens.size() > count || (tokens.size() < count && !is_open))
-        throw std::invalid_argument(fault.function + " has " + std::to_string(count) + " arguments (" +
-                                    names_of(function, [](const PlatformParameter&) { return true; }) + "), not " +
-                                    std::to_string(tokens.size()) + "; ... stands for the rest");
+        refuse_count(function, tokens.size());
     for (std::size_t i = 0; i < tokens.size(); ++i)
     {
         std::string_view token = tokens[i];
@@ -151,6 +165,43 @@ void check_outputs(const PlatformFunction& function, const Fault& fault)
             throw std::invalid_argument(fault.function + ": " + output.name + ": " + error.what());
         }
     }
+}
+
+/** One spelling for all that mean the same: 0x1 is 1, and so is what is called so. */
+std::string plain(std::string_view token)
+{
+    const auto together = [](std::string_view parts) {
+        std::string text;
+        for (const std::string_view part : tokens::split(parts))
+            text += (text.empty() ? "" : ", ") + plain(part);
+        return text;
+    };
+    if (token.starts_with('['))
+        return "[" + together(tokens::inside(token, '[', ']')) + "]";
+    if (token.starts_with('{'))
+        return "{" + together(tokens::inside(token, '{', '}')) + "}";
+    const std::size_t equals = token.find_first_of("={[\"");
+    if (equals != token.npos && token[equals] == '=')
+        return std::string(tokens::trim(token.substr(0, equals))) + "=" + plain(tokens::trim(token.substr(equals + 1)));
+    const auto number = tokens::number(token);
+    const auto named = number ? number : names::number_of(token);
+    return named ? std::to_string(*named) : std::string(token);
+}
+
+/** The arguments one by one, by their places; what does not matter at the end is left out. */
+std::vector<std::string> plain_arguments(std::string_view arguments)
+{
+    std::vector<std::string> all;
+    for (std::string_view token : tokens::split(arguments))
+    {
+        const std::size_t equals = token.find_first_of("={[\"");
+        if (equals != token.npos && token[equals] == '=')
+            token = tokens::trim(token.substr(equals + 1));
+        all.push_back(plain(token));
+    }
+    while (!all.empty() && (all.back() == "*" || is_rest(all.back())))
+        all.pop_back();
+    return all;
 }
 
 bool is_over(const Script& script)
@@ -205,10 +256,8 @@ Value answer_of(const Fault& fault)
 
 void check(const Fault& fault)
 {
-    const auto functions = platform_functions();
-    const auto found = std::find_if(functions.begin(), functions.end(),
-                                    [&](const PlatformFunction& function) { return function.name == fault.function; });
-    if (found == functions.end())
+    const PlatformFunction* const found = find_function(fault.function);
+    if (found == nullptr)
         throw std::invalid_argument("no platform function is called " + fault.function +
                                     nearest_functions(fault.function, true));
     if (!found->has_result)
@@ -237,8 +286,10 @@ void clear(std::string_view function)
 
 void clear(std::string_view function, std::string_view arguments)
 {
-    scripts().remove_if(
-        [&](const Script& script) { return script.fault.function == function && script.fault.arguments == arguments; });
+    const std::vector<std::string> meant = plain_arguments(arguments);
+    scripts().remove_if([&](const Script& script) {
+        return script.fault.function == function && plain_arguments(script.fault.arguments) == meant;
+    });
 }
 
 void clear_all()
@@ -265,10 +316,15 @@ std::pair<std::string, std::string> read_call(std::string_view written)
     if (tokens::closing(written, open) != written.size() - 1)
         throw std::invalid_argument("behind a call's arguments nothing may stand: " + std::string(written));
     std::string arguments(tokens::trim(written.substr(open + 1, written.size() - open - 2)));
+    std::string function(tokens::trim(written.substr(0, open)));
+    // They would mean a call with no arguments, which nobody can make.
+    if (const PlatformFunction* const known = find_function(function);
+        known != nullptr && arguments.empty() && !known->parameters.empty())
+        refuse_count(*known, 0);
     // Whatever it is called with.
     if (is_rest(arguments))
         arguments.clear();
-    return { std::string(tokens::trim(written.substr(0, open))), std::move(arguments) };
+    return { std::move(function), std::move(arguments) };
 }
 
 std::string to_text(const Fault& fault)

@@ -201,7 +201,7 @@ namespace faults
 void set(const Fault& fault);
 /** Take back all faults of a function. */
 void clear(std::string_view function);
-/** Take back the one for these arguments, written as they were. */
+/** Take back the one for these arguments, however they are written. */
 void clear(std::string_view function, std::string_view arguments);
 void clear_all();
 std::vector<Fault> active();

@@ -117,6 +117,45 @@ TEST_F(Faults, Arguments_EachHaveAFaultOfTheirOwn)
     EXPECT_TRUE(board::faults::active().empty());
 }
 
+TEST_F(Faults, Arguments_ThatMeanTheSame_AreTheSame)
+{
+    const auto left = [](const std::string& one, const std::string& other) {
+        board::faults::clear_all();
+        board::faults::set(fault_of(one, 0));
+        board::faults::set(fault_of(other, 1));
+        return board::faults::active().size();
+    };
+    EXPECT_EQ(1u, left("x_sema_lock(1, 0x1)", "x_sema_lock(0x1, 1)"));
+    EXPECT_EQ(1u, left("x_sema_lock(1, X_SEMA_OPTION_NOWAIT)",
+                       "x_sema_lock(hSema=1,eOption = " + std::to_string(X_SEMA_OPTION_NOWAIT) + ")"));
+    EXPECT_EQ(1u, left("x_sema_lock(1, *)", "x_sema_lock(1, ...)"));
+    EXPECT_EQ(1u, left("x_sema_lock", "x_sema_lock(*, *)"));
+    EXPECT_EQ(1u, left("fgPmxDrvGetAvdInfo(*, {u4ResCheck=RES_480P, ...})",
+                       "fgPmxDrvGetAvdInfo(*, { u4ResCheck = " + std::to_string(RES_480P) + ", ... })"));
+    EXPECT_EQ(
+        2u, left("fgPmxDrvGetAvdInfo(*, {u4ResCheck=RES_480P, ...})", "fgPmxDrvGetAvdInfo(*, {u4ResCheck=RES_480P})"));
+    EXPECT_EQ(2u, left("get_part_id_by_name(\"1\")", "get_part_id_by_name(\"0x1\")")) << "texts are no numbers";
+    EXPECT_EQ(2u, left("x_sema_lock(1, ...)", "x_sema_lock(2, ...)"));
+    board::faults::clear("x_sema_lock", "0x2, *");
+    EXPECT_EQ(1u, board::faults::active().size());
+}
+
+TEST_F(Faults, EmptyBrackets_AreACallWithoutArguments)
+{
+    const auto read = [](const std::string& call) {
+        try
+        {
+            return board::faults::read_call(call).first;
+        }
+        catch (const std::invalid_argument& error)
+        {
+            return std::string(error.what());
+        }
+    };
+    EXPECT_EQ("x_sema_lock has 2 arguments (hSema, eOption), not 0; ... stands for the rest", read("x_sema_lock( )"));
+    EXPECT_EQ("fgIsHotPlugChgRes", read("fgIsHotPlugChgRes()"));
+}
+
 TEST_F(Faults, For_LastsForATimeOfTheBoardsClock)
 {
     board::advance(std::chrono::seconds(1));

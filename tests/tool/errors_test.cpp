@@ -131,6 +131,11 @@ TEST(ScenarioErrors, Numbers_OutOfRange)
               diagnostics("fault x_timer_create 4294967296"));
     EXPECT_EQ("here.pmx:1: x_timer_create: phTimer is set twice\n",
               diagnostics("fault x_timer_create -1 always phTimer=9 phTimer=8"));
+    const std::string arguments = "here.pmx:1: x_sema_lock has 2 arguments (hSema, eOption), not 0; ... stands for "
+                                  "the rest\n";
+    EXPECT_EQ(arguments, diagnostics("fault x_sema_lock() -1"));
+    EXPECT_EQ(arguments, diagnostics("fault x_sema_lock() off"));
+    EXPECT_NE("", diagnostics("fault x_sema_lock(1,,2) off"));
     EXPECT_EQ("here.pmx:1: the call's number is 1 to 2147483647, not 0\n", diagnostics("fault x_timer_create -1 on 0"));
     EXPECT_EQ("here.pmx:1: the time in s is 0 to 31622400, not 31622401\n", diagnostics("advance 31622401s"));
     EXPECT_EQ("here.pmx:1: the console's level is -1 to 1000, not 1001\n", diagnostics("loglevel 1001"));

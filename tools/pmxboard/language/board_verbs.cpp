@@ -104,12 +104,17 @@ void set_fault(Session&, const Words& words)
 }
 
 void clear_fault(Session&, const Words& words)
+try
 {
     const auto [function, arguments] = faulted_call(words);
     if (arguments.empty())
         board::faults::clear(function);
     else
         board::faults::clear(function, arguments);
+}
+catch (const std::invalid_argument& error)
+{
+    throw LineError(error.what());
 }
 
 void clear_faults(Session&, const Words&)

@@ -53,8 +53,7 @@ void power_on(const Description& wanted)
         mixer::check_order(arrangement.order);
     threads::end_all();
     meanwhiles::forget_all();
-    for (const Fault& fault : given.faults)
-        faults::check(fault);
+    faults::check_all(given.faults);
     layer_state::restore();
     board_state = { given, 0 };
     for (const Device& device : devices)

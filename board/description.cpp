@@ -427,6 +427,14 @@ void read_faults(const File& file, const toml::node& node, Description& descript
         file.wrong(node.source(), "fault has to be a list of tables: [[fault]]");
     for (const toml::node& item : *list)
         description.faults.push_back(read_fault(file, item));
+    try
+    {
+        faults::check_all(description.faults);
+    }
+    catch (const std::invalid_argument& error)
+    {
+        file.wrong(node.source(), error.what());
+    }
 }
 
 Description read(const File& file, const toml::table& root)

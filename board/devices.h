@@ -140,6 +140,8 @@ void power_on(const Description& description);
 Value state();
 /** Throws std::invalid_argument when a fault cannot be scripted: see faults::set. */
 void check(const Fault& fault);
+/** The same of those that are to be in force together, and of how many there are. */
+void check_all(const std::vector<Fault>& faults);
 /** Counts a call that begins; the fault that is due. */
 std::optional<Fault> due(const TraceEntry& call);
 } // namespace faults

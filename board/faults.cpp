@@ -204,6 +204,19 @@ std::vector<std::string> plain_arguments(std::string_view arguments)
     return all;
 }
 
+bool is_same_call(const Fault& one, const Fault& other)
+{
+    return one.function == other.function && plain_arguments(one.arguments) == plain_arguments(other.arguments);
+}
+
+/** Each call of the platform is held against all of them. */
+void refuse_too_many(std::size_t count)
+{
+    constexpr std::size_t most = 256;
+    if (count > most)
+        throw std::invalid_argument("more than " + std::to_string(most) + " faults at once");
+}
+
 bool is_over(const Script& script)
 {
     return script.fault.when == Fault::When::For && now() >= script.until;
@@ -272,10 +285,21 @@ void check(const Fault& fault)
     check_outputs(*found, fault);
 }
 
+void check_all(const std::vector<Fault>& faults)
+{
+    refuse_too_many(faults.size());
+    for (const Fault& fault : faults)
+        check(fault);
+}
+
 void set(const Fault& fault)
 {
     check(fault);
-    clear(fault.function, fault.arguments);
+    scripts().remove_if(is_over);
+    const auto replaced = [&](const Script& script) { return is_same_call(script.fault, fault); };
+    refuse_too_many(scripts().size() + 1 -
+                    static_cast<std::size_t>(std::count_if(scripts().begin(), scripts().end(), replaced)));
+    scripts().remove_if(replaced);
     scripts().push_back({ fault, 0, now() + fault.time });
 }
 
@@ -286,10 +310,8 @@ void clear(std::string_view function)
 
 void clear(std::string_view function, std::string_view arguments)
 {
-    const std::vector<std::string> meant = plain_arguments(arguments);
-    scripts().remove_if([&](const Script& script) {
-        return script.fault.function == function && plain_arguments(script.fault.arguments) == meant;
-    });
+    const Fault meant{ std::string(function), 0, Fault::When::On, 1, std::string(arguments) };
+    scripts().remove_if([&](const Script& script) { return is_same_call(script.fault, meant); });
 }
 
 void clear_all()

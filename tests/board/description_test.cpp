@@ -313,6 +313,14 @@ TEST_F(BoardFile, FaultsWhoseArgumentsOrOutputsCannotBeMeant)
     EXPECT_NE("nothing", fault("x_timer_create", "outputs = { phTimer = 7, phTimer = 8 }\n")) << "set twice";
 }
 
+TEST_F(BoardFile, Faults_AreNotTooMany)
+{
+    std::string faults;
+    for (unsigned i = 0; i < 257; ++i)
+        faults += "[[fault]]\nfunction = \"x_sema_lock(" + std::to_string(i) + ", *)\"\nanswer = -1\n";
+    EXPECT_EQ("/player/board.toml:1: more than 256 faults at once", wrong(faults));
+}
+
 TEST_F(BoardFile, Product)
 {
     const Description description = load(R"(

@@ -156,6 +156,30 @@ TEST_F(Faults, EmptyBrackets_AreACallWithoutArguments)
     EXPECT_EQ("fgIsHotPlugChgRes", read("fgIsHotPlugChgRes()"));
 }
 
+TEST_F(Faults, TheirNumber_HasALimit)
+{
+    const auto one = [](unsigned i) { return fault_of("get_part_id_by_name(\"" + std::to_string(i) + "\")", 1); };
+    const std::string refused = "more than 256 faults at once";
+    board::Description description;
+    for (unsigned i = 0; i < 256; ++i)
+        description.faults.push_back(one(i));
+    board::power_on(description);
+    EXPECT_EQ(refused, refusal(one(256)));
+    EXPECT_EQ("accepted", refusal(one(255))) << "it replaces one";
+    EXPECT_EQ(256u, board::faults::active().size());
+    board::faults::clear("get_part_id_by_name", "\"0\"");
+    Fault brief = one(256);
+    brief.when = When::For;
+    brief.time = std::chrono::seconds(1);
+    EXPECT_EQ("accepted", refusal(brief));
+    EXPECT_EQ(refused, refusal(one(257)));
+    board::advance(std::chrono::seconds(1));
+    EXPECT_EQ("accepted", refusal(one(257))) << "one is over";
+    description.faults.push_back(one(256));
+    EXPECT_THROW(board::power_on(description), std::invalid_argument);
+    EXPECT_EQ(256u, board::faults::active().size()) << "nothing has changed";
+}
+
 TEST_F(Faults, For_LastsForATimeOfTheBoardsClock)
 {
     board::advance(std::chrono::seconds(1));

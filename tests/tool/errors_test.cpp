@@ -136,6 +136,10 @@ TEST(ScenarioErrors, Numbers_OutOfRange)
     EXPECT_EQ(arguments, diagnostics("fault x_sema_lock() -1"));
     EXPECT_EQ(arguments, diagnostics("fault x_sema_lock() off"));
     EXPECT_NE("", diagnostics("fault x_sema_lock(1,,2) off"));
+    std::string many;
+    for (unsigned i = 0; i < 257; ++i)
+        many += "fault x_sema_lock(" + std::to_string(i) + ", *) -1\n";
+    EXPECT_EQ("here.pmx:257: more than 256 faults at once\n", diagnostics(many));
     EXPECT_EQ("here.pmx:1: the call's number is 1 to 2147483647, not 0\n", diagnostics("fault x_timer_create -1 on 0"));
     EXPECT_EQ("here.pmx:1: the time in s is 0 to 31622400, not 31622401\n", diagnostics("advance 31622401s"));
     EXPECT_EQ("here.pmx:1: the console's level is -1 to 1000, not 1001\n", diagnostics("loglevel 1001"));

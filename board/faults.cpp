@@ -243,6 +243,17 @@ bool counts_to_due(Script& script)
     return true;
 }
 
+/** As it would be set now, to do the same. */
+Fault rest_of(const Script& script)
+{
+    Fault rest = script.fault;
+    if (rest.when == Fault::When::For)
+        rest.time = script.until - now();
+    else if (rest.when != Fault::When::Always)
+        rest.n -= std::min(script.calls, rest.n - 1);
+    return rest;
+}
+
 std::string call_text(const Fault& fault)
 {
     return fault.arguments.empty() ? fault.function : fault.function + "(" + fault.arguments + ")";
@@ -325,7 +336,7 @@ std::vector<Fault> active()
     for (const Script& script : scripts())
     {
         if (!is_over(script))
-            faults.push_back(script.fault);
+            faults.push_back(rest_of(script));
     }
     return faults;
 }

@@ -204,7 +204,7 @@ void clear(std::string_view function);
 /** Take back the one for these arguments, however they are written. */
 void clear(std::string_view function, std::string_view arguments);
 void clear_all();
-std::vector<Fault> active();
+std::vector<Fault> active(); ///< with what is left of calls and time
 
 /** "fgPmxDrvSetAvd(PMX_SET_HDMI_RES_CHG, ...)" taken apart: the function, and what stands in the brackets. Throws
  *  std::invalid_argument when they do not close. */

@@ -285,6 +285,36 @@ TEST_F(Faults, ToText_IsAsAScenarioHasIt)
               board::faults::state().to_text());
 }
 
+TEST_F(Faults, Active_TellsWhatIsLeft)
+{
+    const auto listed = [] {
+        std::string text;
+        for (const Fault& fault : board::faults::active())
+            text += board::faults::to_text(fault) + "\n";
+        return text;
+    };
+    board::faults::set({ "get_part_id_by_name", 7, When::On, 4 });
+    board::faults::set({ "get_part_id_by_name", 8, When::From, 3, "\"none\"" });
+    Fault brief{ "x_timer_stop", -1, When::For };
+    brief.time = std::chrono::seconds(5);
+    board::faults::set(brief);
+    board::faults::set({ "x_sema_lock", -1, When::Always });
+    EXPECT_EQ("get_part_id_by_name 7 on 4\nget_part_id_by_name(\"none\") 8 from 3\nx_timer_stop -1 for 5s\n"
+              "x_sema_lock -1 always\n",
+              listed());
+    ask(2);
+    board::advance(std::chrono::milliseconds(4600));
+    EXPECT_EQ("get_part_id_by_name 7 on 2\nget_part_id_by_name(\"none\") 8 from 1\nx_timer_stop -1 for 400ms\n"
+              "x_sema_lock -1 always\n",
+              listed());
+    ask(1);
+    board::advance(std::chrono::milliseconds(400));
+    EXPECT_EQ("get_part_id_by_name 7\nget_part_id_by_name(\"none\") 8 from 1\nx_sema_lock -1 always\n", listed())
+        << "the next call";
+    EXPECT_EQ((Answers{ 8 }), ask(1)) << "the one that was set last";
+    EXPECT_EQ("get_part_id_by_name(\"none\") 8 from 1\nx_sema_lock -1 always\n", listed());
+}
+
 TEST_F(Faults, On_AnswersThatCallAlone)
 {
     board::faults::set({ "get_part_id_by_name", 7 });

@@ -88,6 +88,15 @@ TEST(Verbs, Fault_FromTheNthCall_UntilItIsTakenBack)
                   "fault get_part_id_by_name off\nPMX_GetHDMIDefaultRes\nexpect call get_part_id_by_name(*) = 0"));
 }
 
+TEST(Verbs, Fault_IsListedWithWhatIsLeft)
+{
+    const std::string shown = tool_test::run("fault get_part_id_by_name 7 from 3\nfault x_timer_stop -1 for 5s\n"
+                                             "PMX_GetHDMIDefaultRes\nadvance 2s\nfault")
+                                  .shown;
+    EXPECT_NE(std::string::npos, shown.find("  fault get_part_id_by_name 7 from 2\n  fault x_timer_stop -1 for 3s\n"))
+        << shown;
+}
+
 TEST(Verbs, Fault_OfTheCallsThatAreMeant)
 {
     EXPECT_EQ("", diagnostics("PMX_Init\nfault fgPmxDrvSetAvd(PMX_SET_HDMI_HUE, ...) FALSE always\n"

@@ -164,6 +164,12 @@ TEST_F(Restore, FilesAreFoundWhereTheLinesStood)
     EXPECT_TRUE(run_here(restore()).starts_with(
         "here.pmx:1: " + saved() + " cannot be restored: its command 2, flash fast_init_param images/boot-576p.bin: "))
         << run_here(restore());
+    std::filesystem::remove(m_directory / "boards/plane-delays.toml");
+    EXPECT_TRUE(
+        run_here(restore()).starts_with("here.pmx:1: " + saved() +
+                                        " cannot be restored: its command 1, power-on boards/plane-delays.toml: the "
+                                        "board cannot be powered on: "))
+        << run_here(restore());
 }
 
 TEST_F(Restore, WhatLeadsElsewhere_IsRefused_AndNothingHasChanged)

@@ -92,7 +92,9 @@ void Session::run_step(const Step& step)
     }
     catch (const std::exception&)
     {
-        return;
+        // But a power-on that fails powers nothing on, and is never kept.
+        if (line.word(0) == "power-on")
+            throw;
     }
 }
 

@@ -25,11 +25,10 @@ std::set<std::pair<dev_t, ino_t>>& inputs()
     return instance;
 }
 
-bool note(const struct stat& status)
+void note(const struct stat& status)
 {
     if (S_ISREG(status.st_mode))
         inputs().insert({ status.st_dev, status.st_ino });
-    return S_ISREG(status.st_mode);
 }
 
 [[noreturn]] void cannot_read(const std::string& name)
@@ -43,7 +42,8 @@ bool note(const struct stat& status)
 class Reader
 {
 public:
-    explicit Reader(std::string name) : m_name(std::move(name)), m_file(open(m_name.c_str(), O_RDONLY | O_CLOEXEC))
+    explicit Reader(std::string name, bool is_noted = true)
+        : m_name(std::move(name)), m_file(open(m_name.c_str(), O_RDONLY | O_CLOEXEC)), m_is_noted(is_noted)
     {
         if (m_file < 0)
             cannot_read(m_name);
@@ -95,12 +95,15 @@ private:
         };
         if (fstat(m_file, &status) != 0)
             cannot_read(m_name);
-        m_is_plain = note(status);
+        m_is_plain = S_ISREG(status.st_mode);
+        if (m_is_noted)
+            note(status);
     }
 
     std::string m_name;
     int m_file;
     bool m_is_own = true;
+    bool m_is_noted = true;
     bool m_is_plain = false;
 };
 
@@ -146,6 +149,11 @@ std::unique_ptr<Reader> reader_of(const std::string& name)
 std::string read(const std::filesystem::path& file, std::size_t most)
 {
     return Reader(file.string()).read_all(most);
+}
+
+std::string read_once(const std::filesystem::path& file, std::size_t most)
+{
+    return Reader(file.string(), false).read_all(most);
 }
 
 std::string read_named(const std::string& name, std::size_t most)

@@ -27,7 +27,9 @@ inline constexpr std::size_t longest_line = mebibyte;
 
 /** All bytes of a file. Throws FileError. */
 std::string read(const std::filesystem::path& file, std::size_t most = largest);
-/** The same where "-" is the standard input. */
+/** The same of a file that nobody looks at again: this process may write it. */
+std::string read_once(const std::filesystem::path& file, std::size_t most = largest);
+/** As read() where "-" is the standard input. */
 std::string read_named(const std::string& name, std::size_t most = largest);
 
 /** A file for next_line(), "-" being the standard input. It is opened once; a plain one is read at once, anything else
@@ -36,7 +38,7 @@ std::unique_ptr<std::istream> open_lines(const std::string& name);
 /** The next line without its end; false when there is none. Throws FileError for one that is too long. */
 bool next_line(std::istream& lines, std::string& line);
 
-/** Remember a file as one that this process reads; reading it does so, too. */
+/** Remember a file as one that this process reads; reading it does so, too, but for read_once(). */
 void note_input(const std::filesystem::path& file);
 /** Whether the process reads this file, whatever it is called. */
 bool is_input(const std::filesystem::path& file);

@@ -26,7 +26,6 @@ using pmxboard::StateDump;
 class Restore : public ProgramRun
 {
 protected:
-    /** A file that this process has read it does not write. */
     std::string saved() const { return file(m_name + ".json"); }
     std::string save() const { return "save " + saved() + "\n"; }
     std::string restore() const { return "restore " + saved() + "\n"; }
@@ -224,6 +223,15 @@ TEST_F(Restore, StatesThatNoLinesLeadTo_AreToldApart)
               run_here("meanwhile x_sema_lock restore x.json"));
     EXPECT_TRUE(run_here("restore no-such.json").starts_with("here.pmx:1: cannot read no-such.json"))
         << run_here("restore no-such.json");
+}
+
+TEST_F(Restore, TheFileMayBeSavedAnew_UnlessSomethingElseReadsIt)
+{
+    EXPECT_EQ("", run_here("PMX_Init\n" + save() + restore() + "PMX_SetTvType 0 PMX_TV_TYPE_PAL\n" + save()));
+    EXPECT_EQ("", run_here(restore() + "expect state ucTvType PMX_TV_TYPE_PAL\n" + save()));
+    EXPECT_TRUE(run_here("PMX_Init\nflash other " + saved() + "\n" + restore() + save())
+                    .starts_with("here.pmx:4: cannot write " + saved() + ": this run reads it"))
+        << "it is an image as well";
 }
 
 TEST_F(Restore, ABreakpointDoesNotStopIt)

@@ -96,7 +96,7 @@ void restore(Session& session, const Words& words)
     StateDump dump;
     try
     {
-        dump = read_dump(board::files::read(name, largest_state));
+        dump = read_dump(board::files::read_once(name, largest_state));
     }
     catch (const board::files::FileError& error)
     {

@@ -4,6 +4,8 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdio>
+#include <filesystem>
 #include <functional>
 #include <string>
 
@@ -143,6 +145,49 @@ TEST_F(BoardC, Console_IsKeptAndShown)
     board_c_console_level(9);
     PMX_IsLog(9, "%s", "fourth\n");
     EXPECT_STREQ("second\nthird\nfourth\n", board_c_console());
+}
+
+/** What a call of this prints on the standard output. */
+template <typename Call>
+std::string printed_by(const Call& call)
+{
+    testing::internal::CaptureStdout();
+    call();
+    std::fflush(stdout);
+    return testing::internal::GetCapturedStdout();
+}
+
+TEST_F(BoardC, Console_OfWhatOnlyMightHappen_IsNotShown)
+{
+    const std::string file = (std::filesystem::temp_directory_path() / "board_c_console.json").string();
+    board_c_show_console(1);
+    EXPECT_EQ("", printed_by([] { board_c_do("what-if PMX_QueryStatus"); }));
+    EXPECT_NE("", printed_by([] { board_c_do("PMX_QueryStatus"); })) << "it prints something";
+    EXPECT_EQ(0, board_c_power_on("default"));
+    EXPECT_NE("", printed_by([] { board_c_do("PMX_QueryStatus"); }));
+    EXPECT_EQ(0, board_c_do(("save " + file).c_str()));
+    EXPECT_EQ("", printed_by([&] { EXPECT_EQ(0, board_c_do(("restore " + file).c_str())); }));
+    EXPECT_NE("", printed_by([] { board_c_do("PMX_QueryStatus"); })) << "behind it all is shown again";
+    board_c_show_console(0);
+    std::filesystem::remove(file);
+}
+
+void print_much(void*)
+{
+    for (unsigned i = 0; i < 10'000; ++i)
+        std::printf("a line of the program's own\n");
+}
+
+TEST_F(BoardC, WhatTheProgramHasPrinted_IsNotPrintedTwice)
+{
+    EXPECT_EQ(0, board_c_meanwhile("PMX_HalSetTvType", 1, 0, print_much, nullptr));
+    const std::string printed = printed_by([] {
+        std::printf("before, ");
+        EXPECT_EQ(0, board_c_do("what-if PMX_SetTvType 0 PMX_TV_TYPE_PAL"));
+    });
+    EXPECT_EQ(0u, printed.find("before, "));
+    EXPECT_EQ(std::string::npos, printed.find("before, ", 1));
+    EXPECT_EQ(0, board_c_do("meanwhile off"));
 }
 
 std::string seen_inside;

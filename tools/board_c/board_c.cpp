@@ -123,10 +123,14 @@ void need_place(const void* place, const char* what)
         throw std::runtime_error(std::string("no place for ") + what + " is given");
 }
 
+/** What only might happen, or happens once more on the way to a saved state, nobody has asked for. */
 void show_console()
 {
     if (console_shown)
-        board::set_console([](std::string_view text) { std::fwrite(text.data(), 1, text.size(), stdout); });
+        board::set_console([](std::string_view text) {
+            if (bench == nullptr || !(bench->session.imagines() || bench->session.is_restoring()))
+                std::fwrite(text.data(), 1, text.size(), stdout);
+        });
     else
         board::set_console({});
 }

@@ -8,6 +8,7 @@
 
 #include <cerrno>
 #include <csignal>
+#include <cstdio>
 #include <cstring>
 #include <ostream>
 #include <stdexcept>
@@ -111,6 +112,7 @@ Apart run_apart(const std::function<std::string(std::ostream& shown)>& function)
 {
     const MemoryFile shown;
     const MemoryFile answer;
+    std::fflush(nullptr); // or what waits in the buffers could be written by both
     const pid_t copy = fork();
     if (copy < 0)
         throw std::runtime_error(std::string("no copy of the process: ") + std::strerror(errno));

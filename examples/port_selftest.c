@@ -3,9 +3,10 @@
  * the port and call i4PortSelftest, before PMX_Init; compiled with PORT_SELFTEST_MAIN it has a main of its own, which
  * prints by the C library. It needs nothing else but the platform's headers and functions.
  *
- * Each contract is a line in the form of TAP, "ok 1 - x_timer_start: …" or "not ok 1 - …". The default part changes
- * nothing that is seen or heard: it makes semaphores and timers of its own and deletes them, sleeps for some seconds,
- * and asks drivers what they know. The hardware's part programs the mixer: the picture may jump.
+ * Each contract is a line in the form of TAP, "ok 1 - x_timer_start: …" or "not ok 1 - …"; before each group of them a
+ * comment, "# x_timer_start", names the functions that are called next, for a crash tells no more. The default part
+ * changes nothing that is seen or heard: it makes semaphores and timers of its own and deletes them, sleeps for some
+ * seconds, and asks drivers what they know. The hardware's part programs the mixer: the picture may jump.
  *
  * What a single thread cannot see is not here: that a mutex keeps others out, that an expiry cannot sleep. */
 #include "drv_av_d.h"
@@ -76,6 +77,16 @@ static void vCheck(const char* szWhat, int i4Met)
     vTell(i4Met != 0, szWhat, "");
 }
 
+/* Told before they are called: who crashes tells nothing any more. */
+static void vAbout(const char* szFunctions)
+{
+    char acLine[LINE_SIZE] = "";
+    const char* const pcEnd = acLine + sizeof acLine - 1;
+
+    pcAppend(pcAppend(acLine, pcEnd, "# "), pcEnd, szFunctions);
+    pfTell(acLine);
+}
+
 /* What this machine has not cannot be wrong. */
 static void vSkip(const char* szWhat, const char* szWhy)
 {
@@ -127,6 +138,7 @@ static void vCheckMutex(void)
 {
     HANDLE_T hMutex = NO_HANDLE;
 
+    vAbout("x_sema_create, x_sema_lock, x_sema_unlock, x_sema_delete");
     vCheck("x_sema_create: a mutex is created with OSR_OK", x_sema_create(&hMutex, X_SEMA_TYPE_MUTEX, 1) == OSR_OK);
     vCheck("x_sema_create: its handle is written, and is not 0", hMutex != NO_HANDLE);
     vCheck("x_sema_lock: a free mutex is taken with OSR_OK", x_sema_lock(hMutex, X_SEMA_OPTION_WAIT) == OSR_OK);
@@ -206,15 +218,19 @@ static void vCheckTimer(void)
 {
     HANDLE_T hTimer = NO_HANDLE;
 
+    vAbout("x_timer_create, x_timer_stop");
     vCheck("x_timer_create: a timer is created with OSR_OK", x_timer_create(&hTimer) == OSR_OK);
     vCheck("x_timer_create: its handle is written, and is not 0", hTimer != NO_HANDLE);
     vCheck("x_timer_stop: a timer that does not run is stopped with OSR_OK", x_timer_stop(hTimer) == OSR_OK);
+    vAbout("x_timer_start, x_thread_delay");
     vCheckExpiry(hTimer);
     vCheckRestart(hTimer);
+    vAbout("x_timer_stop, x_timer_start, x_thread_delay");
     i4Start(hTimer);
     vCheck("x_timer_stop: a running timer is stopped with OSR_OK", x_timer_stop(hTimer) == OSR_OK);
     x_thread_delay(LATER_MS);
     vCheck("x_timer_stop: it does not run out any more", u4Expiries == 0);
+    vAbout("x_timer_delete, x_timer_start, x_timer_stop, x_thread_delay");
     i4Start(hTimer);
     vCheck("x_timer_delete: a running timer is deleted with OSR_OK", x_timer_delete(hTimer) == OSR_OK);
     x_thread_delay(LATER_MS);
@@ -230,6 +246,7 @@ static void vCheckSleep(void)
 {
     HANDLE_T hTimer = NO_HANDLE;
 
+    vAbout("x_thread_delay, x_timer_create, x_timer_start, x_timer_delete");
     x_timer_create(&hTimer);
     i4Start(hTimer);
     x_thread_delay(INTERVAL_MS * 3);
@@ -256,8 +273,10 @@ static void vCheckFormat(void)
 {
     CHAR acText[TEXT_SIZE];
     const CHAR* volatile szNull = NULL; /* so that no compiler sees it */
-    INT32 i4Length = i4Format(acText, sizeof acText, "%d,%s,%8X,%%", -7, "text", 0xC0DEu);
+    INT32 i4Length;
 
+    vAbout("x_vsnprintf");
+    i4Length = i4Format(acText, sizeof acText, "%d,%s,%8X,%%", -7, "text", 0xC0DEu);
     vCheck("x_vsnprintf: numbers, texts and widths are formatted", i4SameText(acText, "-7,text,    C0DE,%"));
     vCheck("x_vsnprintf: it answers the text's length", i4Length == 18);
     vFill(acText, sizeof acText);
@@ -273,12 +292,16 @@ static void vCheckConsole(void)
 {
     const CHAR* volatile szNull = NULL;
 
+    vAbout("PMX_IsLog");
     PMX_IsLog(0, "port_selftest: PMX_IsLog, %s\n", szNull);
     vCheck("PMX_IsLog: it prints a null text and returns", 1);
+    vAbout("Printf");
     Printf("port_selftest: Printf, %d\n", 1);
     vCheck("Printf: it prints and returns", 1);
+    vAbout("UTIL_Printf");
     UTIL_Printf("port_selftest: UTIL_Printf, %d\n", 2);
     vCheck("UTIL_Printf: it prints and returns", 1);
+    vAbout("Assert");
     Assert("0", "port_selftest.c", 0);
     vCheck("Assert: it reports and returns", 1);
 }
@@ -290,6 +313,7 @@ static void vCheckFlash(void)
     UINT8 au1Word[4];
     INT32 i4Partition;
 
+    vAbout("get_part_id_by_name, i4NFBPartitionRead");
     vCheck("get_part_id_by_name: a partition that is not there is negative",
            get_part_id_by_name("port_selftest: none") < 0);
     vFill(au1Word, sizeof au1Word);
@@ -322,6 +346,7 @@ static void vCheckPower(void)
 {
     static const PM_OPERATIONS_T rOperations = { i4Nothing, i4Nothing };
 
+    vAbout("register_pm_ops, unregister_pm_ops");
     vCheck("register_pm_ops: operations are registered with 0", register_pm_ops(&rOperations) == 0);
     register_pm_ops(&rOperations);
     vCheck("register_pm_ops: the same ones a second time do no harm", 1);
@@ -337,6 +362,7 @@ static void vCheckInterfaces(void)
     void* pvTable = NULL;
     void* pvTag = NULL;
 
+    vAbout("i4ImQueryInterface, i4ImUnregisterInterface2, i4ImRegisterInterface2, i4ImReleaseInterface");
     vCheck("i4ImQueryInterface: what is not registered fails",
            i4ImQueryInterface(TEST_COMPONENT, 0, TEST_INTERFACE, &pvTable, &pvTag) < 0);
     vCheck("i4ImUnregisterInterface2: what is not registered fails",
@@ -366,21 +392,33 @@ static void vCheckInterfaces(void)
 
 static void vCheckAnswers(void)
 {
-    const VDP_ENABLE_T eEnable = VDP_GetHwEnable(0);
+    VDP_ENABLE_T eEnable;
 
+    vAbout("VDP_GetHwEnable");
+    eEnable = VDP_GetHwEnable(0);
     vCheck("VDP_GetHwEnable: disabled, hidden or enabled",
            eEnable == VDP_DISABLED || eEnable == VDP_HIDDEN || eEnable == VDP_ENABLED);
+    vAbout("fgVdpIsWaitforSyncCtrl");
     vCheck("fgVdpIsWaitforSyncCtrl: TRUE or FALSE", i4IsTruth(fgVdpIsWaitforSyncCtrl()));
+    vAbout("i4GetHotPlugStatus");
     vCheck("i4GetHotPlugStatus: exactly 1 for a sink, else 0", i4GetHotPlugStatus() == 1 || i4GetHotPlugStatus() == 0);
+    vAbout("fgIsHotPlugChgRes");
     vCheck("fgIsHotPlugChgRes: TRUE or FALSE", i4IsTruth(fgIsHotPlugChgRes()));
+    vAbout("fgPmxHalMixPlane");
     vCheck("fgPmxHalMixPlane: TRUE or FALSE", i4IsTruth(fgPmxHalMixPlane(0, 0)));
     vCheck("fgPmxHalMixPlane: another mixer does no harm", i4IsTruth(fgPmxHalMixPlane(9, 0)));
+    vAbout("fgPmxHalSwapPlane1_2");
     vCheck("fgPmxHalSwapPlane1_2: TRUE or FALSE", i4IsTruth(fgPmxHalSwapPlane1_2(0)));
     vCheck("fgPmxHalSwapPlane1_2: another mixer does no harm", i4IsTruth(fgPmxHalSwapPlane1_2(9)));
+    vAbout("fgPmxHalSwapPlane3_4");
     vCheck("fgPmxHalSwapPlane3_4: TRUE or FALSE", i4IsTruth(fgPmxHalSwapPlane3_4(0)));
+    vAbout("fgPmxHalSwapPlane6_7");
     vCheck("fgPmxHalSwapPlane6_7: TRUE or FALSE", i4IsTruth(fgPmxHalSwapPlane6_7(0)));
+    vAbout("fgPmxHalSwapPlane4_7");
     vCheck("fgPmxHalSwapPlane4_7: TRUE or FALSE", i4IsTruth(fgPmxHalSwapPlane4_7(0)));
+    vAbout("fgPmxHalSwapPlane1_3");
     vCheck("fgPmxHalSwapPlane1_3: TRUE or FALSE", i4IsTruth(fgPmxHalSwapPlane1_3(0)));
+    vAbout("fgPmxHalSwapPlane5_8");
     vCheck("fgPmxHalSwapPlane5_8: TRUE or FALSE", i4IsTruth(fgPmxHalSwapPlane5_8(0)));
 }
 
@@ -400,6 +438,7 @@ static void vCheckSelectors(void)
 {
     UINT8 au1Order[PLANES];
 
+    vAbout("PMX_HalGetPlaneOrder");
     vFill(au1Order, sizeof au1Order);
     vCheck("PMX_HalGetPlaneOrder: the selectors are read with 0", PMX_HalGetPlaneOrder(0, au1Order) == 0);
     vCheck("PMX_HalGetPlaneOrder: all eight are written, 0 to 7", i4IsOrder(au1Order));
@@ -411,6 +450,7 @@ static void vCheckAvd(void)
     UINT32 u4Untouched;
     UINT8 u1Byte = 0;
 
+    vAbout("fgPmxDrvSetAvd, fgPmxDrvGetAvdInfo");
     vFill(&rQuery, sizeof rQuery);
     vCheck("fgPmxDrvSetAvd: a command that there is not is refused", fgPmxDrvSetAvd(99, &u1Byte, 1) == FALSE);
     vCheck("fgPmxDrvGetAvdInfo: a query that there is not has no answer", fgPmxDrvGetAvdInfo(99, &rQuery) == FALSE);
@@ -430,10 +470,15 @@ static void vCheckAvd(void)
 static void vCheckDelays(void)
 {
     UINT8 au1Order[PLANES] = { 0, 1, 2, 3, 4, 5, 6, 7 };
+    UINT8 au1Before[PLANES];
     INT32 ai4Delay[PLANES];
     int i4Plane;
     int i4Written = 1;
+    int i4Known;
 
+    vAbout("PMX_HalSetPlaneOrder, PMX_HalGetPlaneOrder");
+    vFill(au1Before, sizeof au1Before);
+    i4Known = PMX_HalGetPlaneOrder(0, au1Before) == 0 && i4IsOrder(au1Before);
     vFill(ai4Delay, sizeof ai4Delay);
     vCheck("PMX_HalSetPlaneOrder: an order is set with 0", PMX_HalSetPlaneOrder(0, au1Order, ai4Delay) == 0);
     for (i4Plane = 0; i4Plane < PLANES; i4Plane++)
@@ -442,13 +487,17 @@ static void vCheckDelays(void)
     vFill(au1Order, sizeof au1Order);
     PMX_HalGetPlaneOrder(0, au1Order);
     vCheck("PMX_HalGetPlaneOrder: it reads what was set", au1Order[0] == 0 && au1Order[7] == 7);
+    if (i4Known)
+        PMX_HalSetPlaneOrder(0, au1Before, ai4Delay);
 }
 
 static void vCheckMixing(void)
 {
-    const BOOL fgMixed = fgPmxHalMixPlane(0, 7);
+    BOOL fgMixed;
     BOOL fgAsTold;
 
+    vAbout("fgPmxHalMixPlane, vPmxNotMixPlane, vPmxMixPlane");
+    fgMixed = fgPmxHalMixPlane(0, 7);
     vPmxNotMixPlane(0, 7);
     fgAsTold = fgPmxHalMixPlane(0, 7) == FALSE;
     vPmxMixPlane(0, 7);
@@ -460,9 +509,11 @@ static void vCheckMixing(void)
 
 static void vCheckSwap(void)
 {
-    const BOOL fgSwapped = fgPmxHalSwapPlane1_2(0);
+    BOOL fgSwapped;
     BOOL fgAsTold;
 
+    vAbout("fgPmxHalSwapPlane1_2, PMX_HalSwapPlane1_2");
+    fgSwapped = fgPmxHalSwapPlane1_2(0);
     PMX_HalSwapPlane1_2(0, 1);
     fgAsTold = fgPmxHalSwapPlane1_2(0) == TRUE;
     PMX_HalSwapPlane1_2(0, 0);
@@ -476,6 +527,7 @@ static void vCheckHardware(void)
     vCheckDelays();
     vCheckMixing();
     vCheckSwap();
+    vAbout("TVE_SetFmtEx");
     vCheck("TVE_SetFmtEx: a format is set with TVE_SET_OK",
            TVE_SetFmtEx(TVE_1, RES_480P, 60, RES_480P, TRUE, FALSE, 0) == TVE_SET_OK);
 }
@@ -517,6 +569,7 @@ int i4PortSelftest(BOOL fgHardware, port_selftest_line_fct pfLine)
 static void vPrint(const char* szLine)
 {
     puts(szLine);
+    fflush(stdout); /* before what comes next may crash */
 }
 
 /** With any argument the hardware's part runs, too. */

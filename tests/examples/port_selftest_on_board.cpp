@@ -2,6 +2,8 @@
 // The self-test of ports, run on the virtual board: all of it is met there, and each contract is missed when the board
 // is made to break it. What no fault can do, because it is done right or not at all, wrappers of the linker do.
 #include <algorithm>
+#include <array>
+#include <csetjmp>
 #include <cstdarg>
 #include <cstring>
 #include <functional>
@@ -11,6 +13,7 @@
 #include <vector>
 
 #include "board/board.h"
+#include "pmx_hal.h"
 #include "u_os.h"
 
 using board::Fault;
@@ -26,6 +29,9 @@ static bool breaks(const char* what)
 {
     return pending != nullptr && std::strcmp(pending, what) == 0;
 }
+
+/** Where a function goes that does not come back. */
+static std::jmp_buf out;
 
 static x_timer_cb_fct wanted_expiry;
 
@@ -74,6 +80,8 @@ INT32 __wrap_x_sema_unlock(HANDLE_T hSema)
 INT32 __real_x_vsnprintf(CHAR*, size_t, const CHAR*, va_list);
 INT32 __wrap_x_vsnprintf(CHAR* szBuffer, size_t zSize, const CHAR* szFormat, va_list rArgs)
 {
+    if (breaks("crash"))
+        std::longjmp(out, 1);
     return __real_x_vsnprintf(szBuffer, breaks("no limit") ? zSize + 8 : zSize, szFormat, rArgs);
 }
 
@@ -115,7 +123,7 @@ Outcome run()
     outcome.result = i4PortSelftest(TRUE, keep);
     for (const std::string& line : lines)
     {
-        if (line.starts_with("1.."))
+        if (line.starts_with("1..") || line.starts_with("# "))
             continue;
         outcome.all.insert(without_number(line));
         if (line.starts_with("not "))
@@ -252,13 +260,51 @@ void complain(const std::string& what)
     ++wrong;
 }
 
+/** Whoever crashes has been named. */
+void check_names()
+{
+    std::string about;
+    for (const std::string& line : lines)
+    {
+        if (line.starts_with("# "))
+            about = line + ",";
+        else if (!line.starts_with("1.."))
+        {
+            const std::string what = without_number(line);
+            if (about.find(" " + what.substr(0, what.find(':')) + ",") == about.npos)
+                complain("not named before it is called: " + what);
+        }
+    }
+    pending = "crash";
+    lines.clear();
+    if (setjmp(out) == 0)
+        i4PortSelftest(FALSE, keep);
+    pending = nullptr;
+    if (lines.empty() || lines.back() != "# x_vsnprintf")
+        complain("a crash of x_vsnprintf is not seen: " + (lines.empty() ? std::string() : lines.back()));
+}
+
+using Order = std::array<UINT8, 8>;
+
+Order order_now()
+{
+    Order order{};
+    PMX_HalGetPlaneOrder(0, order.data());
+    return order;
+}
+
 } // namespace
 
 int main()
 {
     const board::Description player = board::load_description("default");
     board::power_on(player);
+    const Order order{ 1, 0, 2, 3, 4, 5, 7, 6 };
+    std::array<INT32, 8> delays{};
+    PMX_HalSetPlaneOrder(0, order.data(), delays.data());
     const Outcome whole = run();
+    if (order_now() != order)
+        complain("the order of the planes is not put back");
     if (whole.result != 0 || !whole.failed.empty())
         complain("the board fails: " + (whole.failed.empty() ? std::string("by its result") : *whole.failed.begin()));
     const std::string console = board::console_text();
@@ -267,6 +313,8 @@ int main()
         if (console.find(std::string("port_selftest: ") + shown) == console.npos)
             complain(std::string("the console does not show ") + shown);
     }
+
+    check_names();
 
     std::set<std::string> told = met_by_returning;
     for (const Break& one : planted)

@@ -152,16 +152,17 @@ TEST_F(Restore, LinesThatFailed_AreCarriedOutAgain)
 TEST_F(Restore, FilesAreFoundWhereTheLinesStood)
 {
     std::ofstream(file("part.pmx")) << "power-on boards/plane-delays.toml\n"
-                                       "flash fast_init_param images/boot-576p.bin\nPMX_Init\n";
+                                       "flash fast_init_param images/own.bin\nPMX_Init\n";
     std::filesystem::create_directories(m_directory / "boards");
     std::filesystem::create_directories(m_directory / "images");
     std::filesystem::copy(PMX_SOURCE_DIR "/scenarios/boards/plane-delays.toml", m_directory / "boards");
     std::filesystem::copy(PMX_SOURCE_DIR "/scenarios/images/boot-576p.bin", m_directory / "images");
+    std::filesystem::copy(PMX_SOURCE_DIR "/scenarios/images/boot-576p.bin", m_directory / "images/own.bin");
     EXPECT_EQ("", run_here("include " + file("part.pmx") + "\n" + save()));
     EXPECT_EQ("", run_here(restore() + "expect state mixer.mode RES_576P"));
-    std::filesystem::remove(m_directory / "images/boot-576p.bin");
+    std::filesystem::remove(m_directory / "images/own.bin");
     EXPECT_TRUE(run_here(restore()).starts_with(
-        "here.pmx:1: " + saved() + " cannot be restored: its command 2, flash fast_init_param images/boot-576p.bin: "))
+        "here.pmx:1: " + saved() + " cannot be restored: its command 2, flash fast_init_param images/own.bin: "))
         << run_here(restore());
     std::filesystem::remove(m_directory / "boards/plane-delays.toml");
     EXPECT_TRUE(

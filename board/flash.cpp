@@ -3,9 +3,14 @@
 #include "board/flash.h"
 
 #include <algorithm>
+#include <charconv>
 #include <fstream>
+#include <iterator>
+#include <map>
 #include <optional>
 #include <stdexcept>
+#include <string_view>
+#include <utility>
 #include <vector>
 
 #include "board/device_values.h"
@@ -91,6 +96,40 @@ Value size_of(const Partition& partition)
     return error ? Value::null() : Value::number(static_cast<std::int64_t>(size));
 }
 
+/** FNV-1a, to tell contents apart: nobody forges an image here. */
+std::string digest_of(std::string_view content)
+{
+    std::uint64_t digest = 0xCBF29CE484222325;
+    for (const char byte : content)
+        digest = (digest ^ static_cast<unsigned char>(byte)) * 0x100000001B3;
+    char digits[16];
+    const auto written = std::to_chars(std::begin(digits), std::end(digits), digest, 16);
+    return { digits, written.ptr };
+}
+
+/** What an image holds, in a few characters. It is read again when it has changed, for the state is asked for often. */
+Value content_of(const Partition& partition)
+try
+{
+    using Version = std::pair<std::filesystem::file_time_type, std::uintmax_t>;
+    static std::map<std::filesystem::path, std::pair<Version, Value>> known;
+    if (partition.word)
+        return Value::null();
+    const Version version{ std::filesystem::last_write_time(partition.image),
+                           std::filesystem::file_size(partition.image) };
+    auto& [of_version, content] = known[partition.image];
+    if (of_version != version || content.kind() == Value::Kind::Null)
+    {
+        content = Value::text(digest_of(board::files::read(partition.image)));
+        of_version = version;
+    }
+    return content;
+}
+catch (const std::exception&)
+{
+    return Value::null(); // reading it fails for the layer, too
+}
+
 std::string image_of(const Partition& partition)
 {
     return partition.word ? "word " + Value::number(*partition.word, {}, Value::Base::Hex).to_text()
@@ -170,6 +209,7 @@ Value state()
         value.add("name", Value::text(partition.name));
         value.add("image", Value::text(image_of(partition)));
         value.add("size", size_of(partition));
+        value.add("content", content_of(partition));
         value.add("reads", Value::number(partition.reads));
         partitions.push_back(std::move(value));
     }

@@ -6,6 +6,7 @@
 #include <fstream>
 #include <stdexcept>
 
+#include "board/flash.h"
 #include "u_os.h"
 
 namespace
@@ -135,11 +136,28 @@ TEST_F(Flash, SetFlash_RefusesAnImageThatDoesNotExist)
     EXPECT_EQ(4, i4NFBPartitionRead(0, 0, m_bytes.data(), 4)) << "the old image is still there";
 }
 
+TEST_F(Flash, State_TellsContentsApart)
+{
+    const auto content = [] { return now("partitions[0].content"); };
+    const std::string first = content();
+    EXPECT_EQ(first, content());
+    std::filesystem::copy_file(m_directory / "boot.bin", m_directory / "elsewhere.bin");
+    board::set_flash("boot", m_directory / "elsewhere.bin");
+    EXPECT_EQ(first, content()) << "wherever it lies";
+    std::ofstream(m_directory / "elsewhere.bin") << "something else";
+    EXPECT_NE(first, content());
+    std::filesystem::remove(m_directory / "elsewhere.bin");
+    EXPECT_EQ("null", content());
+    board::set_flash_word("boot", 7);
+    EXPECT_EQ("null", content());
+}
+
 TEST_F(Flash, State_TellsThePartitions)
 {
     EXPECT_EQ("{partitions=[{id=0, name=\"boot\", image=" + board::quote((m_directory / "boot.bin").string()) +
-                  ", size=6, reads=0}, {id=1, name=\"empty\", image=" + board::quote((m_directory / "e.bin").string()) +
-                  ", size=0, reads=0}], failed_reads=0}",
+                  ", size=6, content=\"17892e8ac6561b12\", reads=0}, {id=1, name=\"empty\", image=" +
+                  board::quote((m_directory / "e.bin").string()) +
+                  ", size=0, content=\"cbf29ce484222325\", reads=0}], failed_reads=0}",
               board::flash::state().to_text());
     power_on({});
     EXPECT_EQ("{partitions=[], failed_reads=0}", board::flash::state().to_text());

@@ -226,10 +226,40 @@ TEST_F(Restore, StatesThatNoLinesLeadTo_AreToldApart)
         << run_here("restore no-such.json");
 }
 
+TEST_F(Restore, ImagesAreComparedByWhatTheyHold)
+{
+    const auto put_there = [this](const std::string& place) {
+        std::filesystem::create_directories(m_directory / place);
+        std::filesystem::copy(PMX_SOURCE_DIR "/scenarios/images/boot-576p.bin", m_directory / place / "boot.bin");
+        std::ofstream(m_directory / place / "part.pmx") << "flash fast_init_param boot.bin\nPMX_Init\n";
+    };
+    put_there("here");
+    EXPECT_EQ("", run_here("include " + file("here/part.pmx") + "\n" + save()));
+    std::filesystem::rename(m_directory / "here", m_directory / "there");
+    std::string moved = content(saved());
+    // The steps are carried out where the files are now; the state still names the place where they were.
+    for (std::size_t at = moved.find("\"in\": \""); at != moved.npos; at = moved.find("\"in\": \"", at + 1))
+    {
+        const std::size_t here = moved.find("/here\"", at);
+        if (here != moved.npos && here < moved.find('\n', at))
+            moved.replace(here, 6, "/there\"");
+    }
+    std::ofstream(saved()) << moved;
+    EXPECT_EQ("", run_here(restore() + "expect state mixer.mode RES_576P"));
+    std::ofstream(file("there/boot.bin"), std::ios::app) << '\0';
+    std::filesystem::resize_file(file("there/boot.bin"),
+                                 std::filesystem::file_size(PMX_SOURCE_DIR "/scenarios/images/boot-576p.bin"));
+    EXPECT_EQ("", run_here(restore())) << "written anew, and the same";
+    std::fstream(file("there/boot.bin"), std::ios::in | std::ios::out).seekp(-1, std::ios::end).put('x');
+    EXPECT_NE(std::string::npos, run_here(restore()).find("another state: flash.partitions[0].content becomes "))
+        << run_here(restore());
+}
+
 TEST_F(Restore, TheFileMayBeSavedAnew_UnlessSomethingElseReadsIt)
 {
-    EXPECT_EQ("", run_here("PMX_Init\n" + save() + restore() + "PMX_SetTvType 0 PMX_TV_TYPE_PAL\n" + save()));
-    EXPECT_EQ("", run_here(restore() + "expect state ucTvType PMX_TV_TYPE_PAL\n" + save()));
+    const std::string again = "PMX_SetTvType 0 PMX_TV_TYPE_PAL\n" + save();
+    EXPECT_EQ("", run("run -q -", "PMX_Init\n" + save() + restore() + again).err);
+    EXPECT_EQ("", run("run -q -", restore() + "expect state ucTvType PMX_TV_TYPE_PAL\n" + save()).err);
     EXPECT_TRUE(run_here("PMX_Init\nflash other " + saved() + "\n" + restore() + save())
                     .starts_with("here.pmx:4: cannot write " + saved() + ": this run reads it"))
         << "it is an image as well";

@@ -31,9 +31,20 @@ bool is_step(const Line& line)
     return name == "trace" || name == "stores" || (!command.verb->only_looks && name != "restore");
 }
 
+/** Where an image lies: elsewhere in another installation, and what it holds is compared by itself. */
+bool is_path_of_image(const Change& change)
+{
+    const auto is_word = [](const std::optional<board::Value>& value) {
+        return !value || value->kind() != board::Value::Kind::Text || value->string().starts_with("word ");
+    };
+    return change.path.starts_with("flash.partitions[") && change.path.ends_with("].image") && !is_word(change.older) &&
+           !is_word(change.newer);
+}
+
 std::string first_difference(const StateDump& wanted, const StateDump& found)
 {
-    const std::vector<Change> changes = pmxboard::changes(wanted.state, found.state);
+    std::vector<Change> changes = pmxboard::changes(wanted.state, found.state);
+    std::erase_if(changes, is_path_of_image);
     if (changes.empty())
         return {};
     const Change& first = changes.front();

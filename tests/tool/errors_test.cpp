@@ -135,7 +135,7 @@ TEST(ScenarioErrors, Numbers_OutOfRange)
                                   "the rest\n";
     EXPECT_EQ(arguments, diagnostics("fault x_sema_lock() -1"));
     EXPECT_EQ(arguments, diagnostics("fault x_sema_lock() off"));
-    EXPECT_NE("", diagnostics("fault x_sema_lock(1,,2) off"));
+    EXPECT_NE("", diagnostics("fault x_sema_lock(1, *) -1\nfault x_sema_lock(1,,2) off"));
     std::string many;
     for (unsigned i = 0; i < 257; ++i)
         many += "fault x_sema_lock(" + std::to_string(i) + ", *) -1\n";

@@ -75,7 +75,7 @@ def planted_layer(source, substitutions, made):
     """The layer with a change in one source."""
     tree = made / "tree"
     shutil.rmtree(tree, ignore_errors=True)
-    for directory in ("src", "cmake"):
+    for directory in ("src", "cmake", "examples"):  # whose flags the compiler takes
         shutil.copytree(layers.ROOT / directory, tree / directory)
     path = tree / LAYER / source
     text = path.read_text(encoding="utf-8")

@@ -88,7 +88,7 @@ def check_card(card):
 def tree_of(revision, made):
     """The layer's sources of a revision."""
     tree = made / "tree"
-    packed = run_binary("git", "-C", ROOT, "archive", revision, "src", "cmake")
+    packed = run_binary("git", "-C", ROOT, "archive", revision, "src", "cmake", "examples")  # with layer.flags
     with tarfile.open(fileobj=io.BytesIO(packed)) as archive:
         archive.extractall(tree, filter="data") if hasattr(tarfile, "data_filter") else archive.extractall(tree)
     return tree

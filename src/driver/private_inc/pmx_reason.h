@@ -202,14 +202,14 @@ static inline const CHAR* szPmxReason(PMX_REASON_T eReason)
  *  @context any thread */
 static inline PMX_REASON_CLASS_T ePmxReasonClass(PMX_REASON_T eReason)
 {
-    switch ((UINT32)eReason)
-    {
-#define PMX_REASON_ROW(Number, Name, Class, A, B, Sentence) \
-    case PMX_REASON_##Name: return PMX_REASON_CLASS_##Class;
-        PMX_REASONS_KNOWN(PMX_REASON_ROW)
+    /* By number: they run from 1 on without a gap. */
+    static const PMX_REASON_CLASS_T aeClasses[] = { PMX_REASON_CLASS_NOTE,
+#define PMX_REASON_ROW(Number, Name, Class, A, B, Sentence) PMX_REASON_CLASS_##Class,
+                                                    PMX_REASONS_KNOWN(PMX_REASON_ROW)
 #undef PMX_REASON_ROW
-    default: return PMX_REASON_CLASS_NOTE;
-    }
+    };
+    UINT32 u4Number = (UINT32)eReason;
+    return u4Number < sizeof aeClasses / sizeof aeClasses[0] ? aeClasses[u4Number] : PMX_REASON_CLASS_NOTE;
 }
 
 /** Hook of a layer that was compiled with PMX_REASONS; whoever links it provides it. It is called in the midst of an

@@ -186,14 +186,14 @@ typedef enum
  *  @context any thread */
 static inline const CHAR* szPmxReason(PMX_REASON_T eReason)
 {
-    switch ((UINT32)eReason)
-    {
-#define PMX_REASON_ROW(Number, Name, Class, A, B, Sentence) \
-    case PMX_REASON_##Name: return Sentence;
-        PMX_REASONS_KNOWN(PMX_REASON_ROW)
+    /* By number: they run from 1 on without a gap. */
+    static const CHAR* const aszSentences[] = { "",
+#define PMX_REASON_ROW(Number, Name, Class, A, B, Sentence) Sentence,
+                                                PMX_REASONS_KNOWN(PMX_REASON_ROW)
 #undef PMX_REASON_ROW
-    default: return "";
-    }
+    };
+    UINT32 u4Number = (UINT32)eReason;
+    return u4Number < sizeof aszSentences / sizeof aszSentences[0] ? aszSentences[u4Number] : "";
 }
 
 /** What may be done about a reason.
@@ -202,7 +202,6 @@ static inline const CHAR* szPmxReason(PMX_REASON_T eReason)
  *  @context any thread */
 static inline PMX_REASON_CLASS_T ePmxReasonClass(PMX_REASON_T eReason)
 {
-    /* By number: they run from 1 on without a gap. */
     static const PMX_REASON_CLASS_T aeClasses[] = { PMX_REASON_CLASS_NOTE,
 #define PMX_REASON_ROW(Number, Name, Class, A, B, Sentence) PMX_REASON_CLASS_##Class,
                                                     PMX_REASONS_KNOWN(PMX_REASON_ROW)

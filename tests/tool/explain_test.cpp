@@ -311,7 +311,8 @@ TEST_F(Explain, RefusesExpectationsAndWrongLines)
 
 TEST_F(Explain, ACommandThatWouldFail_IsTold)
 {
-    EXPECT_NE(shown_by("explain power-on no-such-board").find("  but      "), std::string::npos);
+    const std::string shown = shown_by("explain power-on no-such-board");
+    EXPECT_NE(shown.find("  failed:  power-on no-such-board\n  but      "), shown.npos) << shown;
 }
 
 TEST_F(Explain, WorksWhileStoresAreShown_AndAfterAnotherPowerOn)
@@ -431,6 +432,18 @@ TEST(ExplainedRun, AFailedExpectation_IsExplainedWithoutAsking)
                                "  because  no product admits mode RES_2160P (49)\n"),
               diagnostics.npos)
         << diagnostics;
+}
+
+TEST_F(Explain, WhatIsDoneOnceMoreForItsExplanation_WritesNothing)
+{
+    const std::string name = testing::TempDir() + "written-" + std::to_string(getpid()) + ".json";
+    carry_out({ "PMX_Init" });
+    m_session.explain_command(3);
+    EXPECT_ANY_THROW(m_session.run_line("  save " + name));
+    EXPECT_FALSE(std::filesystem::exists(name));
+    carry_out({ "PMX_SetTvType 0 0", "PMX_SetMode 0 RES_2160P 60 0" });
+    ASSERT_TRUE(m_session.explanation());
+    EXPECT_NE(m_session.explanation()->refusal(), nullptr);
 }
 
 TEST(ExplainedRun, WhatCannotBeRunAgain_FailsAsBefore)

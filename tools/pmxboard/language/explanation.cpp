@@ -193,10 +193,11 @@ std::string to_text(const Explanation& explanation, const Look& look)
     const std::string what = explanation.operation.empty() ? explanation.command : explanation.operation;
     const std::string with_answer = what + (explanation.answer.empty() ? "" : " = " + explanation.answer);
     const bool has_refused = refusal != nullptr && row_of(refusal->number).class_of != PMX_REASON_CLASS_SAME;
-    std::string text = explanation.headline.empty() ? line_of(refusal == nullptr ? "done:"
-                                                              : has_refused      ? "refused:"
-                                                                                 : "nothing:",
-                                                              with_answer, look)
+    const std::string verdict = !explanation.failure.empty() ? "failed:"
+                                : refusal == nullptr         ? "done:"
+                                : has_refused                ? "refused:"
+                                                             : "nothing:";
+    std::string text = explanation.headline.empty() ? line_of(verdict, with_answer, look)
                                                     : line_of(explanation.headline + ":", explanation.answer, look);
     std::string begin = "because";
     for (const Reason& reason : explanation.reasons)

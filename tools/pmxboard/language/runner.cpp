@@ -104,8 +104,7 @@ try
     {
         try
         {
-            if (!text.starts_with("save"))
-                session.run_line(text);
+            session.run_line(text);
         }
         catch (const std::exception&)
         {

@@ -230,7 +230,7 @@ bool Session::leads_into_layer(const Line& line)
 /** While everything is as the command will find it. A command that cannot be explained is carried out all the same. */
 void Session::explain_ahead(const Line& line)
 {
-    if (imagines() || m_restoring)
+    if (m_imagined != 0 || m_restoring)
         return;
     ++m_commands;
     m_explanation.reset();

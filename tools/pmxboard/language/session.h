@@ -83,7 +83,8 @@ public:
     const std::string& last_command() const { return m_last_command; }
     /** Carry a line out in a process that is about to end: its effects are nobody's. */
     void imagine(std::string_view text, std::ostream& shown);
-    bool imagines() const { return m_imagined != 0; }
+    /** Whether nothing outside may come of what is done: it is imagined, or done once more for its explanation. */
+    bool imagines() const { return m_imagined != 0 || m_explained_alone; }
     void forget_outcome();
 
     /** Whether each command is explained before it is carried out, for `why`; and whether what was refused is shown

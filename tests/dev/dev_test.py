@@ -336,7 +336,17 @@ class Usage(TreeTest):
     def test_words_go_on_as_they_are(self):
         self.expect(0, "run a b $c * --quiet\n", "run", "a b", "$c", "*", "--quiet")
         self.expect(0, "", "test", "-R", "a b|c")
-        self.assertEqual(["ctest --preset debug -R a b|c"], self.calls("ctest"))
+        self.assertEqual(["ctest --preset debug --label-exclude ^emulated$ -R a b|c"], self.calls("ctest"))
+
+    def test_the_target_s_tests_are_the_others(self):
+        self.expect(0, "", "target", "-R", "a b|c")
+        self.assertEqual(["ctest --preset debug --label-regex ^emulated$ -R a b|c"], self.calls("ctest"))
+        self.assertEqual(["cmake --build --preset arm-linux"], self.calls("cmake --build --preset arm-linux"))
+
+    def test_a_test_needs_no_more_of_the_target_than_the_object(self):
+        self.dev("test")
+        self.assertEqual(["cmake --build --preset arm-linux --target pmx_objects"],
+                         self.calls("cmake --build --preset arm-linux"))
 
     def test_a_repository_of_the_surroundings_is_not_ours(self):
         self.dev("test", GIT_DIR="/elsewhere/.git")
@@ -345,7 +355,7 @@ class Usage(TreeTest):
     def test_what_builds_is_called_in_the_tree_alone(self):
         self.dev("test")
         built = [line.split()[2] for line in self.calls("cmake --preset")]
-        self.assertEqual(["debug", "release", "arm-linux", "arm-bare"], built)
+        self.assertEqual(["debug", "release", "arm-bare", "arm-linux"], built)
         self.assertEqual(["CMakeLists.txt", "CMakePresets.json", "build", "dev", "packages.txt", "tests"],
                          sorted(set(os.listdir(self.tree)) - {".cache"}))
         self.assertEqual(["stubs", "tree"], sorted(os.listdir(self.space)))

@@ -3,7 +3,7 @@
 """Brings the build directory of another preset up to date, which is quick when it is; says how to make one that is not
 there.
 
-usage: check_built.py CMAKE DIRECTORY PRESET
+usage: check_built.py CMAKE DIRECTORY PRESET [TARGET]
 """
 
 import pathlib
@@ -12,10 +12,10 @@ import sys
 
 
 def main():
-    cmake, directory, preset = sys.argv[1:]
+    cmake, directory, preset, *target = sys.argv[1:]
     if not pathlib.Path(directory, "build.ninja").exists():
         sys.exit(f"{directory}: is not there: ./dev build {preset} makes it, and ./dev test too")
-    result = subprocess.run([cmake, "--build", directory, "-j", "2"], capture_output=True, text=True, check=False)
+    result = subprocess.run([cmake, "--build", directory, "-j", "2", *(["--target", *target] if target else [])], capture_output=True, text=True, check=False)
     if result.returncode != 0:
         sys.exit(f"{directory} cannot be built:\n{result.stdout}{result.stderr}")
     print(f"{directory}: up to date")

@@ -1,9 +1,9 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Damaged console logs, and what the log reader tells of them: every statement is held against what the board itself
-recorded while the log was made.
+recorded while the log was made, and every reason against what the layer gives that tells its reasons.
 
-usage: corpus.py PMXBOARD COUNT [SEED]    COUNT logs, drawn from SEED
+usage: corpus.py PMXBOARD PMXBOARD_WITH_THE_TWIN COUNT [SEED]    COUNT logs, drawn from SEED
 
 The logs are those of the scenarios at several levels of the console, whole, and damaged as serial consoles damage them.
 The record is the trace of calls: what drivers were called for, what the timer and the display part did, and when.
@@ -26,6 +26,11 @@ SECONDS_A_LINE = 0.0003  # that a serial console takes
 WORKERS = 2
 MOST_SAID = 40
 ENOUGH = 0.95  # of what damaged logs determine
+# A reason is given so many entries before the line that determines it, or behind it, at most.
+BEFORE, BEHIND = 12, 8
+# Reasons that at level 9 a line always tells: SOURCE_TWICE, FORMAT_FROM_OUTPUT, FORMAT_FROM_OFF, FULL_CHANGE, NO_SINK,
+# HELD_BACK, TIMED_OUT, MASTER_FROM_PORT.
+ALWAYS_TOLD = (13, 32, 33, 35, 38, 40, 42, 44)
 
 Line = collections.namedtuple("Line", "boot index text time")  # of the layer: where its record has it
 
@@ -36,6 +41,7 @@ class Record:
     def __init__(self, pmxboard, scenario):
         run = subprocess.run([pmxboard, "run", "--trace-format", "jsonl", scenario], capture_output=True, check=False)
         self.name = scenario.stem
+        self.path = scenario
         self.boots = []
         entries = [json.loads(line) for line in run.stdout.splitlines() if line.startswith(b'{"sequence":')]
         boots = [[]]
@@ -48,6 +54,8 @@ class Record:
             for place, entry in enumerate(boot):
                 entry["place"] = place
                 entry.setdefault("function", "")
+
+        self.reasons = [[] for _ in self.boots]  # by boot: (the entry behind which it was given, number, values)
 
     def lines(self, level):
         """What a console of this level shows."""
@@ -67,6 +75,29 @@ class Record:
                 made.append(Line(number, index, text.strip(), time))
                 shown += 1
         return made
+
+
+def take_reasons(twin, records):
+    """Has the layer that tells its reasons run all scenarios, and notes the reasons of each boot."""
+    run = subprocess.run([twin, "--reasons", "run", "--trace-format", "jsonl",
+                          *(str(record.path) for record in records)], capture_output=True, check=False)
+    boots = []
+    early = []  # given before the boot's first entry was written
+    for line in run.stdout.splitlines():
+        if line.startswith(b'{"sequence":'):
+            if line.startswith(b'{"sequence":1,'):
+                boots.append([])
+            boots[-1] += early
+            early = []
+        elif line.startswith(b'{"reason":'):
+            entry = json.loads(line)
+            reason = (entry["after"], entry["reason"], entry["values"])
+            (boots[-1] if boots and entry["after"] > 0 else early).append(reason)
+    count = sum(len(record.boots) for record in records)
+    if len(boots) != count:
+        raise RuntimeError(f"the twin starts {len(boots)} times, and not {count}: {run.stderr.decode()}")
+    for record in records:
+        record.reasons, boots = boots[:len(record.boots)], boots[len(record.boots):]
 
 
 # ---- What the board saw
@@ -286,6 +317,8 @@ class Held:
             if event["kind"] == "call":
                 for words in [event["title"], *event["details"]]:
                     self.statement(event, words)
+                for told in event["reasons"]:
+                    self.reason(event, told)
             elif event["kind"] == "gap":
                 self.gap(event)
             else:
@@ -308,6 +341,17 @@ class Held:
         self.own += 1
         if event["first_line"] not in self.console.sources and event["first_line"] not in self.console.pieces:
             self.false.append(f"{event['first_line']}: no line of the layer: {words}")
+
+    def reason(self, event, told):
+        """The layer gave it, with these values, where the line stands."""
+        line = self.source(told["line"])
+        good = line is not None and told["line"] in event["lines"]
+        if good:
+            sequence = self.boot_of(line)[line.index]["sequence"]
+            good = any(number == told["id"] and -BEFORE <= after - sequence <= BEHIND and
+                       all(known in (None, given) for known, given in zip(told["values"], values))
+                       for after, number, values in self.record.reasons[line.boot % 100])
+        self.say(event, f"{told['name']}: {told['text']}", good)
 
     def start(self, event):
         """A boot lies before the line, behind the line of the layer before."""
@@ -426,11 +470,14 @@ def lowered(held, event, words):
     return bool(ends) and held.since(event, words, ends)
 
 
-def told_driver(held, event, _):
+def programmed(held, event, _):
+    if event["operation"] == "PMX_SetMode":
+        return held.any(event, lambda boot, index: behind(boot, index, "PMX_HalSetMode") is not None)
+
     def driven(boot, index):
         return boot[index].get("text", "").startswith("PMX Start to set") and \
             behind(boot, index, "OSD_BASE_SetDisplayMode", 4) is not None
-    return held.any(event, driven) or held.any(event, lambda boot, index: "Disable All" in boot[index].get("text", ""))
+    return held.any(event, driven)
 
 
 def converter_a(held, event, words):
@@ -453,12 +500,13 @@ def converter_scaler(held, event, words):
 
 
 def master(held, event, words):
-    wanted = 0 if words.endswith("BT.601") else 1 if words.endswith("BT.709") else 2
+    found = re.search(r" to \S+ \((\d+)\)$", words)
+    wanted = int(found[1]) if found else None  # of a line that was broken in two
 
     def announced(boot, index):
         call = behind(boot, index, "OSDSetColorSpace", 3)
         return "Master Color Space change" in boot[index].get("text", "") and call is not None and \
-            arguments(call)[0] == wanted
+            wanted in (None, arguments(call)[0])
     return held.any(event, announced)
 
 
@@ -502,21 +550,21 @@ def nothing_back_here(held, event, _):
 
 STATEMENTS = [(re.compile(pattern), test) for pattern, test in (
     (r"mode change requested", request),
-    (r"graphics held back while", hold),
-    (r"graphics are (back|in the mix)", back),
+    (r"graphics wait for the display part", hold),
+    (r"graphics are mixed again", back),
     (r"the display timer is set", timer_set),
-    (r"the timer runs out", timer_out),
+    (r"the display timer has run out", timer_out),
     (r"nothing (up to|before)|as far as its lines tell", left),
-    (r"no wait for the display part: no sink", no_sink),
+    (r"nobody is waited for: no sink", no_sink),
     (r"no wait for the display part: HDMI", no_resolution),
     (r"the display part begins to switch", switches),
     (r"the display part's flag is lowered", lowered),
-    (r"mixer format ", told_driver),
+    (r"everything is programmed for mode ", programmed),
     (r"converter A ", converter_a),
     (r"scaler's converter ", converter_scaler),
-    (r"master colour space changes", master),
+    (r"the master colour space changes", master),
     (r"a video plane is to be told", to_be_told),
-    (r"that video plane has no interface table", no_table),
+    (r"that video plane was passed over", no_table),
     (r"video plane \d+ starts", by_operation("PMX_VdpEnabled")),
     (r"video plane \d+ stops", by_operation("PMX_VdpDisabled")),
     (r"OSD plane \d+ starts", by_operation("PMX_OsdEnabled")),
@@ -547,19 +595,27 @@ def determined(held):
         if line.text == "SetModeEx":
             pattern = "mode change requested"
         elif is_hold(boot, line.index):
-            pattern = "graphics held back"
+            pattern = "graphics wait for the display part"
         elif line.text == "PMX timeout.":
-            pattern = "the timer runs out"
+            pattern = "the display timer has run out"
         elif line.text == "PMX_SetOsdEnable." and number in after:
             other = console.sources[after[number]]
             if other.text == "Set Osd Enable :0." and other.boot == line.boot and is_release(boot, other.index):
-                pattern = "graphics are (back|in the mix)"
+                pattern = "graphics are mixed again"
                 line, number = other, after[number]
         if pattern is not None:
             wanted.setdefault((line.boot, line.index, pattern), []).append(number)
     missed = [f"{numbers}: {pattern} is not told" for (_, _, pattern), numbers in wanted.items()
               if not any(told(number, pattern) for number in numbers)]
     return len(wanted), missed
+
+
+def reasons_missed(held):
+    """The reasons that a whole log at the highest level determines, and the story does not tell."""
+    told = collections.Counter(told["id"] for event in held.story["events"] for told in event["reasons"])
+    given = collections.Counter(number for boot in held.record.reasons for _, number, _ in boot)
+    return [f"reason {number} is told {told[number]} times, and was given {given[number]} times"
+            for number in ALWAYS_TOLD if told[number] < given[number]]
 
 
 def unsure(story):
@@ -604,6 +660,7 @@ def judged(pmxboard, records, seed, number):
     held = Held(record, console, story)
     said = [f"false: {one}" for one in held.check()]
     count, missed = determined(held)
+    figures.update(reasons=sum(len(event["reasons"]) for event in story["events"]))
     figures.update(logs=1, statements=held.checked, own=held.own, false=len(held.false))
     whole = "damaged" if console.damaged else "whole"
     figures.update({f"{whole} logs": 1, f"{whole} determined": count, f"{whole} told": count - len(missed)})
@@ -611,6 +668,8 @@ def judged(pmxboard, records, seed, number):
     if not console.damaged:
         said += [f"unsure in a whole log: {one}" for one in unsure(story)]
         said += [f"not told of a whole log: {one}" for one in missed]
+        if console.level == LEVELS[0]:
+            said += [f"not told of a whole log: {one}" for one in reasons_missed(held)]
     else:
         figures["unsure"] += len(unsure(story))
     return figures, [f"log {number} ({record.name}, {console.kind}, level {console.level}): {one}" for one in said]
@@ -618,9 +677,10 @@ def judged(pmxboard, records, seed, number):
 
 def main():
     pmxboard = pathlib.Path(sys.argv[1]).resolve()
-    count = int(sys.argv[2])
-    seed = int(sys.argv[3]) if len(sys.argv) > 3 else 1
+    count = int(sys.argv[3])
+    seed = int(sys.argv[4]) if len(sys.argv) > 4 else 1
     records = [record for record in (Record(pmxboard, scenario) for scenario in SCENARIOS) if record.boots[0]]
+    take_reasons(pathlib.Path(sys.argv[2]).resolve(), records)
     total = collections.Counter()
     said = []
     with concurrent.futures.ThreadPoolExecutor(WORKERS) as pool:
@@ -630,6 +690,7 @@ def main():
     told, wanted = total["damaged told"], total["damaged determined"]
     print(f"{total['logs']} logs, {total['whole logs']} of them whole; {total['statements']} statements held against "
           f"what the board saw, {total['own']} that say what their lines say")
+    print(f"of the statements {total['reasons']} are reasons, held against what the layer gives")
     print(f"false: {total['false']}; unsure, of damaged logs alone: {total['unsure']}")
     print(f"mode changes, hold-backs, releases and ends of the timer: of {total['whole determined']} in whole logs "
           f"{total['whole told']} are told, of {wanted} that remain in damaged ones {told}")

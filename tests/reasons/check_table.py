@@ -1,7 +1,8 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds the table of reasons: a number once given stays its reason's, new ones are appended, each sentence shows the
-values that its row announces, and each reason is given somewhere in the layer and by nothing else.
+values that its row announces, and each reason is given somewhere in the layer and by nothing else. The page tells which
+of them a console log determines, as the log reader has it, and at which level of the console.
 
 usage: check_table.py [--renew] [ROOT]
 
@@ -24,6 +25,14 @@ HEADER = "src/driver/private_inc/pmx_reason.h"
 NUMBERS = "tests/reasons/numbers.txt"
 PAGE = "docs/reasons.md"
 LAYER = "src/driver/pmx"
+LOG_REASONS = "tools/pmxboard/decode/reasons.cpp"
+LOG_TEXTS = "tools/pmxboard/decode/text_table.cpp"
+LOG_REASON = re.compile(r'\{ PMX_REASON_(\w+),\s*"([^"]+)"')
+LOG_TEXT = re.compile(r'(?:\{ (\w+),\s+|(\w+)\()"((?:[^"\\]|\\.)*)"')
+# Of texts that rows make with a function; what has no level is printed at every one.
+MADE = {"refused": 8, "swap": 8, "report": 0}
+# Those whose values or conditions stand in lines of the request, which are printed at level 9.
+OF_THE_REQUEST = {"MODE_NEVER": 9, "MODE_BIT": 9}
 ROW = re.compile(r'X\(\s*(\d+),\s*(\w+),\s*(\w+),\s*(\w+),\s*(\w+),\s*\\?\s*"([^"]*)"\)')
 CLASS = re.compile(r'X\((\d+), (\w+), "([^"]*)"\)')
 CONVERSION = re.compile(r"%0?\d*(.)")
@@ -37,12 +46,23 @@ def rows(text):
         yield int(number), name, kind_of, (first, second), sentence
 
 
-def page(text, header):
-    """The page with its tables, which stand behind their marks, as the header has them."""
+def levels_in_logs(root):
+    """At which level of the console a log determines a reason: {name: level}, 0 for every level."""
+    texts = [(begin, MADE.get(made, 0) if made else int(level) if level.isdigit() else 0)
+             for level, made, begin in LOG_TEXT.findall((root / LOG_TEXTS).read_text(encoding="utf-8"))]
+    found = {}
+    for name, begin in LOG_REASON.findall((root / LOG_REASONS).read_text(encoding="utf-8")):
+        levels = [level for text, level in texts if text.startswith(begin)]
+        found[name] = OF_THE_REQUEST.get(name, min([*levels, found.get(name, 9)]))
+    return found
+
+
+def page(text, header, in_logs):
+    """The page with its tables, which stand behind their marks, as the sources have them."""
     tables = {"classes": ["| Class | What a caller may do |", "|---|---|",
                           *(f"| `{name}` | {advice} |" for _, name, advice in CLASS.findall(header))],
-              "reasons": ["| | Reason | Class | Sentence |", "|---|---|---|---|",
-                          *(f"| {number} | `{name}` | `{kind}` | {sentence} |"
+              "reasons": ["| | Reason | Class | In a log | Sentence |", "|---|---|---|---|---|",
+                          *(f"| {number} | `{name}` | `{kind}` | {in_logs.get(name, '')} | {sentence} |"
                             for number, name, kind, _, sentence in rows(header))]}
     for mark, lines in tables.items():
         written = f"<!-- {mark} -->\n\n" + "".join(f"{line}\n" for line in lines)
@@ -86,6 +106,12 @@ def complaints(root):
             yield f"{HEADER}: {name}: the sentence shows {CONVERSION.findall(sentence)}, its values are {wanted}"
         if sentence.endswith((".", "\n")) or sentence != sentence.strip():
             yield f"{HEADER}: {name}: the sentence has no full stop or end of line"
+    in_logs = levels_in_logs(root)
+    if not in_logs:
+        yield f"{LOG_REASONS}: no rows were found"
+    for name in in_logs:
+        if name not in named:
+            yield f"{LOG_REASONS}: no reason is called {name}"
     for name, place in given.items():
         if name not in named:
             yield f"{place}: no reason is called {name}"
@@ -97,7 +123,7 @@ def complaints(root):
 def main(*words):
     renew, root = "--renew" in words, pathlib.Path(next((word for word in words if word != "--renew"), ROOT))
     text = (root / PAGE).read_text(encoding="utf-8")
-    wanted = page(text, (root / HEADER).read_text(encoding="utf-8"))
+    wanted = page(text, (root / HEADER).read_text(encoding="utf-8"), levels_in_logs(root))
     if renew:
         whole_file.write(root / PAGE, wanted)
     found = list(complaints(root))

@@ -356,7 +356,8 @@ TEST_F(DecodeProgram, Json_KeepsItsKeys)
               R"("starts":0,"form":"console","level":1,
 "events":[
 {"operation":"PMX_Stop","first_line":1,"last_line":1,"lines":[1],"time":"1.5","title":)"
-              R"("stopped: mutex, timer and registrations stay","details":[],"assumed":[],"problem":0,"kind":"call"}],
+              R"("stopped: mutex, timer and registrations stay","details":[],"assumed":[],"reasons":[],)"
+              R"("problem":0,"kind":"call"}],
 "texts":[
 {"line":1,"last_line":1,"time":"1.5","text":"PMX_Stop","cut":"no","source":"log",)"
               R"("level":1,"operations":["PMX_Stop"],"step":"light stop","values":{}}],

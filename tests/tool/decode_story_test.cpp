@@ -29,17 +29,17 @@ const std::string lines_held_back = "[   10.000300] [PMX] fgPMX_DisplayModeReady
                                     "[   10.000400] [PMX] VDP_SetClearVideo & Not Mix OSD..\r\n"
                                     "[   10.000500] Display Format Change Timer Set.\r\n";
 const std::string told_held_back =
-    "1-3 PMX_SetModeEx: a mode change, of which the log has the end | graphics held back while the display part "
-    "switches | the display timer is set\n";
+    "1-3 PMX_SetModeEx: a mode change, of which the log has the end | graphics wait for the display part, for 10000 ms "
+    "at most | the display timer is set\n";
 
 TEST(DecodeStory, LogFromTheMiddle_ForeignLinesStampsColoursAndCarriageReturns_TellsItAllTheSame)
 {
     EXPECT_EQ(
         "2-2 PMX_SetFormatChangeFlag: the display part begins to switch: its flag is raised\n"
-        "4-7 PMX_SetModeEx: a mode change, of which the log has the end | graphics held back while the display part "
-        "switches | the display timer is set\n"
+        "4-7 PMX_SetModeEx: a mode change, of which the log has the end | graphics wait for the display part, for "
+        "10000 ms at most | the display timer is set\n"
         "8-11 PMX_SetFormatChangeFlag: the display part's flag is lowered, as when it has switched, 2.5 s after line 6 "
-        "| graphics are back, 2.5 s after line 6\n",
+        "| graphics are mixed again, 2.5 s after line 6\n",
         told("et OSD Display mode.\r\n"
              "\x1b[32m[   10.000100] Display Format Change :1.\x1b[0m\r\n"
              "[   10.000200] eth0: link up\r\n"
@@ -55,8 +55,9 @@ TEST(DecodeStory, LogFromTheMiddle_ForeignLinesStampsColoursAndCarriageReturns_T
 
 TEST(DecodeStory, TimerReleases_IsAProblem)
 {
-    EXPECT_EQ(told_held_back + "! 4-8 _PMX_TmrIsr: the timer runs out, 10.0 s after line 3: no answer of the display "
-                               "part stands before it | graphics are back, 10.0 s after line 2\n",
+    EXPECT_EQ(told_held_back +
+                  "! 4-8 _PMX_TmrIsr: the display timer has run out, 10.0 s after line 3: no answer of the "
+                  "display part stands before it | graphics are mixed again, 10.0 s after line 2\n",
               told(lines_held_back + "[   20.000400] PMX timeout.\n"
                                      "[   20.000500] Display Format Change :0.\n"
                                      "[   20.000600] Set Osd Enable :1.\n"
@@ -70,7 +71,7 @@ TEST(DecodeStory, VideoPlaneWaits_LetsGraphicsBackLater)
                                "switched, 1.0 s after line 2 | nothing here lets graphics back, as when the video "
                                "plane driver does so later\n"
                                "6-7 PMX_SetOsdEnable: graphics return if they wait for it: the video plane driver lets "
-                               "them | graphics are back, 1.5 s after line 2\n",
+                               "them | graphics are mixed again, 1.5 s after line 2\n",
               told(lines_held_back + "[   11.000400] Display Format Change :0.\n"
                                      "[   11.000500] Set Osd Enable :1.\n"
                                      "[   11.500400] PMX_SetOsdEnable.\n"
@@ -79,10 +80,11 @@ TEST(DecodeStory, VideoPlaneWaits_LetsGraphicsBackLater)
 
 TEST(DecodeStory, TimerOfAnEarlierChange_IsNoProblem)
 {
-    EXPECT_EQ("1-5 _PMX_TmrIsr: the timer runs out: no line before it has graphics wait for it | graphics are in the "
-              "mix\n",
-              told("PMX timeout.\nDisplay Format Change :0.\nSet Osd Enable :1.\nPMX_SetOsdEnable.\n"
-                   "Set Osd Enable :0.\n"));
+    EXPECT_EQ(
+        "1-5 _PMX_TmrIsr: the display timer has run out: no line before it has graphics wait for it | graphics are "
+        "mixed again\n",
+        told("PMX timeout.\nDisplay Format Change :0.\nSet Osd Enable :1.\nPMX_SetOsdEnable.\n"
+             "Set Osd Enable :0.\n"));
 }
 
 TEST(DecodeStory, StillHeldBackAtTheEnd_IsSaid)
@@ -93,20 +95,23 @@ TEST(DecodeStory, StillHeldBackAtTheEnd_IsSaid)
 
 TEST(DecodeStory, NotWaited_FlagAndGraphicsBelongToTheModeChange)
 {
-    EXPECT_EQ("1-6 PMX_SetModeEx: mode change requested (its outputs are logged at level 9) | no wait for the display "
-              "part: HDMI was sent no new resolution | graphics are in the mix\n",
-              told("SetModeEx\n"
-                   "[PMX] fgHdmiExist:0, Not wait display part...\n"
-                   "Display Format Change :0.\n"
-                   "Set Osd Enable :1.\n"
-                   "PMX_SetOsdEnable.\n"
-                   "Set Osd Enable :0.\n"));
+    EXPECT_EQ(
+        "1-6 PMX_SetModeEx: mode change requested (its outputs are logged at level 9) | no wait for the display "
+        "part: HDMI was sent no new resolution | the mixer's format stays (HDMI changed: 0, TV encoders changed: ?) | "
+        "graphics are mixed again\n",
+        told("SetModeEx\n"
+             "[PMX] fgHdmiExist:0, Not wait display part...\n"
+             "Display Format Change :0.\n"
+             "Set Osd Enable :1.\n"
+             "PMX_SetOsdEnable.\n"
+             "Set Osd Enable :0.\n"));
 }
 
 TEST(DecodeStory, ModeChange_NamesOutputsFormatAndFifthOsd)
 {
     EXPECT_EQ("1-9 PMX_SetModeEx: mode change requested: digital port off, HDMI 720p 50 Hz, component 576p, composite "
-              "576i; fifth OSD 2 | mixer format 720p 50 Hz\n"
+              "576i; fifth OSD 2 | output PMX_OUTPUT_HDMI (1) is the first that is on, and gives the mixer mode "
+              "RES_720P50HZ (9) | everything is programmed for mode RES_720P50HZ (9) at ? Hz\n"
               "9-9 : the log ends within a call: next comes \"PMX Finished to set OSD Display mode.\" of "
               "PMX_SetModeEx\n",
               told("SetModeEx\nCCIR(0, RES_480I)\nHDMI(1, RES_720P50HZ)\nCAV (1, RES_576P)\nCVBS(1, RES_576I)\n"
@@ -115,16 +120,16 @@ TEST(DecodeStory, ModeChange_NamesOutputsFormatAndFifthOsd)
 
 TEST(DecodeStory, AllOutputsOff_IsAProblem)
 {
-    EXPECT_EQ("! 1-2 PMX_SetModeEx: mode change requested (its outputs are logged at level 9) | every output off; "
-              "mixer format 1080i 60 Hz\n",
+    EXPECT_EQ("! 1-2 PMX_SetModeEx: mode change requested (its outputs are logged at level 9) | all outputs "
+              "are off, and HDMI gives the mixer mode RES_1080I60HZ (10)\n",
               told("SetModeEx\n[PMX] Warning: Disable All output, set fmt as 10.\n"));
 }
 
 TEST(DecodeStory, RefusedMode_SaysThatNothingWasSetAndThatTheFlagIsLowered)
 {
     EXPECT_EQ("! 1-6 PMX_SetModeEx: mode change requested (its outputs are logged at level 9) | refused by the "
-              "capability word; nothing was set, and the display part's flag is lowered, not set | graphics are in "
-              "the mix\n",
+              "capability word; nothing was set, and the display part's flag is lowered, not set | graphics are "
+              "mixed again\n",
               told("SetModeEx\n"
                    "[PMX] PMX_SetModeEx, PMX_CheckCap error, set format change flag, wait display part...\n"
                    "Display Format Change :0.\nSet Osd Enable :1.\nPMX_SetOsdEnable.\nSet Osd Enable :0.\n"));
@@ -159,22 +164,25 @@ TEST(DecodeStory, EveryColourConversion_IsNamed)
 
 TEST(DecodeStory, SourceStarts_MasterColourSpaceAndColoursAreItsConsequence)
 {
-    EXPECT_EQ(
-        "1-8 PMX_VdpEnabled: video plane 0 starts | its pictures are BT.601 | master colour space changes from "
-        "BT.709 to BT.601 | a video plane is to be told BT.601 | colours for 480p from BT.601 | converter A off | "
-        "scaler's converter off (not used)\n",
-        told("VDP_0 Enabled\nVDP_0's Src Color Space = DRV_PMX_CS_YCBCR_601\n"
-             "[PMX] VDP_COMP_1 enabled and Color Space is 0.\n"
-             "[PMX] Master Color Space change from 1 to 0.\nInform Vdp CS(0)\n"
-             "Mode(2), eMixerOutCS(0)\nCC_A disable\nScaler CC disable, don't care\n"));
+    EXPECT_EQ("1-8 PMX_VdpEnabled: video plane 0 starts | its pictures are BT.601 | colour space DRV_PMX_CS_YCBCR_6"
+              "01 (0) is what port 0 (main video) asks for, over those before it | the master colour sp"
+              "ace changes from DRV_PMX_CS_YCBCR_709 (1) to DRV_PMX_CS_YCBCR_601 (0) | a video plane is to be told "
+              "BT.601 | colours for 480p from BT.601 | converter A off | "
+              "scaler's converter off (not used)\n",
+              told("VDP_0 Enabled\nVDP_0's Src Color Space = DRV_PMX_CS_YCBCR_601\n"
+                   "[PMX] VDP_COMP_1 enabled and Color Space is 0.\n"
+                   "[PMX] Master Color Space change from 1 to 0.\nInform Vdp CS(0)\n"
+                   "Mode(2), eMixerOutCS(0)\nCC_A disable\nScaler CC disable, don't care\n"));
 }
 
 TEST(DecodeStory, Assertion_IsAProblemWithItsMeaning)
 {
     EXPECT_EQ(
-        "! 1-7 PMX_VdpEnabled: video plane 0 starts | its pictures are BT.601 | master colour space changes from "
-        "BT.709 to BT.601 | a video plane is to be told BT.601 | that video plane has no interface table and was "
-        "passed over | ASSERTION: a video plane has no interface table and was passed over | colours for 480p "
+        "! 1-7 PMX_VdpEnabled: video plane 0 starts | its pictures are BT.601 | the master colour space changes from "
+        "DRV"
+        "_PMX_CS_YCBCR_709 (1) to DRV_PMX_CS_YCBCR_601 (0) | a video plane is to be told BT.601 | that video plane was "
+        "passed over | a component of type PMX_COMP_TYPE_VDP (65) with id ? gave no table | ASSERTION: a video plane "
+        "has no interface table and was passed over | colours for 480p "
         "from BT.601\n",
         told("VDP_0 Enabled\nVDP_0's Src Color Space = DRV_PMX_CS_YCBCR_601\n"
              "[PMX] Master Color Space change from 1 to 0.\nInform Vdp CS(0)\n"
@@ -184,7 +192,71 @@ TEST(DecodeStory, Assertion_IsAProblemWithItsMeaning)
 TEST(DecodeStory, NoSink_IsWhyNobodyIsWaitedFor)
 {
     EXPECT_THAT(told("SetModeEx\n[PMX] fgHdmiExist:1, Not wait display part...\n"),
-                testing::HasSubstr("no wait for the display part: no sink is plugged in"));
+                testing::HasSubstr("nobody is waited for: no sink is there"));
+}
+
+struct Because
+{
+    const char* lines;
+    const char* reason;
+};
+
+TEST(DecodeStory, WhatLinesDetermine_IsToldAsTheReason)
+{
+    constexpr const char* refusal =
+        "[PMX] PMX_SetModeEx, PMX_CheckCap error, set format change flag, wait display part...\n";
+    const std::string request = "SetModeEx\nCCIR(0, RES_480I)\nHDMI(1, RES_1080P50HZ)\nCAV (1, RES_576P)\n"
+                                "CVBS(1, RES_576I)\nCCIR(0, 0, 0, 0)\nOSD5(2)\n";
+    const std::string refused = request + refusal;
+    const std::string never = std::string("SetModeEx\n[PMX] Warning: Disable All output, set fmt as 49.\n") + refusal;
+    const Because cases[] = {
+        { refused.c_str(), "capability bit 9 (RES_1080P50HZ) is clear in ?" },
+        { never.c_str(), "no product admits mode RES_2160P (49)" },
+        { "[PMX] Seting Hue: 1,100.\n[PMX] Seting Hue fail: 1,100.\n", "capability bit 23 (hue) is clear in ?" },
+        { "COMP ID to LOCAL ID Fail, CompType = 7, CompId = 3\n", "a component of type 7 with id 3 has no input port" },
+        { "[PMX0] Set PlaneOrder = [0x76543211]\n[PMX]u1PlnSel[0]=1\n[PMX]u1PlnSel[1]=1\n"
+          "Plane[0] and Plane[1] connect to the same input source!\n",
+          "source 1 feeds two planes, 0 and 1" },
+        { "Plane[0] and Plane[1] connect to the same input source!\n", "source ? feeds two planes, 0 and 1" },
+        { "Invalid VDP Id\n", "the hardware has no video plane ?: they are 0 and 1" },
+        { "Mode(12), eMixerOutCS(2)\nInvalid Color Space Id\n",
+          "the mixer is never set up for colour space DRV_PMX_CS_RGB (2)" },
+        { "Mode(255), eMixerOutCS(1)\n", "mode 255 has no colour standard: the converters stay as they are" },
+        { "Fail to register IID_IPMX of PMX Comp 0\n", "the interface manager refused with ?" },
+        { "i4PMX_Uninit u4Case 1\ni4PMX_Uninit return -1\n", "the operating system did not delete mutex ?" },
+        { "SetMode, RES_1080P60HZ\nMode(12), eMixerOutCS(1)\n",
+          "everything is programmed for mode RES_1080P60HZ (12) at ? Hz" },
+        { "OSD_1 Enabled\nOSD_1's Src Color Space = DRV_PMX_CS_YCBCR_601\n",
+          "colour space DRV_PMX_CS_YCBCR_601 (0) is what port 3 (OSD 1) asks for, over those before it" },
+        { "[PMX] Gfx enabled and Color Space is 1.\n",
+          "colour space DRV_PMX_CS_YCBCR_709 (1) is what port ? asks for, over those before it" },
+        { "[PMX]_arPmxConf[ucPmxId].ucMode=33\n",
+          "mode RES_3D_576I25HZ (33) is none to start with: 480p takes its place" },
+        { "Display Format Change Timer Set.\nASSERT x_timer_stop(_arPmxDispPartStatus.hPMXTimer) == OSR_OK, "
+          "src/driver/pmx/pmx_handshake.cpp:72\n",
+          "the operating system refused the display timer" },
+    };
+    for (const Because& one : cases)
+        EXPECT_THAT(told(one.lines), testing::HasSubstr(std::string(" | ") + one.reason)) << one.lines;
+}
+
+TEST(DecodeStory, WhatLinesDoNotDetermine_HasNoReason)
+{
+    const char* const logs[] = {
+        "SetModeEx\nHDMI(1, RES_1080P50HZ)\n",            // the digital port's line is missing
+        "Mode(12), eMixerOutCS(1)\n",                     // a mode with a standard
+        "Mode(99999999999), eMixerOutCS(4294967297)\n",   // numbers that the layer cannot print
+        "i4PMX_Uninit u4Case 1\ni4PMX_Uninit return 0\n", // it was deleted, or not started
+        "[PMX]_arPmxConf[ucPmxId].ucMode=12\n",           // a mode to start with
+        "PMX_SetOsdEnable.\n",
+        "OSD_1's Src Color Space = DRV_PMX_CS_RGB\n",
+        "SetMode, RES_1080P60HZ\n",
+    };
+    for (const char* const log : logs)
+    {
+        for (const Event& event : pmxboard::decode::tell(read_log(log)).events)
+            EXPECT_TRUE(event.reasons.empty()) << log;
+    }
 }
 
 TEST(DecodeStory, WholeSeconds_AreNotShownWithTenths)
@@ -226,8 +298,8 @@ TEST(DecodeStory, AStart_EndsAllThatWasBefore)
     {
         const std::string story = told(lines_held_back + one.lines);
         EXPECT_THAT(story, testing::HasSubstr(one.told)) << one.what;
-        EXPECT_THAT(story, testing::HasSubstr("graphics are in the mix")) << one.what;
-        EXPECT_THAT(story, testing::Not(testing::HasSubstr("graphics are back"))) << one.what;
+        EXPECT_THAT(story, testing::HasSubstr("graphics are mixed again\n")) << one.what;
+        EXPECT_THAT(story, testing::Not(testing::HasSubstr("graphics are mixed again,"))) << one.what;
     }
 }
 
@@ -272,8 +344,8 @@ TEST(DecodeStory, BehindAGap_WhatLastedIsAssumed)
                                                        "Display Format Change Timer Set.\nHD Exist(1)\n" +
                                                        lines_back));
     const Event& last = story.events.back();
-    EXPECT_EQ(std::vector<std::string>{ "graphics are in the mix" }, last.details);
-    EXPECT_EQ(std::vector<std::string>{ "graphics are back, after line 1" }, last.assumed);
+    EXPECT_EQ(std::vector<std::string>{ "graphics are mixed again" }, last.details);
+    EXPECT_EQ(std::vector<std::string>{ "graphics are mixed again, after line 1" }, last.assumed);
 }
 
 TEST(DecodeStory, ADoubledLine_IsNotTwoEvents)

@@ -24,6 +24,20 @@ Json level_of(const Text& text)
     return text.level >= 0 ? Json(text.level) : Json();
 }
 
+Json json_of(const Determined& reason)
+{
+    const ReasonRow& row = row_of(reason.number);
+    Json values = Json::array();
+    for (std::size_t i = 0; i < row.kinds.size() && row.kinds[i] != "NONE"; ++i)
+        values.push_back(reason.values.at(i) ? Json(*reason.values.at(i)) : Json());
+    return { { "id", reason.number },
+             { "name", row.name },
+             { "class", row.class_name },
+             { "values", values },
+             { "text", sentence_of(reason.number, reason.values) },
+             { "line", reason.line } };
+}
+
 Json json_of(const Event& event)
 {
     constexpr const char* kinds[] = { "call", "gap", "start" };
@@ -36,6 +50,9 @@ Json json_of(const Event& event)
     json["title"] = event.title;
     json["details"] = event.report ? event.report->words() : event.details;
     json["assumed"] = event.assumed;
+    json["reasons"] = Json::array();
+    for (const Determined& reason : event.reasons)
+        json["reasons"].push_back(json_of(reason));
     json["problem"] = event.problem ? 1 : 0;
     json["kind"] = kinds[static_cast<std::size_t>(event.kind)];
     if (event.report)

@@ -50,6 +50,7 @@ struct Teller
     void join_or_open(const Item& item, std::string detail);
     bool go_on(const Item& item, const std::string& detail);
     void close();
+    void tell_reasons(const Item& item);
 
     const Item& at(std::size_t other) const { return log.items[log.order[other]]; }
     bool is_next(Rule rule) const;
@@ -77,6 +78,7 @@ struct Teller
     std::size_t index = 0; ///< the place of the item that is taken
     Rule last = nullptr;   ///< of the item before
     Request request;
+    CallSoFar call; ///< of the open event
     std::optional<Lasting> held;
     std::optional<Lasting> timer;
     bool return_asked = false; ///< the open event says that graphics wait for their return, and has not let them yet
@@ -106,7 +108,9 @@ void Teller::open(const Item& item, std::vector<std::string_view> operations, st
                              item.text->problem,
                              Event::Kind::Call,
                              {},
+                             {},
                              {} });
+    call = CallSoFar(candidates.front());
     event_items = { log.order[index] };
     request = {};
     return_asked = false;
@@ -171,6 +175,18 @@ void Teller::close()
                                      : "the log ends before it tells whether graphics return");
 }
 
+/** What a line determines beside what its rule says. */
+void Teller::tell_reasons(const Item& item)
+{
+    for (const Determined& determined : call.take(item))
+    {
+        event().reasons.push_back(determined);
+        // Two are told by their rules, with how long after what.
+        if (determined.number != PMX_REASON_TIMED_OUT && determined.number != PMX_REASON_MIXED_AGAIN)
+            event().details.push_back(sentence_of(determined.number, determined.values));
+    }
+}
+
 /** Whether the item behind this one has a rule. */
 bool Teller::is_next(Rule rule) const
 {
@@ -200,12 +216,10 @@ std::string Teller::since(const Lasting& begin, const Item& item)
 /** Graphics are mixed again. */
 void Teller::tell_back(const Item& item)
 {
-    if (!held || !held->sure)
-        event().details.push_back("graphics are in the mix");
-    else
-        event().details.push_back("graphics are back" + since(*held, item));
+    const std::string mixed = sentence_of(PMX_REASON_MIXED_AGAIN);
+    event().details.push_back(mixed + (held && held->sure ? since(*held, item) : ""));
     if (held && !held->sure)
-        event().assumed.push_back("graphics are back" + since(*held, item));
+        event().assumed.push_back(mixed + since(*held, item));
     held.reset();
 }
 
@@ -307,6 +321,7 @@ Story Teller::tell()
         lets_return = returning;
         returning = item.text->is_assertion() && lets_return; // which are from within the call
         item.text->rule(*this, item);
+        tell_reasons(item);
         last = item.text->rule;
     }
     close();
@@ -395,7 +410,8 @@ void rules::fifth_osd(Teller& story, const Item& item)
 
 void rules::no_wait(Teller& story, const Item& item)
 {
-    goes_on(story, item);
+    // Without a sink is what a reason says; without a change there may be no sink, too.
+    story.join_or_open(item, item.value("fgHdmiExist") == "1" ? "" : tale_of(item));
 }
 
 void rules::flag(Teller& story, const Item& item)
@@ -431,7 +447,7 @@ void rules::timer_set(Teller& story, const Item& item)
 
 void rules::timed_out(Teller& story, const Item& item)
 {
-    std::string title = "the timer runs out";
+    std::string title = sentence_of(PMX_REASON_TIMED_OUT);
     const auto passed = story.timer ? between(story.timer->since, item.moment) : std::nullopt;
     if (passed && fits_timer(*passed, item.moment->exact))
         title += Teller::since(*story.timer, item);

@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "tools/pmxboard/decode/log.h"
+#include "tools/pmxboard/decode/reasons.h"
 #include "tools/pmxboard/decode/report.h"
 
 namespace pmxboard::decode
@@ -34,6 +35,7 @@ struct Event
     Kind kind = Kind::Call;
     std::vector<std::string> assumed; ///< what is so if nothing of it is among the lines that are missing
     std::optional<StatusReport> report;
+    std::vector<Determined> reasons; ///< that its lines determine; title and details have their sentences
 };
 
 struct Story

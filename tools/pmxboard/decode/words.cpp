@@ -103,7 +103,6 @@ constexpr ValueWords value_table[] = {
     { "fgEnable,fgDigestEnable,ucCAVEn,ucCVBSEn,switch", Family::None, "0=off,1=on,*=on (*)" },
     { "port", Family::None, "8=no port (8): refused,*=port *" },
     { "bSetTVE", Family::None, "0=HDMI,*=the analogue outputs" },
-    { "nobody", Family::None, "0=HDMI was sent no new resolution,*=no sink is plugged in" },
     { "fgApplyOnNext", Family::None, "0=now,*=at the next mode change" },
     { "format", Family::None, "0=YCbCr 4:4:4,1=RGB,2=xvYCC,3=YCbCr 4:2:2,4=full-range RGB" },
     { "called", Family::None, "0=no mode was set since the reset,*=set by a mode setting" },

@@ -44,6 +44,12 @@ std::vector<Reason>& gathered()
     return reasons;
 }
 
+std::function<void(const Reason&)>& listener_of_reasons()
+{
+    static std::function<void(const Reason&)> listener;
+    return listener;
+}
+
 std::string with_number(std::string_view name, std::uint32_t value)
 {
     const std::string number = std::to_string(value);
@@ -152,12 +158,17 @@ bool is_refusal(const Reason& reason)
     return row_of(reason.number).class_of != PMX_REASON_CLASS_NOTE;
 }
 
+std::string sentence_of(PMX_REASON_T reason, const ReasonValues& values)
+{
+    const ReasonRow& row = row_of(reason);
+    return filled(row, [&](std::size_t i, std::string_view conversion) {
+        return values.at(i) ? shown(row.kinds.at(i), conversion, *values.at(i)) : "?";
+    });
+}
+
 std::string sentence_of(const Reason& reason)
 {
-    const ReasonRow& row = row_of(reason.number);
-    return filled(row, [&](std::size_t i, std::string_view conversion) {
-        return shown(row.kinds.at(i), conversion, i == 0 ? reason.a : reason.b);
-    });
+    return sentence_of(reason.number, { reason.a, reason.b });
 }
 
 std::string general_sentence_of(const ReasonRow& row)
@@ -201,6 +212,11 @@ void forget_told_reasons()
     gathered().clear();
 }
 
+void on_told_reason(std::function<void(const Reason&)> listener)
+{
+    listener_of_reasons() = std::move(listener);
+}
+
 } // namespace pmxboard
 
 /* The twin's hook. */
@@ -208,4 +224,6 @@ void pmx_twin_reason(PMX_REASON_T eReason, UINT32 u4A, UINT32 u4B, const CHAR* s
                      const CHAR* szFunction)
 {
     pmxboard::gathered().push_back({ eReason, u4A, u4B, szFile, static_cast<unsigned>(i4Line), szFunction });
+    if (const auto& listener = pmxboard::listener_of_reasons())
+        listener(pmxboard::gathered().back());
 }

@@ -5,6 +5,8 @@
 
 #include <array>
 #include <cstdint>
+#include <functional>
+#include <optional>
 #include <span>
 #include <string>
 #include <string_view>
@@ -46,8 +48,13 @@ struct Reason
 /** Whether something was not done that was asked for: no decision alone. */
 bool is_refusal(const Reason& reason);
 
+/** Of a reason both; what nobody knows is nothing. */
+using ReasonValues = std::array<std::optional<std::uint32_t>, 2>;
+
 /** What it means with its values, by their names: "capability bit 9 is clear in 0x7FFBFDFF". */
 std::string sentence_of(const Reason& reason);
+/** The same, with a question mark for what nobody knows. */
+std::string sentence_of(PMX_REASON_T reason, const ReasonValues& values = {});
 /** The same for any values: "capability bit N is clear in WORD". */
 std::string general_sentence_of(const ReasonRow& row);
 /** "PMX_CheckCap, src/driver/pmx/pmx_mode.cpp:20" */
@@ -58,6 +65,8 @@ board::Value json_of(const Reason& reason);
 /** What the twin has told since it was led in, or since it was last forgotten. */
 const std::vector<Reason>& told_reasons();
 void forget_told_reasons();
+/** Called with each of them when it is told. */
+void on_told_reason(std::function<void(const Reason&)> listener);
 
 /** Where an operation, or what it calls, gives a reason. */
 struct ReasonPlace

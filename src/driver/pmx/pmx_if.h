@@ -187,18 +187,20 @@ static inline bool fgPmxHasCap(UINT32 u4CapBit)
     return ((prPmxConf()->u4Capability >> u4CapBit) & 1) != 0;
 }
 
-/* The port of a video plane: ids 2 and 3 share that of id 1. PMX_PORT_NUM when there is no such plane. */
-static inline UINT32 u4PmxVdpPort(UCHAR ucVdpId)
+/* The port of a video plane, by the low 8 bits of its id: 2 and 3 share that of 1. PMX_PORT_NUM when there is none. */
+static inline UINT32 u4PmxVdpPort(UINT16 u2VdpId)
 {
+    UCHAR ucVdpId = (UCHAR)u2VdpId;
     if (ucVdpId > 3)
-        return PMX_WHY(NO_PORT, PMX_PORT_NUM, PMX_COMP_TYPE_VDP, ucVdpId);
+        return PMX_WHY(NO_PORT, PMX_PORT_NUM, PMX_COMP_TYPE_VDP, u2VdpId);
     return ucVdpId == 0 ? PMX_PORT_VDP_MAIN : PMX_PORT_VDP_SUB;
 }
 
-/* The port of an OSD plane; PMX_PORT_NUM when there is no such plane. */
-static inline UINT32 u4PmxOsdPort(UCHAR ucOsdId)
+/* The port of an OSD plane, by the low 8 bits of its id; PMX_PORT_NUM when there is no such plane. */
+static inline UINT32 u4PmxOsdPort(UINT16 u2OsdId)
 {
-    return ucOsdId > 5 ? PMX_WHY(NO_PORT, PMX_PORT_NUM, PMX_COMP_TYPE_OSD, ucOsdId) : PMX_PORT_OSD_FIRST + ucOsdId;
+    UCHAR ucOsdId = (UCHAR)u2OsdId;
+    return ucOsdId > 5 ? PMX_WHY(NO_PORT, PMX_PORT_NUM, PMX_COMP_TYPE_OSD, u2OsdId) : PMX_PORT_OSD_FIRST + ucOsdId;
 }
 
 /* The mixer id that an IPMX tag carries. */

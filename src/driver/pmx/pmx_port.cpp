@@ -19,9 +19,9 @@ void vPmxUnlock(void)
 UINT32 u4PmxCompId2LocalId(UINT16 u2CompType, UINT16 u2CompId)
 {
     if (u2CompType == PMX_COMP_TYPE_VDP)
-        return u4PmxVdpPort((UCHAR)u2CompId);
+        return u4PmxVdpPort(u2CompId);
     if (u2CompType == PMX_COMP_TYPE_OSD)
-        return u4PmxOsdPort((UCHAR)u2CompId);
+        return u4PmxOsdPort(u2CompId);
     // Only an unknown type is worth a message, not an unknown number of a known one.
     PMX_IsLog(8, "COMP ID to LOCAL ID Fail, CompType = %d, CompId = %d\n", u2CompType, u2CompId);
     return PMX_WHY(NO_PORT, PMX_PORT_NUM, u2CompType, u2CompId);

@@ -73,6 +73,9 @@ std::optional<std::size_t> parameter_called(const Operation& operation, std::str
 
 /* Modes */
 
+constexpr double usual_frequency = 60;
+
+/** 0 where the name does not tell it. */
 double refresh(unsigned mode)
 {
     return std::strtod(refresh_of(record_view::mode_row(mode).name).c_str(), nullptr);
@@ -88,17 +91,19 @@ bool is_interlaced(std::string_view name)
     return false;
 }
 
-/** All modes but one, those nearest to it first. */
-std::vector<unsigned> modes_near(unsigned mode)
+/** All modes but one, those nearest to it first; `asked` is the frequency where its name has none. */
+std::vector<unsigned> modes_near(unsigned mode, double asked = usual_frequency)
 {
     constexpr std::string_view stereo = "RES_3D_";
     const record_view::ModeRow wanted = record_view::mode_row(mode);
+    const double named = refresh(mode);
+    const double frequency = named != 0 ? named : asked;
     const auto distance = [&](unsigned other) {
         const record_view::ModeRow row = record_view::mode_row(other);
         const bool is_alike = row.width == wanted.width && row.height == wanted.height &&
                               is_interlaced(row.name) == is_interlaced(wanted.name) &&
                               row.name.starts_with(stereo) == wanted.name.starts_with(stereo);
-        return std::tuple(!is_alike, std::abs(refresh(other) - refresh(mode)), other);
+        return std::tuple(!is_alike, std::abs(refresh(other) - frequency), other);
     };
     std::vector<unsigned> near;
     for (const record_view::ModeRow& row : record_view::mode_rows())
@@ -116,12 +121,13 @@ std::string whole_refresh(unsigned mode)
     return text.substr(0, text.find('.'));
 }
 
-/** A frequency that was the mode's goes with it. */
+/** A frequency that was the mode's goes with it, and so does one that its name does not tell. */
 std::vector<std::pair<std::size_t, std::string>> with_frequency(const WrittenCall& call, unsigned from, unsigned to)
 {
     const auto frequency = parameter_called(*call.operation, "ucVFreq");
-    if (!frequency || std::to_string(call.values[*frequency].as_number()) != whole_refresh(from) ||
-        whole_refresh(to).empty())
+    const std::string before = whole_refresh(from);
+    if (!frequency || whole_refresh(to).empty() ||
+        (!before.empty() && std::to_string(call.values[*frequency].as_number()) != before))
         return {};
     return { { *frequency, whole_refresh(to) } };
 }
@@ -167,8 +173,10 @@ std::string with_mode(const Value& outputs, std::size_t output, unsigned mode)
 Requests calls_with_other_modes(const WrittenCall& call, const Explanation& explanation)
 {
     Requests requests;
+    const auto frequency = parameter_called(*call.operation, "ucVFreq");
+    const double asked = frequency ? static_cast<double>(call.values[*frequency].as_number()) : usual_frequency;
     const auto add = [&](std::size_t parameter, unsigned from, const auto& word_of) {
-        for (const unsigned mode : modes_near(from))
+        for (const unsigned mode : modes_near(from, asked))
         {
             auto changed = with_frequency(call, from, mode);
             changed.emplace_back(parameter, word_of(mode));

@@ -2,7 +2,10 @@
 #include "tools/pmxboard/language/explanation.h"
 
 #include <algorithm>
+#include <functional>
 #include <ostream>
+#include <span>
+#include <utility>
 
 #include "board/board.h"
 #include "board/json.h"
@@ -13,6 +16,7 @@
 #include "tools/pmxboard/language/session.h"
 #include "tools/pmxboard/reasons/twin.h"
 #include "tools/pmxboard/text/printable.h"
+#include "tools/record_view/store_watch.h"
 
 namespace pmxboard
 {
@@ -63,18 +67,20 @@ protected:
     int_type overflow(int_type c) override { return traits_type::not_eof(c); }
 };
 
-/** Carry commands out, one after the other, and tell what the last one did. In a copy of its own: the next one finds
- *  everything as it was. */
-Json tried(Session& session, const std::vector<std::string>& commands)
+/** Carry commands out, one after the other, and tell what the last one did. */
+Json carried_out(Session& session, const std::vector<std::string>& commands)
 {
-    const Apart apart = run_apart([&](std::ostream&) {
-        Nowhere nowhere;
-        std::ostream shown(&nowhere);
-        Json last;
-        for (const std::string& command : commands)
-            last = carried_out(session, command, shown);
-        return board::written(last);
-    });
+    static Nowhere nowhere;
+    static std::ostream shown(&nowhere);
+    Json last;
+    for (const std::string& command : commands)
+        last = carried_out(session, command, shown);
+    return last;
+}
+
+/** What a copy tells of commands that it has carried out; they may have ended it. */
+Json told_by(const Apart& apart)
+{
     if (apart.death.empty() && !apart.answer.empty())
         return Json::parse(apart.answer);
     return { { "kind", "failed" },        { "message", "it would end the program: " + apart.death },
@@ -105,28 +111,83 @@ bool is_accepted(const std::string& command, const Json& json)
     return json.at("kind") == "done" && unpacked(command, json).refusal() == nullptr;
 }
 
-/** In the copy that the twin was led into. */
-std::string explained_there(Session& session, const std::string& command, const Search& search)
+/** Carry something out in a copy that the twin is led into. Throws StepFailed when it cannot be. */
+Apart run_with_twin(Session& session, const std::function<Json()>& function)
 {
-    lead_in_twin();
-    board::at_every_call({}); // nobody stops there
-    session.watch_stores(session.watches_stores());
-    Json answer = tried(session, { command });
-    answer["accepted"] = Json::array();
-    if (answer.at("kind") == "wrong line")
-        return board::written(answer);
-    const auto near =
-        search.tries == 0 ? std::vector<std::vector<std::string>>() : requests_near(unpacked(command, answer));
-    const auto end = std::chrono::steady_clock::now() + search.time;
-    for (std::size_t i = 0; i < std::min(near.size(), search.tries) && std::chrono::steady_clock::now() < end; ++i)
-    {
-        if (is_accepted(command, tried(session, near[i])))
+    session.output().flush();
+    find_twin();
+    Apart apart = run_apart([&](std::ostream&) {
+        try
         {
-            answer["accepted"] = near[i];
-            break;
+            lead_in_twin();
+            board::at_every_call({}); // nobody stops there
+            session.watch_stores(session.watches_stores());
+            return board::written(function());
         }
-    }
-    return board::written(answer);
+        catch (const std::exception& error)
+        {
+            return board::written(Json{ { "impossible", error.what() } });
+        }
+    });
+    if (apart.answer.starts_with("{\"impossible\""))
+        throw StepFailed(Json::parse(apart.answer).at("impossible").get<std::string>());
+    return apart;
+}
+
+using Requests = std::vector<std::vector<std::string>>;
+
+/** Whether neither the platform was called nor anything stored since the trace had so many entries. */
+bool nothing_has_changed(std::size_t entries)
+{
+    board::trace::look();
+    const auto& all = board::trace::entries();
+    return all.size() >= entries &&
+           std::all_of(all.begin() + static_cast<std::ptrdiff_t>(entries), all.end(),
+                       [](const board::TraceEntry& entry) { return entry.kind == board::TraceEntry::Kind::Log; });
+}
+
+/** Try requests, from one on, as long as they are refused and leave everything as it was: the place behind the last
+ *  that was tried, and whether that was accepted. In a copy of its own. */
+std::pair<std::size_t, bool> try_some(Session& session, const std::string& command,
+                                      std::span<const Requests::value_type> near)
+{
+    const Apart apart = run_apart([&](std::ostream& begun) {
+        record_view::watch_stores(true);
+        bool is_good = false;
+        for (const auto& request : near)
+        {
+            begun << '.';
+            const std::size_t entries = board::trace::entries().size();
+            is_good = is_accepted(command, carried_out(session, request));
+            if (is_good || !nothing_has_changed(entries))
+                break;
+        }
+        return std::string(is_good ? "accepted" : "refused");
+    });
+    return { std::max<std::size_t>(apart.shown.size(), 1), apart.death.empty() && apart.answer == "accepted" };
+}
+
+/** The first of the requests near one that was refused that is accepted; empty when none is. */
+std::vector<std::string> first_accepted(Session& session, const Explanation& refused, const Search& search)
+{
+    const Requests near = search.tries == 0 ? Requests() : requests_near(refused);
+    if (near.empty())
+        return {};
+    const Apart apart = run_with_twin(session, [&] {
+        const auto end = std::chrono::steady_clock::now() + search.time;
+        const auto all = std::span(near).first(std::min(near.size(), search.tries));
+        for (std::size_t next = 0; next < all.size() && std::chrono::steady_clock::now() < end;)
+        {
+            const auto [tried, is_good] = try_some(session, refused.command, all.subspan(next));
+            next += tried;
+            if (is_good)
+                return Json(all[next - 1]);
+        }
+        return Json::array();
+    });
+    if (!apart.death.empty() || apart.answer.empty())
+        throw StepFailed("the copy in which other requests were to be tried ended: " + apart.death);
+    return Json::parse(apart.answer).get<std::vector<std::string>>();
 }
 
 std::string line_of(const std::string& begin, const std::string& text, const Look& look)
@@ -163,27 +224,11 @@ Explanation explain(Session& session, const std::string& command, const Search& 
 {
     if (const auto waiting = board::threads::waiting(); !waiting.empty())
         throw StepFailed("explain copies the process, and a thread that waits cannot be copied: " + waiting.front());
-    session.output().flush();
-    find_twin();
-    const Apart apart = run_apart([&](std::ostream&) {
-        try
-        {
-            return explained_there(session, command, search);
-        }
-        catch (const std::exception& error)
-        {
-            return board::written(Json{ { "impossible", error.what() } });
-        }
-    });
-    if (!apart.death.empty() || apart.answer.empty())
-        throw StepFailed("the copy in which the command was to be explained ended: " + apart.death);
-    const Json answer = Json::parse(apart.answer);
-    if (answer.contains("impossible"))
-        throw StepFailed(answer.at("impossible").get<std::string>());
+    const Json answer = told_by(run_with_twin(session, [&] { return carried_out(session, std::vector{ command }); }));
     if (answer.at("kind") == "wrong line")
         throw LineError(answer.at("message").get<std::string>());
     Explanation explanation = unpacked(command, answer);
-    explanation.accepted = answer.at("accepted").get<std::vector<std::string>>();
+    explanation.accepted = first_accepted(session, explanation, search);
     return explanation;
 }
 

@@ -38,6 +38,21 @@ catch (const board::files::FileError& error)
 }
 
 /** An outcome in a notice: "= 1, *pucMode = RES_480P". */
+constexpr const char* others_called = "the program has called the layer or the platform itself, which no command says";
+
+/** While it lives a command runs: one more. */
+class Running
+{
+public:
+    explicit Running(unsigned& count) : m_count(count) { ++m_count; }
+    ~Running() { --m_count; }
+    Running(const Running&) = delete;
+    Running& operator=(const Running&) = delete;
+
+private:
+    unsigned& m_count;
+};
+
 std::string outcome_text(const Outcome& outcome)
 {
     std::string text = outcome.result ? "= " + outcome.result->to_text() : std::string();
@@ -264,7 +279,7 @@ void Session::imagine(std::string_view text, std::ostream& shown)
     constexpr unsigned deepest = 8;
     if (m_imagined == deepest)
         throw LineError("what-if stands at most " + std::to_string(deepest) + " times within itself");
-    ++m_imagined;
+    const Running imagined(m_imagined);
     m_output.imagine(shown);
     run_command(Line(text));
     m_output.flush();

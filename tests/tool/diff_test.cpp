@@ -132,6 +132,13 @@ TEST(DiffVerb, LookingAround_LeavesItAsItWas)
                             "what-if poke ucHue 9\nexpect misuses 0\ndiff"));
 }
 
+TEST(DiffVerb, AListOfFaults_IsNoCommand)
+{
+    const std::string before = "PMX_Init\nPMX_SetCBEnable 0 1\n";
+    const std::string shown = tool_test::run(before + "fault\ndiff\n").shown;
+    EXPECT_NE(std::string::npos, shown.find("ucCBEnable")) << shown;
+}
+
 TEST(DiffVerb, PowerOn_IsABeginning)
 {
     EXPECT_EQ("  nothing changed\n", shown_by_last("poke ucHue 7\npower-on\ndiff"));

@@ -179,7 +179,7 @@ std::vector<Verb> board_verbs()
               set_fault },
             { "fault FUNCTION off", "take it back; without arguments, all of this function", clear_fault },
             { "fault off", "take all faults back", clear_faults },
-            { "fault", "list them, with the calls and the time that are left", list_faults } } },
+            { "fault", "list them, with the calls and the time that are left", list_faults, looks } } },
         { "advance",
           { { "advance TIME", "let virtual time pass: `10s`, `500ms` or `2us`; timers run out at their moment",
               advance } } },

@@ -70,7 +70,7 @@ void check_command(const Line& command)
         throw LineError("restore would take the board away from under the operation that is running");
     if (name == "include")
         throw LineError("include carries out many lines; each meanwhile is one command");
-    if (found.verb->only_looks)
+    if (only_looks(command))
         throw LineError(name + " only looks, and meanwhile is for what somebody else does; look behind the command "
                                "that it happens in");
     read_form(*found.verb, command);

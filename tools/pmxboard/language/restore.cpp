@@ -28,7 +28,7 @@ bool is_step(const Line& line)
     if (command.operation != nullptr)
         return true;
     const std::string_view name = command.verb->name;
-    return name == "trace" || name == "stores" || (!command.verb->only_looks && name != "restore");
+    return name == "trace" || name == "stores" || (!only_looks(line) && name != "restore");
 }
 
 /** Where an image lies: elsewhere in another installation, and what it holds is compared by itself. */

@@ -130,9 +130,9 @@ void Session::run_line(std::string_view text)
 void Session::run_command(const Line& line)
 {
     const std::string& name = line.word(0);
-    const Command command = find_command(name);
+    const bool acts = !only_looks(line);
     need_power(name);
-    if (command.verb == nullptr || !command.verb->only_looks)
+    if (acts)
     {
         forget_the_past();
         remember(line);
@@ -179,8 +179,7 @@ void Session::run_meanwhile(const Line& line)
 void Session::run_stopped(const Line& line)
 {
     const std::string& name = line.word(0);
-    const Command command = find_command(name);
-    const bool looks = command.verb != nullptr && command.verb->only_looks;
+    const bool only_looked = only_looks(line);
     if (name == "expect" || name == "power-on" || name == "include" || name == "what-if" || name == "restore")
         throw LineError(name + " waits until the layer has gone on: continue");
     const Steps before = std::exchange(m_steps, {});
@@ -188,7 +187,7 @@ void Session::run_stopped(const Line& line)
     m_steps.lose("it was saved while the layer was stopped in the middle of a call");
     try
     {
-        if (looks)
+        if (only_looked)
             carry_out(line);
         else
             run_meanwhile(line);
@@ -199,7 +198,7 @@ void Session::run_stopped(const Line& line)
         throw;
     }
     m_steps = before;
-    if (!looks)
+    if (!only_looked)
         m_steps.lose("a line was typed while the layer was stopped in the middle of a call");
 }
 

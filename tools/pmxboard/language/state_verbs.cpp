@@ -135,16 +135,14 @@ std::vector<Verb> state_verbs()
               "show what each output shows, what each plane is fed with, whether graphics are held back and until "
               "when, "
               "and where record and hardware disagree; or one of these",
-              show_status } },
-          true },
+              show_status, looks } } },
         { "state",
-          { { "state [PATH…] [--json]", "show what board and layer hold, or parts of it", show_state } },
-          true },
+          { { "state [PATH…] [--json]", "show what board and layer hold, or parts of it", show_state, looks } } },
         { "diff",
           { { "diff [PATH…] [--json]", "show what the last command changed, of everything or at these paths",
-              show_changes } },
-          true },
-        { "save", { { "save FILE", "write the whole state to a file, relative to where the tool runs", save } }, true },
+              show_changes, looks } } },
+        { "save",
+          { { "save FILE", "write the whole state to a file, relative to where the tool runs", save, looks } } },
         { "restore",
           { { "restore FILE",
               "bring board and layer to a saved state, by the commands that led there; the file is named relative to "

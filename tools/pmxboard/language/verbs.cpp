@@ -165,7 +165,10 @@ void wrong_usage(const Verb& verb, const Line& line)
     throw LineError("write: " + usage_of(forms));
 }
 
-ReadForm read_form(const Verb& verb, const Line& line)
+namespace
+{
+
+std::optional<ReadForm> best_form(const Verb& verb, const Line& line)
 {
     std::optional<ReadForm> best;
     for (const VerbForm& form : verb.forms)
@@ -173,9 +176,28 @@ ReadForm read_form(const Verb& verb, const Line& line)
         if (auto words = form.form.match(line); words && (!best || words->own > best->words.own))
             best = { &form, std::move(*words) };
     }
+    return best;
+}
+
+} // namespace
+
+ReadForm read_form(const Verb& verb, const Line& line)
+{
+    std::optional<ReadForm> best = best_form(verb, line);
     if (!best)
         wrong_usage(verb, line);
     return std::move(*best);
+}
+
+bool only_looks(const Line& line)
+{
+    const Command command = find_command(line.word(0));
+    if (command.verb == nullptr)
+        return false;
+    if (const auto best = best_form(*command.verb, line))
+        return best->form->only_looks;
+    const auto& forms = command.verb->forms;
+    return std::all_of(forms.begin(), forms.end(), [](const VerbForm& form) { return form.only_looks; });
 }
 
 Command find_command(const std::string& name)

@@ -27,14 +27,15 @@ struct VerbForm
     Form form;
     std::string_view meaning; ///< with `code` in it; empty: that of the form before it
     void (*run)(Session& session, const Words& words);
+    bool only_looks = false; ///< `diff` and `why` go on telling of the command before it
 };
+inline constexpr bool looks = true; ///< as a form's last word
 
 struct Verb
 {
     std::string_view name;
     std::vector<VerbForm> forms;
-    bool only_looks = false; ///< `diff` goes on showing what the command before it changed
-    bool has_kinds = false;  ///< the second word tells what is meant: the forms of another one are of no interest
+    bool has_kinds = false; ///< the second word tells what is meant: the forms of another one are of no interest
 };
 
 /** All of them, in the order of the guide. */
@@ -62,6 +63,10 @@ struct Command
 };
 /** Throws LineError with the nearest names. */
 Command find_command(const std::string& name);
+
+/** Whether a line only looks: the form that it is in does. One that is in none, when every form of its verb does.
+ *  Throws LineError when nothing is called so. */
+bool only_looks(const Line& line);
 
 /* What verbs read from their words. */
 

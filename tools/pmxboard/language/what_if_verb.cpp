@@ -60,9 +60,8 @@ std::vector<Verb> what_if_verbs()
 {
     return {
         { "what-if",
-          { { "what-if COMMAND", "show the calls and the result that a command would have, and change nothing",
-              what_if } },
-          true },
+          { { "what-if COMMAND", "show the calls and the result that a command would have, and change nothing", what_if,
+              looks } } },
     };
 }
 

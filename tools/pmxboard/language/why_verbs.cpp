@@ -129,14 +129,12 @@ std::vector<Verb> why_verbs()
           { { "explain COMMAND",
               "tell why a command would do what it does, and what would be accepted instead of what "
               "is refused; changes nothing",
-              explain_command } },
-          true },
+              explain_command, looks } } },
         { "why",
-          { { "why", "explain the last command", why_last },
-            { "why osd", "tell who holds graphics back, since when, and what ends it", why_graphics },
-            { "why mode", "tell why the mixer runs the mode that it runs", why_mode },
-            { "why colour-space", "tell why the master colour space is what it is", why_colour_space } },
-          true },
+          { { "why", "explain the last command", why_last, looks },
+            { "why osd", "tell who holds graphics back, since when, and what ends it", why_graphics, looks },
+            { "why mode", "tell why the mixer runs the mode that it runs", why_mode, looks },
+            { "why colour-space", "tell why the master colour space is what it is", why_colour_space, looks } } },
     };
 }
 

@@ -1,11 +1,14 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 // The one place of the board that knows the TOML library: it compiles slowly.
 #include <limits>
+#include <sstream>
 #include <toml++/toml.h>
 #include <tuple>
 
+#include "board/board_check.h"
 #include "board/boards_directory.h"
 #include "board/devices.h"
+#include "board/digest.h"
 #include "board/duration.h"
 #include "board/files.h"
 #include "board/names.h"
@@ -534,12 +537,20 @@ void set_boards_directory(std::filesystem::path directory)
 
 Description load_description(const std::filesystem::path& board)
 {
+    return load_checked(board).description;
+}
+
+CheckedDescription load_checked(const std::filesystem::path& board)
+{
     const File file{ find_file(board) };
     try
     {
         const std::string text = files::read(file.path, files::mebibyte);
         check_lines(file, text);
-        return read(file, toml::parse(text, file.path.string()));
+        const toml::table table = toml::parse(text, file.path.string());
+        std::ostringstream said;
+        said << table; // without comments, and laid out as all are
+        return { read(file, table), digest_of(said.str()) };
     }
     catch (const files::FileError& error)
     {

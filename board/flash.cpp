@@ -15,6 +15,7 @@
 
 #include "board/device_values.h"
 #include "board/devices.h"
+#include "board/digest.h"
 #include "board/files.h"
 
 #include "u_os.h"
@@ -96,17 +97,6 @@ Value size_of(const Partition& partition)
     return error ? Value::null() : Value::number(static_cast<std::int64_t>(size));
 }
 
-/** FNV-1a, to tell contents apart: nobody forges an image here. */
-std::string digest_of(std::string_view content)
-{
-    std::uint64_t digest = 0xCBF29CE484222325;
-    for (const char byte : content)
-        digest = (digest ^ static_cast<unsigned char>(byte)) * 0x100000001B3;
-    char digits[16];
-    const auto written = std::to_chars(std::begin(digits), std::end(digits), digest, 16);
-    return { digits, written.ptr };
-}
-
 /** What an image holds, in a few characters. It is read again when it has changed, for the state is asked for often. */
 Value content_of(const Partition& partition)
 try
@@ -120,7 +110,7 @@ try
     auto& [of_version, content] = known[partition.image];
     if (of_version != version || content.kind() == Value::Kind::Null)
     {
-        content = Value::text(digest_of(board::files::read(partition.image)));
+        content = Value::text(board::digest_of(board::files::read(partition.image)));
         of_version = version;
     }
     return content;

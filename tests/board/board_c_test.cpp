@@ -8,6 +8,7 @@
 #include <filesystem>
 #include <functional>
 #include <string>
+#include <utility>
 
 #include "board/board.h"
 #include "board/replaced.h"
@@ -169,6 +170,37 @@ TEST_F(BoardC, Console_OfWhatOnlyMightHappen_IsNotShown)
     EXPECT_EQ("", printed_by([&] { EXPECT_EQ(0, board_c_do(("restore " + file).c_str())); }));
     EXPECT_NE("", printed_by([] { board_c_do("PMX_QueryStatus"); })) << "behind it all is shown again";
     board_c_show_console(0);
+    std::filesystem::remove(file);
+}
+
+TEST_F(BoardC, WhatNoCommandSays_CannotBeRestored)
+{
+    const std::string file = (std::filesystem::temp_directory_path() / "board_c_lost.json").string();
+    const std::string save = "save " + file;
+    const std::string restore = "restore " + file;
+    ASSERT_EQ(0, board_c_do(save.c_str())); // the layer was started by the program itself
+    refused(board_c_do(restore.c_str()), "the program has called the layer or the platform itself");
+    const std::pair<const char*, void (*)()> others[] = {
+        { "the program has called the layer or the platform itself",
+          [] { PMX_SetForceMode(0, TRUE); } }, // stores alone
+        { "board_c_advance", [] { board_c_advance(1); } },
+        { "board_c_meanwhile",
+          [] {
+              board_c_meanwhile(
+                  "PMX_HalSetMode", 1, 0, [](void*) {}, nullptr);
+          } },
+    };
+    for (const auto& [why, act] : others)
+    {
+        ASSERT_EQ(0, board_c_do("power-on"));
+        ASSERT_EQ(0, board_c_do("PMX_Init"));
+        ASSERT_EQ(0, board_c_do("state ucMode"));
+        ASSERT_EQ(0, board_c_do(save.c_str()));
+        EXPECT_EQ(0, board_c_do(restore.c_str())) << board_c_error();
+        act();
+        ASSERT_EQ(0, board_c_do(save.c_str()));
+        refused(board_c_do(restore.c_str()), why);
+    }
     std::filesystem::remove(file);
 }
 

@@ -149,6 +149,41 @@ TEST_F(Restore, LinesThatFailed_AreCarriedOutAgain)
     EXPECT_EQ("", run_here(restore() + "expect state ucTvType PMX_TV_TYPE_PAL"));
 }
 
+TEST_F(Restore, WhatFailsOtherwiseThanThen_IsToldAtItsPlace)
+{
+    std::ostringstream shown, diagnostics;
+    std::istringstream in("PMX_Init\nmeanwhile x_thread_delay request hdmi RES_480P\nPMX_Reset 0\n" + save());
+    pmxboard::Scenario scenario{ "here.pmx", "default", "" };
+    scenario.keep_going = true;
+    EXPECT_FALSE(pmxboard::run_scenario(in, scenario, { .to = &shown }, diagnostics));
+    const std::string good = content(saved());
+    const std::string failed = ",\n        \"failed\": 1";
+    ASSERT_NE(good.npos, good.find("\"failed\": 1")) << good;
+    std::string changed = good;
+    changed.replace(changed.find("\"failed\": 1"), 11, "\"failed\": 0");
+    std::ofstream(saved()) << changed;
+    EXPECT_NE(std::string::npos, run_here(restore()).find("PMX_Reset 0: it fails, which it did not then: "))
+        << run_here(restore());
+    changed = good;
+    changed.replace(changed.find("\"line\": \"PMX_Init\""), 18, "\"failed\": 1, \"line\": \"PMX_Init\"");
+    std::ofstream(saved()) << changed;
+    EXPECT_NE(std::string::npos, run_here(restore()).find("its command 2, PMX_Init: it is done, and failed then"))
+        << run_here(restore());
+}
+
+TEST_F(Restore, AnotherBoardFile_IsRefused)
+{
+    const std::string board = file("own.toml");
+    const std::string says = "name = \"own\"\n[console]\nlevel = 0\n";
+    std::ofstream(board) << says;
+    ASSERT_EQ("", run_here("power-on " + board + "\nPMX_Init\n" + save()));
+    std::ofstream(board) << "# with a comment\n\nname =   \"own\"\n[console]\nlevel=0\n";
+    EXPECT_EQ("", run_here(restore())) << "the same in other words";
+    std::ofstream(board) << says << "[[fault]]\nfunction = \"PMX_HalSetPlaneOrder\"\nanswer = 1\n";
+    EXPECT_NE(std::string::npos, run_here(restore()).find(": its board file says something else than it did then"))
+        << run_here(restore());
+}
+
 TEST_F(Restore, FilesAreFoundWhereTheLinesStood)
 {
     std::ofstream(file("part.pmx")) << "power-on boards/plane-delays.toml\n"
@@ -205,6 +240,7 @@ TEST_F(Restore, WhatLeadsElsewhere_IsRefused_AndNothingHasChanged)
 
 TEST_F(Restore, StatesThatNoLinesLeadTo_AreToldApart)
 {
+    const std::string save_told = "  to be looked at and compared, not restored: ";
     ASSERT_EQ(
         0, run("shell", "PMX_Init\nbreak PMX_HalSetTvType\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\n" + save() + "continue\n")
                .code);
@@ -216,6 +252,8 @@ TEST_F(Restore, StatesThatNoLinesLeadTo_AreToldApart)
                               "continue\n" +
                                   save())
                      .code);
+    EXPECT_NE(std::string::npos,
+              tool_test::run("PMX_Init\n" + restore() + save()).diagnostics.find("cannot be restored"));
     EXPECT_EQ("here.pmx:1: " + saved() +
                   " cannot be restored: a line was typed while the layer was stopped in the middle of a call" +
                   tool_test::repeat,
@@ -310,6 +348,10 @@ TEST(Steps, OfASavedState_AreReadOrRefused)
     EXPECT_EQ("steps: it has neither a list \"commands\" nor a text \"lost\"",
               refused(R"({"version": 1, "commands": []})"));
     EXPECT_EQ("steps.commands[0]: 1 is no command", refused(R"({"version": 1, "commands": [1]})"));
+    for (const char* const wrong : { R"("failed": "x")", R"("board": 1)", R"("in": 1)" })
+        EXPECT_TRUE(refused(std::string(R"({"version": 1, "commands": [{"line": "power-on", )") + wrong + "}]}")
+                        .ends_with("is no command"))
+            << wrong;
     EXPECT_EQ("steps.commands[1]: {\"line\":1} is no command",
               refused(R"({"version": 1, "commands": [{"line": "power-on"}, {"line": 1}]})"));
 }

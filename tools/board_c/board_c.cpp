@@ -98,6 +98,8 @@ void run_inside(pmxboard::Session& running, const pmxboard::Line& line)
         if (line.word(0) == outermost)
             need_outside(outermost);
     }
+    if (!pmxboard::only_looks(line))
+        running.lose_steps("the program gave a command in the middle of a call");
     running.run_meanwhile(line);
 }
 
@@ -187,6 +189,7 @@ int board_c_power_on(const char* szBoard)
         show_console();
         bench->session.watch_changes(false);
         bench->session.power_on(board);
+        bench->session.notice_others();
     });
 }
 
@@ -229,7 +232,7 @@ int board_c_do(const char* szLine)
 int board_c_advance(unsigned uMilliseconds)
 {
     return done_or_failed([uMilliseconds] {
-        session();
+        session().lose_steps("the program let time pass by board_c_advance; the command is advance");
         board::advance(std::chrono::milliseconds(uMilliseconds));
         board::meanwhiles::rethrow_failure();
     });
@@ -243,6 +246,7 @@ int board_c_meanwhile(const char* szFunction, unsigned uCall, int iAsThread, voi
         std::string function = given(szFunction, "platform function");
         if (pfAction == nullptr)
             throw std::runtime_error("no action is given");
+        session().lose_steps("the program armed an action of its own by board_c_meanwhile");
         board::meanwhile(std::move(function), uCall, [=] { pfAction(pvArgument); }, { .thread = iAsThread != 0 });
     });
 }

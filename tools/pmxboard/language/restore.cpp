@@ -80,19 +80,29 @@ private:
 
 } // namespace
 
-void Session::keep_step(const Line& line)
+void Session::keep_step(const Line& line, bool failed)
 {
     if (line.word(0) != "power-on" && is_step(line))
-        m_steps.add({ m_directory.string(), line.from(0) });
+        m_steps.add({ m_directory.string(), line.from(0), failed, {} });
 }
 
-/** What failed in it failed then, too; where that leads is looked at in the end. */
+/** The board is what its file says: it must say what it said then. */
+void Session::power_on_as_then(const Step& step)
+{
+    run_line(step.line);
+    if (const Step& now = m_steps.all().front(); !step.board.empty() && now.board != step.board)
+        throw StepFailed("its board file says something else than it did then");
+}
+
+/** What failed then fails now, too, and nothing else does; where that leads is looked at in the end. */
 void Session::run_step(const Step& step)
 {
     const Line line(step.line);
     if (line.empty() || !is_step(line))
         throw LineError("it does nothing to a state");
     m_directory = step.directory;
+    if (line.word(0) == "power-on")
+        return power_on_as_then(step);
     try
     {
         run_line(step.line);
@@ -101,12 +111,14 @@ void Session::run_step(const Step& step)
     {
         throw;
     }
-    catch (const std::exception&)
+    catch (const std::exception& error)
     {
-        // But a power-on that fails powers nothing on, and is never kept.
-        if (line.word(0) == "power-on")
-            throw;
+        if (!step.failed)
+            throw StepFailed(std::string("it fails, which it did not then: ") + error.what());
+        return;
     }
+    if (step.failed)
+        throw StepFailed("it is done, and failed then");
 }
 
 void Session::run_steps(const StateDump& dump, const std::string& name)

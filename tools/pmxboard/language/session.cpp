@@ -7,6 +7,7 @@
 #include <utility>
 
 #include "board/board.h"
+#include "board/board_check.h"
 #include "board/console.h"
 #include "board/files.h"
 #include "board/threads.h"
@@ -37,7 +38,6 @@ catch (const board::files::FileError& error)
     throw LineError(error.what());
 }
 
-/** An outcome in a notice: "= 1, *pucMode = RES_480P". */
 constexpr const char* others_called = "the program has called the layer or the platform itself, which no command says";
 
 /** While it lives a command runs: one more. */
@@ -53,6 +53,7 @@ private:
     unsigned& m_count;
 };
 
+/** An outcome in a notice: "= 1, *pucMode = RES_480P". */
 std::string outcome_text(const Outcome& outcome)
 {
     std::string text = outcome.result ? "= " + outcome.result->to_text() : std::string();
@@ -73,6 +74,8 @@ Session::Session(Output& output, std::string board, std::filesystem::path direct
     board::trace::set_sink([this](const board::TraceEntry& entry) {
         if (entry.kind == board::TraceEntry::Kind::Notice && entry.function == "misuse")
             m_last_misuse = entry.text;
+        if (m_notices_others && m_running == 0)
+            m_steps.lose(others_called);
         m_output.entry(entry);
     });
     record_view::watch_stores(m_output.shows_stores());
@@ -92,6 +95,8 @@ void Session::run_line(std::string_view text)
     const Line line(text);
     if (line.empty())
         return;
+    look_for_others();
+    const Running running(m_running);
     if (line.word(0) == "expect")
     {
         m_output.expectation(line.from(0));
@@ -118,13 +123,35 @@ void Session::run_line(std::string_view text)
     {
         m_output.flush();
         board::meanwhiles::forget_failures();
-        keep_step(line); // it has failed in the middle of what it did
+        keep_step(line, true); // it has failed in the middle of what it did
+        take_state();
         throw;
     }
     m_output.flush();
     keep_step(line);
+    take_state();
     if (m_shows_explanations && m_commands != commands_before && m_explanation && m_explanation->refusal() != nullptr)
         m_output.shown(to_json_line(*m_explanation), to_text(*m_explanation, m_output.look()));
+}
+
+void Session::notice_others()
+{
+    m_notices_others = true;
+    take_state();
+}
+
+/** What has an entry in the trace was noticed when it happened. */
+void Session::look_for_others()
+{
+    if (m_left && m_running == 0 && m_steps.lost().empty() && !pmxboard::changes(*m_left, whole_state()).empty())
+        m_steps.lose(others_called);
+}
+
+void Session::take_state()
+{
+    m_left.reset();
+    if (m_notices_others && m_running <= 1 && m_powered && m_steps.lost().empty())
+        m_left = whole_state();
 }
 
 void Session::run_command(const Line& line)
@@ -327,23 +354,27 @@ void Session::power_on(const std::string& board)
     std::error_code error;
     const bool is_file = name.find('/') != name.npos || name.ends_with(".toml");
     const bool from_scenario = !board.empty() && is_file && std::filesystem::exists(beside, error);
+    std::string check;
+    const Running running(m_running);
     try
     {
-        const board::Description description = board::load_description(from_scenario ? beside.string() : name);
-        board::power_on(description);
+        board::CheckedDescription loaded = board::load_checked(from_scenario ? beside.string() : name);
+        check = std::move(loaded.check);
+        board::power_on(loaded.description);
     }
     catch (const board::DescriptionError& wrong)
     {
         throw StepFailed(std::string("the board cannot be powered on: ") + wrong.what());
     }
     m_powered = true;
-    const Step step{ board.empty() ? std::string() : m_directory.string(), "power-on " + word_of_file(name) };
+    const Step step{ board.empty() ? std::string() : m_directory.string(), "power-on " + word_of_file(name), false,
+                     std::move(check) };
     m_steps.begin(step);
     // What is seen goes on through a power-on.
     if (m_watches_stores)
-        m_steps.add({ step.directory, "stores on" });
+        m_steps.add({ .directory = step.directory, .line = "stores on" });
     if (!m_output.shows_trace())
-        m_steps.add({ step.directory, "trace off" });
+        m_steps.add({ .directory = step.directory, .line = "trace off" });
     m_before.reset();
     m_output.powered_on();
     m_misuses_expected = 0;

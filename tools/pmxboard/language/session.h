@@ -107,6 +107,10 @@ public:
 
     /** The commands that led here, as a saved state keeps them. */
     const Steps& steps() const { return m_steps; }
+    /** Something happened that none of its commands says: the state cannot be restored. */
+    void lose_steps(std::string why) { m_steps.lose(std::move(why)); }
+    /** Others call the layer and the platform, too: what they do between two commands is noticed. */
+    void notice_others();
     /** Bring board and layer to a saved state by what led there; `name` is the file's, for messages. When they do not
      *  lead there, nothing has changed. Throws StepFailed. */
     void restore(const StateDump& dump, const std::string& name);
@@ -134,13 +138,16 @@ private:
     /** A scenario that does not begin with power-on has a board all the same. */
     void need_power(std::string_view command);
     void run_step(const Step& step);
+    void power_on_as_then(const Step& step);
     void run_steps(const StateDump& dump, const std::string& name);
-    void keep_step(const Line& line);
+    void keep_step(const Line& line, bool failed = false);
     void check_misuses() const;
     void remember(const Line& line);
     static bool leads_into_layer(const Line& line);
     void explain_ahead(const Line& line);
     static void forget_the_past();
+    void look_for_others();
+    void take_state();
 
     Output& m_output;
     std::string m_board;
@@ -152,7 +159,10 @@ private:
     bool m_watches = true;
     Steps m_steps;
     bool m_restoring = false;
-    unsigned m_imagined = 0; ///< what-if within what-if
+    bool m_notices_others = false;
+    unsigned m_running = 0;             ///< commands, each within the one before
+    std::optional<board::Value> m_left; ///< the state that the last command left, when others are noticed
+    unsigned m_imagined = 0;            ///< what-if within what-if
     bool m_watches_stores = false;
     bool m_explains = false;
     bool m_shows_explanations = false;

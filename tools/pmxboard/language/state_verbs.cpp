@@ -88,6 +88,8 @@ void save(Session& session, const Words& words)
         throw StepFailed(error.what());
     }
     session.output().text("  saved to " + printable(name) + "\n");
+    if (const std::string& lost = session.steps().lost(); !lost.empty())
+        session.output().text(wrapped("  to be looked at and compared, not restored: " + lost, usual_width, 0, 2));
 }
 
 void restore(Session& session, const Words& words)

@@ -134,6 +134,10 @@ Json json_of(const Steps& steps)
         if (!step.directory.empty())
             one["in"] = step.directory;
         one["line"] = step.line;
+        if (step.failed)
+            one["failed"] = 1;
+        if (!step.board.empty())
+            one["board"] = step.board;
         json["commands"].push_back(std::move(one));
     }
     return json;
@@ -141,13 +145,14 @@ Json json_of(const Steps& steps)
 
 Step step_of(const Json& json, std::size_t number)
 {
-    const bool is_step = json.is_object() && json.contains("line") && json.at("line").is_string() &&
-                         (!json.contains("in") || json.at("in").is_string());
+    const auto is_text = [&json](const char* key) { return !json.contains(key) || json.at(key).is_string(); };
+    const bool is_step = json.is_object() && json.contains("line") && is_text("line") && is_text("in") &&
+                         is_text("board") && (!json.contains("failed") || json.at("failed").is_number_integer());
     if (!is_step)
         throw DumpError("steps.commands" + item_step(number) + ": " + printable(board::written(json), 60) +
                         " is no command");
-    return { json.contains("in") ? json.at("in").get<std::string>() : std::string(),
-             json.at("line").get<std::string>() };
+    return { json.value("in", ""), json.at("line").get<std::string>(), json.value("failed", 0) != 0,
+             json.value("board", "") };
 }
 
 /** Those that are kept in another way do not keep the state from being looked at. */

@@ -6,7 +6,8 @@
  *
  *  Values are in the form of board/json.h. The steps are what the state can be restored by:
  *
- *      {"version": 1, "commands": [{"in": "scenarios", "line": "power-on default"}, …]}
+ *      {"version": 1, "commands": [{"in": "scenarios", "line": "power-on default", "board": "…"},
+ *                                  {"line": "fault x_sema_creat 0", "failed": 1}, …]}
  *      {"version": 1, "lost": "why they do not lead there"} */
 #pragma once
 

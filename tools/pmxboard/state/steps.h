@@ -18,6 +18,8 @@ struct Step
 {
     std::string directory; ///< what names of files in the line are relative to
     std::string line;
+    bool failed = false; ///< when it led there
+    std::string board{}; ///< of a power-on: what the board file says, in short
 
     bool operator==(const Step&) const = default;
 };

@@ -38,6 +38,7 @@ NOBODY = 65534
 CLOSED_PIPE = 128 + signal.SIGPIPE
 CODES = {0: "done", 1: "a failed step", 2: "nothing that can be used"}
 CONTROLS = {chr(code) for code in [*range(0x20), *range(0x7f, 0xa0)]} - {"\n", "\t"}
+TO_SCENARIO = "to scenario"  # decode's reader once more: of mutated logs alone
 HUGE = 1 << 20
 LONGEST_NAME = "n" * 300
 
@@ -147,6 +148,7 @@ class Inputs(Directory):
         if len(content) < HUGE:  # the same reader
             yield "decode json", ("decode", "--json", "-"), content
             yield "against hostile", ("decode", file, "--against", self.scenario), b""
+            yield TO_SCENARIO, ("decode", "--to-scenario", file), b""
         yield "against", ("decode", self.log, "--against", file), b""
         yield "board", ("run", "--board", toml, self.scenario), b""
         yield "power-on", ("run", "-"), f"power-on {toml}\nPMX_Init\n".encode()
@@ -158,7 +160,7 @@ class Inputs(Directory):
         for number, (name, content) in enumerate(found.items()):
             wanted = ways and ways[number % len(ways)]
             for way, arguments, stdin in self.every_way(content):
-                if wanted in (None, way):
+                if wanted == way or (wanted is None and way != TO_SCENARIO):
                     self.check(self.run_tool(*arguments, stdin=stdin), f"{name}, {way}")
 
     def test_any_bytes_everywhere(self):
@@ -186,7 +188,7 @@ class Inputs(Directory):
         lines = pathlib.Path("scenarios/picture-in-picture.pmx").read_bytes()
         for good, ways in ((lines, ("run", "shell")), (self.state.read_bytes(), ("state", "state two", "status")),
                            (self.board.read_bytes(), ("board",)),
-                           (self.log.read_bytes(), ("decode", "against hostile"))):
+                           (self.log.read_bytes(), ("decode", "against hostile", TO_SCENARIO))):
             self.try_all(contents.mutations(good, 40 * ROUNDS, len(good)), ways)
 
     def test_names_that_lead_nowhere(self):
@@ -304,7 +306,7 @@ class Outputs(Directory):
                     ("run", "--trace-format", "chrome", self.scenario), ("state", self.state),
                     ("state", "--json", self.state), ("status", self.state), ("status", "--json", self.state),
                     ("shell",), ("decode", self.log), ("decode", "--json", self.log), ("decode", "--texts"),
-                    ("decode", self.log, "--against", self.scenario))
+                    ("decode", self.log, "--against", self.scenario), ("decode", "--to-scenario", self.log))
 
     def run_into(self, arguments, output, **options):
         return subprocess.run([PROGRAM, *map(str, arguments)], input=b"PMX_Init\n", stdout=output,

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <optional>
 #include <random>
 
 #include "board/board.h"
@@ -364,17 +365,25 @@ TEST(MeanwhileVerb, HostileLines_AreRefusedOrDone_AndNothingElse)
                                              "what-if",     "stores",
                                              "fault",       "=" };
     std::mt19937 random(1);
+    constexpr int lines_a_board = 20;
+    std::optional<pmxboard::Output> output;
+    std::optional<pmxboard::Session> session;
     for (int i = 0; i < 600; ++i)
     {
         std::string line = i % 3 == 0 ? "meanwhile" : i % 3 == 1 ? "meanwhile x_sema_lock" : "expect next SET";
         for (unsigned n = random() % 6; n > 0; --n)
             line += " " + words[random() % words.size()];
-        pmxboard::Output output({ .quiet = true });
-        pmxboard::Session session(output, "default", ".");
+        if (i % lines_a_board == 0)
+        {
+            session.reset();
+            output.emplace(pmxboard::OutputOptions{ .quiet = true });
+            session.emplace(*output, "default", ".");
+            session->watch_changes(false); // nobody asks for them
+        }
         const auto carry_out = [&](const std::string& text) {
             try
             {
-                session.run_line(text);
+                session->run_line(text);
             }
             catch (const pmxboard::LineError&)
             {

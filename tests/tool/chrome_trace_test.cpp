@@ -33,11 +33,11 @@ std::vector<Json> traced(const std::vector<std::string>& scenarios, const pmxboa
                                    diagnostics);
         }
     }
-    const Json whole = Json::parse(trace.str());
+    Json whole = Json::parse(trace.str());
     EXPECT_EQ("ms", whole.at("displayTimeUnit"));
     EXPECT_EQ(2u, whole.size());
     EXPECT_EQ("", shown.str()) << "what a program reads holds nothing else";
-    return whole.at("traceEvents").get<std::vector<Json>>();
+    return std::move(whole.at("traceEvents").get_ref<Json::array_t&>());
 }
 
 using Lane = std::pair<int, int>;
@@ -57,15 +57,17 @@ std::vector<std::string> faults(const std::vector<Json>& events)
     std::set<int> processes;
     for (const Json& event : events)
     {
-        const std::string phase = event.at("ph");
+        const auto& phase = event.at("ph").get_ref<const std::string&>();
+        const auto& name = phase == "E" ? phase : event.at("name").get_ref<const std::string&>();
         const Lane lane = lane_of(event);
-        const auto nanoseconds = static_cast<std::int64_t>(event.at("ts").get<double>() * 1000 + 0.5);
+        const auto time = event.at("ts").get<double>();
+        const auto nanoseconds = static_cast<std::int64_t>(time * 1000 + 0.5);
         const auto complain = [&](const char* what) { wrong.push_back(what + (": " + event.dump())); };
-        if (event.at("ts").get<double>() < 0 || !event.at("args").is_object())
+        if (time < 0 || !event.at("args").is_object())
             complain("negative time, or no arguments");
-        if (phase == "M" && event.at("name") == "process_name")
+        if (phase == "M" && name == "process_name")
             processes.insert(lane.first);
-        if (phase == "M" && event.at("name") == "thread_name")
+        if (phase == "M" && name == "thread_name")
             named.insert(lane);
         if (phase == "M")
             continue;
@@ -82,7 +84,7 @@ std::vector<std::string> faults(const std::vector<Json>& events)
             complain("an instant of no scope");
         else if (phase != "B" && phase != "E" && phase != "i")
             complain("a phase of no meaning");
-        if (phase != "E" && (!event.at("name").is_string() || event.at("name") == ""))
+        if (name.empty())
             complain("no name");
     }
     for (const auto& [lane, depth] : open)

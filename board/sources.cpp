@@ -35,6 +35,7 @@ struct Source
     bool connected = false;
     std::optional<Size> size;  ///< of the pictures that it delivers; nothing: it is stopped
     std::optional<bool> taken; ///< whether the mixer took its last start or change of size
+    board::sources::Picture picture;
 };
 
 struct VideoPlane : Source
@@ -252,6 +253,8 @@ void report_common(const Source& source, Value& value)
                                    : Value::record({ { "width", Value::number(source.size->width) },
                                                      { "height", Value::number(source.size->height) } }));
     value.add("taken", source.taken ? board::flag(*source.taken) : Value::null());
+    if (!source.picture.name.empty())
+        value.add("picture", Value::text(source.picture.name));
 }
 
 Value reported(const VideoPlane& plane, unsigned number)
@@ -396,6 +399,16 @@ UINT32 stop(Id id)
     }
     set_hardware(id, VDP_DISABLED);
     return answer;
+}
+
+void set_picture(Id id, Picture picture)
+{
+    source_at(id).picture = std::move(picture);
+}
+
+const Picture& picture_of(Id id)
+{
+    return source_at(id).picture;
 }
 
 void mixer_has_started()

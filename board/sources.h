@@ -5,6 +5,7 @@
  *  video plane has its IVdp table published, keeps what it is told, and checks that it is told by the rules. */
 #pragma once
 
+#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -12,6 +13,11 @@
 
 #include "drv_if_pmx.h"
 #include "x_typedef.h"
+
+namespace board::picture
+{
+class Image;
+}
 
 namespace board::sources
 {
@@ -58,6 +64,16 @@ UINT32 resize(Id id, Size size);
 /** Deliver no more pictures; the plane's hardware is disabled.
  *  @return the mixer's answer */
 UINT32 stop(Id id);
+
+/** What a source shows. */
+struct Picture
+{
+    std::string name{};                            ///< a pattern's, or a file's; empty: a card that names the source
+    std::shared_ptr<const picture::Image> image{}; ///< of a file
+};
+/** From now on, whatever its size is; it is scaled to that. Power-on takes it back. */
+void set_picture(Id id, Picture picture);
+const Picture& picture_of(Id id);
 
 /** What a source does when the mixer has started. */
 struct Start

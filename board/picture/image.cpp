@@ -18,7 +18,8 @@ std::size_t checked_count(int width, int height)
 } // namespace
 
 Image::Image(int width, int height, Space space, Pixel filled)
-    : m_width(width), m_height(height), m_space(space), m_pixels(checked_count(width, height), filled)
+    : m_width(width), m_height(height), m_space(space), m_opaque(opacity(filled) == 255),
+      m_pixels(checked_count(width, height), filled)
 {
 }
 

@@ -41,6 +41,9 @@ public:
     Space space() const { return m_space; }
     /** Say what they mean; they stay as they are. */
     void set_space(Space space) { m_space = space; }
+    /** Whether nothing shows through, as far as somebody has said so. */
+    bool is_opaque() const { return m_opaque; }
+    void set_opaque(bool opaque) { m_opaque = opaque; }
 
     std::span<Pixel> pixels() { return m_pixels; }
     std::span<const Pixel> pixels() const { return m_pixels; }
@@ -55,6 +58,7 @@ private:
     int m_width = 0;
     int m_height = 0;
     Space m_space;
+    bool m_opaque = false;
     std::vector<Pixel> m_pixels;
 };
 

@@ -57,14 +57,15 @@ void fill(Image& image, const Field& field, Pixel colour)
                   image.row(y).begin() + std::clamp(field.right, std::max(field.left, 0), image.width()), colour);
 }
 
-/** How many pixels a dot may have for the lines to fit into a field, with a frame of two dots and a dot of air. */
-int dot_for(const Field& field, const std::vector<std::string>& lines)
+/** How many pixels a dot may have, so that the lines fit into the field, with a frame of a dot and some air. */
+int dot_for(const Field& field, const std::vector<std::string>& lines, int largest)
 {
     int longest = 1;
     for (const std::string& line : lines)
         longest = std::max(longest, width_of(line));
     const int tall = static_cast<int>(lines.size()) * (letter_height + 2);
-    return std::max(1, std::min((field.right - field.left) / (longest + 6), (field.bottom - field.top) / (tall + 6)));
+    return std::max(
+        1, std::min({ (field.right - field.left) / (longest + 6), (field.bottom - field.top) / (tall + 6), largest }));
 }
 
 } // namespace
@@ -90,7 +91,7 @@ Signals signals_of(unsigned red, unsigned green, unsigned blue)
 
 Image bars(int width, int height, const Space& space, int bar_width)
 {
-    Image image(width, height, space);
+    Image image(width, height, space, opaque(0, 0, 0));
     for (int x = 0; x < width; ++x)
         image.at(x, 0) =
             pixel_of(times(BARS[static_cast<std::size_t>(x / bar_width) % BARS.size()], BAR_HEIGHT), space);
@@ -100,7 +101,7 @@ Image bars(int width, int height, const Space& space, int bar_width)
 
 Image bars(int width, int height, const Space& space)
 {
-    Image image(width, height, space);
+    Image image(width, height, space, opaque(0, 0, 0));
     for (int x = 0; x < width; ++x)
         image.at(x, 0) = pixel_of(
             times(BARS[static_cast<std::size_t>(x) * BARS.size() / static_cast<std::size_t>(width)], BAR_HEIGHT),
@@ -111,7 +112,7 @@ Image bars(int width, int height, const Space& space)
 
 Image ramp(int width, int height, const Space& space)
 {
-    Image image(width, height, space);
+    Image image(width, height, space, opaque(0, 0, 0));
     for (std::size_t i = 0; i < RAMPS.size(); ++i)
     {
         const int from = height * static_cast<int>(i) / static_cast<int>(RAMPS.size());
@@ -130,7 +131,7 @@ Image solid(int width, int height, const Space& space, const Signals& colour)
 
 Image checker(int width, int height, const Space& space)
 {
-    Image image(width, height, space);
+    Image image(width, height, space, opaque(0, 0, 0));
     const std::array<Pixel, 2> both = { pixel_of(BLACK, space), pixel_of(WHITE, space) };
     for (int y = 0; y < height; ++y)
         for (int x = 0; x < width; ++x)
@@ -138,13 +139,13 @@ Image checker(int width, int height, const Space& space)
     return image;
 }
 
-Image card(int width, int height, const Space& space, const Signals& colour, double how_opaque, const Place& place,
-           const std::vector<std::string>& lines)
+Image card(int width, int height, const Space& space, const CardStyle& style, const std::vector<std::string>& lines)
 {
     Image image(width, height, space);
+    const auto& [colour, how_opaque, place, lines_in_picture] = style;
     const Field field{ static_cast<int>(place.left * width), static_cast<int>(place.top * height),
                        static_cast<int>(place.right * width), static_cast<int>(place.bottom * height) };
-    const int dot = dot_for(field, lines);
+    const int dot = dot_for(field, lines, height / (lines_in_picture * (letter_height + 2)));
     const bool is_light = 0.2126 * colour[0] + 0.7152 * colour[1] + 0.0722 * colour[2] > 0.4;
     const Pixel letters = pixel_of(is_light ? BLACK : WHITE, space);
     fill(image, field, letters);
@@ -156,6 +157,8 @@ Image card(int width, int height, const Space& space, const Signals& colour, dou
         draw_letters(image, (field.left + field.right - dot * width_of(line)) / 2, y, dot, letters, line);
         y += dot * (letter_height + 2);
     }
+    image.set_opaque(how_opaque == 1 && field.left <= 0 && field.top <= 0 && field.right >= width &&
+                     field.bottom >= height);
     return image;
 }
 

@@ -39,8 +39,15 @@ struct Place
     double right = 1;
     double bottom = 1;
 };
-/** A framed field that tells something, as large as the letters can be; the picture around it is transparent. */
-Image card(int width, int height, const Space& space, const Signals& colour, double how_opaque, const Place& place,
-           const std::vector<std::string>& lines);
+/** A field's colour, how opaque it is, and where it is in its picture, which is transparent around it. */
+struct CardStyle
+{
+    Signals colour;
+    double how_opaque = 1;
+    Place place{};
+    int lines_in_picture = 10; ///< its letters are no larger than so many of them would be
+};
+/** A framed field that tells something. */
+Image card(int width, int height, const Space& space, const CardStyle& style, const std::vector<std::string>& lines);
 
 } // namespace board::picture

@@ -43,6 +43,11 @@ png_byte without_opacity(unsigned number, unsigned a)
     return static_cast<png_byte>(a == 0 ? 0 : std::min((number * 255 + a / 2) / a, 255u));
 }
 
+bool is_transparent(const Image& image)
+{
+    return std::any_of(image.pixels().begin(), image.pixels().end(), [](Pixel pixel) { return opacity(pixel) != 255; });
+}
+
 } // namespace
 
 bool is_png(std::string_view bytes)
@@ -65,14 +70,14 @@ Image read_png(std::string_view bytes)
         png.failed();
     for (std::size_t i = 0; i < image.pixels().size(); ++i)
         image.pixels()[i] = with_opacity(&rgba[i * BYTES]);
+    image.set_opaque(!is_transparent(image));
     return image;
 }
 
 std::string to_png(const Image& image)
 {
     const Image rgb = converted(image, full_rgb);
-    const bool transparent =
-        std::any_of(rgb.pixels().begin(), rgb.pixels().end(), [](Pixel pixel) { return opacity(pixel) != 255; });
+    const bool transparent = is_transparent(rgb);
     std::vector<png_byte> samples;
     samples.reserve(rgb.pixels().size() * BYTES);
     for (const Pixel pixel : rgb.pixels())

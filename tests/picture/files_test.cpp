@@ -116,7 +116,7 @@ TEST(PictureFiles, DamagedFiles_AreReadOrRefused)
 {
     std::mt19937 random(1);
     const std::string y4m = "YUV4MPEG2 W4 H4 F25:1 C420jpeg\nFRAME\n" + std::string(24, 'x');
-    const std::string png = to_png(card(40, 30, full_rgb, { 0.2, 0.5, 0.7 }, 0.8, {}, { "x" }));
+    const std::string png = to_png(card(40, 30, full_rgb, { { 0.2, 0.5, 0.7 }, 0.8 }, { "x" }));
     unsigned refused = 0;
     for (const std::string& good : { y4m, png })
     {

@@ -90,7 +90,7 @@ TEST(Patterns, Solid_IsTheColour)
 
 TEST(Patterns, Card_IsTransparentAroundItsField)
 {
-    const Image image = card(100, 50, full_rgb, { 0, 0, 1 }, 0.5, { 0.5, 0.2, 1, 0.8 }, { "A" });
+    const Image image = card(100, 50, full_rgb, { { 0, 0, 1 }, 0.5, { 0.5, 0.2, 1, 0.8 }, 1 }, { "A" });
     EXPECT_EQ(0U, image.at(49, 25));
     EXPECT_EQ(0U, image.at(75, 9));
     EXPECT_EQ(0U, image.at(75, 40));

@@ -26,6 +26,8 @@ LIBRARIES = {
     "nlohmann_json": ("MIT", "STATIC_LINK", (TOOL, BOARD)),
     "tomlplusplus": ("MIT", "STATIC_LINK", (TOOL, BOARD)),
     "libedit": ("BSD-3-Clause", "DYNAMIC_LINK", (TOOL,)),
+    "pixman": ("MIT", "DYNAMIC_LINK", (TOOL, BOARD)),
+    "libpng": ("libpng-2.0", "DYNAMIC_LINK", (TOOL, BOARD)),
 }
 
 

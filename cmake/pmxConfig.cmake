@@ -24,12 +24,18 @@ endif()
 if(board IN_LIST pmx_FIND_COMPONENTS)
     find_package(Threads QUIET)
     find_library(PMX_TOML_LIBRARY tomlplusplus)
-    mark_as_advanced(PMX_TOML_LIBRARY)
+    find_library(PMX_PIXMAN_LIBRARY pixman-1)
+    find_library(PMX_PNG_LIBRARY png)
+    mark_as_advanced(PMX_TOML_LIBRARY PMX_PIXMAN_LIBRARY PMX_PNG_LIBRARY)
     set(pmx_board_FOUND FALSE)
     if(NOT Threads_FOUND)
         set(pmx_NOT_FOUND_MESSAGE "pmx::board needs threads.")
     elseif(NOT PMX_TOML_LIBRARY)
         set(pmx_NOT_FOUND_MESSAGE "pmx::board needs the library tomlplusplus (Debian: libtomlplusplus-dev).")
+    elseif(NOT PMX_PIXMAN_LIBRARY)
+        set(pmx_NOT_FOUND_MESSAGE "pmx::board needs the library pixman (Debian: libpixman-1-dev).")
+    elseif(NOT PMX_PNG_LIBRARY)
+        set(pmx_NOT_FOUND_MESSAGE "pmx::board needs the library libpng (Debian: libpng-dev).")
     else()
         set(pmx_board_FOUND TRUE)
     endif()
@@ -37,7 +43,8 @@ if(board IN_LIST pmx_FIND_COMPONENTS)
         add_library(pmx::board STATIC IMPORTED)
         set_target_properties(pmx::board PROPERTIES
             IMPORTED_LOCATION "${PMX_PREFIX}/lib/pmx/libpmx_board.a"
-            INTERFACE_LINK_LIBRARIES "${PMX_TOML_LIBRARY};stdc++;Threads::Threads"
+            INTERFACE_LINK_LIBRARIES
+                "${PMX_TOML_LIBRARY};${PMX_PIXMAN_LIBRARY};${PMX_PNG_LIBRARY};stdc++;Threads::Threads"
             INTERFACE_LINK_OPTIONS "-no-pie;LINKER:@${PMX_PREFIX}/lib/pmx/recorded_calls.txt"
             INTERFACE_INCLUDE_DIRECTORIES "${PMX_PREFIX}/include/pmx")
         get_property(languages GLOBAL PROPERTY ENABLED_LANGUAGES)

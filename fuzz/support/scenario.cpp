@@ -54,9 +54,15 @@ bool has(std::string_view line, std::string_view part)
 /** Whether it names a file that may not be in the directory of its scenario, however that is quoted. */
 bool leads_out(std::string_view line)
 {
-    if (!has(line, "flash") && !has(line, "power-on"))
+    if (!has(line, "flash") && !has(line, "power-on") && !has(line, "picture"))
         return false;
     return has(line, "..") || has(line, "\\") || has(line, " /") || has(line, "\t/") || has(line, "\"/");
+}
+
+/** Whether it writes pictures, or those in which others differ. */
+bool draws(std::string_view line)
+{
+    return has(line, "shot") || (has(line, "expect") && has(line, "picture"));
 }
 
 /** Lines that are included would not have come through here, nor those of a saved state. */
@@ -78,7 +84,7 @@ std::string harmless(std::string_view bytes)
         const bool is_copy = has(line, "what-if");
         // To explain what is refused the process is copied hundreds of times.
         const bool explains = has(line, "explain") || has(line, "why");
-        if (has(line, "save") || explains || includes(line) || leads_out(line) || takes_long(line) ||
+        if (has(line, "save") || draws(line) || explains || includes(line) || leads_out(line) || takes_long(line) ||
             (is_copy && ++copies > most_copies))
             continue;
         kept.append(line).append(1, '\n');

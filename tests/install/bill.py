@@ -15,7 +15,7 @@ FIELDS = {
     "file": {"SPDXID", "fileName", "fileTypes", "checksums", "licenseConcluded", "licenseInfoInFiles", "copyrightText"},
 }
 BILL = "share/pmx/pmx.spdx.json"
-KNOWN_LICENCES = {"MIT", "GPL-2.0-only", "BSD-3-Clause", "NOASSERTION"}
+KNOWN_LICENCES = {"MIT", "GPL-2.0-only", "BSD-3-Clause", "libpng-2.0", "NOASSERTION"}
 
 
 def read(prefix):

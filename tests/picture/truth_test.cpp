@@ -72,7 +72,7 @@ double farthest(const Image& image, const Place& place)
 double farthest_on_outputs(const Kind& kind, const std::string& what)
 {
     double most = 0;
-    for (const Shot& shot : all_shots(hardware_now(), { 1, kind.place.left == 0 ? 8 : 5 }))
+    for (const Shot& shot : all_shots(hardware_now(), { 1, kind.place.left == 0 ? 12 : 6 }))
     {
         EXPECT_EQ("", shot.why_dark) << what << ", " << name_of(shot.output);
         const double far = farthest(shot.picture, kind.place);

@@ -159,7 +159,7 @@ TEST(ScenarioErrors, Expectations)
 {
     EXPECT_BEGINNING("here.pmx:1: no expectation resul; did you mean result", "expect resul 1");
     EXPECT_EQ("here.pmx:1: expect what? result, out, call, next, at, after, no-more, none, log, console, state, "
-              "asserts or misuses\n",
+              "asserts, picture or misuses\n",
               diagnostics("expect"));
     EXPECT_EQ("here.pmx:1: no operation has run yet\n", diagnostics("expect result 1"));
     EXPECT_EQ("here.pmx:1: no operation has run yet\n", diagnostics("expect out pucMode 1"));

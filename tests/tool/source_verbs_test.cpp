@@ -11,9 +11,10 @@ using tool_test::diagnostics;
 
 constexpr const char* SOURCE_USAGE =
     "here.pmx:1: write: source NAME connect, source NAME disconnect, source VDP start SIZE [luma N], source OSD start "
-    "SIZE ycbcr|rgb, source NAME size SIZE, source NAME stop, or source NAME connects-back on|off; SIZE is 1920x1080 "
-    "or "
-    "the like; NAME is vdp0…vdp3 or osd0…osd5; VDP is vdp0…vdp3; OSD is osd0…osd5\n";
+    "SIZE ycbcr|rgb, source NAME size SIZE, source NAME stop, source NAME picture FILE, source NAME picture "
+    "bars|ramp|checker|card, source NAME picture solid R,G,B, or source NAME connects-back on|off; SIZE is 1920x1080 "
+    "or the like; NAME is vdp0…vdp3 or osd0…osd5; VDP is vdp0…vdp3; OSD is osd0…osd5; R,G,B is a colour, such as "
+    "255,128,0\n";
 constexpr const char* DELAY_USAGE =
     "here.pmx:1: write: plane-delay D D D D D D D D, or plane-delay order ORDER D D D D D D D D; ORDER is an order of "
     "planes, such as 0x76543210; D is the delay of a plane, plane 1 first\n";

@@ -5,6 +5,7 @@
 
 #include "board/board.h"
 #include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/picture_verbs.h"
 #include "tools/pmxboard/language/session.h"
 #include "tools/pmxboard/language/verbs.h"
 #include "tools/pmxboard/state/now.h"
@@ -289,7 +290,11 @@ void check_expectation(Session& session, const Line& line)
     const Verb& verb = *find_verb("expect");
     std::vector<std::string> kinds;
     for (const VerbForm& form : verb.forms)
-        kinds.push_back(Line(form.form.written()).word(1));
+    {
+        const std::string kind = Line(form.form.written()).word(1);
+        if (kinds.empty() || kinds.back() != kind) // one may have several forms
+            kinds.push_back(kind);
+    }
     if (line.size() < 2)
     {
         std::string listed;
@@ -325,6 +330,12 @@ std::vector<Verb> expectation_verbs()
             { "expect console \"text\"", "the console printed this, among other things", expect_console, looks },
             { "expect state PATH VALUE", "it is so", expect_state, looks },
             { "expect asserts N", "so many assertions were reported since power-on", expect_asserts, looks },
+            { "expect picture OUTPUT X,Y R,G,B [TOLERANCE]",
+              "a viewer sees this colour there, within 2 or so much in each of the three", expect_colour, looks },
+            { "expect picture OUTPUT FILE",
+              "a viewer sees the picture of a file, relative to the scenario; where that is smaller, in its size. "
+              "`all` are the four outputs in one picture. What differs is written beside the file",
+              expect_file, looks },
             { "expect misuses N", "the board found so many misuses of the platform since power-on", expect_misuses,
               looks } },
           true },

@@ -5,6 +5,7 @@
 #include "board/mixer.h"
 #include "board/sources.h"
 #include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/language/picture_verbs.h"
 #include "tools/pmxboard/language/session.h"
 #include "tools/pmxboard/language/verbs.h"
 #include "tools/pmxboard/text/suggest.h"
@@ -18,15 +19,7 @@ using board::sources::Id;
 
 Id source_in(const Words& words, std::string_view place)
 {
-    const std::string& name = words.at(place);
-    try
-    {
-        return board::sources::find(name);
-    }
-    catch (const std::invalid_argument& error)
-    {
-        throw LineError(error.what() + did_you_mean(name, board::sources::names()));
-    }
+    return source_called(words.at(place));
 }
 
 board::sources::Size size_in(const Words& words)
@@ -119,6 +112,16 @@ void set_delays(Session&, const Words& words)
 
 } // namespace
 
+board::sources::Id source_called(const std::string& name)
+try
+{
+    return board::sources::find(name);
+}
+catch (const std::invalid_argument& error)
+{
+    throw LineError(error.what() + did_you_mean(name, board::sources::names()));
+}
+
 std::vector<Verb> source_verbs()
 {
     return {
@@ -136,6 +139,13 @@ std::vector<Verb> source_verbs()
             { "source OSD start SIZE ycbcr|rgb", "the same for an OSD plane, with its colour mode", start_graphics },
             { "source NAME size SIZE", "its pictures have another size from now on", resize },
             { "source NAME stop", "it delivers no more", stop },
+            { "source NAME picture FILE",
+              "its pictures are those of a file from now on, a PNG or the first frame of a Y4M, relative to the "
+              "scenario",
+              show_file },
+            { "source NAME picture bars|ramp|checker|card",
+              "they are colour bars, a ramp, squares, or the card that names it, as in the beginning", show_pattern },
+            { "source NAME picture solid R,G,B", "they have one colour", show_solid },
             { "source NAME connects-back on|off",
               "a video plane's driver that connects from inside `pu4SetColorMode`, which nobody may",
               connect_back } } },

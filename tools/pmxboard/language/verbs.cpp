@@ -124,6 +124,8 @@ const std::vector<Place>& places()
         { "PARAMETER=VALUE", is_setting,
           "an output, such as phTimer=7, pvDest=[0x0C, 0] or pvParameter={u2ValidAutoVfreq=50}" },
         { "LINE", nullptr, "such as FUNCTION(ARGUMENT, …) = RESULT or SET FIELD OLD → NEW" },
+        { "X,Y", nullptr, "a point, from the upper left corner, such as 960,540" },
+        { "R,G,B", nullptr, "a colour, such as 255,128,0" },
         { "PATH", is_no_option, "" },
         { "COMMAND", begins_command, "" },
         { "\"text\"", is_text, "" },
@@ -135,8 +137,9 @@ const std::vector<Verb>& verbs()
 {
     static const std::vector<Verb> all = [] {
         std::vector<Verb> joined;
-        for (const auto& verbs_of : { output_verbs, board_verbs, device_verbs, source_verbs, state_verbs, what_if_verbs,
-                                      why_verbs, meanwhile_verbs, view_verbs, neighbour_verbs, expectation_verbs })
+        for (const auto& verbs_of :
+             { output_verbs, board_verbs, device_verbs, source_verbs, state_verbs, what_if_verbs, why_verbs,
+               meanwhile_verbs, picture_verbs, view_verbs, neighbour_verbs, expectation_verbs })
         {
             for (Verb& verb : verbs_of())
                 joined.push_back(std::move(verb));

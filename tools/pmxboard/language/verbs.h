@@ -13,6 +13,7 @@
 #include <utility>
 #include <vector>
 
+#include "board/sources.h"
 #include "tools/pmxboard/functions/operation.h"
 #include "tools/pmxboard/language/grammar.h"
 
@@ -85,6 +86,8 @@ std::optional<std::pair<std::int32_t, std::int32_t>> read_size(std::string_view 
 inline constexpr std::array<std::string_view, 5> output_words = { "digital", "hdmi", "component", "composite", "cvbs" };
 /** The index of an output: `digital`, `hdmi`, `component`, or `composite`, which is also `cvbs`. Throws LineError. */
 std::size_t output_called(const std::string& name);
+/** The source of a name. Throws LineError with the nearest names. */
+board::sources::Id source_called(const std::string& name);
 
 /* The verbs by what they are about. */
 
@@ -96,6 +99,7 @@ std::vector<Verb> state_verbs();
 std::vector<Verb> what_if_verbs();
 std::vector<Verb> why_verbs();
 std::vector<Verb> meanwhile_verbs();
+std::vector<Verb> picture_verbs();
 std::vector<Verb> view_verbs();
 std::vector<Verb> neighbour_verbs();
 std::vector<Verb> expectation_verbs();

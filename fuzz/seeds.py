@@ -185,6 +185,22 @@ def words_of_images(tool):
     return [mode["number"].to_bytes(4, "little") for mode in tool.json("modes", "--json")]
 
 
+def pictures(tool):
+    with tempfile.TemporaryDirectory() as directory:
+        for pattern in ("card", "bars", "ramp"):
+            into = pathlib.Path(directory, pattern + ".png")
+            lines = (f"PMX_Init\noutputs hdmi=480p60\nsource vdp0 start 64x64\nsource vdp0 picture {pattern}\n"
+                     f"shot hdmi {into} 32x32\n")
+            tool.output("run", "--quiet", "-", input=lines.encode())
+            yield pattern, into.read_bytes()
+    for sampling, size in (("420jpeg", 24), ("422", 32), ("444", 48), ("mono", 16)):
+        yield sampling, f"YUV4MPEG2 W4 H4 F25:1 Ip A1:1 C{sampling}\nFRAME\n".encode() + bytes(range(size))
+
+
+def words_of_pictures(_):
+    return [b"IHDR", b"IDAT", b"PLTE", b"tRNS", b"gAMA", b"IEND", b"FRAME", b"XCOLORRANGE=FULL", b"C420jpeg", b"Cmono"]
+
+
 TARGETS = {
     "scenario": (scenarios, words_of_the_language),
     "state": (states, words_of_states),
@@ -193,6 +209,7 @@ TARGETS = {
     "decode": (logs, words_of_texts),
     "against": (compared, lambda tool: [*words_of_texts(tool), *(path.stem.encode() for path in SCENARIOS)]),
     "shell": (shell_lines, words_of_the_language),
+    "picture": (pictures, words_of_pictures),
 }
 
 

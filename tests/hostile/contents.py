@@ -2,6 +2,8 @@
 """What somebody may send: {name: bytes}, made by classes, and files that are right but for a few bytes."""
 
 import random
+import struct
+import zlib
 
 DEEP = 30_000    # deeper than any stack, where each level is a call
 LONG = 100_000
@@ -88,6 +90,35 @@ def states(good):
                         ("directory of zero", b'{"version":1,"commands":[{"in":"\\u0000","line":"flash a b"}]}'),
                         ("brackets", b'{"version":1,"commands":[{"line":"' + b"[" * DEEP + b'"}]}')):
         found["steps, " + what] = head + b'"a":1},"steps":' + steps + b"}"
+    return found
+
+
+def _png(width, height, *, depth=8, kind=2, packed=None, more=b""):
+    def chunk(name, content):
+        return struct.pack(">I", len(content)) + name + content + struct.pack(">I", zlib.crc32(name + content))
+
+    head = struct.pack(">IIBBBBB", width, height, depth, kind, 0, 0, 0)
+    return (b"\x89PNG\r\n\x1a\n" + chunk(b"IHDR", head) + more + chunk(b"IDAT", packed or zlib.compress(b"\0" * 800)) +
+            chunk(b"IEND", b""))
+
+
+def pictures():
+    """PNG and Y4M."""
+    text = b"\0\0\0\x01tEXtx\0\0\0\0"
+    found = {
+        "png": _png(16, 16),
+        "png of many pixels": _png(8192, 2048, packed=zlib.compress(bytes(2048 * (1 + 3 * 8192)), 9)),
+        "png of too many": _png(65535, 65535, packed=zlib.compress(bytes(1 << 24), 9)),
+        "png of no pixels": _png(0, 16),
+        "png of no kind": _png(16, 16, kind=9),
+        "png of 16 bits": _png(16, 16, depth=16),
+        "png with wrong texts": _png(16, 16, more=text * 10_000),
+        "png, cut": _png(16, 16)[:60],
+        "y4m": b"YUV4MPEG2 W16 H16 F25:1 C420jpeg\nFRAME\n" + bytes(range(256)) + bytes(128),
+        "y4m without end": b"YUV4MPEG2 " + b"W1 " * LONG,
+    }
+    for size in (b"W0 H0", b"W8192 H8192", b"W-1 H1", b"W99999999999999999999 H1", b"W H", b"W1"):
+        found["y4m " + size.decode()] = b"YUV4MPEG2 " + size + b"\nFRAME\n" + bytes(100)
     return found
 
 

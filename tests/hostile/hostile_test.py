@@ -154,6 +154,8 @@ class Inputs(Directory):
         yield "power-on", ("run", "-"), f"power-on {toml}\nPMX_Init\n".encode()
         yield "image", ("run", "-"), image
         yield "include", ("run", "-"), f"include {file}\n".encode()
+        yield "picture", ("run", "-"), (f"PMX_Init\noutputs hdmi=480p60\nsource vdp0 start 16x16\n"
+                                        f"source vdp0 picture {file}\nshot hdmi\n").encode()
 
     def try_all(self, found, ways=None):
         """Each in one of the ways, or in all that there are."""
@@ -183,6 +185,12 @@ class Inputs(Directory):
 
     def test_board_files(self):
         self.try_all(contents.boards(), ("board", "power-on"))
+
+    def test_pictures(self):
+        found = contents.pictures()
+        self.try_all(found, ("picture",))
+        for name in ("png", "y4m"):
+            self.try_all(contents.mutations(found[name], 15 * ROUNDS, len(found[name])), ("picture",))
 
     def test_right_but_for_a_few_bytes(self):
         lines = pathlib.Path("scenarios/picture-in-picture.pmx").read_bytes()

@@ -1,0 +1,148 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
+/* How what is handed over becomes words: the recorder keeps them, a replay compares them. */
+#ifndef PMX_RECORDER_ENCODING_H
+#define PMX_RECORDER_ENCODING_H
+
+#include <stdbool.h>
+#include <stddef.h>
+
+#include "u_os.h"
+#include "x_typedef.h"
+
+#ifdef __cplusplus
+#include <cstring>
+#else
+void* memcpy(void* pvDest, const void* pvSource, size_t zSize); /* the kernel's */
+void* memset(void* pvDest, int iValue, size_t zSize);
+#endif
+
+#define PMX_WORDS(Size) (((Size) + 3) / 4)
+#define PMX_PRESENT 0x80000000u /* of bytes behind a pointer: it was no null pointer; how many, is added */
+#define PMX_MOST_BYTES 256u     /* that are kept of what one pointer leads to */
+#define PMX_MOST_TEXT 384u      /* characters of a format from outside */
+#define PMX_MOST_VALUES 16u     /* that go with a format */
+#define PMX_ROOM 256u           /* words in which an event is made */
+
+/* The numbers of what both sides know by name. */
+#define PMX_SYMBOL_NULL 0u
+#define PMX_SYMBOL_ISR 1u
+#define PMX_SYMBOL_TABLE 2u
+#define PMX_SYMBOL_POWER 3u
+#define PMX_SYMBOL_OTHER 4u
+
+static inline UINT32 u4PmxSize(size_t zSize, size_t zMost)
+{
+    return (UINT32)(zSize < zMost ? zSize : zMost);
+}
+
+static inline UINT32 u4PmxLength(const char* szText, UINT32 u4Most)
+{
+    UINT32 u4Length = 0;
+    while (u4Length < u4Most && szText[u4Length] != 0)
+        ++u4Length;
+    return u4Length;
+}
+
+/* A text of the layer, or one that it got back: its check sum (FNV-1a); 0 for a null pointer. */
+static inline UINT32 u4PmxText(const char* szText)
+{
+    UINT32 u4Sum = 2166136261u;
+    if (szText == 0)
+        return 0;
+    for (; *szText != 0; ++szText)
+        u4Sum = (u4Sum ^ (UCHAR)*szText) * 16777619u;
+    return u4Sum;
+}
+
+/* Bytes, the last word filled up with zeros. */
+static inline UINT32 u4PmxPutRaw(UINT32* pu4Words, UINT32 u4At, const void* pvBytes, UINT32 u4Size)
+{
+    if (u4Size == 0)
+        return u4At;
+    pu4Words[u4At + PMX_WORDS(u4Size) - 1] = 0;
+    memcpy(pu4Words + u4At, pvBytes, u4Size);
+    return u4At + PMX_WORDS(u4Size);
+}
+
+/* What a pointer leads to: how much, and then the bytes. */
+static inline UINT32 u4PmxPutBytes(UINT32* pu4Words, UINT32 u4At, const void* pvBytes, size_t zSize)
+{
+    UINT32 u4Size = u4PmxSize(zSize, PMX_MOST_BYTES);
+    if (pvBytes == 0)
+    {
+        pu4Words[u4At] = 0;
+        return u4At + 1;
+    }
+    if (u4At + 1 + PMX_WORDS(u4Size) > PMX_ROOM - 1)
+        u4Size = 0;
+    pu4Words[u4At] = PMX_PRESENT | u4Size;
+    return u4PmxPutRaw(pu4Words, u4At + 1, pvBytes, u4Size);
+}
+
+/* The next value that a format takes, behind its letters: 's', 'l' or 'd', 0 when there is none. */
+static inline char cPmxNextValue(const char** pszFormat)
+{
+    const char* szAt = *pszFormat;
+    bool fgInside = false;
+    char cFound = 0;
+    for (; *szAt != 0 && cFound == 0; ++szAt)
+    {
+        const char c = *szAt;
+        if (!fgInside)
+            fgInside = c == '%';
+        else if (c == '*')
+        {
+            *pszFormat = szAt + 1;
+            return 'd'; /* its width; what it is the width of comes next */
+        }
+        else if (c == '%')
+            fgInside = false;
+        else if (c == 'l' || c == 'z' || c == 'p')
+            cFound = 'l';
+        else if (c == 's')
+            cFound = 's';
+        else if ((c >= 'a' && c <= 'z' && c != 'h') || (c >= 'A' && c <= 'Z'))
+            cFound = 'd';
+    }
+    *pszFormat = szAt;
+    return cFound;
+}
+
+/* All values of a format, wide enough to be handed on; how many there are. */
+static inline UINT32 u4PmxCollect(const char* szFormat, va_list rArgs, long* piValues)
+{
+    UINT32 u4Count = 0;
+    char c;
+    if (szFormat == 0)
+        return 0;
+    while (u4Count < PMX_MOST_VALUES && (c = cPmxNextValue(&szFormat)) != 0)
+    {
+        if (c == 's')
+            piValues[u4Count++] = (long)(size_t)va_arg(rArgs, const char*);
+        else
+            piValues[u4Count++] = c == 'l' ? va_arg(rArgs, long) : (long)va_arg(rArgs, int);
+    }
+    return u4Count;
+}
+
+/* The same as words. A text from outside is kept whole, one of the layer as its check sum. */
+static inline UINT32 u4PmxPutValues(UINT32* pu4Words, UINT32 u4At, const char* szFormat, const long* piValues,
+                                    UINT32 u4Count, bool fgWhole)
+{
+    UINT32 i;
+    for (i = 0; i < u4Count; ++i)
+    {
+        if (u4At + 2 >= PMX_ROOM)
+            return u4At;
+        if (cPmxNextValue(&szFormat) != 's')
+            pu4Words[u4At++] = (UINT32)piValues[i];
+        else if (fgWhole)
+            u4At = u4PmxPutBytes(pu4Words, u4At, (const void*)(size_t)piValues[i],
+                                 piValues[i] == 0 ? 0 : u4PmxLength((const char*)(size_t)piValues[i], 63));
+        else
+            pu4Words[u4At++] = u4PmxText((const char*)(size_t)piValues[i]);
+    }
+    return u4At;
+}
+
+#endif

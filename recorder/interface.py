@@ -1,0 +1,134 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+"""What recorder and replay have in common: the numbers of functions, and how the arguments of each become words. Both
+are written from the headers, so that a replay makes of its arguments what the recorder made of them."""
+
+import pathlib
+import sys
+import zlib
+
+sys.dont_write_bytecode = True
+sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "tools" / "cost"))
+
+import elf  # noqa: E402
+import signatures  # noqa: E402
+
+HEADERS = signatures.HEADERS
+PLANE_CALL = signatures.PLANE_CALL
+# Constant objects through which others call the layer, and what a symbol among the arguments is.
+TABLES = ("_rPMXIF", "pmx_pm_ops")
+SYMBOLS = {"_PMX_TmrIsr": "PMX_SYMBOL_ISR", "_rPMXIF": "PMX_SYMBOL_TABLE", "pmx_pm_ops": "PMX_SYMBOL_POWER"}
+KERNEL = ("memcpy", "memset")
+
+
+def operations():
+    return list(signatures.operations().values())
+
+
+def platform():
+    return list(signatures.platform().values())
+
+
+def check_sum():
+    """Tells interfaces apart: the numbers in a recording are those of one of them."""
+    listed = [function.declaration() for function in (*operations(), *platform())]
+    return f"0x{zlib.crc32(chr(10).join(listed).encode()):08X}u"
+
+
+def variables(layer):
+    """(name, size, whether neighbours see it) of the layer's variables, those first that neighbours see."""
+    found = [(symbol.name, symbol.size, not symbol.is_local) for symbol in elf.Elf(layer).symbols
+             if symbol.type == elf.OBJECT and symbol.section and symbol.section.flags & elf.WRITE]
+    return sorted(found, key=lambda one: (not one[2], one[0]))
+
+
+def placed(layer):
+    """(name, size, offset) of the exported variables, of the private ones, and the sizes of the first and of all."""
+    at, rows = 0, {True: [], False: []}
+    exported_size = 0
+    for name, size, is_exported in variables(layer):
+        if not is_exported and not rows[False]:
+            exported_size = at = (at + 3) // 4 * 4
+        rows[is_exported].append((name, size, at))
+        at += size
+    return rows[True], rows[False], exported_size, (at + 3) // 4 * 4
+
+
+def is_text_out(parameter):
+    return bool(parameter.written) and "strlen" in parameter.written
+
+
+def fixed_outputs(function):
+    """What is written behind pointers and has a size that is known before."""
+    return [parameter for parameter in function.parameters if parameter.written and not is_text_out(parameter)]
+
+
+def tables(function):
+    return [parameter for parameter in function.parameters if parameter.kind == "table"]
+
+
+def size_of(parameter, expression):
+    return f"({parameter.name} == 0 ? 0 : u4PmxSize({expression}, PMX_MOST_BYTES))"
+
+
+def encoding(function, is_operation):
+    """The lines that put a function's arguments into au4Words, from u4Used on."""
+    lines, previous = [], ""
+    for parameter in function.parameters:
+        name = parameter.name
+        if parameter.kind in ("values", "list"):
+            whole = "true" if is_operation else "false"
+            lines.append(f"u4Used = u4PmxPutValues(au4Words, u4Used, {previous}, aiValues, u4Values, {whole});")
+        elif parameter.kind == "tag":
+            lines.append(f"au4Words[u4Used++] = (UINT32)(size_t){name};")
+        elif parameter.kind == "symbol":
+            lines.append(f"au4Words[u4Used++] = u4Symbol((size_t){name});")
+        elif parameter.kind == "text" and is_operation:
+            lines.append(f"u4Used = u4PmxPutBytes(au4Words, u4Used, {name}, {name} == 0 ? 0 : "
+                         f"u4PmxLength({name}, PMX_MOST_BYTES - 1));")
+        elif parameter.kind == "text":
+            lines.append(f"au4Words[u4Used++] = u4PmxText({name});")
+        elif parameter.kind == "data" or (parameter.kind == "place" and is_operation):
+            size = parameter.read or parameter.written
+            lines.append(f"u4Used = u4PmxPutBytes(au4Words, u4Used, {name}, {name} == 0 ? 0 : {size});")
+        elif parameter.kind in ("place", "table"):
+            lines.append(f"au4Words[u4Used++] = {name} != 0;")
+        else:
+            lines.append(f"au4Words[u4Used++] = (UINT32){name};")
+        previous = name
+    return lines
+
+
+def collecting(function):
+    """The lines that gather the values of a format first."""
+    kinds = [parameter.kind for parameter in function.parameters]
+    texts = [parameter.name for parameter in function.parameters if parameter.kind == "text"]
+    if "values" in kinds:
+        return ["long aiValues[PMX_MOST_VALUES] = { 0 };", "UINT32 u4Values;", "va_list rValues;",
+                f"va_start(rValues, {texts[-1]});", f"u4Values = u4PmxCollect({texts[-1]}, rValues, aiValues);",
+                "va_end(rValues);"]
+    if "list" in kinds:
+        [given] = [parameter.name for parameter in function.parameters if parameter.kind == "list"]
+        return ["long aiValues[PMX_MOST_VALUES] = { 0 };", "UINT32 u4Values;", "va_list rValues;",
+                f"va_copy(rValues, {given});", f"u4Values = u4PmxCollect({texts[-1]}, rValues, aiValues);",
+                "va_end(rValues);"]
+    return []
+
+
+def handed_on(function):
+    """The arguments of the call behind."""
+    names = [parameter.name for parameter in function.parameters if parameter.kind != "values"]
+    if function.is_variadic:
+        names += [f"aiValues[{i}]" for i in range(16)]
+    return ", ".join(names)
+
+
+def room(function, is_operation):
+    """How many words an event of this function takes at most."""
+    most = 4 + len(tables(function))
+    for parameter in function.parameters:
+        if is_text_out(parameter) or (is_operation and parameter.kind == "values"):
+            return "PMX_ROOM"
+        has_bytes = parameter.kind == "data" or (is_operation and parameter.kind in ("place", "text"))
+        most += (65 if has_bytes else 16 if parameter.kind in ("values", "list") else 1)
+        most += 64 if parameter.written else 0
+    return str(most)

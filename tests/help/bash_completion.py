@@ -35,7 +35,8 @@ class BashCompletion(unittest.TestCase):
         return set(result.stdout.split())
 
     def test_subcommands(self):
-        self.assertLessEqual({"run", "state", "shell", "ops", "modes", "decode"}, self.completed(""))
+        self.assertLessEqual({"run", "state", "shell", "ops", "modes", "decode", "record", "replay"},
+                             self.completed(""))
         self.assertEqual({"state", "status", "shell"}, self.completed("s"))
 
     def test_options(self):

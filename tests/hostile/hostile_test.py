@@ -145,6 +145,7 @@ class Inputs(Directory):
         yield "state two", ("state", self.state, file, ), b""
         yield "status", ("status", file), b""
         yield "decode", ("decode", "-v", file), b""
+        yield "replay", ("replay", file), b""
         if len(content) < HUGE:  # the same reader
             yield "decode json", ("decode", "--json", "-"), content
             yield "against hostile", ("decode", file, "--against", self.scenario), b""
@@ -314,7 +315,12 @@ class Outputs(Directory):
                     ("run", "--trace-format", "chrome", self.scenario), ("state", self.state),
                     ("state", "--json", self.state), ("status", self.state), ("status", "--json", self.state),
                     ("shell",), ("decode", self.log), ("decode", "--json", self.log), ("decode", "--texts"),
-                    ("decode", self.log, "--against", self.scenario), ("decode", "--to-scenario", self.log))
+                    ("decode", self.log, "--against", self.scenario), ("decode", "--to-scenario", self.log),
+                    ("replay", self.recording()))
+
+    def recording(self):
+        self.good("record", self.place / "good.rec", self.scenario)
+        return self.place / "good.rec"
 
     def run_into(self, arguments, output, **options):
         return subprocess.run([PROGRAM, *map(str, arguments)], input=b"PMX_Init\n", stdout=output,
@@ -350,6 +356,7 @@ class Outputs(Directory):
         yield ("shell",), save, 1
         # What is more than the limit of the full disk.
         yield ("shell",), f"record {name}\n".encode() + b"PMX_GetMode 0\n" * 40, 1
+        yield ("record", name, self.scenario), b"", 2
         yield ("run", "-q", "--junit", name, *[self.scenario] * 10), b"", 2
 
     def test_a_full_disk(self):

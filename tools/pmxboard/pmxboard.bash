@@ -63,7 +63,7 @@ _pmxboard_argument()
         _pmxboard_take "$word" < <("$tool" complete "state $word" 2>/dev/null) ;;
     ops) _pmxboard_take "$word" < <(_pmxboard_operations "$tool"; "$tool" complete "fault $word" 2>/dev/null) ;;
     modes) _pmxboard_take "$word" < <("$tool" complete "poke ucMode $word" 2>/dev/null) ;;
-    decode) _pmxboard_files "$word" '*' ;;
+    decode | record | replay) _pmxboard_files "$word" '*' ;;
     '') _pmxboard_take "$word" < <(_pmxboard_subcommands "$tool") ;;
     esac
 }

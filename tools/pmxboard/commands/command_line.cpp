@@ -15,6 +15,7 @@
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/commands/modes.h"
 #include "tools/pmxboard/commands/ops.h"
+#include "tools/pmxboard/commands/record.h"
 #include "tools/pmxboard/commands/run.h"
 #include "tools/pmxboard/commands/shell.h"
 #include "tools/pmxboard/commands/state.h"
@@ -231,6 +232,33 @@ int told(const CLI::App& app, const CLI::ParseError& error)
     return is_help ? exit_done : exit_usage;
 }
 
+void add_record(CLI::App& app, Chosen& chosen)
+{
+    const auto record = std::make_shared<RecordOptions>();
+    CLI::App* const sub =
+        app.add_subcommand("record", "Record what goes in and out of the layer while a scenario runs.");
+    sub->add_option("FILE", record->file, "Where to write the recording")->required();
+    sub->add_option("SCENARIO", record->scenario, "The scenario")->required();
+    sub->add_option("--board", record->board, "Board to power on: a name under boards/, a directory or a .toml file")
+        ->type_name("NAME|FILE");
+    sub->add_option("--size", record->size, "Bytes of the recorder's memory; 16 MiB unless given")
+        ->check(CLI::Range(RecordOptions::least_size, RecordOptions::largest_size).description(""))
+        ->type_name("BYTES");
+    sub->footer(record_examples);
+    sub->callback([record, &chosen] { chosen = [record] { return record_scenario(*record); }; });
+}
+
+void add_replay(CLI::App& app, Chosen& chosen)
+{
+    const auto replay = std::make_shared<ReplayOptions>();
+    CLI::App* const sub = app.add_subcommand("replay", "Run a recording once more, and find the first departure.");
+    sub->add_option("FILE", replay->file, "A recording, or a memory dump with one; - reads the standard input")
+        ->required();
+    sub->add_flag("-q,--quiet", replay->quiet, "Show departures only");
+    sub->footer(replay_examples);
+    sub->callback([replay, &chosen] { chosen = [replay] { return replay_file(*replay); }; });
+}
+
 /** A first word that is no sub-command, which the parser would not name; the exit code. */
 std::optional<int> misspelt(const CLI::App& app, int count, const char* const* arguments)
 {
@@ -269,6 +297,8 @@ int run_command_line(int count, const char* const* arguments)
     add_ops(app, chosen);
     add_modes(app, chosen);
     add_decode(app, chosen);
+    add_record(app, chosen);
+    add_replay(app, chosen);
     if (const auto code = misspelt(app, count, arguments))
         return *code;
     try

@@ -137,4 +137,24 @@ const char* const decode_examples = R"(Examples:
 A log may have anything before, between and behind the layer's lines. docs/decode.md tells the rest.
 Exit codes: 0 done, 1 the log departs from the scenario, 2 wrong usage, or a scenario that fails.)";
 
+const char* const record_examples = R"(Examples:
+  pmxboard record change.rec scenarios/first-mode-after-boot.pmx
+      what goes in and out of the layer in that scenario
+  pmxboard record --size 65536 change.rec scenarios/first-mode-after-boot.pmx
+      the same, as much of its end as a ring of 64 KiB holds
+
+docs/recorder.md tells how a product records the same.
+Exit codes: 0 done, 1 the scenario fails, which is recorded, 2 wrong usage.)";
+
+const char* const replay_examples = R"(Examples:
+  pmxboard record change.rec scenarios/first-mode-after-boot.pmx
+      a recording
+  pmxboard replay change.rec
+      does the layer do the same once more?
+
+FILE is a recording or a memory dump that holds one; docs/recorder.md tells the
+rest.
+Exit codes: 0 equal, 1 the layer departs from it, 2 wrong usage, or no such
+recording.)";
+
 } // namespace pmxboard

@@ -16,5 +16,7 @@ extern const char* const shell_examples;
 extern const char* const ops_examples;
 extern const char* const modes_examples;
 extern const char* const decode_examples;
+extern const char* const record_examples;
+extern const char* const replay_examples;
 
 } // namespace pmxboard

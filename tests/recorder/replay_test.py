@@ -1,0 +1,170 @@
+#!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+"""Records scenarios and replays them: as they are, with another answer, argument or result, out of a memory dump, out
+of a ring that has run over, and damaged.
+
+usage: replay_test.py PROGRAM
+"""
+
+import pathlib
+import random
+import struct
+import subprocess
+import sys
+import tempfile
+import unittest
+
+sys.dont_write_bytecode = True
+ROOT = pathlib.Path(__file__).resolve().parents[2]
+sys.path.insert(0, str(ROOT / "recorder"))
+
+import interface  # noqa: E402
+
+HEADER_WORDS = 28
+RING_WORDS, HEAD, SNAPSHOT_COUNT = 8, 9, 11  # words of the header
+OPERATION, CALL, RETURN, CHANGE, SNAPSHOT = range(1, 6)
+ANSWERED = 0x80
+MODE_CHANGE = "PMX_Init\nPMX_SetMode 0 RES_720P50HZ 50 0\nPMX_SetMode 0 RES_480P 60 0\n"
+
+
+class Recording:
+    """A recording as docs/recorder.md describes it."""
+
+    def __init__(self, content):
+        self.words = list(struct.unpack(f"<{len(content) // 4}I", content))
+
+    def bytes(self):
+        return struct.pack(f"<{len(self.words)}I", *self.words)
+
+    def events(self):
+        """(place, kind, whether it is answered, function) of a ring that has not run over."""
+        at, end = HEADER_WORDS, HEADER_WORDS + self.words[HEAD]
+        while at < end:
+            head = self.words[at]
+            yield at, head >> 8 & 0x7F, bool(head >> 8 & ANSWERED), head >> 16 & 0xFF
+            at += head & 0xFF
+
+
+class Replay(unittest.TestCase):
+    def setUp(self):
+        folder = tempfile.TemporaryDirectory()
+        self.addCleanup(folder.cleanup)
+        self.place = pathlib.Path(folder.name)
+        self.file = self.place / "recording"
+
+    def run_tool(self, *arguments):
+        return subprocess.run([PROGRAM, *map(str, arguments)], capture_output=True, text=True, cwd=ROOT, timeout=60,
+                              check=False)
+
+    def record(self, lines, *options):
+        scenario = self.place / "scenario.pmx"
+        scenario.write_text(lines, encoding="utf-8")
+        ended = self.run_tool("record", *options, self.file, scenario)
+        self.assertEqual(0, ended.returncode, ended.stderr)
+        return Recording(self.file.read_bytes())
+
+    def replay(self, content):
+        self.file.write_bytes(content)
+        return self.run_tool("replay", self.file)
+
+    def test_every_scenario_replays_equal(self):
+        scenarios = sorted((ROOT / "scenarios").glob("*.pmx"))
+        self.assertGreater(len(scenarios), 40)
+        for scenario in scenarios:
+            ended = self.run_tool("record", self.file, scenario)
+            self.assertEqual(0, ended.returncode, f"{scenario.name}: {ended.stderr}")
+            ended = self.run_tool("replay", self.file)
+            self.assertEqual(0, ended.returncode, f"{scenario.name}: {ended.stdout}{ended.stderr}")
+            self.assertRegex(ended.stdout, r"^equal: [1-9]\d* operations, [1-9]\d* calls\n$", scenario.name)
+
+    def test_what_neighbours_do_meanwhile(self):
+        self.record("PMX_Init\nmeanwhile PMX_HalSetMode poke ucBrightness 7\nPMX_SetMode 0 RES_720P50HZ 50 0\n"
+                    "meanwhile TVE_SetFmtEx PMX_SetBrightness 0 9 1\nPMX_SetMode 0 RES_480P 60 0\n"
+                    "PMX_GetBrightness 0\n")
+        self.assertEqual("equal", self.run_tool("replay", self.file).stdout.split(":")[0])
+
+    def test_another_answer_departs_there(self):
+        recording = self.record(MODE_CHANGE)
+        numbers = [function.name for function in interface.platform()]
+        events = list(recording.events())
+        [began] = [event[0] for event in events if event[1::2] == (CALL, numbers.index("x_timer_create"))]
+        # Its handle stands in an object that neighbours see: that was a change from outside, and then it returned.
+        [number] = [i for i, event in enumerate(events) if event[1] == RETURN and
+                    recording.words[event[0] + 3] == began - HEADER_WORDS]
+        recording.words[events[number][0] + 2] = 0xFFFFFFFF
+        ended = self.replay(recording.bytes())
+        self.assertEqual(1, ended.returncode)
+        self.assertIn(f"departs at event {number + 2} of {len(events)}", ended.stdout)
+        self.assertIn("in PMX_Init: another call\n", ended.stdout)
+        self.assertIn("computed: Assert(", ended.stdout)
+        self.assertIn("record:   {ucEnable=", ended.stdout)
+
+    def test_another_argument_departs_there(self):
+        recording = self.record(MODE_CHANGE)
+        numbers = [function.name for function in interface.platform()]
+        place, number = next((event[0], i) for i, event in enumerate(recording.events())
+                             if event[1] == CALL and event[3] == numbers.index("PMX_HalSetMode"))
+        recording.words[place + 4] += 1
+        ended = self.replay(recording.bytes())
+        self.assertEqual(1, ended.returncode)
+        self.assertRegex(ended.stdout, rf"^departs at event {number + 1} .* PMX_\w+: other arguments\n")
+        self.assertRegex(ended.stdout, r"recorded: PMX_HalSetMode\(0, \w+\)\n  computed: PMX_HalSetMode\(0, \w+\)\n")
+
+    def test_another_result_departs_there(self):
+        recording = self.record("PMX_Init\nPMX_GetMode 0\n")
+        numbers = [function.name for function in interface.operations()]
+        [place] = [event[0] for event in recording.events()
+                   if event[1:] == (OPERATION, True, numbers.index("PMX_GetMode"))]
+        recording.words[place + 2] = 5
+        ended = self.replay(recording.bytes())
+        self.assertIn("another result\n  recorded: end of PMX_GetMode = 5\n  computed: end of PMX_GetMode = 1\n",
+                      ended.stdout)
+        recording.words[place + 2] = 1
+        recording.words[place + (recording.words[place] & 0xFF) - 1] ^= 1
+        self.assertIn("another output", self.replay(recording.bytes()).stdout)
+
+    def test_a_ring_that_has_run_over(self):
+        recording = self.record("PMX_Init\n" + 60 * MODE_CHANGE.removeprefix("PMX_Init\n"), "--size", "65536")
+        ring, head = recording.words[RING_WORDS], recording.words[HEAD]
+        self.assertEqual(8192, ring)
+        self.assertGreater(head, 2 * ring)
+        self.assertGreaterEqual(recording.words[SNAPSHOT_COUNT], 4 * (head // ring))
+        ended = self.run_tool("replay", self.file)
+        self.assertEqual(0, ended.returncode, ended.stdout + ended.stderr)
+        lost = int(ended.stdout.split("lost before: ")[1].split()[0]) // 4
+        self.assertGreaterEqual(head - lost, 3 * ring // 4)
+
+    def test_out_of_a_memory_dump(self):
+        content = self.record(MODE_CHANGE).bytes()
+        self.assertEqual(0, self.replay(random.Random(1).randbytes(1001) + content + b"\xff" * 99).returncode)
+
+    def test_what_is_no_recording(self):
+        content = self.record("PMX_Init\n").bytes()
+        swapped = b"".join(content[i:i + 4][::-1] for i in range(0, len(content), 4))
+        for changed, told in ((b"", "there is no recording in it"), (content[:60], "ends within its header"),
+                              (content[:-4], "ends within its ring"), (swapped, "the other order of bytes"),
+                              (content[:12] + b"\x07" + content[13:], "has version 7"),
+                              (content[:16] + b"\x00" + content[17:], "another version of the layer's interface")):
+            ended = self.replay(changed)
+            self.assertEqual(2, ended.returncode, told)
+            self.assertIn(told, ended.stderr)
+
+    def test_damage_does_no_harm(self):
+        recording = self.record(MODE_CHANGE)
+        draw = random.Random(7)
+        ends = set()
+        for _ in range(60):
+            words = list(recording.words)
+            for _ in range(draw.randint(1, 4)):
+                at = draw.randrange(HEADER_WORDS + recording.words[HEAD])
+                words[at] = draw.choice((0, 0xFFFFFFFF, words[at] ^ 1 << draw.randrange(32), draw.getrandbits(32)))
+            ended = self.replay(struct.pack(f"<{len(words)}I", *words))
+            self.assertIn(ended.returncode, (0, 1, 2), f"{ended.returncode}: {ended.stderr}")
+            self.assertEqual(ended.returncode == 2, ended.stderr.startswith("pmxboard: "), ended.stderr)
+            ends.add(ended.returncode)
+        self.assertEqual({1, 2}, ends - {0})
+
+
+if __name__ == "__main__":
+    PROGRAM = pathlib.Path(sys.argv.pop(1)).resolve()
+    unittest.main()

@@ -1,0 +1,144 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
+#include "tools/pmxboard/recording/described.h"
+
+#include <algorithm>
+#include <cstring>
+
+#include "board/names.h"
+#include "board/value.h"
+#include "recorder/encoding.h"
+
+namespace pmxboard
+{
+namespace
+{
+
+std::string number_text(const std::string& owner, const std::string& name, std::uint32_t word)
+{
+    const auto number = static_cast<std::int32_t>(word);
+    return board::Value::number(number, board::names::name_of(board::names::family_of(owner, name), number)).to_text();
+}
+
+std::string symbol_text(std::uint32_t word)
+{
+    static constexpr const char* names[] = { "null", "_PMX_TmrIsr", "_rPMXIF", "pmx_pm_ops" };
+    return word < std::size(names) ? names[word] : "<elsewhere>";
+}
+
+/** Hexadecimal, as check sums and bytes are read. */
+std::string hexadecimal(std::uint32_t word)
+{
+    return board::Value::number(word, {}, board::Value::Base::Hex).to_text();
+}
+
+/** Takes words one after the other. */
+class RecordedWords
+{
+public:
+    explicit RecordedWords(std::span<const std::uint32_t> words) : m_words(words) {}
+
+    bool is_empty() const { return m_words.empty(); }
+    std::uint32_t next()
+    {
+        const std::uint32_t word = is_empty() ? 0 : m_words.front();
+        m_words = m_words.subspan(is_empty() ? 0 : 1);
+        return word;
+    }
+
+    std::string bytes(bool is_text)
+    {
+        const std::uint32_t present = next();
+        if ((present & PMX_PRESENT) == 0)
+            return "null";
+        const std::size_t size = std::min<std::size_t>(present & ~PMX_PRESENT, m_words.size_bytes());
+        std::string text(reinterpret_cast<const char*>(m_words.data()), size);
+        m_words = m_words.subspan(PMX_WORDS(size));
+        if (is_text)
+            return board::quote(text);
+        std::string list;
+        for (const char byte : text)
+            list.append(list.empty() ? "" : " ").append(hexadecimal(static_cast<unsigned char>(byte)).substr(2));
+        return "[" + list + "]";
+    }
+
+private:
+    std::span<const std::uint32_t> m_words;
+};
+
+std::string argument_text(const Described& function, const DescribedParameter& parameter, bool is_operation,
+                          RecordedWords& words)
+{
+    if (parameter.kind == "number")
+        return number_text(function.name, parameter.name, words.next());
+    if (parameter.kind == "symbol")
+        return symbol_text(words.next());
+    if (parameter.kind == "text" && !is_operation)
+        return "#" + hexadecimal(words.next()).substr(2);
+    if (parameter.kind == "data" || (is_operation && (parameter.kind == "text" || parameter.kind == "place")))
+        return words.bytes(parameter.kind == "text");
+    if (parameter.kind == "place" || parameter.kind == "table")
+        return words.next() != 0 ? "<place>" : "null";
+    if (parameter.kind == "tag")
+        return hexadecimal(words.next());
+    std::string values;
+    while (!words.is_empty())
+        values.append(values.empty() ? "" : ", ").append(hexadecimal(words.next()));
+    return values;
+}
+
+std::string described(const Described& function, bool is_operation, std::span<const std::uint32_t> given)
+{
+    RecordedWords words(given);
+    std::string text;
+    for (const DescribedParameter& parameter : function.parameters)
+    {
+        const std::string argument = argument_text(function, parameter, is_operation, words);
+        text += (text.empty() || argument.empty() ? "" : ", ") + argument;
+    }
+    return function.name + "(" + text + ")";
+}
+
+std::string with_answer(const Described& function, const std::string& call, std::uint32_t answer)
+{
+    return function.has_result ? call + " = " + described_answer(function, answer) : call;
+}
+
+} // namespace
+
+std::string described(const Described& function, std::span<const std::uint32_t> words)
+{
+    return described(function, false, words);
+}
+
+std::string described_answer(const Described& function, std::uint32_t answer)
+{
+    return number_text(function.name, "result", answer);
+}
+
+std::string described(const Event& event, std::span<const Event> began)
+{
+    const ReplayedLayer& layer = replayed_layer();
+    const auto function_of = [&layer](const Event& of) -> const Described& {
+        return of.kind == PMX_RECORDER_OPERATION ? layer.operations[of.function].described
+                                                 : layer.functions[of.function];
+    };
+    if (event.kind == PMX_RECORDER_SNAPSHOT)
+        return "snapshot";
+    if (event.kind == PMX_RECORDER_CHANGE)
+        return "changed from outside";
+    if (event.kind == PMX_RECORDER_RETURN)
+    {
+        const auto begin = std::find_if(began.rbegin(), began.rend(),
+                                        [&event](const Event& other) { return other.at == event.words[1]; });
+        const bool is_call =
+            begin != began.rend() && (begin->kind == PMX_RECORDER_OPERATION || begin->kind == PMX_RECORDER_CALL);
+        if (!is_call)
+            return "end of something before";
+        return with_answer(function_of(*begin), "end of " + function_of(*begin).name, event.words[0]);
+    }
+    const Described& function = function_of(event);
+    const std::string call = described(function, event.kind == PMX_RECORDER_OPERATION, event.words.subspan(1));
+    return event.is_answered ? with_answer(function, call, event.words[0]) : call;
+}
+
+} // namespace pmxboard

@@ -1,0 +1,107 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
+#include "tools/pmxboard/recording/replayed.h"
+
+#include <algorithm>
+#include <cstring>
+#include <stdexcept>
+
+#include "recorder/encoding.h"
+
+// Written from the headers; not in every program that has the tool's library.
+__attribute__((weak)) const pmxboard::ReplayedLayer& pmxboard_replayed_layer();
+
+namespace pmxboard
+{
+
+Bytes::Bytes(std::span<const UINT32> words, std::size_t size) : m_size(size), m_is_null(false)
+{
+    std::copy(words.begin(), words.end(), m_content.begin());
+}
+
+void Bytes::put_into(std::vector<UINT32>& words) const
+{
+    if (!m_is_null)
+        words.insert(words.end(), m_content.begin(), m_content.begin() + PMX_WORDS(m_size));
+}
+
+UINT32 Given::number()
+{
+    return m_at < m_words.size() ? m_words[m_at++] : 0;
+}
+
+Bytes Given::bytes()
+{
+    const UINT32 present = number();
+    if ((present & PMX_PRESENT) == 0)
+        return {};
+    const std::size_t size = std::min<std::size_t>(
+        { present & ~PMX_PRESENT, PMX_MOST_BYTES, 4 * (m_words.size() - std::min(m_at, m_words.size())) });
+    const auto words = m_words.subspan(m_at, PMX_WORDS(size));
+    m_at += words.size();
+    return Bytes(words, size);
+}
+
+std::vector<long> Given::values(const char* format)
+{
+    std::vector<long> numbers;
+    m_texts.reserve(PMX_MOST_VALUES);
+    char letter = 0;
+    while (format != nullptr && numbers.size() < PMX_MOST_VALUES && (letter = cPmxNextValue(&format)) != 0)
+    {
+        if (letter == 's')
+            numbers.push_back(reinterpret_cast<long>(m_texts.emplace_back(bytes()).pointer()));
+        else
+            numbers.push_back(static_cast<INT32>(number()));
+    }
+    numbers.resize(PMX_MOST_VALUES);
+    return numbers;
+}
+
+std::span<const UINT32> Answer::next(std::size_t words)
+{
+    const auto found = written.first(std::min(words, written.size()));
+    written = written.subspan(found.size());
+    return found;
+}
+
+void Answer::write(void* place, std::size_t size)
+{
+    const auto words = next(PMX_WORDS(size));
+    if (place != nullptr && !words.empty())
+        std::memcpy(place, words.data(), std::min(size, words.size_bytes()));
+}
+
+void Answer::write_text(char* place, std::size_t size)
+{
+    if (place == nullptr || size == 0)
+        return;
+    const auto present = next(1);
+    const std::size_t length =
+        present.empty() ? 0 : std::min<std::size_t>({ present[0] & ~PMX_PRESENT, size - 1, written.size_bytes() });
+    if (length != 0)
+        std::memcpy(place, written.data(), length);
+    place[length] = 0;
+}
+
+void Answer::write_table(void** place, const void* table)
+{
+    const auto word = next(1);
+    if (place != nullptr && static_cast<INT32>(number) >= 0)
+        *place = word.empty() || word[0] != 0 ? const_cast<void*>(table) : nullptr;
+}
+
+void Answer::write_tag(void** place)
+{
+    const auto word = next(1);
+    if (place != nullptr && !word.empty())
+        *place = reinterpret_cast<void*>(std::uintptr_t{ word[0] });
+}
+
+const ReplayedLayer& replayed_layer()
+{
+    if (pmxboard_replayed_layer == nullptr)
+        throw std::runtime_error("this program was linked without the layer that recordings are replayed with");
+    return pmxboard_replayed_layer();
+}
+
+} // namespace pmxboard

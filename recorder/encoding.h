@@ -16,6 +16,13 @@ void* memcpy(void* pvDest, const void* pvSource, size_t zSize); /* the kernel's 
 void* memset(void* pvDest, int iValue, size_t zSize);
 #endif
 
+/* A few bytes whose number the compiler knows are no call: it is told what this copies, library or not. */
+#ifdef __GNUC__
+#define PMX_COPY(pvTo, pvFrom, zSize) __builtin_memcpy(pvTo, pvFrom, zSize)
+#else
+#define PMX_COPY(pvTo, pvFrom, zSize) memcpy(pvTo, pvFrom, zSize)
+#endif
+
 #define PMX_WORDS(Size) (((Size) + 3) / 4)
 #define PMX_PRESENT 0x80000000u /* of bytes behind a pointer: it was no null pointer; how many, is added */
 #define PMX_MOST_BYTES 256u     /* that are kept of what one pointer leads to */
@@ -60,7 +67,7 @@ static inline UINT32 u4PmxPutRaw(UINT32* pu4Words, UINT32 u4At, const void* pvBy
     if (u4Size == 0)
         return u4At;
     pu4Words[u4At + PMX_WORDS(u4Size) - 1] = 0;
-    memcpy(pu4Words + u4At, pvBytes, u4Size);
+    PMX_COPY(pu4Words + u4At, pvBytes, u4Size);
     return u4At + PMX_WORDS(u4Size);
 }
 

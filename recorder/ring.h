@@ -40,8 +40,13 @@ static UINT32 u4RingWrite(const UINT32* pu4Words, UINT32 u4Count)
 {
     const UINT32 u4At = PMX_RECORDER_ADD(&prRecorder->u4Head, u4Count);
     UINT32 i;
-    for (i = 0; i < u4Count; ++i)
-        pu4Ring[(u4At + i) & u4RingMask] = pu4Words[i];
+    UINT32* const pu4To = pu4Ring + (u4At & u4RingMask);
+    if (u4Count <= u4RingMask + 1 - (u4At & u4RingMask))
+        for (i = 0; i < u4Count; ++i)
+            pu4To[i] = pu4Words[i];
+    else
+        for (i = 0; i < u4Count; ++i)
+            pu4Ring[(u4At + i) & u4RingMask] = pu4Words[i];
     PMX_RECORDER_ADD(&prRecorder->u4Events, 1u);
     return u4At;
 }

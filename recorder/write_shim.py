@@ -14,7 +14,7 @@ PLANES = 8  # tables of video planes that stand ready for recording at a time
 
 
 def take(name, rows):
-    lines = "".join(f"    memcpy(pucTo + {at}, (const void*)&{symbol}, {size});\n" for symbol, size, at in rows)
+    lines = "".join(f"    PMX_COPY(pucTo + {at}, (const void*)&{symbol}, {size});\n" for symbol, size, at in rows)
     return f"static inline void {name}(UCHAR* pucTo)\n{{\n{lines}}}\n"
 
 

@@ -3,11 +3,12 @@
 """Records scenarios and replays them: as they are, with another answer, argument or result, out of a memory dump, out
 of a ring that has run over, and damaged.
 
-usage: replay_test.py PROGRAM
+usage: replay_test.py PROGRAM PRODUCT
 """
 
 import pathlib
 import random
+import signal
 import struct
 import subprocess
 import sys
@@ -138,6 +139,20 @@ class Replay(unittest.TestCase):
         content = self.record(MODE_CHANGE).bytes()
         self.assertEqual(0, self.replay(random.Random(1).randbytes(1001) + content + b"\xff" * 99).returncode)
 
+    def test_what_a_product_keeps(self):
+        subprocess.run([PRODUCT, self.file, "0"], check=True, timeout=60)
+        ended = self.run_tool("replay", self.file)
+        self.assertEqual(0, ended.returncode, ended.stdout + ended.stderr)
+        # A ring of 64 KiB: two operations for each mode change.
+        self.assertGreaterEqual(int(ended.stdout.split()[1]), 2 * 20)
+
+    def test_what_is_left_after_a_crash(self):
+        for event in (2, 3, 50, 777, 2000, 30001):
+            ended = subprocess.run([PRODUCT, self.file, str(event)], check=False, timeout=60)
+            self.assertEqual(-signal.SIGKILL, ended.returncode)
+            ended = self.run_tool("replay", self.file)
+            self.assertEqual(0, ended.returncode, f"{event}: {ended.stdout}{ended.stderr}")
+
     def test_what_is_no_recording(self):
         content = self.record("PMX_Init\n").bytes()
         swapped = b"".join(content[i:i + 4][::-1] for i in range(0, len(content), 4))
@@ -166,5 +181,5 @@ class Replay(unittest.TestCase):
 
 
 if __name__ == "__main__":
-    PROGRAM = pathlib.Path(sys.argv.pop(1)).resolve()
+    PROGRAM, PRODUCT = (pathlib.Path(sys.argv.pop(1)).resolve() for _ in range(2))
     unittest.main()

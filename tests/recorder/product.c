@@ -1,0 +1,88 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
+/* A stack that is little more than the skeleton of a port, with the recorder as a product has it: its memory is a file
+ * here, which outlives the program as a product's memory outlives a crash.
+ *
+ * usage: product FILE EVENT     the program kills itself inside that event, counted from 1; 0: never
+ *        product +|- CHANGES     changes the mode so often, with a recorder or without; for counting instructions */
+#define _DEFAULT_SOURCE
+#include <fcntl.h>
+#include <signal.h>
+#include <stdlib.h>
+#include <string.h>
+#include <sys/mman.h>
+#include <unistd.h>
+
+#include "port_skeleton.c"
+
+#include "pmx_recorder.h"
+
+#define MEMORY_SIZE (65536 + sizeof(PMX_RECORDER_T))
+
+static UINT32 u4Events;
+static UINT32 u4LastEvent;
+
+static UINT32 u4Time(void)
+{
+    if (++u4Events == u4LastEvent)
+        raise(SIGKILL);
+    return u4Events;
+}
+
+static UINT32 u4Thread(void)
+{
+    return 0;
+}
+
+static void vChangeModes(UINT32 u4Times)
+{
+    static const UCHAR aucModes[] = { RES_720P50HZ, RES_480P, RES_1080I60HZ };
+    PMX_RESOLUTION_T arOutputs[PMX_OUTPUT_NUM];
+    UINT32 i;
+    memset(arOutputs, 0, sizeof arOutputs);
+    for (i = 0; i < u4Times; ++i)
+    {
+        UCHAR ucMode = 0;
+        const DRV_EXT_CHIP_USAGE_T eNone = DRV_NON_EXT_CHIP;
+        arOutputs[PMX_OUTPUT_HDMI].fgOutputEnable = TRUE;
+        arOutputs[PMX_OUTPUT_HDMI].eResMode = (PMX_RESOLUTION_MODE_T)aucModes[i % 3];
+        arOutputs[PMX_OUTPUT_HDMI].u4VFreq = i % 3 == 0 ? 50 : 60;
+        PMX_SetModeEx(0, arOutputs, i % 3 == 0 ? 50 : 60, eNone, 0);
+        PMX_GetMode(0, &ucMode);
+        _PmxTestOsd = (BOOL)(i & 1); /* a tester's */
+    }
+}
+
+static int iRecordInto(const char* szFile)
+{
+    const int iFile = open(szFile, O_RDWR | O_CREAT | O_TRUNC, 0600);
+    PMX_RECORDER_SETUP_T rHow = { 0, MEMORY_SIZE, u4Time, u4Thread, FALSE };
+    if (iFile < 0 || ftruncate(iFile, MEMORY_SIZE) != 0)
+        return 1;
+    rHow.pvMemory = mmap(0, MEMORY_SIZE, PROT_READ | PROT_WRITE, MAP_SHARED, iFile, 0);
+    if (rHow.pvMemory == MAP_FAILED || fgPmxRecorderStart(&rHow) == FALSE)
+        return 1;
+    return 0;
+}
+
+int main(int iCount, char** pszWords)
+{
+    static UINT32 au4Memory[MEMORY_SIZE / 4];
+    const PMX_RECORDER_SETUP_T rHow = { au4Memory, sizeof au4Memory, u4Time, u4Thread, FALSE };
+    const UINT32 u4Number = iCount == 3 ? (UINT32)atoi(pszWords[2]) : 0;
+    if (iCount != 3)
+        return 2;
+    if (pszWords[1][0] == '-' || pszWords[1][0] == '+')
+    {
+        if (pszWords[1][0] == '+' && fgPmxRecorderStart(&rHow) == FALSE)
+            return 1;
+        PMX_Init();
+        vChangeModes(u4Number);
+        return 0;
+    }
+    u4LastEvent = u4Number;
+    if (iRecordInto(pszWords[1]) != 0)
+        return 1;
+    PMX_Init();
+    vChangeModes(500);
+    return 0;
+}

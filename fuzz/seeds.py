@@ -201,6 +201,18 @@ def words_of_pictures(_):
     return [b"IHDR", b"IDAT", b"PLTE", b"tRNS", b"gAMA", b"IEND", b"FRAME", b"XCOLORRANGE=FULL", b"C420jpeg", b"Cmono"]
 
 
+def recordings(tool):
+    for path in SCENARIOS[::8]:
+        with tempfile.TemporaryDirectory() as folder:
+            file = pathlib.Path(folder) / "recording"
+            tool.output("record", "--size", "16384", file, path)
+            yield path.stem, file.read_bytes()
+
+
+def words_of_recordings(_):
+    return [b"PMXFLIGHTREC"]
+
+
 TARGETS = {
     "scenario": (scenarios, words_of_the_language),
     "state": (states, words_of_states),
@@ -210,6 +222,7 @@ TARGETS = {
     "against": (compared, lambda tool: [*words_of_texts(tool), *(path.stem.encode() for path in SCENARIOS)]),
     "shell": (shell_lines, words_of_the_language),
     "picture": (pictures, words_of_pictures),
+    "recording": (recordings, words_of_recordings),
 }
 
 

@@ -124,6 +124,17 @@ class Replay(unittest.TestCase):
         recording.words[place + (recording.words[place] & 0xFF) - 1] ^= 1
         self.assertIn("another output", self.replay(recording.bytes()).stdout)
 
+    def test_what_was_recorded_is_shown(self):
+        self.record("PMX_Init\nPMX_GetMode 0\n")
+        shown = self.run_tool("replay", "--show", self.file).stdout
+        self.assertRegex(shown, r"^1\t0\t0\tsnapshot\n")
+        self.assertRegex(shown, r"(?m)^\d+\t0\t0\tPMX_Init\(\)$")
+        self.assertRegex(shown, r"(?m)^\d+\t\d+\t0\t  PMX_HalSetMode\(0, RES_\w+\)$")
+        self.assertRegex(shown, r'(?m)^\d+\t0\t0\t  PMX_IsLog\(1, "PMX_Init')
+        self.assertRegex(shown, r"(?m)^\d+\t\d+\t0\t  x_reg_write32\(0xFD0000\w\w, \w+\)$")
+        self.assertRegex(shown, r"(?m)^\d+\t\d+\t0\tend of PMX_Init$")
+        self.assertRegex(shown, r"PMX_GetMode\(0, \[A5\]\) = 1\n$")
+
     def test_a_ring_that_has_run_over(self):
         recording = self.record("PMX_Init\n" + 60 * MODE_CHANGE.removeprefix("PMX_Init\n"), "--size", "65536")
         ring, head = recording.words[RING_WORDS], recording.words[HEAD]

@@ -254,6 +254,7 @@ void add_replay(CLI::App& app, Chosen& chosen)
     CLI::App* const sub = app.add_subcommand("replay", "Run a recording once more, and find the first departure.");
     sub->add_option("FILE", replay->file, "A recording, or a memory dump with one; - reads the standard input")
         ->required();
+    sub->add_flag("--show", replay->show, "Show what was recorded, and replay nothing");
     sub->add_flag("-q,--quiet", replay->quiet, "Show departures only");
     sub->footer(replay_examples);
     sub->callback([replay, &chosen] { chosen = [replay] { return replay_file(*replay); }; });

@@ -151,6 +151,8 @@ const char* const replay_examples = R"(Examples:
       a recording
   pmxboard replay change.rec
       does the layer do the same once more?
+  pmxboard replay --show change.rec | less
+      what was recorded: number, time, thread, and the call
 
 FILE is a recording or a memory dump that holds one; docs/recorder.md tells the
 rest.

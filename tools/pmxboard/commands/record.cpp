@@ -6,6 +6,7 @@
 #include "board/board.h"
 #include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
+#include "tools/pmxboard/decode/texts.h"
 #include "tools/pmxboard/files/new_file.h"
 #include "tools/pmxboard/language/runner.h"
 #include "tools/pmxboard/recording/recorded_run.h"
@@ -16,6 +17,14 @@ namespace pmxboard
 {
 namespace
 {
+
+TextNames layer_texts()
+{
+    TextNames names;
+    for (const decode::Text& text : decode::texts())
+        names.emplace(check_sum_of(std::string(text.format)), text.format);
+    return names;
+}
 
 void show_departure(const Departure& departure, std::size_t events)
 {
@@ -66,7 +75,13 @@ int replay_file(const ReplayOptions& options)
 try
 {
     const Recording recording = read_recording(board::files::read_named(options.file));
-    return show_verdict(recording, replay(recording), options.quiet);
+    const TextNames texts = layer_texts();
+    if (options.show)
+    {
+        show_events(std::cout, recording, texts);
+        return exit_done;
+    }
+    return show_verdict(recording, replay(recording, texts), options.quiet);
 }
 catch (const RecordingError& error)
 {

@@ -24,6 +24,7 @@ struct ReplayOptions
 {
     std::string file;
     bool quiet = false;
+    bool show = false;
 };
 
 /** The exit code. */

@@ -2,33 +2,38 @@
 #include "tools/pmxboard/recording/described.h"
 
 #include <algorithm>
-#include <cstring>
+#include <ostream>
 
 #include "board/names.h"
 #include "board/value.h"
 #include "recorder/encoding.h"
+#include "tools/pmxboard/text/printable.h"
 
 namespace pmxboard
 {
 namespace
 {
 
+/** Hexadecimal, as addresses, check sums and bytes are read. */
+std::string hexadecimal(std::uint32_t word)
+{
+    return board::Value::number(word, {}, board::Value::Base::Hex).to_text();
+}
+
 std::string number_text(const std::string& owner, const std::string& name, std::uint32_t word)
 {
+    constexpr std::int32_t large = 0xFFFF;
     const auto number = static_cast<std::int32_t>(word);
-    return board::Value::number(number, board::names::name_of(board::names::family_of(owner, name), number)).to_text();
+    const auto known = board::names::name_of(board::names::family_of(owner, name), number);
+    if (known.empty() && (number > large || number < -large))
+        return hexadecimal(word);
+    return board::Value::number(number, known).to_text();
 }
 
 std::string symbol_text(std::uint32_t word)
 {
     static constexpr const char* names[] = { "null", "_PMX_TmrIsr", "_rPMXIF", "pmx_pm_ops" };
     return word < std::size(names) ? names[word] : "<elsewhere>";
-}
-
-/** Hexadecimal, as check sums and bytes are read. */
-std::string hexadecimal(std::uint32_t word)
-{
-    return board::Value::number(word, {}, board::Value::Base::Hex).to_text();
 }
 
 /** Takes words one after the other. */
@@ -65,15 +70,23 @@ private:
     std::span<const std::uint32_t> m_words;
 };
 
+std::string text_of(std::uint32_t sum, const TextNames& texts)
+{
+    const auto found = texts.find(sum);
+    if (sum == 0)
+        return "null";
+    return found == texts.end() ? "#" + hexadecimal(sum).substr(2) : board::quote(found->second);
+}
+
 std::string argument_text(const Described& function, const DescribedParameter& parameter, bool is_operation,
-                          RecordedWords& words)
+                          RecordedWords& words, const TextNames& texts)
 {
     if (parameter.kind == "number")
         return number_text(function.name, parameter.name, words.next());
     if (parameter.kind == "symbol")
         return symbol_text(words.next());
     if (parameter.kind == "text" && !is_operation)
-        return "#" + hexadecimal(words.next()).substr(2);
+        return text_of(words.next(), texts);
     if (parameter.kind == "data" || (is_operation && (parameter.kind == "text" || parameter.kind == "place")))
         return words.bytes(parameter.kind == "text");
     if (parameter.kind == "place" || parameter.kind == "table")
@@ -86,13 +99,14 @@ std::string argument_text(const Described& function, const DescribedParameter& p
     return values;
 }
 
-std::string described(const Described& function, bool is_operation, std::span<const std::uint32_t> given)
+std::string described(const Described& function, bool is_operation, std::span<const std::uint32_t> given,
+                      const TextNames& texts)
 {
     RecordedWords words(given);
     std::string text;
     for (const DescribedParameter& parameter : function.parameters)
     {
-        const std::string argument = argument_text(function, parameter, is_operation, words);
+        const std::string argument = argument_text(function, parameter, is_operation, words, texts);
         text += (text.empty() || argument.empty() ? "" : ", ") + argument;
     }
     return function.name + "(" + text + ")";
@@ -103,11 +117,28 @@ std::string with_answer(const Described& function, const std::string& call, std:
     return function.has_result ? call + " = " + described_answer(function, answer) : call;
 }
 
+bool begins(const Event& event)
+{
+    return event.kind == PMX_RECORDER_OPERATION || event.kind == PMX_RECORDER_CALL;
+}
+
+const Described& function_of(const Event& event)
+{
+    const ReplayedLayer& layer = replayed_layer();
+    return event.kind == PMX_RECORDER_OPERATION ? layer.operations[event.function].described
+                                                : layer.functions[event.function];
+}
+
 } // namespace
 
-std::string described(const Described& function, std::span<const std::uint32_t> words)
+std::uint32_t check_sum_of(const std::string& text)
 {
-    return described(function, false, words);
+    return u4PmxText(text.c_str());
+}
+
+std::string described(const Described& function, std::span<const std::uint32_t> words, const TextNames& texts)
+{
+    return described(function, false, words, texts);
 }
 
 std::string described_answer(const Described& function, std::uint32_t answer)
@@ -115,30 +146,45 @@ std::string described_answer(const Described& function, std::uint32_t answer)
     return number_text(function.name, "result", answer);
 }
 
-std::string described(const Event& event, std::span<const Event> began)
+std::string described(const Event& event, const Event* begin, const TextNames& texts)
 {
-    const ReplayedLayer& layer = replayed_layer();
-    const auto function_of = [&layer](const Event& of) -> const Described& {
-        return of.kind == PMX_RECORDER_OPERATION ? layer.operations[of.function].described
-                                                 : layer.functions[of.function];
-    };
     if (event.kind == PMX_RECORDER_SNAPSHOT)
         return "snapshot";
     if (event.kind == PMX_RECORDER_CHANGE)
         return "changed from outside";
+    if (event.kind == PMX_RECORDER_RETURN && begin == nullptr)
+        return "end of something before";
     if (event.kind == PMX_RECORDER_RETURN)
-    {
-        const auto begin = std::find_if(began.rbegin(), began.rend(),
-                                        [&event](const Event& other) { return other.at == event.words[1]; });
-        const bool is_call =
-            begin != began.rend() && (begin->kind == PMX_RECORDER_OPERATION || begin->kind == PMX_RECORDER_CALL);
-        if (!is_call)
-            return "end of something before";
         return with_answer(function_of(*begin), "end of " + function_of(*begin).name, event.words[0]);
-    }
     const Described& function = function_of(event);
-    const std::string call = described(function, event.kind == PMX_RECORDER_OPERATION, event.words.subspan(1));
+    const std::string call = described(function, event.kind == PMX_RECORDER_OPERATION, event.words.subspan(1), texts);
     return event.is_answered ? with_answer(function, call, event.words[0]) : call;
+}
+
+void show_events(std::ostream& out, const Recording& recording, const TextNames& texts)
+{
+    constexpr std::size_t deepest = 20;
+    std::map<unsigned, std::size_t> depths;
+    std::map<std::uint32_t, const Event*> open;
+    std::size_t number = 0;
+    for (const Event& event : recording.events)
+    {
+        std::size_t& depth = depths[event.thread];
+        const bool is_return = event.kind == PMX_RECORDER_RETURN;
+        const auto begin = is_return ? open.find(event.words[1]) : open.end();
+        if (is_return && depth != 0)
+            --depth;
+        out << ++number << '\t' << event.time << '\t' << event.thread << '\t'
+            << std::string(2 * std::min(depth, deepest), ' ')
+            << printable(described(event, begin == open.end() ? nullptr : begin->second, texts)) << '\n';
+        if (begin != open.end())
+            open.erase(begin);
+        if (begins(event) && !event.is_answered)
+        {
+            ++depth;
+            open[event.at] = &event;
+        }
+    }
 }
 
 } // namespace pmxboard

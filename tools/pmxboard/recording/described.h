@@ -4,6 +4,8 @@
 #pragma once
 
 #include <cstdint>
+#include <iosfwd>
+#include <map>
 #include <span>
 #include <string>
 
@@ -13,13 +15,22 @@
 namespace pmxboard
 {
 
+/** Texts of the layer by the check sums that stand for them. */
+using TextNames = std::map<std::uint32_t, std::string>;
+
+/** The check sum that a recording has of a text. */
+std::uint32_t check_sum_of(const std::string& text);
+
 /** "PMX_HalSetMode(0, RES_480P)": a call by its words. */
-std::string described(const Described& function, std::span<const std::uint32_t> words);
+std::string described(const Described& function, std::span<const std::uint32_t> words, const TextNames& texts);
 
 /** "RES_480P", "TRUE", "-1": what a function answers. */
 std::string described_answer(const Described& function, std::uint32_t answer);
 
-/** What an event says on one line; `began` are the calls that it may end. */
-std::string described(const Event& event, std::span<const Event> began);
+/** What an event says on one line; `begin` is the one that it ends, or null. */
+std::string described(const Event& event, const Event* begin, const TextNames& texts);
+
+/** All events, a line each: its number, time and thread, and what it says, deeper within calls. */
+void show_events(std::ostream& out, const Recording& recording, const TextNames& texts);
 
 } // namespace pmxboard

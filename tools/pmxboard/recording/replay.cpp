@@ -97,7 +97,7 @@ std::string record_text()
 class Performance
 {
 public:
-    explicit Performance(const Recording& recording) : m_events(recording.events) {}
+    Performance(const Recording& recording, const TextNames& texts) : m_events(recording.events), m_texts(texts) {}
 
     ReplayVerdict run();
     Answer call(unsigned function, std::span<const UINT32> words, std::size_t reserved);
@@ -116,6 +116,7 @@ private:
     std::string next_text() const;
 
     const std::vector<Event>& m_events;
+    const TextNames& m_texts;
     std::size_t m_next = 0;
     bool m_is_over = false;
     ReplayVerdict m_verdict;
@@ -130,7 +131,14 @@ thread_local bool my_operation_calls_nobody; // the innermost one, as it was rec
 
 std::string Performance::next_text() const
 {
-    return described(m_events[m_next], std::span(m_events).first(m_next));
+    const Event& event = m_events[m_next];
+    const auto ends = [&event](const Event& other) {
+        const bool begins = other.kind == PMX_RECORDER_OPERATION || other.kind == PMX_RECORDER_CALL;
+        return begins && event.kind == PMX_RECORDER_RETURN && other.at == event.words[1];
+    };
+    const auto begin = std::find_if(m_events.begin(), m_events.begin() + static_cast<std::ptrdiff_t>(m_next), ends);
+    const bool is_known = begin != m_events.begin() + static_cast<std::ptrdiff_t>(m_next);
+    return described(event, is_known ? &*begin : nullptr, m_texts);
 }
 
 void Performance::depart(std::string recorded, std::string computed, std::string why)
@@ -194,19 +202,19 @@ Answer Performance::call(unsigned function, std::span<const UINT32> words, std::
     Lock lock(m_mutex);
     const Described& called = replayed_layer().functions[function];
     if (my_operation_calls_nobody && !m_is_over)
-        depart("end of " + my_operations.back(), described(called, words), "another call");
+        depart("end of " + my_operations.back(), described(called, words, m_texts), "another call");
     if (!wait_for_turn(lock))
         return {};
     const Event& begin = m_events[m_next];
     if (begin.kind != PMX_RECORDER_CALL || begin.function != function)
     {
-        depart(next_text(), described(called, words), "another call");
+        depart(next_text(), described(called, words, m_texts), "another call");
         return {};
     }
     const auto given = begin.words.subspan(1);
     if (given.size() != words.size() + reserved || !std::equal(words.begin(), words.end(), given.begin()))
     {
-        depart(next_text(), described(called, words), "other arguments");
+        depart(next_text(), described(called, words, m_texts), "other arguments");
         return {};
     }
     take();
@@ -307,9 +315,9 @@ Answer Replay::call(unsigned function, const UINT32* words, unsigned count, unsi
     return performance->call(function, { words + 3, words + count }, reserved);
 }
 
-ReplayVerdict replay(const Recording& recording)
+ReplayVerdict replay(const Recording& recording, const TextNames& texts)
 {
-    Performance now(recording);
+    Performance now(recording, texts);
     performance = &now;
     const ReplayVerdict verdict = now.run();
     performance = nullptr;

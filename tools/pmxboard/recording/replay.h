@@ -9,6 +9,7 @@
 #include <optional>
 #include <string>
 
+#include "tools/pmxboard/recording/described.h"
 #include "tools/pmxboard/recording/recording.h"
 
 namespace pmxboard
@@ -36,6 +37,6 @@ struct ReplayVerdict
 };
 
 /** Not for two threads at once: there is one layer to replay with. */
-ReplayVerdict replay(const Recording& recording);
+ReplayVerdict replay(const Recording& recording, const TextNames& texts = {});
 
 } // namespace pmxboard

@@ -179,7 +179,7 @@ class Replay(unittest.TestCase):
         recording = self.record(MODE_CHANGE)
         draw = random.Random(7)
         ends = set()
-        for _ in range(60):
+        for _ in range(25):
             words = list(recording.words)
             for _ in range(draw.randint(1, 4)):
                 at = draw.randrange(HEADER_WORDS + recording.words[HEAD])

@@ -241,7 +241,7 @@ void add_record(CLI::App& app, Chosen& chosen)
     sub->add_option("SCENARIO", record->scenario, "The scenario")->required();
     sub->add_option("--board", record->board, "Board to power on: a name under boards/, a directory or a .toml file")
         ->type_name("NAME|FILE");
-    sub->add_option("--size", record->size, "Bytes of the recorder's memory; 16 MiB unless given")
+    sub->add_option("--size", record->size, "Bytes of the recorder's memory; 1 MiB unless given")
         ->check(CLI::Range(RecordOptions::least_size, RecordOptions::largest_size).description(""))
         ->type_name("BYTES");
     sub->footer(record_examples);

@@ -17,7 +17,7 @@ struct RecordOptions
     std::string file;
     std::string scenario;
     std::string board;
-    std::uint32_t size = 1 << 24;
+    std::uint32_t size = 1 << 20;
 };
 
 struct ReplayOptions

@@ -30,6 +30,10 @@ void* memset(void* pvDest, int iValue, size_t zSize);
 #define PMX_MOST_VALUES 16u     /* that go with a format */
 #define PMX_ROOM 256u           /* words in which an event is made */
 
+/* What is to be known of a format: how many values it takes, and above that a bit for each that is a text. */
+#define PMX_CODE_COUNT(u4Code) ((u4Code)&31u)
+#define PMX_CODE_TEXTS(u4Code) ((u4Code) >> 5)
+
 /* The numbers of what both sides know by name. */
 #define PMX_SYMBOL_NULL 0u
 #define PMX_SYMBOL_ISR 1u
@@ -86,7 +90,7 @@ static inline UINT32 u4PmxPutBytes(UINT32* pu4Words, UINT32 u4At, const void* pv
     return u4PmxPutRaw(pu4Words, u4At + 1, pvBytes, u4Size);
 }
 
-/* The next value that a format takes, behind its letters: 's', 'l' or 'd', 0 when there is none. */
+/* The next value that a format takes, behind its letters: 's' for a text, 'd' for anything else, 0 for none. */
 static inline char cPmxNextValue(const char** pszFormat)
 {
     const char* szAt = *pszFormat;
@@ -97,57 +101,59 @@ static inline char cPmxNextValue(const char** pszFormat)
         const char c = *szAt;
         if (!fgInside)
             fgInside = c == '%';
-        else if (c == '*')
-        {
-            *pszFormat = szAt + 1;
-            return 'd'; /* its width; what it is the width of comes next */
-        }
         else if (c == '%')
             fgInside = false;
-        else if (c == 'l' || c == 'z' || c == 'p')
-            cFound = 'l';
         else if (c == 's')
             cFound = 's';
-        else if ((c >= 'a' && c <= 'z' && c != 'h') || (c >= 'A' && c <= 'Z'))
+        else if (c == '*') /* its width; what it is the width of comes next */
+        {
+            *pszFormat = szAt + 1;
+            return 'd';
+        }
+        else if ((c >= 'a' && c <= 'z' && c != 'h' && c != 'l' && c != 'z') || (c >= 'A' && c <= 'Z'))
             cFound = 'd';
     }
     *pszFormat = szAt;
     return cFound;
 }
 
-/* All values of a format, wide enough to be handed on; how many there are. */
-static inline UINT32 u4PmxCollect(const char* szFormat, va_list rArgs, long* piValues)
+/* The PMX_CODE_ of a format. */
+static inline UINT32 u4PmxCode(const char* szFormat)
 {
     UINT32 u4Count = 0;
+    UINT32 u4Texts = 0;
     char c;
     if (szFormat == 0)
         return 0;
     while (u4Count < PMX_MOST_VALUES && (c = cPmxNextValue(&szFormat)) != 0)
-    {
-        if (c == 's')
-            piValues[u4Count++] = (long)(size_t)va_arg(rArgs, const char*);
-        else
-            piValues[u4Count++] = c == 'l' ? va_arg(rArgs, long) : (long)va_arg(rArgs, int);
-    }
-    return u4Count;
+        u4Texts |= (c == 's' ? 1u : 0u) << u4Count++;
+    return u4Texts << 5 | u4Count;
+}
+
+/* All values of a format, wide enough to be handed on. Wherever int, long and pointers are passed alike each is read as
+ * the widest. */
+static inline void vPmxCollect(UINT32 u4Code, va_list rArgs, long* piValues)
+{
+    UINT32 i;
+    for (i = 0; i < PMX_CODE_COUNT(u4Code); ++i)
+        piValues[i] = va_arg(rArgs, long);
 }
 
 /* The same as words. A text from outside is kept whole, one of the layer as its check sum. */
-static inline UINT32 u4PmxPutValues(UINT32* pu4Words, UINT32 u4At, const char* szFormat, const long* piValues,
-                                    UINT32 u4Count, bool fgWhole)
+static inline UINT32 u4PmxPutValues(UINT32* pu4Words, UINT32 u4At, UINT32 u4Code, const long* piValues, bool fgWhole)
 {
     UINT32 i;
-    for (i = 0; i < u4Count; ++i)
+    for (i = 0; i < PMX_CODE_COUNT(u4Code); ++i)
     {
+        const char* const szText = (const char*)(size_t)piValues[i];
         if (u4At + 2 >= PMX_ROOM)
             return u4At;
-        if (cPmxNextValue(&szFormat) != 's')
+        if ((PMX_CODE_TEXTS(u4Code) >> i & 1) == 0)
             pu4Words[u4At++] = (UINT32)piValues[i];
         else if (fgWhole)
-            u4At = u4PmxPutBytes(pu4Words, u4At, (const void*)(size_t)piValues[i],
-                                 piValues[i] == 0 ? 0 : u4PmxLength((const char*)(size_t)piValues[i], 63));
+            u4At = u4PmxPutBytes(pu4Words, u4At, szText, szText == 0 ? 0 : u4PmxLength(szText, 63));
         else
-            pu4Words[u4At++] = u4PmxText((const char*)(size_t)piValues[i]);
+            pu4Words[u4At++] = u4PmxText(szText);
     }
     return u4At;
 }

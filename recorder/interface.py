@@ -18,6 +18,8 @@ PLANE_CALL = signatures.PLANE_CALL
 TABLES = ("_rPMXIF", "pmx_pm_ops")
 SYMBOLS = {"_PMX_TmrIsr": "PMX_SYMBOL_ISR", "_rPMXIF": "PMX_SYMBOL_TABLE", "pmx_pm_ops": "PMX_SYMBOL_POWER"}
 KERNEL = ("memcpy", "memset")
+# These are handed texts that somebody else made, too. All other texts that the layer hands over are its own, and stay.
+FROM_OUTSIDE = ("x_vsnprintf", "UTIL_Printf")
 
 
 def operations():
@@ -53,6 +55,35 @@ def placed(layer):
     return rows[True], rows[False], exported_size, (at + 3) // 4 * 4
 
 
+def watched(layer):
+    """(words that stand together: name of the first variable, number; single variables: name, size) of what neighbours
+    see. Words are looked at faster than single variables."""
+    rows = {}
+    for symbol in elf.Elf(layer).symbols:
+        if symbol.type == elf.OBJECT and symbol.section and symbol.section.flags & elf.WRITE:
+            rows.setdefault(symbol.section, []).append(symbol)
+    runs, single = [], []
+    for section, symbols in rows.items():
+        run = []
+        for symbol in [*sorted(symbols, key=lambda one: one.value), None]:
+            if symbol and not symbol.is_local:
+                run.append(symbol)
+                continue
+            end = run[-1].value + run[-1].size if run else 0
+            if run and run[0].value % 4 == 0 and section.align >= 4 and end >= run[0].value + 4:
+                words = min((end - run[0].value + 3) // 4, (section.size - run[0].value) // 4)
+                runs.append((run[0].name, words))
+                run = [one for one in run if one.value + one.size > run[0].value + 4 * words]
+            single += [(one.name, one.size) for one in run]
+            run = []
+    return runs, single
+
+
+def is_from_outside(function, is_operation):
+    """Whether texts are kept, or their check sums, in place of where they stand."""
+    return is_operation or function.name in FROM_OUTSIDE
+
+
 def is_text_out(parameter):
     return bool(parameter.written) and "strlen" in parameter.written
 
@@ -77,7 +108,7 @@ def encoding(function, is_operation):
         name = parameter.name
         if parameter.kind in ("values", "list"):
             whole = "true" if is_operation else "false"
-            lines.append(f"u4Used = u4PmxPutValues(au4Words, u4Used, {previous}, aiValues, u4Values, {whole});")
+            lines.append(f"u4Used = u4PmxPutValues(au4Words, u4Used, u4Code, aiValues, {whole});")
         elif parameter.kind == "tag":
             lines.append(f"au4Words[u4Used++] = (UINT32)(size_t){name};")
         elif parameter.kind == "symbol":
@@ -101,17 +132,15 @@ def encoding(function, is_operation):
 def collecting(function):
     """The lines that gather the values of a format first."""
     kinds = [parameter.kind for parameter in function.parameters]
-    texts = [parameter.name for parameter in function.parameters if parameter.kind == "text"]
-    if "values" in kinds:
-        return ["long aiValues[PMX_MOST_VALUES] = { 0 };", "UINT32 u4Values;", "va_list rValues;",
-                f"va_start(rValues, {texts[-1]});", f"u4Values = u4PmxCollect({texts[-1]}, rValues, aiValues);",
-                "va_end(rValues);"]
+    if "values" not in kinds and "list" not in kinds:
+        return []
+    [text] = [parameter.name for parameter in function.parameters if parameter.kind == "text"]
+    begin = f"va_start(rValues, {text});"
     if "list" in kinds:
         [given] = [parameter.name for parameter in function.parameters if parameter.kind == "list"]
-        return ["long aiValues[PMX_MOST_VALUES] = { 0 };", "UINT32 u4Values;", "va_list rValues;",
-                f"va_copy(rValues, {given});", f"u4Values = u4PmxCollect({texts[-1]}, rValues, aiValues);",
-                "va_end(rValues);"]
-    return []
+        begin = f"va_copy(rValues, {given});"
+    return ["long aiValues[PMX_MOST_VALUES] = { 0 };", f"const UINT32 u4Code = u4PmxCode({text});", "va_list rValues;",
+            begin, "vPmxCollect(u4Code, rValues, aiValues);", "va_end(rValues);"]
 
 
 def handed_on(function):

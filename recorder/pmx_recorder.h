@@ -33,9 +33,9 @@ typedef struct
     UINT32 u4PointerSize;   /**< bytes */
     UINT32 u4ExportedSize;  /**< bytes of the objects that neighbours see, at the head of the state */
     UINT32 u4StateSize;     /**< bytes of the whole state */
-    UINT32 u4RingWords;     /**< a power of two */
+    UINT32 u4RingWords;     /**< a power of two; behind the ring stand PMX_RECORDER_LONGEST + 1 words more */
+    UINT32 u4TickNs;        /**< nanoseconds of what times are counted in */
     UINT32 u4Head;          /**< words ever written, modulo 2^32; what is older than a ring is lost */
-    UINT32 u4Events;        /**< events ever written, modulo 2^32 */
     UINT32 u4SnapshotCount; /**< snapshots ever taken; the last ones stand below, each at its number's remainder */
     UINT32 au4Snapshot[PMX_RECORDER_SNAPSHOTS]; /**< where they begin, counted like u4Head */
 } PMX_RECORDER_T;
@@ -46,17 +46,22 @@ typedef DRV_ENUM(PMX_RECORDER_KIND_T){
     PMX_RECORDER_CALL = 2,      /**< the layer calls somebody */
     PMX_RECORDER_RETURN = 3,    /**< either of them ends, and something came between */
     PMX_RECORDER_CHANGE = 4,    /**< a neighbour has written into the layer's objects */
-    PMX_RECORDER_SNAPSHOT = 5   /**< the whole state, while no operation runs */
+    PMX_RECORDER_SNAPSHOT = 5,  /**< the whole state, while no operation runs */
+    PMX_RECORDER_TEXT = 6       /**< what stands where a text is handed over from; told once behind each snapshot */
 } PMX_RECORDER_KIND_T;
 #define PMX_RECORDER_ANSWERED 0x80u
+
+/** Bytes that a ring of so many bytes needs, a power of two. */
+#define PMX_RECORDER_MEMORY(RingBytes) ((RingBytes) + 4 * (PMX_RECORDER_LONGEST + 1) + sizeof(PMX_RECORDER_T))
 
 /** Who lends the ring, and knows what the layer does not. */
 typedef struct
 {
     void* pvMemory;            /**< at an address that is a multiple of 4 */
-    UINT32 u4Size;             /**< bytes; as much of it is used as makes a power of two */
-    UINT32 (*pu4Time)(void);   /**< microseconds from some moment on, modulo 2^32; called in any context */
+    UINT32 u4Size;             /**< bytes: PMX_RECORDER_MEMORY of the largest ring that fits is used */
+    UINT32 (*pu4Time)(void);   /**< ticks from some moment on, modulo 2^32; called in any context */
     UINT32 (*pu4Thread)(void); /**< a number below 255 for the thread or context that calls */
+    UINT32 u4TickNs;           /**< nanoseconds of a tick */
     BOOL fgWatchAll;           /**< look for changes from outside in the private objects, too: for test benches */
 } PMX_RECORDER_SETUP_T;
 

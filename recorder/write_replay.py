@@ -15,9 +15,7 @@ PLANE = "replayed_plane_call"
 
 def call_of(function, index):
     lines = interface.collecting(function)
-    declared = [line for line in lines if not line.endswith(");")]
-    gathered = [line for line in lines if line.endswith(");")]
-    lines = [*declared, f"UINT32 au4Words[{interface.room(function, False)}];", "UINT32 u4Used = 3;", *gathered,
+    lines = [*lines, f"UINT32 au4Words[{interface.room(function, False)}];", "UINT32 u4Used = 3;",
              *interface.encoding(function, False)]
     reserved = [f"PMX_WORDS({interface.size_of(output, output.written)})"
                 for output in interface.fixed_outputs(function)] + ["1"] * len(interface.tables(function))
@@ -74,9 +72,10 @@ def thunk(function, index):
             f"{{\n    {body}\n}}\n")
 
 
-def described(function):
+def described(function, is_operation):
     rows = ", ".join(f'{{ "{parameter.name}", "{parameter.kind}" }}' for parameter in function.parameters)
-    return f'{{ "{function.name}", {str(function.has_result).lower()}, {{ {rows} }} }}'
+    says = [str(told).lower() for told in (function.has_result, not interface.is_from_outside(function, is_operation))]
+    return f'{{ "{function.name}", {", ".join(says)}, {{ {rows} }} }}'
 
 
 def source(layer):
@@ -87,8 +86,8 @@ def source(layer):
     variables = "\n".join(f"extern unsigned char pmx_replayed_{name}[];" for name, _, _ in (*exported, *private))
     rows = ", ".join(f'{{ "{name}", pmx_replayed_{name}, {length}, {at} }}'
                      for name, length, at in (*exported, *private))
-    listed = ",\n".join(f"    {{ {described(function)}, run_{i} }}" for i, function in enumerate(offered))
-    called = ",\n".join(f"    {described(function)}" for function in platform)
+    listed = ",\n".join(f"    {{ {described(function, True)}, run_{i} }}" for i, function in enumerate(offered))
+    called = ",\n".join(f"    {described(function, False)}" for function in platform)
     [plane] = [function for function in platform if function.name == interface.PLANE_CALL]
     functions = "\n".join(stand_in(function, i) for i, function in enumerate(platform))
     return f"""// Written from the headers when the tool is built.

@@ -10,6 +10,8 @@ import sys
 
 import interface
 
+INDENT = "\n    "
+FEW_VALUES = 4  # of a format are handed on one by one, more than that as the most there can be
 PLANES = 8  # tables of video planes that stand ready for recording at a time
 
 
@@ -22,50 +24,189 @@ def private(name, size):
     return f'extern UCHAR {name}[{size}] __attribute__((visibility("hidden")));\n'
 
 
-def begin(function, index, kind, is_operation):
-    lines = interface.encoding(function, is_operation)
-    lines += [f"u4Used += PMX_WORDS({interface.size_of(output, output.written)});"
-              for output in interface.fixed_outputs(function)]
-    lines += ["u4Used += 1;" for _ in interface.tables(function)]
-    return lines + [f"rEvent = rBegin({kind}, {index}, au4Words, u4Used);"]
+def watch(layer):
+    """What is looked at whenever the layer is entered or left: words that stand together, and what is left over."""
+    runs, single = interface.watched(layer)
+    declared = "".join(f'typedef struct {{ UINT32 au4Word[{words}]; }} PMX_RUN_{i}_T;\n'
+                       f'extern PMX_RUN_{i}_T rPmxRun{i} __asm__("{name}");\n' for i, (name, words) in enumerate(runs))
+    fields = [f"PMX_RUN_{i}_T rRun{i};" for i in range(len(runs))]
+    fields += [f"UCHAR auc{name}[{size}];" for name, size in single]
+    copied = [f"prTo->rRun{i} = rPmxRun{i};" for i in range(len(runs))]
+    copied += [f"PMX_COPY(prTo->auc{name}, (const void*)&{name}, {size});" for name, size in single]
+    compared = ["PMX_WATCHED_T rAsIs;", "UINT32 u4Differs = 0;", "vPmxWatch(&rAsIs);"]
+    compared += [f"u4Differs |= rAsIs.rRun{i}.au4Word[{word}] ^ prFrom->rRun{i}.au4Word[{word}];"
+                 for i, (_, words) in enumerate(runs) for word in range(words)]
+    compared += [f"u4Differs |= (UINT32)rAsIs.auc{name}[{i}] ^ prFrom->auc{name}[{i}];"
+                 for name, size in single for i in range(size)]
+    return (f"{declared}typedef struct {{ {' '.join(fields)} }} PMX_WATCHED_T;\n\n"
+            f"static inline void vPmxWatch(PMX_WATCHED_T* prTo)\n{{\n    {INDENT.join(copied)}\n}}\n\n"
+            f"static inline UINT32 u4PmxDiffers(const PMX_WATCHED_T* prFrom)\n{{\n    {INDENT.join(compared)}\n"
+            "    return u4Differs;\n}\n")
 
 
-def end(function, kind):
-    lines, fits = ["u4Used = 4;"], "true"
-    for output in interface.fixed_outputs(function):
-        lines.append(f"u4Used = u4PmxPutRaw(au4Words, u4Used, {output.name}, "
-                     f"{interface.size_of(output, output.written)});")
-    for place, word in zip(interface.tables(function), ("u4OfferTable(ppvIf)", "(UINT32)(size_t)*ppvTag")):
-        lines.append(f"au4Words[u4Used++] = result >= 0 && {place.name} != 0 ? {word} : 0;")
+def sizes(function, is_operation):
+    """{what is kept of a pointer's bytes: how many, as an expression}, read and written."""
+    read, written = {}, {}
     for parameter in function.parameters:
-        if interface.is_text_out(parameter):
-            lines.append(f"u4Used = u4PmxPutBytes(au4Words, u4Used, {parameter.name}, {parameter.name} == 0 ? 0 : "
-                         f"u4PmxLength({parameter.name}, PMX_MOST_BYTES - 1));")
-            fits = "false"
+        name, size = parameter.name, None
+        if parameter.kind == "text" and is_operation:
+            size = f"u4PmxLength({name}, PMX_MOST_BYTES - 1)"
+        elif parameter.kind == "data" or (parameter.kind == "place" and is_operation):
+            size = f"u4PmxSize({parameter.read or parameter.written}, PMX_MOST_BYTES)"
+        if size:
+            read[name] = size
+    for output in interface.fixed_outputs(function):
+        written[output.name] = f"u4PmxSize({output.written}, PMX_MOST_BYTES)"
+    return read, written
+
+
+def counted(function, is_operation):
+    """Declarations of sizes, the words of the event as an expression, and those among them that are written."""
+    read, written = sizes(function, is_operation)
+    lines = [f"const UINT32 u4Read_{name} = {name} == 0 ? 0 : {size};" for name, size in read.items()]
+    lines += [f"const UINT32 u4Written_{name} = {name} == 0 ? 0 : {size};" for name, size in written.items()
+              if read.get(name) != size]
+    outputs = [f"PMX_WORDS({size_name(name, read, written)})" for name in written]
+    tables = len(interface.tables(function))
+    words = [str(3 + len(function.parameters) + tables), *(f"PMX_WORDS(u4Read_{name})" for name in read), *outputs]
+    return lines, " + ".join(words), " + ".join([str(tables), *outputs])
+
+
+def size_name(name, read, written):
+    return f"u4Read_{name}" if read.get(name) == written[name] else f"u4Written_{name}"
+
+
+def arguments(function, is_operation):
+    """The lines that put the arguments behind an event's head."""
+    read, _ = sizes(function, is_operation)
+    lines, place = [], 0
+    for parameter in function.parameters:
+        name = parameter.name
+        word = f"(UINT32)(size_t){name}" if parameter.kind in ("text", "tag") else f"(UINT32){name}"
+        if name in read:
+            at = f"pu4To + {place}" if place else "pu4To"
+            lines.append(f"pu4To = pu4PutBytes({at}, {name}, u4Read_{name});")
+            place = 0
+            continue
+        if parameter.kind == "symbol":
+            word = f"u4Symbol((size_t){name})"
+        elif parameter.kind in ("place", "table"):
+            word = f"{name} != 0"
+        lines.append(f"pu4To[{place}] = {word};")
+        place += 1
+    return lines
+
+
+def ending(function, kind, is_operation, words):
+    """What comes behind the call."""
+    read, written = sizes(function, is_operation)
     answer = "(UINT32)result" if function.has_result else "0"
-    return lines + [f"vEnd({kind}, &rEvent, {answer}, au4Words, u4Used - 4, {fits});"]
+    if not written and not interface.tables(function):
+        return [f"pu4Done(&rEvent, {answer}, 0);" if is_operation else f"vAnswer(&rEvent, {answer});"]
+    lines = [f"pu4To = {'pu4Done' if is_operation else 'pu4Answer'}(&rEvent, {answer}, {words});"]
+    lines += [f"pu4To = pu4PutRaw(pu4To, {name}, {size_name(name, read, written)});" for name in written]
+    for place, word in zip(interface.tables(function), ("u4OfferTable(ppvIf)", "(UINT32)(size_t)*ppvTag")):
+        lines.append(f"*pu4To++ = result >= 0 && {place.name} != 0 ? {word} : 0;")
+    return lines
 
 
-def recording(function, index, real, kind, is_operation):
+def called(function, real, is_operation):
+    """(the call, the same that returns at once)"""
     call = f"{real}({interface.handed_on(function)})"
     if not is_operation:
         call = exchanged(function, call)
     if function.has_result:
-        plain = f"return {call};"
-        call = f"result = {call};"
-    else:
-        plain = f"{{ {call}; return; }}"
-        call = f"{call};"
-    lines = interface.collecting(function)
-    declared = [line for line in lines if not line.endswith(");")]
-    declared += [f"UINT32 au4Words[{interface.room(function, is_operation)}];", "PMX_EVENT_T rEvent;",
-                 "UINT32 u4Used = 3;"]
-    declared += [f"{function.result} result;"] if function.has_result else []
-    body = [*declared, *(line for line in lines if line.endswith(");")), f"if (prRecorder == 0)\n        {plain}",
-            *begin(function, index, kind, is_operation), call, *end(function, kind)]
+        return f"result = {call};", f"return {call};"
+    return f"{call};", f"{{ {call}; return; }}"
+
+
+def recording(function, index, real, kind, is_operation):
+    """The body of a function that records a call: each argument is written where it stays."""
+    call, plain = called(function, real, is_operation)
+    declared, count, words = counted(function, is_operation)
+    body = ["PMX_EVENT_T rEvent;", "UINT32* pu4To;"]
+    body += [f"{function.result} result;"] if function.has_result else []
+    body.append(f"if (PMX_SELDOM(rNow.prRecorder == 0))\n        {plain}")
+    body.append("{")
+    body += [f"    {line}" for line in declared]
+    body += [f"    u4Tell({parameter.name});" for parameter in function.parameters if parameter.kind == "text"
+             and not is_operation]
+    begin = "pu4Operation" if is_operation else "pu4Call"
+    body.append(f"    pu4To = {begin}(&rEvent, {kind} << 8 | {index}u << 16 | ({count}));")
+    body += [f"    {line}" for line in arguments(function, is_operation)]
+    body += ["    (void)pu4To;", f"    {call}"]
+    body += [f"    {line}" for line in ending(function, kind, is_operation, words)]
+    body.append("}")
     if function.has_result:
         body.append("return result;")
-    return "\n    ".join(body)
+    return INDENT.join(body)
+
+
+def recording_whole(function, index, real, kind, is_operation):
+    """The same for a call with texts from outside: what is kept of it is gathered first."""
+    call, plain = called(function, real, is_operation)
+    gathered = interface.collecting(function)
+    answer = "(UINT32)result" if function.has_result else "0"
+    body = [*(line for line in gathered if not line.endswith(");") or " = " in line),
+            "UINT32 au4Words[PMX_ROOM];", "PMX_EVENT_T rEvent;", "UINT32 u4Used = 3;"]
+    body += [f"{function.result} result;"] if function.has_result else []
+    body += [line for line in gathered if line.endswith(");") and " = " not in line]
+    body += [f"if (rNow.prRecorder == 0)\n        {plain}", *interface.encoding(function, is_operation),
+             f"PMX_COPY({'pu4Operation' if is_operation else 'pu4Call'}(&rEvent, "
+             f"{kind} << 8 | {index}u << 16 | u4Used), au4Words + 3, 4 * (u4Used - 3));", call]
+    texts = [parameter.name for parameter in function.parameters if interface.is_text_out(parameter)]
+    if not texts:
+        body.append(f"{'pu4Done' if is_operation else 'pu4Answer'}(&rEvent, {answer}, 0);")
+    for name in texts:
+        body += ["vEnter();", f"u4Used = {name} == 0 ? 0 : u4PmxLength({name}, PMX_MOST_BYTES - 1);",
+                 f"pu4PutBytes(pu4Return(&rEvent, {answer}, 1 + PMX_WORDS(u4Used)), {name}, u4Used);"]
+    return INDENT.join([*body, *(["return result;"] if function.has_result else [])])
+
+
+def printing_much(function, index):
+    """A function for the formats with more values, and for all while nothing is recorded."""
+    *numbers, text, _ = function.parameters
+    given = ", ".join(parameter.name for parameter in (*numbers, text))
+    first = len(numbers) + 1
+    handed = ", ".join([given, *(f"aiValue[{i}]" for i in range(16))])
+    body = ["long aiValue[PMX_MOST_VALUES] = { 0 };", "const UINT32 u4Count = PMX_CODE_COUNT(u4Code);",
+            "PMX_EVENT_T rEvent;", "UINT32* pu4To;", "UINT32 i;", "vPmxCollect(u4Code, rValues, aiValue);",
+            f"if (rNow.prRecorder == 0)\n    {{\n        {function.name}({handed});\n        return;\n    }}",
+            "vTellValues(PMX_CODE_TEXTS(u4Code), aiValue);",
+            f"pu4To = pu4Call(&rEvent, PMX_RECORDER_CALL << 8 | {index}u << 16 | ({3 + first} + u4Count));"]
+    body += [f"pu4To[{i}] = (UINT32){parameter.name};" for i, parameter in enumerate(numbers)]
+    body += [f"pu4To[{first - 1}] = (UINT32)(size_t){text.name};",
+             f"for (i = 0; i < u4Count; ++i)\n        pu4To[{first} + i] = (UINT32)aiValue[i];",
+             f"{function.name}({handed});", "vAnswer(&rEvent, 0);"]
+    parameters = ", ".join([*(f"{parameter.type} {parameter.name}" for parameter in (*numbers, text)), "UINT32 u4Code",
+                            "va_list rValues"])
+    return f"static PMX_RARE void vMuch_{function.name}({parameters})\n{{\n    {INDENT.join(body)}\n}}\n\n"
+
+
+def printing(function, index):
+    """The body for a format of the layer, of which is known how many values it takes."""
+    *numbers, text, _ = [parameter.name for parameter in function.parameters]
+    given = ", ".join([*numbers, text])
+    first = len(numbers) + 1
+    values = [f"iValue{i}" for i in range(FEW_VALUES)]
+    lines = [f"long {', '.join(f'{value} = 0' for value in values)};", "PMX_EVENT_T rEvent;", "UINT32* pu4To;",
+             "va_list rValues;", f"const UINT32 u4Code = u4Tell({text});",
+             "const UINT32 u4Count = PMX_CODE_COUNT(u4Code);", f"va_start(rValues, {text});",
+             f"if (PMX_SELDOM(rNow.prRecorder == 0) || PMX_SELDOM(u4Count > {FEW_VALUES}))", "{",
+             f"    vMuch_{function.name}({given}, u4Code, rValues);", "    va_end(rValues);", "    return;", "}",
+             "switch (u4Count)", "{"]
+    for count in range(FEW_VALUES, -1, -1):
+        lines.append("default:" if count == FEW_VALUES else f"case {count}:")
+        lines += [f"    {value} = va_arg(rValues, long);" for value in values[:count]]
+        if count:
+            lines.append("    if (PMX_CODE_TEXTS(u4Code) != 0)")
+            lines.append(f"        vTellFew(PMX_CODE_TEXTS(u4Code), {', '.join(values)});")
+        lines.append(f"    pu4To = pu4Call(&rEvent, PMX_RECORDER_CALL << 8 | {index}u << 16 | {3 + first + count});")
+        lines += [f"    pu4To[{i}] = (UINT32){name};" for i, name in enumerate(numbers)]
+        lines.append(f"    pu4To[{first - 1}] = (UINT32)(size_t){text};")
+        lines += [f"    pu4To[{first + i}] = (UINT32){value};" for i, value in enumerate(values[:count])]
+        lines += [f"    {function.name}({', '.join([given, *values[:count]])});", "    break;"]
+    return INDENT.join([*lines, "}", "va_end(rValues);", "vAnswer(&rEvent, 0);"])
 
 
 def exchanged(function, call):
@@ -79,12 +220,22 @@ def exchanged(function, call):
 
 def operation(function, index):
     real = f"pmx_recorded_{function.name}"
-    body = recording(function, index, real, "PMX_RECORDER_OPERATION", True)
+    how = recording_whole if function.is_variadic else recording
+    body = how(function, index, real, "PMX_RECORDER_OPERATION", True)
     return f"{function.declaration(real)};\n{function.declaration()}\n{{\n    {body}\n}}\n"
 
 
 def platform_function(function, index):
-    body = recording(function, index, function.name, "PMX_RECORDER_CALL", False)
+    if interface.is_from_outside(function, False):
+        body = recording_whole(function, index, function.name, "PMX_RECORDER_CALL", False)
+    elif function.is_variadic:
+        return printing_much(function, index) + defined(function, printing(function, index))
+    else:
+        body = recording(function, index, function.name, "PMX_RECORDER_CALL", False)
+    return defined(function, body)
+
+
+def defined(function, body):
     name = f"pmx_recorder_{function.name}"
     return f"{function.declaration(name)};\n{function.declaration(name)}\n{{\n    {body}\n}}\n"
 
@@ -190,6 +341,7 @@ DRV_STATIC_ASSERT(2 + PMX_WORDS(PMX_STATE_SIZE) <= 255, "a snapshot is one event
 {''.join(private(name, size) for name, size, at in private_ones)}
 {take("vPmxTakeExported", exported)}
 {take("vPmxTakePrivate", private_ones)}
+{watch(layer)}
 #include "ring.h"
 {SYMBOLS}{PLANE_TABLES}
 {plane_call(plane, index)}{OFFER}

@@ -16,7 +16,7 @@
 
 #include "pmx_recorder.h"
 
-#define MEMORY_SIZE (65536 + sizeof(PMX_RECORDER_T))
+#define MEMORY_SIZE PMX_RECORDER_MEMORY(65536)
 
 static UINT32 u4Events;
 static UINT32 u4LastEvent;
@@ -55,7 +55,7 @@ static void vChangeModes(UINT32 u4Times)
 static int iRecordInto(const char* szFile)
 {
     const int iFile = open(szFile, O_RDWR | O_CREAT | O_TRUNC, 0600);
-    PMX_RECORDER_SETUP_T rHow = { 0, MEMORY_SIZE, u4Time, u4Thread, FALSE };
+    PMX_RECORDER_SETUP_T rHow = { 0, MEMORY_SIZE, u4Time, u4Thread, 1000, FALSE };
     if (iFile < 0 || ftruncate(iFile, MEMORY_SIZE) != 0)
         return 1;
     rHow.pvMemory = mmap(0, MEMORY_SIZE, PROT_READ | PROT_WRITE, MAP_SHARED, iFile, 0);
@@ -67,7 +67,7 @@ static int iRecordInto(const char* szFile)
 int main(int iCount, char** pszWords)
 {
     static UINT32 au4Memory[MEMORY_SIZE / 4];
-    const PMX_RECORDER_SETUP_T rHow = { au4Memory, sizeof au4Memory, u4Time, u4Thread, FALSE };
+    const PMX_RECORDER_SETUP_T rHow = { au4Memory, sizeof au4Memory, u4Time, u4Thread, 1000, FALSE };
     const UINT32 u4Number = iCount == 3 ? (UINT32)atoi(pszWords[2]) : 0;
     if (iCount != 3)
         return 2;

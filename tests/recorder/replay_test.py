@@ -22,8 +22,8 @@ sys.path.insert(0, str(ROOT / "recorder"))
 import interface  # noqa: E402
 
 HEADER_WORDS = 28
-RING_WORDS, HEAD, SNAPSHOT_COUNT = 8, 9, 11  # words of the header
-OPERATION, CALL, RETURN, CHANGE, SNAPSHOT = range(1, 6)
+RING_WORDS, HEAD, SNAPSHOT_COUNT = 8, 10, 11  # words of the header
+OPERATION, CALL, RETURN, CHANGE, SNAPSHOT, TEXT = range(1, 7)
 ANSWERED = 0x80
 MODE_CHANGE = "PMX_Init\nPMX_SetMode 0 RES_720P50HZ 50 0\nPMX_SetMode 0 RES_480P 60 0\n"
 
@@ -38,11 +38,13 @@ class Recording:
         return struct.pack(f"<{len(self.words)}I", *self.words)
 
     def events(self):
-        """(place, kind, whether it is answered, function) of a ring that has not run over."""
+        """(place, kind, whether it is answered, function) of a ring that has not run over. Texts are told between
+        them."""
         at, end = HEADER_WORDS, HEADER_WORDS + self.words[HEAD]
         while at < end:
             head = self.words[at]
-            yield at, head >> 8 & 0x7F, bool(head >> 8 & ANSWERED), head >> 16 & 0xFF
+            if head >> 8 & 0x7F != TEXT:
+                yield at, head >> 8 & 0x7F, bool(head >> 8 & ANSWERED), head >> 16 & 0xFF
             at += head & 0xFF
 
 
@@ -136,9 +138,9 @@ class Replay(unittest.TestCase):
         self.assertRegex(shown, r"PMX_GetMode\(0, \[A5\]\) = 1\n$")
 
     def test_a_ring_that_has_run_over(self):
-        recording = self.record("PMX_Init\n" + 60 * MODE_CHANGE.removeprefix("PMX_Init\n"), "--size", "65536")
+        recording = self.record("PMX_Init\n" + 60 * MODE_CHANGE.removeprefix("PMX_Init\n"), "--size", "32768")
         ring, head = recording.words[RING_WORDS], recording.words[HEAD]
-        self.assertEqual(8192, ring)
+        self.assertEqual(32768 // 4, ring)
         self.assertGreater(head, 2 * ring)
         self.assertGreaterEqual(recording.words[SNAPSHOT_COUNT], 4 * (head // ring))
         ended = self.run_tool("replay", self.file)

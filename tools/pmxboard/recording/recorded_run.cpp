@@ -39,8 +39,9 @@ public:
     {
         if (fgPmxRecorderStart == nullptr)
             throw std::runtime_error("this program was linked without a recorder");
-        const PMX_RECORDER_SETUP_T setup{ memory.data(), static_cast<UINT32>(4 * memory.size()), recorder_time,
-                                          recorder_thread, TRUE };
+        const PMX_RECORDER_SETUP_T setup{ memory.data(), static_cast<UINT32>(4 * memory.size()),
+                                          recorder_time, recorder_thread,
+                                          1000,          TRUE };
         if (fgPmxRecorderStart(&setup) == FALSE)
             throw std::runtime_error("the recorder's memory is too small");
     }
@@ -53,15 +54,17 @@ public:
 
 std::string recorded(std::uint32_t size, const std::function<void()>& meanwhile)
 {
-    std::vector<UINT32> memory(size / 4);
+    std::vector<UINT32> memory(PMX_RECORDER_MEMORY(size) / 4);
     {
         const RecorderOn on(memory);
         meanwhile();
     }
     PMX_RECORDER_T header;
     std::memcpy(&header, memory.data(), sizeof header);
-    header.u4RingWords = std::min(header.u4RingWords, std::max(std::bit_ceil(header.u4Head), PMX_RECORDER_LEAST_WORDS));
-    std::string bytes(sizeof header + 4 * std::size_t{ header.u4RingWords }, '\0');
+    const std::size_t ring =
+        std::min(header.u4RingWords, std::max(std::bit_ceil(header.u4Head), PMX_RECORDER_LEAST_WORDS));
+    header.u4RingWords = static_cast<UINT32>(ring);
+    std::string bytes(PMX_RECORDER_MEMORY(4 * ring), '\0');
     std::memcpy(bytes.data(), memory.data(), bytes.size());
     std::memcpy(bytes.data(), &header, sizeof header);
     return bytes;

@@ -3,8 +3,11 @@
 
 #include <bit>
 #include <cstring>
+#include <map>
 #include <optional>
 
+#include "recorder/encoding.h"
+#include "tools/pmxboard/recording/foreign_state.h"
 #include "tools/pmxboard/recording/replayed.h"
 
 namespace pmxboard
@@ -41,19 +44,19 @@ PMX_RECORDER_T header_of(std::string_view bytes)
     PMX_RECORDER_T header;
     hold(bytes.size() >= sizeof header, "the recording ends within its header");
     std::memcpy(&header, bytes.data(), sizeof header);
-    const ReplayedLayer& layer = replayed_layer();
     hold(header.u4Version == PMX_RECORDER_VERSION, "the recording has version " + std::to_string(header.u4Version) +
                                                        "; this tool reads version " +
                                                        std::to_string(PMX_RECORDER_VERSION));
-    hold(header.u4PointerSize == sizeof(void*), "the recording was made where pointers have " +
-                                                    std::to_string(header.u4PointerSize) + " bytes; here they have " +
-                                                    std::to_string(sizeof(void*)));
-    hold(header.u4Interface == layer.interface && header.u4ExportedSize == layer.exported_size &&
-             header.u4StateSize == layer.state_size,
+    hold(header.u4PointerSize == 4 || header.u4PointerSize == 8,
+         "the recording was made where pointers have " + std::to_string(header.u4PointerSize) + " bytes");
+    const ForeignState state(header.u4PointerSize);
+    hold(header.u4Interface == replayed_layer().interface && header.u4ExportedSize == state.exported_size() &&
+             header.u4StateSize == state.size(),
          "the recording was made with another version of the layer's interface");
     hold(std::has_single_bit(header.u4RingWords) && header.u4RingWords >= PMX_RECORDER_LEAST_WORDS,
          "the recording's ring has an impossible size");
-    hold((bytes.size() - sizeof header) / 4 >= header.u4RingWords, "the recording ends within its ring");
+    hold(bytes.size() / 4 >= PMX_RECORDER_MEMORY(4 * std::uint64_t{ header.u4RingWords }) / 4,
+         "the recording ends within its ring");
     return header;
 }
 
@@ -69,17 +72,6 @@ std::optional<std::uint32_t> oldest_snapshot(const PMX_RECORDER_T& header)
             oldest = back;
     }
     return oldest;
-}
-
-std::vector<std::uint32_t> words_of(std::string_view ring, const PMX_RECORDER_T& header, std::uint32_t back)
-{
-    std::vector<std::uint32_t> words(back);
-    for (std::uint32_t i = 0; i < back; ++i)
-    {
-        const std::size_t at = (header.u4Head - back + i) & (header.u4RingWords - 1);
-        std::memcpy(&words[i], ring.data() + 4 * at, 4);
-    }
-    return words;
 }
 
 /** What an event must have, by its kind; empty when it has. */
@@ -102,36 +94,120 @@ std::string wrong_with(const Event& event, const PMX_RECORDER_T& header)
                        event.words.size() != (header.u4StateSize + 3) / 4
                    ? "it is no state"
                    : "";
+    case PMX_RECORDER_TEXT: return event.words.size() != 3 ? "it is no text" : "";
     case PMX_RECORDER_SNAPSHOT: return event.words.size() != (header.u4StateSize + 3) / 4 ? "it is no state" : "";
     }
     return "no such kind of event";
 }
 
-void read_events(Recording& recording)
+/** Reads the events of a ring one after the other. */
+class Reader
 {
-    const std::span<const std::uint32_t> words = recording.words;
-    const std::uint32_t first = recording.header.u4Head - static_cast<std::uint32_t>(words.size());
-    for (std::size_t i = 0; i < words.size();)
+public:
+    Reader(std::string_view ring, Recording& recording)
+        : m_ring(ring), m_recording(recording), m_state(recording.header.u4PointerSize)
     {
-        const std::uint32_t head = words[i];
-        const std::size_t count = head & 0xFF;
-        const std::string place = "event " + std::to_string(recording.events.size() + 1);
-        hold(count >= 2 && count <= words.size() - i, place + " is damaged: it has an impossible length");
-        const Event event{ static_cast<PMX_RECORDER_KIND_T>(head >> 8 & 0x7F),
-                           (head >> 8 & PMX_RECORDER_ANSWERED) != 0,
-                           head >> 16 & 0xFF,
-                           head >> 24,
-                           first + static_cast<std::uint32_t>(i),
-                           words[i + 1],
-                           words.subspan(i + 2, count - 2) };
-        const std::string wrong = wrong_with(event, recording.header);
-        hold(wrong.empty(), place + " is damaged: " + wrong);
-        recording.events.push_back(event);
-        i += count;
     }
-    hold(!recording.events.empty() && recording.events.front().kind == PMX_RECORDER_SNAPSHOT,
-         "the recording has no snapshot where it says");
-}
+
+    /** So many words, up to the head. */
+    void read(std::uint32_t back)
+    {
+        for (std::uint32_t left = back; left != 0;)
+            left -= read_event(m_recording.header.u4Head - left, left);
+        hold(!m_recording.events.empty() && m_recording.events.front().kind == PMX_RECORDER_SNAPSHOT,
+             "the recording has no snapshot where it says");
+    }
+
+private:
+    struct Text
+    {
+        std::uint32_t sum;
+        std::uint32_t code;
+    };
+
+    std::uint32_t read_event(std::uint32_t at, std::uint32_t left)
+    {
+        m_place = "event " + std::to_string(m_recording.events.size() + 1);
+        const char* const from = m_ring.data() + 4 * std::size_t{ at & (m_recording.header.u4RingWords - 1) };
+        std::uint32_t head = 0;
+        std::memcpy(&head, from, sizeof head);
+        const std::uint32_t count = head & 0xFF;
+        hold(count >= 2 && count <= left, m_place + " is damaged: it has an impossible length");
+        std::vector<std::uint32_t> words(count);
+        std::memcpy(words.data(), from, 4 * std::size_t{ count });
+        const std::span<const std::uint32_t> behind = std::span(words).subspan(2);
+        Event event{ static_cast<PMX_RECORDER_KIND_T>(head >> 8 & 0x7F),
+                     (head >> 8 & PMX_RECORDER_ANSWERED) != 0,
+                     head >> 16 & 0xFF,
+                     head >> 24,
+                     at,
+                     static_cast<std::uint32_t>(std::uint64_t{ words[1] } * m_recording.header.u4TickNs / 1000),
+                     behind };
+        const std::string wrong = wrong_with(event, m_recording.header);
+        hold(wrong.empty(), m_place + " is damaged: " + wrong);
+        keep(event, std::vector(behind.begin(), behind.end()));
+        return count;
+    }
+
+    void keep(Event event, std::vector<std::uint32_t> words)
+    {
+        if (event.kind == PMX_RECORDER_TEXT)
+        {
+            m_texts[words[0]] = { words[1], words[2] };
+            return;
+        }
+        if (event.kind == PMX_RECORDER_CALL)
+            name_texts(replayed_layer().functions[event.function], std::span(words).subspan(1));
+        else if (event.kind == PMX_RECORDER_CHANGE || event.kind == PMX_RECORDER_SNAPSHOT)
+            words = m_state.as_here(words);
+        event.words = m_recording.words.emplace_back(std::move(words));
+        m_recording.events.push_back(event);
+    }
+
+    /** Where a text stood becomes its check sum. */
+    Text name_text(std::uint32_t& word) const
+    {
+        if (word == 0)
+            return { 0, 0 };
+        const auto found = m_texts.find(word);
+        hold(found != m_texts.end(), m_place + " is damaged: it has a text that was not told");
+        word = found->second.sum;
+        return found->second;
+    }
+
+    void name_texts(const Described& function, std::span<std::uint32_t> words) const
+    {
+        std::size_t at = 0;
+        std::uint32_t code = 0;
+        for (const DescribedParameter& parameter : function.parameters)
+        {
+            if (!function.tells_texts || at >= words.size())
+                return;
+            if (parameter.kind == "data" && (words[at] & PMX_PRESENT) != 0)
+                at += PMX_WORDS(words[at] & ~PMX_PRESENT);
+            else if (parameter.kind == "text")
+                code = name_text(words[at]).code;
+            else if (parameter.kind == "values")
+                name_values(code, words.subspan(at));
+            ++at;
+        }
+    }
+
+    void name_values(std::uint32_t code, std::span<std::uint32_t> words) const
+    {
+        for (std::size_t i = 0; i < words.size() && i < PMX_CODE_COUNT(code); ++i)
+        {
+            if ((PMX_CODE_TEXTS(code) >> i & 1) != 0)
+                name_text(words[i]);
+        }
+    }
+
+    std::string_view m_ring;
+    Recording& m_recording;
+    ForeignState m_state;
+    std::map<std::uint32_t, Text> m_texts;
+    std::string m_place;
+};
 
 } // namespace
 
@@ -141,9 +217,8 @@ Recording read_recording(std::string_view bytes)
     Recording recording{ header_of(bytes), {}, {}, 0 };
     const auto back = oldest_snapshot(recording.header);
     hold(back.has_value(), "the recording has no snapshot to begin with");
-    recording.words = words_of(bytes.substr(sizeof recording.header), recording.header, *back);
     recording.lost = recording.header.u4Head - *back;
-    read_events(recording);
+    Reader(bytes.substr(sizeof recording.header), recording).read(*back);
     return recording;
 }
 

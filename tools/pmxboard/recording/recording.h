@@ -5,6 +5,7 @@
 #pragma once
 
 #include <cstdint>
+#include <deque>
 #include <span>
 #include <stdexcept>
 #include <string>
@@ -29,17 +30,18 @@ struct Event
     bool is_answered;
     unsigned function;
     unsigned thread;
-    std::uint32_t at; ///< counted in words since the recording began, modulo 2^32
-    std::uint32_t time;
+    std::uint32_t at;                     ///< counted in words since the recording began, modulo 2^32
+    std::uint32_t time;                   ///< microseconds
     std::span<const std::uint32_t> words; ///< behind the time
 };
 
+/** In its events texts are check sums, wherever they stood, and states are laid out as in the layer that replays. */
 struct Recording
 {
     PMX_RECORDER_T header;
-    std::vector<std::uint32_t> words; ///< from the first snapshot that is still whole
-    std::vector<Event> events;        ///< into `words`
-    std::uint32_t lost = 0;           ///< words that were overwritten, or stand before that snapshot
+    std::vector<Event> events;                    ///< from the first snapshot that is still whole
+    std::deque<std::vector<std::uint32_t>> words; ///< of each event
+    std::uint32_t lost = 0;                       ///< words that were overwritten, or stand before that snapshot
 };
 
 /** The first recording in these bytes. Throws RecordingError. */

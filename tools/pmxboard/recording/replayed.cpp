@@ -44,11 +44,11 @@ Bytes Given::bytes()
 std::vector<long> Given::values(const char* format)
 {
     std::vector<long> numbers;
+    const UINT32 code = u4PmxCode(format);
     m_texts.reserve(PMX_MOST_VALUES);
-    char letter = 0;
-    while (format != nullptr && numbers.size() < PMX_MOST_VALUES && (letter = cPmxNextValue(&format)) != 0)
+    for (UINT32 i = 0; i < PMX_CODE_COUNT(code); ++i)
     {
-        if (letter == 's')
+        if ((PMX_CODE_TEXTS(code) >> i & 1) != 0)
             numbers.push_back(reinterpret_cast<long>(m_texts.emplace_back(bytes()).pointer()));
         else
             numbers.push_back(static_cast<INT32>(number()));

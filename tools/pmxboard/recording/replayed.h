@@ -77,6 +77,7 @@ struct Described
 {
     std::string name;
     bool has_result;
+    bool tells_texts; ///< texts are recorded by where they stand, and told apart
     std::vector<DescribedParameter> parameters;
 };
 

@@ -32,7 +32,8 @@ void* memset(void* pvDest, int iValue, size_t zSize);
 
 /* What is to be known of a format: how many values it takes, and above that a bit for each that is a text. */
 #define PMX_CODE_COUNT(u4Code) ((u4Code)&31u)
-#define PMX_CODE_TEXTS(u4Code) ((u4Code) >> 5)
+#define PMX_CODE_TEXTS(u4Code) ((u4Code) >> 5 & 0xFFFFu)
+#define PMX_UNRECORDED 0x80000000u /* beside that: nothing is recorded */
 
 /* The numbers of what both sides know by name. */
 #define PMX_SYMBOL_NULL 0u

@@ -3,6 +3,7 @@
 are written from the headers, so that a replay makes of its arguments what the recorder made of them."""
 
 import pathlib
+import re
 import sys
 import zlib
 
@@ -17,9 +18,14 @@ PLANE_CALL = signatures.PLANE_CALL
 # Constant objects through which others call the layer, and what a symbol among the arguments is.
 TABLES = ("_rPMXIF", "pmx_pm_ops")
 SYMBOLS = {"_PMX_TmrIsr": "PMX_SYMBOL_ISR", "_rPMXIF": "PMX_SYMBOL_TABLE", "pmx_pm_ops": "PMX_SYMBOL_POWER"}
-KERNEL = ("memcpy", "memset")
 # These are handed texts that somebody else made, too. All other texts that the layer hands over are its own, and stay.
 FROM_OUTSIDE = ("x_vsnprintf", "UTIL_Printf")
+
+
+def constant(name):
+    """A number of pmx_recorder.h."""
+    header = (pathlib.Path(__file__).parent / "pmx_recorder.h").read_text(encoding="utf-8")
+    return int(re.search(rf"^#define {name} (\d+)u\b", header, re.M)[1])
 
 
 def operations():

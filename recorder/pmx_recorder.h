@@ -29,13 +29,13 @@ typedef struct
 {
     UINT32 au4Magic[3];
     UINT32 u4Version;
-    UINT32 u4Interface;     /**< which operations and functions the numbers mean: a check sum of the headers */
-    UINT32 u4PointerSize;   /**< bytes */
-    UINT32 u4ExportedSize;  /**< bytes of the objects that neighbours see, at the head of the state */
-    UINT32 u4StateSize;     /**< bytes of the whole state */
-    UINT32 u4RingWords;     /**< a power of two; behind the ring stand PMX_RECORDER_LONGEST + 1 words more */
-    UINT32 u4TickNs;        /**< nanoseconds of what times are counted in */
-    UINT32 u4Head;          /**< words ever written, modulo 2^32; what is older than a ring is lost */
+    UINT32 u4Interface;    /**< which operations and functions the numbers mean: a check sum of the headers */
+    UINT32 u4PointerSize;  /**< bytes */
+    UINT32 u4ExportedSize; /**< bytes of the objects that neighbours see, at the head of the state */
+    UINT32 u4StateSize;    /**< bytes of the whole state */
+    UINT32 u4RingWords;    /**< a power of two; behind the ring stand PMX_RECORDER_LONGEST + 1 words more, then texts */
+    UINT32 u4TickNs;       /**< nanoseconds of what times are counted in */
+    UINT32 u4Head;         /**< words ever written, modulo 2^32; what is older than a ring is lost */
     UINT32 u4SnapshotCount; /**< snapshots ever taken; the last ones stand below, each at its number's remainder */
     UINT32 au4Snapshot[PMX_RECORDER_SNAPSHOTS]; /**< where they begin, counted like u4Head */
 } PMX_RECORDER_T;
@@ -46,13 +46,26 @@ typedef DRV_ENUM(PMX_RECORDER_KIND_T){
     PMX_RECORDER_CALL = 2,      /**< the layer calls somebody */
     PMX_RECORDER_RETURN = 3,    /**< either of them ends, and something came between */
     PMX_RECORDER_CHANGE = 4,    /**< a neighbour has written into the layer's objects */
-    PMX_RECORDER_SNAPSHOT = 5,  /**< the whole state, while no operation runs */
-    PMX_RECORDER_TEXT = 6       /**< what stands where a text is handed over from; told once behind each snapshot */
+    PMX_RECORDER_SNAPSHOT = 5   /**< the whole state, while no operation runs */
 } PMX_RECORDER_KIND_T;
 #define PMX_RECORDER_ANSWERED 0x80u
 
+/** A text of the layer, which stays what it is: events have where it stands, and here is what that means. Threads write
+ *  without a lock: where the first word does not fit the second, or is 0, there is no text yet. */
+typedef struct
+{
+    UINT32 u4Key;  /**< the low 32 bits of its address, combined with the next word by exclusive or */
+    UINT32 u4Code; /**< as a format: how many values it takes, 5 bits, and above that a bit for each that is a text */
+    UINT32 u4Sum;  /**< its check sum */
+    UINT32 u4Claimed; /**< whoever finds 0 here and adds 1 may fill the place */
+} PMX_RECORDER_TEXT_T;
+
+#define PMX_RECORDER_TEXTS 512u /* places for them; a text stands at its own or one of the next */
+
 /** Bytes that a ring of so many bytes needs, a power of two. */
-#define PMX_RECORDER_MEMORY(RingBytes) ((RingBytes) + 4 * (PMX_RECORDER_LONGEST + 1) + sizeof(PMX_RECORDER_T))
+#define PMX_RECORDER_MEMORY(RingBytes)                                       \
+    (sizeof(PMX_RECORDER_T) + (RingBytes) + 4 * (PMX_RECORDER_LONGEST + 1) + \
+     PMX_RECORDER_TEXTS * sizeof(PMX_RECORDER_TEXT_T))
 
 /** Who lends the ring, and knows what the layer does not. */
 typedef struct

@@ -12,6 +12,7 @@
 #ifndef PMX_RECORDER_ADD
 #define PMX_RECORDER_ADD(pu4Word, u4Number) __atomic_fetch_add(pu4Word, u4Number, __ATOMIC_RELAXED)
 #define PMX_RECORDER_LOAD(pu4Word) __atomic_load_n(pu4Word, __ATOMIC_RELAXED)
+#define PMX_RECORDER_PUBLISH(pu4Word, u4Value) __atomic_store_n(pu4Word, u4Value, __ATOMIC_RELEASE)
 #endif
 
 #ifdef __GNUC__
@@ -24,42 +25,29 @@
 #define PMX_SELDOM(fgCondition) (fgCondition)
 #endif
 
-#define PMX_TEXTS 256u /* places for texts: a power of two, and more than the layer has in a run */
-
 static struct
 {
     PMX_RECORDER_T* prRecorder; /* null: nothing is recorded; the ring stands behind it */
     UINT32 u4Mask;
+    PMX_RECORDER_TEXT_T* prText;
     UINT32 (*pu4Time)(void);
     UINT32 (*pu4Thread)(void);
-    UINT32 u4Lap;          /* how many snapshots there have been in all recordings */
     UINT32 u4Running;      /* operations, in all threads */
     UINT32 u4LastSnapshot; /* where it begins */
-    BOOL fgWatchAll;
+    PMX_PLACES_T rPlaces;
+    PMX_WATCHED_T rShadow; /* what neighbours see, as it was when the layer was last left */
+    UINT32 (*pu4GivenThread)(void);
 } rNow;
 
-/* What neighbours see, and, where that is watched, what they do not, as it was when the layer was last left. */
-static PMX_WATCHED_T rShadow;
-static UCHAR aucShadow[PMX_STATE_SIZE];
+/* The whole state at that moment, where that is watched. */
+static UINT32 au4Shadow[PMX_WORDS(PMX_STATE_SIZE)];
 
 typedef struct
 {
     UINT32* pu4Words;
-    UINT32 u4At;
+    UINT32 u4End;
     UINT32 u4Head; /* its first word */
 } PMX_EVENT_T;
-
-/* A text that the layer has handed over, which stays what it is: where it stands, its check sum and what it says as a
- * format. Threads write without a lock: the first word fits the others or the place does not count. */
-typedef struct
-{
-    size_t zKey;
-    UINT32 u4Sum;
-    UINT32 u4Code;
-    UINT32 u4Told; /* the lap in which it was told */
-} PMX_TEXT_T;
-
-static PMX_TEXT_T arText[PMX_TEXTS];
 
 /* A place for an event, and its head, in which its length stands already. An event that begins before the ring's end
  * goes on behind it: there are as many words as the longest has. What may be interrupted is asked for before there is a
@@ -72,7 +60,7 @@ static inline UINT32* pu4Begin(PMX_EVENT_T* prEvent, UINT32 u4Head)
     const UINT32 u4At = PMX_RECORDER_ADD(&prRecorder->u4Head, u4Head & 0xFF);
     UINT32* const pu4Words = (UINT32*)(prRecorder + 1) + (u4At & rNow.u4Mask);
     prEvent->pu4Words = pu4Words;
-    prEvent->u4At = u4At;
+    prEvent->u4End = u4At + (u4Head & 0xFF);
     prEvent->u4Head = u4Head | u4Thread << 24;
     pu4Words[0] = prEvent->u4Head;
     pu4Words[1] = u4Time;
@@ -97,59 +85,78 @@ static inline UINT32* pu4PutBytes(UINT32* pu4To, const void* pvBytes, UINT32 u4S
     return pu4PutRaw(pu4To + 1, pvBytes, u4Size);
 }
 
-/* The first so many bytes of the state as an event. */
-static UINT32 u4WriteState(UINT32 u4Kind, UINT32 u4Size)
+/* The state, or the exported objects at its head; the last word of either may be filled up with zeros. */
+static void vTakeState(UINT32* pu4To, UINT32 u4Size)
 {
-    UCHAR aucState[PMX_STATE_SIZE];
-    PMX_EVENT_T rEvent;
-    UINT32* pu4To;
-    memset(aucState, 0, sizeof aucState);
-    vPmxTakeExported(aucState);
-    vPmxTakePrivate(aucState);
-    pu4To = pu4Begin(&rEvent, u4Kind << 8 | (2 + PMX_WORDS(u4Size)));
-    pu4PutRaw(pu4To - 1, aucState, u4Size);
-    return rEvent.u4At;
+    pu4To[PMX_WORDS(PMX_EXPORTED_SIZE) - 1] = 0;
+    vPmxTakeExported((UCHAR*)pu4To);
+    if (u4Size == PMX_EXPORTED_SIZE)
+        return;
+    pu4To[PMX_WORDS(PMX_STATE_SIZE) - 1] = 0;
+    vPmxTakePrivate((UCHAR*)pu4To);
 }
 
-/* Texts are told anew behind each: of a ring that has run over, what stands before the first one that is left is
- * lost. */
+/* It as an event. */
+static UINT32 u4WriteState(UINT32 u4Kind, UINT32 u4Size)
+{
+    PMX_EVENT_T rEvent;
+    vTakeState(pu4Begin(&rEvent, u4Kind << 8 | (2 + PMX_WORDS(u4Size))) - 1, u4Size);
+    return rEvent.u4End - (rEvent.u4Head & 0xFF);
+}
+
 static PMX_RARE void vTakeSnapshot(void)
 {
     PMX_RECORDER_T* const prRecorder = rNow.prRecorder;
     rNow.u4LastSnapshot = u4WriteState(PMX_RECORDER_SNAPSHOT, PMX_STATE_SIZE);
     prRecorder->au4Snapshot[prRecorder->u4SnapshotCount % PMX_RECORDER_SNAPSHOTS] = rNow.u4LastSnapshot;
     ++prRecorder->u4SnapshotCount;
-    ++rNow.u4Lap;
 }
 
 /* The layer is left: from here on others write. */
 static inline void vLeave(void)
 {
-    vPmxWatch(&rShadow);
-    if (PMX_SELDOM(rNow.fgWatchAll))
-        vPmxTakePrivate(aucShadow);
+    vPmxWatch(&rNow.rPlaces, &rNow.rShadow);
 }
 
-static PMX_RARE void vEnterChanged(UINT32 u4Differs)
+/* Where everything is watched, it is asked for in the place of the thread's number, which is when the layer was left.
+ * Then the watched words never fit, and every entry looks closer. */
+static UINT32 u4WatchAll(void)
 {
-    UCHAR aucNow[PMX_STATE_SIZE];
+    vTakeState(au4Shadow, PMX_STATE_SIZE);
+    vPmxSpoil(&rNow.rPlaces, &rNow.rShadow);
+    return rNow.pu4GivenThread();
+}
+
+/* The layer is left without an event that begins. */
+static inline void vLeaveAll(void)
+{
+    vLeave();
+    if (PMX_SELDOM(rNow.pu4Thread == u4WatchAll))
+        u4WatchAll();
+}
+
+static PMX_RARE void vEnterChanged(void)
+{
+    UINT32 au4Now[PMX_WORDS(PMX_STATE_SIZE)];
+    UINT32 u4Differs = 0;
     UINT32 i;
-    if (rNow.fgWatchAll != FALSE)
+    if (rNow.pu4Thread != u4WatchAll)
     {
-        vPmxTakePrivate(aucNow);
-        for (i = PMX_EXPORTED_SIZE; i < PMX_STATE_SIZE; ++i)
-            u4Differs |= (UINT32)aucNow[i] ^ aucShadow[i];
+        u4WriteState(PMX_RECORDER_CHANGE, PMX_EXPORTED_SIZE);
+        return;
     }
+    vTakeState(au4Now, PMX_STATE_SIZE);
+    for (i = 0; i < PMX_WORDS(PMX_STATE_SIZE); ++i)
+        u4Differs |= au4Now[i] ^ au4Shadow[i];
     if (u4Differs != 0)
-        u4WriteState(PMX_RECORDER_CHANGE, rNow.fgWatchAll != FALSE ? PMX_STATE_SIZE : PMX_EXPORTED_SIZE);
+        u4WriteState(PMX_RECORDER_CHANGE, PMX_STATE_SIZE);
 }
 
 /* The layer is entered: what did they write? */
 static inline void vEnter(void)
 {
-    const UINT32 u4Differs = u4PmxDiffers(&rShadow);
-    if (PMX_SELDOM(u4Differs | rNow.fgWatchAll))
-        vEnterChanged(u4Differs);
+    if (PMX_SELDOM(u4PmxDiffers(&rNow.rPlaces, &rNow.rShadow)))
+        vEnterChanged();
 }
 
 /* The end of an event as one of its own, with room for what was written behind pointers. */
@@ -158,7 +165,7 @@ static PMX_RARE UINT32* pu4Return(const PMX_EVENT_T* prEvent, UINT32 u4Answer, U
     PMX_EVENT_T rEnd;
     UINT32* const pu4To = pu4Begin(&rEnd, PMX_RECORDER_RETURN << 8 | (prEvent->u4Head & 0xFF0000u) | (4 + u4Words));
     pu4To[-1] = u4Answer;
-    *pu4To = prEvent->u4At;
+    *pu4To = prEvent->u4End - (prEvent->u4Head & 0xFF);
     return pu4To + 1;
 }
 
@@ -166,12 +173,11 @@ static PMX_RARE UINT32* pu4Return(const PMX_EVENT_T* prEvent, UINT32 u4Answer, U
  * many words. */
 static inline UINT32* pu4End(const PMX_EVENT_T* prEvent, UINT32 u4Answer, UINT32 u4Words)
 {
-    const UINT32 u4Count = prEvent->u4Head & 0xFF;
-    if (PMX_SELDOM(PMX_RECORDER_LOAD(&rNow.prRecorder->u4Head) != prEvent->u4At + u4Count))
+    if (PMX_SELDOM(PMX_RECORDER_LOAD(&rNow.prRecorder->u4Head) != prEvent->u4End))
         return pu4Return(prEvent, u4Answer, u4Words);
     prEvent->pu4Words[2] = u4Answer;
     prEvent->pu4Words[0] = prEvent->u4Head | PMX_RECORDER_ANSWERED << 8;
-    return prEvent->pu4Words + u4Count - u4Words;
+    return prEvent->pu4Words + (prEvent->u4Head & 0xFF) - u4Words;
 }
 
 /* The layer calls. What goes in the head, its length too, is known when this is compiled, as a rule. */
@@ -206,72 +212,59 @@ static PMX_SHARED UINT32* pu4Operation(PMX_EVENT_T* prEvent, UINT32 u4Head)
 
 static PMX_SHARED UINT32* pu4Done(const PMX_EVENT_T* prEvent, UINT32 u4Answer, UINT32 u4Words)
 {
-    vLeave();
+    vLeaveAll();
     PMX_RECORDER_ADD(&rNow.u4Running, 0xFFFFFFFFu);
     return pu4End(prEvent, u4Answer, u4Words);
 }
 
-static inline UINT32 u4Place(const char* szText)
+static inline UINT32 u4Place(UINT32 u4Where)
 {
-    return (UINT32)(size_t)szText * 2654435769u >> 24;
-}
-DRV_STATIC_ASSERT(PMX_TEXTS == 256, "a place is told by eight bits");
-
-static inline bool fgIs(const PMX_TEXT_T* prText, const char* szText)
-{
-    return (prText->zKey ^ prText->u4Code ^ prText->u4Sum) == (size_t)szText;
+    return (u4Where ^ u4Where >> 9) % PMX_RECORDER_TEXTS;
 }
 
-/* Its place; one that is read for the first time gets one, in the end another one's. */
-static PMX_TEXT_T* prTextOf(const char* szText)
+/* A text that is handed over for the first time takes a place that is free. There are more than the layer has texts. */
+static PMX_RARE UINT32 u4TellFirst(const char* szText)
 {
-    const UINT32 u4First = u4Place(szText);
-    PMX_TEXT_T* prText;
+    const UINT32 u4Where = (UINT32)(size_t)szText;
+    const UINT32 u4Code = u4PmxCode(szText);
     UINT32 i;
-    for (i = 0; i < PMX_TEXTS / 16; ++i)
+    for (i = 0; szText != 0 && i < PMX_RECORDER_TEXTS; ++i)
     {
-        prText = &arText[(u4First + i) % PMX_TEXTS];
-        if (fgIs(prText, szText))
-            return prText;
-        if (prText->zKey == 0)
-            break;
+        PMX_RECORDER_TEXT_T* const prText = &rNow.prText[(u4Place(u4Where) + i) % PMX_RECORDER_TEXTS];
+        if (prText->u4Key != 0 || PMX_RECORDER_ADD(&prText->u4Claimed, 1u) != 0)
+            continue;
+        prText->u4Code = u4Code;
+        prText->u4Sum = u4PmxText(szText);
+        PMX_RECORDER_PUBLISH(&prText->u4Key, u4Where ^ u4Code);
+        break;
     }
-    if (i == PMX_TEXTS / 16)
-        prText = &arText[u4First];
-    prText->u4Told = 0;
-    prText->u4Code = u4PmxCode(szText);
-    prText->u4Sum = u4PmxText(szText);
-    prText->zKey = (size_t)szText ^ prText->u4Code ^ prText->u4Sum;
-    return prText;
+    return u4Code;
 }
 
-static PMX_RARE UINT32 u4TellSlowly(const char* szText)
+/* A text that does not stand at its own place. */
+static PMX_SHARED UINT32 u4TellSlowly(const char* szText)
 {
-    PMX_TEXT_T* prText;
-    PMX_EVENT_T rEvent;
-    UINT32* pu4To;
-    if (szText == 0)
-        return 0;
-    prText = prTextOf(szText);
-    if (rNow.prRecorder != 0 && prText->u4Told != rNow.u4Lap)
+    const UINT32 u4Where = (UINT32)(size_t)szText;
+    UINT32 u4At = u4Place(u4Where);
+    while (rNow.prText[u4At].u4Key != 0)
     {
-        const UINT32 u4Lap = rNow.u4Lap;
-        pu4To = pu4Begin(&rEvent, PMX_RECORDER_TEXT << 8 | 5);
-        pu4To[-1] = (UINT32)(size_t)szText;
-        pu4To[0] = prText->u4Sum;
-        pu4To[1] = prText->u4Code;
-        prText->u4Told = u4Lap;
+        const UINT32 u4Code = rNow.prText[u4At].u4Code;
+        if ((rNow.prText[u4At].u4Key ^ u4Code) == u4Where)
+            return u4Code;
+        u4At = (u4At + 1) % PMX_RECORDER_TEXTS;
     }
-    return prText->u4Code;
+    return u4TellFirst(szText);
 }
 
-/* What a text of the layer says as a format. Where something is recorded, it was told from here on. */
+/* What a text of the layer says as a format. Where it stands means something from here on. */
 static inline UINT32 u4Tell(const char* szText)
 {
-    const PMX_TEXT_T* const prText = &arText[u4Place(szText)];
-    if (PMX_SELDOM(!fgIs(prText, szText) || prText->u4Told != rNow.u4Lap))
+    const UINT32 u4Where = (UINT32)(size_t)szText;
+    const PMX_RECORDER_TEXT_T* const prText = &rNow.prText[u4Place(u4Where)];
+    const UINT32 u4Code = prText->u4Code;
+    if (PMX_SELDOM((prText->u4Key ^ u4Code) != u4Where))
         return u4TellSlowly(szText);
-    return prText->u4Code;
+    return u4Code;
 }
 
 /* The texts among the values of a format. */
@@ -308,13 +301,15 @@ BOOL fgPmxRecorderStart(const PMX_RECORDER_SETUP_T* prSetup)
     prNew->u4RingWords = u4Words;
     prNew->u4TickNs = prSetup->u4TickNs;
     rNow.pu4Time = prSetup->pu4Time;
-    rNow.pu4Thread = prSetup->pu4Thread;
+    rNow.pu4GivenThread = prSetup->pu4Thread;
+    rNow.pu4Thread = prSetup->fgWatchAll != FALSE ? u4WatchAll : prSetup->pu4Thread;
+    vPmxFind(&rNow.rPlaces);
     rNow.u4Mask = u4Words - 1;
+    rNow.prText = (PMX_RECORDER_TEXT_T*)((UINT32*)(prNew + 1) + u4Words + PMX_RECORDER_LONGEST + 1);
     rNow.u4Running = 0;
-    rNow.fgWatchAll = prSetup->fgWatchAll;
     rNow.prRecorder = prNew;
     vTakeSnapshot();
-    vLeave();
+    vLeaveAll();
     /* A recording is one from here on. */
     prNew->au4Magic[0] = PMX_RECORDER_MAGIC_0;
     prNew->au4Magic[1] = PMX_RECORDER_MAGIC_1;

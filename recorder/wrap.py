@@ -22,17 +22,18 @@ from interface import elf
 def new_names(layer, manner):
     """{name: new name}, and the private variables."""
     needed, own, private = {}, {}, []
+    platform = {function.name for function in interface.platform()}
     for symbol in elf.Elf(layer).symbols:
         is_variable = symbol.type == elf.OBJECT and symbol.section and symbol.section.flags & elf.WRITE
         if symbol.is_local and is_variable:
             private.append(symbol.name)
         if symbol.is_local and manner == "replayed" and symbol.type in (elf.OBJECT, elf.FUNC):
             own[symbol.name] = f"pmx_replayed_{symbol.name}"  # whoever looks for it finds one of that name
-        elif symbol.is_local or not symbol.name or symbol.name in interface.KERNEL:
+        elif symbol.is_local or not symbol.name:
             continue
-        elif symbol.section is None:
+        elif symbol.section is None and symbol.name in platform:  # and not what a compiler takes for granted
             needed[symbol.name] = ("pmx_recorder_" if manner == "recorded" else "pmx_replay_") + symbol.name
-        elif manner == "replayed" or symbol.type == elf.FUNC or symbol.name in interface.TABLES:
+        elif symbol.section and (manner == "replayed" or symbol.type == elf.FUNC or symbol.name in interface.TABLES):
             own[symbol.name] = f"pmx_{manner}_{symbol.name}"
     if not needed or not own or not private:
         raise SystemExit(f"{layer} is no layer that ships")

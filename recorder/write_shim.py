@@ -25,23 +25,49 @@ def private(name, size):
 
 
 def watch(layer):
-    """What is looked at whenever the layer is entered or left: words that stand together, and what is left over."""
+    """What is looked at whenever the layer is entered or left: words that stand together, and what is left over. A load
+    of an address is shorter than making it."""
     runs, single = interface.watched(layer)
-    declared = "".join(f'typedef struct {{ UINT32 au4Word[{words}]; }} PMX_RUN_{i}_T;\n'
+    declared = "".join(f"typedef struct {{ UINT32 au4Word[{words}]; }} PMX_RUN_{i}_T;\n"
                        f'extern PMX_RUN_{i}_T rPmxRun{i} __asm__("{name}");\n' for i, (name, words) in enumerate(runs))
-    fields = [f"PMX_RUN_{i}_T rRun{i};" for i in range(len(runs))]
-    fields += [f"UCHAR auc{name}[{size}];" for name, size in single]
-    copied = [f"prTo->rRun{i} = rPmxRun{i};" for i in range(len(runs))]
-    copied += [f"PMX_COPY(prTo->auc{name}, (const void*)&{name}, {size});" for name, size in single]
-    compared = ["PMX_WATCHED_T rAsIs;", "UINT32 u4Differs = 0;", "vPmxWatch(&rAsIs);"]
+    watched = [f"PMX_RUN_{i}_T rRun{i};" for i in range(len(runs))]
+    watched += [f"UCHAR auc{name}[{size}];" for name, size in single]
+    places = [f"const PMX_RUN_{i}_T* prRun{i};" for i in range(len(runs))] + [f"const void* pv{name};"
+                                                                           for name, _ in single]
+    found = [f"prPlaces->prRun{i} = &rPmxRun{i};" for i in range(len(runs))]
+    found += [f"prPlaces->pv{name} = (const void*)&{name};" for name, _ in single]
+    copied = [f"prTo->rRun{i} = *prPlaces->prRun{i};" for i in range(len(runs))]
+    copied += [f"PMX_COPY(prTo->auc{name}, prPlaces->pv{name}, {size});" for name, size in single]
+    compared = ["PMX_WATCHED_T rAsIs;", "UINT32 u4Differs = 0;", "vPmxWatch(prPlaces, &rAsIs);"]
     compared += [f"u4Differs |= rAsIs.rRun{i}.au4Word[{word}] ^ prFrom->rRun{i}.au4Word[{word}];"
                  for i, (_, words) in enumerate(runs) for word in range(words)]
     compared += [f"u4Differs |= (UINT32)rAsIs.auc{name}[{i}] ^ prFrom->auc{name}[{i}];"
                  for name, size in single for i in range(size)]
-    return (f"{declared}typedef struct {{ {' '.join(fields)} }} PMX_WATCHED_T;\n\n"
-            f"static inline void vPmxWatch(PMX_WATCHED_T* prTo)\n{{\n    {INDENT.join(copied)}\n}}\n\n"
-            f"static inline UINT32 u4PmxDiffers(const PMX_WATCHED_T* prFrom)\n{{\n    {INDENT.join(compared)}\n"
-            "    return u4Differs;\n}\n")
+    return f"""{declared}typedef struct {{ {" ".join(watched)} }} PMX_WATCHED_T;
+typedef struct {{ {" ".join(places)} }} PMX_PLACES_T;
+
+static inline void vPmxFind(PMX_PLACES_T* prPlaces)
+{{
+    {INDENT.join(found)}
+}}
+
+static inline void vPmxWatch(const PMX_PLACES_T* prPlaces, PMX_WATCHED_T* prTo)
+{{
+    {INDENT.join(copied)}
+}}
+
+static inline UINT32 u4PmxDiffers(const PMX_PLACES_T* prPlaces, const PMX_WATCHED_T* prFrom)
+{{
+    {INDENT.join(compared)}
+    return u4Differs;
+}}
+
+/* From here on they differ, whatever the layer's objects hold. */
+static inline void vPmxSpoil(const PMX_PLACES_T* prPlaces, PMX_WATCHED_T* prTo)
+{{
+    prTo->rRun0.au4Word[0] = ~prPlaces->prRun0->au4Word[0];
+}}
+"""
 
 
 def sizes(function, is_operation):
@@ -171,7 +197,7 @@ def printing_much(function, index):
     handed = ", ".join([given, *(f"aiValue[{i}]" for i in range(16))])
     body = ["long aiValue[PMX_MOST_VALUES] = { 0 };", "const UINT32 u4Count = PMX_CODE_COUNT(u4Code);",
             "PMX_EVENT_T rEvent;", "UINT32* pu4To;", "UINT32 i;", "vPmxCollect(u4Code, rValues, aiValue);",
-            f"if (rNow.prRecorder == 0)\n    {{\n        {function.name}({handed});\n        return;\n    }}",
+            f"if ((u4Code & PMX_UNRECORDED) != 0)\n    {{\n        {function.name}({handed});\n        return;\n    }}",
             "vTellValues(PMX_CODE_TEXTS(u4Code), aiValue);",
             f"pu4To = pu4Call(&rEvent, PMX_RECORDER_CALL << 8 | {index}u << 16 | ({3 + first} + u4Count));"]
     body += [f"pu4To[{i}] = (UINT32){parameter.name};" for i, parameter in enumerate(numbers)]
@@ -190,11 +216,12 @@ def printing(function, index):
     first = len(numbers) + 1
     values = [f"iValue{i}" for i in range(FEW_VALUES)]
     lines = [f"long {', '.join(f'{value} = 0' for value in values)};", "PMX_EVENT_T rEvent;", "UINT32* pu4To;",
-             "va_list rValues;", f"const UINT32 u4Code = u4Tell({text});",
-             "const UINT32 u4Count = PMX_CODE_COUNT(u4Code);", f"va_start(rValues, {text});",
-             f"if (PMX_SELDOM(rNow.prRecorder == 0) || PMX_SELDOM(u4Count > {FEW_VALUES}))", "{",
+             "va_list rValues;",
+             f"const UINT32 u4Code = PMX_SELDOM(rNow.prRecorder == 0) ? u4PmxCode({text}) | PMX_UNRECORDED "
+             f": u4Tell({text});",
+             f"va_start(rValues, {text});", f"if (PMX_SELDOM((u4Code & (PMX_UNRECORDED | 31)) > {FEW_VALUES}))", "{",
              f"    vMuch_{function.name}({given}, u4Code, rValues);", "    va_end(rValues);", "    return;", "}",
-             "switch (u4Count)", "{"]
+             "switch (PMX_CODE_COUNT(u4Code))", "{"]
     for count in range(FEW_VALUES, -1, -1):
         lines.append("default:" if count == FEW_VALUES else f"case {count}:")
         lines += [f"    {value} = va_arg(rValues, long);" for value in values[:count]]
@@ -320,7 +347,18 @@ def table_of_slots():
     return "const IPMX _rPMXIF = {\n" + "\n".join(rows) + "\n};\n"
 
 
+def hold_texts(layer):
+    """There is a place for each text of the layer, and as many again."""
+    most = interface.constant("PMX_RECORDER_TEXTS")
+    read = interface.elf.Elf(layer)
+    texts = len({text for section in read.sections if section.flags & interface.elf.STRINGS
+                 and section.flags & interface.elf.ALLOC for text in read.bytes_of(section).split(b"\0")})
+    if not 0 < texts <= most // 2:
+        raise SystemExit(f"{layer} has {texts} texts; PMX_RECORDER_TEXTS has to be twice as many, and is {most}")
+
+
 def source(layer):
+    hold_texts(layer)
     exported, private_ones, exported_size, size = interface.placed(layer)
     platform = interface.platform()
     includes = "\n".join(f'#include "{header}"' for header in interface.HEADERS)

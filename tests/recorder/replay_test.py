@@ -23,7 +23,7 @@ import interface  # noqa: E402
 
 HEADER_WORDS = 28
 RING_WORDS, HEAD, SNAPSHOT_COUNT = 8, 10, 11  # words of the header
-OPERATION, CALL, RETURN, CHANGE, SNAPSHOT, TEXT = range(1, 7)
+OPERATION, CALL, RETURN, CHANGE, SNAPSHOT = range(1, 6)
 ANSWERED = 0x80
 MODE_CHANGE = "PMX_Init\nPMX_SetMode 0 RES_720P50HZ 50 0\nPMX_SetMode 0 RES_480P 60 0\n"
 
@@ -38,13 +38,11 @@ class Recording:
         return struct.pack(f"<{len(self.words)}I", *self.words)
 
     def events(self):
-        """(place, kind, whether it is answered, function) of a ring that has not run over. Texts are told between
-        them."""
+        """(place, kind, whether it is answered, function) of a ring that has not run over."""
         at, end = HEADER_WORDS, HEADER_WORDS + self.words[HEAD]
         while at < end:
             head = self.words[at]
-            if head >> 8 & 0x7F != TEXT:
-                yield at, head >> 8 & 0x7F, bool(head >> 8 & ANSWERED), head >> 16 & 0xFF
+            yield at, head >> 8 & 0x7F, bool(head >> 8 & ANSWERED), head >> 16 & 0xFF
             at += head & 0xFF
 
 

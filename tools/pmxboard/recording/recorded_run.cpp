@@ -61,12 +61,14 @@ std::string recorded(std::uint32_t size, const std::function<void()>& meanwhile)
     }
     PMX_RECORDER_T header;
     std::memcpy(&header, memory.data(), sizeof header);
-    const std::size_t ring =
-        std::min(header.u4RingWords, std::max(std::bit_ceil(header.u4Head), PMX_RECORDER_LEAST_WORDS));
-    header.u4RingWords = static_cast<UINT32>(ring);
-    std::string bytes(PMX_RECORDER_MEMORY(4 * ring), '\0');
-    std::memcpy(bytes.data(), memory.data(), bytes.size());
+    const std::size_t texts = PMX_RECORDER_TEXTS * sizeof(PMX_RECORDER_TEXT_T);
+    const std::size_t given = PMX_RECORDER_MEMORY(4 * std::size_t{ header.u4RingWords });
+    header.u4RingWords = std::min(header.u4RingWords, std::max(std::bit_ceil(header.u4Head), PMX_RECORDER_LEAST_WORDS));
+    std::string bytes(PMX_RECORDER_MEMORY(4 * std::size_t{ header.u4RingWords }), '\0');
+    const auto* const from = reinterpret_cast<const char*>(memory.data());
     std::memcpy(bytes.data(), &header, sizeof header);
+    std::memcpy(bytes.data() + sizeof header, from + sizeof header, bytes.size() - sizeof header - texts);
+    std::memcpy(bytes.data() + bytes.size() - texts, from + given - texts, texts);
     return bytes;
 }
 

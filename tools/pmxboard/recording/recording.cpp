@@ -94,7 +94,6 @@ std::string wrong_with(const Event& event, const PMX_RECORDER_T& header)
                        event.words.size() != (header.u4StateSize + 3) / 4
                    ? "it is no state"
                    : "";
-    case PMX_RECORDER_TEXT: return event.words.size() != 3 ? "it is no text" : "";
     case PMX_RECORDER_SNAPSHOT: return event.words.size() != (header.u4StateSize + 3) / 4 ? "it is no state" : "";
     }
     return "no such kind of event";
@@ -107,6 +106,14 @@ public:
     Reader(std::string_view ring, Recording& recording)
         : m_ring(ring), m_recording(recording), m_state(recording.header.u4PointerSize)
     {
+        const char* from = ring.data() + 4 * (recording.header.u4RingWords + std::size_t{ PMX_RECORDER_LONGEST } + 1);
+        for (std::size_t i = 0; i < PMX_RECORDER_TEXTS; ++i, from += sizeof(PMX_RECORDER_TEXT_T))
+        {
+            PMX_RECORDER_TEXT_T text;
+            std::memcpy(&text, from, sizeof text);
+            if (text.u4Key != 0)
+                m_texts[text.u4Key ^ text.u4Code] = { text.u4Sum, text.u4Code };
+        }
     }
 
     /** So many words, up to the head. */
@@ -151,11 +158,6 @@ private:
 
     void keep(Event event, std::vector<std::uint32_t> words)
     {
-        if (event.kind == PMX_RECORDER_TEXT)
-        {
-            m_texts[words[0]] = { words[1], words[2] };
-            return;
-        }
         if (event.kind == PMX_RECORDER_CALL)
             name_texts(replayed_layer().functions[event.function], std::span(words).subspan(1));
         else if (event.kind == PMX_RECORDER_CHANGE || event.kind == PMX_RECORDER_SNAPSHOT)

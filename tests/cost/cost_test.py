@@ -174,7 +174,9 @@ def card():
             "kernel": {"code": 1300, "texts": 500, "tables": 100, "ram": 50, "unwind": 200},
             "files": {"pmx_a": {"code": 1000, "texts": 500, "tables": 100, "ram": 50}},
             "functions": {"PMX_A": function},
-            "tables": {"T": 100}, "ram": {"_arPmxConf": 40, "x": 10}, "repeated": [], "indirect": [], "paths": [path]}
+            "tables": {"T": 100}, "ram": {"_arPmxConf": 40, "x": 10}, "repeated": [], "indirect": [],
+            "recorder": {"change": 1000, "calls": 9, "call": 100, "code": 5000, "functions": {"PMX_A": 50}},
+            "paths": [path]}
 
 
 class AsJson(unittest.TestCase):
@@ -213,6 +215,13 @@ class Check(unittest.TestCase):
         self.assertEqual(1, len(self.complaints(lambda now: now["functions"]["PMX_A"].update(stack=103))))
         self.assertEqual(1, len(self.complaints(lambda now: now["files"]["pmx_a"].update(code=1030))))
 
+    def test_what_recording_costs_may_not_grow(self):
+        self.assertEqual([], self.complaints(lambda now: now["recorder"].update(change=1010)))
+        self.assertEqual(["the recorder: change: 1000 has grown to 1030"],
+                         self.complaints(lambda now: now["recorder"].update(change=1030)))
+        self.assertEqual(["the recorder: PMX_A: 50 has grown to 60"],
+                         self.complaints(lambda now: now["recorder"]["functions"].update(PMX_A=60)))
+
     def test_fewer_of_anything_pass_but_calls(self):
         self.assertEqual([], self.complaints(lambda now: now["paths"][0].update(layer=50)))
         for kind in ("calls", "registers", "logs"):
@@ -247,14 +256,16 @@ class Check(unittest.TestCase):
 
 class Goals(unittest.TestCase):
     LIST = {"size": {"code": 1000, "tables": 100, "frame": 16, "stack": 100, "ram": 10},
-            "price": {"any": 40, "loop": 60, "own": {}}, "loops": {"operations": []}, "stack": {"apart": []}}
+            "price": {"any": 40, "loop": 60, "own": {}}, "loops": {"operations": []}, "stack": {"apart": []},
+            "recorder": {"call": 120, "change": 1000}}
 
     def complaints(self, explained=(), **changes):
         now = copy.deepcopy(card())
         now["totals"].update({name: value for name, value in changes.items() if name in now["totals"]})
         now["paths"][0].update({name: value for name, value in changes.items() if name == "layer"})
         now["repeated"] = changes.get("repeated", [])
-        every = [*goals.of_sizes(self.LIST, now), *goals.of_prices(self.LIST, now)]
+        now["recorder"].update({name: value for name, value in changes.items() if name in ("call", "change")})
+        every = [*goals.of_sizes(self.LIST, now), *goals.of_prices(self.LIST, now), *goals.of_recorder(self.LIST, now)]
         return list(goals.complaints(every, [{"goals": list(explained), "because": "so"}] if explained else []))
 
     def test_met_goals_need_no_explanation(self):
@@ -267,6 +278,8 @@ class Goals(unittest.TestCase):
         self.assertEqual([], self.complaints(["PMX_A"], layer=101))
         self.assertEqual(1, len(self.complaints(ram=51)))
         self.assertEqual(1, len(self.complaints(repeated=["twice"])))
+        self.assertEqual(1, len(self.complaints(call=121)))
+        self.assertEqual([], self.complaints(["recorded change"], change=1001))
 
     def test_a_stale_explanation_and_one_of_nothing_are_refused(self):
         self.assertRegex(self.complaints(["code"])[0], "its explanation is stale")

@@ -38,7 +38,7 @@ def _functions(sizes):
     return rows
 
 
-def make(paths, counts, sizes):
+def make(paths, counts, sizes, recorder):
     """The card as an object that can be written as JSON."""
     rows = []
     for path in paths:
@@ -49,7 +49,7 @@ def make(paths, counts, sizes):
     return {"compilers": compilers(), "totals": {**sizes.totals, "heap": 0}, "kernel": sizes.kernel,
             "files": sizes.files,
             "functions": _functions(sizes), "tables": sizes.tables, "ram": sizes.ram, "repeated": sizes.repeated,
-            "indirect": [list(row) for row in sizes.graph.indirect], "paths": rows}
+            "indirect": [list(row) for row in sizes.graph.indirect], "recorder": recorder, "paths": rows}
 
 
 def as_json(card):
@@ -167,6 +167,13 @@ def _kernel_rows(card):
     yield tuple(_thousands(card["kernel"][kind]) for kind in (*KINDS, "unwind"))
 
 
+def _recorder_rows(card):
+    """Functions that cost the same stand together, the dearest first."""
+    functions = card["recorder"]["functions"]
+    for count in sorted(set(functions.values()), reverse=True):
+        yield ", ".join(f"`{name}`" for name, found in functions.items() if found == count), count
+
+
 def _objects(listed):
     plain = plain_names(listed)
     return [(f"`{plain[name]}`", _thousands(size))
@@ -177,9 +184,10 @@ def render(card, goals, explanations):
     """The document."""
     sizes, prices = goal_list.of_sizes(goals, card), goal_list.of_prices(goals, card)
     missed = [goal for goal in prices if not goal.met]
-    found = {goal.name: goal for goal in (*sizes, *prices)}
+    found = {goal.name: goal for goal in (*sizes, *prices, *goal_list.of_recorder(goals, card))}
     explained = [explanation for explanation in explanations if set(explanation["goals"]) <= set(found)]
     figures = _table(("", "", ""), figure_rows(card, goals))
+    recording = goal_list.of_recorder(goals, card)
     indirect = ", ".join(f"`{name}` ({place.split(':')[0]})" for name, place in card["indirect"]) or "none"
     executed = ("Operation", "Calls", "Registers", "Log lines", "Layer", "Floor", "Price", "Goal", "Paths")
     further = ("Path", "Calls", "Registers", "Log lines", "Layer", "Floor", "Price")
@@ -252,6 +260,15 @@ way through the layer. They count apart: nothing of the layer looks at them.
 
 {_table(("Code", "Texts", "Tables", "RAM", "Unwind tables"), _kernel_rows(card), ("Code", "Texts", "Tables", "RAM",
 "Unwind tables"))}
+## The flight recorder
+
+What [recording](recorder.md) adds to the layer, counted on the 32-bit target, one by one, by an emulator: the layer in
+the form for kernels, the recorder in ARM state, `-O2`, {_thousands(card["recorder"]["code"])} bytes of code.
+All outputs change their modes, and the dearest of many such changes has a snapshot in it. The product's own functions
+for time and thread number are not counted.
+
+{_table(("Instructions", "Goal", "Found", ""), _goal_rows(recording), ("Goal", "Found"))}
+{_table(("At most for", "Instructions"), _recorder_rows(card), ("Instructions",))}
 ## Tables
 
 {_table(("Table", "Bytes"), _objects(card["tables"]), ("Bytes",))}

@@ -55,10 +55,17 @@ def sizes(old, new):
             yield from _grew(f"{row['label']}: stack", before["stack"], row["stack"])
 
 
+def recorder(old, new):
+    for kind in ("change", "call", "code"):
+        yield from _grew(f"the recorder: {kind}", old["recorder"][kind], new["recorder"][kind])
+    for name, before in old["recorder"]["functions"].items():
+        yield from _grew(f"the recorder: {name}", before, new["recorder"]["functions"].get(name, 0))
+
+
 def all_of(old, new):
     """Complaints, and notes on what was not compared."""
     complaints, notes = list(calls(old, new)), []
-    for which, compare in (("host", instructions), ("target", sizes)):
+    for which, compare in (("host", instructions), ("target", sizes), ("target", recorder)):
         if old["compilers"][which] == new["compilers"][which]:
             complaints += compare(old, new)
         else:

@@ -29,6 +29,7 @@ import diff  # noqa: E402
 import goals as goal_list  # noqa: E402
 import instructions  # noqa: E402
 import paths as path_list  # noqa: E402
+import recorded  # noqa: E402
 import signatures  # noqa: E402
 import whole_file  # noqa: E402
 from tools import ToolError, run_binary  # noqa: E402
@@ -45,7 +46,8 @@ def measure(build, tree, made):
     board = instructions.Board(build)
     listed = path_list.read((TOOL / "paths.txt").read_text(encoding="utf-8"), signatures.operations(), board.examples)
     counts = instructions.count(listed, board, tree, made / "host")
-    return cards.make(listed, counts, arm.measure(tree, made / "target"))
+    return cards.make(listed, counts, arm.measure(tree, made / "target"),
+                      recorded.measure(tree, made / "target" / "recorder"))
 
 
 def goals_and_explanations():
@@ -54,7 +56,8 @@ def goals_and_explanations():
 
 def goal_complaints(card):
     goals, explanations = goals_and_explanations()
-    every_goal = [*goal_list.of_sizes(goals, card), *goal_list.of_prices(goals, card)]
+    every_goal = [*goal_list.of_sizes(goals, card), *goal_list.of_prices(goals, card),
+                  *goal_list.of_recorder(goals, card)]
     return list(goal_list.complaints(every_goal, explanations))
 
 

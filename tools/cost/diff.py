@@ -34,6 +34,8 @@ def text(before, now):
         of = [{name: row["code"] if kind == "functions" else row for name, row in card[kind].items()}
               for card in (before, now)]
         lines += ["", *_lines(title, *of, cards.plain_names({**of[0], **of[1]}))]
+    recorders = [card["recorder"].get("functions", {}) for card in (before, now)]
+    lines += ["", *_lines("instructions in the recorder, by function", *recorders)]
     stacks = [{name: row["stack"] for name, row in card["functions"].items()} for card in (before, now)]
     lines += ["", *_lines("worst stack, by function", *stacks, cards.plain_names({**stacks[0], **stacks[1]}))]
     for title, value in (("calls of the platform, by path", lambda path: path["calls"]),

@@ -56,6 +56,14 @@ def of_prices(goals, card):
             for operation, (price, kind) in highest.items()]
 
 
+def of_recorder(goals, card):
+    """The goals for what recording costs."""
+    limits, found = goals["recorder"], card["recorder"]
+    return [Goal("recorded call", f"a call, on average of the {found['calls']} of that change", limits["call"],
+                 found["call"]),
+            Goal("recorded change", "the dearest mode change", limits["change"], found["change"])]
+
+
 def complaints(every_goal, explanations):
     """Misses that nobody explains, explanations of what is no miss, and such of nothing at all."""
     explained = {}

@@ -135,6 +135,16 @@ class Replay(unittest.TestCase):
         self.assertRegex(shown, r"(?m)^\d+\t\d+\t0\tend of PMX_Init$")
         self.assertRegex(shown, r"PMX_GetMode\(0, \[A5\]\) = 1\n$")
 
+    def test_three_small_arguments_take_24_bytes(self):
+        recording = self.record(MODE_CHANGE)
+        functions, most = interface.platform(), 0
+        for place, kind, _, number in recording.events():
+            if kind == CALL and {parameter.kind for parameter in functions[number].parameters} <= {"number"}:
+                count = len(functions[number].parameters)
+                self.assertEqual(3 + count, recording.words[place] & 0xFF, functions[number].name)
+                most = max(most, count if count <= 3 else 0)
+        self.assertEqual(3, most)
+
     def test_a_ring_that_has_run_over(self):
         recording = self.record("PMX_Init\n" + 60 * MODE_CHANGE.removeprefix("PMX_Init\n"), "--size", "32768")
         ring, head = recording.words[RING_WORDS], recording.words[HEAD]
@@ -154,7 +164,8 @@ class Replay(unittest.TestCase):
         subprocess.run([PRODUCT, self.file, "0"], check=True, timeout=60)
         ended = self.run_tool("replay", self.file)
         self.assertEqual(0, ended.returncode, ended.stdout + ended.stderr)
-        # A ring of 64 KiB: two operations for each mode change.
+        # A ring of 64 KiB, which has lost something: two operations for each mode change.
+        self.assertGreater(int(ended.stdout.split("lost before: ")[1].split()[0]), 65536)
         self.assertGreaterEqual(int(ended.stdout.split()[1]), 2 * 20)
 
     def test_what_is_left_after_a_crash(self):

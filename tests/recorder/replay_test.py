@@ -16,34 +16,12 @@ import tempfile
 import unittest
 
 sys.dont_write_bytecode = True
+
+from recordings import (CALL, HEAD, HEADER_WORDS, OPERATION, RING_WORDS, SNAPSHOT_COUNT, Recording,  # noqa: E402
+                        interface)
+
 ROOT = pathlib.Path(__file__).resolve().parents[2]
-sys.path.insert(0, str(ROOT / "recorder"))
-
-import interface  # noqa: E402
-
-HEADER_WORDS = 28
-RING_WORDS, HEAD, SNAPSHOT_COUNT = 8, 10, 11  # words of the header
-OPERATION, CALL, RETURN, CHANGE, SNAPSHOT = range(1, 6)
-ANSWERED = 0x80
 MODE_CHANGE = "PMX_Init\nPMX_SetMode 0 RES_720P50HZ 50 0\nPMX_SetMode 0 RES_480P 60 0\n"
-
-
-class Recording:
-    """A recording as docs/recorder.md describes it."""
-
-    def __init__(self, content):
-        self.words = list(struct.unpack(f"<{len(content) // 4}I", content))
-
-    def bytes(self):
-        return struct.pack(f"<{len(self.words)}I", *self.words)
-
-    def events(self):
-        """(place, kind, whether it is answered, function) of a ring that has not run over."""
-        at, end = HEADER_WORDS, HEADER_WORDS + self.words[HEAD]
-        while at < end:
-            head = self.words[at]
-            yield at, head >> 8 & 0x7F, bool(head >> 8 & ANSWERED), head >> 16 & 0xFF
-            at += head & 0xFF
 
 
 class Replay(unittest.TestCase):
@@ -86,16 +64,12 @@ class Replay(unittest.TestCase):
 
     def test_another_answer_departs_there(self):
         recording = self.record(MODE_CHANGE)
-        numbers = [function.name for function in interface.platform()]
-        events = list(recording.events())
-        [began] = [event[0] for event in events if event[1::2] == (CALL, numbers.index("x_timer_create"))]
         # Its handle stands in an object that neighbours see: that was a change from outside, and then it returned.
-        [number] = [i for i, event in enumerate(events) if event[1] == RETURN and
-                    recording.words[event[0] + 3] == began - HEADER_WORDS]
-        recording.words[events[number][0] + 2] = 0xFFFFFFFF
+        number, place = recording.answer("x_timer_create")
+        recording.words[place] = 0xFFFFFFFF
         ended = self.replay(recording.bytes())
         self.assertEqual(1, ended.returncode)
-        self.assertIn(f"departs at event {number + 2} of {len(events)}", ended.stdout)
+        self.assertIn(f"departs at event {number + 2} of {len(list(recording.events()))}", ended.stdout)
         self.assertIn("in PMX_Init: another call\n", ended.stdout)
         self.assertIn("computed: Assert(", ended.stdout)
         self.assertIn("record:   {ucEnable=", ended.stdout)

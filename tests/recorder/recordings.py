@@ -1,0 +1,42 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+"""Recordings as docs/recorder.md describes them, read and changed by tests."""
+
+import pathlib
+import struct
+import sys
+
+sys.dont_write_bytecode = True
+sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "recorder"))
+
+import interface  # noqa: E402
+
+HEADER_WORDS = 28
+RING_WORDS, HEAD, SNAPSHOT_COUNT = 8, 10, 11  # words of the header
+OPERATION, CALL, RETURN, CHANGE, SNAPSHOT = range(1, 6)
+ANSWERED = 0x80
+
+
+class Recording:
+    def __init__(self, content):
+        self.words = list(struct.unpack(f"<{len(content) // 4}I", content))
+
+    def bytes(self):
+        return struct.pack(f"<{len(self.words)}I", *self.words)
+
+    def events(self):
+        """(place, kind, whether it is answered, function) of a ring that has not run over."""
+        at, end = HEADER_WORDS, HEADER_WORDS + self.words[HEAD]
+        while at < end:
+            head = self.words[at]
+            yield at, head >> 8 & 0x7F, bool(head >> 8 & ANSWERED), head >> 16 & 0xFF
+            at += head & 0xFF
+
+    def answer(self, name):
+        """(number of the event in which it is answered, from 0; place of the answer) of a function's first call."""
+        number = [function.name for function in interface.platform()].index(name)
+        events = list(self.events())
+        at, began = next((i, event) for i, event in enumerate(events) if event[1::2] == (CALL, number))
+        if not began[2]:
+            at = next(i for i, event in enumerate(events) if event[1] == RETURN and
+                      self.words[event[0] + 3] == began[0] - HEADER_WORDS)
+        return at, events[at][0] + 2

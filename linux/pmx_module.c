@@ -14,22 +14,28 @@ static int __init pmx_begin(void)
     int result;
 
     pmx_console_begin();
+    result = pmx_recorder_begin();
+    if (result)
+        return result;
     result = pmx_registers_begin();
     if (result)
-        return result;
+        goto no_registers;
     result = pmx_power_begin();
     if (result)
-    {
-        pmx_registers_end();
-        return result;
-    }
+        goto no_power;
     if (start)
         PMX_Init();
     return 0;
+
+no_power:
+    pmx_registers_end();
+no_registers:
+    pmx_recorder_end();
+    return result;
 }
 
 /* The layer first, for it calls everything else; then its timers, for an expiry prints and mixes planes; the console
- * last, for all of them print. */
+ * last, for all of them print, but for the recorder, through which everything goes. */
 static void __exit pmx_end(void)
 {
     if (_PmxInitiated)
@@ -38,6 +44,7 @@ static void __exit pmx_end(void)
     pmx_os_end();
     pmx_registers_end();
     pmx_console_end();
+    pmx_recorder_end();
 }
 
 module_init(pmx_begin);

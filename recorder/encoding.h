@@ -3,15 +3,17 @@
 #ifndef PMX_RECORDER_ENCODING_H
 #define PMX_RECORDER_ENCODING_H
 
-#include <stdbool.h>
-#include <stddef.h>
-
 #include "u_os.h"
 #include "x_typedef.h"
 
 #ifdef __cplusplus
 #include <cstring>
+#elif defined(__KERNEL__)
+#include <linux/string.h>
 #else
+#include <stdbool.h>
+#include <stddef.h>
+
 void* memcpy(void* pvDest, const void* pvSource, size_t zSize); /* the kernel's */
 void* memset(void* pvDest, int iValue, size_t zSize);
 #endif
@@ -28,7 +30,7 @@ void* memset(void* pvDest, int iValue, size_t zSize);
 #define PMX_MOST_BYTES 256u     /* that are kept of what one pointer leads to */
 #define PMX_MOST_TEXT 384u      /* characters of a format from outside */
 #define PMX_MOST_VALUES 16u     /* that go with a format */
-#define PMX_ROOM 256u           /* words in which an event is made */
+#define PMX_ROOM 160u           /* words in which the arguments of an event are gathered */
 
 /* What is to be known of a format: how many values it takes, and above that a bit for each that is a text. */
 #define PMX_CODE_COUNT(u4Code) ((u4Code)&31u)

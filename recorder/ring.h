@@ -16,8 +16,8 @@
 #endif
 
 #ifdef __GNUC__
-#define PMX_RARE __attribute__((noinline, cold))
-#define PMX_SHARED __attribute__((noinline)) /* too large to stand in each function */
+#define PMX_RARE __attribute__((__noinline__, __cold__))
+#define PMX_SHARED __attribute__((__noinline__)) /* too large to stand in each function */
 #define PMX_SELDOM(fgCondition) __builtin_expect((fgCondition) != 0, 0)
 #else
 #define PMX_RARE

@@ -13,6 +13,15 @@ load()
     insmod /pmx.ko "$@" || echo "WRONG insmod pmx.ko $*"
 }
 
+# What the flight recorder has, where there is one.
+recording()
+{
+    [ -f "$files/recording" ] || return
+    echo "RECORDING $1"
+    gzip -c <"$files/recording" | base64
+    echo "RECORDED"
+}
+
 unload()
 {
     rmmod pmx || echo "WRONG rmmod pmx"
@@ -28,14 +37,17 @@ scenario()
         if [ "$line" = POWER-ON ] && $loaded
         then
             cat "$files/trace"
+            recording "$1"
             unload
             loaded=false
         fi
-        $loaded || load start=0
+        # shellcheck disable=SC2086 # words
+        $loaded || load start=0 $(cat /parameters)
         loaded=true
         [ "$line" = POWER-ON ] || echo "$line" >"$files/command" || echo "WRONG $line"
     done <"/scenarios/$1"
     cat "$files/trace"
+    recording "$1"
     unload
     echo "END"
 }

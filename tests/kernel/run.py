@@ -11,6 +11,9 @@ usage: run.py CACHE MADE PMXBOARD OBJECT
     OBJECT    the layer as it ships for kernels
 """
 
+import base64
+import concurrent.futures
+import gzip
 import pathlib
 import re
 import shutil
@@ -24,6 +27,10 @@ import debian  # noqa: E402
 import scenarios  # noqa: E402
 
 HERE = pathlib.Path(__file__).resolve().parent
+sys.path.insert(0, str(HERE.parent / "recorder"))
+
+from recordings import Recording  # noqa: E402
+
 ROOT = HERE.parents[1]
 CROSS = "arm-linux-gnueabihf-"
 BOOT_SECONDS = 240
@@ -36,7 +43,10 @@ MEMORY_LIMIT = 4 * 1024 * 1024  # KB; the kernel's symbol reader can run away
 # A nanosecond is an instruction, and a sleep costs nothing: the same run every time.
 VIRTUAL_TIME = ["-icount", "shift=0,sleep=off"]
 APPLETS = ("sh", "mount", "cat", "cut", "grep", "sed", "dmesg", "insmod", "rmmod", "ls", "uname", "poweroff", "sleep",
-           "echo", "sync")
+           "echo", "sync", "gzip", "base64")
+# What a scenario does to the record behind the layer's back is recorded, too.
+RECORDING = "watch_all=1"
+CHANGED_BY_HAND = "first-mode-after-boot"
 
 
 class Failed(Exception):
@@ -87,8 +97,8 @@ def module(kernel, folder, *variables):
     return folder
 
 
-def image(kernel, modules, commands, made, more=None):
-    """The archive that the kernel boots from."""
+def image(kernel, modules, commands, made, more=None, parameters=""):
+    """The archive that the kernel boots from. The parameters are the module's, in scenarios."""
     root = made / "root"
     shutil.rmtree(root, ignore_errors=True)
     for name in ("bin", "proc", "sys", "dev", "scenarios"):
@@ -102,6 +112,7 @@ def image(kernel, modules, commands, made, more=None):
         run(f"{CROSS}strip", "--strip-debug", "-o", root / name, modules / name)
     for name, lines in commands.items():
         (root / "scenarios" / name).write_text("".join(line + "\n" for line in lines), encoding="utf-8")
+    (root / "parameters").write_text(parameters, encoding="utf-8")
     if more:
         shutil.copy(more, root / "more.sh")
     archive = made / "root.cpio.gz"
@@ -172,6 +183,50 @@ def compare(ktap, title, expected, console):
     ktap.verdict(f"{title} boot: {len(found)} scenarios, {lines} lines", wrong)
 
 
+def recordings(console):
+    """(scenario, recording) of each time that a recorded layer went."""
+    name, lines = None, []
+    for line in console:
+        if line.startswith("RECORDING "):
+            name, lines = line.split()[1], []
+        elif line == "RECORDED" and name:
+            yield name, gzip.decompress(base64.b64decode("".join(lines)))
+            name = None
+        elif name:
+            lines.append(line)
+
+
+def replays(ktap, program, expected, console, folder):
+    """A verdict for each scenario: what the kernel recorded is what the layer does here."""
+    shutil.rmtree(folder, ignore_errors=True)
+    folder.mkdir(parents=True)
+    wrong = {name: [] for name in expected}
+    found = dict.fromkeys(expected, 0)
+    for name, content in recordings(console):
+        found[name] += 1
+        file = folder / f"{name}-{found[name]}.rec"
+        file.write_bytes(content)
+        ran = subprocess.run([program, "replay", file], capture_output=True, text=True, check=False)
+        if not re.match(r"equal: [1-9]\d* operations, [1-9]\d* calls\n$", ran.stdout):
+            wrong[name] += [f"{file.name}: {line}" for line in (ran.stdout + ran.stderr).splitlines()]
+    for name, lines in wrong.items():
+        ktap.verdict(f"replayed: {name}", lines if found[name] else ["nothing was recorded"])
+
+
+def departs(ktap, program, folder):
+    """A recording in which a semaphore was not created after all."""
+    recording = Recording((folder / f"{CHANGED_BY_HAND}-1.rec").read_bytes())
+    number, place = recording.answer("x_sema_create")
+    recording.words[place] = 0xFFFFFFFF
+    file = folder / "changed-by-hand"
+    file.write_bytes(recording.bytes())
+    ran = subprocess.run([program, "replay", file], capture_output=True, text=True, check=False)
+    # The layer complains of it before it makes the next call that was recorded.
+    expected = rf"departs at event {number + 2} of .*: another call\n  recorded: .*\n  computed: Assert\("
+    ktap.verdict("an answer that was changed by hand", [] if re.match(expected, ran.stdout) else
+                 (ran.stdout + ran.stderr).splitlines() or ["equal"])
+
+
 def checks(ktap, title, console):
     """A verdict for each check that the kernel made behind the scenarios."""
     made = [line.split(" ", 1) for line in console if re.match(r"RIGHT |WRONG .*: ", line)]
@@ -221,11 +276,20 @@ def compare_all(ktap, cache, made, program, shipped):
     ktap.verdict(f"pmx.ko built by the build of {kernel.release}")
     ready = module(kernel, made / "shipped", f"PMX_OBJECT={shipped}")
     ktap.verdict("pmx.ko from the object that ships")
+    recorder = module(kernel, made / "recorded", f"PMX_OBJECT={shipped}", "PMX_RECORDER=y")
+    ktap.verdict("pmx.ko from the object that ships, with the recorder around it")
     commands, expected = prepared(ktap, program)
-    archive = image(kernel, built, commands, made)
-    compare(ktap, "virtual time:", expected, boot(kernel, archive, made / "virtual.log", *VIRTUAL_TIME))
+    archive = image(kernel, built, commands, made / "virtual")
+    of_recorder = image(kernel, recorder, commands, made / "recorder", parameters=RECORDING)
+    with concurrent.futures.ThreadPoolExecutor() as both:
+        console = both.submit(boot, kernel, archive, made / "virtual.log", *VIRTUAL_TIME)
+        recorded = both.submit(boot, kernel, of_recorder, made / "recorded.log", *VIRTUAL_TIME)
+    compare(ktap, "virtual time:", expected, console.result())
+    compare(ktap, "recorded:", expected, recorded.result())
+    replays(ktap, program, expected, recorded.result(), made / "recordings")
+    departs(ktap, program, made / "recordings")
     commands, left_out = in_real_time(commands)
-    archive = image(kernel, ready, commands, made, HERE / "real_time.sh")
+    archive = image(kernel, ready, commands, made / "real", HERE / "real_time.sh")
     console = boot(kernel, archive, made / "real.log")
     compare(ktap, "real time:", {name: expected[name] for name in commands if name in expected}, console)
     for name, reason in left_out.items():

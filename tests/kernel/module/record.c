@@ -32,7 +32,7 @@ struct line
 
 static struct line* lines;
 static atomic_t line_num = ATOMIC_INIT(0);
-static struct dentry* folder;
+static struct dentry *folder, *files[2];
 
 static __printf(2, 0) void add_values(struct line* line, const char* format, va_list values)
 {
@@ -276,6 +276,7 @@ int __real_pmx_power_begin(void);
 int __wrap_pmx_power_begin(void);
 int __wrap_pmx_power_begin(void)
 {
+    struct dentry* found;
     int result;
 
     lines = vzalloc(sizeof(*lines) * MOST_LINES);
@@ -288,9 +289,11 @@ int __wrap_pmx_power_begin(void)
         return result;
     }
     scripts_begin();
-    folder = debugfs_create_dir("pmx", NULL);
-    debugfs_create_file("command", 0200, folder, NULL, &command_file);
-    debugfs_create_file("trace", 0400, folder, NULL, &trace_fops);
+    found = debugfs_lookup("pmx", NULL); /* the recorder's */
+    folder = found ? NULL : debugfs_create_dir("pmx", NULL);
+    files[0] = debugfs_create_file("command", 0200, found ? found : folder, NULL, &command_file);
+    files[1] = debugfs_create_file("trace", 0400, found ? found : folder, NULL, &trace_fops);
+    dput(found);
     return 0;
 }
 
@@ -299,7 +302,9 @@ void __real_pmx_power_end(void);
 void __wrap_pmx_power_end(void);
 void __wrap_pmx_power_end(void)
 {
-    debugfs_remove_recursive(folder);
+    debugfs_remove(files[0]);
+    debugfs_remove(files[1]);
+    debugfs_remove(folder);
     scripts_end();
     __real_pmx_power_end();
 }

@@ -7,6 +7,7 @@ mount -t devtmpfs dev /dev 2>/dev/null
 mount -t debugfs debug /sys/kernel/debug
 dmesg -n 1
 files=/sys/kernel/debug/pmx
+complaints='BUG|WARNING:|Oops|scheduling while atomic|sleeping function|INFO: |UBSAN|ODEBUG|kmemleak: [0-9]+ new'
 
 load()
 {
@@ -52,16 +53,27 @@ scenario()
     echo "END"
 }
 
+# What the kernel's own watchers have found; it is told once.
+complain()
+{
+    dmesg | grep -E "$complaints" | sed 's/^/COMPLAINT /'
+    dmesg -c >/dev/null
+}
+
 echo "BEGIN $(uname -r)"
+for file in /modules/*
+do
+    [ ! -f "$file" ] || insmod "$file" || echo "WRONG insmod $file"
+done
 for file in /scenarios/*
 do
-    scenario "${file##*/}"
+    [ ! -f "$file" ] || scenario "${file##*/}"
 done
 if [ -f /more.sh ]
 then
     # shellcheck source=tests/kernel/real_time.sh
     . /more.sh
 fi
-dmesg | grep -E 'BUG|WARNING:|Oops|scheduling while atomic|sleeping function|INFO: ' | sed 's/^/COMPLAINT /'
+complain
 echo "DONE $(cut -d' ' -f1 /proc/uptime)"
 poweroff -f

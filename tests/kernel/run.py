@@ -32,7 +32,6 @@ sys.path.insert(0, str(HERE.parent / "recorder"))
 from recordings import Recording  # noqa: E402
 
 ROOT = HERE.parents[1]
-CROSS = "arm-linux-gnueabihf-"
 BOOT_SECONDS = 240
 SKIPPED = 77
 # In real time nobody waits longer than this, but once.
@@ -43,7 +42,7 @@ MEMORY_LIMIT = 4 * 1024 * 1024  # KB; the kernel's symbol reader can run away
 # A nanosecond is an instruction, and a sleep costs nothing: the same run every time.
 VIRTUAL_TIME = ["-icount", "shift=0,sleep=off"]
 APPLETS = ("sh", "mount", "cat", "cut", "grep", "sed", "dmesg", "insmod", "rmmod", "ls", "uname", "poweroff", "sleep",
-           "echo", "sync", "gzip", "base64")
+           "echo", "sync", "gzip", "base64", "head")
 # What a scenario does to the record behind the layer's back is recorded, too.
 RECORDING = "watch_all=1"
 CHANGED_BY_HAND = "first-mode-after-boot"
@@ -82,52 +81,67 @@ def run(*command, **how):
     return ran.stdout
 
 
-def module(kernel, folder, *variables):
-    """Builds pmx.ko with recorders, and a module that imports from it."""
+def module(kernel, folder, *variables, sources=HERE / "module"):
+    """Builds pmx.ko with what stands around it: recorders, and a module that imports from it."""
     folder.mkdir(parents=True, exist_ok=True)
     for link in folder.iterdir():
         if link.is_symlink():
             link.unlink()
-    for source in [*(ROOT / "linux").glob("*.[ch]"), *(HERE / "module").iterdir()]:
+    for source in [*(ROOT / "linux").glob("*.[ch]"), *sources.iterdir()]:
         (folder / source.name).symlink_to(source)
-    run("bash", "-c", f'ulimit -v {MEMORY_LIMIT}; exec "$@"', "make", "make", "-s", "-j2", "-C", kernel.headers,
-        f"M={folder}", f"PMX={ROOT}", "ARCH=arm", f"CROSS_COMPILE={CROSS}", *variables, "modules")
-    if ".init_array" in run(f"{CROSS}readelf", "-SW", folder / "pmx.ko"):
-        raise Failed("pmx.ko has static constructors, which a kernel does not run")
+    machine = kernel.machine
+    said = run("bash", "-c", f'ulimit -v {MEMORY_LIMIT}; exec "$@" 2>&1', "make", "make", "-s", "-j2", "-C",
+               kernel.headers, f"M={folder}", f"PMX={ROOT}", f"ARCH={machine.arch}", f"CROSS_COMPILE={machine.cross}",
+               *variables, "modules")
+    if "objtool:" in said:
+        raise Failed(f"the kernel's own look at the code finds:\n{said}")
+    # A kernel that watches memory runs constructors, which tell it of each global object.
+    settings = (kernel.headers / "include/config/auto.conf").read_text(encoding="utf-8")
+    for made in folder.glob("*.ko") if "CONFIG_CONSTRUCTORS=y" not in settings else ():
+        if ".init_array" in run(f"{machine.cross}readelf", "-SW", made):
+            raise Failed(f"{made.name} has static constructors, which a kernel does not run")
     return folder
 
 
-def image(kernel, modules, commands, made, more=None, parameters=""):
-    """The archive that the kernel boots from. The parameters are the module's, in scenarios."""
+def image(kernel, modules, commands, made, more=None, parameters="", peers=()):
+    """The archive that the kernel boots from. The parameters are the module's, in scenarios; the peers are modules of that
+    kernel, which are loaded first."""
     root = made / "root"
     shutil.rmtree(root, ignore_errors=True)
-    for name in ("bin", "proc", "sys", "dev", "scenarios"):
+    for name in ("bin", "proc", "sys", "dev", "scenarios", "modules"):
         (root / name).mkdir(parents=True)
     shutil.copy(kernel.busybox, root / "bin/busybox")
     for applet in APPLETS:
         (root / "bin" / applet).symlink_to("busybox")
     shutil.copy(HERE / "init.sh", root / "init")
     (root / "init").chmod(0o755)
-    for name in ("pmx.ko", "pmx_user.ko"):
-        run(f"{CROSS}strip", "--strip-debug", "-o", root / name, modules / name)
+    for number, name in enumerate([*(kernel.machine.modules if kernel.ships else ()), *peers]):
+        shutil.copy(kernel.module(name), root / f"modules/{number}-{pathlib.PurePath(name).name}")
+    for path in modules.glob("*.ko"):
+        run(f"{kernel.machine.cross}strip", "--strip-debug", "-o", root / path.name, path)
     for name, lines in commands.items():
         (root / "scenarios" / name).write_text("".join(line + "\n" for line in lines), encoding="utf-8")
     (root / "parameters").write_text(parameters, encoding="utf-8")
     if more:
         shutil.copy(more, root / "more.sh")
+    return packed(root, made)
+
+
+def packed(root, made):
     archive = made / "root.cpio.gz"
     run("bash", "-c", 'set -o pipefail; find . | cpio -o -H newc --quiet | gzip -1 >"$0"', archive, cwd=root)
     return archive
 
 
-def boot(kernel, archive, console, *options):
-    """What the kernel's console showed."""
+def boot(kernel, archive, console, *options, words="", memory=256):
+    """What the kernel's console showed. The words are for its command line."""
+    machine = kernel.machine
     with console.open("wb") as shown:
         try:
-            subprocess.run(["qemu-system-arm", "-M", "virt,highmem=off", "-cpu", "cortex-a15", "-m", "256",
-                            "-nographic", "-no-reboot", "-nic", "none", "-kernel", kernel.image, "-initrd", archive,
-                            "-append", "console=ttyAMA0 panic=-1", *options], stdin=subprocess.DEVNULL, stdout=shown,
-                           stderr=subprocess.STDOUT, timeout=BOOT_SECONDS, check=False)
+            subprocess.run([*machine.emulator, "-m", str(memory), "-nographic", "-no-reboot", "-nic", "none", "-kernel",
+                            kernel.image, "-initrd", archive, "-append",
+                            f"console={machine.console} panic=-1 {words}".strip(), *options], stdin=subprocess.DEVNULL,
+                           stdout=shown, stderr=subprocess.STDOUT, timeout=BOOT_SECONDS, check=False)
         except subprocess.TimeoutExpired:
             pass  # told by what is missing
     return console.read_text(encoding="utf-8", errors="replace").replace("\r", "").splitlines()
@@ -227,13 +241,13 @@ def departs(ktap, program, folder):
                  (ran.stdout + ran.stderr).splitlines() or ["equal"])
 
 
-def checks(ktap, title, console):
+def checks(ktap, title, console, number=CHECKS):
     """A verdict for each check that the kernel made behind the scenarios."""
     made = [line.split(" ", 1) for line in console if re.match(r"RIGHT |WRONG .*: ", line)]
     for verdict, what in made:
         ktap.verdict(f"{title} {what.partition(': ')[0]}", [what] if verdict == "WRONG" else [])
-    if len(made) < CHECKS:
-        ktap.verdict(f"{title} {CHECKS} checks", [f"only {len(made)} were made"])
+    if len(made) < number:
+        ktap.verdict(f"{title} {number} checks", [f"only {len(made)} were made"])
 
 
 def in_real_time(commands):
@@ -297,13 +311,14 @@ def compare_all(ktap, cache, made, program, shipped):
     checks(ktap, "real time:", console)
 
 
-def main():
-    paths = [pathlib.Path(word).resolve() for word in sys.argv[1:]]
+def carried_out(work, words):
+    """Runs that with a verdict for whatever it finds; how the program ends."""
+    paths = [pathlib.Path(word).resolve() for word in words]
     began, skipped = time.monotonic(), False
     ktap = Ktap()
     try:
         check_path(ROOT, *paths)
-        compare_all(ktap, *paths)
+        work(ktap, *paths)
     except debian.Unavailable as reason:
         ktap.skip("kernel", str(reason).replace("\n", " "))
         skipped = True
@@ -315,4 +330,4 @@ def main():
 
 
 if __name__ == "__main__":
-    sys.exit(main())
+    sys.exit(carried_out(compare_all, sys.argv[1:]))

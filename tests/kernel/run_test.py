@@ -154,7 +154,7 @@ class Kernel(unittest.TestCase):
         with tempfile.TemporaryDirectory() as directory:
             folder = pathlib.Path(directory).resolve()
             fetched, fetch = [], debian._fetch
-            debian._fetch = lambda place: fetched.append(place) or "1.2-x"
+            debian._fetch = lambda place, *_: fetched.append(place) or "1.2-x"
             self.addCleanup(setattr, debian, "_fetch", fetch)
             self.assertEqual("1.2-x", debian.kernel(folder).release)
             self.assertEqual("1.2-x", debian.kernel(folder).release)
@@ -162,6 +162,14 @@ class Kernel(unittest.TestCase):
             (folder / debian.USABLE).write_text("/elsewhere\n1.2-x\n", encoding="utf-8")
             debian.kernel(folder)
             self.assertEqual([folder, folder], fetched)
+            self.assertEqual("1.2-x", debian.kernel(folder, newest=True).release)
+            self.assertEqual([folder] * 3, fetched)
+
+    def test_backports_go_with_the_release_that_the_machine_has(self):
+        self.assertEqual(("http://mirror/debian", "bookworm-backports"), debian.backports_of(
+            "http://other/ stable Other\nhttp://mirror/debian bookworm-updates Debian\n"
+            "http://mirror/debian bookworm Debian\nhttp://second/debian trixie Debian\n"))
+        self.assertIsNone(debian.backports_of("http://other/ stable Other\n"))
 
     def test_folders_that_the_kernels_build_cannot_use(self):
         for name in ("a b", "a:b", "a$b", "a'b", "a#b"):

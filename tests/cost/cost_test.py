@@ -172,6 +172,7 @@ def card():
     return {"compilers": {"host": "g++ 12", "target": "arm 12"},
             "totals": {"code": 1000, "texts": 500, "tables": 100, "ram": 50, "heap": 0},
             "kernel": {"code": 1300, "texts": 500, "tables": 100, "ram": 50, "unwind": 200},
+            "in_kernel": {"kernel": "6.1", "mode": 900, "frequency": 1000, "again": 700},
             "files": {"pmx_a": {"code": 1000, "texts": 500, "tables": 100, "ram": 50}},
             "functions": {"PMX_A": function},
             "tables": {"T": 100}, "ram": {"_arPmxConf": 40, "x": 10}, "repeated": [], "indirect": [],
@@ -257,7 +258,8 @@ class Check(unittest.TestCase):
 class Goals(unittest.TestCase):
     LIST = {"size": {"code": 1000, "tables": 100, "frame": 16, "stack": 100, "ram": 10},
             "price": {"any": 40, "loop": 60, "own": {}}, "loops": {"operations": []}, "stack": {"apart": []},
-            "recorder": {"call": 120, "change": 1000}}
+            "recorder": {"call": 120, "change": 1000},
+            "in_kernel": {"mode": 900, "frequency": 1000, "again": 700}}
 
     def complaints(self, explained=(), **changes):
         now = copy.deepcopy(card())
@@ -265,7 +267,9 @@ class Goals(unittest.TestCase):
         now["paths"][0].update({name: value for name, value in changes.items() if name == "layer"})
         now["repeated"] = changes.get("repeated", [])
         now["recorder"].update({name: value for name, value in changes.items() if name in ("call", "change")})
-        every = [*goals.of_sizes(self.LIST, now), *goals.of_prices(self.LIST, now), *goals.of_recorder(self.LIST, now)]
+        now["in_kernel"].update({name: value for name, value in changes.items() if name in now["in_kernel"]})
+        every = [*goals.of_sizes(self.LIST, now), *goals.of_prices(self.LIST, now), *goals.of_kernel(self.LIST, now),
+                 *goals.of_recorder(self.LIST, now)]
         return list(goals.complaints(every, [{"goals": list(explained), "because": "so"}] if explained else []))
 
     def test_met_goals_need_no_explanation(self):
@@ -280,6 +284,9 @@ class Goals(unittest.TestCase):
         self.assertEqual(1, len(self.complaints(repeated=["twice"])))
         self.assertEqual(1, len(self.complaints(call=121)))
         self.assertEqual([], self.complaints(["recorded change"], change=1001))
+        for name in ("mode", "frequency", "again"):
+            self.assertEqual(1, len(self.complaints(**{name: 1001})))
+            self.assertEqual([], self.complaints([f"kernel_{name}"], **{name: 1001}))
 
     def test_a_stale_explanation_and_one_of_nothing_are_refused(self):
         self.assertRegex(self.complaints(["code"])[0], "its explanation is stale")

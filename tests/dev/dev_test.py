@@ -162,6 +162,11 @@ class Caches(TreeTest):
         self.assertTrue((self.tree / ".cache/kernel").is_dir())
         self.expect(2, "kernel does not take: x", "kernel", "x")
 
+    def test_each_way_of_the_kernel_has_its_program(self):
+        for option, program in (("--cost", "cost_kernel"),):
+            self.expect(0, f"{program} {self.tree}/.cache/kernel {self.tree}/build/kernel ", "kernel", option)
+            self.expect(2, f"kernel {option} does not take: x", "kernel", option, "x")
+
     def test_the_users_own_is_used(self):
         self.expect(0, "cache /elsewhere", "run", CCACHE_DIR="/elsewhere")
         self.expect(0, "cache none", "run", CCACHE_CONFIGPATH="/elsewhere/ccache.conf")

@@ -11,6 +11,7 @@ import unittest
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 NOBODY = 65534
+KERNEL_PROGRAMS = ("run", "cost_kernel")
 
 # Each notes its call. The cmake notes as well when two builds of one folder meet.
 PROGRAMS = {
@@ -90,10 +91,11 @@ class TreeTest(unittest.TestCase):
             shutil.copy2(ROOT / file, tree)
         (tree / "CMakeLists.txt").write_text("cmake_minimum_required(VERSION 3.25)\n", encoding="utf-8")
         (tree / "CMakePresets.json").write_text("{}\n", encoding="utf-8")
-        kernel = tree / "tests/kernel/run.py"
-        kernel.parent.mkdir(parents=True)
-        kernel.write_text('#!/bin/bash\necho "kernel $*"\n', encoding="utf-8")
-        kernel.chmod(0o755)
+        (tree / "tests/kernel").mkdir(parents=True)
+        for name in KERNEL_PROGRAMS:
+            kernel = tree / f"tests/kernel/{name}.py"
+            kernel.write_text(f'#!/bin/bash\necho "{name.replace("run", "kernel")} $*"\n', encoding="utf-8")
+            kernel.chmod(0o755)
         return tree
 
     def environment(self, **more):

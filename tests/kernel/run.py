@@ -104,8 +104,8 @@ def module(kernel, folder, *variables, sources=HERE / "module"):
 
 
 def image(kernel, modules, commands, made, more=None, parameters="", peers=()):
-    """The archive that the kernel boots from. The parameters are the module's, in scenarios; the peers are modules of that
-    kernel, which are loaded first."""
+    """The archive that the kernel boots from. The parameters are the module's, in scenarios; the peers are modules of
+    that kernel, which are loaded first."""
     root = made / "root"
     shutil.rmtree(root, ignore_errors=True)
     for name in ("bin", "proc", "sys", "dev", "scenarios", "modules"):

@@ -15,7 +15,8 @@ def main():
     cmake, directory, preset, *target = sys.argv[1:]
     if not pathlib.Path(directory, "build.ninja").exists():
         sys.exit(f"{directory}: is not there: ./dev build {preset} makes it, and ./dev test too")
-    result = subprocess.run([cmake, "--build", directory, "-j", "2", *(["--target", *target] if target else [])], capture_output=True, text=True, check=False)
+    command = [cmake, "--build", directory, "-j", "2", *(["--target", *target] if target else [])]
+    result = subprocess.run(command, capture_output=True, text=True, check=False)
     if result.returncode != 0:
         sys.exit(f"{directory} cannot be built:\n{result.stdout}{result.stderr}")
     print(f"{directory}: up to date")

@@ -41,13 +41,18 @@ DATA = ROOT / "docs" / "cost.json"
 README = ROOT / "README.md"  # shows the five figures
 
 
+def on_card():
+    return json.loads(DATA.read_text(encoding="utf-8"))
+
+
 def measure(build, tree, made):
-    """The card of the layer of a tree."""
+    """The card of the layer of a tree. What takes a kernel is measured by ./dev kernel --cost, and kept."""
     board = instructions.Board(build)
     listed = path_list.read((TOOL / "paths.txt").read_text(encoding="utf-8"), signatures.operations(), board.examples)
     counts = instructions.count(listed, board, tree, made / "host")
     return cards.make(listed, counts, arm.measure(tree, made / "target"),
-                      recorded.measure(tree, made / "target" / "recorder"))
+                      recorded.measure(tree, made / "target" / "recorder"),
+                      on_card()["in_kernel"])
 
 
 def goals_and_explanations():
@@ -57,14 +62,26 @@ def goals_and_explanations():
 def goal_complaints(card):
     goals, explanations = goals_and_explanations()
     every_goal = [*goal_list.of_sizes(goals, card), *goal_list.of_prices(goals, card),
-                  *goal_list.of_recorder(goals, card)]
+                  *goal_list.of_recorder(goals, card), *goal_list.of_kernel(goals, card)]
     return list(goal_list.complaints(every_goal, explanations))
 
 
-def write_card(card):
+def write_files(card):
     goals, explanations = goals_and_explanations()
     whole_file.write(DATA, cards.as_json(card))
     whole_file.write(DOCUMENT, cards.render(card, goals, explanations))
+    return goals
+
+
+def take(in_kernel):
+    """Puts what was measured in a kernel on the card; the goals and explanations that do not go with it."""
+    card = {**on_card(), "in_kernel": in_kernel}
+    write_files(card)
+    return goal_complaints(card)
+
+
+def write_card(card):
+    goals = write_files(card)
     for name, value, text in cards.five_figures(card, goals):
         print(f"{name}: {value} ({text.replace('`', '')})")
     return goal_complaints(card)
@@ -72,7 +89,7 @@ def write_card(card):
 
 def check_card(card):
     """Everything that is wrong with the committed card."""
-    old = json.loads(DATA.read_text(encoding="utf-8"))
+    old = on_card()
     goals, explanations = goals_and_explanations()
     if missing := list(check.operations(old, signatures.places())):
         return missing

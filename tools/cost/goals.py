@@ -4,6 +4,8 @@
 import dataclasses
 import tomllib
 
+# The paths of a mode change that are measured in a kernel.
+CHANGES = {"mode": "another mode", "frequency": "another mode and frequency", "again": "the same again"}
 RECORD = ("_arPmxConf", "_arPmxDispPartStatus")
 
 
@@ -62,6 +64,12 @@ def of_recorder(goals, card):
     return [Goal("recorded call", f"a call, on average of the {found['calls']} of that change", limits["call"],
                  found["call"]),
             Goal("recorded change", "the dearest mode change", limits["change"], found["change"])]
+
+
+def of_kernel(goals, card):
+    """The goals for a mode change in a kernel."""
+    return [Goal(f"kernel_{name}", text, goals["in_kernel"][name], card["in_kernel"][name])
+            for name, text in CHANGES.items()]
 
 
 def complaints(every_goal, explanations):

@@ -19,6 +19,7 @@ sys.dont_write_bytecode = True
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 
 import debian  # noqa: E402
+import machines  # noqa: E402
 import recorders  # noqa: E402
 import run  # noqa: E402
 import scenarios  # noqa: E402
@@ -170,6 +171,19 @@ class Kernel(unittest.TestCase):
             "http://other/ stable Other\nhttp://mirror/debian bookworm-updates Debian\n"
             "http://mirror/debian bookworm Debian\nhttp://second/debian trixie Debian\n"))
         self.assertIsNone(debian.backports_of("http://other/ stable Other\n"))
+
+    def test_what_the_kernels_build_finds_in_the_code_is_an_error(self):
+        with tempfile.TemporaryDirectory() as directory:
+            folder = pathlib.Path(directory).resolve()
+            settings = folder / "include/config/auto.conf"
+            settings.parent.mkdir(parents=True)
+            settings.write_text("CONFIG_X=y\n", encoding="utf-8")
+            kernel = debian.Kernel(folder, "1.2-x", machines.PC)
+            kernel.headers = folder
+            for line, refused in (("x.o: warning: objtool: f() falls through", True), ("CC x.o", False)):
+                (folder / "Makefile").write_text(f"modules:\n\t@echo '{line}' >&2\n", encoding="utf-8")
+                with self.subTest(line), self.assertRaises(run.Failed) if refused else contextlib.nullcontext():
+                    run.module(kernel, folder / "made")
 
     def test_folders_that_the_kernels_build_cannot_use(self):
         for name in ("a b", "a:b", "a$b", "a'b", "a#b"):

@@ -113,16 +113,17 @@ INT32 x_sema_create(HANDLE_T* phSema, X_SEMA_TYPE_T eType, UINT32 u4InitValue)
     return keep(object, phSema);
 }
 
-/* Whoever holds the mutex and wants it again would wait for itself: that is refused, and the layer reports it. */
+/* Whoever holds the mutex and wants it again would wait for itself: that is refused, and the layer reports it. The
+ * holder is looked at without the mutex: a thread finds itself there only when it has stored that itself. */
 static INT32 lock_mutex(struct object* object, X_SEMA_OPTION_T eOption)
 {
-    if (object->holder == current)
+    if (READ_ONCE(object->holder) == current)
         return REFUSED;
     if (eOption != X_SEMA_OPTION_NOWAIT)
         mutex_lock(&object->mutex);
     else if (!mutex_trylock(&object->mutex))
         return REFUSED;
-    object->holder = current;
+    WRITE_ONCE(object->holder, current);
     return OSR_OK;
 }
 
@@ -148,9 +149,9 @@ INT32 x_sema_unlock(HANDLE_T hSema)
         return REFUSED;
     if (object->kind == OBJECT_MUTEX)
     {
-        if (object->holder != current)
+        if (READ_ONCE(object->holder) != current)
             return REFUSED;
-        object->holder = NULL;
+        WRITE_ONCE(object->holder, NULL);
         mutex_unlock(&object->mutex);
         return OSR_OK;
     }

@@ -24,10 +24,11 @@ HEAD = """// SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* Stand-ins for the neighbouring drivers, written from their headers. */
 """
 
-# What the drivers remember; only what something asks for again.
+# What the drivers remember; only what something asks for again. It is volatile as registers are: the timer's context
+# mixes planes, too.
 MEMORY = {
-    "mixed": "static UINT8 mixed[8] = { 1, 1, 1, 1, 1, 1, 1, 1 };",
-    "selectors": "static UINT8 selectors[8] = { 0, 1, 2, 3, 4, 5, 6, 7 };",
+    "mixed": "static volatile UINT8 mixed[8] = { 1, 1, 1, 1, 1, 1, 1, 1 };",
+    "selectors": "static volatile UINT8 selectors[8] = { 0, 1, 2, 3, 4, 5, 6, 7 };",
 }
 ANSWERS = {
     "TVE_SetFmtEx": "return u4Tve <= TVE_2 ? TVE_SET_OK : 0;",
@@ -72,7 +73,7 @@ prQuery->u2ValidAutoVfreq = prQuery->u2VsyncFreq;
 return TRUE;""",
 }
 for pair in ("1_2", "3_4", "6_7", "4_7", "1_3", "5_8"):
-    MEMORY[f"swapped_{pair}"] = f"static BOOL swapped_{pair};"
+    MEMORY[f"swapped_{pair}"] = f"static volatile BOOL swapped_{pair};"
     ANSWERS[f"PMX_HalSwapPlane{pair}"] = f"if (ucPmxId == 0)\n    swapped_{pair} = u4Swap != 0;"
     ANSWERS[f"fgPmxHalSwapPlane{pair}"] = f"return ucPmxId == 0 && swapped_{pair};"
 

@@ -30,6 +30,8 @@ g++-linux   # why
 gcovr
 [kernel]
 qemu
+[own]
+flex
 [drawing]
 graphviz
 """
@@ -46,6 +48,8 @@ class Packages(TreeTest):
                                   (("build", "arm-linux"), "python3 cmake libx-dev g++-linux"),
                                   (("run",), "python3 cmake libx-dev g++"),
                                   (("kernel",), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu"),
+                                  (("kernel", "--cost"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu"),
+                                  (("kernel", "--all"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu flex"),
                                   (("docs",), ""),
                                   (("clean",), ""),
                                   (("help",), ""),

@@ -112,17 +112,17 @@ bool is_accepted(const std::string& command, const Json& json)
 }
 
 /** Carry something out in a copy that the twin is led into. Throws StepFailed when it cannot be. */
-Apart run_with_twin(Session& session, const std::function<Json()>& function)
+Apart run_with_twin(Session& session, const std::function<Json(std::ostream& shown)>& function)
 {
     session.output().flush();
     find_twin();
-    Apart apart = run_apart([&](std::ostream&) {
+    Apart apart = run_apart([&](std::ostream& shown) {
         try
         {
             lead_in_twin();
             board::at_every_call({}); // nobody stops there
             session.watch_stores(session.watches_stores());
-            return board::written(function());
+            return board::written(function(shown));
         }
         catch (const std::exception& error)
         {
@@ -146,12 +146,13 @@ bool nothing_has_changed(std::size_t entries)
                        [](const board::TraceEntry& entry) { return entry.kind == board::TraceEntry::Kind::Log; });
 }
 
-/** Try requests, from one on, as long as they are refused and leave everything as it was: the place behind the last
- *  that was tried, and whether that was accepted. In a copy of its own. */
+/** Try requests in a copy, from the first on, as long as they are refused and leave everything as it was: how many were
+ *  tried, and whether the last of them was accepted. */
 std::pair<std::size_t, bool> try_some(Session& session, const std::string& command,
-                                      std::span<const Requests::value_type> near)
+                                      std::span<const Requests::value_type> near,
+                                      std::chrono::steady_clock::time_point end)
 {
-    const Apart apart = run_apart([&](std::ostream& begun) {
+    const Apart apart = run_with_twin(session, [&](std::ostream& begun) {
         record_view::watch_stores(true);
         bool is_good = false;
         for (const auto& request : near)
@@ -159,35 +160,28 @@ std::pair<std::size_t, bool> try_some(Session& session, const std::string& comma
             begun << '.';
             const std::size_t entries = board::trace::entries().size();
             is_good = is_accepted(command, carried_out(session, request));
-            if (is_good || !nothing_has_changed(entries))
+            if (is_good || !nothing_has_changed(entries) || std::chrono::steady_clock::now() >= end)
                 break;
         }
-        return std::string(is_good ? "accepted" : "refused");
+        return Json(is_good);
     });
-    return { std::max<std::size_t>(apart.shown.size(), 1), apart.death.empty() && apart.answer == "accepted" };
+    return { std::max<std::size_t>(apart.shown.size(), 1), apart.death.empty() && apart.answer == "true" };
 }
 
 /** The first of the requests near one that was refused that is accepted; empty when none is. */
 std::vector<std::string> first_accepted(Session& session, const Explanation& refused, const Search& search)
 {
     const Requests near = search.tries == 0 ? Requests() : requests_near(refused);
-    if (near.empty())
-        return {};
-    const Apart apart = run_with_twin(session, [&] {
-        const auto end = std::chrono::steady_clock::now() + search.time;
-        const auto all = std::span(near).first(std::min(near.size(), search.tries));
-        for (std::size_t next = 0; next < all.size() && std::chrono::steady_clock::now() < end;)
-        {
-            const auto [tried, is_good] = try_some(session, refused.command, all.subspan(next));
-            next += tried;
-            if (is_good)
-                return Json(all[next - 1]);
-        }
-        return Json::array();
-    });
-    if (!apart.death.empty() || apart.answer.empty())
-        throw StepFailed("the copy in which other requests were to be tried ended: " + apart.death);
-    return Json::parse(apart.answer).get<std::vector<std::string>>();
+    const auto end = std::chrono::steady_clock::now() + search.time;
+    const auto all = std::span(near).first(std::min(near.size(), search.tries));
+    for (std::size_t next = 0; next < all.size() && std::chrono::steady_clock::now() < end;)
+    {
+        const auto [tried, is_good] = try_some(session, refused.command, all.subspan(next), end);
+        next += tried;
+        if (is_good)
+            return all[next - 1];
+    }
+    return {};
 }
 
 std::string line_of(const std::string& begin, const std::string& text, const Look& look)
@@ -224,7 +218,8 @@ Explanation explain(Session& session, const std::string& command, const Search& 
 {
     if (const auto waiting = board::threads::waiting(); !waiting.empty())
         throw StepFailed("explain copies the process, and a thread that waits cannot be copied: " + waiting.front());
-    const Json answer = told_by(run_with_twin(session, [&] { return carried_out(session, std::vector{ command }); }));
+    const Json answer =
+        told_by(run_with_twin(session, [&](std::ostream&) { return carried_out(session, std::vector{ command }); }));
     if (answer.at("kind") == "wrong line")
         throw LineError(answer.at("message").get<std::string>());
     Explanation explanation = unpacked(command, answer);

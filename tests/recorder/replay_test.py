@@ -21,6 +21,12 @@ from recordings import (CALL, HEAD, HEADER_WORDS, OPERATION, RING_WORDS, SNAPSHO
                         interface)
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
+# What no scenario can say.
+NO_SCENARIO = {
+    "connect-while-informing": "a thread of its own that waits for the mutex within a call",
+    "plane-connects-back": "an operation within pu4SetColorMode, which is no function that a line can name",
+    "second-source-while-announcing": "a thread of its own that waits for the mutex within a call",
+}
 MODE_CHANGE = "PMX_Init\nPMX_SetMode 0 RES_720P50HZ 50 0\nPMX_SetMode 0 RES_480P 60 0\n"
 
 
@@ -55,6 +61,29 @@ class Replay(unittest.TestCase):
             ended = self.run_tool("replay", self.file)
             self.assertEqual(0, ended.returncode, f"{scenario.name}: {ended.stdout}{ended.stderr}")
             self.assertRegex(ended.stdout, r"^equal: [1-9]\d* operations, [1-9]\d* calls\n$", scenario.name)
+
+    def test_every_scenario_becomes_one_that_plays_the_same(self):
+        converted = 0
+        for scenario in sorted((ROOT / "scenarios").glob("*.pmx")):
+            self.assertEqual(0, self.run_tool("record", self.file, scenario).returncode, scenario.name)
+            ended = self.run_tool("replay", "--to-scenario", self.file)
+            if scenario.stem in NO_SCENARIO:
+                self.assertEqual(1, ended.returncode, f"{scenario.stem}: why is it an exception?")
+                self.assertRegex(ended.stdout, r"\n# missing: .*\n$", scenario.name)
+                continue
+            self.assertEqual(0, ended.returncode, f"{scenario.name}: {ended.stdout[-300:]}{ended.stderr}")
+            written = self.place / "written.pmx"
+            written.write_text(ended.stdout, encoding="utf-8")
+            ended = self.run_tool("run", "--quiet", written)
+            self.assertEqual((0, ""), (ended.returncode, ended.stderr), scenario.name)
+            converted += 1
+        self.assertGreater(converted, 40)
+
+    def test_a_scenario_says_what_was_answered(self):
+        self.record("sink unplug\nfault x_sema_create 0 phSema=77\nPMX_Init\nexpect misuses 0\n")
+        ended = self.run_tool("replay", "--to-scenario", self.file)
+        self.assertEqual(0, ended.returncode, ended.stdout)
+        self.assertIn("\nfault x_sema_create 0 on 1 phSema=77\nPMX_Init\n", ended.stdout)
 
     def test_what_neighbours_do_meanwhile(self):
         self.record("PMX_Init\nmeanwhile PMX_HalSetMode poke ucBrightness 7\nPMX_SetMode 0 RES_720P50HZ 50 0\n"

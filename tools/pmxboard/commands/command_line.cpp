@@ -255,6 +255,7 @@ void add_replay(CLI::App& app, Chosen& chosen)
     sub->add_option("FILE", replay->file, "A recording, or a memory dump with one; - reads the standard input")
         ->required();
     sub->add_flag("--show", replay->show, "Show what was recorded, and replay nothing");
+    sub->add_flag("--to-scenario", replay->to_scenario, "Print a scenario that plays the same on the board");
     sub->add_flag("-q,--quiet", replay->quiet, "Show departures only");
     sub->footer(replay_examples);
     sub->callback([replay, &chosen] { chosen = [replay] { return replay_file(*replay); }; });

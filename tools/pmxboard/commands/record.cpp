@@ -6,6 +6,7 @@
 #include "board/board.h"
 #include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
+#include "tools/pmxboard/commands/play.h"
 #include "tools/pmxboard/decode/texts.h"
 #include "tools/pmxboard/files/new_file.h"
 #include "tools/pmxboard/language/runner.h"
@@ -74,12 +75,20 @@ catch (const std::runtime_error& error) // a file or a board that cannot be used
 int replay_file(const ReplayOptions& options)
 try
 {
+    if (options.to_scenario)
+        board::load_description("default");
     const Recording recording = read_recording(board::files::read_named(options.file));
     const TextNames texts = layer_texts();
     if (options.show)
     {
         show_events(std::cout, recording, texts);
         return exit_done;
+    }
+    if (options.to_scenario)
+    {
+        const PlayedScenario scenario = scenario_of(recording, options.file);
+        std::cout << scenario.lines;
+        return scenario.plays_the_same ? exit_done : exit_failed;
     }
     return show_verdict(recording, replay(recording, texts), options.quiet);
 }

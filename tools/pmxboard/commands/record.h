@@ -25,6 +25,7 @@ struct ReplayOptions
     std::string file;
     bool quiet = false;
     bool show = false;
+    bool to_scenario = false;
 };
 
 /** The exit code. */

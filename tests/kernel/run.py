@@ -45,7 +45,7 @@ APPLETS = ("sh", "mount", "cat", "cut", "grep", "sed", "dmesg", "insmod", "rmmod
            "echo", "sync", "gzip", "base64", "head")
 # What a scenario does to the record behind the layer's back is recorded, too.
 RECORDING = "watch_all=1"
-CHANGED_BY_HAND = "first-mode-after-boot"
+TAKEN = "first-mode-after-boot"
 
 
 class Failed(Exception):
@@ -229,7 +229,7 @@ def replays(ktap, program, expected, console, folder):
 
 def departs(ktap, program, folder):
     """A recording in which a semaphore was not created after all."""
-    recording = Recording((folder / f"{CHANGED_BY_HAND}-1.rec").read_bytes())
+    recording = Recording((folder / f"{TAKEN}-1.rec").read_bytes())
     number, place = recording.answer("x_sema_create")
     recording.words[place] = 0xFFFFFFFF
     file = folder / "changed-by-hand"
@@ -239,6 +239,19 @@ def departs(ktap, program, folder):
     expected = rf"departs at event {number + 2} of .*: another call\n  recorded: .*\n  computed: Assert\("
     ktap.verdict("an answer that was changed by hand", [] if re.match(expected, ran.stdout) else
                  (ran.stdout + ran.stderr).splitlines() or ["equal"])
+
+
+def becomes_scenario(ktap, program, folder):
+    """A recording of the kernel as a scenario for the board, which passes."""
+    file = folder / "written.pmx"
+    ran = subprocess.run([program, "replay", "--to-scenario", folder / f"{TAKEN}-1.rec"],
+                         capture_output=True, text=True, check=False)
+    file.write_text(ran.stdout, encoding="utf-8")
+    wrong = (ran.stdout[-500:] + ran.stderr).splitlines() if ran.returncode else []
+    if not wrong:
+        ran = subprocess.run([program, "run", "--quiet", file], capture_output=True, text=True, check=False)
+        wrong = (ran.stdout + ran.stderr + (f"it ended with {ran.returncode}" if ran.returncode else "")).splitlines()
+    ktap.verdict("a recording that becomes a scenario", wrong)
 
 
 def checks(ktap, title, console, number=CHECKS):
@@ -302,6 +315,7 @@ def compare_all(ktap, cache, made, program, shipped):
     compare(ktap, "recorded:", expected, recorded.result())
     replays(ktap, program, expected, recorded.result(), made / "recordings")
     departs(ktap, program, made / "recordings")
+    becomes_scenario(ktap, program, made / "recordings")
     commands, left_out = in_real_time(commands)
     archive = image(kernel, ready, commands, made / "real", HERE / "real_time.sh")
     console = boot(kernel, archive, made / "real.log")

@@ -8,6 +8,10 @@ list(TRANSFORM directories APPEND /)   # what is in them, not they themselves
 install(DIRECTORY ${directories} DESTINATION include/pmx)
 install(FILES ${PROJECT_BINARY_DIR}/pmx_if.o DESTINATION lib/pmx)
 install(FILES ${PMX_VERSION_DIRECTORY}/pmx_version.h DESTINATION include/pmx)
+# The flight recorder: around that object, and as sources for another compiler.
+install(FILES ${PROJECT_BINARY_DIR}/pmx_if_recorded.o DESTINATION lib/pmx)
+install(FILES recorder/pmx_recorder.h DESTINATION include/pmx)
+install(FILES recorder/ring.h recorder/encoding.h ${PROJECT_BINARY_DIR}/recorder/shim.c DESTINATION share/pmx/recorder)
 install(FILES cmake/pmxConfig.cmake ${PROJECT_BINARY_DIR}/pmxConfigVersion.cmake DESTINATION lib/cmake/pmx)
 foreach(name pmx pmx-board)
     configure_file(cmake/${name}.pc.in ${name}.pc @ONLY)

@@ -1,10 +1,12 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
-// Any bytes are a recording: what can be read is replayed, twice.
+// Any bytes are a recording: what can be read is shown, read as steps, and replayed, twice.
 #include <cstddef>
 #include <cstdint>
 #include <cstdlib>
+#include <sstream>
 
 #include "fuzz/support/holds.h"
+#include "tools/pmxboard/commands/play_steps.h"
 #include "tools/pmxboard/recording/replay.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
@@ -13,6 +15,13 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     try
     {
         const Recording recording = read_recording({ reinterpret_cast<const char*>(data), size });
+        for (const EventForm form : { EventForm::Text, EventForm::Json, EventForm::Chrome })
+        {
+            std::ostringstream shown;
+            show_events(shown, recording, {}, form);
+        }
+        if (recorded_steps(recording).steps.size() > 2 * recording.events.size())
+            std::abort(); // each event begins and ends at most
         const ReplayVerdict verdict = replay(recording);
         if (verdict.events > recording.events.size())
             std::abort(); // more than there is

@@ -6,6 +6,7 @@ of a ring that has run over, and damaged.
 usage: replay_test.py PROGRAM PRODUCT
 """
 
+import json
 import pathlib
 import random
 import signal
@@ -147,6 +148,21 @@ class Replay(unittest.TestCase):
                 self.assertEqual(3 + count, recording.words[place] & 0xFF, functions[number].name)
                 most = max(most, count if count <= 3 else 0)
         self.assertEqual(3, most)
+
+    def test_what_was_recorded_is_told_to_programs(self):
+        recording = self.record("PMX_Init\nPMX_GetMode 0\n")
+        told = [json.loads(line) for line in self.run_tool("replay", "--json", self.file).stdout.splitlines()]
+        self.assertEqual(len(list(recording.events())), len(told))
+        self.assertEqual(list(range(1, len(told) + 1)), [one["event"] for one in told])
+        self.assertEqual({"event": len(told), "time_us": told[-1]["time_us"], "thread": 0, "depth": 0,
+                          "kind": "operation", "function": "PMX_GetMode", "answer": 1,
+                          "text": "PMX_GetMode(0, [A5]) = 1"}, told[-1])
+        trace = json.loads(self.run_tool("replay", "--chrome", self.file).stdout)["traceEvents"]
+        self.assertEqual(len(told), len(trace))
+        phases = [event["ph"] for event in trace]
+        self.assertEqual(phases.count("B"), phases.count("E"))
+        self.assertEqual(("B", "PMX_Init"), next((event["ph"], event["name"]) for event in trace
+                                                 if event["name"].startswith("PMX_")))
 
     def test_a_ring_that_has_run_over(self):
         recording = self.record("PMX_Init\n" + 60 * MODE_CHANGE.removeprefix("PMX_Init\n"), "--size", "32768")

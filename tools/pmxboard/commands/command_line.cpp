@@ -254,8 +254,19 @@ void add_replay(CLI::App& app, Chosen& chosen)
     CLI::App* const sub = app.add_subcommand("replay", "Run a recording once more, and find the first departure.");
     sub->add_option("FILE", replay->file, "A recording, or a memory dump with one; - reads the standard input")
         ->required();
-    sub->add_flag("--show", replay->show, "Show what was recorded, and replay nothing");
-    sub->add_flag("--to-scenario", replay->to_scenario, "Print a scenario that plays the same on the board");
+    CLI::Option* const show = sub->add_flag("--show", replay->show, "Show what was recorded, and replay nothing");
+    CLI::Option* const json = sub->add_flag("--json", replay->json, "The same as JSON, an object a line");
+    CLI::Option* const chrome = sub->add_flag("--chrome", replay->chrome, "The same for a viewer of Chrome traces");
+    CLI::Option* const written =
+        sub->add_flag("--to-scenario", replay->to_scenario, "Print a scenario that plays the same on the board");
+    for (CLI::Option* const one : { show, json, chrome, written })
+    {
+        for (CLI::Option* const other : { show, json, chrome, written })
+        {
+            if (one != other)
+                one->excludes(other);
+        }
+    }
     sub->add_flag("-q,--quiet", replay->quiet, "Show departures only");
     sub->footer(replay_examples);
     sub->callback([replay, &chosen] { chosen = [replay] { return replay_file(*replay); }; });

@@ -153,6 +153,8 @@ const char* const replay_examples = R"(Examples:
       does the layer do the same once more?
   pmxboard replay --show change.rec | less
       what was recorded: number, time, thread, and the call
+  pmxboard replay --to-scenario change.rec > change.pmx
+      a scenario that plays the same on the board
 
 FILE is a recording or a memory dump that holds one; docs/recorder.md tells the
 rest.

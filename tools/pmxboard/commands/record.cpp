@@ -79,9 +79,12 @@ try
         board::load_description("default");
     const Recording recording = read_recording(board::files::read_named(options.file));
     const TextNames texts = layer_texts();
-    if (options.show)
+    if (options.show || options.json || options.chrome)
     {
-        show_events(std::cout, recording, texts);
+        show_events(std::cout, recording, texts,
+                    options.chrome ? EventForm::Chrome
+                    : options.json ? EventForm::Json
+                                   : EventForm::Text);
         return exit_done;
     }
     if (options.to_scenario)

@@ -25,6 +25,8 @@ struct ReplayOptions
     std::string file;
     bool quiet = false;
     bool show = false;
+    bool json = false;
+    bool chrome = false;
     bool to_scenario = false;
 };
 

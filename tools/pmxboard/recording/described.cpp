@@ -161,30 +161,101 @@ std::string described(const Event& event, const Event* begin, const TextNames& t
     return event.is_answered ? with_answer(function, call, event.words[0]) : call;
 }
 
-void show_events(std::ostream& out, const Recording& recording, const TextNames& texts)
+namespace
+{
+
+/** An event as it is shown. */
+struct ShownEvent
+{
+    const Event& event;
+    const Event* begin; ///< of an end: what ends; of others themselves, where they are no state
+    std::size_t number;
+    std::size_t depth;
+    std::string text;
+};
+
+std::string quoted(const std::string& text)
+{
+    return board::Value::text(text).to_json();
+}
+
+const char* kind_name(const Event& event)
+{
+    static constexpr const char* names[] = { "", "operation", "call", "return", "change", "snapshot" };
+    return names[event.kind];
+}
+
+void show_line(std::ostream& out, const ShownEvent& shown)
 {
     constexpr std::size_t deepest = 20;
+    out << shown.number << '\t' << shown.event.time << '\t' << shown.event.thread << '\t'
+        << std::string(2 * std::min(shown.depth, deepest), ' ') << printable(shown.text) << '\n';
+}
+
+void show_json(std::ostream& out, const ShownEvent& shown)
+{
+    out << "{\"event\":" << shown.number << ",\"time_us\":" << shown.event.time << ",\"thread\":" << shown.event.thread
+        << ",\"depth\":" << shown.depth << ",\"kind\":\"" << kind_name(shown.event) << '"';
+    if (shown.begin != nullptr)
+        out << ",\"function\":" << quoted(function_of(*shown.begin).name);
+    if (shown.event.is_answered || (shown.event.kind == PMX_RECORDER_RETURN && shown.begin != nullptr))
+        out << ",\"answer\":" << static_cast<std::int32_t>(shown.event.words[0]);
+    out << ",\"text\":" << quoted(shown.text) << "}\n";
+}
+
+/** What is answered at once has no length; what others do is a mark. */
+void show_chrome(std::ostream& out, const ShownEvent& shown)
+{
+    const bool is_end = shown.event.kind == PMX_RECORDER_RETURN;
+    const std::string phase = shown.begin == nullptr    ? "\"i\",\"s\":\"t\""
+                              : is_end                  ? "\"E\""
+                              : shown.event.is_answered ? "\"X\",\"dur\":0"
+                                                        : "\"B\"";
+    out << (shown.number == 1 ? "" : ",\n") << "{\"ph\":" << phase << ",\"pid\":1,\"tid\":" << shown.event.thread
+        << ",\"ts\":" << shown.event.time
+        << ",\"name\":" << quoted(shown.begin == nullptr ? shown.text : function_of(*shown.begin).name)
+        << ",\"args\":{\"event\":" << shown.number << ",\"text\":" << quoted(shown.text) << "}}";
+}
+
+void show_event(std::ostream& out, const ShownEvent& shown, EventForm form)
+{
+    switch (form)
+    {
+    case EventForm::Text: return show_line(out, shown);
+    case EventForm::Json: return show_json(out, shown);
+    case EventForm::Chrome: return show_chrome(out, shown);
+    }
+}
+
+} // namespace
+
+void show_events(std::ostream& out, const Recording& recording, const TextNames& texts, EventForm form)
+{
     std::map<unsigned, std::size_t> depths;
     std::map<std::uint32_t, const Event*> open;
     std::size_t number = 0;
+    if (form == EventForm::Chrome)
+        out << "{\"displayTimeUnit\":\"ms\",\"traceEvents\":[\n";
     for (const Event& event : recording.events)
     {
         std::size_t& depth = depths[event.thread];
         const bool is_return = event.kind == PMX_RECORDER_RETURN;
-        const auto begin = is_return ? open.find(event.words[1]) : open.end();
+        const auto found = is_return ? open.find(event.words[1]) : open.end();
+        const Event* const ended = found == open.end() ? nullptr : found->second;
         if (is_return && depth != 0)
             --depth;
-        out << ++number << '\t' << event.time << '\t' << event.thread << '\t'
-            << std::string(2 * std::min(depth, deepest), ' ')
-            << printable(described(event, begin == open.end() ? nullptr : begin->second, texts)) << '\n';
-        if (begin != open.end())
-            open.erase(begin);
+        show_event(out, { event, begins(event) ? &event : ended, ++number, depth, described(event, ended, texts) },
+                   form);
+        if (found != open.end())
+            open.erase(found);
         if (begins(event) && !event.is_answered)
         {
             ++depth;
             open[event.at] = &event;
         }
     }
+    if (form == EventForm::Chrome)
+        out << "\n]}\n";
 }
 
 } // namespace pmxboard

@@ -30,7 +30,14 @@ std::string described_answer(const Described& function, std::uint32_t answer);
 /** What an event says on one line; `begin` is the one that it ends, or null. */
 std::string described(const Event& event, const Event* begin, const TextNames& texts);
 
-/** All events, a line each: its number, time and thread, and what it says, deeper within calls. */
-void show_events(std::ostream& out, const Recording& recording, const TextNames& texts);
+/** How all events are shown. */
+enum class EventForm
+{
+    Text,  ///< a line each: its number, time and thread, and what it says, deeper within calls
+    Json,  ///< a JSON object each
+    Chrome ///< for a viewer of traces: a lane for each thread
+};
+
+void show_events(std::ostream& out, const Recording& recording, const TextNames& texts, EventForm form);
 
 } // namespace pmxboard

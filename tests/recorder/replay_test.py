@@ -128,6 +128,14 @@ class Replay(unittest.TestCase):
         recording.words[place + (recording.words[place] & 0xFF) - 1] ^= 1
         self.assertIn("another output", self.replay(recording.bytes()).stdout)
 
+    def test_the_layer_says_why_it_refuses(self):
+        recording = self.record("PMX_Init\nPMX_ChkSupportedRes 0 RES_480P 60\n")
+        _, place = recording.answer("fgPmxDrvGetAvdInfo")
+        recording.words[place] = 0
+        ended = self.replay(recording.bytes())
+        self.assertEqual(1, ended.returncode)
+        self.assertRegex(ended.stdout, r"\nthe layer's reasons:\n  refused: PMX_ChkSupportedRes = 0\n  because ")
+
     def test_what_was_recorded_is_shown(self):
         self.record("PMX_Init\nPMX_GetMode 0\n")
         shown = self.run_tool("replay", "--show", self.file).stdout

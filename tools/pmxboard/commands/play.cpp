@@ -205,6 +205,7 @@ public:
     Play(const Recording& recording, const std::string& name) : m_name(name), m_recorded(recorded_steps(recording)) {}
 
     PlayedScenario write();
+    std::string refusal(std::size_t operation);
 
 private:
     void write_commands();
@@ -220,7 +221,7 @@ private:
     bool add_pokes(const RecordedStep& step, std::span<const std::uint32_t> instead);
     bool give_up(const std::string& why);
 
-    const std::string& m_name;
+    std::string m_name;
     RecordedSteps m_recorded;
     std::vector<std::uint32_t> m_fresh; ///< the state behind a power-on
     std::vector<PlayedCommand> m_commands;
@@ -403,7 +404,32 @@ PlayedScenario Play::write()
     return { text(m_commands.size()) + m_end, !is_going_on && !m_end.starts_with("#") };
 }
 
+std::string Play::refusal(std::size_t operation)
+{
+    write();
+    if (operation == 0 || operation > m_commands.size() || m_commands[operation - 1].line.empty())
+        return {};
+    std::string lines = "trace off\n" + text(operation - 1);
+    for (const std::string& line : m_commands[operation - 1].before)
+        lines += line + "\n";
+    std::istringstream in(lines + "explain " + m_commands[operation - 1].line + "\n");
+    std::ostringstream shown;
+    std::ostringstream told;
+    OutputOptions output;
+    output.echo = false;
+    output.to = &shown;
+    run_scenario(in, { m_name, "default", "" }, output, told);
+    const std::string all = shown.str();
+    const std::size_t at = all.rfind("  refused:");
+    return at == all.npos ? "" : all.substr(at);
+}
+
 } // namespace
+
+std::string refusal_of(const Recording& recording, std::size_t operation)
+{
+    return Play(recording, "the recording").refusal(operation);
+}
 
 PlayedScenario scenario_of(const Recording& recording, const std::string& name)
 {

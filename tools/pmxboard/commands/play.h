@@ -20,4 +20,8 @@ struct PlayedScenario
  *  cannot say it: then that is a comment, and the end. */
 PlayedScenario scenario_of(const Recording& recording, const std::string& name);
 
+/** Why the layer refuses the n-th operation that nobody calls from within it, as it was recorded, in its own reasons;
+ *  empty when it does not, or when that cannot be played on the board. */
+std::string refusal_of(const Recording& recording, std::size_t operation);
+
 } // namespace pmxboard

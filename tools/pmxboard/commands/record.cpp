@@ -35,11 +35,21 @@ void show_departure(const Departure& departure, std::size_t events)
               << "\n  computed: " << printable(departure.computed) << "\n  record:   " << departure.record << '\n';
 }
 
+/** Played on the board, for the layer that tells its reasons sits beside the board's. */
+void show_refusal(const Recording& recording, const Departure& departure)
+{
+    board::load_description("default");
+    const std::string refusal = departure.operation.empty() ? "" : refusal_of(recording, departure.outermost);
+    if (!refusal.empty())
+        std::cout << "the layer's reasons:\n" << refusal;
+}
+
 int show_verdict(const Recording& recording, const ReplayVerdict& verdict, bool quiet)
 {
     if (verdict.departure)
     {
         show_departure(*verdict.departure, recording.events.size());
+        show_refusal(recording, *verdict.departure);
         return exit_failed;
     }
     if (!quiet)

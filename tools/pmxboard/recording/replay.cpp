@@ -119,6 +119,7 @@ private:
     const TextNames& m_texts;
     std::size_t m_next = 0;
     bool m_is_over = false;
+    std::size_t m_outermost = 0;
     ReplayVerdict m_verdict;
     std::mutex m_mutex;
     std::condition_variable m_turn;
@@ -145,10 +146,18 @@ void Performance::depart(std::string recorded, std::string computed, std::string
 {
     m_is_over = true;
     if (!m_verdict.departure)
-        m_verdict.departure = { m_next + 1,          m_events[std::min(m_next, m_events.size() - 1)].time,
-                                my_thread,           my_operations.empty() ? "" : my_operations.front(),
-                                std::move(recorded), std::move(computed),
-                                std::move(why),      record_text() };
+    {
+        Departure& found = m_verdict.departure.emplace();
+        found.event = m_next + 1;
+        found.time = m_events[std::min(m_next, m_events.size() - 1)].time;
+        found.thread = my_thread;
+        found.operation = my_operations.empty() ? "" : my_operations.front();
+        found.outermost = m_outermost;
+        found.recorded = std::move(recorded);
+        found.computed = std::move(computed);
+        found.why = std::move(why);
+        found.record = record_text();
+    }
     m_turn.notify_all();
 }
 
@@ -241,6 +250,7 @@ void Performance::run_operation(Lock& lock)
 {
     const Event& begin = take();
     const ReplayedOperation& operation = replayed_layer().operations[begin.function];
+    m_outermost += my_operations.empty();
     my_operations.push_back(operation.described.name);
     std::vector<UINT32> written;
     Given given(begin.words.subspan(1));

@@ -163,7 +163,7 @@ class Caches(TreeTest):
         self.expect(2, "kernel does not take: x", "kernel", "x")
 
     def test_each_way_of_the_kernel_has_its_program(self):
-        for option, program in (("--cost", "cost_kernel"), ("--all", "every_kernel")):
+        for option, program in (("--cost", "cost_kernel"), ("--all", "every_kernel"), ("--debug", "debug_kernel")):
             self.expect(0, f"{program} {self.tree}/.cache/kernel {self.tree}/build/kernel ", "kernel", option)
             self.expect(2, f"kernel {option} does not take: x", "kernel", option, "x")
 

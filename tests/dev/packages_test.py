@@ -49,7 +49,7 @@ class Packages(TreeTest):
                                   (("run",), "python3 cmake libx-dev g++"),
                                   (("kernel",), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu"),
                                   (("kernel", "--cost"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu"),
-                                  (("kernel", "--all"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu flex"),
+                                  (("kernel", "--debug"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu flex"),
                                   (("docs",), ""),
                                   (("clean",), ""),
                                   (("help",), ""),

@@ -11,7 +11,7 @@ import unittest
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 NOBODY = 65534
-KERNEL_PROGRAMS = ("run", "cost_kernel", "every_kernel")
+KERNEL_PROGRAMS = ("run", "cost_kernel", "debug_kernel", "every_kernel")
 
 # Each notes its call. The cmake notes as well when two builds of one folder meet.
 PROGRAMS = {

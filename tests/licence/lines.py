@@ -20,8 +20,8 @@ TAG = "SPDX-License-" + "Identifier:"  # apart, so that nobody takes this for a 
 LICENCE = f"{TAG} MIT OR GPL-2.0-only"
 COMMENTS = {".c": "// {}", ".cpp": "// {}", ".h": "// {}", ".h.in": "// {}", ".s.in": "/* {} */", ".pc.in": "# {}",
             ".md": "<!-- {} -->"}
-HASH = {".bash", ".clang-format", ".clang-tidy", ".cmake", ".gitignore", ".pmx", ".py", ".sh", ".supp", ".toml",
-        ".txt", "Doxyfile", "Kbuild", "dev", "run"}
+HASH = {".bash", ".clang-format", ".clang-tidy", ".cmake", ".fragment", ".gitignore", ".pmx", ".py", ".sh", ".supp",
+        ".toml", ".txt", "Doxyfile", "Kbuild", "dev", "run"}
 LICENCES = ("LICENSE", "LICENSES/*")
 
 

@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
-"""Runs the port of linux/ in every kind of kernel: Debian's ARM kernel as run.py does, the newest that the package
-sources offer, and Debian's kernel for PCs, in which the layer is a 64-bit one and the kernel's build looks
+"""Runs the port of linux/ in every kind of kernel: Debian's ARM kernel as run.py does, one in Thumb-2, the newest that
+the package sources offer, and Debian's kernel for PCs, in which the layer is a 64-bit one and the kernel's build looks
 at its code. Every scenario is held against the virtual board in each, in virtual time. Prints KTAP; ends with 1 when
 something differs, and with 77 when no kernel is to be had.
 
@@ -14,7 +14,12 @@ sys.dont_write_bytecode = True
 
 import debian  # noqa: E402
 import machines  # noqa: E402
+import own  # noqa: E402
 import run  # noqa: E402
+
+
+def thumb2(cache):
+    return own.kernel(cache, machines.ARM, "thumb2", debian.kernel(cache))
 
 
 def newest(cache):
@@ -25,7 +30,7 @@ def pc(cache):
     return debian.kernel(cache / "amd64", machines.PC)
 
 
-KERNELS = {"newest": newest, "amd64": pc}
+KERNELS = {"thumb2": thumb2, "newest": newest, "amd64": pc}
 
 
 def compare_in(ktap, name, kernel, made, commands, expected):
@@ -42,7 +47,7 @@ def compare_others(ktap, cache, made, program):
             compare_in(ktap, name, kernel(cache), made, commands, expected)
         except debian.Unavailable as reason:
             ktap.skip(name, str(reason).replace("\n", " "))
-        except run.Failed as reason:
+        except (own.Broken, run.Failed) as reason:
             ktap.verdict(name, str(reason).splitlines())
 
 

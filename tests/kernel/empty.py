@@ -14,6 +14,9 @@ sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))
 
 from platform_functions import PLATFORM_HEADERS, ROOT, functions  # noqa: E402
 
+HEAD = """// SPDX-License-Identifier: MIT OR GPL-2.0-only
+/* Written from the headers. */
+"""
 ANSWERS = {"TVE_SetFmtEx": "TVE_SET_OK", "i4GetHotPlugStatus": "1", "fgPmxDrvSetAvd": "TRUE"}
 OUTPUTS = {"x_sema_create": "*phSema = 1;", "x_timer_create": "*phTimer = 2;"}
 
@@ -28,8 +31,7 @@ def body(function):
 
 def code():
     headers = [ROOT / header for header in PLATFORM_HEADERS]
-    text = "// SPDX-License-Identifier: MIT OR GPL-2.0-only\n/* Written from the headers. */\n"
-    text += "".join(f'#include "{header.name}"\n' for header in headers) + "\n"
+    text = HEAD + "".join(f'#include "{header.name}"\n' for header in headers) + "\n"
     return text + "\n".join(body(function) for header in headers for function in functions(header))
 
 

@@ -44,7 +44,7 @@ if(board IN_LIST pmx_FIND_COMPONENTS)
         set_target_properties(pmx::board PROPERTIES
             IMPORTED_LOCATION "${PMX_PREFIX}/lib/pmx/libpmx_board.a"
             INTERFACE_LINK_LIBRARIES
-                "${PMX_TOML_LIBRARY};${PMX_PIXMAN_LIBRARY};${PMX_PNG_LIBRARY};stdc++;Threads::Threads"
+                "${PMX_TOML_LIBRARY};${PMX_PIXMAN_LIBRARY};${PMX_PNG_LIBRARY};stdc++;m;Threads::Threads"
             INTERFACE_LINK_OPTIONS "-no-pie;LINKER:@${PMX_PREFIX}/lib/pmx/recorded_calls.txt"
             INTERFACE_INCLUDE_DIRECTORIES "${PMX_PREFIX}/include/pmx")
         get_property(languages GLOBAL PROPERTY ENABLED_LANGUAGES)

@@ -256,12 +256,12 @@ TEST(Mix, ManyThreads_MakeTheSamePicture)
 
 TEST(Bands, WhatTheWorkThrows_IsThrown)
 {
-    EXPECT_THROW(in_bands(100, 3,
-                          [](int from, int) {
-                              if (from > 40)
-                                  throw PictureError("here");
-                          }),
-                 PictureError);
+    const auto work = [](int from, int) {
+        if (from > 400)
+            throw PictureError("here");
+    };
+    for (const unsigned threads : { 1U, 3U })
+        EXPECT_THROW(in_bands(1000, threads, work), PictureError);
     int seen = 0;
     in_bands(0, 3, [&](int, int) { ++seen; });
     EXPECT_EQ(0, seen);

@@ -3,7 +3,7 @@
 
 #include <algorithm>
 #include <array>
-#include <cstdio>
+#include <charconv>
 #include <map>
 
 #include "board/picture/pattern.h"
@@ -47,20 +47,36 @@ Image card_of(const SourceState& source, const Space& space)
                 { source.name, std::to_string(width) + "x" + std::to_string(height) });
 }
 
+constexpr std::string_view SOLID = "solid ";
+
+/** The colour in the name of a picture of one colour. */
+std::optional<Signals> solid_colour(std::string_view name)
+{
+    if (!name.starts_with(SOLID))
+        return std::nullopt;
+    std::array<unsigned, 3> levels{};
+    const char* next = name.data() + SOLID.size();
+    const char* const end = name.data() + name.size();
+    for (unsigned& level : levels)
+    {
+        next = std::from_chars(next, end, level).ptr;
+        next += next != end ? 1 : 0; // the comma
+    }
+    return signals_of(levels[0], levels[1], levels[2]);
+}
+
 Image pattern_of(const SourceState& source, const Space& space)
 {
-    const auto [width, height, key, is_ycbcr] = *source.delivery;
-    unsigned red = 0;
-    unsigned green = 0;
-    unsigned blue = 0;
+    const int width = source.delivery->width;
+    const int height = source.delivery->height;
     if (source.picture == "bars")
         return bars(width, height, space);
     if (source.picture == "ramp")
         return ramp(width, height, space);
     if (source.picture == "checker")
         return checker(width, height, space);
-    if (std::sscanf(source.picture.c_str(), "solid %u,%u,%u", &red, &green, &blue) == 3)
-        return solid(width, height, space, signals_of(red, green, blue));
+    if (const auto colour = solid_colour(source.picture))
+        return solid(width, height, space, *colour);
     return card_of(source, space);
 }
 
@@ -120,7 +136,7 @@ bool is_pattern(std::string_view word)
 
 std::string solid_name(unsigned red, unsigned green, unsigned blue)
 {
-    return "solid " + std::to_string(red) + "," + std::to_string(green) + "," + std::to_string(blue);
+    return std::string(SOLID) + std::to_string(red) + "," + std::to_string(green) + "," + std::to_string(blue);
 }
 
 } // namespace board::picture

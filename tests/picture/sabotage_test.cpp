@@ -98,11 +98,12 @@ Calls recorded_calls()
     Calls calls;
     for (const TraceEntry& entry : board::trace::entries())
     {
-        unsigned source = 0;
-        char space[40] = "";
-        if (entry.kind == TraceEntry::Kind::Notice &&
-            std::sscanf(entry.text.c_str(), "vdp%u is told %39s", &source, space) == 2)
-            calls.push_back({ TOLD, { Value::number(source), Value::number(*board::names::number_of(space)) } });
+        constexpr std::string_view telling = " is told ";
+        if (const std::size_t at = entry.text.find(telling);
+            entry.kind == TraceEntry::Kind::Notice && at != std::string::npos)
+            calls.push_back({ TOLD,
+                              { Value::number(board::sources::find(entry.text.substr(0, at)).number),
+                                Value::number(*board::names::number_of(entry.text.substr(at + telling.size()))) } });
         if (entry.kind != TraceEntry::Kind::Call)
             continue;
         Call call{ entry.function, {} };

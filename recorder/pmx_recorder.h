@@ -63,8 +63,8 @@ typedef struct
 #define PMX_RECORDER_TEXTS 512u /* places for them; a text stands at its own or one of the next */
 
 /** Bytes that a ring of so many bytes needs, a power of two. */
-#define PMX_RECORDER_MEMORY(RingBytes)                                       \
-    (sizeof(PMX_RECORDER_T) + (RingBytes) + 4 * (PMX_RECORDER_LONGEST + 1) + \
+#define PMX_RECORDER_MEMORY(RingBytes)                                               \
+    (sizeof(PMX_RECORDER_T) + (RingBytes) + (size_t)4 * (PMX_RECORDER_LONGEST + 1) + \
      PMX_RECORDER_TEXTS * sizeof(PMX_RECORDER_TEXT_T))
 
 /** Who lends the ring, and knows what the layer does not. */

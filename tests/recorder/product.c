@@ -12,7 +12,7 @@
 #include <sys/mman.h>
 #include <unistd.h>
 
-#include "port_skeleton.c"
+#include "port_skeleton.c" // NOLINT(bugprone-suspicious-include): a stack is one program here
 
 #include "pmx_recorder.h"
 

@@ -41,7 +41,8 @@ typedef struct
 } PMX_RECORDER_T;
 
 /** What an event is; PMX_RECORDER_ANSWERED is added when its answer stands in it, because nothing came between. */
-typedef DRV_ENUM(PMX_RECORDER_KIND_T){
+typedef DRV_ENUM(PMX_RECORDER_KIND_T)
+{
     PMX_RECORDER_OPERATION = 1, /**< somebody calls the layer */
     PMX_RECORDER_CALL = 2,      /**< the layer calls somebody */
     PMX_RECORDER_RETURN = 3,    /**< either of them ends, and something came between */

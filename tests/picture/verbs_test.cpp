@@ -132,6 +132,18 @@ TEST_F(PictureFilesOfVerbs, AnotherPicture_IsNotMet_AndTheDifferenceIsKept)
     EXPECT_EQ(32, read(file("hdmi.difference.png")).width());
 }
 
+TEST_F(PictureFilesOfVerbs, WhatIsOnlyImagined_KeepsNoDifference)
+{
+    const std::string name = file("hdmi.png");
+    const std::string other = file_with("other.pmx", "expect picture hdmi " + name + "\n");
+    const std::string shown = tool_test::run(FILM + "shot hdmi " + name +
+                                             " 32x18\nsource vdp0 picture solid 200,110,50\nwhat-if include " + other)
+                                  .shown;
+    EXPECT_NE(shown.npos, shown.find("expected the picture " + name + ", found 576 other pixels")) << shown;
+    EXPECT_EQ(shown.npos, shown.find("the difference is in")) << shown;
+    EXPECT_FALSE(std::filesystem::exists(file("hdmi.difference.png")));
+}
+
 TEST_F(PictureFilesOfVerbs, ASource_ShowsAFile)
 {
     const std::string png = file_with("menu.png", board::picture::to_png(board::picture::Image(

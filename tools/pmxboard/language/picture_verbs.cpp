@@ -140,10 +140,13 @@ std::string colour_text(picture::Pixel pixel)
     return level(0) + "," + level(1) + "," + level(2);
 }
 
-/** Beside the picture that was expected; what cannot be written is no matter then. */
-std::string keep_difference(const std::filesystem::path& file, const picture::Image& shown)
+/** Beside the picture that was expected, by a line that is carried out and not imagined; what cannot be written is no
+ *  matter then. */
+std::string keep_difference(const Session& session, const std::filesystem::path& file, const picture::Image& shown)
 try
 {
+    if (session.imagines())
+        return "";
     const std::filesystem::path kept = std::filesystem::path(file).replace_extension(".difference.png");
     write_file(kept.string(), picture::to_png(shown));
     return "; the difference is in " + kept.string();
@@ -234,7 +237,7 @@ void expect_file(Session& session, const Words& words)
                      " other pixels, at " + std::to_string(found->x) + "," + std::to_string(found->y) + " " +
                      colour_text(seen.image.at(found->x, found->y)) + " for " +
                      colour_text(expected.at(found->x, found->y)) + "; " + seen.description +
-                     keep_difference(file, found->shown));
+                     keep_difference(session, file, found->shown));
 }
 
 #else

@@ -237,7 +237,9 @@ TEST(Truth, APhotograph_HasTheFullRange_AndNoOutputIsTold)
     const Space full_601 = ycbcr(Standard::Bt601, Range::Full);
     expect_wrong(OutputId::Composite, { { full_rgb, full_601 }, { SD_SPACE, full_rgb } }, "full range");
     board::sources::start_graphics(0, sd_size, DRV_GFX_COLOR_MODE_RGB);
-    show("osd0", "bars"); // in front of it, and of the same range
+    show("vdp2", "solid 0,0,0");
+    show("osd0", "bars");
+    PMX_SetPlaneOrder(0, 2, 0); // in front of the photograph, and of the same range
     expect_wrong(OutputId::Composite, { { full_rgb, full_601 }, { SD_SPACE, full_rgb } }, "full range graphics");
 }
 

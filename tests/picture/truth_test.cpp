@@ -213,6 +213,21 @@ TEST(Truth, AModeWithoutConverters_LeavesThemAsTheyAre)
     expect_wrong(OutputId::Component, { { full_rgb, HD_SPACE }, { SD_SPACE, full_rgb } }, "709 in an SD mode");
 }
 
+TEST(Truth, AnUltraHdModeAfterAnSdOne_GoesOnConvertingInto601)
+{
+    start_layer();
+    set_outputs(RES_480P, RES_480P, RES_480I);
+    show_bars();
+    KINDS[1].start();
+    decide_master(DRV_PMX_CS_YCBCR_601);
+    decide_master(DRV_PMX_CS_YCBCR_709);
+    PMX_HalSetMode(0, RES_2160P); // as a boot loader may leave it
+    TVE_SetFmtEx(TVE_1, RES_2160P, 60, RES_2160P, TRUE, FALSE, 0);
+    PMX_ColorSpaceSetup(DRV_PMX_CS_YCBCR_709, RES_2160P);
+    expect_wrong(OutputId::Component, { { full_rgb, HD_SPACE }, { HD_SPACE, SD_SPACE }, { HD_SPACE, full_rgb } },
+                 "converted for SD in a 4K mode");
+}
+
 TEST(Truth, APlaneThatConnectsAfterTheAnnouncement_GoesOnIn709)
 {
     start_layer();

@@ -65,6 +65,8 @@ Image read_png(std::string_view bytes)
                            std::to_string(png.height));
     Image image(static_cast<int>(png.width), static_cast<int>(png.height));
     png.format = PNG_FORMAT_RGBA;
+    png.flags |=
+        PNG_IMAGE_FLAG_16BIT_sRGB; // as with eight bits where the file does not tell; else they would be linear
     std::vector<png_byte> rgba(image.pixels().size() * BYTES);
     if (png_image_finish_read(&png, nullptr, rgba.data(), 0, nullptr) == 0)
         png.failed();

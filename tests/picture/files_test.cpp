@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include <gtest/gtest.h>
+#include <zlib.h>
 
 #include <random>
 
@@ -21,6 +22,38 @@ std::string why_not(const std::string& bytes)
         return error.what();
     }
     return "it was read";
+}
+
+std::string big_endian(std::uint32_t number)
+{
+    std::string bytes;
+    for (int shift = 24; shift >= 0; shift -= 8)
+        bytes += static_cast<char>(number >> shift & 0xFF);
+    return bytes;
+}
+
+const unsigned char* bytes_of(const std::string& text)
+{
+    return reinterpret_cast<const unsigned char*>(text.data());
+}
+
+std::string png_chunk(const std::string& name, const std::string& data)
+{
+    const std::string checked = name + data;
+    const uLong sum = crc32(0, bytes_of(checked), static_cast<uInt>(checked.size()));
+    return big_endian(static_cast<std::uint32_t>(data.size())) + checked + big_endian(static_cast<std::uint32_t>(sum));
+}
+
+/** A PNG in shades of grey that says nothing of what they mean; in front of each row stands how it is packed. */
+std::string grey_png(std::uint32_t width, std::uint32_t height, char bits, const std::string& rows)
+{
+    std::string packed(compressBound(static_cast<uLong>(rows.size())), '\0');
+    uLongf size = packed.size();
+    EXPECT_EQ(Z_OK, compress(reinterpret_cast<unsigned char*>(packed.data()), &size, bytes_of(rows),
+                             static_cast<uLong>(rows.size())));
+    packed.resize(size);
+    const std::string head = big_endian(width) + big_endian(height) + bits + std::string(4, '\0');
+    return "\x89PNG\r\n\x1A\n" + png_chunk("IHDR", head) + png_chunk("IDAT", packed) + png_chunk("IEND", "");
 }
 
 TEST(PictureFiles, Png_IsReadAsItWasWritten)
@@ -56,6 +89,13 @@ TEST(PictureFiles, Png_ThatEndsEarly_IsRefused)
     const std::string file = to_png(checker(64, 64, full_rgb));
     for (std::size_t size = 8; size < file.size() - 12; size += 7) // behind all pixels stands no more than the end
         EXPECT_TRUE(why_not(file.substr(0, size)).starts_with("no PNG: ")) << size;
+}
+
+TEST(PictureFiles, Png_OfSixteenBits_HasTheColoursOfOneOfEight)
+{
+    const std::string middle(2, '\x80');
+    EXPECT_EQ(opaque(128, 128, 128), read_picture(grey_png(1, 1, 16, '\0' + middle)).at(0, 0));
+    EXPECT_EQ(opaque(128, 128, 128), read_picture(grey_png(2, 1, 8, '\0' + middle)).at(0, 0));
 }
 
 TEST(PictureFiles, Png_LargerThanAPictureMayBe_IsRefusedBeforeItIsUnpacked)

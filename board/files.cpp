@@ -5,6 +5,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstring>
 #include <istream>
@@ -87,6 +88,15 @@ public:
         return text;
     }
 
+    std::string read_start(std::size_t most) const
+    {
+        std::string text;
+        char part[65536];
+        while (const std::size_t count = read_some(part, std::min(sizeof part, most - text.size())))
+            text.append(part, count);
+        return text;
+    }
+
 private:
     void look()
     {
@@ -154,6 +164,11 @@ std::string read(const std::filesystem::path& file, std::size_t most)
 std::string read_once(const std::filesystem::path& file, std::size_t most)
 {
     return Reader(file.string(), false).read_all(most);
+}
+
+std::string read_start(const std::filesystem::path& file, std::size_t most)
+{
+    return Reader(file.string()).read_start(most);
 }
 
 std::string read_named(const std::string& name, std::size_t most)

@@ -5,6 +5,7 @@
 #include <filesystem>
 #include <fstream>
 
+#include "board/files.h"
 #include "board/picture/pattern.h"
 #include "scene.h"
 #include "tests/tool/scenario_run.h"
@@ -156,6 +157,14 @@ TEST_F(PictureFilesOfVerbs, ASource_ShowsAFile)
                               png + "\nexpect picture hdmi 9,9 127,128,0 3"));
     EXPECT_EQ("", diagnostics("PMX_Init\noutputs hdmi=720p60\nsource vdp0 start 1280x720\nsource vdp0 picture " + y4m +
                               "\nexpect picture hdmi 9,9 255,24,0 3"));
+}
+
+TEST_F(PictureFilesOfVerbs, OfALongFilm_TheFirstFrameIsRead)
+{
+    const std::string film = file_with("film.y4m", "YUV4MPEG2 W1 H1 C444\nFRAME\n\x51\x5A\xF0");
+    std::filesystem::resize_file(film, board::files::largest + 1);
+    EXPECT_EQ("", diagnostics("PMX_Init\noutputs hdmi=480p60\nsource vdp0 start 720x480\nsource vdp0 picture " + film +
+                              "\nexpect picture hdmi 9,9 255,0,0"));
 }
 
 TEST_F(PictureFilesOfVerbs, AFileThatIsNoPicture_IsTold)

@@ -33,6 +33,8 @@ namespace
 namespace picture = board::picture;
 
 constexpr unsigned usual_tolerance = 2; ///< what conversions of eight bits leave, one behind the other
+/** Enough for a Y4M's first frame, and for a PNG of sixteen bits that cannot be packed. */
+constexpr std::size_t most_of_file = 160 * board::files::mebibyte;
 constexpr int preview_columns = 64;
 constexpr int sheet_width = 960;
 constexpr int sheet_height = 540;
@@ -62,7 +64,7 @@ std::array<unsigned, 3> colour_in(const Words& words)
 picture::Image read_image(const std::filesystem::path& file)
 try
 {
-    return picture::read_picture(board::files::read(file));
+    return picture::read_picture(board::files::read_start(file, most_of_file));
 }
 catch (const board::files::FileError& error)
 {

@@ -284,11 +284,12 @@ void lay_over(Image& image, const Layer& layer)
 Image mixed_picture(const Hardware& hardware, const Raster& raster, unsigned threads, bool only_main_video)
 {
     const MixerState& mixer = hardware.mixer;
-    Image image(raster.width, raster.height, ycbcr(raster.standard), mixer.muted ? MIXER_BLACK : mixer.background);
+    const bool is_black = mixer.muted || only_main_video;
+    Image image(raster.width, raster.height, ycbcr(raster.standard), is_black ? MIXER_BLACK : mixer.background);
     image.set_opaque(true);
-    if (mixer.muted)
+    if (mixer.muted && !only_main_video)
         return image;
-    if (mixer.colour_bar)
+    if (mixer.colour_bar && !only_main_video)
     {
         Image bars = mixed_bars(hardware, raster);
         bars.set_space(image.space());
@@ -303,7 +304,7 @@ Image mixed_picture(const Hardware& hardware, const Raster& raster, unsigned thr
                                    static_cast<std::size_t>(to - from) * static_cast<std::size_t>(raster.width));
         for (const Layer& layer : layers)
             lay_rows(rows.data(), raster.width, from, to, layer, room);
-        if (!is_neutral(mixer))
+        if (!only_main_video && !is_neutral(mixer))
             adjust(rows, adjustment);
     });
     return image;

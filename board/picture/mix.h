@@ -31,7 +31,7 @@ std::optional<Layer> graphics_layer(const SourceState& source, int width, int he
 void lay_over(Image& image, const Layer& layer);
 
 /** The mixer's picture, in the codes of whatever its planes convert into; the size is that of its mode.
- *  @param only_main_video  what the digital port shows that is fed in front of the mixer */
+ *  @param only_main_video  what the digital port shows that is fed in front of the mixer: on black, and untouched */
 Image mixed_picture(const Hardware& hardware, const Raster& raster, unsigned threads, bool only_main_video = false);
 
 } // namespace board::picture

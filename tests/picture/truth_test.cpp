@@ -386,6 +386,19 @@ TEST(BeforeMixer, TheDigitalPortShowsTheMainVideoAlone)
     PMX_SetDGOSource(TRUE);
     EXPECT_LT(250U, level(OutputId::Digital));
     EXPECT_EQ(0U, level(OutputId::Hdmi));
+    // What the mixer does besides is done behind the place where the port is fed.
+    Hardware hardware = hardware_now();
+    const auto port = [&] { return code(shot_of(hardware, OutputId::Digital, { 1, 16 }).picture.at(5, 5), 1); };
+    hardware.mixer.brightness = 60;
+    EXPECT_LT(250U, port());
+    hardware.mixer.colour_bar = true;
+    hardware.mixer.bar_width = 200;
+    EXPECT_LT(250U, port());
+    hardware.mixer.muted = true;
+    EXPECT_LT(250U, port());
+    hardware.mixer.background = opaque(235, 128, 128);
+    hardware.sources[0].delivery.reset();
+    EXPECT_EQ(0U, port());
 }
 
 TEST(Sheet, HasTheFourOutputs)

@@ -209,14 +209,16 @@ Adjustment adjustment_of(const MixerState& mixer)
     return adjustment;
 }
 
-/** The width of the bars comes in steps of eight samples; an SD picture's pixels are two each. */
+/** The width of the bars comes in steps of eight samples; an SD picture's pixels are two each. What is computed in a
+ *  smaller size than the mode's has bars as much narrower. */
 Image mixed_bars(const Hardware& hardware, const Raster& raster)
 {
     const Space space = ycbcr(hardware.osd.told);
     const unsigned width = hardware.mixer.bar_width.value_or(0) * (raster.standard == Standard::Bt601 ? 4 : 8);
     if (width == 0)
         return bars(raster.width, raster.height, space);
-    return bars(raster.width, raster.height, space, static_cast<int>(width));
+    const Raster whole = *raster_of(*hardware.mixer.mode);
+    return bars(raster.width, raster.height, space, static_cast<double>(width) * raster.width / whole.width);
 }
 
 std::vector<Layer> layers_of(const Hardware& hardware, const Raster& raster, bool only_main_video)

@@ -89,7 +89,7 @@ Signals signals_of(unsigned red, unsigned green, unsigned blue)
     return { red / 255.0, green / 255.0, blue / 255.0 };
 }
 
-Image bars(int width, int height, const Space& space, int bar_width)
+Image bars(int width, int height, const Space& space, double bar_width)
 {
     Image image(width, height, space, opaque(0, 0, 0));
     for (int x = 0; x < width; ++x)

@@ -24,7 +24,7 @@ Signals signals_of(unsigned red, unsigned green, unsigned blue);
 /** Colour bars: white, yellow, cyan, green, magenta, red, blue of 75 in 100 of the height, and black. */
 Image bars(int width, int height, const Space& space);
 /** The same, as wide as asked for; they begin anew at the left as often as they fit. */
-Image bars(int width, int height, const Space& space, int bar_width);
+Image bars(int width, int height, const Space& space, double bar_width);
 /** From black on the left to the whole height on the right: grey, red, green, blue, one below the other. */
 Image ramp(int width, int height, const Space& space);
 Image solid(int width, int height, const Space& space, const Signals& colour);

@@ -6,6 +6,7 @@
 #include "board/picture/content.h"
 #include "board/picture/mix.h"
 #include "board/picture/pattern.h"
+#include "drv_if_pmx.h"
 
 namespace
 {
@@ -180,7 +181,8 @@ TEST(Mix, Mute_AndColourBar_TakeThePlaceOfAll)
     deliver(hardware, 0, 255, 0, 0);
     hardware.mixer.colour_bar = true;
     EXPECT_EQ("190,0,0", colour_at(hardware, 40, 30)) << "the sixth of eight bars";
-    hardware.mixer.bar_width = 2; // 16 pixels
+    hardware.mixer.mode = RES_1080P60HZ;
+    hardware.mixer.bar_width = 60; // 480 pixels of 1920, and so 16 of 64
     EXPECT_EQ("0,190,190", colour_at(hardware, 40, 30));
     hardware.mixer.muted = true;
     EXPECT_EQ(BLACK, colour_at(hardware));

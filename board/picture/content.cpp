@@ -115,18 +115,11 @@ Space own_space(const SourceState& source)
 
 std::shared_ptr<const Image> content_of(const SourceState& source)
 {
-    if (!source.delivery)
+    if (!source.delivery || !is_picture_size(source.delivery->width, source.delivery->height))
         return nullptr;
     if (source.image != nullptr)
         return source.image;
-    try
-    {
-        return made_pattern(source, own_space(source));
-    }
-    catch (const PictureError&)
-    {
-        return nullptr;
-    }
+    return made_pattern(source, own_space(source));
 }
 
 bool is_pattern(std::string_view word)

@@ -8,14 +8,19 @@ namespace
 
 std::size_t checked_count(int width, int height)
 {
-    if (width < 1 || height < 1 || width > longest_side || height > longest_side ||
-        static_cast<std::size_t>(width) * static_cast<std::size_t>(height) > most_pixels)
+    if (!is_picture_size(width, height))
         throw PictureError("no picture is " + std::to_string(width) + "x" + std::to_string(height) +
                            ": sides are 1 to 8192 pixels, and there are at most 2^24 of them");
     return static_cast<std::size_t>(width) * static_cast<std::size_t>(height);
 }
 
 } // namespace
+
+bool is_picture_size(int width, int height)
+{
+    return width >= 1 && height >= 1 && width <= longest_side && height <= longest_side &&
+           static_cast<std::size_t>(width) * static_cast<std::size_t>(height) <= most_pixels;
+}
 
 Image::Image(int width, int height, Space space, Pixel filled)
     : m_width(width), m_height(height), m_space(space), m_opaque(opacity(filled) == 255),

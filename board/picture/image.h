@@ -26,6 +26,8 @@ public:
 inline constexpr int longest_side = 8192;
 inline constexpr std::size_t most_pixels = std::size_t{ 1 } << 24;
 
+bool is_picture_size(int width, int height);
+
 /** Rows of pixels, the uppermost first. */
 class Image
 {

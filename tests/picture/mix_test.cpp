@@ -241,6 +241,10 @@ TEST(Mix, ASizeThatNoPictureHas_IsNotSeen)
         hardware.sources[0].delivery = Delivery{ width, height, 0, true };
         EXPECT_EQ(GREEN, colour_at(hardware)) << width;
     }
+    hardware.sources[0].image = std::make_shared<Image>(4, 4, full_rgb, opaque(255, 0, 0)); // as a file has it
+    EXPECT_EQ(GREEN, colour_at(hardware));
+    hardware.sources[0].delivery = Delivery{ 722, 48, 0, true };
+    EXPECT_EQ(RED, colour_at(hardware));
 }
 
 TEST(Mix, ManyThreads_MakeTheSamePicture)

@@ -112,7 +112,8 @@ Seen seen_on(const std::optional<picture::OutputId>& output, int width, int heig
     if (output)
     {
         picture::Shot shot = picture::shot_of(hardware, *output);
-        return { std::move(shot.picture), described(shot) };
+        std::string description = described(shot); // of the picture, before it goes
+        return { std::move(shot.picture), std::move(description) };
     }
     const auto shots = picture::all_shots(hardware);
     std::string description;

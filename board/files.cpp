@@ -168,7 +168,7 @@ std::string read_once(const std::filesystem::path& file, std::size_t most)
 
 std::string read_start(const std::filesystem::path& file, std::size_t most)
 {
-    return Reader(file.string()).read_start(most);
+    return Reader(file.string(), false).read_start(most);
 }
 
 std::string read_named(const std::string& name, std::size_t most)

@@ -29,7 +29,7 @@ inline constexpr std::size_t longest_line = mebibyte;
 std::string read(const std::filesystem::path& file, std::size_t most = largest);
 /** The same of a file that nobody looks at again: this process may write it. */
 std::string read_once(const std::filesystem::path& file, std::size_t most = largest);
-/** The first bytes of a file, at most so many. Throws FileError. */
+/** The first bytes of a file, at most so many; as read_once(), it is not remembered. */
 std::string read_start(const std::filesystem::path& file, std::size_t most);
 /** As read() where "-" is the standard input. */
 std::string read_named(const std::string& name, std::size_t most = largest);

@@ -164,6 +164,7 @@ catch (const board::files::FileError&)
 void show_file(Session& session, const Words& words)
 {
     const std::filesystem::path file = session.file(words.at("FILE"));
+    board::files::note_input(file);
     set_picture(words, { file.filename().string(), std::make_shared<const picture::Image>(read_image(file)) });
 }
 

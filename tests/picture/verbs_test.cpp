@@ -2,8 +2,14 @@
 // What lines of a scenario do with pictures.
 #include <gtest/gtest.h>
 
+#include <sys/stat.h>
+
+#include <chrono>
 #include <filesystem>
 #include <fstream>
+#include <future>
+#include <sstream>
+#include <thread>
 
 #include "board/files.h"
 #include "board/picture/pattern.h"
@@ -163,6 +169,33 @@ TEST_F(PictureFilesOfVerbs, ASource_ShowsAFile)
                               png + "\nexpect picture hdmi 9,9 127,128,0 3"));
     EXPECT_EQ("", diagnostics("PMX_Init\noutputs hdmi=720p60\nsource vdp0 start 1280x720\nsource vdp0 picture " + y4m +
                               "\nexpect picture hdmi 9,9 255,24,0 3"));
+}
+
+/** Others would find a pipe empty. */
+TEST_F(PictureFilesOfVerbs, WithExplanations_AFileIsReadOnce)
+{
+    const std::string pipe = file("pipe");
+    ASSERT_EQ(0, mkfifo(pipe.c_str(), 0600));
+    const auto write = [&](unsigned red, unsigned blue) {
+        const board::picture::Image image(1, 1, board::picture::full_rgb, board::picture::opaque(red, 0, blue));
+        std::ofstream(pipe, std::ios::binary) << board::picture::to_png(image);
+    };
+    std::promise<void> done;
+    std::thread writer([&, is_done = done.get_future()] {
+        write(255, 0);
+        if (is_done.wait_for(std::chrono::seconds(20)) == std::future_status::timeout)
+            write(0, 255); // for whoever waits for the file a second time
+    });
+    const std::string scenario = file_with("here.pmx", "PMX_Init\noutputs hdmi=480p60\nsource vdp0 start 720x480\n"
+                                                       "source vdp0 picture pipe\nexpect picture hdmi 9,9 255,0,0\n");
+    std::ifstream lines(scenario);
+    std::ostringstream shown;
+    std::ostringstream diagnostics;
+    pmxboard::run_scenario(lines, { .name = scenario, .board = "default", .repeat = "again", .explain = true },
+                           { .to = &shown }, diagnostics);
+    done.set_value();
+    writer.join();
+    EXPECT_EQ("", diagnostics.str());
 }
 
 TEST_F(PictureFilesOfVerbs, OfALongFilm_TheFirstFrameIsRead)

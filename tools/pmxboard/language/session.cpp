@@ -264,6 +264,9 @@ bool Session::leads_into_layer(const Line& line)
 {
     static constexpr std::string_view verbs[] = { "outputs",      "ipmx",        "source",  "suspend", "resume",
                                                   "display-part", "video-plane", "advance", "sink" };
+    const bool shows_picture = line.words().size() > 2 && line.word(0) == "source" && line.word(2) == "picture";
+    if (shows_picture)
+        return false;
     return find_command(line.word(0)).operation != nullptr ||
            std::find(std::begin(verbs), std::end(verbs), line.word(0)) != std::end(verbs);
 }

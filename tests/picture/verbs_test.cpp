@@ -139,6 +139,13 @@ TEST_F(PictureFilesOfVerbs, AnotherPicture_IsNotMet_AndTheDifferenceIsKept)
     EXPECT_EQ(32, read(file("hdmi.difference.png")).width());
 }
 
+TEST_F(PictureFilesOfVerbs, APictureOfALargerMode_IsNotMet)
+{
+    const std::string name = file("hdmi.png");
+    EXPECT_EQ("here.pmx:7: expected a picture of 1280x720, found HDMI: 720x480" + repeat,
+              diagnostics(FILM + "shot hdmi " + name + "\noutputs hdmi=480p60 cvbs=480i\nexpect picture hdmi " + name));
+}
+
 TEST_F(PictureFilesOfVerbs, AnExpectedPicture_MayBeTakenAnew)
 {
     const std::string name = file("hdmi.png");

@@ -96,6 +96,7 @@ struct Seen
 {
     picture::Image image;
     std::string description;
+    bool is_enlarged = false; ///< it was smaller than asked for
 };
 
 std::string described(const picture::Shot& shot)
@@ -129,7 +130,10 @@ try
     const auto [width, height] = size.value_or(std::pair(sheet_width, sheet_height));
     Seen seen = seen_on(output, width, height);
     if (size && (seen.image.width() != width || seen.image.height() != height))
+    {
+        seen.is_enlarged = width > seen.image.width() || height > seen.image.height();
         seen.image = picture::scaled(seen.image, width, height);
+    }
     return seen;
 }
 catch (const picture::PictureError& error)
@@ -234,6 +238,9 @@ void expect_file(Session& session, const Words& words)
     const std::filesystem::path file = session.file(words.at("FILE"));
     const picture::Image expected = converted(read_image(file), picture::full_rgb);
     const Seen seen = seen_in_size(words, std::pair(expected.width(), expected.height()));
+    if (seen.is_enlarged)
+        throw StepFailed("expected a picture of " + std::to_string(expected.width()) + "x" +
+                         std::to_string(expected.height()) + ", found " + seen.description);
     const auto found = picture::difference(expected, seen.image, usual_tolerance);
     if (!found)
         return;

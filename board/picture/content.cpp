@@ -110,7 +110,7 @@ Space own_space(const SourceState& source)
         return full_rgb;
     if (source.name == PHOTOGRAPH)
         return ycbcr(Standard::Bt601, Range::Full);
-    return ycbcr(source.delivery->width > 720 || source.delivery->height > 576 ? Standard::Bt709 : Standard::Bt601);
+    return ycbcr(standard_of(source.delivery->width, source.delivery->height));
 }
 
 std::shared_ptr<const Image> content_of(const SourceState& source)

@@ -27,6 +27,11 @@ inline constexpr int longest_side = 8192;
 inline constexpr std::size_t most_pixels = std::size_t{ 1 } << 24;
 
 bool is_picture_size(int width, int height);
+/** That of pictures of which nothing else is known: BT.709 when they are larger than those of SD. */
+constexpr Standard standard_of(int width, int height)
+{
+    return width > 720 || height > 576 ? Standard::Bt709 : Standard::Bt601;
+}
 
 /** Rows of pixels, the uppermost first. */
 class Image
@@ -68,8 +73,8 @@ private:
 Image converted(const Image& image, const Space& to);
 
 /** A picture of a PNG or a Y4M file, of whose frames the first is taken; which of the two it is, its first bytes tell.
- *  A PNG is RGB, and may be transparent. Y4M has the codes of Y'C'BC'R, whose standard the file does not tell: it is to
- *  be set. Colour differences that several pixels share are those of each of them. Throws PictureError. */
+ *  A PNG is RGB, and may be transparent. Y4M has the codes of Y'C'BC'R, whose standard the file does not tell: it is
+ *  that of its size. Colour differences that several pixels share are those of each of them. Throws PictureError. */
 Image read_picture(std::string_view bytes);
 
 /** The bytes of a PNG file. */

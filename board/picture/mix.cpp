@@ -33,7 +33,7 @@ struct Fit
 
 bool is_wide(const Delivery& delivery)
 {
-    return delivery.width > 720 || delivery.height > 576;
+    return standard_of(delivery.width, delivery.height) == Standard::Bt709;
 }
 
 /** Three quarters of a side, in the middle. */
@@ -74,12 +74,12 @@ std::shared_ptr<const Image> fitted(const std::shared_ptr<const Image>& image, c
 }
 
 /** What is delivered, and what the plane makes of it. Of a file in R'G'B' its source makes Y'C'BC'R first. A file in
- *  Y'C'BC'R is of the source's own standard. */
+ *  Y'C'BC'R is of the source's own standard, where that has one. */
 std::vector<Conversion> steps_between(const Space& content, const Space& own, const Space& into)
 {
     std::vector<Conversion> steps;
     Space delivered = content;
-    if (content.kind == Space::Kind::Ycbcr)
+    if (content.kind == Space::Kind::Ycbcr && own.kind == Space::Kind::Ycbcr)
         delivered.standard = own.standard;
     if (delivered.kind != own.kind)
         steps.push_back(conversion(std::exchange(delivered, own), own));

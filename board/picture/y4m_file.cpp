@@ -131,7 +131,8 @@ Image read_y4m(std::string_view bytes)
     const Y4mHeader header = read_header(bytes);
     if (!cut_line(bytes).starts_with(FRAME))
         throw PictureError("no Y4M: there is no frame behind the parameters");
-    Image image(header.width, header.height, ycbcr(Standard::Bt709, header.range), opaque(0, 128, 128));
+    const Standard standard = standard_of(header.width, header.height);
+    Image image(header.width, header.height, ycbcr(standard, header.range), opaque(0, 128, 128));
     const SamplePlane luma = cut_plane(bytes, header, 1, 1);
     const auto [name, across, down] = header.sampling;
     std::optional<SamplePlane> blue;

@@ -133,6 +133,9 @@ TEST(PictureFiles, Y4m_OtherSamplings)
     EXPECT_EQ(opaque('b', 'c', 'd'), read_picture("YUV4MPEG2 W2 H1 C422\nFRAME\nabcd").at(1, 0));
     EXPECT_EQ(opaque('b', 'd', 'f'), read_picture("YUV4MPEG2 W2 H1 C444\nFRAME\nabcdef").at(1, 0));
     EXPECT_EQ(opaque('b', 128, 128), read_picture("YUV4MPEG2 H1 W2 Cmono\nFRAME\nab").at(1, 0));
+    EXPECT_EQ(Standard::Bt601, read_picture("YUV4MPEG2 W2 H1 C422\nFRAME\nabcd").space().standard);
+    EXPECT_EQ(Standard::Bt709,
+              read_picture("YUV4MPEG2 W721 H1 Cmono\nFRAME\n" + std::string(721, 'a')).space().standard);
     EXPECT_EQ(Range::Full, read_picture("YUV4MPEG2 W1 H1 C444 XCOLORRANGE=FULL\nFRAME\nabc").space().range);
 }
 

@@ -66,11 +66,12 @@ Box box_of(const Place& place, int width, int height)
 }
 
 /** Of that size, without a copy where it is of it already. */
-std::shared_ptr<const Image> fitted(const std::shared_ptr<const Image>& image, const Box& part, int width, int height)
+std::shared_ptr<const Image> fitted(const std::shared_ptr<const Image>& image, const Box& part, int width, int height,
+                                    unsigned threads)
 {
     if (part == Box{ 0, 0, width, height } && image->width() == width && image->height() == height)
         return image;
-    return std::make_shared<const Image>(scaled(*image, part, width, height));
+    return std::make_shared<const Image>(scaled(*image, part, width, height, threads));
 }
 
 /** What is delivered, and what the plane makes of it. Of a file in R'G'B' its source makes Y'C'BC'R first. A file in
@@ -88,7 +89,7 @@ std::vector<Conversion> steps_between(const Space& content, const Space& own, co
     return steps;
 }
 
-std::optional<Layer> video_layer(const Hardware& hardware, unsigned number, int width, int height)
+std::optional<Layer> video_layer(const Hardware& hardware, unsigned number, int width, int height, unsigned threads)
 {
     const SourceState& source = hardware.sources[number];
     const std::shared_ptr<const Image> content = content_of(source);
@@ -107,8 +108,8 @@ std::optional<Layer> video_layer(const Hardware& hardware, unsigned number, int 
         return layer;
     }
     const Space own = own_space(source);
-    layer.image =
-        fitted(content, box_of(fit.part, content->width(), content->height()), layer.place.width, layer.place.height);
+    layer.image = fitted(content, box_of(fit.part, content->width(), content->height()), layer.place.width,
+                         layer.place.height, threads);
     layer.steps = steps_between(content->space(), own, ycbcr(source.told, own.range));
     layer.luma_key = source.delivery->luma_key;
     layer.opaque = layer.luma_key == 0 && layer.image->is_opaque();
@@ -133,18 +134,18 @@ std::optional<unsigned> source_of_port(const Hardware& hardware, unsigned port)
     return std::nullopt;
 }
 
-std::optional<Layer> layer_of(const Hardware& hardware, unsigned input, int width, int height)
+std::optional<Layer> layer_of(const Hardware& hardware, unsigned input, int width, int height, unsigned threads)
 {
     if (input <= SECOND_VIDEO_PORT)
     {
         const auto number = source_of_port(hardware, input);
-        return number ? video_layer(hardware, *number, width, height) : std::nullopt;
+        return number ? video_layer(hardware, *number, width, height, threads) : std::nullopt;
     }
     if (input >= plane_count)
         return std::nullopt;
     const Range range = hardware.osd.full_range ? Range::Full : Range::Limited;
     return graphics_layer(hardware.sources[video_source_count + input - FIRST_OSD_INPUT], width, height,
-                          ycbcr(hardware.osd.told, range));
+                          ycbcr(hardware.osd.told, range), threads);
 }
 
 /* Rows */
@@ -221,11 +222,11 @@ Image mixed_bars(const Hardware& hardware, const Raster& raster)
     return bars(raster.width, raster.height, space, static_cast<double>(width) * raster.width / whole.width);
 }
 
-std::vector<Layer> layers_of(const Hardware& hardware, const Raster& raster, bool only_main_video)
+std::vector<Layer> layers_of(const Hardware& hardware, const Raster& raster, unsigned threads, bool only_main_video)
 {
     std::vector<Layer> layers;
     const auto add = [&](unsigned input) {
-        if (auto layer = layer_of(hardware, input, raster.width, raster.height))
+        if (auto layer = layer_of(hardware, input, raster.width, raster.height, threads))
             layers.push_back(std::move(*layer));
     };
     if (only_main_video)
@@ -264,14 +265,15 @@ unsigned input_of(const MixerState& mixer, unsigned plane)
     return inputs[plane];
 }
 
-std::optional<Layer> graphics_layer(const SourceState& source, int width, int height, const Space& into)
+std::optional<Layer> graphics_layer(const SourceState& source, int width, int height, const Space& into,
+                                    unsigned threads)
 {
     const std::shared_ptr<const Image> content = content_of(source);
     if (content == nullptr)
         return std::nullopt;
     Layer layer;
     layer.place = { 0, 0, width, height };
-    layer.image = fitted(content, { 0, 0, content->width(), content->height() }, width, height);
+    layer.image = fitted(content, { 0, 0, content->width(), content->height() }, width, height, threads);
     layer.steps = steps_between(content->space(), own_space(source), into);
     layer.opaque = layer.image->is_opaque();
     return layer;
@@ -297,7 +299,7 @@ Image mixed_picture(const Hardware& hardware, const Raster& raster, unsigned thr
         bars.set_space(image.space());
         return bars;
     }
-    const std::vector<Layer> layers = layers_of(hardware, raster, only_main_video);
+    const std::vector<Layer> layers = layers_of(hardware, raster, threads, only_main_video);
     const Adjustment adjustment = adjustment_of(mixer);
     in_bands(raster.height, threads, [&](int from, int to) {
         std::vector<Pixel> room;

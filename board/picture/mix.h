@@ -26,7 +26,8 @@ struct Layer
     bool opaque = false;
 };
 /** An OSD plane that fills a picture of this size, in a space; nothing where it delivers none. */
-std::optional<Layer> graphics_layer(const SourceState& source, int width, int height, const Space& into);
+std::optional<Layer> graphics_layer(const SourceState& source, int width, int height, const Space& into,
+                                    unsigned threads);
 /** Lay it over a picture of any size. */
 void lay_over(Image& image, const Layer& layer);
 

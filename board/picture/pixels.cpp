@@ -62,13 +62,13 @@ unsigned thread_count(int height, unsigned wanted)
 
 } // namespace
 
-Image scaled(const Image& image, const Box& part, int width, int height)
+Image scaled(const Image& image, const Box& part, int width, int height, unsigned threads)
 {
     Image result(width, height, image.space());
     result.set_opaque(image.is_opaque());
     const double across = static_cast<double>(part.width) / width;
     const double down = static_cast<double>(part.height) / height;
-    in_bands(height, 0, [&](int from, int to) {
+    in_bands(height, threads, [&](int from, int to) {
         const PixmanImage source = bits_of(image.pixels().data(), image.width(), image.width(), image.height());
         pixman_transform_t transform;
         pixman_transform_init_scale(&transform, pixman_double_to_fixed(across), pixman_double_to_fixed(down));
@@ -83,9 +83,9 @@ Image scaled(const Image& image, const Box& part, int width, int height)
     return result;
 }
 
-Image scaled(const Image& image, int width, int height)
+Image scaled(const Image& image, int width, int height, unsigned threads)
 {
-    return scaled(image, { 0, 0, image.width(), image.height() }, width, height);
+    return scaled(image, { 0, 0, image.width(), image.height() }, width, height, threads);
 }
 
 void lay_over(const Pixel* above, int above_pitch, Pixel* below, int below_pitch, int width, int height)

@@ -22,9 +22,9 @@ struct Box
     bool operator==(const Box&) const = default;
 };
 
-/** Part of a picture, scaled. Throws PictureError for a size that no picture has. */
-Image scaled(const Image& image, const Box& part, int width, int height);
-Image scaled(const Image& image, int width, int height);
+/** Part of a picture, scaled in so many threads as in_bands(). Throws PictureError for a size that no picture has. */
+Image scaled(const Image& image, const Box& part, int width, int height, unsigned threads = 0);
+Image scaled(const Image& image, int width, int height, unsigned threads = 0);
 
 /** Lay rows of pixels, so many in a row, over others. Opaque pixels simply take their place. */
 void lay_over(const Pixel* above, int above_pitch, Pixel* below, int below_pitch, int width, int height);

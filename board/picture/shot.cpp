@@ -140,7 +140,7 @@ public:
     {
         const Raster out = reduced(composite_raster(m_hardware.encoders[1]), m_effort.divisor);
         const bool in_sd = m_raster.has_converters && m_raster.standard == Standard::Bt601;
-        Image image = scaled(in_sd ? main() : m_mixed, out.width, out.height);
+        Image image = scaled(in_sd ? main() : m_mixed, out.width, out.height, m_effort.threads);
         if (!in_sd)
             image = behind(m_hardware.mixer.scaler_converter, std::move(image));
         image.set_space(ycbcr(out.standard));
@@ -160,8 +160,9 @@ private:
     Image fitted_to(unsigned mode, const Image& main) const
     {
         const Raster out = reduced(*raster_of(mode), m_effort.divisor);
-        Image image =
-            main.width() == out.width && main.height() == out.height ? main : scaled(main, out.width, out.height);
+        Image image = main.width() == out.width && main.height() == out.height
+                          ? main
+                          : scaled(main, out.width, out.height, m_effort.threads);
         if (mode != *m_hardware.mixer.mode && out.standard != m_raster.standard)
             convert_rows(image, conversion(ycbcr(m_raster.standard), ycbcr(out.standard)), m_effort.threads);
         image.set_space(ycbcr(out.standard));
@@ -233,7 +234,8 @@ Image seen(Image image, const Space& wire, unsigned threads)
     return image;
 }
 
-Image analogue_picture(Image image, const EncoderState& encoder, const Hardware& hardware, bool has_fifth_osd)
+Image analogue_picture(Image image, const EncoderState& encoder, const Hardware& hardware, bool has_fifth_osd,
+                       unsigned threads)
 {
     if (encoder.black)
     {
@@ -242,21 +244,23 @@ Image analogue_picture(Image image, const EncoderState& encoder, const Hardware&
     }
     if (has_fifth_osd)
         if (const auto layer =
-                graphics_layer(hardware.sources[FIFTH_OSD], image.width(), image.height(), image.space()))
+                graphics_layer(hardware.sources[FIFTH_OSD], image.width(), image.height(), image.space(), threads))
             lay_over(image, *layer);
     adjust_by(image, hardware.analogue);
     return image;
 }
 
-Image signal_of(const Frame& frame, const Hardware& hardware, OutputId output)
+Image signal_of(const Frame& frame, const Hardware& hardware, OutputId output, unsigned threads)
 {
     switch (output)
     {
     case OutputId::Digital: return frame.digital();
     case OutputId::Component:
-        return analogue_picture(frame.component(), hardware.encoders[0], hardware, hardware.osd.fifth_on_component);
+        return analogue_picture(frame.component(), hardware.encoders[0], hardware, hardware.osd.fifth_on_component,
+                                threads);
     case OutputId::Composite:
-        return analogue_picture(frame.composite(), hardware.encoders[1], hardware, hardware.osd.fifth_on_composite);
+        return analogue_picture(frame.composite(), hardware.encoders[1], hardware, hardware.osd.fifth_on_composite,
+                                threads);
     case OutputId::Hdmi: break;
     }
     Image image = frame.hdmi();
@@ -274,7 +278,7 @@ Shot shot_in(std::optional<Frame>& frame, const Hardware& hardware, OutputId out
     }
     if (!frame)
         frame.emplace(hardware, effort);
-    Image signal = signal_of(*frame, hardware, output);
+    Image signal = signal_of(*frame, hardware, output, effort.threads);
     const Space wire = on_the_wire(output, hardware, signal.space().standard);
     shot.picture = seen(std::move(signal), wire, effort.threads);
     shot.picture.set_opaque(true);

@@ -210,11 +210,14 @@ static PMX_SHARED UINT32* pu4Operation(PMX_EVENT_T* prEvent, UINT32 u4Head)
     return pu4Begin(prEvent, u4Head);
 }
 
+/* It runs until its end has its place: a snapshot that somebody takes stands behind that. */
 static PMX_SHARED UINT32* pu4Done(const PMX_EVENT_T* prEvent, UINT32 u4Answer, UINT32 u4Words)
 {
+    UINT32* pu4To;
     vLeaveAll();
+    pu4To = pu4End(prEvent, u4Answer, u4Words);
     PMX_RECORDER_ADD(&rNow.u4Running, 0xFFFFFFFFu);
-    return pu4End(prEvent, u4Answer, u4Words);
+    return pu4To;
 }
 
 static inline UINT32 u4Place(UINT32 u4Where)

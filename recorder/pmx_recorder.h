@@ -47,7 +47,8 @@ typedef DRV_ENUM(PMX_RECORDER_KIND_T)
     PMX_RECORDER_CALL = 2,      /**< the layer calls somebody */
     PMX_RECORDER_RETURN = 3,    /**< either of them ends, and something came between */
     PMX_RECORDER_CHANGE = 4,    /**< a neighbour has written into the layer's objects */
-    PMX_RECORDER_SNAPSHOT = 5   /**< the whole state, while no operation runs */
+    PMX_RECORDER_SNAPSHOT = 5,  /**< the whole state, while no operation runs */
+    PMX_RECORDER_NOTHING = 6    /**< what was to be one, and an operation began meanwhile */
 } PMX_RECORDER_KIND_T;
 #define PMX_RECORDER_ANSWERED 0x80u
 

@@ -97,17 +97,22 @@ static void vTakeState(UINT32* pu4To, UINT32 u4Size)
 }
 
 /* It as an event. */
-static UINT32 u4WriteState(UINT32 u4Kind, UINT32 u4Size)
+static void vWriteState(PMX_EVENT_T* prEvent, UINT32 u4Kind, UINT32 u4Size)
 {
-    PMX_EVENT_T rEvent;
-    vTakeState(pu4Begin(&rEvent, u4Kind << 8 | (2 + PMX_WORDS(u4Size))) - 1, u4Size);
-    return rEvent.u4End - (rEvent.u4Head & 0xFF);
+    vTakeState(pu4Begin(prEvent, u4Kind << 8 | (2 + PMX_WORDS(u4Size))) - 1, u4Size);
 }
 
+/* While it is copied others may enter and store: whoever does has taken a place first. Then it says nothing, and the
+ * next operation that finds nobody inside takes another. */
 static PMX_RARE void vTakeSnapshot(void)
 {
     PMX_RECORDER_T* const prRecorder = rNow.prRecorder;
-    rNow.u4LastSnapshot = u4WriteState(PMX_RECORDER_SNAPSHOT, PMX_STATE_SIZE);
+    PMX_EVENT_T rEvent;
+    vWriteState(&rEvent, PMX_RECORDER_NOTHING, PMX_STATE_SIZE);
+    if (PMX_RECORDER_LOAD(&prRecorder->u4Head) != rEvent.u4End)
+        return;
+    rEvent.pu4Words[0] = rEvent.u4Head ^ (PMX_RECORDER_NOTHING ^ PMX_RECORDER_SNAPSHOT) << 8;
+    rNow.u4LastSnapshot = rEvent.u4End - (rEvent.u4Head & 0xFF);
     prRecorder->au4Snapshot[prRecorder->u4SnapshotCount % PMX_RECORDER_SNAPSHOTS] = rNow.u4LastSnapshot;
     ++prRecorder->u4SnapshotCount;
 }
@@ -138,18 +143,19 @@ static inline void vLeaveAll(void)
 static PMX_RARE void vEnterChanged(void)
 {
     UINT32 au4Now[PMX_WORDS(PMX_STATE_SIZE)];
+    PMX_EVENT_T rEvent;
     UINT32 u4Differs = 0;
     UINT32 i;
     if (rNow.pu4Thread != u4WatchAll)
     {
-        u4WriteState(PMX_RECORDER_CHANGE, PMX_EXPORTED_SIZE);
+        vWriteState(&rEvent, PMX_RECORDER_CHANGE, PMX_EXPORTED_SIZE);
         return;
     }
     vTakeState(au4Now, PMX_STATE_SIZE);
     for (i = 0; i < PMX_WORDS(PMX_STATE_SIZE); ++i)
         u4Differs |= au4Now[i] ^ au4Shadow[i];
     if (u4Differs != 0)
-        u4WriteState(PMX_RECORDER_CHANGE, PMX_STATE_SIZE);
+        vWriteState(&rEvent, PMX_RECORDER_CHANGE, PMX_STATE_SIZE);
 }
 
 /* The layer is entered: what did they write? */

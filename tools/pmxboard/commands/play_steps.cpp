@@ -56,7 +56,7 @@ public:
                 end(event.words[1], event.words[0], { event.words.begin() + 2, event.words.end() });
             else if (event.kind == PMX_RECORDER_CHANGE && m_command != 0)
                 change(event);
-            else if (m_command == 0)
+            else if (m_command == 0 && event.kind != PMX_RECORDER_NOTHING)
                 begin_with(event);
         }
         return { std::move(m_state), std::move(m_steps) };

@@ -152,6 +152,8 @@ std::string described(const Event& event, const Event* begin, const TextNames& t
         return "snapshot";
     if (event.kind == PMX_RECORDER_CHANGE)
         return "changed from outside";
+    if (event.kind == PMX_RECORDER_NOTHING)
+        return "no snapshot: an operation began meanwhile";
     if (event.kind == PMX_RECORDER_RETURN && begin == nullptr)
         return "end of something before";
     if (event.kind == PMX_RECORDER_RETURN)
@@ -181,7 +183,7 @@ std::string quoted(const std::string& text)
 
 const char* kind_name(const Event& event)
 {
-    static constexpr const char* names[] = { "", "operation", "call", "return", "change", "snapshot" };
+    static constexpr const char* names[] = { "", "operation", "call", "return", "change", "snapshot", "nothing" };
     return names[event.kind];
 }
 

@@ -95,6 +95,7 @@ std::string wrong_with(const Event& event, const PMX_RECORDER_T& header)
                    ? "it is no state"
                    : "";
     case PMX_RECORDER_SNAPSHOT: return event.words.size() != (header.u4StateSize + 3) / 4 ? "it is no state" : "";
+    case PMX_RECORDER_NOTHING: return "";
     }
     return "no such kind of event";
 }

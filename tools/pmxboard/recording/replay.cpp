@@ -94,6 +94,11 @@ std::string record_text()
     return {};
 }
 
+bool happens_in_a_thread(const Event& event)
+{
+    return event.kind == PMX_RECORDER_OPERATION || event.kind == PMX_RECORDER_CALL || event.kind == PMX_RECORDER_RETURN;
+}
+
 class Performance
 {
 public:
@@ -169,10 +174,13 @@ void Performance::settle()
         const Event& event = m_events[m_next];
         if (event.kind == PMX_RECORDER_CHANGE || m_next == 0)
             set_state(event.words);
-        else if (event.kind != PMX_RECORDER_SNAPSHOT)
+        else if (happens_in_a_thread(event))
             break;
-        else if (const std::string found = difference(event.words); !found.empty())
-            return depart("snapshot", "another record", found);
+        else if (event.kind == PMX_RECORDER_SNAPSHOT)
+        {
+            if (const std::string found = difference(event.words); !found.empty())
+                return depart("snapshot", "another record", found);
+        }
         ++m_verdict.events;
     }
     m_is_over = m_is_over || m_next == m_events.size();
@@ -195,8 +203,7 @@ bool Performance::is_my_turn() const
 {
     if (m_next == m_events.size())
         return false;
-    const Event& event = m_events[m_next];
-    return event.thread == my_thread && event.kind != PMX_RECORDER_CHANGE && event.kind != PMX_RECORDER_SNAPSHOT;
+    return m_events[m_next].thread == my_thread && happens_in_a_thread(m_events[m_next]);
 }
 
 /** False when there is nothing left to do. */

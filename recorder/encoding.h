@@ -32,6 +32,14 @@ void* memset(void* pvDest, int iValue, size_t zSize);
 #define PMX_MOST_VALUES 16u     /* that go with a format */
 #define PMX_ROOM 160u           /* words in which the arguments of an event are gathered */
 
+/* Where the caller's variables stand: behind this, in so many bytes. */
+#define PMX_CALLER 4096u
+#ifdef __GNUC__
+#define PMX_FRAME(pvLocal) __builtin_frame_address(0)
+#else
+#define PMX_FRAME(pvLocal) (pvLocal)
+#endif
+
 /* What is to be known of a format: how many values it takes, and above that a bit for each that is a text. */
 #define PMX_CODE_COUNT(u4Code) ((u4Code)&31u)
 #define PMX_CODE_TEXTS(u4Code) ((u4Code) >> 5 & 0xFFFFu)
@@ -140,6 +148,13 @@ static inline void vPmxCollect(UINT32 u4Code, va_list rArgs, long* piValues)
     UINT32 i;
     for (i = 0; i < PMX_CODE_COUNT(u4Code); ++i)
         piValues[i] = va_arg(rArgs, long);
+}
+
+/* The layer prints what it has made on the stack as a format once more, without values: what would be taken for them is
+ * another thing each time, and no text. The formats of its own that it prints so have numbers alone. */
+static inline UINT32 u4PmxNumbersAlone(UINT32 u4Code, const char* szFormat, const void* pvFrame)
+{
+    return (size_t)szFormat - (size_t)pvFrame < PMX_CALLER ? 0 : PMX_CODE_COUNT(u4Code);
 }
 
 /* The same as words. A text from outside is kept whole, one of the layer as its check sum. */

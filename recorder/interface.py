@@ -20,6 +20,8 @@ TABLES = ("_rPMXIF", "pmx_pm_ops")
 SYMBOLS = {"_PMX_TmrIsr": "PMX_SYMBOL_ISR", "_rPMXIF": "PMX_SYMBOL_TABLE", "pmx_pm_ops": "PMX_SYMBOL_POWER"}
 # These are handed texts that somebody else made, too. All other texts that the layer hands over are its own, and stay.
 FROM_OUTSIDE = ("x_vsnprintf", "UTIL_Printf")
+# This one also gets a text that was made from a format, and no values with it.
+PRINTS_WHAT_WAS_MADE = "UTIL_Printf"
 
 
 def constant(name):
@@ -114,7 +116,10 @@ def encoding(function, is_operation):
         name = parameter.name
         if parameter.kind in ("values", "list"):
             whole = "true" if is_operation else "false"
-            lines.append(f"u4Used = u4PmxPutValues(au4Words, u4Used, u4Code, aiValues, {whole});")
+            code = "u4Code"
+            if function.name == PRINTS_WHAT_WAS_MADE:
+                code = f"u4PmxNumbersAlone(u4Code, {previous}, PMX_FRAME(au4Words))"
+            lines.append(f"u4Used = u4PmxPutValues(au4Words, u4Used, {code}, aiValues, {whole});")
         elif parameter.kind == "tag":
             lines.append(f"au4Words[u4Used++] = (UINT32)(size_t){name};")
         elif parameter.kind == "symbol":

@@ -101,28 +101,25 @@ static inline UINT32 u4PmxPutBytes(UINT32* pu4Words, UINT32 u4At, const void* pv
     return u4PmxPutRaw(pu4Words, u4At + 1, pvBytes, u4Size);
 }
 
-/* The next value that a format takes, behind its letters: 's' for a text, 'd' for anything else, 0 for none. */
-static inline char cPmxNextValue(const char** pszFormat)
+/* The next value that a format takes, behind its letters: 's' for a text, 'd' for anything else, 0 for none. Behind a
+ * width that is a value what it is the width of still goes on. */
+static inline char cPmxNextValue(const char** pszFormat, bool* pfgInside)
 {
     const char* szAt = *pszFormat;
-    bool fgInside = false;
     char cFound = 0;
     for (; *szAt != 0 && cFound == 0; ++szAt)
     {
         const char c = *szAt;
-        if (!fgInside)
-            fgInside = c == '%';
+        if (!*pfgInside)
+            *pfgInside = c == '%';
         else if (c == '%')
-            fgInside = false;
+            *pfgInside = false;
         else if (c == 's')
             cFound = 's';
-        else if (c == '*') /* its width; what it is the width of comes next */
-        {
-            *pszFormat = szAt + 1;
-            return 'd';
-        }
-        else if ((c >= 'a' && c <= 'z' && c != 'h' && c != 'l' && c != 'z') || (c >= 'A' && c <= 'Z'))
+        else if (c == '*' || (c >= 'a' && c <= 'z' && c != 'h' && c != 'l' && c != 'z') || (c >= 'A' && c <= 'Z'))
             cFound = 'd';
+        if (cFound != 0)
+            *pfgInside = c == '*';
     }
     *pszFormat = szAt;
     return cFound;
@@ -133,10 +130,11 @@ static inline UINT32 u4PmxCode(const char* szFormat)
 {
     UINT32 u4Count = 0;
     UINT32 u4Texts = 0;
+    bool fgInside = false;
     char c;
     if (szFormat == 0)
         return 0;
-    while (u4Count < PMX_MOST_VALUES && (c = cPmxNextValue(&szFormat)) != 0)
+    while (u4Count < PMX_MOST_VALUES && (c = cPmxNextValue(&szFormat, &fgInside)) != 0)
         u4Texts |= (c == 's' ? 1u : 0u) << u4Count++;
     return u4Texts << 5 | u4Count;
 }

@@ -3,20 +3,44 @@
  * here, which outlives the program as a product's memory outlives a crash.
  *
  * usage: product FILE EVENT     the program kills itself inside that event, counted from 1; 0: never
- *        product +|- CHANGES     changes the mode so often, with a recorder or without; for counting instructions */
+ *        product +|- CHANGES     changes the mode so often, with a recorder or without; for counting instructions
+ *        product print FILE|-    prints texts with values, with a recorder or without */
 #define _DEFAULT_SOURCE
 #include <fcntl.h>
 #include <signal.h>
+#include <stdio.h>
 #include <stdlib.h>
 #include <string.h>
 #include <sys/mman.h>
 #include <unistd.h>
 
+#include "u_os.h"
+
+/* The skeleton prints nothing. */
+#define x_vsnprintf iSkeletonFormats
+#define UTIL_Printf vSkeletonPrints
 #include "port_skeleton.c" // NOLINT(bugprone-suspicious-include): a stack is one program here
+#undef x_vsnprintf
+#undef UTIL_Printf
 
 #include "pmx_recorder.h"
 
 #define MEMORY_SIZE PMX_RECORDER_MEMORY(65536)
+
+static BOOL fgPrints;
+
+INT32 x_vsnprintf(CHAR* szBuffer, size_t zSize, const CHAR* szFormat, va_list rArgs)
+{
+    return fgPrints != FALSE ? vsnprintf(szBuffer, zSize, szFormat, rArgs)
+                             : iSkeletonFormats(szBuffer, zSize, szFormat, rArgs);
+}
+
+/* As a format once more, and no value of it is looked at. */
+void UTIL_Printf(const CHAR* szFormat, ...)
+{
+    if (fgPrints != FALSE)
+        puts(szFormat);
+}
 
 static UINT32 u4Events;
 static UINT32 u4LastEvent;
@@ -64,6 +88,19 @@ static int iRecordInto(const char* szFile)
     return 0;
 }
 
+static int iPrint(const char* szFile)
+{
+    if (strcmp(szFile, "-") != 0 && iRecordInto(szFile) != 0)
+        return 1;
+    PMX_Init();
+    fgPrints = TRUE;
+    PMX_debug_level = 1;
+    PMX_Printf(0, "%*d %s", 7, 42, "behind a width");
+    PMX_Printf(0, "%.*s, %-*.*s.", 3, "three four", 6, 2, "two");
+    PMX_Printf(0, "%ld%% and %5s, %%s %%d", 12345678L, "so");
+    return 0;
+}
+
 int main(int iCount, char** pszWords)
 {
     static UINT32 au4Memory[MEMORY_SIZE / 4];
@@ -71,6 +108,8 @@ int main(int iCount, char** pszWords)
     const UINT32 u4Number = iCount == 3 ? (UINT32)atoi(pszWords[2]) : 0;
     if (iCount != 3)
         return 2;
+    if (strcmp(pszWords[1], "print") == 0)
+        return iPrint(pszWords[2]);
     if (pszWords[1][0] == '-' || pszWords[1][0] == '+')
     {
         if (pszWords[1][0] == '+' && fgPmxRecorderStart(&rHow) == FALSE)

@@ -195,6 +195,14 @@ class Replay(unittest.TestCase):
         self.assertGreater(int(ended.stdout.split("lost before: ")[1].split()[0]), 65536)
         self.assertGreaterEqual(int(ended.stdout.split()[1]), 2 * 20)
 
+    def test_a_recorder_prints_what_is_printed_without(self):
+        printed = [subprocess.run([PRODUCT, "print", file], check=True, timeout=60, stdout=subprocess.PIPE,
+                                  text=True).stdout for file in ("-", self.file)]
+        self.assertEqual("     42 behind a width\nthr, tw    .\n12345678% and    so, %s %d\n", printed[0])
+        self.assertEqual(printed[0], printed[1])
+        ended = self.run_tool("replay", self.file)
+        self.assertEqual(0, ended.returncode, ended.stdout + ended.stderr)
+
     def test_what_is_left_after_a_crash(self):
         for event in (2, 3, 50, 777, 2000, 30001):
             ended = subprocess.run([PRODUCT, self.file, str(event)], check=False, timeout=60)

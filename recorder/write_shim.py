@@ -293,6 +293,8 @@ static UINT32 u4OfferTable(void** ppvIf)
 {
     const IVdp* const prReal = (const IVdp*)*ppvIf;
     UINT32 i;
+    if (prReal == 0)
+        return PMX_SYMBOL_NULL;
     for (i = 0; i < PLANES && aprPlane[i] != prReal && aprPlane[i] != 0; ++i)
     {
     }

@@ -35,12 +35,6 @@ std::size_t take_arguments(const Described& function, bool is_operation, std::ve
     return at;
 }
 
-bool hands_out_table(const Described& function)
-{
-    const auto& all = function.parameters;
-    return std::any_of(all.begin(), all.end(), [](const auto& parameter) { return parameter.kind == "table"; });
-}
-
 class StepReader
 {
 public:

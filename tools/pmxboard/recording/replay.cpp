@@ -112,6 +112,7 @@ private:
 
     void perform(unsigned thread);
     void run_operation(Lock& lock);
+    Answer answered(const Described& function, std::uint32_t answer, std::span<const std::uint32_t> written);
     void end_operation(Lock& lock, const Event& begin, std::uint32_t answer, const std::vector<UINT32>& written);
     const Event& take();
     bool is_my_turn() const;
@@ -235,20 +236,31 @@ Answer Performance::call(unsigned function, std::span<const UINT32> words, std::
     }
     take();
     if (begin.is_answered)
-        return { begin.words[0], given.subspan(words.size()) };
+        return answered(called, begin.words[0], given.subspan(words.size()));
     while (wait_for_turn(lock))
     {
         const Event& event = m_events[m_next];
         if (event.kind == PMX_RECORDER_RETURN && event.words[1] == begin.at)
         {
             take();
-            return { event.words[0], event.words.subspan(2) };
+            return answered(called, event.words[0], event.words.subspan(2));
         }
         if (event.kind == PMX_RECORDER_OPERATION)
             run_operation(lock);
         else
             depart(next_text(), "nothing: " + called.name + " has not returned", "the recording contradicts itself");
     }
+    return {};
+}
+
+/** Without a table in it the layer would call nothing. */
+Answer Performance::answered(const Described& function, std::uint32_t answer, std::span<const std::uint32_t> written)
+{
+    const bool lacks_table = static_cast<INT32>(answer) >= 0 && (written.empty() || written.front() == 0);
+    if (!lacks_table || !hands_out_table(function))
+        return { answer, written };
+    depart("end of " + function.name + " = " + described_answer(function, answer), "nothing: no table was handed out",
+           "the recording contradicts itself");
     return {};
 }
 

@@ -85,9 +85,9 @@ void Answer::write_text(char* place, std::size_t size)
 
 void Answer::write_table(void** place, const void* table)
 {
-    const auto word = next(1);
+    next(1);
     if (place != nullptr && static_cast<INT32>(number) >= 0)
-        *place = word.empty() || word[0] != 0 ? const_cast<void*>(table) : nullptr;
+        *place = const_cast<void*>(table);
 }
 
 void Answer::write_tag(void** place)
@@ -95,6 +95,12 @@ void Answer::write_tag(void** place)
     const auto word = next(1);
     if (place != nullptr && !word.empty())
         *place = reinterpret_cast<void*>(std::uintptr_t{ word[0] });
+}
+
+bool hands_out_table(const Described& function)
+{
+    const auto& all = function.parameters;
+    return std::any_of(all.begin(), all.end(), [](const auto& parameter) { return parameter.kind == "table"; });
 }
 
 const ReplayedLayer& replayed_layer()

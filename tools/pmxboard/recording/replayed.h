@@ -81,6 +81,9 @@ struct Described
     std::vector<DescribedParameter> parameters;
 };
 
+/** What it answers leads to a table through which the layer calls. */
+bool hands_out_table(const Described& function);
+
 struct ReplayedOperation
 {
     Described described;

@@ -26,7 +26,7 @@ std::string_view shade_of(Pixel upper, Pixel lower)
     unsigned sum = 0;
     for (const Pixel pixel : { upper, lower })
         sum += 2 * code(pixel, 0) + 7 * code(pixel, 1) + code(pixel, 2);
-    return SHADES[sum * SHADES.size() / (2 * 10 * 256)];
+    return SHADES[sum * SHADES.size() / (2UL * 10 * 256)];
 }
 
 } // namespace

@@ -181,7 +181,9 @@ TEST_F(PictureFilesOfVerbs, ASource_ShowsAFile)
 /** Others would find a pipe empty. */
 TEST_F(PictureFilesOfVerbs, AY4mWithoutAVideoSource_IsOfTheStandardOfItsSize)
 {
-    const std::string red = file_with("red.y4m", "YUV4MPEG2 W1 H1 C444\nFRAME\n\x51\x5A\xF0"); // by BT.601
+    const auto plane = [](char sample) { return std::string(std::size_t{ 64 } * 36, sample); };
+    const std::string red = file_with("red.y4m", "YUV4MPEG2 W64 H36 C444\nFRAME\n" + plane('\x51') + plane('\x5A') +
+                                                     plane('\xF0')); // by BT.601
     const std::string outputs = "PMX_Init\noutputs hdmi=720p60 cvbs=480i\nsource osd0 start 1280x720 rgb\n";
     EXPECT_EQ("", diagnostics(outputs + "source osd0 picture " + red + "\nexpect picture hdmi 9,9 255,0,0\n" +
                               "expect picture cvbs " + red));

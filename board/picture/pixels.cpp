@@ -64,6 +64,14 @@ unsigned thread_count(int height, unsigned wanted)
 
 Image scaled(const Image& image, const Box& part, int width, int height, unsigned threads)
 {
+    // The shares of pixels that make one have 16 bits: of too many each would be nothing. They go by several steps.
+    constexpr int most = 16;
+    if (width > 0 && height > 0 && (part.width > most * width || part.height > most * height))
+    {
+        const int across = std::max(width, (part.width + most - 1) / most);
+        const int down = std::max(height, (part.height + most - 1) / most);
+        return scaled(scaled(image, part, across, down, threads), width, height, threads);
+    }
     Image result(width, height, image.space());
     result.set_opaque(image.is_opaque());
     const double across = static_cast<double>(part.width) / width;

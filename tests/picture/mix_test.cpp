@@ -260,6 +260,20 @@ TEST(Mix, ManyThreads_MakeTheSamePicture)
     EXPECT_TRUE(std::equal(one.pixels().begin(), one.pixels().end(), many.pixels().begin()));
 }
 
+TEST(Scaled, HoweverSmall_APictureKeepsItsLight)
+{
+    const Pixel grey = opaque(200, 200, 200);
+    const Image wide(1920, 1080, full_rgb, grey);
+    for (const auto& [width, height] : { std::pair{ 1, 1 }, { 19, 10 }, { 50, 1 }, { 2, 1080 }, { 100, 56 } })
+    {
+        const Image small = scaled(wide, width, height);
+        EXPECT_EQ(width, small.width());
+        EXPECT_EQ(height, small.height());
+        for (unsigned index = 0; index < 3; ++index)
+            EXPECT_NEAR(200, code(small.at(width / 2, height / 2), index), 2) << width;
+    }
+}
+
 TEST(Bands, WhatTheWorkThrows_IsThrown)
 {
     const auto work = [](int from, int) {

@@ -15,7 +15,6 @@ namespace
 
 constexpr std::string_view PHOTOGRAPH = "vdp2";
 constexpr std::array<std::string_view, 2> SECOND_VIDEOS = { "vdp1", "vdp3" };
-constexpr std::array<std::string_view, 4> PATTERNS = { "bars", "ramp", "checker", "card" };
 
 /** The card of a source: those of video planes fill the picture, those of graphics let it be seen. */
 struct NamedStyle
@@ -120,11 +119,6 @@ std::shared_ptr<const Image> content_of(const SourceState& source)
     if (source.image != nullptr)
         return source.image;
     return made_pattern(source, own_space(source));
-}
-
-bool is_pattern(std::string_view word)
-{
-    return std::find(PATTERNS.begin(), PATTERNS.end(), word) != PATTERNS.end();
 }
 
 std::string solid_name(unsigned red, unsigned green, unsigned blue)

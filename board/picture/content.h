@@ -22,8 +22,6 @@ Space own_space(const SourceState& source);
  *  size that no picture has. */
 std::shared_ptr<const Image> content_of(const SourceState& source);
 
-/** Whether a word says what a source may show without a file: bars, ramp, checker, card. */
-bool is_pattern(std::string_view word);
 /** The name of a picture of one colour. */
 std::string solid_name(unsigned red, unsigned green, unsigned blue);
 

@@ -95,6 +95,11 @@ TEST(PictureVerbs, WrongLines_AreToldApart)
     EXPECT_EQ("here.pmx:1: write: shot OUTPUT, or shot OUTPUT FILE [SIZE]; SIZE is 1920x1080 or the like; OUTPUT is "
               "digital, hdmi, component or composite (cvbs)\n",
               diagnostics("shot"));
+    EXPECT_EQ("here.pmx:1: there is no output al; did you mean all, cav?\n", diagnostics("shot al"));
+    EXPECT_EQ("here.pmx:1: there is no output ccr; did you mean ccir, cav?\n", diagnostics("shot ccr"));
+    EXPECT_EQ("here.pmx:1: a size stands behind its file; write: shot OUTPUT FILE SIZE\n",
+              diagnostics("shot hdmi 640x360"));
+    EXPECT_EQ("here.pmx:1: there is no file brs; did you mean bars?" + repeat, diagnostics("source vdp0 picture brs"));
     EXPECT_EQ("here.pmx:1: shot writes a file, and what-if changes nothing\n", diagnostics("what-if shot hdmi x.png"));
 }
 

@@ -8,6 +8,7 @@
 #include "tools/pmxboard/language/verbs.h"
 
 #ifdef PMX_HAS_PICTURES
+#include <algorithm>
 #include <array>
 #include <filesystem>
 
@@ -20,6 +21,7 @@
 #include "board/sources.h"
 #include "tools/pmxboard/files/new_file.h"
 #include "tools/pmxboard/text/printable.h"
+#include "tools/pmxboard/text/suggest.h"
 #endif
 
 namespace pmxboard
@@ -36,6 +38,9 @@ constexpr unsigned usual_tolerance = 2; ///< what conversions of eight bits leav
 /** Enough for a Y4M's first frame, and for a PNG of sixteen bits that cannot be packed. */
 constexpr std::size_t most_of_file = 160 * board::files::mebibyte;
 constexpr int preview_columns = 64;
+constexpr std::string_view card = "card";
+/** What a source shows without a file, but for one colour. */
+constexpr std::array<std::string_view, 4> patterns = { "bars", "ramp", "checker", card };
 constexpr int sheet_width = 960;
 constexpr int sheet_height = 540;
 
@@ -84,11 +89,21 @@ void set_picture(const Words& words, board::sources::Picture shown)
 std::optional<picture::OutputId> output_in(const Words& words)
 {
     const std::string& name = words.at("OUTPUT");
-    if (name == "all")
-        return std::nullopt;
+    const std::string_view all = "all";
     // As the layer's calls have them, too.
-    const std::size_t index = name == "ccir" ? 0 : name == "cav" ? 2 : output_called(name);
-    return static_cast<picture::OutputId>(index);
+    const std::string_view digital = "ccir";
+    const std::string_view component = "cav";
+    if (name == all)
+        return std::nullopt;
+    if (name == digital)
+        return picture::OutputId::Digital;
+    if (name == component)
+        return picture::OutputId::Component;
+    std::vector<std::string_view> known(output_words.begin(), output_words.end());
+    if (std::find(known.begin(), known.end(), name) != known.end())
+        return static_cast<picture::OutputId>(output_called(name));
+    known.insert(known.end(), { all, digital, component });
+    throw LineError("there is no output " + name + did_you_mean(name, known));
 }
 
 /** What is seen, and what is to be said of it. */
@@ -168,17 +183,22 @@ catch (const board::files::FileError&)
 void show_file(Session& session, const Words& words)
 {
     const std::filesystem::path file = session.file(words.at("FILE"));
+    std::error_code error;
+    if (!std::filesystem::exists(file, error))
+    {
+        const std::string meant = did_you_mean(words.at("FILE"), { patterns.begin(), patterns.end() });
+        if (!meant.empty())
+            throw StepFailed("there is no file " + file.string() + meant);
+    }
     board::files::note_input(file);
     set_picture(words, { file.filename().string(), std::make_shared<const picture::Image>(read_image(file)) });
 }
 
 void show_pattern(Session&, const Words& words)
 {
-    for (const char* const pattern : { "bars", "ramp", "checker" })
+    for (const std::string_view pattern : patterns)
         if (words.has(pattern))
-            set_picture(words, { pattern, {} });
-    if (words.has("card"))
-        set_picture(words, {});
+            set_picture(words, { pattern == card ? std::string() : std::string(pattern), {} });
 }
 
 void show_solid(Session&, const Words& words)
@@ -190,6 +210,8 @@ void show_solid(Session&, const Words& words)
 void take_shot(Session& session, const Words& words)
 {
     const bool to_file = words.has("FILE");
+    if (to_file && read_size(words.at("FILE")))
+        throw LineError("a size stands behind its file; write: shot OUTPUT FILE SIZE");
     if (to_file && session.imagines())
         throw LineError("shot writes a file, and what-if changes nothing");
     std::optional<std::pair<int, int>> size;
@@ -304,8 +326,9 @@ std::vector<Verb> picture_verbs()
               "shows the four of them",
               take_shot, looks },
             { "shot OUTPUT FILE [SIZE]",
-              "write it to a PNG, relative to where the tool runs, as large as it is or in another size", take_shot,
-              looks } } },
+              "write it to a PNG, relative to where the tool runs, as large as it is, all four as 960x540, or in "
+              "another size",
+              take_shot, looks } } },
     };
 }
 

@@ -311,27 +311,71 @@ TEST(Dark, ABlackScreen_IsASignal)
 
 /* Adjustments */
 
-TEST(Adjustments, ActWhereTheyWereSet)
+/** One colour on every output, whose codes of BT.709 are known. */
+void show_colour(const char* colour)
 {
     start_layer();
     set_outputs(RES_720P60HZ, RES_720P60HZ, RES_480I);
-    show("vdp0", "solid 191,0,0");
+    show("vdp0", colour);
     KINDS[1].start();
-    const auto red_of = [](OutputId output) {
-        const Image image = shot_of(hardware_now(), output, { 1, 16 }).picture;
-        return std::array{ code(image.at(5, 5), 0), code(image.at(5, 5), 1), code(image.at(5, 5), 2) };
+}
+
+void expect_colour(OutputId output, const Levels& levels, const char* what)
+{
+    const Pixel found = shot_of(hardware_now(), output, { 1, 16 }).picture.at(5, 5);
+    for (unsigned index = 0; index < 3; ++index)
+        EXPECT_NEAR(levels[index], code(found, index), RIGHT) << what << ", " << name_of(output) << ", " << index;
+}
+
+constexpr const char* DARK_RED = "solid 191,0,0"; // 51, 109, 212: luma, and its differences -19 and 84
+constexpr Levels IS_DARK_RED{ 191, 0, 0 };
+
+TEST(Adjustments, OfTheEncoders_ActOnThemAlone)
+{
+    show_colour(DARK_RED);
+    PMX_SetHue(0, 192, 1); // a quarter of a turn: the differences become -84 and -19
+    expect_colour(OutputId::Component, { 7, 69, 0 }, "hue");
+    expect_colour(OutputId::Hdmi, IS_DARK_RED, "hue of the encoders");
+    PMX_SetHue(0, 128, 1);
+    PMX_SetSaturation(0, 64, 1); // half of them
+    expect_colour(OutputId::Component, { 116, 20, 21 }, "saturation");
+    expect_colour(OutputId::Digital, IS_DARK_RED, "saturation of the encoders");
+}
+
+TEST(Adjustments, OfHdmi_ActOnItAlone)
+{
+    show_colour(DARK_RED);
+    PMX_SetHue(0, 192, 0);
+    expect_colour(OutputId::Hdmi, { 7, 69, 0 }, "hue");
+    expect_colour(OutputId::Component, IS_DARK_RED, "hue of HDMI");
+    PMX_SetHue(0, 128, 0);
+    PMX_SetSaturation(0, 64, 0);
+    expect_colour(OutputId::Hdmi, { 116, 20, 21 }, "saturation");
+    expect_colour(OutputId::Component, IS_DARK_RED, "saturation of HDMI");
+}
+
+TEST(Adjustments, OfLuma_ActInTheMixer_AndOnceMoreWhereTheyWereSet)
+{
+    const auto grey = [](double luma) {
+        const double level = (luma - 16) * 255 / 219;
+        return Levels{ level, level, level };
     };
-    const auto untouched = red_of(OutputId::Digital);
-    PMX_SetSaturation(0, 0, 1);
-    PMX_SetHue(0, 255, 0); // half a turn
-    const auto grey = red_of(OutputId::Component);
-    EXPECT_NEAR(grey[0], grey[1], 1);
-    EXPECT_NEAR(grey[0], grey[2], 1);
-    EXPECT_LT(red_of(OutputId::Hdmi)[0], 20U) << "cyan instead of red";
-    EXPECT_GT(red_of(OutputId::Hdmi)[1], 40U);
-    EXPECT_EQ(untouched, red_of(OutputId::Digital));
-    PMX_SetBrightness(0, 138, 0); // the mixer's acts on all, HDMI's on top of it
-    EXPECT_NEAR(untouched[0] + 10 * 255 / 219, red_of(OutputId::Digital)[0], 2);
+    show_colour("solid 191,191,191"); // a luma of 180
+    PMX_SetContrast(0, 64, 1);
+    expect_colour(OutputId::Digital, grey(98), "contrast of the mixer");
+    expect_colour(OutputId::Hdmi, grey(98), "contrast of the mixer");
+    expect_colour(OutputId::Component, grey(57), "contrast of the encoders");
+
+    show_colour("solid 191,191,191");
+    PMX_SetContrast(0, 64, 0);
+    expect_colour(OutputId::Component, grey(98), "contrast of the mixer");
+    expect_colour(OutputId::Hdmi, grey(57), "contrast of HDMI");
+
+    show_colour("solid 191,191,191");
+    PMX_SetBrightness(0, 138, 0);
+    expect_colour(OutputId::Digital, grey(190), "brightness of the mixer");
+    expect_colour(OutputId::Component, grey(190), "brightness of the mixer");
+    expect_colour(OutputId::Hdmi, grey(200), "brightness of HDMI on top of it");
 }
 
 TEST(FifthOsd, LiesOnTheOutputsThatItIsRoutedTo)

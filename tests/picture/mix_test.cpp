@@ -232,6 +232,29 @@ TEST(Mix, AspectRatios_CutVideo_OrLeaveItsSidesBlack)
     EXPECT_EQ("190,190,190", colour_at(hardware, 2, 20));
 }
 
+TEST(Mix, PanScan_CutsANarrowPictureAboveAndBelow)
+{
+    Hardware hardware = nothing_delivered();
+    deliver(hardware, 0, 255, 255, 255);
+    hardware.sources[0].delivery = Delivery{ 720, 480, 0, true };
+    hardware.sources[0].picture = "ramp"; // a quarter of its height each: grey, red, green, blue
+    const auto channels_at = [&](int y) {
+        const Image seen = converted(mixed_picture(hardware, SMALL, 1), full_rgb);
+        std::string channels;
+        for (unsigned index = 0; index < 3; ++index)
+            channels += code(seen.at(60, y), index) > 200 ? "RGB"[index] : '-';
+        return channels;
+    };
+    hardware.aspect = 3;
+    for (const auto& [y, channels] :
+         { std::pair{ 0, "RGB" }, { 10, "RGB" }, { 14, "R--" }, { 34, "-G-" }, { 38, "--B" }, { 47, "--B" } })
+        EXPECT_EQ(channels, channels_at(y)) << "whole, " << y;
+    hardware.aspect = 8; // 16:9, pan and scan: the first row is that at an eighth of the height
+    for (const auto& [y, channels] :
+         { std::pair{ 0, "RGB" }, { 6, "RGB" }, { 10, "R--" }, { 22, "R--" }, { 38, "-G-" }, { 42, "--B" } })
+        EXPECT_EQ(channels, channels_at(y)) << "cut, " << y;
+}
+
 TEST(Mix, ASizeThatNoPictureHas_IsNotSeen)
 {
     Hardware hardware = nothing_delivered();

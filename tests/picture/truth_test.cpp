@@ -8,6 +8,7 @@
 
 #include "board/picture/shot.h"
 #include "scene.h"
+#include "tools/record_view/mode_table.h"
 #include "x_avd.h"
 #include "x_plane_mxr.h"
 
@@ -118,6 +119,29 @@ TEST(Truth, EveryMode_BothMasters_EveryKindOfSource)
     }
     EXPECT_EQ(46U * 2 * 7 * 4, pictures);
     std::cout << pictures << " pictures; the farthest of their colours is " << most << " of 255 off\n";
+}
+
+/** What a mode's picture is stands in two places; here they are held together. */
+TEST(Rasters, AreThoseThatTheLayerHas)
+{
+    std::vector<unsigned> without_converters;
+    for (unsigned mode = 0; mode < RES_MODE_NUM; ++mode)
+    {
+        const record_view::ModeRow row = record_view::mode_row(mode);
+        const Raster raster = *raster_of(mode);
+        EXPECT_EQ(row.colour != record_view::ColourGroup::None, raster.has_converters) << row.name;
+        if (!raster.has_converters)
+        {
+            without_converters.push_back(mode); // of their sizes, too, the layer says something else
+            continue;
+        }
+        EXPECT_EQ(row.width, static_cast<unsigned>(raster.width)) << row.name;
+        EXPECT_EQ(row.height, static_cast<unsigned>(raster.height)) << row.name;
+        EXPECT_EQ(row.colour == record_view::ColourGroup::Sd, raster.standard == Standard::Bt601) << row.name;
+    }
+    EXPECT_EQ((std::vector<unsigned>{ RES_2D_576I50HZ, RES_4K2K23976HZ, RES_4K2K24HZ, RES_2160P, RES_2160P_4096 }),
+              without_converters);
+    EXPECT_FALSE(raster_of(RES_MODE_NUM));
 }
 
 /** Outputs whose mode is not the mixer's, in either direction between SD and HD. */

@@ -201,28 +201,6 @@ void adjust_by(Image& image, const Settings& settings)
         adjust(image.pixels(), adjustment_by(settings));
 }
 
-/** What travels to the set, of the colour formats that HDMI and the digital port have. */
-Space on_the_wire(OutputId output, const Hardware& hardware, Standard standard)
-{
-    const unsigned format = output == OutputId::Hdmi ? hardware.hdmi_format : hardware.mixer.digital_format;
-    if (output == OutputId::Hdmi)
-    {
-        switch (format)
-        {
-        case HDMI_RGB: return limited_rgb;
-        case HDMI_RGB_FULL: return full_rgb;
-        case HDMI_YCBCR_444_FULL:
-        case HDMI_YCBCR_422_FULL: return ycbcr(standard, Range::Full);
-        default: return ycbcr(standard);
-        }
-    }
-    if (output == OutputId::Digital && format == PLA_MXR_DIGITAL_OUTPUT_FMT_RGB)
-        return limited_rgb;
-    if (output == OutputId::Digital && format == PLA_MXR_DIGITAL_OUTPUT_FMT_FULL_RGB)
-        return full_rgb;
-    return ycbcr(standard);
-}
-
 /** The viewer's set knows the format and its own standard, and nothing else. */
 Image seen(Image image, const Space& wire, unsigned threads)
 {
@@ -290,6 +268,27 @@ Shot shot_in(std::optional<Frame>& frame, const Hardware& hardware, OutputId out
 std::string_view name_of(OutputId output)
 {
     return OUTPUT_NAMES[static_cast<std::size_t>(output)];
+}
+
+Space on_the_wire(OutputId output, const Hardware& hardware, Standard standard)
+{
+    const unsigned format = output == OutputId::Hdmi ? hardware.hdmi_format : hardware.mixer.digital_format;
+    if (output == OutputId::Hdmi)
+    {
+        switch (format)
+        {
+        case HDMI_RGB: return limited_rgb;
+        case HDMI_RGB_FULL: return full_rgb;
+        case HDMI_YCBCR_444_FULL:
+        case HDMI_YCBCR_422_FULL: return ycbcr(standard, Range::Full);
+        default: return ycbcr(standard);
+        }
+    }
+    if (output == OutputId::Digital && format == PLA_MXR_DIGITAL_OUTPUT_FMT_RGB)
+        return limited_rgb;
+    if (output == OutputId::Digital && format == PLA_MXR_DIGITAL_OUTPUT_FMT_FULL_RGB)
+        return full_rgb;
+    return ycbcr(standard);
 }
 
 Shot shot_of(const Hardware& hardware, OutputId output, const Effort& effort)

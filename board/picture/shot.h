@@ -22,6 +22,9 @@ struct Shot
 /** "digital", "HDMI", "component", "composite". */
 std::string_view name_of(OutputId output);
 
+/** What travels to the set, of the colour formats that HDMI and the digital port have. */
+Space on_the_wire(OutputId output, const Hardware& hardware, Standard standard);
+
 /** How a picture is computed. */
 struct Effort
 {

@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <cmath>
 #include <iostream>
+#include <tuple>
 
 #include "board/picture/shot.h"
 #include "scene.h"
@@ -180,6 +181,44 @@ TEST(Truth, EveryColourFormatOfHdmiAndThePort)
     {
         ASSERT_EQ(1U, PMX_SetDigitalOutRgb(0, format));
         farthest_on_outputs(KINDS[4], "format " + std::to_string(format));
+    }
+}
+
+TEST(Wire, CarriesTheFormatThatWasAskedFor)
+{
+    const Standard sd = Standard::Bt601;
+    const Standard hd = Standard::Bt709;
+    Hardware hardware;
+    const auto expect_on = [&](OutputId output, const Space& of_sd, const Space& of_hd, unsigned format) {
+        for (const auto& [standard, expected] : { std::pair{ sd, of_sd }, { hd, of_hd } })
+            EXPECT_TRUE(on_the_wire(output, hardware, standard) == expected) << name_of(output) << " " << format;
+    };
+    const std::array of_hdmi = {
+        std::tuple{ HDMI_RGB, limited_rgb, limited_rgb },
+        std::tuple{ HDMI_RGB_FULL, full_rgb, full_rgb },
+        std::tuple{ HDMI_YCBCR_444, ycbcr(sd), ycbcr(hd) },
+        std::tuple{ HDMI_YCBCR_422, ycbcr(sd), ycbcr(hd) },
+        std::tuple{ HDMI_YCBCR_444_FULL, ycbcr(sd, Range::Full), ycbcr(hd, Range::Full) },
+        std::tuple{ HDMI_YCBCR_422_FULL, ycbcr(sd, Range::Full), ycbcr(hd, Range::Full) },
+    };
+    for (const auto& [format, of_sd, of_hd] : of_hdmi)
+    {
+        hardware.hdmi_format = format;
+        expect_on(OutputId::Hdmi, of_sd, of_hd, format);
+        expect_on(OutputId::Component, ycbcr(sd), ycbcr(hd), format);
+    }
+    const std::array of_port = {
+        std::tuple{ PLA_MXR_DIGITAL_OUTPUT_FMT_YBR, ycbcr(sd), ycbcr(hd) },
+        std::tuple{ PLA_MXR_DIGITAL_OUTPUT_FMT_RGB, limited_rgb, limited_rgb },
+        std::tuple{ PLA_MXR_DIGITAL_OUTPUT_FMT_XVYCC, ycbcr(sd), ycbcr(hd) },
+        std::tuple{ PLA_MXR_DIGITAL_OUTPUT_FMT_YBR422, ycbcr(sd), ycbcr(hd) },
+        std::tuple{ PLA_MXR_DIGITAL_OUTPUT_FMT_FULL_RGB, full_rgb, full_rgb },
+    };
+    for (const auto& [format, of_sd, of_hd] : of_port)
+    {
+        hardware.mixer.digital_format = format;
+        expect_on(OutputId::Digital, of_sd, of_hd, format);
+        expect_on(OutputId::Composite, ycbcr(sd), ycbcr(hd), format);
     }
 }
 

@@ -110,6 +110,7 @@ TEST(Truth, EveryMode_BothMasters_EveryKindOfSource)
                 kind.start();
                 decide_master(master == DRV_PMX_CS_YCBCR_601 ? DRV_PMX_CS_YCBCR_709 : DRV_PMX_CS_YCBCR_601);
                 decide_master(master); // a change, which all are told
+                EXPECT_EQ(master == DRV_PMX_CS_YCBCR_601 ? Standard::Bt601 : Standard::Bt709, hardware_now().osd.told);
                 most = std::max(most, farthest_on_outputs(kind, "mode " + std::to_string(mode) + ", master " +
                                                                     std::to_string(master) + ", " + kind.name));
                 pictures += 4;
@@ -510,12 +511,17 @@ TEST(BeforeMixer, TheDigitalPortShowsTheMainVideoAlone)
 
 TEST(Sheet, HasTheFourOutputs)
 {
-    start_layer();
-    const Image sheet = sheet_of(all_shots(hardware_now()), 101, 51);
+    const std::array colours = { opaque(200, 0, 0), opaque(0, 200, 0), opaque(0, 0, 200), opaque(200, 200, 200) };
+    std::array<Shot, all_outputs.size()> shots;
+    for (std::size_t i = 0; i < shots.size(); ++i)
+        shots[i] = { all_outputs[i], Image(8, 8, full_rgb, colours[i]), "" };
+    const Image sheet = sheet_of(shots, 101, 51);
     EXPECT_EQ(101, sheet.width());
     EXPECT_EQ(51, sheet.height());
-    EXPECT_NE(opaque(0, 0, 0), sheet.at(5, 5));
-    EXPECT_NE(opaque(0, 0, 0), sheet.at(95, 45));
+    for (std::size_t i = 0; i < shots.size(); ++i)
+        for (const int x : { 0, 25, 49 })
+            for (const int y : { 0, 12, 24 })
+                EXPECT_EQ(colours[i], sheet.at(x + (i % 2 == 0 ? 0 : 51), y + (i < 2 ? 0 : 26))) << i;
 }
 
 } // namespace

@@ -76,7 +76,9 @@ TEST(PictureVerbs, Patterns_AreShown)
                                      "source vdp0 picture ramp\nexpect picture hdmi 0,0 0,0,0\n"
                                      "source vdp0 picture checker\nexpect picture hdmi 24,8 255,255,255\n"
                                      "source vdp0 picture card\nexpect picture hdmi 640,100 26,64,140\n"
-                                     "power-on\nexpect state sources.vdp0.size null"));
+                                     "source vdp0 picture bars\nexpect state sources.vdp0.picture \"bars\"\n"
+                                     "power-on\nPMX_Init\noutputs hdmi=720p60\nsource vdp0 start 1280x720\n"
+                                     "expect picture hdmi 640,100 26,64,140"));
 }
 
 TEST(PictureVerbs, WrongLines_AreToldApart)

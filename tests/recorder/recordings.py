@@ -31,6 +31,19 @@ class Recording:
             yield at, head >> 8 & 0x7F, bool(head >> 8 & ANSWERED), head >> 16 & 0xFF
             at += head & 0xFF
 
+    def event(self, place):
+        """Its words."""
+        return self.words[place:place + (self.words[place] & 0xFF)]
+
+    def of(self, *events):
+        """A recording with the same beginning, and these events behind it."""
+        began = next(self.events())[0]
+        held = [word for event in (self.event(began), *events) for word in event]
+        changed = Recording(self.bytes())
+        changed.words[HEAD], changed.words[SNAPSHOT_COUNT] = len(held), 1
+        changed.words[HEADER_WORDS:HEADER_WORDS + len(held)] = held
+        return changed
+
     def answer(self, name):
         """(number of the event in which it is answered, from 0; place of the answer) of a function's first call."""
         number = [function.name for function in interface.platform()].index(name)

@@ -18,8 +18,8 @@ import unittest
 
 sys.dont_write_bytecode = True
 
-from recordings import (CALL, HEAD, HEADER_WORDS, OPERATION, RING_WORDS, SNAPSHOT_COUNT, Recording,  # noqa: E402
-                        interface)
+from recordings import (ANSWERED, CALL, HEAD, HEADER_WORDS, OPERATION, RING_WORDS, SNAPSHOT_COUNT,  # noqa: E402
+                        Recording, interface)
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 # What no scenario can say.
@@ -186,6 +186,24 @@ class Replay(unittest.TestCase):
     def test_out_of_a_memory_dump(self):
         content = self.record(MODE_CHANGE).bytes()
         self.assertEqual(0, self.replay(random.Random(1).randbytes(1001) + content + b"\xff" * 99).returncode)
+
+    def test_depth_has_a_limit(self):
+        recording = self.record(MODE_CHANGE)
+        call = next(event[0] for event in recording.events() if event[1] == CALL)
+        deeper = self.operation(recording) + self.unanswered(recording, call)
+        ended = self.replay(recording.of(*(100 * [deeper])).bytes())
+        self.assertEqual(1, ended.returncode, ended.stderr)
+        self.assertIn("departs at event 130 of 201", ended.stdout)
+        self.assertIn("the recording contradicts itself", ended.stdout)
+
+    @staticmethod
+    def operation(recording):
+        return recording.event(next(event[0] for event in recording.events() if event[1] == OPERATION))
+
+    @staticmethod
+    def unanswered(recording, place):
+        head, *words = recording.event(place)
+        return [head & ~(ANSWERED << 8), *words]
 
     def test_what_a_product_keeps(self):
         subprocess.run([PRODUCT, self.file, "0"], check=True, timeout=60)

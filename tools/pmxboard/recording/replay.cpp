@@ -6,6 +6,7 @@
 #include <cstring>
 #include <mutex>
 #include <set>
+#include <system_error>
 #include <thread>
 #include <vector>
 
@@ -131,6 +132,9 @@ private:
     std::condition_variable m_turn;
 };
 
+/** Operations within calls within operations: a product's stack has room for a few. */
+constexpr std::size_t deepest = 64;
+
 Performance* performance;
 thread_local unsigned my_thread;
 thread_local std::vector<std::string> my_operations;
@@ -245,7 +249,7 @@ Answer Performance::call(unsigned function, std::span<const UINT32> words, std::
             take();
             return answered(called, event.words[0], event.words.subspan(2));
         }
-        if (event.kind == PMX_RECORDER_OPERATION)
+        if (event.kind == PMX_RECORDER_OPERATION && my_operations.size() < deepest)
             run_operation(lock);
         else
             depart(next_text(), "nothing: " + called.name + " has not returned", "the recording contradicts itself");
@@ -330,10 +334,23 @@ ReplayVerdict Performance::run()
         numbers.insert(event.thread);
     settle();
     std::vector<std::thread> threads;
-    for (const unsigned number : numbers)
-        threads.emplace_back([this, number] { perform(number); });
+    std::string lacking;
+    try
+    {
+        for (const unsigned number : numbers)
+            threads.emplace_back([this, number] { perform(number); });
+    }
+    catch (const std::system_error& error)
+    {
+        lacking = error.what();
+        const Lock lock(m_mutex);
+        m_is_over = true;
+        m_turn.notify_all();
+    }
     for (std::thread& thread : threads)
         thread.join();
+    if (!lacking.empty())
+        throw RecordingError("its " + std::to_string(numbers.size()) + " threads cannot be run: " + lacking);
     return m_verdict;
 }
 

@@ -187,6 +187,15 @@ class Replay(unittest.TestCase):
         content = self.record(MODE_CHANGE).bytes()
         self.assertEqual(0, self.replay(random.Random(1).randbytes(1001) + content + b"\xff" * 99).returncode)
 
+    def test_a_call_that_no_operation_makes(self):
+        recording = self.record(MODE_CHANGE)
+        call = next(event[0] for event in recording.events() if event[1] == CALL)
+        self.file.write_bytes(recording.of(self.unanswered(recording, call), self.operation(recording)).bytes())
+        ended = self.run_tool("replay", "--to-scenario", self.file)
+        self.assertEqual((2, ""), (ended.returncode, ended.stdout))
+        self.assertIn("begins with a call and no operation", ended.stderr)
+        self.assertIn("nothing: no operation runs", self.run_tool("replay", self.file).stdout)
+
     def test_depth_has_a_limit(self):
         recording = self.record(MODE_CHANGE)
         call = next(event[0] for event in recording.events() if event[1] == CALL)

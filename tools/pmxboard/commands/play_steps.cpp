@@ -73,6 +73,8 @@ private:
             ++m_command;
             m_counts.clear();
         }
+        if (m_command == 0)
+            throw RecordingError("the recording begins with a call and no operation that makes it");
         place(step);
         if (!is_operation)
             step.nth = ++m_counts[step.function->name];

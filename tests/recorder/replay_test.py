@@ -187,6 +187,14 @@ class Replay(unittest.TestCase):
         content = self.record(MODE_CHANGE).bytes()
         self.assertEqual(0, self.replay(random.Random(1).randbytes(1001) + content + b"\xff" * 99).returncode)
 
+    def test_the_first_words_alone_are_no_recording(self):
+        content = self.record(MODE_CHANGE).bytes()
+        alone = content[:12] + bytes(199) + content[:12]
+        self.assertEqual(0, self.replay(alone + content).returncode)
+        ended = self.replay(alone)
+        self.assertEqual(2, ended.returncode)
+        self.assertIn("has version 0", ended.stderr)
+
     def test_a_call_that_no_operation_makes(self):
         recording = self.record(MODE_CHANGE)
         call = next(event[0] for event in recording.events() if event[1] == CALL)

@@ -17,20 +17,19 @@ namespace
 
 constexpr std::uint32_t magic[] = { PMX_RECORDER_MAGIC_0, PMX_RECORDER_MAGIC_1, PMX_RECORDER_MAGIC_2 };
 
-/** Where a recording begins. */
-std::size_t find_magic(std::string_view bytes)
+std::string_view bytes_of(const std::uint32_t (&words)[3])
+{
+    return { reinterpret_cast<const char*>(words), sizeof words };
+}
+
+[[noreturn]] void refuse_without_magic(std::string_view bytes)
 {
     std::uint32_t swapped[3];
     for (std::size_t i = 0; i < 3; ++i)
         swapped[i] = __builtin_bswap32(magic[i]);
-    const std::string_view wanted(reinterpret_cast<const char*>(magic), sizeof magic);
-    const std::string_view other(reinterpret_cast<const char*>(swapped), sizeof swapped);
-    const std::size_t at = bytes.find(wanted);
-    if (at == bytes.npos && bytes.find(other) != bytes.npos)
-        throw RecordingError("the recording was made on a processor with the other order of bytes");
-    if (at == bytes.npos)
-        throw RecordingError("there is no recording in it");
-    return at;
+    throw RecordingError(bytes.find(bytes_of(swapped)) == bytes.npos
+                             ? "there is no recording in it"
+                             : "the recording was made on a processor with the other order of bytes");
 }
 
 void hold(bool fits, const std::string& what)
@@ -212,11 +211,34 @@ private:
     std::string m_place;
 };
 
+/** Where the first recording begins. Its first words stand in a dump elsewhere, too: as constants of programs, and
+ *  before what is left of an older recording. */
+std::size_t find_recording(std::string_view bytes)
+{
+    std::optional<RecordingError> first;
+    for (std::size_t at = 0; (at = bytes.find(bytes_of(magic), at)) != bytes.npos; ++at)
+    {
+        try
+        {
+            header_of(bytes.substr(at));
+            return at;
+        }
+        catch (const RecordingError& error)
+        {
+            if (!first)
+                first = error;
+        }
+    }
+    if (!first)
+        refuse_without_magic(bytes);
+    throw *first;
+}
+
 } // namespace
 
 Recording read_recording(std::string_view bytes)
 {
-    bytes.remove_prefix(find_magic(bytes));
+    bytes.remove_prefix(find_recording(bytes));
     Recording recording{ header_of(bytes), {}, {}, 0 };
     const auto back = oldest_snapshot(recording.header);
     hold(back.has_value(), "the recording has no snapshot to begin with");

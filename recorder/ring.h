@@ -255,7 +255,8 @@ static PMX_SHARED UINT32 u4TellSlowly(const char* szText)
 {
     const UINT32 u4Where = (UINT32)(size_t)szText;
     UINT32 u4At = u4Place(u4Where);
-    while (rNow.prText[u4At].u4Key != 0)
+    UINT32 i;
+    for (i = 0; i < PMX_RECORDER_TEXTS && rNow.prText[u4At].u4Key != 0; ++i)
     {
         const UINT32 u4Code = rNow.prText[u4At].u4Code;
         if ((rNow.prText[u4At].u4Key ^ u4Code) == u4Where)

@@ -13,6 +13,7 @@
 #define PMX_RECORDER_ADD(pu4Word, u4Number) __atomic_fetch_add(pu4Word, u4Number, __ATOMIC_RELAXED)
 #define PMX_RECORDER_LOAD(pu4Word) __atomic_load_n(pu4Word, __ATOMIC_RELAXED)
 #define PMX_RECORDER_PUBLISH(pu4Word, u4Value) __atomic_store_n(pu4Word, u4Value, __ATOMIC_RELEASE)
+#define PMX_RECORDER_PUBLISHED(pu4Word) __atomic_load_n(pu4Word, __ATOMIC_ACQUIRE)
 #endif
 
 #ifdef __GNUC__

@@ -282,8 +282,10 @@ def plane_call(function, index):
 PLANE_TABLES = """
 /* A video plane's table is handed to the layer with the one function exchanged that it calls. Whoever registers another
  * table each time in the end has the rest unrecorded. */
-static const IVdp* volatile aprPlane[PLANES];
+static const IVdp* aprPlane[PLANES];
 static IVdp arOffered[PLANES];
+static UINT32 au4Claimed[PLANES]; /* whoever finds 0 here and adds 1 fills the place */
+static UINT32 au4Filled[PLANES];
 
 static UINT32 u4OfferTable(void** ppvIf);
 """
@@ -295,19 +297,23 @@ static UINT32 u4OfferTable(void** ppvIf)
     UINT32 i;
     if (prReal == 0)
         return PMX_SYMBOL_NULL;
-    for (i = 0; i < PLANES && aprPlane[i] != prReal && aprPlane[i] != 0; ++i)
+    for (i = 0; i < PLANES; ++i)
     {
+        if (PMX_RECORDER_PUBLISHED(&au4Filled[i]) == 0)
+        {
+            if (PMX_RECORDER_ADD(&au4Claimed[i], 1u) != 0)
+                continue; /* another thread is at it */
+            aprPlane[i] = prReal;
+            arOffered[i] = *prReal;
+            arOffered[i].pu4SetColorMode = apfPlaneCall[i];
+            PMX_RECORDER_PUBLISH(&au4Filled[i], 1u);
+        }
+        if (aprPlane[i] != prReal)
+            continue;
+        *ppvIf = &arOffered[i];
+        return PMX_SYMBOL_OTHER + 1 + i;
     }
-    if (i == PLANES)
-        return PMX_SYMBOL_OTHER;
-    if (aprPlane[i] == 0)
-    {
-        arOffered[i] = *prReal;
-        arOffered[i].pu4SetColorMode = apfPlaneCall[i];
-        aprPlane[i] = prReal;
-    }
-    *ppvIf = &arOffered[i];
-    return PMX_SYMBOL_OTHER + 1 + i;
+    return PMX_SYMBOL_OTHER;
 }
 """
 

@@ -31,6 +31,8 @@ INT32 i4NFBPartitionRead(INT32 i4PartId, UINT32 u4Offset, void* pvDest, UINT32 u
         return -1;
     if (u4Offset <= device->size && u4Count <= device->size - u4Offset)
         result = mtd_read(device, u4Offset, u4Count, &done, pvDest);
+    if (mtd_is_bitflip(result)) /* and mended */
+        result = 0;
     put_mtd_device(device);
     return result || done != u4Count ? -1 : (INT32)done;
 }

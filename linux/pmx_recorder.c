@@ -2,7 +2,9 @@
 /* The flight recorder: the memory that it is lent, and the file in which it is read. A crash dump has it, too. */
 #include <linux/debugfs.h>
 #include <linux/err.h>
+#include <linux/fs.h>
 #include <linux/ktime.h>
+#include <linux/mm.h>
 #include <linux/module.h>
 #include <linux/preempt.h>
 #include <linux/sched.h>
@@ -21,7 +23,11 @@ static bool watch_all;
 module_param(watch_all, bool, 0444);
 MODULE_PARM_DESC(watch_all, "record what others do to the layer's private objects, too; for tests");
 
-static struct debugfs_blob_wrapper memory;
+static struct
+{
+    void* data;
+    size_t size;
+} memory;
 static struct dentry *folder, *file;
 
 /* In nanoseconds by a shift: a division would cost more than all the rest. */
@@ -35,6 +41,60 @@ static UINT32 thread_now(void)
     return in_task() ? 1 + (UINT32)task_pid_nr(current) % THREADS : 0;
 }
 
+/* Who opens the file has the recording as it is then. */
+struct reading
+{
+    size_t size;
+    u32 words[];
+};
+
+/* The layer goes on while it is copied: snapshots that were overwritten meanwhile are where nothing begins. */
+static void drop_overwritten(PMX_RECORDER_T* copy)
+{
+    const PMX_RECORDER_T* now = memory.data;
+    u32 head, i;
+
+    smp_rmb(); /* the copy is older than this */
+    head = READ_ONCE(now->u4Head);
+    for (i = 0; i < PMX_RECORDER_SNAPSHOTS; ++i)
+        if (head - copy->au4Snapshot[i] > copy->u4RingWords)
+            copy->au4Snapshot[i] = copy->u4Head;
+}
+
+static int recording_open(struct inode* inode, struct file* opened)
+{
+    struct reading* copy = kvmalloc(sizeof *copy + memory.size, GFP_KERNEL);
+
+    if (!copy)
+        return -ENOMEM;
+    copy->size = memory.size;
+    memcpy(copy->words, memory.data, memory.size);
+    drop_overwritten((PMX_RECORDER_T*)copy->words);
+    opened->private_data = copy;
+    return 0;
+}
+
+static ssize_t recording_read(struct file* opened, char __user* to, size_t count, loff_t* at)
+{
+    const struct reading* copy = opened->private_data;
+
+    return simple_read_from_buffer(to, count, at, copy->words, copy->size);
+}
+
+static int recording_release(struct inode* inode, struct file* opened)
+{
+    kvfree(opened->private_data);
+    return 0;
+}
+
+static const struct file_operations recording_operations = {
+    .owner = THIS_MODULE,
+    .open = recording_open,
+    .read = recording_read,
+    .release = recording_release,
+    .llseek = default_llseek,
+};
+
 /* Others may have the folder of that name already. */
 static void show(void)
 {
@@ -42,7 +102,7 @@ static void show(void)
 
     if (!found)
         folder = debugfs_create_dir("pmx", NULL);
-    file = debugfs_create_blob("recording", 0400, found ? found : folder, &memory);
+    file = debugfs_create_file("recording", 0400, found ? found : folder, NULL, &recording_operations);
     dput(found);
 }
 

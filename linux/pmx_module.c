@@ -14,9 +14,7 @@ static int __init pmx_begin(void)
     int result;
 
     pmx_console_begin();
-    result = pmx_recorder_begin();
-    if (result)
-        return result;
+    pmx_recorder_begin();
     result = pmx_registers_begin();
     if (result)
         goto no_registers;

@@ -21,12 +21,11 @@ void pmx_power_end(void);
 
 /* The flight recorder, where the module is built with it. */
 #ifdef PMX_HAS_RECORDER
-int pmx_recorder_begin(void);
+void pmx_recorder_begin(void);
 void pmx_recorder_end(void);
 #else
-static inline int pmx_recorder_begin(void)
+static inline void pmx_recorder_begin(void)
 {
-    return 0;
 }
 
 static inline void pmx_recorder_end(void)

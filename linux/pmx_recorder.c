@@ -15,6 +15,7 @@
 
 #define THREADS 253 /* numbers for threads; 0 is for interrupts */
 #define TICK_SHIFT 10
+#define MOST_KILOBYTES 65536u
 
 static unsigned int recording = 64;
 module_param(recording, uint, 0444);
@@ -106,27 +107,54 @@ static void show(void)
     dput(found);
 }
 
-int pmx_recorder_begin(void)
+/* Where the ring lies in one piece a plain copy of the physical memory has it in one piece, too. */
+static void* lend(size_t size)
+{
+    void* pages = alloc_pages_exact(size, GFP_KERNEL | __GFP_ZERO | __GFP_NOWARN);
+
+    if (pages)
+        return pages;
+    pages = vzalloc(size);
+    if (pages)
+        pr_warn("pmx: the recording is scattered over the memory\n");
+    return pages;
+}
+
+static void take_back(void)
+{
+    /* What is left of it is no recording. */
+    memset(memory.data, 0, sizeof(PMX_RECORDER_T));
+    if (is_vmalloc_addr(memory.data))
+        vfree(memory.data);
+    else
+        free_pages_exact(memory.data, memory.size);
+    memory.data = NULL;
+}
+
+/* A driver that works is worth more than a recording of it. */
+void pmx_recorder_begin(void)
 {
     PMX_RECORDER_SETUP_T setup = {
         .pu4Time = time_now, .pu4Thread = thread_now, .u4TickNs = 1u << TICK_SHIFT, .fgWatchAll = watch_all
     };
 
     if (!recording)
-        return 0;
-    memory.size = PMX_RECORDER_MEMORY(recording * 1024ul);
-    memory.data = vzalloc(memory.size);
-    if (!memory.data)
-        return -ENOMEM;
+        return;
+    if (recording <= MOST_KILOBYTES)
+    {
+        memory.size = PMX_RECORDER_MEMORY(recording * 1024ul);
+        memory.data = lend(memory.size);
+    }
     setup.pvMemory = memory.data;
     setup.u4Size = memory.size;
-    if (!fgPmxRecorderStart(&setup))
+    if (memory.data && fgPmxRecorderStart(&setup))
     {
-        vfree(memory.data);
-        return -EINVAL;
+        show();
+        return;
     }
-    show();
-    return 0;
+    pr_warn("pmx: nothing is recorded: a ring of %u kilobytes cannot be had\n", recording);
+    if (memory.data)
+        take_back();
 }
 
 /* Last of all: whatever calls the layer, or is called by it, goes first. */
@@ -136,6 +164,7 @@ void pmx_recorder_end(void)
         return;
     PMX_RecorderStop();
     debugfs_remove(file);
-    debugfs_remove(folder);
-    vfree(memory.data);
+    if (folder && simple_empty(folder)) /* others may have put files into it */
+        debugfs_remove(folder);
+    take_back();
 }

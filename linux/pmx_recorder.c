@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 /* The flight recorder: the memory that it is lent, and the file in which it is read. A crash dump has it, too. */
+#include <linux/atomic.h>
 #include <linux/debugfs.h>
 #include <linux/err.h>
 #include <linux/fs.h>
@@ -37,9 +38,27 @@ static UINT32 time_now(void)
     return (UINT32)(ktime_get_mono_fast_ns() >> TICK_SHIFT);
 }
 
+/* Each has a number of its own, near its id: a replay takes one number for one thread. Numbers are not given back; when
+ * there are no more, some threads share theirs. */
 static UINT32 thread_now(void)
 {
-    return in_task() ? 1 + (UINT32)task_pid_nr(current) % THREADS : 0;
+    static u32 known[THREADS];
+    const u32 id = task_pid_nr(current);
+    u32 at = id % THREADS;
+    u32 i;
+
+    if (!in_task())
+        return 0;
+    for (i = 0; i < THREADS; ++i, at = (at + 1) % THREADS)
+    {
+        u32 there = READ_ONCE(known[at]);
+
+        if (!there)
+            there = cmpxchg(&known[at], 0, id) ?: id;
+        if (there == id)
+            break;
+    }
+    return 1 + at;
 }
 
 /* Who opens the file has the recording as it is then. */

@@ -16,7 +16,8 @@ from tools import ToolError, compiler, in_parallel, run, write
 
 ROOT = signatures.ROOT
 TOOL = ROOT / "tools" / "cost"
-LIBRARIES = ("tools/libpmxboard_language.a", "tools/librecord_view.a", "board/libpmx_board.a")
+PICTURE = "board/picture/libpmx_picture.a"  # where the build can compute pictures
+LIBRARIES = ("tools/libpmxboard_language.a", "tools/librecord_view.a", PICTURE, "board/libpmx_board.a")
 
 
 @dataclasses.dataclass(frozen=True)
@@ -87,7 +88,9 @@ class Board:
     def libraries(self):
         """What the tool is linked from, with the line editor's library where the build has found it."""
         line_editor = re.search(r"^LIBEDIT_LIBRARY:FILEPATH=(/.*)$", self._cache, re.M)
-        return [*(self.build / library for library in LIBRARIES), "-ltomlplusplus",
+        paths = [self.build / library for library in LIBRARIES]
+        pictures = ("-lpng", "-lpixman-1") if (self.build / PICTURE).exists() else ()
+        return [*(path for path in paths if pictures or path != self.build / PICTURE), "-ltomlplusplus", *pictures,
                 *(line_editor.groups() if line_editor else ())]
 
 

@@ -44,8 +44,15 @@ void show_refusal(const Recording& recording, const Departure& departure)
         std::cout << "the layer's reasons:\n" << refusal;
 }
 
+std::string damage_of(const Recording& recording)
+{
+    return recording.damaged + "; nothing behind it is read";
+}
+
 int show_verdict(const Recording& recording, const ReplayVerdict& verdict, bool quiet)
 {
+    if (!recording.damaged.empty())
+        std::cout << damage_of(recording) << '\n';
     if (verdict.departure)
     {
         show_departure(*verdict.departure, recording.events.size());
@@ -89,6 +96,9 @@ try
         board::load_description("default");
     const Recording recording = read_recording(board::files::read_named(options.file));
     const TextNames texts = layer_texts();
+    const bool is_replayed = !options.show && !options.json && !options.chrome && !options.to_scenario;
+    if (!recording.damaged.empty() && !is_replayed)
+        std::cerr << "pmxboard: " << printable(options.file) << ": " << damage_of(recording) << '\n';
     if (options.show || options.json || options.chrome)
     {
         show_events(std::cout, recording, texts,

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "tools/pmxboard/recording/recording.h"
 
+#include <algorithm>
 #include <bit>
 #include <cstring>
 #include <map>
@@ -116,11 +117,20 @@ public:
         }
     }
 
-    /** So many words, up to the head. */
+    /** So many words, up to the head. What a crash has left half filled costs nothing that stands before it. */
     void read(std::uint32_t back)
     {
-        for (std::uint32_t left = back; left != 0;)
-            left -= read_event(m_recording.header.u4Head - left, left);
+        try
+        {
+            for (std::uint32_t left = back; left != 0;)
+                left -= read_event(m_recording.header.u4Head - left, left);
+        }
+        catch (const RecordingError& error)
+        {
+            if (!has_operation())
+                throw;
+            m_recording.damaged = error.what();
+        }
         hold(!m_recording.events.empty() && m_recording.events.front().kind == PMX_RECORDER_SNAPSHOT,
              "the recording has no snapshot where it says");
     }
@@ -131,6 +141,13 @@ private:
         std::uint32_t sum;
         std::uint32_t code;
     };
+
+    bool has_operation() const
+    {
+        const auto& events = m_recording.events;
+        return std::any_of(events.begin(), events.end(),
+                           [](const Event& event) { return event.kind == PMX_RECORDER_OPERATION; });
+    }
 
     std::uint32_t read_event(std::uint32_t at, std::uint32_t left)
     {
@@ -239,7 +256,7 @@ std::size_t find_recording(std::string_view bytes)
 Recording read_recording(std::string_view bytes)
 {
     bytes.remove_prefix(find_recording(bytes));
-    Recording recording{ header_of(bytes), {}, {}, 0 };
+    Recording recording{ header_of(bytes), {}, {}, 0, {} };
     const auto back = oldest_snapshot(recording.header);
     hold(back.has_value(), "the recording has no snapshot to begin with");
     recording.lost = recording.header.u4Head - *back;

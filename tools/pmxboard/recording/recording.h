@@ -42,6 +42,7 @@ struct Recording
     std::vector<Event> events;                    ///< from the first snapshot that is still whole
     std::deque<std::vector<std::uint32_t>> words; ///< of each event
     std::uint32_t lost = 0;                       ///< words that were overwritten, or stand before that snapshot
+    std::string damaged; ///< what is wrong with the event behind the last one; empty when that is the end
 };
 
 /** The first recording in these bytes. Throws RecordingError. */

@@ -126,6 +126,7 @@ private:
     const TextNames& m_texts;
     std::size_t m_next = 0;
     bool m_is_over = false;
+    std::size_t m_open = 0; ///< operations that have begun and not ended, in all threads
     std::size_t m_outermost = 0;
     ReplayVerdict m_verdict;
     std::mutex m_mutex;
@@ -273,7 +274,8 @@ void Performance::run_operation(Lock& lock)
 {
     const Event& begin = take();
     const ReplayedOperation& operation = replayed_layer().operations[begin.function];
-    m_outermost += my_operations.empty();
+    m_outermost += m_open == 0;
+    ++m_open;
     my_operations.push_back(operation.described.name);
     std::vector<UINT32> written;
     Given given(begin.words.subspan(1));
@@ -283,6 +285,7 @@ void Performance::run_operation(Lock& lock)
     my_operation_calls_nobody = false; // whoever called it out of an operation is one that calls
     lock.lock();
     end_operation(lock, begin, answer, written);
+    --m_open;
     my_operations.pop_back();
 }
 

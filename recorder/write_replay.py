@@ -28,6 +28,7 @@ def call_of(function, index):
             lines.append(f"answer.write_text({parameter.name}, zSize);")
     if interface.tables(function):
         lines += ["answer.write_table(ppvIf, &plane_table);", "answer.write_tag(ppvTag);"]
+    lines.append("Replay::go_on();")
     if function.has_result:
         lines.append(f"return static_cast<{function.result}>(answer.number);")
     return "\n    ".join(lines)

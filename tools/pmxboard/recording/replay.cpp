@@ -107,6 +107,7 @@ public:
 
     ReplayVerdict run();
     Answer call(unsigned function, std::span<const UINT32> words, std::size_t reserved);
+    void go_on();
 
 private:
     using Lock = std::unique_lock<std::mutex>;
@@ -126,7 +127,8 @@ private:
     const TextNames& m_texts;
     std::size_t m_next = 0;
     bool m_is_over = false;
-    std::size_t m_open = 0; ///< operations that have begun and not ended, in all threads
+    bool m_runs_alone = false; ///< the operation that runs ends before anything else begins
+    std::size_t m_open = 0;    ///< operations that have begun and not ended, in all threads
     std::size_t m_outermost = 0;
     ReplayVerdict m_verdict;
     std::mutex m_mutex;
@@ -200,7 +202,8 @@ const Event& Performance::take()
     ++m_verdict.events;
     m_verdict.operations += taken.kind == PMX_RECORDER_OPERATION;
     m_verdict.calls += taken.kind == PMX_RECORDER_CALL;
-    if (taken.kind != PMX_RECORDER_OPERATION || !taken.is_answered)
+    m_runs_alone = taken.kind == PMX_RECORDER_OPERATION && taken.is_answered;
+    if (!m_runs_alone)
         settle();
     return taken;
 }
@@ -209,7 +212,7 @@ bool Performance::is_my_turn() const
 {
     if (m_next == m_events.size())
         return false;
-    return m_events[m_next].thread == my_thread && happens_in_a_thread(m_events[m_next]);
+    return !m_runs_alone && m_events[m_next].thread == my_thread && happens_in_a_thread(m_events[m_next]);
 }
 
 /** False when there is nothing left to do. */
@@ -258,6 +261,14 @@ Answer Performance::call(unsigned function, std::span<const UINT32> words, std::
     return {};
 }
 
+/** What another thread did next comes before what the layer does behind a call: what it had stored by then, and others
+ *  see, was recorded as a change. */
+void Performance::go_on()
+{
+    Lock lock(m_mutex);
+    wait_for_turn(lock);
+}
+
 /** Without a table in it the layer would call nothing. */
 Answer Performance::answered(const Described& function, std::uint32_t answer, std::span<const std::uint32_t> written)
 {
@@ -279,6 +290,8 @@ void Performance::run_operation(Lock& lock)
     my_operations.push_back(operation.described.name);
     std::vector<UINT32> written;
     Given given(begin.words.subspan(1));
+    if (!begin.is_answered)
+        wait_for_turn(lock);
     lock.unlock();
     my_operation_calls_nobody = begin.is_answered;
     const std::uint32_t answer = operation.run(given, written);
@@ -311,6 +324,7 @@ void Performance::end_operation(Lock& lock, const Event& begin, std::uint32_t an
     if (!is_equal && !m_verdict.departure)
         return depart("end of " + operation.name + " = " + described_answer(operation, expected), computed,
                       expected == answer ? "another output" : "another result");
+    m_runs_alone = false;
     if (begin.is_answered)
         settle();
     else
@@ -362,6 +376,11 @@ ReplayVerdict Performance::run()
 Answer Replay::call(unsigned function, const UINT32* words, unsigned count, unsigned reserved)
 {
     return performance->call(function, { words + 3, words + count }, reserved);
+}
+
+void Replay::go_on()
+{
+    performance->go_on();
 }
 
 ReplayVerdict replay(const Recording& recording, const TextNames& texts)

@@ -115,6 +115,8 @@ const ReplayedLayer& replayed_layer();
 struct Replay
 {
     static Answer call(unsigned function, const UINT32* words, unsigned count, unsigned reserved);
+    /** What was answered is written; returns when nothing else comes before what the layer does next. */
+    static void go_on();
 };
 
 } // namespace pmxboard

@@ -147,6 +147,14 @@ class Replay(unittest.TestCase):
         self.assertRegex(shown, r"(?m)^\d+\t\d+\t0\tend of PMX_Init$")
         self.assertRegex(shown, r"PMX_GetMode\(0, \[A5\]\) = 1\n$")
 
+    def test_time_goes_on_when_its_ticks_begin_again(self):
+        recording = self.record("PMX_Init\n")
+        for number, (place, *_) in enumerate(recording.events()):
+            recording.words[place + 1] = 0xFFFFFFF0 + 7 * number & 0xFFFFFFFF
+        self.assertEqual(0, self.replay(recording.bytes()).returncode)
+        told = [json.loads(line) for line in self.run_tool("replay", "--json", self.file).stdout.splitlines()]
+        self.assertEqual([0xFFFFFFF0 + 7 * number for number in range(len(told))], [one["time_us"] for one in told])
+
     def test_three_small_arguments_take_24_bytes(self):
         recording = self.record(MODE_CHANGE)
         functions, most = interface.platform(), 0

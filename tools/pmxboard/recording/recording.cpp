@@ -165,12 +165,20 @@ private:
                      head >> 16 & 0xFF,
                      head >> 24,
                      at,
-                     static_cast<std::uint32_t>(std::uint64_t{ words[1] } * m_recording.header.u4TickNs / 1000),
+                     microseconds(words[1]),
                      behind };
         const std::string wrong = wrong_with(event, m_recording.header);
         hold(wrong.empty(), m_place + " is damaged: " + wrong);
         keep(event, std::vector(behind.begin(), behind.end()));
         return count;
+    }
+
+    /** Ticks are told modulo 2^32; what another thread began to record before may have a place behind. */
+    std::uint64_t microseconds(std::uint32_t ticks)
+    {
+        const auto since = static_cast<std::int32_t>(ticks - static_cast<std::uint32_t>(m_ticks));
+        m_ticks = m_recording.events.empty() ? ticks : std::max<std::int64_t>(0, m_ticks + since);
+        return static_cast<std::uint64_t>(m_ticks) * m_recording.header.u4TickNs / 1000;
     }
 
     void keep(Event event, std::vector<std::uint32_t> words)
@@ -226,6 +234,7 @@ private:
     ForeignState m_state;
     std::map<std::uint32_t, Text> m_texts;
     std::string m_place;
+    std::int64_t m_ticks = 0;
 };
 
 /** Where the first recording begins. Its first words stand in a dump elsewhere, too: as constants of programs, and

@@ -31,7 +31,7 @@ struct Event
     unsigned function;
     unsigned thread;
     std::uint32_t at;                     ///< counted in words since the recording began, modulo 2^32
-    std::uint32_t time;                   ///< microseconds
+    std::uint64_t time;                   ///< microseconds
     std::span<const std::uint32_t> words; ///< behind the time
 };
 

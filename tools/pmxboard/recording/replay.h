@@ -19,7 +19,7 @@ namespace pmxboard
 struct Departure
 {
     std::size_t event = 0; ///< counted from 1
-    std::uint32_t time = 0;
+    std::uint64_t time = 0;
     unsigned thread = 0;
     std::string operation;     ///< that ran there; empty between operations
     std::size_t outermost = 0; ///< how many operations that nobody calls from within had begun

@@ -42,7 +42,7 @@ scenario()
             unload
             loaded=false
         fi
-        # shellcheck disable=SC2086 # words
+        # shellcheck disable=SC2046 # words
         $loaded || load start=0 $(cat /parameters)
         loaded=true
         [ "$line" = POWER-ON ] || echo "$line" >"$files/command" || echo "WRONG $line"

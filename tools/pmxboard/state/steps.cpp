@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "tools/pmxboard/state/steps.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace pmxboard
@@ -30,7 +31,11 @@ void Steps::add(Step step)
     if (m_all.size() == most_steps || m_characters > most_characters)
         lose("more than " + std::to_string(most_steps) + " commands, or very long ones, led to it since power-on");
     else
+    {
+        if (m_all.size() == m_all.capacity()) // never for more than there will be
+            m_all.reserve(std::min(most_steps, 2 * m_all.size() + 16));
         m_all.push_back(std::move(step));
+    }
 }
 
 void Steps::lose(std::string why)

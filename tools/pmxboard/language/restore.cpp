@@ -83,15 +83,7 @@ private:
 void Session::keep_step(const Line& line, bool failed)
 {
     if (line.word(0) != "power-on" && is_step(line))
-        m_steps.add({ m_directory.string(), line.from(0), failed, {} });
-}
-
-/** The board is what its file says: it must say what it said then. */
-void Session::power_on_as_then(const Step& step)
-{
-    run_line(step.line);
-    if (const Step& now = m_steps.all().front(); !step.board.empty() && now.board != step.board)
-        throw StepFailed("its board file says something else than it did then");
+        m_steps.add({ m_directory.string(), line.from(0), failed });
 }
 
 /** What failed then fails now, too, and nothing else does; where that leads is looked at in the end. */
@@ -102,7 +94,7 @@ void Session::run_step(const Step& step)
         throw LineError("it does nothing to a state");
     m_directory = step.directory;
     if (line.word(0) == "power-on")
-        return power_on_as_then(step);
+        return run_line(step.line);
     try
     {
         run_line(step.line);
@@ -134,6 +126,9 @@ void Session::run_steps(const StateDump& dump, const std::string& name)
         {
             ++number;
             run_step(step);
+            // The board is what its file says: it must say what it said then.
+            if (number == 1 && !dump.steps.board().empty() && dump.steps.board() != m_steps.board())
+                throw StepFailed("its board file says something else than it did then");
         }
     }
     catch (const std::exception& error)

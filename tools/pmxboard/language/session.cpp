@@ -370,9 +370,8 @@ void Session::power_on(const std::string& board)
         throw StepFailed(std::string("the board cannot be powered on: ") + wrong.what());
     }
     m_powered = true;
-    const Step step{ board.empty() ? std::string() : m_directory.string(), "power-on " + word_of_file(name), false,
-                     std::move(check) };
-    m_steps.begin(step);
+    const Step step{ board.empty() ? std::string() : m_directory.string(), "power-on " + word_of_file(name) };
+    m_steps.begin(step, std::move(check));
     // What is seen goes on through a power-on.
     if (m_watches_stores)
         m_steps.add({ .directory = step.directory, .line = "stores on" });

@@ -138,7 +138,6 @@ private:
     /** A scenario that does not begin with power-on has a board all the same. */
     void need_power(std::string_view command);
     void run_step(const Step& step);
-    void power_on_as_then(const Step& step);
     void run_steps(const StateDump& dump, const std::string& name);
     void keep_step(const Line& line, bool failed = false);
     void check_misuses() const;

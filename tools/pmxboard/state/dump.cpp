@@ -136,8 +136,8 @@ Json json_of(const Steps& steps)
         one["line"] = step.line;
         if (step.failed)
             one["failed"] = 1;
-        if (!step.board.empty())
-            one["board"] = step.board;
+        if (json["commands"].empty() && !steps.board().empty())
+            one["board"] = steps.board();
         json["commands"].push_back(std::move(one));
     }
     return json;
@@ -151,8 +151,7 @@ Step step_of(const Json& json, std::size_t number)
     if (!is_step)
         throw DumpError("steps.commands" + item_step(number) + ": " + printable(board::written(json), 60) +
                         " is no command");
-    return { json.value("in", ""), json.at("line").get<std::string>(), json.value("failed", 0) != 0,
-             json.value("board", "") };
+    return { json.value("in", ""), json.at("line").get<std::string>(), json.value("failed", 0) != 0 };
 }
 
 /** Those that are kept in another way do not keep the state from being looked at. */
@@ -185,7 +184,7 @@ Steps steps_of(const Json& all)
     {
         Step step = step_of(json.at("commands")[i], i);
         if (i == 0)
-            steps.begin(std::move(step));
+            steps.begin(std::move(step), json.at("commands")[i].value("board", ""));
         else
             steps.add(std::move(step));
     }

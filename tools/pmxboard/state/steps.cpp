@@ -15,9 +15,10 @@ constexpr std::size_t most_characters = std::size_t{ 4 } << 20;
 
 } // namespace
 
-void Steps::begin(Step step)
+void Steps::begin(Step step, std::string board)
 {
     m_all.clear();
+    m_board = std::move(board);
     m_characters = 0;
     m_lost.clear();
     add(std::move(step));
@@ -41,6 +42,7 @@ void Steps::add(Step step)
 void Steps::lose(std::string why)
 {
     m_all.clear();
+    m_board.clear();
     if (m_lost.empty())
         m_lost = std::move(why);
 }

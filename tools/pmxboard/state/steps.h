@@ -19,7 +19,6 @@ struct Step
     std::string directory; ///< what names of files in the line are relative to
     std::string line;
     bool failed = false; ///< when it led there
-    std::string board{}; ///< of a power-on: what the board file says, in short
 
     bool operator==(const Step&) const = default;
 };
@@ -27,13 +26,14 @@ struct Step
 class Steps
 {
 public:
-    /** Power-on: what was before does not count any more. */
-    void begin(Step step);
+    /** Power-on: what was before does not count any more. `board` is what the board file says, in short. */
+    void begin(Step step, std::string board = {});
     void add(Step step);
     /** Something happened that no line says. */
     void lose(std::string why);
 
     const std::vector<Step>& all() const { return m_all; }
+    const std::string& board() const { return m_board; }
     /** Why these steps do not lead to the state; empty when they do. */
     const std::string& lost() const { return m_lost; }
 
@@ -41,6 +41,7 @@ public:
 
 private:
     std::vector<Step> m_all;
+    std::string m_board;
     std::size_t m_characters = 0;
     std::string m_lost = "the board was never powered on";
 };

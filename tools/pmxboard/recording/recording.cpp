@@ -241,7 +241,7 @@ private:
  *  before what is left of an older recording. */
 std::size_t find_recording(std::string_view bytes)
 {
-    std::optional<RecordingError> first;
+    std::optional<std::string> first;
     for (std::size_t at = 0; (at = bytes.find(bytes_of(magic), at)) != bytes.npos; ++at)
     {
         try
@@ -252,12 +252,12 @@ std::size_t find_recording(std::string_view bytes)
         catch (const RecordingError& error)
         {
             if (!first)
-                first = error;
+                first = error.what();
         }
     }
     if (!first)
         refuse_without_magic(bytes);
-    throw *first;
+    throw RecordingError(*first);
 }
 
 } // namespace

@@ -20,6 +20,7 @@ ROOT = pathlib.Path(__file__).resolve().parents[2]
 
 import debian  # noqa: E402
 import machines  # noqa: E402
+import packages  # noqa: E402
 import recorders  # noqa: E402
 import run  # noqa: E402
 import scenarios  # noqa: E402
@@ -160,17 +161,11 @@ class Kernel(unittest.TestCase):
             self.assertEqual("1.2-x", debian.kernel(folder).release)
             self.assertEqual("1.2-x", debian.kernel(folder).release)
             self.assertEqual([folder], fetched)
-            (folder / debian.USABLE).write_text("/elsewhere\n1.2-x\n", encoding="utf-8")
+            (folder / packages.USABLE).write_text("/elsewhere\n1.2-x\n", encoding="utf-8")
             debian.kernel(folder)
             self.assertEqual([folder, folder], fetched)
             self.assertEqual("1.2-x", debian.kernel(folder, newest=True).release)
             self.assertEqual([folder] * 3, fetched)
-
-    def test_backports_go_with_the_release_that_the_machine_has(self):
-        self.assertEqual(("http://mirror/debian", "bookworm-backports"), debian.backports_of(
-            "http://other/ stable Other\nhttp://mirror/debian bookworm-updates Debian\n"
-            "http://mirror/debian bookworm Debian\nhttp://second/debian trixie Debian\n"))
-        self.assertIsNone(debian.backports_of("http://other/ stable Other\n"))
 
     def test_what_the_kernels_build_finds_in_the_code_is_an_error(self):
         with tempfile.TemporaryDirectory() as directory:

@@ -27,8 +27,9 @@ import debian  # noqa: E402
 import scenarios  # noqa: E402
 
 HERE = pathlib.Path(__file__).resolve().parent
-sys.path.insert(0, str(HERE.parent / "recorder"))
+sys.path[:0] = [str(HERE.parent / "recorder"), str(HERE.parent / "common")]
 
+from ktap import Ktap  # noqa: E402
 from recordings import Recording  # noqa: E402
 
 ROOT = HERE.parents[1]
@@ -50,28 +51,6 @@ TAKEN = "first-mode-after-boot"
 
 class Failed(Exception):
     """No comparison came about."""
-
-
-class Ktap:
-    """Verdicts, one a line, as kernel tests tell them."""
-
-    def __init__(self):
-        self.number, self.failures = 0, 0
-        print("KTAP version 1", flush=True)
-
-    def verdict(self, name, wrong=()):
-        self.number += 1
-        self.failures += bool(wrong)
-        for line in wrong:
-            print(f"# {line}")
-        print(f"{'not ok' if wrong else 'ok'} {self.number} {name}", flush=True)
-
-    def skip(self, name, reason):
-        self.number += 1
-        print(f"ok {self.number} {name} # SKIP {reason}", flush=True)
-
-    def end(self):
-        print(f"1..{self.number}")
 
 
 def run(*command, **how):

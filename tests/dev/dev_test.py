@@ -167,6 +167,13 @@ class Caches(TreeTest):
             self.expect(0, f"{program} {self.tree}/.cache/kernel {self.tree}/build/kernel ", "kernel", option)
             self.expect(2, f"kernel {option} does not take: x", "kernel", option, "x")
 
+    def test_the_proof_is_kept_there_too(self):
+        self.expect(0, f"prove {self.tree}/.cache/prove {self.tree}/build/prove\n", "prove")
+        self.expect(0, f"prove {self.space}/kept/prove {self.tree}/build/prove --faults PMX_Init\n",
+                    "prove", "--faults", "PMX_Init", PMX_CACHE="kept")
+        self.expect(0, "", "clean")
+        self.assertTrue((self.tree / ".cache/prove").is_dir())
+
     def test_the_users_own_is_used(self):
         self.expect(0, "cache /elsewhere", "run", CCACHE_DIR="/elsewhere")
         self.expect(0, "cache none", "run", CCACHE_CONFIGPATH="/elsewhere/ccache.conf")

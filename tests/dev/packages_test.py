@@ -50,6 +50,8 @@ class Packages(TreeTest):
                                   (("kernel",), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu"),
                                   (("kernel", "--cost"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu"),
                                   (("kernel", "--debug"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu flex"),
+                                  (("kernel", "--all"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu flex"),
+                                  (("prove",), "python3 gcc-bare clang"),
                                   (("docs",), ""),
                                   (("clean",), ""),
                                   (("help",), ""),

@@ -91,12 +91,16 @@ class TreeTest(unittest.TestCase):
             shutil.copy2(ROOT / file, tree)
         (tree / "CMakeLists.txt").write_text("cmake_minimum_required(VERSION 3.25)\n", encoding="utf-8")
         (tree / "CMakePresets.json").write_text("{}\n", encoding="utf-8")
-        (tree / "tests/kernel").mkdir(parents=True)
         for name in KERNEL_PROGRAMS:
-            kernel = tree / f"tests/kernel/{name}.py"
-            kernel.write_text(f'#!/bin/bash\necho "{name.replace("run", "kernel")} $*"\n', encoding="utf-8")
-            kernel.chmod(0o755)
+            self.make_program(tree / f"tests/kernel/{name}.py", name.replace("run", "kernel"))
+        self.make_program(tree / "tests/prove/prove.py", "prove")
         return tree
+
+    @staticmethod
+    def make_program(path, says):
+        path.parent.mkdir(parents=True, exist_ok=True)
+        path.write_text(f'#!/bin/bash\necho "{says} $*"\n', encoding="utf-8")
+        path.chmod(0o755)
 
     def environment(self, **more):
         kept = {name: value for name, value in os.environ.items() if name not in ("CCACHE_DIR", "CCACHE_CONFIGPATH",

@@ -1,0 +1,50 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+"""The bounded model checker CBMC, out of the next release of Debian, unpacked into a cache folder with the C library
+that it was built for, and run by that library's own loader: nothing of the machine is changed."""
+
+import pathlib
+import platform
+import shutil
+import subprocess
+import sys
+
+sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "common"))
+
+from packages import Apt, Unavailable, emptied, kept, unpack  # noqa: E402, F401
+
+# The checker, and what its programs are linked with.
+PACKAGES = ("cbmc", "minisat", "libc6", "libstdc++6", "libgcc-s1", "zlib1g")
+
+
+def _fetch(folder):
+    if platform.machine() != "x86_64":
+        raise Unavailable(f"the checker's loader is known for x86-64 alone, not for {platform.machine()}")
+    apt = Apt(folder / "apt")
+    apt.update()
+    apt.prefer_next_release()
+    version = apt.version("cbmc")
+    archives, unpacked = emptied(folder / "archives"), emptied(folder / "unpacked")
+    apt.download([f"{name}={apt.version(name)}" for name in PACKAGES], archives)
+    for archive in sorted(archives.iterdir()):
+        unpack(archive, unpacked)
+    shutil.rmtree(archives)
+    return version
+
+
+class Checker:
+    """The unpacked programs."""
+
+    def __init__(self, cache):
+        folder, self.version = kept(cache, " ".join(PACKAGES), _fetch)
+        root = folder / "unpacked"
+        libraries = [root / "usr/lib/x86_64-linux-gnu", root / "usr/lib"]
+        loader = next((path for path in (root / "usr/lib64/ld-linux-x86-64.so.2", libraries[0] / "ld-linux-x86-64.so.2")
+                       if path.exists()), None)
+        if not loader:
+            raise Unavailable("the checker's C library has no loader")
+        self._start = [loader, "--library-path", ":".join(map(str, libraries))]
+        self._programs = root / "usr/bin"
+
+    def run(self, program, *arguments, **how):
+        return subprocess.run([*self._start, self._programs / program, *arguments], capture_output=True, text=True,
+                              check=False, **how)

@@ -1,0 +1,273 @@
+#!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+"""Proves of each operation of the layer, for all arguments, all contents of the record and all answers of the platform,
+what docs/claims.md says; and that faults which are planted in copies of the sources are found. Prints KTAP; ends with 1
+when something does not hold, and with 77 when the checker is not to be had.
+
+usage: prove.py CACHE MADE [--faults] [OPERATION...]
+    CACHE      folder in which the checker is kept, and what was proved of these very sources
+    MADE       folder for all that is written on the way
+    --faults   plant every fault of faults.toml, not a sample
+    OPERATION  prove these alone, and plant the faults that are theirs
+"""
+
+import argparse
+import concurrent.futures
+import hashlib
+import os
+import pathlib
+import re
+import shutil
+import subprocess
+import sys
+import time
+import tomllib
+
+sys.dont_write_bytecode = True
+
+import checker  # noqa: E402
+import harness  # noqa: E402
+import view  # noqa: E402
+from ktap import Ktap  # noqa: E402
+
+HERE = pathlib.Path(__file__).resolve().parent
+ROOT = view.ROOT
+SKIPPED = 77
+SAMPLE = 8  # faults that are planted in every run
+LIMIT = 600  # seconds for one operation
+# A place beyond the longest loop: what goes round more often is an error, told as such.
+OPTIONS = ["--nondet-static", "--unwind", "9", "--object-bits", "10", "--drop-unused-functions"]
+GUARD = '(__CPROVER_assert((size_t)(i)<(n),"index within the array of a record"),(i))'
+REACHED = "the end is reached"
+CHECKED = re.compile(r"^\[(\S+)\] (?:line (\d+) )?(.*): (SUCCESS|FAILURE|UNKNOWN|ERROR)$", re.M)
+PLACE = re.compile(r"^(\S+) function (\w+)$", re.M)
+COMPILER = ["--native-compiler", "arm-none-eabi-gcc", "-mcpu=cortex-a9"]
+
+
+class Program:
+    """The layer of a tree, with what is put around it, as the checker reads it."""
+
+    def __init__(self, cbmc, root, folder, others=None):
+        self._cbmc, self._folder = cbmc, folder
+        shutil.rmtree(folder, ignore_errors=True)
+        folder.mkdir(parents=True)
+        sources = view.write(root, folder)
+        written = folder / "harness.c"
+        written.write_text(harness.text(root), encoding="utf-8")
+        names = [source.name for source in (*sources, written)] + [str(HERE / "surroundings.c")]
+        self._preprocessed = {pathlib.PurePath(name).stem: self._preprocess(name) for name in names}
+        whole = "".join([cbmc.version, *OPTIONS, *self._preprocessed.values()])
+        self.key = hashlib.sha256(whole.encode()).hexdigest()[:32]
+        self._others = others  # a program whose objects are used where they are of the same text
+
+    def _preprocess(self, name):
+        """The same wherever the folder is: what has no fault in it is compiled once."""
+        return view.run(*view.PREPROCESS, *view.defines(GUARD), "-Iinclude", f"-I{HERE}", name, cwd=self._folder)
+
+    def _run(self, program, *arguments):
+        ran = self._cbmc.run(program, *arguments)
+        if ran.returncode != 0:
+            raise view.Failed(f"{program} {' '.join(map(str, arguments))}:\n{(ran.stdout + ran.stderr)[-3000:]}")
+
+    def _object(self, stem):
+        others = self._others
+        if others and others._preprocessed.get(stem) == self._preprocessed[stem]:
+            return others._folder / f"{stem}.go"
+        text, made = self._folder / f"{stem}.i", self._folder / f"{stem}.go"
+        text.write_text(self._preprocessed[stem], encoding="utf-8")
+        self._run("goto-cc", *COMPILER, "-c", text, "-o", made)
+        return made
+
+    def build(self):
+        objects = [self._object(stem) for stem in self._preprocessed]
+        self._run("goto-cc", *COMPILER, *objects, "-o", self._folder / "whole")
+
+    def check(self, operation, world=None):
+        """What the checker says of an operation, in every world or in one."""
+        entry = f"{world}_{operation}" if world else f"{harness.ENTRY}{operation}"
+        worlds = 1 if world else len(harness.WORLDS)
+        try:
+            ran = self._cbmc.run("cbmc", self._folder / "whole", *OPTIONS, "--function", entry, timeout=LIMIT)
+        except subprocess.TimeoutExpired:
+            return Verdict("", worlds, f"the checker took longer than {LIMIT} s")
+        return Verdict(ran.stdout, worlds, (ran.stdout + ran.stderr)[-300:])
+
+
+class Verdict:
+    """How many checks the checker made, and what is wrong."""
+
+    def __init__(self, text, worlds=len(harness.WORLDS), complaint=""):
+        place, self.number, self.wrong, reached = "", 0, [], []
+        for line in text.splitlines():
+            where, checked = PLACE.match(line), CHECKED.match(line)
+            if where:
+                place = where[1].removeprefix(f"{ROOT}/")
+            elif checked and checked[3] == REACHED:
+                reached.append(checked[4])
+            elif checked:
+                self.number += 1
+                if checked[4] != "SUCCESS":
+                    self.wrong.append(f"{place}:{checked[2]}: {checked[3]}: {checked[4]}")
+        # Behind what fails the checker does not know; what fails goes first.
+        self.wrong.sort(key=lambda line: not line.endswith("FAILURE"))
+        self.wrong += re.findall(r"no body for .*", text)
+        # Of what is behind every call it is claimed that nothing gets there: who does not see that this is wrong has
+        # presumed too much.
+        if not reached:
+            self.wrong.append(f"nothing was proved: {complaint}")
+        elif reached != ["FAILURE"] * worlds:
+            self.wrong.append("an end is not reached: what is presumed cannot be")
+
+
+class Results:
+    """What was proved before of the same text."""
+
+    def __init__(self, folder, key):
+        self._folder = folder / key
+        for other in folder.iterdir() if folder.exists() else ():
+            if other != self._folder:
+                shutil.rmtree(other)
+        self._folder.mkdir(parents=True, exist_ok=True)
+
+    def get(self, operation):
+        kept = self._folder / operation
+        return int(kept.read_text(encoding="utf-8")) if kept.exists() else None
+
+    def keep(self, operation, number):
+        unfinished = self._folder / f"{operation}.unfinished"
+        unfinished.write_text(f"{number}\n", encoding="utf-8")
+        unfinished.rename(self._folder / operation)
+
+
+def prove(program, results, operation):
+    """(number of checks, what is wrong, seconds; none when it was proved before)"""
+    number = results.get(operation)
+    if number:
+        return number, [], None
+    began = time.monotonic()
+    verdict = program.check(operation)
+    if not verdict.wrong:
+        results.keep(operation, verdict.number)
+    return verdict.number, verdict.wrong, time.monotonic() - began
+
+
+def all_faults():
+    return tomllib.loads((HERE / "faults.toml").read_text(encoding="utf-8"))["fault"]
+
+
+def faulty(fault):
+    """The text of a source with a fault in it."""
+    text = (ROOT / view.LAYER / fault["file"]).read_text(encoding="utf-8")
+    if text.count(fault["from"]) != 1:
+        raise view.Failed(f"{fault['file']} has {text.count(fault['from'])} times: {fault['from']}")
+    return text.replace(fault["from"], fault["to"])
+
+
+def planted(fault, folder):
+    """A copy of the sources with a fault in it."""
+    shutil.rmtree(folder, ignore_errors=True)
+    shutil.copytree(ROOT / "src", folder / "src")
+    (folder / view.LAYER / fault["file"]).write_text(faulty(fault), encoding="utf-8")
+    return folder
+
+
+def find(base, cbmc, fault, folder):
+    """What is wrong with finding a fault, and what was seen of it."""
+    try:
+        program = Program(cbmc, planted(fault, folder / "tree"), folder / "view", base)
+        program.build()
+        wrong = program.check(fault["operation"], fault.get("world", harness.WORLDS[0])).wrong
+    except view.Failed as reason:
+        return str(reason).splitlines(), ""
+    seen = [line for line in wrong if fault["seen"] in line]
+    return [] if seen else [f"it was not seen as: {fault['seen']}", *wrong], (seen or [""])[0]
+
+
+def sample(faults, everything):
+    """All faults, or some that are spread over the list."""
+    return faults if everything else faults[::max(1, len(faults) // SAMPLE)][:SAMPLE]
+
+
+def in_turn(pool, work, things):
+    """(thing, what became of it), in their order."""
+    begun = [(thing, pool.submit(work, thing)) for thing in things]
+    for thing, future in begun:
+        yield thing, future.result()
+
+
+def the_view(ktap, folder):
+    """What is proved compiles to the layer's own code."""
+    shutil.rmtree(folder, ignore_errors=True)
+    view.write(ROOT, folder)
+    number, different = view.disagreements(ROOT, folder)
+    wrong = [f"{name}: no compiler makes the same of source and view" for name in different]
+    ktap.verdict(f"view: {number} functions and tables compile to the layer's own",
+                 wrong if number else ["there are none"])
+
+
+def the_operations(ktap, pool, program, results, names):
+    """How many checks were made of the operations."""
+    total, before = 0, 0
+    for name, (number, wrong, seconds) in in_turn(pool, lambda name: prove(program, results, name), names):
+        how = "proved before" if seconds is None else f"{seconds:.1f} s"
+        ktap.verdict(f"{name}: {number} checks, {how}", wrong)
+        total, before = total + number, before + (seconds is None)
+    print(f"# {len(names)} operations, {before} of them proved before; {total} checks")
+    return total
+
+
+def the_faults(ktap, pool, program, cbmc, faults, folder):
+    numbered = list(enumerate(faults))
+    found = in_turn(pool, lambda each: find(program, cbmc, each[1], folder / f"fault-{each[0]}"), numbered)
+    for (_, fault), (wrong, seen) in found:
+        ktap.verdict(f"fault: {fault['what']}: {seen or fault['operation']}", wrong)
+
+
+def carry_out(ktap, chosen, names, faults):
+    cbmc = checker.Checker(chosen.cache / "checker")
+    made = chosen.made.resolve()
+    the_view(ktap, made / "view")
+    program = Program(cbmc, ROOT, made / "whole")
+    program.build()
+    planting = sample(faults, chosen.faults or chosen.operation)
+    with concurrent.futures.ThreadPoolExecutor(len(os.sched_getaffinity(0))) as pool:
+        if not the_operations(ktap, pool, program, Results(chosen.cache / "proved", program.key), names):
+            ktap.verdict("proof", ["nothing was proved"])
+        the_faults(ktap, pool, program, cbmc, planting, made)
+    print(f"# {len(planting)} of {len(faults)} faults planted")
+
+
+def asked_for(words):
+    """(what was asked for, the operations to prove, the faults that are theirs)"""
+    parser = argparse.ArgumentParser(usage="./dev prove [--faults] [OPERATION...]", add_help=False)
+    parser.add_argument("cache", type=pathlib.Path)
+    parser.add_argument("made", type=pathlib.Path)
+    parser.add_argument("--faults", action="store_true")
+    parser.add_argument("operation", nargs="*")
+    chosen = parser.parse_args(words)
+    names = [function.name for function in harness.operations(ROOT)]
+    for name in chosen.operation:
+        if name not in names:
+            parser.error(f"no such operation: {name}")
+    names = chosen.operation or names
+    return chosen, names, [fault for fault in all_faults() if fault["operation"] in names]
+
+
+def main():
+    chosen, names, faults = asked_for(sys.argv[1:])
+    began, skipped, ktap = time.monotonic(), False, Ktap()
+    try:
+        carry_out(ktap, chosen, names, faults)
+    except checker.Unavailable as reason:
+        ktap.skip("proof", str(reason).replace("\n", " "))
+        skipped = True
+    except view.Failed as reason:
+        ktap.verdict("proof", str(reason).splitlines())
+    ktap.end()
+    spent = os.times()
+    print(f"# {time.monotonic() - began:.0f} s, {spent.children_user + spent.children_system:.0f} s of processors")
+    return 1 if ktap.failures else SKIPPED if skipped else 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())

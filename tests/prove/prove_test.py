@@ -1,0 +1,125 @@
+#!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+"""The layer as C is the layer; each fault can be planted; what the checker says is read; and the page about it tells
+what is presumed. The proof itself needs the checker, and is ./dev prove."""
+
+import pathlib
+import re
+import sys
+import tempfile
+import unittest
+
+sys.dont_write_bytecode = True
+
+import harness  # noqa: E402
+import prove  # noqa: E402
+import view  # noqa: E402
+
+PAGE = (prove.ROOT / "docs/claims.md").read_text(encoding="utf-8")
+REACHED = "".join(f"[{world}_x.assertion.1] line 9 {prove.REACHED}: FAILURE\n" for world in harness.WORLDS)
+
+
+def read(text):
+    return view.as_c(text, {"arPortInfo": "PMX_PORT_NUM"})
+
+
+class View(unittest.TestCase):
+    def test_it_compiles_to_the_layers_own_code(self):
+        with tempfile.TemporaryDirectory() as directory:
+            folder = pathlib.Path(directory)
+            view.write(view.ROOT, folder)
+            number, different = view.disagreements(view.ROOT, folder)
+            self.assertEqual([], different)
+            self.assertGreater(number, 126)
+            path = folder / "pmx_port.c"
+            changed = path.read_text(encoding="utf-8").replace("fgConnected = TRUE", "fgConnected = FALSE")
+            path.write_text(changed, encoding="utf-8")
+            self.assertIn("i4Pmx_Connect", view.disagreements(view.ROOT, folder)[1])
+
+    def test_each_index_into_a_record_states_its_bound(self):
+        self.assertEqual("x->arPortInfo[PMX_WITHIN(a[b + 1], PMX_PORT_NUM)].fgEnabled",
+                         read("x->arPortInfo[a[b + 1]].fgEnabled"))
+        self.assertEqual("f() { P* p = x->arPortInfo;\n p[PMX_WITHIN(i, PMX_PORT_NUM)];\n}\np[i];",
+                         read("f() { P* p = x->arPortInfo;\n p[i];\n}\np[i];"))
+        self.assertEqual('"x.arPortInfo[%d]"', read('"x.arPortInfo[%d]"'))
+        self.assertEqual({"aucPlaneOrder", "arPortInfo", "arOutputConf"}, view.member_arrays(view.ROOT).keys())
+
+
+class Promises(unittest.TestCase):
+    def setUp(self):
+        self.functions = {function.name: function for function in harness.operations(harness.ROOT)}
+
+    def of(self, name):
+        return [condition for condition, _ in harness.promises(self.functions[name], set())]
+
+    def test_they_are_read_from_the_contracts(self):
+        self.assertEqual(["!inRange || result <= 1", "ucPmxId == 0 || result == 0", "pucGamma != 0 || result == 0",
+                          "(_arPmxConf[0].u4Capability >> 20 & 1) != 0 || result == 0"], self.of("PMX_GetGamma"))
+        self.assertEqual(["result == 1"], self.of("PMX_SetOsdEnable"))
+        self.assertIn("(UCHAR)(size_t)pvTag == 0 || result == 0", self.of("i4PmxSetMode"))
+
+    def test_whatever_is_named_is_an_operation(self):
+        for names in (harness.STORED_ALL_THE_SAME, harness.LOWERS_THE_FLAG, harness.PRESUMED, harness.ALSO):
+            self.assertLessEqual(set(names), self.functions.keys())
+
+    def test_every_operation_is_called_in_every_world(self):
+        text = harness.text(harness.ROOT)
+        for name in self.functions:
+            for world in harness.WORLDS:
+                self.assertEqual(1, text.count(f"void {world}_{name}(void)"), name)
+
+
+class Verdicts(unittest.TestCase):
+    def test_what_does_not_hold_is_told_with_its_place(self):
+        verdict = prove.Verdict("src/x.cpp function f\n[f.1] line 7 division by zero: SUCCESS\n"
+                                f"[f.2] line 8 array 'a' upper bound in a[i]: FAILURE\n{REACHED}")
+        self.assertEqual((2, ["src/x.cpp:8: array 'a' upper bound in a[i]: FAILURE"]), (verdict.number, verdict.wrong))
+        self.assertEqual([], prove.Verdict(REACHED).wrong)
+
+    def test_what_proves_nothing_is_wrong(self):
+        self.assertEqual(["nothing was proved: killed"], prove.Verdict("", complaint="killed").wrong)
+        for text in (REACHED.replace("FAILURE", "SUCCESS", 1), REACHED.partition("\n")[2]):
+            self.assertEqual(["an end is not reached: what is presumed cannot be"], prove.Verdict(text).wrong)
+        self.assertEqual(["no body for function f"], prove.Verdict(f"no body for function f\n{REACHED}").wrong)
+
+    def test_what_was_proved_is_kept_for_the_same_text_alone(self):
+        with tempfile.TemporaryDirectory() as directory:
+            folder = pathlib.Path(directory)
+            prove.Results(folder, "one").keep("f", 7)
+            self.assertEqual(7, prove.Results(folder, "one").get("f"))
+            self.assertIsNone(prove.Results(folder, "one").get("g"))
+            self.assertIsNone(prove.Results(folder, "two").get("f"))
+            self.assertIsNone(prove.Results(folder, "one").get("f"))
+
+
+class Faults(unittest.TestCase):
+    def test_each_can_be_planted_and_belongs_to_an_operation(self):
+        names = {function.name for function in harness.operations(harness.ROOT)}
+        faults = prove.all_faults()
+        self.assertEqual(len(faults), len({(fault["file"], fault["from"], fault["to"]) for fault in faults}))
+        for fault in faults:
+            with self.subTest(fault["what"]):
+                self.assertNotEqual(prove.faulty(fault), (view.ROOT / view.LAYER / fault["file"]).read_text("utf-8"))
+                self.assertIn(fault["operation"], names)
+
+    def test_a_sample_is_spread_over_the_list(self):
+        faults = list(range(78))
+        self.assertEqual(prove.SAMPLE, len(set(prove.sample(faults, False))))
+        self.assertGreater(max(prove.sample(faults, False)), 60)
+        self.assertEqual(faults, prove.sample(faults, True))
+        self.assertEqual([1], prove.sample([1], False))
+
+
+class Page(unittest.TestCase):
+    def test_it_tells_what_is_presumed_and_excepted(self):
+        for names in (harness.STORED_ALL_THE_SAME, harness.LOWERS_THE_FLAG, harness.PRESUMED):
+            for name in names:
+                self.assertIn(f"`{name}`", PAGE)
+
+    def test_its_numbers_are_right(self):
+        self.assertEqual(len(harness.operations(harness.ROOT)), int(re.search(r"\b(\d+) operations\b", PAGE)[1]))
+        self.assertEqual(len(prove.all_faults()), int(re.search(r"\b(\d+) faults\b", PAGE)[1]))
+
+
+if __name__ == "__main__":
+    unittest.main()

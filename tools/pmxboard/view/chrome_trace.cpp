@@ -7,7 +7,7 @@
 #include <utility>
 
 #include "board/board.h"
-#include "tools/pmxboard/view/chrome_lanes.h"
+#include "tools/pmxboard/view/lanes.h"
 
 namespace pmxboard
 {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
-#include "tools/pmxboard/view/chrome_lanes.h"
+#include "tools/pmxboard/view/lanes.h"
 
 #include "board/devices.h"
 #include "tools/record_view/record_view.h"

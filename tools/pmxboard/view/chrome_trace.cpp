@@ -208,7 +208,7 @@ void ChromeTrace::end_operation(const std::string& arguments)
 
 void ChromeTrace::show(const States& states)
 {
-    for (int lane = lane_format_change_flag; lane <= lane_osd_plane_8; ++lane)
+    for (int lane = first_lane_of_states; lane <= last_lane_of_states; ++lane)
     {
         const auto before = m_states.find(lane);
         const auto after = states.find(lane);

@@ -2,6 +2,7 @@
 #include "tools/pmxboard/view/lanes.h"
 
 #include "board/devices.h"
+#include "tools/pmxboard/state/status.h"
 #include "tools/record_view/record_view.h"
 
 namespace pmxboard
@@ -11,8 +12,8 @@ namespace
 
 using board::Value;
 
-constexpr int first_osd_plane = 3;
-constexpr int last_osd_plane = 8;
+constexpr unsigned first_osd_plane = 3;
+constexpr unsigned last_osd_plane = 8;
 
 std::string flag_field(int lane)
 {
@@ -24,17 +25,54 @@ std::string flag_field(int lane)
     }
 }
 
+int lane_of_plane(unsigned plane)
+{
+    return lane_osd_plane_3 + static_cast<int>(plane - first_osd_plane);
+}
+
+/** As much of the whole state as tells what outputs show and whether graphics wait. The whole takes too long for every
+ *  call. */
+Value part_of_state()
+{
+    Value status = Value::record({});
+    for (const char* const flag : { "fgPmxFormatChangeFlag", "fgPmxEnabeOsdFlag" })
+        status.add(flag, record_view::get("status." + std::string(flag)));
+    return Value::record({ { "mixer", board::mixer::state() },
+                           { "tv_encoder", board::tv_encoder::state() },
+                           { "hdmi_av", board::hdmi_av::state() },
+                           { "os", Value::record({ { "timers", board::timers::state() } }) },
+                           { "record", Value::record({ { "ucVfreq", record_view::get("ucVfreq") } }) },
+                           { "status", status } });
+}
+
 /** The layer's timer, while it runs: by the function that it will call. */
-std::string running_timer()
+std::string running_timer(const Value& timers)
 {
     const std::int64_t handle = record_view::get("status.hPMXTimer").as_number();
-    const Value timers = board::timers::state();
     for (const Value& timer : timers.items())
     {
         if (timer.find("handle")->as_number() == handle && timer.find("running")->as_number() != 0)
             return timer.find("callback")->to_text();
     }
     return {};
+}
+
+std::string shown_graphics(const GraphicsStatus& graphics)
+{
+    switch (graphics.state)
+    {
+    case GraphicsStatus::State::Held: return "held back";
+    case GraphicsStatus::State::AwaitsVideoPlane: return "held back by the video plane";
+    default: return {};
+    }
+}
+
+std::string shown_on(const OutputStatus& output)
+{
+    if (!output.on.value_or(false))
+        return {};
+    return output.mode.to_text() + " at " + output.frequency.to_text() + " Hz" +
+           (output.remark.empty() ? "" : ", " + output.remark);
 }
 
 } // namespace
@@ -45,31 +83,40 @@ std::map<int, std::string> lane_names()
                                          { lane_calls, "platform calls" },
                                          { lane_console, "console" },
                                          { lane_board, "board" },
-                                         { lane_timer, "display timer" } };
+                                         { lane_graphics, "graphics" },
+                                         { lane_timer, "display timer" },
+                                         { lane_sink, "HDMI sink" },
+                                         { lane_mute, "mute" },
+                                         { lane_digital, "digital output" },
+                                         { lane_digital + 1, "HDMI output" },
+                                         { lane_digital + 2, "component output" },
+                                         { lane_composite, "composite output" } };
     for (const int lane : { lane_format_change_flag, lane_osd_enable_flag, lane_timer_set_flag })
         names[lane] = "flag " + flag_field(lane);
-    for (int plane = first_osd_plane; plane <= last_osd_plane; ++plane)
-        names[lane_osd_plane_3 + plane - first_osd_plane] = "OSD plane " + std::to_string(plane);
+    for (unsigned plane = first_osd_plane; plane <= last_osd_plane; ++plane)
+        names[lane_of_plane(plane)] = "OSD plane " + std::to_string(plane);
     return names;
 }
 
 std::map<int, std::string> states_now()
 {
+    const Value part = part_of_state();
+    const Status status = status_of(part, {});
     std::map<int, std::string> states;
+    states[lane_graphics] = shown_graphics(status.graphics);
     for (const int lane : { lane_format_change_flag, lane_osd_enable_flag, lane_timer_set_flag })
+        states[lane] = record_view::get("status." + flag_field(lane)).as_number() != 0 ? flag_field(lane) : "";
+    states[lane_timer] = running_timer(*part.find("os.timers"));
+    for (const PlaneStatus& plane : status.planes)
     {
-        if (record_view::get("status." + flag_field(lane)).as_number() != 0)
-            states[lane] = flag_field(lane);
+        if (plane.plane >= first_osd_plane && plane.mixed)
+            states[lane_of_plane(plane.plane)] = "plane " + std::to_string(plane.plane) + " mixed";
     }
-    if (const std::string timer = running_timer(); !timer.empty())
-        states[lane_timer] = timer;
-    const Value mixer = board::mixer::state();
-    const Value* const mixed = mixer.find("mixed");
-    for (int plane = first_osd_plane; mixed != nullptr && plane <= last_osd_plane; ++plane)
-    {
-        if (mixed->items().at(static_cast<std::size_t>(plane) - 1).as_number() != 0)
-            states[lane_osd_plane_3 + plane - first_osd_plane] = "plane " + std::to_string(plane) + " mixed";
-    }
+    states[lane_sink] = status.sink.plugged ? "plugged in" : "";
+    states[lane_mute] = status.muted ? "muted" : "";
+    for (std::size_t output = 0; output < status.outputs.size(); ++output)
+        states[lane_digital + static_cast<int>(output)] = shown_on(status.outputs[output]);
+    std::erase_if(states, [](const auto& state) { return state.second.empty(); });
     return states;
 }
 

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
- *  The lanes of a Chrome trace, and what those of states show. */
+ *  What holds over a time of a run, in lanes: raised flags, the timer, mixed planes, what the outputs show. */
 #pragma once
 
 #include <map>
@@ -9,7 +9,7 @@
 namespace pmxboard
 {
 
-/** Lanes, from top to bottom. */
+/** Lanes, from top to bottom. Those in front of the states belong to traces that show calls, too. */
 enum Lane
 {
     lane_process, ///< what belongs to no lane
@@ -17,19 +17,28 @@ enum Lane
     lane_calls,
     lane_console,
     lane_board,
+    lane_graphics,
     lane_format_change_flag,
     lane_osd_enable_flag,
     lane_timer_set_flag,
     lane_timer,
     lane_osd_plane_3, ///< planes are counted from 1 here; the first two are of video
     lane_osd_plane_8 = lane_osd_plane_3 + 5,
-    lane_stores ///< only where there is one
+    lane_sink,
+    lane_mute,
+    lane_digital, ///< the outputs, in the layer's order
+    lane_composite = lane_digital + 3,
+    lane_stores, ///< only where there is one
+
+    first_lane_of_states = lane_graphics,
+    last_lane_of_states = lane_composite
 };
 
 /** What each lane is called, but for that of the stores. */
 std::map<int, std::string> lane_names();
 
-/** Lanes of states on which something holds now, and what: a raised flag, the running timer, a mixed plane. */
+/** Lanes of states on which something holds now, and what: a raised flag, the running timer, a mixed plane, graphics
+ *  that are held back, an output's mode. */
 std::map<int, std::string> states_now();
 
 } // namespace pmxboard

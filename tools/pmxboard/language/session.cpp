@@ -283,8 +283,11 @@ void Session::explain_ahead(const Line& line)
     try
     {
         m_explanation = explain(*this, line.from(0), quick);
-        if (const Reason* const refusal = m_explanation->refusal(); refusal != nullptr && m_shows_explanations)
+        if (!m_shows_explanations)
+            return;
+        if (const Reason* const refusal = m_explanation->refusal(); refusal != nullptr)
             m_output.refusal(sentence_of(*refusal));
+        m_output.explanation(to_json_line(*m_explanation));
     }
     catch (const std::exception&)
     {

@@ -65,6 +65,8 @@ void Output::command(std::string_view line)
 
 void Output::expectation(std::string_view line)
 {
+    if (!m_hushed)
+        m_trace->expectation(line);
     if (people() != nullptr && m_options.verbose)
         *people() << "> " + printable_lines(line) << '\n';
 }

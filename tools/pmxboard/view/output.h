@@ -62,6 +62,7 @@ public:
 
     void powered_on();
     void refusal(const std::string& sentence) { m_trace->refusal(sentence); }
+    void explanation(const std::string& json_line) { m_trace->explanation(json_line); }
     void operation_begins(const std::string& name);
     void command(std::string_view line);
     void expectation(std::string_view line);

@@ -28,8 +28,12 @@ public:
     virtual void scenario(const std::string&) {}
     virtual void powered_on() {}
     virtual void command(std::string_view) {}
+    /** What the scenario expects of the last command; looked at behind this. */
+    virtual void expectation(std::string_view) {}
     /** Why the operation that begins next will refuse. */
     virtual void refusal(const std::string&) {}
+    /** Why the command does what it does, as one JSON object: told in front of what it does. */
+    virtual void explanation(const std::string&) {}
     virtual void operation_begins(const std::string&) {}
     virtual void operation_ends(const Outcome&) {}
     /** The command is done: everything that it began has ended. */

@@ -56,7 +56,7 @@ _pmxboard_argument()
 {
     local tool=$1 sub=$2 word=$3
     case $sub in
-    run) _pmxboard_files "$word" '*.pmx' ;;
+    run | report) _pmxboard_files "$word" '*.pmx' ;;
     status) _pmxboard_files "$word" '*.json' ;;
     state)
         _pmxboard_files "$word" '*.json'
@@ -85,7 +85,7 @@ _pmxboard()
         _pmxboard_take "$word" < <("$tool" complete "power-on $word" 2>/dev/null)
         _pmxboard_files "$word" '*.toml' ;;
     --against) _pmxboard_files "$word" '*.pmx' ;;
-    --trace-file | --junit) _pmxboard_files "$word" '*' ;;
+    --trace-file | --junit | -o | --output) _pmxboard_files "$word" '*' ;;
     --trace-format | --color | --colour) _pmxboard_take "$word" < <(_pmxboard_values "$tool" "$sub" "$previous") ;;
     *)
         if [[ $word == -* ]]

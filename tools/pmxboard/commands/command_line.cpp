@@ -16,6 +16,7 @@
 #include "tools/pmxboard/commands/modes.h"
 #include "tools/pmxboard/commands/ops.h"
 #include "tools/pmxboard/commands/record.h"
+#include "tools/pmxboard/commands/report.h"
 #include "tools/pmxboard/commands/run.h"
 #include "tools/pmxboard/commands/shell.h"
 #include "tools/pmxboard/commands/state.h"
@@ -272,6 +273,19 @@ void add_replay(CLI::App& app, Chosen& chosen)
     sub->callback([replay, &chosen] { chosen = [replay] { return replay_file(*replay); }; });
 }
 
+void add_report(CLI::App& app, Chosen& chosen)
+{
+    const auto report = std::make_shared<ReportOptions>();
+    CLI::App* const sub =
+        app.add_subcommand("report", "Tell scenarios as a storyboard: one page for a browser, with pictures.");
+    sub->add_option("SCENARIO", report->files, "Scenarios; - reads the standard input")->required();
+    sub->add_option("-o,--output", report->page, "Where to write the page")->required()->type_name("FILE");
+    sub->add_option("--board", report->board, "Board to power on: a name under boards/, a directory or a .toml file")
+        ->type_name("NAME|FILE");
+    sub->footer(report_examples);
+    sub->callback([report, &chosen] { chosen = [report] { return report_scenarios(*report); }; });
+}
+
 /** A first word that is no sub-command, which the parser would not name; the exit code. */
 std::optional<int> misspelt(const CLI::App& app, int count, const char* const* arguments)
 {
@@ -312,6 +326,7 @@ int run_command_line(int count, const char* const* arguments)
     add_decode(app, chosen);
     add_record(app, chosen);
     add_replay(app, chosen);
+    add_report(app, chosen);
     if (const auto code = misspelt(app, count, arguments))
         return *code;
     try

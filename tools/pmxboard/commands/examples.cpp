@@ -161,4 +161,13 @@ rest.
 Exit codes: 0 equal, 1 the layer departs from it, 2 wrong usage, or no such
 recording.)";
 
+const char* const report_examples = R"(Examples:
+  pmxboard report scenarios/display-part-never-answers.pmx -o story.html
+      open story.html in a browser, and see why there were no graphics, and for how long
+  pmxboard report scenarios/display-part-answers.pmx scenarios/display-part-never-answers.pmx -o two.html
+      see what differs between two runs, side by side
+
+A scenario that fails is told as far as it came.
+Exit codes: 0 done, 1 a step failed, 2 wrong usage.)";
+
 } // namespace pmxboard

@@ -17,6 +17,7 @@ extern const char* const ops_examples;
 extern const char* const modes_examples;
 extern const char* const decode_examples;
 extern const char* const record_examples;
+extern const char* const report_examples;
 extern const char* const replay_examples;
 
 } // namespace pmxboard

@@ -1,0 +1,489 @@
+// SPDX-License-Identifier: MIT OR GPL-2.0-only
+"use strict";
+
+const data = JSON.parse(document.getElementById("data").textContent);
+const shown = { run: 0, other: -1, step: 0, output: 0, filter: "", toScale: false };
+
+const part = (id) => document.getElementById(id);
+
+/** An element with attributes and children. What a run holds becomes text, never markup. */
+function make(tag, attributes = {}, ...children) {
+  const element = document.createElement(tag);
+  for (const [name, value] of Object.entries(attributes)) {
+    if (name === "onclick") element.addEventListener("click", value);
+    else if (value === true) element.setAttribute(name, "");
+    else if (value !== false && value !== null && value !== undefined) element.setAttribute(name, value);
+  }
+  element.append(...children.filter((child) => child !== null && child !== ""));
+  return element;
+}
+
+const counted = (count, one, many = one + "s") => `${count} ${count === 1 ? one : many}`;
+
+/** Microseconds as people say them. */
+function spoken(us) {
+  if (us !== 0 && us < 1000) return `${us} µs`;
+  if (us < 1e6) return `${us / 1000} ms`;
+  return `${us / 1e6} s`;
+}
+
+const run = () => data.runs[shown.run];
+const isRefused = (step) => Boolean(step.explanation && step.explanation.reason);
+const placesOf = (step) => [step.place, ...step.expectations.map((expected) => expected.place)];
+const failuresOf = (runShown, step) =>
+  runShown.failures.filter((failure) => placesOf(step).some((place) => failure.startsWith(`${place}:`)));
+const titleOf = (step) => step.command || "(before the first command)";
+
+/* In short: what somebody wants to know who does not read on. */
+
+/** Who ended a wait: what the board told last before it did. */
+function endOfWait(runShown, span) {
+  const step = runShown.steps[span.to.step];
+  const told = step.entries.filter((entry) => entry.sequence <= span.to.sequence && entry.kind === "notice").pop();
+  if (told && told.function === "expiry")
+    return "the display timer ran out; the display part had not answered";
+  if (told && told.function === "display_part") return `the display part ${told.text}`;
+  return titleOf(step);
+}
+
+function linkTo(index) {
+  const link = make("a", { href: `#step-${index + 1}` }, `step ${index + 1}`);
+  link.addEventListener("click", (event) => {
+    event.preventDefault();
+    choose(index, true);
+  });
+  return link;
+}
+
+function waits(runShown) {
+  const lane = runShown.lanes.find((one) => one.name === "graphics");
+  return lane.spans.filter((span) => span.to.us > span.from.us || span.open);
+}
+
+function waitLine(runShown, span) {
+  const line = make("li", { class: "bad" });
+  line.append(`Graphics were ${span.text} for `, make("strong", {}, spoken(span.to.us - span.from.us)),
+              `: from ${spoken(span.from.us)}, in `, linkTo(span.from.step), `, until ${spoken(span.to.us)}, in `,
+              linkTo(span.to.step));
+  line.append(span.open ? ", where the run ends and they still wait." : `: ${endOfWait(runShown, span)}.`);
+  const why = runShown.steps[span.from.step].graphics;
+  return why ? [line, make("li", {}, `After step ${span.from.step + 1} they were ${why}.`)] : [line];
+}
+
+function story(runShown) {
+  const lines = waits(runShown).flatMap((span) => waitLine(runShown, span));
+  runShown.steps.forEach((step, index) => {
+    if (isRefused(step))
+      lines.push(make("li", { class: "bad" }, linkTo(index), ` was refused: ${step.explanation.reason.text}.`));
+    for (const failure of failuresOf(runShown, step))
+      lines.push(make("li", { class: "bad" }, linkTo(index), ` failed: ${failure}`));
+  });
+  if (lines.length === 0) lines.push(make("li", {}, "Nothing was refused, and graphics never waited."));
+  const expectations = runShown.steps.reduce((sum, step) => sum + step.expectations.length, 0);
+  if (runShown.steps_left_out > 0)
+    lines.push(make("li", {}, `${counted(runShown.steps_left_out, "more step")} ran that this page leaves out.`));
+  const verdict = runShown.failures.length > 0 ? "The scenario failed" : "The scenario did what it says";
+  lines.push(make("li", {}, `${verdict}: ${counted(runShown.steps.length, "step")}, ` +
+                            `${counted(expectations, "expectation")}, ${spoken(runShown.to_us)} on board ` +
+                            `${runShown.board}.`));
+  return lines;
+}
+
+/* The time line. */
+
+/** Where moments stand, from 0 to 1. To scale, time alone decides; else half of the width is shared by all steps, so
+ *  that those that take no time are seen, too. */
+class Axis {
+  constructor(runShown, toScale) {
+    this.steps = runShown.steps;
+    this.total = Math.max(1, runShown.to_us);
+    const each = toScale && runShown.to_us > 0 ? 0 : 0.5 / this.steps.length;
+    const time = runShown.to_us === 0 ? 0 : each === 0 ? 1 : 0.5;
+    const room = 0.97; // what holds at the end is seen behind it
+    this.starts = [0];
+    this.widths = this.steps.map((step) => each + time * (step.to_us - step.from_us) / this.total);
+    const sum = this.widths.reduce((one, other) => one + other, 0) || 1;
+    this.widths = this.widths.map((width) => width / sum * room);
+    for (const width of this.widths) this.starts.push(this.starts.at(-1) + width);
+  }
+
+  /** Within its step a moment stands by its time, or where none passes by its place in the trace. */
+  at(moment) {
+    const step = this.steps[moment.step];
+    const passed = step.to_us - step.from_us;
+    const before = step.entries.filter((entry) => entry.sequence <= moment.sequence).length;
+    const share = passed > 0 ? (moment.us - step.from_us) / passed : before / Math.max(1, step.entries.length);
+    return this.starts[moment.step] + this.widths[moment.step] * Math.min(1, Math.max(0, share));
+  }
+}
+
+function kindOf(lane) {
+  if (lane.name === "graphics") return "held";
+  if (lane.name.startsWith("flag ")) return "flag";
+  if (lane.name === "display timer") return "timer";
+  return lane.name.startsWith("OSD plane") || lane.name === "mute" ? "plane" : "output";
+}
+
+function bar(from, to, kind, text, label, onclick) {
+  const width = to - from;
+  const element = make("button", { type: "button", class: `bar ${kind}${width < 0.02 ? " narrow" : ""}`, title: label,
+                                   "aria-label": label, onclick }, width < 0.02 ? "" : text);
+  element.style.left = `${from * 100}%`;
+  element.style.width = `${width * 100}%`;
+  return element;
+}
+
+function laneRow(name, bars) {
+  return make("div", { class: "lane", role: "group", "aria-label": name },
+              make("span", { class: "lane-name" }, name), make("div", { class: "track" }, ...bars));
+}
+
+function laneBar(axis, lane, span) {
+  const lasted = `${spoken(span.to.us - span.from.us)}, from ${spoken(span.from.us)} to ${spoken(span.to.us)}`;
+  const end = span.open ? "the end of the run" : `step ${span.to.step + 1}`;
+  const label = `${lane.name}: ${span.text} for ${lasted}, step ${span.from.step + 1} to ${end}`;
+  return bar(axis.at(span.from), span.open ? 1 : axis.at(span.to), kindOf(lane), span.text, label, () => {
+    choose(span.from.step, true);
+    part("told").textContent = label;
+  });
+}
+
+function timesRow(axis, runShown) {
+  const times = make("div", { class: "times", "aria-hidden": "true" });
+  let free = 0;
+  let last = -1;
+  runShown.steps.forEach((step, index) => {
+    const at = axis.starts[index];
+    if (at < free || step.from_us === last) return;
+    const time = make("span", {}, spoken(step.from_us));
+    time.style.left = `${at * 100}%`;
+    if (at > 0.8) time.style.transform = "translateX(-100%)";
+    times.append(time);
+    free = at + 0.15;
+    last = step.from_us;
+  });
+  return make("div", { class: "lane" }, make("span", { class: "lane-name" }), times);
+}
+
+function showLanes() {
+  const axis = new Axis(run(), shown.toScale);
+  const steps = run().steps.map((step, index) => {
+    const label = `Step ${index + 1}: ${titleOf(step)}, at ${spoken(step.from_us)}` +
+                  (isRefused(step) ? ", refused" : "");
+    const button = bar(axis.starts[index], axis.starts[index + 1], isRefused(step) ? "step refusing" : "step",
+                       String(index + 1), label, () => choose(index, true));
+    button.dataset.step = index;
+    return button;
+  });
+  const lanes = run().lanes.filter((lane) => lane.spans.length > 0)
+    .map((lane) => laneRow(lane.name, lane.spans.map((span) => laneBar(axis, lane, span))));
+  part("lanes").replaceChildren(timesRow(axis, run()), laneRow("steps", steps), ...lanes);
+  part("lanes").axis = axis;
+}
+
+/* A step. */
+
+function entryLine(entry) {
+  const time = make("span", { class: "time" }, `${(entry.time_us / 1000).toFixed(3)}  `);
+  const names = entry.kind + (entry.faulted ? " faulted" : "");
+  const item = make("li", { class: names }, time, entry.brief + (entry.faulted ? "  (scripted)" : ""));
+  item.style.marginLeft = `${entry.depth * 1.5}em`;
+  item.dataset.text = entry.brief.toLowerCase();
+  return item;
+}
+
+function folded(title, className, ...content) {
+  return make("details", { class: className }, make("summary", {}, title), ...content);
+}
+
+function listOf(entries, what, className) {
+  if (entries.length === 0) return null;
+  return folded(what, className, make("ul", { class: "entries" }, ...entries.map((entry) => entryLine(entry))));
+}
+
+function changesOf(step) {
+  if (step.changes.length === 0) return null;
+  const row = (change) => make("tr", {}, make("th", { scope: "row" }, change.path),
+                               make("td", {}, change.older ?? "–"), make("td", {}, change.newer ?? "–"));
+  const head = make("tr", {}, ...["What", "before", "after"].map((text) => make("th", { scope: "col" }, text)));
+  return folded(`${counted(step.changes.length, "change")} of the state`, "state",
+                make("table", { class: "changes" }, make("thead", {}, head),
+                     make("tbody", {}, ...step.changes.map(row))));
+}
+
+function reasonsOf(step) {
+  const reasons = step.explanation ? step.explanation.reasons : [];
+  if (reasons.length === 0) return null;
+  return folded(`Why: ${counted(reasons.length, "decision")}`, "why", make("ul", { class: "entries" },
+    ...reasons.map((reason) => make("li", {}, `${reason.text}  (${reason.function}, ${reason.place})`))));
+}
+
+function expectationsOf(step) {
+  if (step.expectations.length === 0) return null;
+  return folded(counted(step.expectations.length, "expectation"), "expected",
+                make("ul", { class: "entries" }, ...step.expectations.map(({ line }) => make("li", {}, line))));
+}
+
+function refusalOf(step) {
+  if (!isRefused(step)) return null;
+  const { reason, advice, accepted } = step.explanation;
+  const refused = make("p", { class: "refused" }, `Refused: ${reason.text}.`);
+  if (advice) refused.append(` What to do: ${advice}.`);
+  if (accepted.length > 0) refused.append(" Accepted instead: ", make("code", {}, accepted.join("; ")));
+  return refused;
+}
+
+function pictureOf(runIndex, index, output) {
+  const steps = data.runs[runIndex].steps;
+  const seen = steps[index].outputs[output];
+  const before = index > 0 ? steps[index - 1].outputs[output] : undefined;
+  const isNew = before !== undefined && before.picture !== seen.picture;
+  const label = `${seen.output}: ${seen.description}${isNew ? ", changed" : ""}`;
+  const image = make("img", { src: data.pictures[seen.picture], alt: label, loading: "lazy" });
+  return make("button", { type: "button", class: `picture${isNew ? " changed" : ""}`,
+                          onclick: () => enlarge(runIndex, index, output) },
+              image, make("span", { "aria-hidden": "true" }, label));
+}
+
+function picturesOf(runIndex, index) {
+  const outputs = data.runs[runIndex].steps[index].outputs.filter((seen) => seen.picture !== null);
+  if (outputs.length === 0) return null;
+  return make("div", { class: "pictures", role: "group", "aria-label": `What is seen after step ${index + 1}` },
+              ...outputs.map((_, output) => pictureOf(runIndex, index, output)));
+}
+
+function whenOf(step) {
+  const lasted = step.to_us - step.from_us;
+  return `at ${spoken(step.from_us)}` + (lasted > 0 ? `, takes ${spoken(lasted)}` : "") + ` · ${step.place}`;
+}
+
+/** What a step shows of the trace, in lists that fold. */
+function detailsOf(step) {
+  const stores = step.entries.filter((entry) => entry.kind === "store");
+  const others = step.entries.filter((entry) => entry.kind !== "store");
+  const calls = others.filter((entry) => entry.kind === "call").length;
+  const told = others.length - calls;
+  const title = counted(calls, "call") + (told > 0 ? `, ${counted(told, "line")} of log and board` : "") +
+                (step.entries_left_out > 0 ? `; ${step.entries_left_out} more that this page leaves out` : "");
+  return [reasonsOf(step), listOf(others, title, "calls"), listOf(stores, counted(stores.length, "store"), "stores"),
+          changesOf(step), expectationsOf(step),
+          step.status ? folded("What this means", "status",
+                               make("div", { class: "scroll", tabindex: "0", role: "region",
+                                             "aria-label": "What this means" }, make("pre", {}, step.status))) : null];
+}
+
+function card(runIndex, index, id) {
+  const runShown = data.runs[runIndex];
+  const step = runShown.steps[index];
+  const isHeld = step.graphics && step.graphics.startsWith("held back");
+  const failures = failuresOf(runShown, step).map((failure) => make("p", { class: "failed" }, `Failed: ${failure}`));
+  const title = make("h3", {}, make("span", { class: "number" }, `${index + 1}  `), make("code", {}, titleOf(step)));
+  return make("article", { class: `card${isRefused(step) || failures.length > 0 ? " refusing" : ""}`, id,
+                           tabindex: "-1", "aria-label": `Step ${index + 1}: ${titleOf(step)}` },
+              title, make("p", { class: "when" }, whenOf(step)),
+              ...step.results.map((line) => make("p", { class: "result" }, make("code", {}, line))),
+              refusalOf(step), ...failures,
+              isHeld ? make("p", { class: "held-back" }, `Graphics are ${step.graphics}.`) : null,
+              picturesOf(runIndex, index), ...detailsOf(step));
+}
+
+/* Two runs side by side. */
+
+/** What two lists have in common, in order: pairs of places, with -1 where there is none on the other side. */
+function aligned(older, newer) {
+  const lengths = Array.from({ length: older.length + 1 }, () => new Uint32Array(newer.length + 1));
+  for (let i = older.length - 1; i >= 0; --i)
+    for (let j = newer.length - 1; j >= 0; --j)
+      lengths[i][j] = older[i] === newer[j] ? lengths[i + 1][j + 1] + 1
+        : Math.max(lengths[i + 1][j], lengths[i][j + 1]);
+  const pairs = [];
+  let i = 0;
+  let j = 0;
+  while (i < older.length || j < newer.length) {
+    if (i < older.length && j < newer.length && older[i] === newer[j]) pairs.push([i++, j++]);
+    else if (j === newer.length || (i < older.length && lengths[i + 1][j] >= lengths[i][j + 1])) pairs.push([i++, -1]);
+    else pairs.push([-1, j++]);
+  }
+  return pairs;
+}
+
+function differingLines(older, newer) {
+  const items = [];
+  for (const [i, j] of aligned(older, newer)) {
+    if (j < 0) items.push(make("li", { class: "gone" }, older[i]));
+    else if (i < 0) items.push(make("li", { class: "new" }, newer[j]));
+  }
+  return items;
+}
+
+/** What differs between two steps: a line for each that is on one side alone. */
+function differences(one, other) {
+  const briefs = (step) => step.entries.map((entry) => entry.brief);
+  const states = (step) => step.changes.map((change) => `${change.path}: ${change.older} → ${change.newer}`);
+  const seen = (step) => step.outputs.map((output) => `picture on ${output.output}: ${output.description}, ` +
+                                                      `picture ${output.picture}`);
+  return [[one.results, other.results], [[one.graphics ?? ""], [other.graphics ?? ""]], [seen(one), seen(other)],
+          [briefs(one), briefs(other)], [states(one), states(other)]]
+    .flatMap(([older, newer]) => differingLines(older, newer));
+}
+
+function pair(index, otherIndex) {
+  const missing = () => make("p", { class: "nothing" }, "no such step in this run");
+  const row = make("div", { class: "pair" },
+                   index < 0 ? missing() : card(shown.run, index, `step-${index + 1}`),
+                   otherIndex < 0 ? missing() : card(shown.other, otherIndex, `other-step-${otherIndex + 1}`));
+  if (index < 0 || otherIndex < 0) return [row];
+  const found = differences(run().steps[index], data.runs[shown.other].steps[otherIndex]);
+  const text = found.length === 0 ? make("p", { class: "apart" }, "Both do the same, and look the same.")
+    : make("div", { class: "apart" },
+           folded(`${counted(found.length, "difference")}: − on the left, + on the right`, "differences",
+                  make("ul", { class: "entries" }, ...found)));
+  return [row, text];
+}
+
+function showCards() {
+  const steps = run().steps;
+  if (shown.other < 0) {
+    part("cards").replaceChildren(...steps.map((_, index) => card(shown.run, index, `step-${index + 1}`)));
+    return;
+  }
+  const commands = (runShown) => runShown.steps.map((step) => step.command);
+  part("cards").replaceChildren(
+    ...aligned(commands(run()), commands(data.runs[shown.other])).flatMap(([one, other]) => pair(one, other)));
+}
+
+/* Choosing, filtering, enlarging. */
+
+function choose(index, moves) {
+  shown.step = Math.min(run().steps.length - 1, Math.max(0, index));
+  const id = `step-${shown.step + 1}`;
+  for (const element of document.querySelectorAll(".card")) {
+    element.classList.toggle("chosen", element.id === id);
+    if (element.id === id) element.setAttribute("aria-current", "step");
+    else element.removeAttribute("aria-current");
+  }
+  for (const button of document.querySelectorAll(".bar.step"))
+    button.classList.toggle("chosen", Number(button.dataset.step) === shown.step);
+  const axis = part("lanes").axis;
+  part("lanes").style.setProperty("--at", axis.starts[shown.step]);
+  part("lanes").style.setProperty("--wide", axis.widths[shown.step]);
+  const step = run().steps[shown.step];
+  part("told").textContent =
+    `Step ${shown.step + 1} of ${run().steps.length}, at ${spoken(step.from_us)}: ${titleOf(step)}`;
+  if (!moves) return;
+  history.replaceState(null, "", `#${id}`);
+  part(id).focus({ preventScroll: true });
+  part(id).scrollIntoView({ block: "nearest" });
+}
+
+function filter() {
+  const wanted = shown.filter.toLowerCase();
+  let lines = 0;
+  let steps = 0;
+  for (const element of document.querySelectorAll(".card")) {
+    let here = 0;
+    for (const list of element.querySelectorAll(".calls, .stores")) {
+      let inList = 0;
+      for (const line of list.querySelectorAll("li")) {
+        line.hidden = wanted !== "" && !line.dataset.text.includes(wanted);
+        inList += line.hidden ? 0 : 1;
+      }
+      list.open = wanted !== "" && inList > 0;
+      here += inList;
+    }
+    element.classList.toggle("without", wanted !== "" && here === 0);
+    lines += here;
+    steps += here > 0 ? 1 : 0;
+  }
+  part("found").textContent = wanted === "" ? "" : `${counted(lines, "line")} in ${counted(steps, "step")}`;
+}
+
+function showLarge(runIndex) {
+  const step = data.runs[runIndex].steps[shown.step];
+  const seen = step.outputs[shown.output];
+  part("large-title").textContent = `${seen.output}, after step ${shown.step + 1}: ${titleOf(step)}`;
+  part("large-picture").src = data.pictures[seen.picture];
+  part("large-picture").alt = `${seen.output}: ${seen.description}`;
+  part("large-text").textContent = `${seen.description}. Graphics: ${step.graphics}.`;
+}
+
+function enlarge(runIndex, index, output) {
+  if (runIndex === shown.run) choose(index, false);
+  shown.step = index;
+  shown.output = output;
+  part("large").runIndex = runIndex;
+  showLarge(runIndex);
+  part("large").showModal();
+}
+
+function keyInLarge(event) {
+  const runIndex = part("large").runIndex;
+  const steps = data.runs[runIndex].steps;
+  const by = { ArrowLeft: [-1, 0], ArrowRight: [1, 0], ArrowUp: [0, -1], ArrowDown: [0, 1] }[event.key];
+  if (by === undefined) return;
+  event.preventDefault();
+  event.stopPropagation();
+  const outputs = steps[shown.step].outputs.length;
+  shown.output = (shown.output + by[1] + outputs) % outputs;
+  const next = shown.step + by[0];
+  if (next >= 0 && next < steps.length && steps[next].outputs.length > 0) shown.step = next;
+  if (runIndex === shown.run) choose(shown.step, false);
+  showLarge(runIndex);
+}
+
+function key(event) {
+  if (event.ctrlKey || event.altKey || event.metaKey || part("large").open) return;
+  if (event.target.closest("input, select, textarea, .scroll")) return;
+  const steps = { ArrowLeft: shown.step - 1, ArrowRight: shown.step + 1, Home: 0, End: run().steps.length - 1 };
+  if (event.key in steps) choose(steps[event.key], true);
+  else if (event.key === "/") part("filter").focus();
+  else return;
+  event.preventDefault();
+}
+
+function show() {
+  document.title = `${run().name} – storyboard`;
+  part("title").textContent = shown.other < 0 ? run().name : `${run().name} beside ${data.runs[shown.other].name}`;
+  part("story").replaceChildren(...story(run()));
+  showLanes();
+  showCards();
+  choose(shown.step, false);
+  filter();
+}
+
+function offerRuns() {
+  const options = () => data.runs.map((one, index) => make("option", { value: index }, `${index + 1}  ${one.name}`));
+  part("run").replaceChildren(...options());
+  part("other").replaceChildren(make("option", { value: -1 }, "none"), ...options());
+  for (const label of document.querySelectorAll(".runs")) label.hidden = data.runs.length < 2;
+}
+
+function begin() {
+  offerRuns();
+  part("run").addEventListener("change", (event) => {
+    shown.run = Number(event.target.value);
+    shown.step = 0;
+    show();
+  });
+  part("other").addEventListener("change", (event) => {
+    shown.other = Number(event.target.value);
+    show();
+  });
+  part("filter").addEventListener("input", (event) => {
+    shown.filter = event.target.value.trim();
+    filter();
+  });
+  part("scale").addEventListener("change", (event) => {
+    shown.toScale = event.target.checked;
+    showLanes();
+    choose(shown.step, false);
+  });
+  part("controls").addEventListener("submit", (event) => event.preventDefault());
+  part("large").addEventListener("keydown", keyInLarge);
+  document.addEventListener("keydown", key);
+  const asked = /^#step-(\d+)$/.exec(location.hash);
+  if (asked) shown.step = Number(asked[1]) - 1;
+  show();
+}
+
+begin();

@@ -268,7 +268,7 @@ function detailsOf(step) {
   return [reasonsOf(step), listOf(others, title, "calls"), listOf(stores, counted(stores.length, "store"), "stores"),
           changesOf(step), expectationsOf(step),
           step.status ? folded("What this means", "status",
-                               make("div", { class: "scroll", tabindex: "0", role: "region",
+                               make("div", { class: "scroll", tabindex: "0", role: "group",
                                              "aria-label": "What this means" }, make("pre", {}, step.status))) : null];
 }
 

@@ -1,0 +1,287 @@
+#!/usr/bin/env python3
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+"""Opens the pages that `pmxboard report` writes in a real browser, and uses them as people do: with eyes, mouse and
+keyboard.
+
+usage: page_test.py TOOL [UNITTEST ARGUMENT...]
+"""
+
+import base64
+import contextlib
+import json
+import pathlib
+import sys
+import unittest
+
+sys.dont_write_bytecode = True
+
+import browser as browsers  # noqa: E402
+import pages  # noqa: E402
+from selenium.webdriver.common.by import By  # noqa: E402
+from selenium.webdriver.common.keys import Keys  # noqa: E402
+from selenium.webdriver.support.ui import Select  # noqa: E402
+
+TOOL = pathlib.Path(sys.argv[1]).resolve()
+LARGEST = 2_000_000
+ALL = "return [...document.querySelectorAll(arguments[0])]"
+HELD_STEP = 4  # of NEVER: PMX_SetModeEx
+
+
+def setUpModule():
+    global browser, written, ways
+    ways = contextlib.ExitStack()
+    written = pages.Pages(TOOL, ways.enter_context(pages.folder()))
+    browser = ways.enter_context(browsers.started())
+
+
+def tearDownModule():
+    ways.close()
+
+
+class PageTest(unittest.TestCase):
+    def setUp(self):
+        browser.look()
+
+    def tearDown(self):
+        self.assertEqual([], browser.complaints())
+
+    def open(self, name, *scenarios, code=0):
+        page = written.write(name, *scenarios, code=code)
+        browser.open(page)
+        return page
+
+    def all(self, selector):
+        return browser.driver.find_elements(By.CSS_SELECTOR, selector)
+
+    def one(self, selector):
+        found = self.all(selector)
+        self.assertEqual(1, len(found), selector)
+        return found[0]
+
+    def texts(self, selector):
+        """Texts, folded ones too."""
+        return browser.run(f"{ALL}.map((one) => one.textContent)", selector)
+
+    def visible(self, selector):
+        """Texts of those that are seen: neither folded nor filtered out."""
+        return browser.run(f"{ALL}.filter((one) => one.checkVisibility()).map((one) => one.textContent)", selector)
+
+    def choose(self, selector, value):
+        Select(self.one(selector)).select_by_value(str(value))
+
+    def press(self, *keys):
+        browser.driver.switch_to.active_element.send_keys(*keys)
+
+    def current(self):
+        """The number of the step that is chosen."""
+        return int(self.one("[aria-current=step]").get_attribute("id").removeprefix("step-"))
+
+    def active(self):
+        return browser.run("return document.activeElement.id")
+
+
+class Shown(PageTest):
+    def test_it_opens_from_a_file_and_asks_for_nothing(self):
+        page = self.open("alone", pages.NEVER)
+        self.assertIn("display-part-never-answers.pmx", browser.driver.title)
+        self.assertEqual([page.as_uri()], browser.requests())
+
+    def test_every_step_is_shown_with_its_command(self):
+        self.open("steps", pages.NEVER)
+        self.assertEqual(pages.commands(pages.NEVER), self.texts(".card h3 code"))
+        self.assertEqual(len(pages.commands(pages.NEVER)), len(self.all(".bar.step")))
+
+    def test_all_that_a_trace_has_is_there(self):
+        self.open("trace", pages.NEVER)
+        trace = written.run("run", "--stores", "--trace-format", "jsonl", pages.NEVER).stdout.splitlines()
+        self.assertEqual(len(trace), len(self.all(".calls li, .stores li")))
+        calls = [json.loads(line)["function"] for line in trace if json.loads(line)["kind"] == "call"]
+        shown = self.texts(".calls li.call")
+        self.assertEqual(len(calls), len(shown))
+        for call, line in zip(calls, shown):
+            self.assertIn(f"  {call}(", line)
+
+    def test_who_reads_no_code_learns_why_there_were_no_graphics(self):
+        self.open("why", pages.NEVER)
+        told = " ".join(self.texts("#story li"))
+        self.assertIn("Graphics were held back for 10 s: from 4 ms", told)
+        self.assertIn("the display timer ran out; the display part had not answered", told)
+        self.assertIn("planes 3 to 7 wait until the display part answers", told)
+        self.open("answered", pages.FIRST_LOOK)
+        told = " ".join(self.texts("#story li"))
+        self.assertIn("Graphics were held back for 3 s", told)
+        self.assertIn("the display part has switched", told)
+
+    def test_held_graphics_are_a_bar_that_leads_to_their_step(self):
+        self.open("bar", pages.NEVER)
+        bar = self.all(".bar.held")[0]
+        self.assertIn("held back for 10 s", bar.get_attribute("aria-label"))
+        track = self.all(".track")[0].size["width"]
+        self.assertGreater(bar.size["width"], track / 2)
+        self.one("#scale").click()
+        self.assertGreater(self.all(".bar.held")[0].size["width"], track * 0.9)
+        self.all(".bar.held")[0].click()
+        self.assertEqual(HELD_STEP, self.current())
+        self.assertIn("Graphics are held back", self.one(f"#step-{HELD_STEP}").text)
+        self.assertIn("held back for 10 s", self.one("#told").text)
+
+    def test_what_was_refused_says_why_and_what_would_do(self):
+        self.open("refused", pages.REFUSED)
+        self.assertIn("source 1 feeds two planes", " ".join(self.texts("#story li.bad")))
+        refused = " ".join(self.texts(".refused"))
+        self.assertIn("Refused: source 1 feeds two planes, 0 and 1.", refused)
+        self.assertIn("PMX_SetArbPlaneOrder 0 0x76543201", refused)
+
+    def test_a_failure_is_told_where_it_happened(self):
+        wrong = written.scenario("wrong.pmx", "PMX_Init\nPMX_GetMode 0\nexpect result 0\nPMX_Stop\n")
+        self.open("failed", wrong, code=1)
+        self.assertEqual(2, len(self.all(".card")))
+        self.assertEqual(1, len(self.all("#step-2 .failed")))
+        self.assertIn("The scenario failed", " ".join(self.texts("#story li")))
+
+    def test_what_a_scenario_holds_stays_text(self):
+        text = "</script><b class=evil>&amp;<!--"
+        hostile = written.scenario("hostile.pmx", f'poke PMX_debug_level 2\nPMX_Printf 1 "{text}\\n"\n')
+        self.open("hostile", hostile)
+        self.assertEqual([], self.all(".evil"))
+        self.assertIn(text, self.texts(".card h3 code")[1])
+
+    def test_the_page_of_the_longest_scenario_is_small(self):
+        page = self.open("longest", pages.LONGEST)
+        self.assertLess(page.stat().st_size, LARGEST)
+        self.assertEqual(pages.commands(pages.LONGEST), self.texts(".card h3 code"))
+
+    def test_it_fits_on_screens_of_any_kind(self):
+        self.open("fits", pages.FIRST_LOOK)
+        grounds = set()
+        for width in (browsers.WIDE, browsers.NARROW):
+            for scheme in (browsers.LIGHT, browsers.DARK):
+                browser.look(width, scheme)
+                self.assertLessEqual(browser.run("return document.documentElement.scrollWidth"), width)
+                grounds.add(browser.run("return getComputedStyle(document.body).backgroundColor"))
+        self.assertEqual(2, len(grounds), "light and dark")
+
+
+class Pictures(PageTest):
+    LAST = 8  # step of FIRST_LOOK, behind which graphics are back
+
+    def test_all_of_them_are_whole(self):
+        self.open("pictures", pages.FIRST_LOOK)
+        self.assertEqual(4 * len(pages.commands(pages.FIRST_LOOK)), len(self.all(".picture img")))
+        broken = browser.run("""return Promise.all([...document.querySelectorAll(".picture img")].map((image) => {
+            image.loading = "eager"; return image.decode().then(() => image.naturalWidth, () => 0); }))
+            .then((widths) => widths.filter((width) => width === 0).length)""")
+        self.assertEqual(0, broken)
+
+    def test_they_are_what_a_shot_is(self):
+        taken = written.folder / "hdmi.png"
+        lines = f"{pages.FIRST_LOOK.read_text(encoding='utf-8')}shot hdmi {taken} 640x360\n"
+        self.assertEqual(0, written.run("run", "-q", written.scenario("shot.pmx", lines)).returncode)
+        self.open("shot", pages.FIRST_LOOK)
+        shown = self.one(f"#step-{self.LAST} .picture:nth-child(2) img").get_attribute("src")
+        self.assertEqual(taken.read_bytes(), base64.b64decode(shown.partition("base64,")[2], validate=True))
+
+    def test_enter_enlarges_and_arrows_step(self):
+        self.open("large", pages.FIRST_LOOK)
+        thumbnail = self.one(f"#step-{self.LAST} .picture:nth-child(2)")
+        browser.run("arguments[0].focus()", thumbnail)
+        self.press(Keys.ENTER)
+        large = self.one("#large[open]")
+        self.assertIn(f"HDMI, after step {self.LAST}", self.one("#large-title").text)
+        self.assertGreater(self.one("#large-picture").size["width"], 3 * thumbnail.size["width"])
+        last = self.one("#large-picture").get_attribute("src")
+        self.press(Keys.ARROW_LEFT, Keys.ARROW_LEFT)
+        self.assertIn(f"HDMI, after step {self.LAST - 2}", self.one("#large-title").text)
+        self.assertEqual(self.LAST - 2, self.current())
+        self.assertNotEqual(last, self.one("#large-picture").get_attribute("src"), "graphics were away")
+        self.press(Keys.ARROW_DOWN)
+        self.assertIn("component, after", self.one("#large-title").text)
+        self.press(Keys.ARROW_UP, Keys.ARROW_RIGHT)
+        self.assertIn(f"HDMI, after step {self.LAST - 1}", self.one("#large-title").text)
+        self.press(Keys.ESCAPE)
+        self.assertFalse(large.is_displayed())
+        self.assertTrue(browser.run("return document.activeElement === arguments[0]", thumbnail))
+
+
+class Used(PageTest):
+    def test_the_keyboard_steps(self):
+        self.open("keys", pages.NEVER)
+        count = len(pages.commands(pages.NEVER))
+        self.assertEqual(1, self.current())
+        self.press(Keys.END)
+        self.assertEqual(count, self.current())
+        self.press(Keys.ARROW_LEFT)
+        self.assertEqual((count - 1, f"step-{count - 1}"), (self.current(), self.active()))
+        self.press(Keys.ARROW_RIGHT, Keys.ARROW_RIGHT)
+        self.assertEqual(count, self.current(), "there is none behind the last")
+        self.press(Keys.HOME)
+        self.assertEqual(1, self.current())
+        self.press("/")
+        self.assertEqual("filter", self.active())
+        self.press("a", Keys.ARROW_LEFT)
+        self.assertEqual(1, self.current(), "arrows in a field move in it")
+
+    def test_an_address_names_a_step(self):
+        page = self.open("named", pages.NEVER)
+        browser.driver.get("about:blank")
+        browser.driver.get(f"{page.as_uri()}#step-3")
+        self.assertEqual(3, self.current())
+
+    def test_the_filter_leaves_what_contains_it(self):
+        self.open("filter", pages.NEVER)
+        self.assertEqual([], self.visible(".entries li"), "folded at first")
+        self.one("#filter").send_keys("tve_")
+        shown = self.visible(".entries li")
+        trace = written.run("run", "--trace-format", "jsonl", pages.NEVER).stdout.splitlines()
+        self.assertEqual(sum("TVE_" in line for line in trace), len(shown))
+        self.assertTrue(shown and all("TVE_" in line for line in shown), shown)
+        self.assertIn(f"{len(shown)} lines", self.one("#found").text)
+        self.assertIn("without", self.one("#step-1").get_attribute("class"))
+        self.one("#filter").send_keys(Keys.BACKSPACE * 4)
+        self.assertEqual([], self.all(".card.without"))
+        self.assertEqual("", self.one("#found").text)
+
+    def test_lists_unfold(self):
+        self.open("unfold", pages.NEVER)
+        self.one(f"#step-{HELD_STEP} .calls summary").click()
+        self.assertEqual(len(self.all(f"#step-{HELD_STEP} .calls li")), len(self.visible(".entries li")))
+        self.one(f"#step-{HELD_STEP} .state summary").click()
+        self.assertIn("record.ucMode", " ".join(self.visible(".state th")))
+
+    def test_two_runs_stand_side_by_side(self):
+        self.open("two", pages.ANSWERS, pages.NEVER)
+        self.assertIn("display-part-answers", self.one("#title").text)
+        self.choose("#run", 1)
+        self.assertIn("display-part-never-answers", self.one("#title").text)
+        self.choose("#other", 0)
+        self.assertEqual(pages.commands(pages.NEVER), self.texts("[id^=step-] h3 code"))
+        self.assertEqual(pages.commands(pages.ANSWERS), self.texts("[id^=other-step-] h3 code"))
+        self.assertIn("no such step in this run", self.texts(".nothing"))
+        self.assertIn("Both do the same, and look the same.", self.texts(".apart"))
+        self.choose("#other", 1)
+        self.assertEqual({"Both do the same, and look the same."}, set(self.texts(".apart")), "beside itself")
+
+    def test_what_differs_between_two_runs_is_named(self):
+        one = written.scenario("one.pmx", "PMX_Init\nPMX_GetTvType 0\n")
+        other = written.scenario("other.pmx", "PMX_Init\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\nPMX_GetTvType 0\n")
+        self.open("differ", one, other)
+        self.choose("#other", 1)
+        self.assertIn("*pucTvType = PMX_TV_TYPE_NTSC", self.texts(".apart .gone"))
+        self.assertIn("*pucTvType = PMX_TV_TYPE_PAL", self.texts(".apart .new"))
+
+
+class TheWatch(unittest.TestCase):
+    """What finds nothing in these pages would find something."""
+
+    def test_it_sees_complaints_and_requests(self):
+        page = written.folder / "bad.html"
+        page.write_text('<!DOCTYPE html><img src="missing.png" alt=""><script>console.error("no")</script>',
+                        encoding="utf-8")
+        browser.look()
+        browser.open(page)
+        self.assertEqual([page.as_uri(), (written.folder / "missing.png").as_uri()], browser.requests())
+        self.assertTrue(any('"no"' in complaint for complaint in browser.complaints()))
+
+
+if __name__ == "__main__":
+    unittest.main(argv=sys.argv[:1] + sys.argv[2:])

@@ -1,0 +1,44 @@
+# SPDX-License-Identifier: MIT OR GPL-2.0-only
+"""The pages that the tests look at, written by the tool."""
+
+import pathlib
+import subprocess
+import tempfile
+
+ROOT = pathlib.Path(__file__).resolve().parents[2]
+SCENARIOS = ROOT / "scenarios"
+NEVER, ANSWERS = SCENARIOS / "display-part-never-answers.pmx", SCENARIOS / "display-part-answers.pmx"
+REFUSED = SCENARIOS / "refused-orders.pmx"
+FIRST_LOOK = SCENARIOS / "first-look.pmx"
+LONGEST = max(SCENARIOS.glob("*.pmx"), key=lambda path: len(path.read_text(encoding="utf-8").splitlines()))
+
+
+class Pages:
+    def __init__(self, tool, folder):
+        self.tool, self.folder = tool, pathlib.Path(folder)
+
+    def run(self, *arguments):
+        return subprocess.run([self.tool, *map(str, arguments)], cwd=ROOT, capture_output=True, text=True,
+                              check=False)
+
+    def write(self, name, *scenarios, code=0):
+        page = self.folder / f"{name}.html"
+        found = self.run("report", *scenarios, "-o", page)
+        if found.returncode != code:
+            raise AssertionError(f"report of {scenarios} ended with {found.returncode}: {found.stderr}")
+        return page
+
+    def scenario(self, name, lines):
+        path = self.folder / name
+        path.write_text(lines, encoding="utf-8")
+        return path
+
+
+def folder():
+    return tempfile.TemporaryDirectory(prefix="pmx-report-")
+
+
+def commands(scenario):
+    """The lines that a run carries out, as they are written."""
+    lines = (line.strip() for line in scenario.read_text(encoding="utf-8").splitlines())
+    return [line for line in lines if line and not line.startswith(("#", "expect "))]

@@ -12,6 +12,7 @@
 #include "tools/pmxboard/text/printable.h"
 #include "tools/pmxboard/view/chrome_trace.h"
 #include "tools/pmxboard/view/summary_trace.h"
+#include "tools/pmxboard/view/vcd_trace.h"
 
 namespace pmxboard
 {
@@ -127,6 +128,8 @@ std::span<const TraceForm> trace_forms()
           [](const TraceOptions&, std::ostream&) { return std::make_unique<JsonTrace>(); } },
         { "chrome", "for chrome://tracing and Perfetto's viewer",
           [](const TraceOptions&, std::ostream& to) { return std::make_unique<ChromeTrace>(to); } },
+        { "vcd", "waveforms, for GTKWave and its like",
+          [](const TraceOptions&, std::ostream& to) { return std::make_unique<VcdTrace>(to); } },
         { "summary", "what each command did, in short",
           [](const TraceOptions& options, std::ostream& to) { return std::make_unique<SummaryTrace>(options, to); } },
         { "off", "", [](const TraceOptions&, std::ostream&) { return std::make_unique<NoTrace>(); } },

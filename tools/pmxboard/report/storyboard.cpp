@@ -110,7 +110,7 @@ void Storyboard::begin_step(std::string_view line)
                    { "expectations", Json::array() },
                    { "entries", Json::array() },
                    { "entries_left_out", 0 } };
-    if (m_steps.size() == most_steps)
+    if (m_steps.size() == m_limits.steps)
     {
         ++m_steps_left_out;
         m_left_out = std::move(begun);
@@ -165,7 +165,7 @@ std::string Storyboard::entry(const board::TraceEntry& entry, bool)
 {
     m_sequence = entry.sequence;
     Json& now = step();
-    if (is_left_out() || m_entries == most_entries)
+    if (is_left_out() || m_entries == m_limits.entries)
         now["entries_left_out"] = now.at("entries_left_out").get<std::size_t>() + 1;
     else
     {

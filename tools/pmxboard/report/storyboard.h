@@ -4,6 +4,7 @@
  *  as a form of the trace does, and keeps everything until the page is written. */
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <optional>
 #include <string>
@@ -19,14 +20,19 @@
 namespace pmxboard
 {
 
+/** A page of more would open slowly, or not at all. What is beyond is counted, and the page says so. */
+struct PageLimits
+{
+    std::size_t steps = 500;     ///< of each run
+    std::size_t entries = 20000; ///< of each run's trace
+};
+
 class Storyboard : public TraceSink
 {
 public:
-    /** A page of more would open slowly, or not at all. What is beyond is counted, and the page says so. */
-    static constexpr std::size_t most_steps = 500;
-    static constexpr std::size_t most_entries = 20000;
-
-    explicit Storyboard(std::string board) : m_board(std::move(board)) {}
+    explicit Storyboard(std::string board, const PageLimits& limits = {}) : m_board(std::move(board)), m_limits(limits)
+    {
+    }
 
     void scenario(const std::string& name) override;
     void powered_on() override;
@@ -53,6 +59,7 @@ private:
     board::Json lanes() const;
 
     std::string m_board;
+    PageLimits m_limits;
     SeenPictures m_pictures;
     board::Json m_runs = board::Json::array();
 

@@ -312,7 +312,8 @@ class Outputs(Directory):
         yield from (("--help",), ("--version",), ("run", "--help"), ("ops",), ("ops", "--json"), ("modes",),
                     ("modes", "--json"), ("guide",), ("complete", "PMX_"), ("run", self.scenario),
                     ("run", "--trace-format", "jsonl", self.scenario),
-                    ("run", "--trace-format", "chrome", self.scenario), ("state", self.state),
+                    ("run", "--trace-format", "chrome", self.scenario),
+                    ("run", "--trace-format", "vcd", self.scenario), ("state", self.state),
                     ("state", "--json", self.state), ("status", self.state), ("status", "--json", self.state),
                     ("shell",), ("decode", self.log), ("decode", "--json", self.log), ("decode", "--texts"),
                     ("decode", self.log, "--against", self.scenario), ("decode", "--to-scenario", self.log),
@@ -350,13 +351,14 @@ class Outputs(Directory):
     def writers(self, name):
         """(arguments, standard input, exit code) of what writes a file."""
         save = f"PMX_Init\nsave {name}\n".encode()
-        for form in ("text", "jsonl", "chrome"):
+        for form in ("text", "jsonl", "chrome", "vcd"):
             yield ("run", "--trace-format", form, "--trace-file", name, self.scenario), b"", 2
         yield ("run", "-"), save, 1
         yield ("shell",), save, 1
         # What is more than the limit of the full disk.
         yield ("shell",), f"record {name}\n".encode() + b"PMX_GetMode 0\n" * 40, 1
         yield ("record", name, self.scenario), b"", 2
+        yield ("report", self.scenario, "-o", name), b"", 2
         yield ("run", "-q", "--junit", name, *[self.scenario] * 10), b"", 2
 
     def test_a_full_disk(self):

@@ -13,7 +13,8 @@ ROOT = pathlib.Path(__file__).resolve().parents[2]
 NOBODY = 65534
 KERNEL_PROGRAMS = ("run", "cost_kernel", "debug_kernel", "every_kernel")
 
-# Each notes its call. The cmake notes as well when two builds of one folder meet.
+# Each notes its call. The cmake notes as well when two builds of one folder meet, and when it has come to its long
+# work: a shell that is interrupted while another child is about to end well goes on behind it.
 PROGRAMS = {
     "cmake": r"""
 case "$1" in
@@ -22,7 +23,7 @@ case "$1" in
     printf '%s\n' "CMAKE_HOME_DIRECTORY:INTERNAL=$PWD" "CMAKE_CACHEFILE_DIR:INTERNAL=$PWD/build/$2" \
         >"build/$2/CMakeCache.txt"
     [ -z "${BREAK_CONFIGURE:-}" ] || { echo "no compiler"; exit 1; }
-    sleep "${SLOW_CONFIGURE:-0}"
+    takes "${SLOW_CONFIGURE:-}"
     echo "tree $PWD" >"build/$2/build.ninja"
     ;;
 --build)
@@ -31,7 +32,7 @@ case "$1" in
     echo "[1/1] building, cache ${CCACHE_DIR:-none}"
     [ -z "${CATCHES:-}" ] || trap 'rmdir "$folder/building"; exit 1' INT
     while [ -n "${GATE:-}" ] && [ ! -e "$GATE" ]; do sleep 0.02; done
-    sleep "${SLOW_BUILD:-0}"
+    takes "${SLOW_BUILD:-}"
     [ -z "${BREAK_BUILD:-}" ] || { rmdir "$folder/building"; exit 1; }
     printf '#!/bin/bash\nprintf "%%s\\n" "ran in "%q": $*"\n' "$PWD" >"$folder/pmxboard"
     chmod +x "$folder/pmxboard"
@@ -64,6 +65,7 @@ done
 
 START = """#!/bin/bash
 note() { printf '%s\\n' "$*" >>"$STUBS/calls"; }
+takes() { [ -z "$1" ] || { note "$(basename "$0") works"; sleep "$1"; }; }
 note "$(basename "$0") $*"
 """
 

@@ -52,7 +52,8 @@ class Real(TreeTest):
 
     def runs(self, text, tree=None):
         found = self.dev("run", script=(tree or self.tree) / "dev")
-        self.assertEqual((0, f"first\n{text}\n"), (found[0], found[1][:found[1].index("Every call")]), found)
+        shown = f"first\n{text}\n"   # by the run, and by the report
+        self.assertEqual((0, shown * 2), (found[0], found[1][:found[1].index("The same with pictures")]), found)
         return found[2]
 
     def test_nothing_to_do_says_nothing(self):
@@ -85,7 +86,7 @@ class Real(TreeTest):
         texts = [run.communicate(timeout=60)[0] for run in runs]
         self.assertEqual([0, 0, 0], [run.returncode for run in runs], texts)
         for text in texts:
-            self.assertIn("first\nnew\nEvery call", text, texts)
+            self.assertIn("first\nnew\n" * 2 + "The same with pictures", text, texts)
 
     def test_what_was_interrupted_is_made_again(self):
         run = self.start("run", SLOW_STEP="60")

@@ -1,6 +1,6 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
-"""Has axe-core look at the report's page in a browser, in light and dark, wide and narrow, with everything folded and
+"""Has axe-core look at the report's page in a browser, wide in light and narrow in dark, with everything folded and
 unfolded: whoever listens to a page, or uses no mouse, gets at all of it. npm fetches axe-core, and takes none but the
 one whose hash package-lock.json has.
 
@@ -63,12 +63,11 @@ def findings(browser, script, page, prepare):
 
 
 def looked_at(browser, script, page):
-    """(state, finding) of each; and how many states there were."""
-    for width in (browsers.WIDE, browsers.NARROW):
-        for scheme in (browsers.LIGHT, browsers.DARK):
-            for name, prepare in STATES.items():
-                browser.look(width, scheme)
-                yield f"{name}, {scheme}, {width} pixels", findings(browser, script, page, prepare)
+    """(state, its findings) of each state, in either scheme and at either width: colours do not hang on the width."""
+    for width, scheme in ((browsers.WIDE, browsers.LIGHT), (browsers.NARROW, browsers.DARK)):
+        for name, prepare in STATES.items():
+            browser.look(width, scheme)
+            yield f"{name}, {scheme}, {width} pixels", findings(browser, script, page, prepare)
 
 
 def main():

@@ -31,6 +31,14 @@ TEST_F(Told, AMisspeltSubCommand_WithTheNearest)
     EXPECT_EQ("PMX_PORT_DONE = 0x71000000, and goes with any number\n", run("shell", "help PMX_PORT_DONE\n").out);
 }
 
+TEST_F(Told, HelpAsAWord_WhatTheOptionTells)
+{
+    EXPECT_EQ(run("--help").out, run("help").out);
+    EXPECT_EQ(run("replay --help").out, run("help replay").out);
+    EXPECT_EQ(0, run("help replay").code);
+    EXPECT_EQ("pmxboard: no sub-command rn; did you mean run?\n", run("help rn").err);
+}
+
 TEST_F(Told, AField_WithWhatItHolds)
 {
     EXPECT_EQ("ucEnable, a field of the layer: 0 to 255\n  master enable, as given\n",

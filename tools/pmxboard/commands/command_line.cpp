@@ -5,6 +5,8 @@
 #include <iostream>
 #include <optional>
 #include <sstream>
+#include <string_view>
+#include <vector>
 
 // The one place of the tool that knows the argument parser: it compiles slowly.
 #include <CLI/CLI.hpp>
@@ -305,10 +307,23 @@ std::optional<int> misspelt(const CLI::App& app, int count, const char* const* a
     return usage_error("no sub-command " + word + (nearest.empty() ? "; there are " + told : nearest));
 }
 
+/** `help run`, as other tools have it, is `run --help`. */
+std::vector<const char*> with_help_as_option(int count, const char* const* arguments)
+{
+    std::vector<const char*> words(arguments, arguments + count);
+    if (count > 1 && std::string_view(words[1]) == "help")
+    {
+        words.erase(words.begin() + 1);
+        words.push_back("--help");
+    }
+    return words;
+}
+
 } // namespace
 
 int run_command_line(int count, const char* const* arguments)
 {
+    const std::vector<const char*> words = with_help_as_option(count, arguments);
     CLI::App app{ "The mixer layer on a virtual board." };
     app.formatter_fn(folded_help);
     app.set_version_flag("--version", version);
@@ -327,11 +342,11 @@ int run_command_line(int count, const char* const* arguments)
     add_record(app, chosen);
     add_replay(app, chosen);
     add_report(app, chosen);
-    if (const auto code = misspelt(app, count, arguments))
+    if (const auto code = misspelt(app, static_cast<int>(words.size()), words.data()))
         return *code;
     try
     {
-        app.parse(count, arguments);
+        app.parse(static_cast<int>(words.size()), words.data());
     }
     catch (const CLI::ParseError& error)
     {

@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Proves of each operation of the layer, for all arguments, all contents of the record and all answers of the platform,
-what docs/claims.md says; and that faults which are planted in copies of the sources are found. Prints KTAP; ends with 1
+what docs/proof.md says; and that faults which are planted in copies of the sources are found. Prints KTAP; ends with 1
 when something does not hold, and with 77 when the checker is not to be had.
 
 usage: prove.py CACHE MADE [--faults] [OPERATION...]

@@ -15,7 +15,7 @@ import harness  # noqa: E402
 import prove  # noqa: E402
 import view  # noqa: E402
 
-PAGE = (prove.ROOT / "docs/claims.md").read_text(encoding="utf-8")
+PAGE = (prove.ROOT / "docs/proof.md").read_text(encoding="utf-8")
 REACHED = "".join(f"[{world}_x.assertion.1] line 9 {prove.REACHED}: FAILURE\n" for world in harness.WORLDS)
 
 

@@ -40,6 +40,13 @@ void* memset(void* pvDest, int iValue, size_t zSize);
 #define PMX_FRAME(pvLocal) (pvLocal)
 #endif
 
+/* The layer's private variables are named here and nowhere else. Another compiler leaves that to who links. */
+#ifdef __GNUC__
+#define PMX_HIDDEN __attribute__((visibility("hidden")))
+#else
+#define PMX_HIDDEN
+#endif
+
 /* What is to be known of a format: how many values it takes, and above that a bit for each that is a text. */
 #define PMX_CODE_COUNT(u4Code) ((u4Code)&31u)
 #define PMX_CODE_TEXTS(u4Code) ((u4Code) >> 5 & 0xFFFFu)

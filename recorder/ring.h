@@ -10,6 +10,9 @@
 /* Take so many words, and tell where they begin: the one thing that threads and contexts contend for. A compiler
  * without these built-ins gives its own. */
 #ifndef PMX_RECORDER_ADD
+#ifndef __GNUC__
+#error "PMX_RECORDER_ADD, PMX_RECORDER_LOAD, PMX_RECORDER_PUBLISH and PMX_RECORDER_PUBLISHED have to be defined"
+#endif
 #define PMX_RECORDER_ADD(pu4Word, u4Number) __atomic_fetch_add(pu4Word, u4Number, __ATOMIC_RELAXED)
 #define PMX_RECORDER_LOAD(pu4Word) __atomic_load_n(pu4Word, __ATOMIC_RELAXED)
 #define PMX_RECORDER_PUBLISH(pu4Word, u4Value) __atomic_store_n(pu4Word, u4Value, __ATOMIC_RELEASE)

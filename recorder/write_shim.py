@@ -21,15 +21,18 @@ def take(name, rows):
 
 
 def private(name, size):
-    return f'extern UCHAR {name}[{size}] __attribute__((visibility("hidden")));\n'
+    return f"extern UCHAR {name}[{size}] PMX_HIDDEN;\n"
 
 
 def watch(layer):
     """What is looked at whenever the layer is entered or left: words that stand together, and what is left over. A load
-    of an address is shorter than making it."""
+    of an address is shorter than making it. A compiler that knows no second name for a variable is not told that they
+    are words."""
     runs, single = interface.watched(layer)
     declared = "".join(f"typedef struct {{ UINT32 au4Word[{words}]; }} PMX_RUN_{i}_T;\n"
-                       f'extern PMX_RUN_{i}_T rPmxRun{i} __asm__("{name}");\n' for i, (name, words) in enumerate(runs))
+                       f"#ifdef __GNUC__\nextern PMX_RUN_{i}_T rPmxRun{i} __asm__(\"{name}\");\n#else\n"
+                       f"#define rPmxRun{i} (*(const PMX_RUN_{i}_T*)(const void*)&{name})\n#endif\n"
+                       for i, (name, words) in enumerate(runs))
     watched = [f"PMX_RUN_{i}_T rRun{i};" for i in range(len(runs))]
     watched += [f"UCHAR auc{name}[{size}];" for name, size in single]
     places = [f"const PMX_RUN_{i}_T* prRun{i};" for i in range(len(runs))] + [f"const void* pv{name};"

@@ -44,11 +44,18 @@ class Recording:
         changed.words[HEADER_WORDS:HEADER_WORDS + len(held)] = held
         return changed
 
-    def answer(self, name):
-        """(number of the event in which it is answered, from 0; place of the answer) of a function's first call."""
-        number = [function.name for function in interface.platform()].index(name)
+    def begin(self, name, last=False):
+        """(number of the event, from 0; the event) of a function's first call, or of its last one."""
+        kind, listed = CALL, [function.name for function in interface.platform()]
+        if name not in listed:
+            kind, listed = OPERATION, [function.name for function in interface.operations()]
+        found = [(i, event) for i, event in enumerate(self.events()) if event[1::2] == (kind, listed.index(name))]
+        return found[-1 if last else 0]
+
+    def answer(self, name, last=False):
+        """(number of the event in which it is answered, from 0; place of the answer) of such a call."""
         events = list(self.events())
-        at, began = next((i, event) for i, event in enumerate(events) if event[1::2] == (CALL, number))
+        at, began = self.begin(name, last)
         if not began[2]:
             at = next(i for i, event in enumerate(events) if event[1] == RETURN and
                       self.words[event[0] + 3] == began[0] - HEADER_WORDS)

@@ -3,10 +3,11 @@
 """Records scenarios and replays them: as they are, with another answer, argument or result, out of a memory dump, out
 of a ring that has run over, and damaged.
 
-usage: replay_test.py PROGRAM PRODUCT
+usage: replay_test.py PROGRAM PRODUCT INTERRUPTED LATE
 """
 
 import json
+import os
 import pathlib
 import random
 import signal
@@ -152,7 +153,7 @@ class Replay(unittest.TestCase):
         for number, (place, *_) in enumerate(recording.events()):
             recording.words[place + 1] = 0xFFFFFFF0 + 7 * number & 0xFFFFFFFF
         self.assertEqual(0, self.replay(recording.bytes()).returncode)
-        told = [json.loads(line) for line in self.run_tool("replay", "--json", self.file).stdout.splitlines()]
+        told = self.events()
         self.assertEqual([0xFFFFFFF0 + 7 * number for number in range(len(told))], [one["time_us"] for one in told])
 
     def test_three_small_arguments_take_24_bytes(self):
@@ -167,7 +168,7 @@ class Replay(unittest.TestCase):
 
     def test_what_was_recorded_is_told_to_programs(self):
         recording = self.record("PMX_Init\nPMX_GetMode 0\n")
-        told = [json.loads(line) for line in self.run_tool("replay", "--json", self.file).stdout.splitlines()]
+        told = self.events()
         self.assertEqual(len(list(recording.events())), len(told))
         self.assertEqual(list(range(1, len(told) + 1)), [one["event"] for one in told])
         self.assertEqual({"event": len(told), "time_us": told[-1]["time_us"], "thread": 0, "depth": 0,
@@ -246,6 +247,74 @@ class Replay(unittest.TestCase):
         ended = self.run_tool("replay", self.file)
         self.assertEqual(0, ended.returncode, ended.stdout + ended.stderr)
 
+    def interrupted(self, way):
+        ended = subprocess.run([INTERRUPTED, way, self.file], check=True, timeout=60, stdout=subprocess.PIPE, text=True)
+        return ended.stdout
+
+    def events(self):
+        return [json.loads(line) for line in self.run_tool("replay", "--json", self.file).stdout.splitlines()]
+
+    def replays_equal(self, operations, **environment):
+        ended = subprocess.run([PROGRAM, "replay", self.file], capture_output=True, text=True, timeout=60, check=False,
+                               env={**os.environ, **environment})
+        self.assertEqual(0, ended.returncode, ended.stdout + ended.stderr)
+        self.assertGreater(int(ended.stdout.split()[1]), operations)
+
+    def test_another_context_enters_at_every_moment(self):
+        self.interrupted("between")
+        self.replays_equal(300)
+        running, snapshots = set(), 0
+        for event in self.events():
+            if event["kind"] == "operation" and "answer" not in event:
+                running.add((event["thread"], event["function"]))
+            elif event["kind"] == "return":
+                running.discard((event["thread"], event.get("function")))
+            elif event["kind"] == "snapshot":
+                self.assertEqual(set(), running, f"event {event['event']}: no snapshot while somebody is inside")
+                snapshots += 1
+        self.assertGreater(snapshots, 3)
+
+    def test_no_snapshot_is_torn(self):
+        self.interrupted("torn")
+        kinds = [event["kind"] for event in self.events()]
+        self.assertGreater(kinds.count("nothing"), 2)
+        self.assertGreater(kinds.count("snapshot"), 2)
+        self.replays_equal(20)
+
+    def test_threads_come_in_the_recorded_order(self):
+        for way, operations in (("turns", 400), ("between", 300)):
+            self.interrupted(way)
+            self.assertEqual({0, 1}, {event["thread"] for event in self.events()})
+            for _ in range(3):
+                self.replays_equal(operations, LD_PRELOAD=str(LATE), ASAN_OPTIONS="verify_asan_link_order=0")
+
+    def test_two_planes_that_are_told_at_once(self):
+        self.assertEqual("1 2, 0 mistaken\n", self.interrupted("planes"))
+
+    def test_a_table_of_texts_that_is_full(self):
+        self.interrupted("full")
+        self.assertIn("it has a text that was not told", self.run_tool("replay", self.file).stdout)
+
+    def test_a_table_that_is_null(self):
+        recording = self.record("PMX_Init\nsource vdp0 connect\nPMX_InformVdpColorSpace 0\n")
+        number, _ = recording.answer("i4ImQueryInterface")
+        place = list(recording.events())[number][0]
+        recording.words[place + (recording.words[place] & 0xFF) - 2] = 0
+        ended = self.replay(recording.bytes())
+        self.assertEqual(1, ended.returncode, ended.stderr)
+        self.assertIn("computed: nothing: no table was handed out\n", ended.stdout)
+
+    def test_what_another_thread_does_within_a_call_is_no_operation_to_be_explained(self):
+        recording = self.record("PMX_Init\nmeanwhile as thread PMX_HalSetMode PMX_SetBrightness 0 9 1\n"
+                                "PMX_SetMode 0 RES_720P50HZ 50 0\nPMX_ChkSupportedRes 0 RES_480P 60\n")
+        self.assertGreater(len({event["thread"] for event in self.events()}), 1)
+        _, place = recording.answer("fgPmxDrvGetAvdInfo", last=True)
+        recording.words[place] = 0
+        ended = self.replay(recording.bytes())
+        self.assertEqual(1, ended.returncode, ended.stderr)
+        self.assertIn(", in PMX_ChkSupportedRes: ", ended.stdout)
+        self.assertRegex(ended.stdout, r"\nthe layer's reasons:\n  refused: PMX_ChkSupportedRes = 0\n  because ")
+
     def test_what_is_left_after_a_crash(self):
         for event in (2, 3, 50, 777, 2000, 30001):
             ended = subprocess.run([PRODUCT, self.file, str(event)], check=False, timeout=60)
@@ -303,5 +372,5 @@ class Replay(unittest.TestCase):
 
 
 if __name__ == "__main__":
-    PROGRAM, PRODUCT = (pathlib.Path(sys.argv.pop(1)).resolve() for _ in range(2))
+    PROGRAM, PRODUCT, INTERRUPTED, LATE = (pathlib.Path(sys.argv.pop(1)).resolve() for _ in range(4))
     unittest.main()

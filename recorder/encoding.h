@@ -27,10 +27,12 @@ void* memset(void* pvDest, int iValue, size_t zSize);
 
 #define PMX_WORDS(Size) (((Size) + 3) / 4)
 #define PMX_PRESENT 0x80000000u /* of bytes behind a pointer: it was no null pointer; how many, is added */
-#define PMX_MOST_BYTES 256u     /* that are kept of what one pointer leads to */
-#define PMX_MOST_TEXT 384u      /* characters of a format from outside */
-#define PMX_MOST_VALUES 16u     /* that go with a format */
-#define PMX_ROOM 160u           /* words in which the arguments of an event are gathered */
+#define PMX_CUT 0x40000000u     /* beside that, of a text: there was more of it, or nobody has read it */
+#define PMX_KEPT(u4Present) ((u4Present)&0x3FFFFFFFu)
+#define PMX_MOST_BYTES 256u /* that are kept of what one pointer leads to */
+#define PMX_MOST_TEXT 511u  /* characters of a text from outside: what PMX_Printf prints at most */
+#define PMX_MOST_VALUES 16u /* that go with a format */
+#define PMX_MOST_KEPT 240u  /* words of a format from outside with its values: there are others in the event */
 
 /* Where the caller's variables stand: behind this, in so many bytes. */
 #define PMX_CALLER 4096u
@@ -72,14 +74,30 @@ static inline UINT32 u4PmxLength(const char* szText, UINT32 u4Most)
     return u4Length;
 }
 
-/* A text of the layer, or one that it got back: its check sum (FNV-1a); 0 for a null pointer. */
+/* FNV-1a */
+#define PMX_SUM_OF_NOTHING 2166136261u
+#define PMX_SUM_WITH(u4Sum, cNext) (((u4Sum) ^ (UCHAR)(cNext)) * 16777619u)
+
+/* A text of the layer, or one that it got back: its check sum; 0 for a null pointer. */
 static inline UINT32 u4PmxText(const char* szText)
 {
-    UINT32 u4Sum = 2166136261u;
+    UINT32 u4Sum = PMX_SUM_OF_NOTHING;
     if (szText == 0)
         return 0;
     for (; *szText != 0; ++szText)
-        u4Sum = (u4Sum ^ (UCHAR)*szText) * 16777619u;
+        u4Sum = PMX_SUM_WITH(u4Sum, *szText);
+    return u4Sum;
+}
+
+/* A text from outside: that of its first so many characters. */
+static inline UINT32 u4PmxBeginning(const char* szText, UINT32 u4Length)
+{
+    UINT32 u4Sum = PMX_SUM_OF_NOTHING;
+    UINT32 i;
+    if (szText == 0)
+        return 0;
+    for (i = 0; i < u4Length; ++i)
+        u4Sum = PMX_SUM_WITH(u4Sum, szText[i]);
     return u4Sum;
 }
 
@@ -102,33 +120,70 @@ static inline UINT32 u4PmxPutBytes(UINT32* pu4Words, UINT32 u4At, const void* pv
         pu4Words[u4At] = 0;
         return u4At + 1;
     }
-    if (u4At + 1 + PMX_WORDS(u4Size) > PMX_ROOM - 1)
-        u4Size = 0;
     pu4Words[u4At] = PMX_PRESENT | u4Size;
     return u4PmxPutRaw(pu4Words, u4At + 1, pvBytes, u4Size);
 }
 
-/* The next value that a format takes, behind its letters: 's' for a text, 'd' for anything else, 0 for none. Behind a
- * width that is a value what it is the width of still goes on. */
-static inline char cPmxNextValue(const char** pszFormat, bool* pfgInside)
+/* How far a format is read. */
+typedef struct
 {
-    const char* szAt = *pszFormat;
-    char cFound = 0;
-    for (; *szAt != 0 && cFound == 0; ++szAt)
+    const char* szAt;
+    UINT32 u4Left;      /* characters */
+    bool fgInside;      /* a conversion has begun */
+    bool fgPoint;       /* and so has its precision */
+    UINT32 u4Precision; /* characters that it has of a text at most */
+} PMX_FORMAT_T;
+
+static inline void vPmxRead(PMX_FORMAT_T* prFormat, const char* szFormat, UINT32 u4Length)
+{
+    prFormat->szAt = szFormat;
+    prFormat->u4Left = szFormat == 0 ? 0 : u4Length;
+    prFormat->fgInside = false;
+    prFormat->fgPoint = false;
+    prFormat->u4Precision = 0;
+}
+
+/* A character within a conversion that is no value yet. */
+static inline void vPmxReadInside(PMX_FORMAT_T* prFormat, char c)
+{
+    if (c == '%')
+        prFormat->fgInside = false;
+    else if (c == '.')
     {
-        const char c = *szAt;
-        if (!*pfgInside)
-            *pfgInside = c == '%';
-        else if (c == '%')
-            *pfgInside = false;
+        prFormat->fgPoint = true;
+        prFormat->u4Precision = 0;
+    }
+    else if (prFormat->fgPoint && c >= '0' && c <= '9' && prFormat->u4Precision <= PMX_MOST_TEXT)
+        prFormat->u4Precision = 10 * prFormat->u4Precision + (UINT32)(c - '0');
+}
+
+/* The next value that a format takes, behind its letters: 's' for a text, '.' for a precision, 'd' for anything else, 0
+ * for none. Behind a width or a precision that is a value what it belongs to still goes on. */
+static inline char cPmxNextValue(PMX_FORMAT_T* prFormat)
+{
+    char cFound = 0;
+    for (; prFormat->u4Left != 0 && *prFormat->szAt != 0 && cFound == 0; ++prFormat->szAt, --prFormat->u4Left)
+    {
+        const char c = *prFormat->szAt;
+        if (!prFormat->fgInside)
+        {
+            if (c != '%')
+                continue;
+            prFormat->fgInside = true;
+            prFormat->fgPoint = false;
+            prFormat->u4Precision = ~0u;
+        }
         else if (c == 's')
             cFound = 's';
-        else if (c == '*' || (c >= 'a' && c <= 'z' && c != 'h' && c != 'l' && c != 'z') || (c >= 'A' && c <= 'Z'))
+        else if (c == '*')
+            cFound = prFormat->fgPoint ? '.' : 'd';
+        else if ((c >= 'a' && c <= 'z' && c != 'h' && c != 'l' && c != 'z') || (c >= 'A' && c <= 'Z'))
             cFound = 'd';
+        else
+            vPmxReadInside(prFormat, c);
         if (cFound != 0)
-            *pfgInside = c == '*';
+            prFormat->fgInside = c == '*';
     }
-    *pszFormat = szAt;
     return cFound;
 }
 
@@ -137,11 +192,10 @@ static inline UINT32 u4PmxCode(const char* szFormat)
 {
     UINT32 u4Count = 0;
     UINT32 u4Texts = 0;
-    bool fgInside = false;
+    PMX_FORMAT_T rFormat;
     char c;
-    if (szFormat == 0)
-        return 0;
-    while (u4Count < PMX_MOST_VALUES && (c = cPmxNextValue(&szFormat, &fgInside)) != 0)
+    vPmxRead(&rFormat, szFormat, ~0u);
+    while (u4Count < PMX_MOST_VALUES && (c = cPmxNextValue(&rFormat)) != 0)
         u4Texts |= (c == 's' ? 1u : 0u) << u4Count++;
     return u4Texts << 5 | u4Count;
 }
@@ -162,22 +216,81 @@ static inline UINT32 u4PmxNumbersAlone(UINT32 u4Code, const char* szFormat, cons
     return (size_t)szFormat - (size_t)pvFrame < PMX_CALLER ? 0 : PMX_CODE_COUNT(u4Code);
 }
 
-/* The same as words. A text from outside is kept whole, one of the layer as its check sum. */
-static inline UINT32 u4PmxPutValues(UINT32* pu4Words, UINT32 u4At, UINT32 u4Code, const long* piValues, bool fgWhole)
+/* The values of a format of the layer as words. */
+static inline UINT32 u4PmxPutValues(UINT32* pu4Words, UINT32 u4At, UINT32 u4Code, const long* piValues)
 {
     UINT32 i;
     for (i = 0; i < PMX_CODE_COUNT(u4Code); ++i)
+        pu4Words[u4At++] =
+            (PMX_CODE_TEXTS(u4Code) >> i & 1) == 0 ? (UINT32)piValues[i] : u4PmxText((const char*)(size_t)piValues[i]);
+    return u4At;
+}
+
+/* What is kept of a format from outside, and of the values that go with it: the operation has these characters, the
+ * call that it makes with them their check sums. What a replay hands over has lost the rest, and comes to the same. */
+typedef struct
+{
+    UINT32 u4Format;                  /* PMX_PRESENT, PMX_CUT, and how many characters; 0 for a null pointer */
+    UINT32 u4Count;                   /* values */
+    UINT32 u4Texts;                   /* a bit for each that is a text */
+    UINT32 au4Value[PMX_MOST_VALUES]; /* the number; of a text what u4Format has of the format */
+    UINT32 u4Words;                   /* of all of it, with the characters */
+} PMX_KEPT_T;
+
+/* Of a text: no more than is read of it, and than there is room for. */
+static inline UINT32 u4PmxKeepText(const char* szText, UINT32 u4Precision, UINT32* pu4Room)
+{
+    const UINT32 u4Most = u4PmxSize(4 * *pu4Room, PMX_MOST_TEXT);
+    UINT32 u4Length;
+    if (szText == 0)
+        return 0;
+    u4Length = u4PmxLength(szText, u4PmxSize(u4Precision, u4Most));
+    *pu4Room -= PMX_WORDS(u4Length);
+    if (u4Length == u4Most && u4Length < u4Precision && szText[u4Length] != 0)
+        return PMX_PRESENT | PMX_CUT | u4Length;
+    return PMX_PRESENT | u4Length;
+}
+
+/* A precision below 0 is none in one library and 0 in another: nothing is read then. */
+static inline void vPmxKeep(PMX_KEPT_T* prKept, const char* szFormat, const long* piValues)
+{
+    UINT32 u4Room = PMX_MOST_KEPT - 1 - PMX_MOST_VALUES;
+    UINT32 u4Count = 0;
+    PMX_FORMAT_T rFormat;
+    char c;
+    prKept->u4Texts = 0;
+    prKept->u4Format = u4PmxKeepText(szFormat, ~0u, &u4Room);
+    vPmxRead(&rFormat, szFormat, PMX_KEPT(prKept->u4Format));
+    while (u4Count < PMX_MOST_VALUES && (c = cPmxNextValue(&rFormat)) != 0)
     {
-        const char* const szText = (const char*)(size_t)piValues[i];
-        if (u4At + 2 >= PMX_ROOM)
-            return u4At;
-        if ((PMX_CODE_TEXTS(u4Code) >> i & 1) == 0)
-            pu4Words[u4At++] = (UINT32)piValues[i];
-        else if (fgWhole)
-            u4At = u4PmxPutBytes(pu4Words, u4At, szText, szText == 0 ? 0 : u4PmxLength(szText, 63));
-        else
-            pu4Words[u4At++] = u4PmxText(szText);
+        const long iValue = piValues[u4Count];
+        prKept->au4Value[u4Count] = (UINT32)iValue;
+        if (c == '.')
+            rFormat.u4Precision = (INT32)iValue < 0 ? 0 : (UINT32)iValue;
+        else if (c == 's')
+        {
+            prKept->u4Texts |= 1u << u4Count;
+            prKept->au4Value[u4Count] = u4PmxKeepText((const char*)(size_t)iValue, rFormat.u4Precision, &u4Room);
+        }
+        ++u4Count;
     }
+    prKept->u4Count = u4Count;
+    prKept->u4Words = PMX_MOST_KEPT - PMX_MOST_VALUES + u4Count - u4Room;
+}
+
+static inline bool fgPmxIsText(const PMX_KEPT_T* prKept, UINT32 u4Value)
+{
+    return (prKept->u4Texts >> u4Value & 1) != 0;
+}
+
+/* The values as words, a text as its check sum. */
+static inline UINT32 u4PmxPutSums(UINT32* pu4Words, UINT32 u4At, const PMX_KEPT_T* prKept, const long* piValues)
+{
+    UINT32 i;
+    for (i = 0; i < prKept->u4Count; ++i)
+        pu4Words[u4At++] = fgPmxIsText(prKept, i)
+                               ? u4PmxBeginning((const char*)(size_t)piValues[i], PMX_KEPT(prKept->au4Value[i]))
+                               : prKept->au4Value[i];
     return u4At;
 }
 

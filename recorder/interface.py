@@ -22,6 +22,9 @@ SYMBOLS = {"_PMX_TmrIsr": "PMX_SYMBOL_ISR", "_rPMXIF": "PMX_SYMBOL_TABLE", "pmx_
 FROM_OUTSIDE = ("x_vsnprintf", "UTIL_Printf")
 # This one also gets a text that was made from a format, and no values with it.
 PRINTS_WHAT_WAS_MADE = "UTIL_Printf"
+# Operations that take a format, and when they read it. Otherwise nobody may: a caller has it ready for a level that is
+# on, perhaps, and no sooner.
+READS_FORMAT_WHEN = {"PMX_Printf": "level >= 0 && level <= 31 && (PMX_debug_level >> level & 1u) != 0"}
 
 
 def constant(name):
@@ -109,29 +112,30 @@ def size_of(parameter, expression):
     return f"({parameter.name} == 0 ? 0 : u4PmxSize({expression}, PMX_MOST_BYTES))"
 
 
-def encoding(function, is_operation):
-    """The lines that put a function's arguments into au4Words, from u4Used on."""
+def encoding(function):
+    """The lines that put what a platform function is handed into au4Words, from u4Used on."""
     lines, previous = [], ""
+    is_format_kept = "list" in [parameter.kind for parameter in function.parameters]
     for parameter in function.parameters:
         name = parameter.name
-        if parameter.kind in ("values", "list"):
-            whole = "true" if is_operation else "false"
+        if parameter.kind == "list":
+            lines.append("u4Used = u4PmxPutSums(au4Words, u4Used, &rKept, aiValues);")
+        elif parameter.kind == "values":
             code = "u4Code"
             if function.name == PRINTS_WHAT_WAS_MADE:
                 code = f"u4PmxNumbersAlone(u4Code, {previous}, PMX_FRAME(au4Words))"
-            lines.append(f"u4Used = u4PmxPutValues(au4Words, u4Used, {code}, aiValues, {whole});")
+            lines.append(f"u4Used = u4PmxPutValues(au4Words, u4Used, {code}, aiValues);")
         elif parameter.kind == "tag":
             lines.append(f"au4Words[u4Used++] = (UINT32)(size_t){name};")
         elif parameter.kind == "symbol":
             lines.append(f"au4Words[u4Used++] = u4Symbol((size_t){name});")
-        elif parameter.kind == "text" and is_operation:
-            lines.append(f"u4Used = u4PmxPutBytes(au4Words, u4Used, {name}, {name} == 0 ? 0 : "
-                         f"u4PmxLength({name}, PMX_MOST_BYTES - 1));")
+        elif parameter.kind == "text" and is_format_kept:
+            lines.append(f"vPmxKeep(&rKept, {name}, aiValues);")
+            lines.append(f"au4Words[u4Used++] = u4PmxBeginning({name}, PMX_KEPT(rKept.u4Format));")
         elif parameter.kind == "text":
             lines.append(f"au4Words[u4Used++] = u4PmxText({name});")
-        elif parameter.kind == "data" or (parameter.kind == "place" and is_operation):
-            size = parameter.read or parameter.written
-            lines.append(f"u4Used = u4PmxPutBytes(au4Words, u4Used, {name}, {name} == 0 ? 0 : {size});")
+        elif parameter.kind == "data":
+            lines.append(f"u4Used = u4PmxPutBytes(au4Words, u4Used, {name}, {name} == 0 ? 0 : {parameter.read});")
         elif parameter.kind in ("place", "table"):
             lines.append(f"au4Words[u4Used++] = {name} != 0;")
         else:
@@ -146,12 +150,13 @@ def collecting(function):
     if "values" not in kinds and "list" not in kinds:
         return []
     [text] = [parameter.name for parameter in function.parameters if parameter.kind == "text"]
-    begin = f"va_start(rValues, {text});"
+    kept, begin = [], f"va_start(rValues, {text});"
     if "list" in kinds:
+        kept = ["PMX_KEPT_T rKept;"]
         [given] = [parameter.name for parameter in function.parameters if parameter.kind == "list"]
         begin = f"va_copy(rValues, {given});"
     return ["long aiValues[PMX_MOST_VALUES] = { 0 };", f"const UINT32 u4Code = u4PmxCode({text});", "va_list rValues;",
-            begin, "vPmxCollect(u4Code, rValues, aiValues);", "va_end(rValues);"]
+            *kept, begin, "vPmxCollect(u4Code, rValues, aiValues);", "va_end(rValues);"]
 
 
 def handed_on(function):
@@ -162,13 +167,7 @@ def handed_on(function):
     return ", ".join(names)
 
 
-def room(function, is_operation):
-    """How many words an event of this function takes at most."""
-    most = 4 + len(tables(function))
-    for parameter in function.parameters:
-        if is_text_out(parameter) or (is_operation and parameter.kind == "values"):
-            return "PMX_ROOM"
-        has_bytes = parameter.kind == "data" or (is_operation and parameter.kind in ("place", "text"))
-        most += (65 if has_bytes else 16 if parameter.kind in ("values", "list") else 1)
-        most += 64 if parameter.written else 0
-    return str(most)
+def room(function):
+    """How many words what a platform function is handed takes at most, behind three others."""
+    sizes = {"data": 65, "values": 16, "list": 16}
+    return 3 + sum(sizes.get(parameter.kind, 1) for parameter in function.parameters)

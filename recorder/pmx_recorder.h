@@ -17,7 +17,7 @@ extern "C" {
 #define PMX_RECORDER_MAGIC_0 0x46584D50u
 #define PMX_RECORDER_MAGIC_1 0x4847494Cu
 #define PMX_RECORDER_MAGIC_2 0x43455254u
-#define PMX_RECORDER_VERSION 1u
+#define PMX_RECORDER_VERSION 2u
 
 #define PMX_RECORDER_SNAPSHOTS 16u /* positions that are remembered: more than a ring ever holds */
 #define PMX_RECORDER_A_RING 8u     /* a snapshot is due when so many'th part of the ring was written since the last */

@@ -89,6 +89,20 @@ static inline UINT32* pu4PutBytes(UINT32* pu4To, const void* pvBytes, UINT32 u4S
     return pu4PutRaw(pu4To + 1, pvBytes, u4Size);
 }
 
+/* A format from outside, and its values. */
+static void vPutKept(UINT32* pu4To, const PMX_KEPT_T* prKept, const char* szFormat, const long* piValues)
+{
+    UINT32 i;
+    *pu4To = prKept->u4Format;
+    pu4To = pu4PutRaw(pu4To + 1, szFormat, PMX_KEPT(prKept->u4Format));
+    for (i = 0; i < prKept->u4Count; ++i)
+    {
+        *pu4To++ = prKept->au4Value[i];
+        if (fgPmxIsText(prKept, i))
+            pu4To = pu4PutRaw(pu4To, (const char*)(size_t)piValues[i], PMX_KEPT(prKept->au4Value[i]));
+    }
+}
+
 /* The state, or the exported objects at its head; the last word of either may be filled up with zeros. */
 static void vTakeState(UINT32* pu4To, UINT32 u4Size)
 {

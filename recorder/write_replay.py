@@ -15,8 +15,8 @@ PLANE = "replayed_plane_call"
 
 def call_of(function, index):
     lines = interface.collecting(function)
-    lines = [*lines, f"UINT32 au4Words[{interface.room(function, False)}];", "UINT32 u4Used = 3;",
-             *interface.encoding(function, False)]
+    lines = [*lines, f"UINT32 au4Words[{interface.room(function)}];", "UINT32 u4Used = 3;",
+             *interface.encoding(function)]
     reserved = [f"PMX_WORDS({interface.size_of(output, output.written)})"
                 for output in interface.fixed_outputs(function)] + ["1"] * len(interface.tables(function))
     room = " + ".join(reserved) or "0"

@@ -171,24 +171,46 @@ def recording(function, index, real, kind, is_operation):
     return INDENT.join(body)
 
 
-def recording_whole(function, index, real, kind, is_operation):
+def recording_format(function, index, real):
+    """The same for an operation with a format. One that it does not read is handed on as an empty one: whoever turns
+    the level on at that moment has it print nothing."""
+    if function.name not in interface.READS_FORMAT_WHEN:
+        raise SystemExit(f"{function.name} takes a format: READS_FORMAT_WHEN has to say when it is read")
+    *numbers, text, _ = [parameter.name for parameter in function.parameters]
+    call, plain = called(function, real, True)
+    body = [f"const bool fgIsRead = {interface.READS_FORMAT_WHEN[function.name]};",
+            "long aiValues[PMX_MOST_VALUES] = { 0 };", "PMX_KEPT_T rKept;", "PMX_EVENT_T rEvent;", "UINT32* pu4To;",
+            "va_list rValues;", f"if (!fgIsRead && {text} != 0)\n        {text} = \"\";",
+            f"va_start(rValues, {text});", f"vPmxCollect(u4PmxCode({text}), rValues, aiValues);", "va_end(rValues);",
+            f"if (rNow.prRecorder == 0)\n        {plain}", f"vPmxKeep(&rKept, {text}, aiValues);",
+            "if (!fgIsRead && rKept.u4Format != 0)\n        rKept.u4Format |= PMX_CUT;",
+            f"pu4To = pu4Operation(&rEvent, PMX_RECORDER_OPERATION << 8 | {index}u << 16 | "
+            f"({3 + len(numbers)} + rKept.u4Words));"]
+    body += [f"pu4To[{i}] = (UINT32){name};" for i, name in enumerate(numbers)]
+    body += [f"vPutKept(pu4To + {len(numbers)}, &rKept, {text}, aiValues);", call, "pu4Done(&rEvent, 0, 0);"]
+    return INDENT.join(body)
+
+
+def recording_whole(function, index, real):
     """The same for a call with texts from outside: what is kept of it is gathered first."""
-    call, plain = called(function, real, is_operation)
+    call, plain = called(function, real, False)
     gathered = interface.collecting(function)
     answer = "(UINT32)result" if function.has_result else "0"
     body = [*(line for line in gathered if not line.endswith(");") or " = " in line),
-            "UINT32 au4Words[PMX_ROOM];", "PMX_EVENT_T rEvent;", "UINT32 u4Used = 3;"]
+            f"UINT32 au4Words[{interface.room(function)}];", "PMX_EVENT_T rEvent;", "UINT32 u4Used = 3;"]
+    texts = [parameter.name for parameter in function.parameters if interface.is_text_out(parameter)]
+    body += ["UINT32 u4Room = PMX_MOST_KEPT;", "UINT32* pu4To;"] if texts else []
     body += [f"{function.result} result;"] if function.has_result else []
     body += [line for line in gathered if line.endswith(");") and " = " not in line]
-    body += [f"if (rNow.prRecorder == 0)\n        {plain}", *interface.encoding(function, is_operation),
-             f"PMX_COPY({'pu4Operation' if is_operation else 'pu4Call'}(&rEvent, "
-             f"{kind} << 8 | {index}u << 16 | u4Used), au4Words + 3, 4 * (u4Used - 3));", call]
-    texts = [parameter.name for parameter in function.parameters if interface.is_text_out(parameter)]
+    body += [f"if (rNow.prRecorder == 0)\n        {plain}", *interface.encoding(function),
+             f"PMX_COPY(pu4Call(&rEvent, PMX_RECORDER_CALL << 8 | {index}u << 16 | u4Used), au4Words + 3, "
+             "4 * (u4Used - 3));", call]
     if not texts:
-        body.append(f"{'pu4Done' if is_operation else 'pu4Answer'}(&rEvent, {answer}, 0);")
+        body.append(f"pu4Answer(&rEvent, {answer}, 0);")
     for name in texts:
-        body += ["vEnter();", f"u4Used = {name} == 0 ? 0 : u4PmxLength({name}, PMX_MOST_BYTES - 1);",
-                 f"pu4PutBytes(pu4Return(&rEvent, {answer}, 1 + PMX_WORDS(u4Used)), {name}, u4Used);"]
+        body += ["vEnter();", f"u4Used = u4PmxKeepText({name}, (UINT32)zSize, &u4Room);",
+                 f"pu4To = pu4Return(&rEvent, {answer}, 1 + PMX_WORDS(PMX_KEPT(u4Used)));", "*pu4To = u4Used;",
+                 f"pu4PutRaw(pu4To + 1, {name}, PMX_KEPT(u4Used));"]
     return INDENT.join([*body, *(["return result;"] if function.has_result else [])])
 
 
@@ -250,14 +272,16 @@ def exchanged(function, call):
 
 def operation(function, index):
     real = f"pmx_recorded_{function.name}"
-    how = recording_whole if function.is_variadic else recording
-    body = how(function, index, real, "PMX_RECORDER_OPERATION", True)
+    if function.is_variadic:
+        body = recording_format(function, index, real)
+    else:
+        body = recording(function, index, real, "PMX_RECORDER_OPERATION", True)
     return f"{function.declaration(real)};\n{function.declaration()}\n{{\n    {body}\n}}\n"
 
 
 def platform_function(function, index):
     if interface.is_from_outside(function, False):
-        body = recording_whole(function, index, function.name, "PMX_RECORDER_CALL", False)
+        body = recording_whole(function, index, function.name)
     elif function.is_variadic:
         return printing_much(function, index) + defined(function, printing(function, index))
     else:
@@ -358,6 +382,11 @@ def table_of_slots():
     return "const IPMX _rPMXIF = {\n" + "\n".join(rows) + "\n};\n"
 
 
+def most_beside_a_format():
+    """Words of an event that a format from outside shares with others."""
+    return 3 + max(len(function.parameters) for function in interface.operations() if function.is_variadic)
+
+
 def hold_texts(layer):
     """There is a place for each text of the layer, and as many again."""
     most = interface.constant("PMX_RECORDER_TEXTS")
@@ -380,12 +409,14 @@ def source(layer):
     return f"""/* Written from the headers when the recorder is built. */
 {includes}
 #include "encoding.h"
+#include "pmx_recorder.h"
 
 #define PMX_INTERFACE {interface.check_sum()}
 #define PMX_EXPORTED_SIZE {exported_size}u
 #define PMX_STATE_SIZE {size}u
 #define PLANES {PLANES}u
-DRV_STATIC_ASSERT(2 + PMX_WORDS(PMX_STATE_SIZE) <= 255, "a snapshot is one event");
+DRV_STATIC_ASSERT(2 + PMX_WORDS(PMX_STATE_SIZE) <= PMX_RECORDER_LONGEST, "a snapshot is one event");
+DRV_STATIC_ASSERT({most_beside_a_format()} + PMX_MOST_KEPT <= PMX_RECORDER_LONGEST, "so is a format with its values");
 
 {''.join(private(name, size) for name, size, at in private_ones)}
 {take("vPmxTakeExported", exported)}

@@ -88,6 +88,39 @@ static int iRecordInto(const char* szFile)
     return 0;
 }
 
+/* These are the last letters of a page, and behind it nothing can be read: the text has no end. */
+static char* pcOfPage(const char* szLetters)
+{
+    const size_t zPage = (size_t)sysconf(_SC_PAGESIZE);
+    char* const pcPages = mmap(0, 2 * zPage, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
+    const size_t zLength = strlen(szLetters);
+    if (pcPages == MAP_FAILED || mprotect(pcPages + zPage, zPage, PROT_NONE) != 0)
+        abort();
+    memcpy(pcPages + zPage - zLength, szLetters, zLength);
+    return pcPages + zPage - zLength;
+}
+
+/* So many times the same letter. */
+static const char* szMany(char cLetter, size_t zLength)
+{
+    char* const szText = calloc(zLength + 1, 1);
+    if (szText == 0)
+        abort();
+    memset(szText, cLetter, zLength);
+    return szText;
+}
+
+/* As long as what is printed at most, and longer; what is cut of a format takes its values along. */
+static void vPrintLong(void)
+{
+    char acFormat[700];
+    snprintf(acFormat, sizeof acFormat, "%s%%s.", szMany('f', 300));
+    PMX_Printf(0, acFormat, szMany('v', 200));
+    PMX_Printf(0, "%s%s", szMany('a', 500), szMany('b', 500));
+    snprintf(acFormat, sizeof acFormat, "%%d%s%%d%%s", szMany('c', 550));
+    PMX_Printf(0, acFormat, 7, 8, "behind");
+}
+
 static int iPrint(const char* szFile)
 {
     if (strcmp(szFile, "-") != 0 && iRecordInto(szFile) != 0)
@@ -98,6 +131,9 @@ static int iPrint(const char* szFile)
     PMX_Printf(0, "%*d %s", 7, 42, "behind a width");
     PMX_Printf(0, "%.*s, %-*.*s.", 3, "three four", 6, 2, "two");
     PMX_Printf(0, "%ld%% and %5s, %%s %%d", 12345678L, "so");
+    PMX_Printf(0, "%.8s %.*s.", pcOfPage("12345678"), 4, pcOfPage("1234"));
+    PMX_Printf(2, pcOfPage(""), "nobody reads that");
+    vPrintLong();
     return 0;
 }
 

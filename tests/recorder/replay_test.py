@@ -10,6 +10,7 @@ import json
 import os
 import pathlib
 import random
+import re
 import signal
 import struct
 import subprocess
@@ -242,10 +243,24 @@ class Replay(unittest.TestCase):
     def test_a_recorder_prints_what_is_printed_without(self):
         printed = [subprocess.run([PRODUCT, "print", file], check=True, timeout=60, stdout=subprocess.PIPE,
                                   text=True).stdout for file in ("-", self.file)]
-        self.assertEqual("     42 behind a width\nthr, tw    .\n12345678% and    so, %s %d\n", printed[0])
+        self.assertEqual(["     42 behind a width", "thr, tw    .", "12345678% and    so, %s %d", "12345678 1234.",
+                          300 * "f" + 200 * "v" + ".", 500 * "a" + 11 * "b", "7" + 510 * "c"], printed[0].splitlines())
         self.assertEqual(printed[0], printed[1])
         ended = self.run_tool("replay", self.file)
         self.assertEqual(0, ended.returncode, ended.stdout + ended.stderr)
+
+    def test_what_is_kept_of_long_texts(self):
+        subprocess.run([PRODUCT, "print", self.file], check=True, timeout=60, stdout=subprocess.DEVNULL)
+        told = self.events()
+        printed = [one["text"] for one in told if one.get("function") == "PMX_Printf" and one["kind"] == "operation"]
+        self.assertEqual('PMX_Printf(2, ""...)', printed[4])
+        kept = [re.findall(r'"([^"]*)"(\.\.\.)?', text) for text in printed[5:]]
+        self.assertEqual([[(300 * "f" + "%s.", ""), (200 * "v", "")],
+                          [("%s%s", ""), (500 * "a", ""), (388 * "b", "...")],
+                          [("%d" + 509 * "c", "...")]], kept)
+        ended = self.run_tool("replay", "--to-scenario", self.file)
+        self.assertEqual(1, ended.returncode)
+        self.assertIn("# missing: all of the text, or the values that go with it, of PMX_Printf", ended.stdout)
 
     def interrupted(self, way):
         ended = subprocess.run([INTERRUPTED, way, self.file], check=True, timeout=60, stdout=subprocess.PIPE, text=True)
@@ -327,6 +342,7 @@ class Replay(unittest.TestCase):
         swapped = b"".join(content[i:i + 4][::-1] for i in range(0, len(content), 4))
         for changed, told in ((b"", "there is no recording in it"), (content[:60], "ends within its header"),
                               (content[:-4], "ends within its ring"), (swapped, "the other order of bytes"),
+                              (content[:12] + b"\x01" + content[13:], "has version 1; this tool reads version 2"),
                               (content[:12] + b"\x07" + content[13:], "has version 7"),
                               (content[:16] + b"\x00" + content[17:], "another version of the layer's interface")):
             ended = self.replay(changed)

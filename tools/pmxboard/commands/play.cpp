@@ -83,7 +83,7 @@ std::optional<std::string> source_line(const RecordedStep& step)
     return "source vdp" + std::to_string(step.words[3]) + (name == "i4Pmx_Connect" ? " connect" : " disconnect");
 }
 
-/** The operation's line; nothing when it has values that no line can have. */
+/** The operation's line; nothing when it has values that no line can have, or a text that is not known whole. */
 std::optional<std::string> line_of(const RecordedStep& step)
 {
     if (const auto source = source_line(step))
@@ -101,7 +101,9 @@ std::optional<std::string> line_of(const RecordedStep& step)
             line += " " + (parameter.name.starts_with("i4") ? number(word) : std::to_string(word));
             continue;
         }
-        const std::size_t size = std::min<std::size_t>(word & ~PMX_PRESENT, words.size_bytes());
+        const std::size_t size = std::min<std::size_t>(PMX_KEPT(word), words.size_bytes());
+        if ((word & PMX_CUT) != 0 && size != 0)
+            return std::nullopt;
         const auto bytes = words.first(PMX_WORDS(size));
         words = words.subspan(bytes.size());
         if ((word & PMX_PRESENT) == 0)
@@ -242,7 +244,8 @@ void Play::write_commands()
         if (step.kind != RecordedStep::Kind::Operation)
             continue;
         const auto line = line_of(step);
-        const std::string said = line.value_or("# missing: the values that go with the text of " + step.function->name);
+        const std::string said =
+            line.value_or("# missing: all of the text, or the values that go with it, of " + step.function->name);
         if (step.command > m_commands.size())
             m_commands.push_back({ {}, said, {} });
         else if (line)

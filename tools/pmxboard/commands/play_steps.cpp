@@ -23,7 +23,7 @@ std::size_t take_arguments(const Described& function, bool is_operation, std::ve
             return words.size();
         if (at >= words.size())
             break;
-        const std::size_t size = has_bytes && (words[at] & PMX_PRESENT) != 0 ? words[at] & ~PMX_PRESENT : 0;
+        const std::size_t size = has_bytes && (words[at] & PMX_PRESENT) != 0 ? PMX_KEPT(words[at]) : 0;
         if (parameter.kind == "tag" && !is_operation) // whose it is, its owner knows
             words[at] = words[at] != 0;
         const std::size_t end = std::min(words.size(), at + 1 + PMX_WORDS(size));

@@ -2,6 +2,7 @@
 #include "tools/pmxboard/recording/described.h"
 
 #include <algorithm>
+#include <optional>
 #include <ostream>
 
 #include "board/names.h"
@@ -50,24 +51,62 @@ public:
         return word;
     }
 
-    std::string bytes(bool is_text)
+    std::string bytes()
     {
-        const std::uint32_t present = next();
-        if ((present & PMX_PRESENT) == 0)
+        const auto kept = take();
+        if (!kept)
             return "null";
-        const std::size_t size = std::min<std::size_t>(present & ~PMX_PRESENT, m_words.size_bytes());
-        std::string text(reinterpret_cast<const char*>(m_words.data()), size);
-        m_words = m_words.subspan(PMX_WORDS(size));
-        if (is_text)
-            return board::quote(text);
         std::string list;
-        for (const char byte : text)
+        for (const char byte : *kept)
             list.append(list.empty() ? "" : " ").append(hexadecimal(static_cast<unsigned char>(byte)).substr(2));
         return "[" + list + "]";
     }
 
+    /** With three points behind it when there was more of it. */
+    std::string text()
+    {
+        const bool is_cut = !is_empty() && (m_words.front() & PMX_CUT) != 0;
+        const auto kept = take();
+        if (!kept)
+            return "null";
+        return board::quote(*kept) + (is_cut ? "..." : "");
+    }
+
+    std::string format()
+    {
+        RecordedWords ahead = *this;
+        m_format = ahead.take().value_or("");
+        return text();
+    }
+
+    /** What goes with a format: of one that was kept it is known which of them are texts. */
+    std::string values()
+    {
+        const std::uint32_t code = u4PmxCode(m_format.c_str());
+        std::string list;
+        for (unsigned i = 0; !is_empty(); ++i)
+        {
+            const bool is_text = i < PMX_CODE_COUNT(code) && (PMX_CODE_TEXTS(code) >> i & 1) != 0;
+            list.append(list.empty() ? "" : ", ").append(is_text ? text() : hexadecimal(next()));
+        }
+        return list;
+    }
+
 private:
+    /** The bytes that come next; nothing for a null pointer. */
+    std::optional<std::string> take()
+    {
+        const std::uint32_t present = next();
+        if ((present & PMX_PRESENT) == 0)
+            return std::nullopt;
+        const std::size_t size = std::min<std::size_t>(PMX_KEPT(present), m_words.size_bytes());
+        const auto* const from = reinterpret_cast<const char*>(m_words.data());
+        m_words = m_words.subspan(PMX_WORDS(size));
+        return std::string(from, size);
+    }
+
     std::span<const std::uint32_t> m_words;
+    std::string m_format;
 };
 
 std::string text_of(std::uint32_t sum, const TextNames& texts)
@@ -87,16 +126,15 @@ std::string argument_text(const Described& function, const DescribedParameter& p
         return symbol_text(words.next());
     if (parameter.kind == "text" && !is_operation)
         return text_of(words.next(), texts);
-    if (parameter.kind == "data" || (is_operation && (parameter.kind == "text" || parameter.kind == "place")))
-        return words.bytes(parameter.kind == "text");
+    if (parameter.kind == "text")
+        return words.format();
+    if (parameter.kind == "data" || (is_operation && parameter.kind == "place"))
+        return words.bytes();
     if (parameter.kind == "place" || parameter.kind == "table")
         return words.next() != 0 ? "<place>" : "null";
     if (parameter.kind == "tag")
         return hexadecimal(words.next());
-    std::string values;
-    while (!words.is_empty())
-        values.append(values.empty() ? "" : ", ").append(hexadecimal(words.next()));
-    return values;
+    return words.values();
 }
 
 std::string described(const Described& function, bool is_operation, std::span<const std::uint32_t> given,

@@ -211,7 +211,7 @@ private:
             if (!function.tells_texts || at >= words.size())
                 return;
             if (parameter.kind == "data" && (words[at] & PMX_PRESENT) != 0)
-                at += PMX_WORDS(words[at] & ~PMX_PRESENT);
+                at += PMX_WORDS(PMX_KEPT(words[at]));
             else if (parameter.kind == "text")
                 code = name_text(words[at]).code;
             else if (parameter.kind == "values")

@@ -35,7 +35,7 @@ Bytes Given::bytes()
     if ((present & PMX_PRESENT) == 0)
         return {};
     const std::size_t size = std::min<std::size_t>(
-        { present & ~PMX_PRESENT, PMX_MOST_BYTES, 4 * (m_words.size() - std::min(m_at, m_words.size())) });
+        { PMX_KEPT(present), PMX_MOST_TEXT, 4 * (m_words.size() - std::min(m_at, m_words.size())) });
     const auto words = m_words.subspan(m_at, PMX_WORDS(size));
     m_at += words.size();
     return Bytes(words, size);
@@ -77,7 +77,7 @@ void Answer::write_text(char* place, std::size_t size)
         return;
     const auto present = next(1);
     const std::size_t length =
-        present.empty() ? 0 : std::min<std::size_t>({ present[0] & ~PMX_PRESENT, size - 1, written.size_bytes() });
+        present.empty() ? 0 : std::min<std::size_t>({ PMX_KEPT(present[0]), size - 1, written.size_bytes() });
     if (length != 0)
         std::memcpy(place, written.data(), length);
     place[length] = 0;

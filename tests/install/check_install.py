@@ -55,8 +55,9 @@ def main():
 
         for part in ("share/man/man1/pmxboard.1", "share/bash-completion/completions/pmxboard",
                      "share/pmx/examples/port_skeleton.c", "include/pmx/pmx_version.h",
-                     "share/pmx/schemas/trace.schema.json", "lib/pmx/pmx_if_recorded.o",
-                     "include/pmx/pmx_recorder.h", "share/pmx/recorder/shim.c", "share/doc/pmx/LICENSE"):
+                     "share/pmx/schemas/trace.schema.json", "share/pmx/schemas/recording.schema.json",
+                     "lib/pmx/pmx_if_recorded.o", "include/pmx/pmx_recorder.h", "share/pmx/recorder/shim.c",
+                     "share/doc/pmx/LICENSE"):
             if not (prefix / part).is_file():
                 sys.exit(f"{part} is not installed")
 

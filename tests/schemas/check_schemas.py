@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Holds what the tool writes for programs against the schemas: the trace of every scenario with its stores, the state
-and the difference that it ends with, operations, modes, and logs that are decoded.
+and the difference that it ends with, operations, modes, logs that are decoded, and recordings.
 
 usage: check_schemas.py TOOL
 """
@@ -66,6 +66,16 @@ def of_looks(tool, directory):
     return found
 
 
+def of_recordings(tool, directory):
+    """Two recordings, the second one of a ring that has run over."""
+    recording, scenario = directory / "recording", directory / "long.pmx"
+    scenario.write_text("PMX_Init\n" + 40 * "PMX_SetMode 0 RES_480P 60 0\nPMX_SetMode 0 RES_720P50HZ 50 0\n",
+                        encoding="utf-8")
+    for recorded, size in (("scenarios/connect-while-informing.pmx", "1048576"), (scenario, "16384")):
+        run(tool, "record", "--size", size, recording, recorded)
+        yield from (("recording", json.loads(line)) for line in run(tool, "replay", "--json", recording).splitlines())
+
+
 def of_commands(tool):
     contracts = [entry["name"] for entry in json.loads(run(tool, "ops", "--json"))]
     platform = [function.name for header in PLATFORM_HEADERS for function in functions(ROOT / header)]
@@ -86,6 +96,7 @@ def documents(tool):
         for found in pool.map(lambda scenario: of_scenario(tool, scenario), sorted(copies.glob("*.pmx"))):
             yield from found
         yield from of_looks(tool, pathlib.Path(directory))
+        yield from of_recordings(tool, pathlib.Path(directory))
     yield from of_commands(tool)
 
 

@@ -25,6 +25,7 @@ def written():
     """(schema, document) of each kind that the tool writes."""
     with tempfile.TemporaryDirectory() as directory:
         looks = check_schemas.of_looks(TOOL[0], pathlib.Path(directory))
+        looks += check_schemas.of_recordings(TOOL[0], pathlib.Path(directory))
     return [*looks, *check_schemas.of_commands(TOOL[0])]
 
 
@@ -65,7 +66,7 @@ class SchemasRefuse(unittest.TestCase):
         self.assertTrue(complaint.startswith(where), f"{name}: {complaint!r} does not begin with {where}")
 
     def test_what_the_tool_writes_is_accepted(self):
-        self.assertEqual({"trace", "state", "status", "diff", "ops", "modes", "decode"},
+        self.assertEqual({"trace", "state", "status", "diff", "ops", "modes", "decode", "recording"},
                          {name for name, _ in self.written})
         for name, document in self.written:
             self.assertEqual("", self.schemas.complaint(name, document))
@@ -82,7 +83,7 @@ class SchemasRefuse(unittest.TestCase):
             self.refused("trace", {**line, "kind": "shout"}, "$.kind: 'shout' is not one of")
 
     def test_a_key_more_anywhere_but_among_what_the_layer_names(self):
-        for name in ("diff", "status", "modes", "decode", "ops"):
+        for name in ("diff", "status", "modes", "decode", "ops", "recording"):
             document = cut(self.of(name))
             for path in places(document):
                 if {"values", "report", "fields"} & set(path):
@@ -129,6 +130,21 @@ class SchemasRefuse(unittest.TestCase):
             document[0][key] = value
             self.refused(name, document, f"$[0].{key}")
             self.refused(name, [], "$: [] is too short")
+
+    def test_recordings(self):
+        kinds = ("operation", "call", "return", "change", "snapshot")
+        self.assertLessEqual(set(kinds), {document["kind"] for name, document in self.written if name == "recording"})
+        for kind in kinds:
+            event = self.of("recording", kind)
+            for key in ("event", "time_us", "thread", "depth", "kind", "text"):
+                self.refused("recording", {name: value for name, value in event.items() if name != key}, "$: '")
+            self.refused("recording", {**event, "kind": "shout"}, "$.kind: 'shout' is not one of")
+            self.refused("recording", {**event, "answer": "0"}, "$.answer: ")
+            self.refused("recording", {**event, "thread": -1}, "$.thread: -1 is less than the minimum of 0")
+        for kind, key in (("operation", "function"), ("call", "function"), ("return", "answer")):
+            event = {name: value for name, value in self.of("recording", kind).items() if name != key}
+            self.refused("recording", event, f"$: '{key}' is a required property")
+        self.refused("recording", {**self.of("recording", "snapshot"), "answer": 0}, "$.answer: ")
 
     def test_decoded_logs(self):
         logs = [document for name, document in self.written if name == "decode" and isinstance(document, dict)]

@@ -61,6 +61,7 @@ complain()
 }
 
 echo "BEGIN $(uname -r)"
+echo "PROCESSORS $(grep -c ^processor /proc/cpuinfo)"
 for file in /modules/*
 do
     [ ! -f "$file" ] || insmod "$file" || echo "WRONG insmod $file"

@@ -47,6 +47,15 @@ APPLETS = ("sh", "mount", "cat", "cut", "grep", "sed", "dmesg", "insmod", "rmmod
 # What a scenario does to the record behind the layer's back is recorded, too.
 RECORDING = "watch_all=1"
 TAKEN = "first-mode-after-boot"
+# What is changed in that recording by hand; how many events behind it the layer departs, and how. It complains of what
+# was not created before it makes the next call that was recorded.
+CHANGES = (
+    ("x_sema_create", "answer", 2, "another call", r"Assert\("),
+    ("x_timer_create", "answer", 2, "another call", r"Assert\("),
+    ("PMX_HalSetMode", "argument", 1, "other arguments", r"PMX_HalSetMode\("),
+    ("PMX_Init", "answer", 1, "another result", r"end of PMX_Init"),
+)
+PROCESSORS = 2
 
 
 class Failed(Exception):
@@ -189,12 +198,17 @@ def recordings(console):
             lines.append(line)
 
 
-def replays(ktap, program, expected, console, folder):
-    """A verdict for each scenario: what the kernel recorded is what the layer does here."""
+def power_ons(lines):
+    """How often the module goes, and tells what it recorded, in a scenario."""
+    return 1 + lines[1:].count("POWER-ON")
+
+
+def replays(ktap, title, program, commands, console, folder):
+    """A verdict for each scenario: what the kernel recorded is what the layer does here, behind every power-on."""
     shutil.rmtree(folder, ignore_errors=True)
     folder.mkdir(parents=True)
-    wrong = {name: [] for name in expected}
-    found = dict.fromkeys(expected, 0)
+    wrong = {name: [] for name in commands}
+    found = dict.fromkeys(commands, 0)
     for name, content in recordings(console):
         found[name] += 1
         file = folder / f"{name}-{found[name]}.rec"
@@ -203,21 +217,24 @@ def replays(ktap, program, expected, console, folder):
         if not re.match(r"equal: [1-9]\d* operations, [1-9]\d* calls\n$", ran.stdout):
             wrong[name] += [f"{file.name}: {line}" for line in (ran.stdout + ran.stderr).splitlines()]
     for name, lines in wrong.items():
-        ktap.verdict(f"replayed: {name}", lines if found[name] else ["nothing was recorded"])
+        due = power_ons(commands[name])
+        lines += [f"{found[name]} recordings of {due}"] if found[name] != due else []
+        ktap.verdict(f"{title} replayed {name}", lines)
 
 
 def departs(ktap, program, folder):
-    """A recording in which a semaphore was not created after all."""
-    recording = Recording((folder / f"{TAKEN}-1.rec").read_bytes())
-    number, place = recording.answer("x_sema_create")
-    recording.words[place] = 0xFFFFFFFF
-    file = folder / "changed-by-hand"
-    file.write_bytes(recording.bytes())
-    ran = subprocess.run([program, "replay", file], capture_output=True, text=True, check=False)
-    # The layer complains of it before it makes the next call that was recorded.
-    expected = rf"departs at event {number + 2} of .*: another call\n  recorded: .*\n  computed: Assert\("
-    ktap.verdict("an answer that was changed by hand", [] if re.match(expected, ran.stdout) else
-                 (ran.stdout + ran.stderr).splitlines() or ["equal"])
+    """The same recording with one word changed, again and again."""
+    content = (folder / f"{TAKEN}-1.rec").read_bytes()
+    for name, what, behind, why, computed in CHANGES:
+        recording = Recording(content)
+        number, place = recording.answer(name) if what == "answer" else recording.argument(name)
+        recording.words[place] ^= 0xFFFFFFFF
+        file = folder / "changed-by-hand"
+        file.write_bytes(recording.bytes())
+        ran = subprocess.run([program, "replay", file], capture_output=True, text=True, check=False)
+        expected = rf"departs at event {number + behind} of .*: {why}\n  recorded: .*\n  computed: {computed}"
+        ktap.verdict(f"changed by hand: {what} of {name}", [] if re.match(expected, ran.stdout) else
+                     [f"not {expected}", *((ran.stdout + ran.stderr).splitlines() or ["equal"])])
 
 
 def becomes_scenario(ktap, program, folder):
@@ -240,6 +257,18 @@ def checks(ktap, title, console, number=CHECKS):
         ktap.verdict(f"{title} {what.partition(': ')[0]}", [what] if verdict == "WRONG" else [])
     if len(made) < number:
         ktap.verdict(f"{title} {number} checks", [f"only {len(made)} were made"])
+
+
+def without_pokes(commands):
+    """What others do to the layer's private objects, only a test records."""
+    return {name: lines for name, lines in commands.items() if not any("poke " in line for line in lines)}
+
+
+def has_processors(ktap, console):
+    """Whether the machine had as many as it was given."""
+    told = [line for line in console if line.startswith("PROCESSORS ")]
+    ktap.verdict(f"a machine of {PROCESSORS} processors", [] if told == [f"PROCESSORS {PROCESSORS}"] else
+                 told or ["how many it has, it did not tell"])
 
 
 def in_real_time(commands):
@@ -268,6 +297,11 @@ def prepared(ktap, program):
     return commands, expected
 
 
+def expected_of(expected, commands):
+    """What is expected of these scenarios."""
+    return {name: expected[name] for name in commands if name in expected}
+
+
 def check_path(*paths):
     """The kernel's build cannot be told of every folder."""
     for path in paths:
@@ -287,21 +321,31 @@ def compare_all(ktap, cache, made, program, shipped):
     commands, expected = prepared(ktap, program)
     archive = image(kernel, built, commands, made / "virtual")
     of_recorder = image(kernel, recorder, commands, made / "recorder", parameters=RECORDING)
-    with concurrent.futures.ThreadPoolExecutor() as both:
+    unwatched = without_pokes(commands)
+    of_product = image(kernel, recorder, unwatched, made / "product")
+    with concurrent.futures.ThreadPoolExecutor(2) as both:
         console = both.submit(boot, kernel, archive, made / "virtual.log", *VIRTUAL_TIME)
         recorded = both.submit(boot, kernel, of_recorder, made / "recorded.log", *VIRTUAL_TIME)
+        as_product = both.submit(boot, kernel, of_product, made / "product.log", *VIRTUAL_TIME)
     compare(ktap, "virtual time:", expected, console.result())
     compare(ktap, "recorded:", expected, recorded.result())
-    replays(ktap, program, expected, recorded.result(), made / "recordings")
+    replays(ktap, "recorded:", program, commands, recorded.result(), made / "recordings")
+    compare(ktap, "as on a product:", expected_of(expected, unwatched), as_product.result())
+    replays(ktap, "as on a product:", program, unwatched, as_product.result(), made / "product-recordings")
     departs(ktap, program, made / "recordings")
     becomes_scenario(ktap, program, made / "recordings")
     commands, left_out = in_real_time(commands)
     archive = image(kernel, ready, commands, made / "real", HERE / "real_time.sh")
     console = boot(kernel, archive, made / "real.log")
-    compare(ktap, "real time:", {name: expected[name] for name in commands if name in expected}, console)
+    compare(ktap, "real time:", expected_of(expected, commands), console)
     for name, reason in left_out.items():
         ktap.skip(f"real time: {name}", reason)
     checks(ktap, "real time:", console)
+    archive = image(kernel, recorder, commands, made / "several")
+    console = boot(kernel, archive, made / "several.log", "-smp", str(PROCESSORS))
+    has_processors(ktap, console)
+    compare(ktap, "several processors:", expected_of(expected, commands), console)
+    replays(ktap, "several processors:", program, commands, console, made / "several-recordings")
 
 
 def carried_out(work, words):

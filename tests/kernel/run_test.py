@@ -6,7 +6,9 @@ carried out in a kernel.
 usage: run_test.py PMXBOARD
 """
 
+import base64
 import contextlib
+import gzip
 import io
 import pathlib
 import re
@@ -77,6 +79,46 @@ class Comparison(unittest.TestCase):
             text, failures = told(self.expected, [*self.console[:-1], line, self.console[-1]])
             self.assertEqual(1, failures)
             self.assertIn(f"# {line}\n", text)
+
+
+class Recordings(unittest.TestCase):
+    COMMANDS = {"once": ["POWER-ON", "PMX_Init"], "twice": ["PMX_Init", "POWER-ON", "PMX_Init"]}
+
+    def told(self, console, says):
+        with tempfile.TemporaryDirectory() as directory:
+            program = pathlib.Path(directory, "program")
+            program.write_text(f"#!/bin/sh\necho '{says}'\n", encoding="utf-8")
+            program.chmod(0o755)
+            shown = io.StringIO()
+            with contextlib.redirect_stdout(shown):
+                ktap = run.Ktap()
+                run.replays(ktap, "t", program, self.COMMANDS, console, pathlib.Path(directory, "made"))
+        return shown.getvalue()
+
+    def test_every_power_on_has_a_recording_that_replays(self):
+        packed = base64.b64encode(gzip.compress(b"recording")).decode()
+        once, twice = (["RECORDING " + name, packed, "RECORDED"] for name in self.COMMANDS)
+        equal = "equal: 1 operations, 2 calls"
+        self.assertEqual("ok 1 t replayed once\nok 2 t replayed twice\n",
+                         self.verdicts([*once, *twice, *twice], equal))
+        for console, found in (([*once, *twice], 1), ([*once, *twice, *twice[:2]], 1), ([*once, *(3 * twice)], 3),
+                               (once, 0)):
+            text = self.told(console, equal)
+            self.assertIn("not ok 2 t replayed twice", text)
+            self.assertIn(f"# {found} recordings of 2\n", text)
+        for other in ("departs at event 3 of 4", "equal: 0 operations, 0 calls"):
+            self.assertEqual("not ok 1 t replayed once\nnot ok 2 t replayed twice\n",
+                             self.verdicts([*once, *twice, *twice], other))
+
+    def verdicts(self, console, says):
+        return "".join(re.findall(r"^(?:not )?ok .*\n", self.told(console, says), re.M))
+
+    def test_a_machine_that_lacks_processors(self):
+        for told, expected in ((["PROCESSORS 2"], 0), (["PROCESSORS 1"], 1), ([], 1)):
+            with contextlib.redirect_stdout(io.StringIO()):
+                ktap = run.Ktap()
+                run.has_processors(ktap, told)
+            self.assertEqual(expected, ktap.failures)
 
 
 class RealTime(unittest.TestCase):

@@ -52,6 +52,11 @@ class Recording:
         found = [(i, event) for i, event in enumerate(self.events()) if event[1::2] == (kind, listed.index(name))]
         return found[-1 if last else 0]
 
+    def argument(self, name):
+        """(number of the event, place of the second argument) of a function's first call."""
+        at, began = self.begin(name)
+        return at, began[0] + 4
+
     def answer(self, name, last=False):
         """(number of the event in which it is answered, from 0; place of the answer) of such a call."""
         events = list(self.events())

@@ -133,6 +133,8 @@ static int iPrint(const char* szFile)
     PMX_Printf(0, "%ld%% and %5s, %%s %%d", 12345678L, "so");
     PMX_Printf(0, "%.8s %.*s.", pcOfPage("12345678"), 4, pcOfPage("1234"));
     PMX_Printf(2, pcOfPage(""), "nobody reads that");
+    PMX_Printf(-1, pcOfPage(""), "nor this");
+    PMX_Printf(32, pcOfPage(""), "nor this");
     vPrintLong();
     return 0;
 }

@@ -253,8 +253,8 @@ class Replay(unittest.TestCase):
         subprocess.run([PRODUCT, "print", self.file], check=True, timeout=60, stdout=subprocess.DEVNULL)
         told = self.events()
         printed = [one["text"] for one in told if one.get("function") == "PMX_Printf" and one["kind"] == "operation"]
-        self.assertEqual('PMX_Printf(2, ""...)', printed[4])
-        kept = [re.findall(r'"([^"]*)"(\.\.\.)?', text) for text in printed[5:]]
+        self.assertEqual([f'PMX_Printf({level}, ""...)' for level in (2, -1, 32)], printed[4:7])
+        kept = [re.findall(r'"([^"]*)"(\.\.\.)?', text) for text in printed[7:]]
         self.assertEqual([[(300 * "f" + "%s.", ""), (200 * "v", "")],
                           [("%s%s", ""), (500 * "a", ""), (388 * "b", "...")],
                           [("%d" + 509 * "c", "...")]], kept)

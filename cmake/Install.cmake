@@ -58,7 +58,7 @@ if(PMX_LINE_EDITOR AND LIBEDIT_LIBRARY)
 endif()
 if(TARGET pmx_picture)
     find_package(PNG QUIET)
-    list(APPEND libraries pixman= libpng=${PNG_VERSION_STRING})
+    list(APPEND libraries pixman= libpng=${PNG_VERSION_STRING} libsixel=)
 endif()
 list(JOIN libraries " " libraries)
 install(CODE "

@@ -28,6 +28,7 @@ LIBRARIES = {
     "libedit": ("BSD-3-Clause", "DYNAMIC_LINK", (TOOL,)),
     "pixman": ("MIT", "DYNAMIC_LINK", (TOOL, BOARD)),
     "libpng": ("libpng-2.0", "DYNAMIC_LINK", (TOOL, BOARD)),
+    "libsixel": ("MIT", "DYNAMIC_LINK", (TOOL,)),
 }
 
 

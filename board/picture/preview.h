@@ -10,6 +10,9 @@
 namespace board::picture
 {
 
+/** As many as fit any terminal. */
+inline constexpr int preview_columns = 64;
+
 /** Lines of so many columns, each ending with a line feed: in colour, two pixels one above the other in each character
  *  of a terminal; without it, how light the picture is there. */
 std::string preview(const Image& image, int columns, bool colour);

@@ -52,6 +52,7 @@ class BashCompletion(unittest.TestCase):
         self.assertEqual(formats, self.completed("run", "--trace-format", ""))
         self.assertEqual({"auto", "always"}, self.completed("state", "--color", "a"))
         self.assertEqual({"never"}, self.completed("modes", "--colour", "n"))
+        self.assertEqual({"sixel"}, self.completed("run", "--graphics", "s"))
 
     def test_names(self):
         self.assertEqual({"PMX_SetTvType"}, self.completed("run", "--op", "PMX_SetTvT"))

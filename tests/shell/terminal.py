@@ -19,9 +19,11 @@ PROMPT = "pmx> "
 class Terminal:
     """A shell on a terminal of its own."""
 
-    def __init__(self, program, home, *arguments, columns=80, rows=24, prepare=None, **environment):
+    def __init__(self, program, home, *arguments, columns=80, rows=24, pixels=0, command="shell", prepare=None,
+                 **environment):
         variables = {name: value for name, value in os.environ.items()
-                     if name not in ("XDG_STATE_HOME", "PMXBOARD_HISTORY", "EDITRC")}
+                     if name not in ("XDG_STATE_HOME", "PMXBOARD_HISTORY", "PMXBOARD_GRAPHICS", "KITTY_WINDOW_ID",
+                                     "EDITRC")}
         variables |= {"TERM": "xterm", "HOME": str(home), "NO_COLOR": "1"}
         for name, value in environment.items():
             if value is None:
@@ -34,10 +36,10 @@ class Terminal:
         if self.process == 0:
             try:
                 # The size has to be there before the first look at it.
-                fcntl.ioctl(1, termios.TIOCSWINSZ, struct.pack("HHHH", rows, columns, 0, 0))
+                fcntl.ioctl(1, termios.TIOCSWINSZ, struct.pack("HHHH", rows, columns, pixels, 0))
                 if prepare:
                     prepare()
-                os.execve(program, [program, "shell", *arguments], variables)
+                os.execve(program, [program, command, *arguments], variables)
             finally:
                 os._exit(127)
 

@@ -47,7 +47,7 @@ NOT_IN_THE_LAYER = [
 # The wings of the tool, from the bottom up: a file includes what stands in its own wing or further down.
 TOOL = "tools/pmxboard/"
 WINGS = ("files", "text", "functions", "reasons", "state", "recording", "view", "language", "prompt", "decode",
-         "report", "commands")
+         "report", "graphics", "commands")
 INCLUDE = re.compile(r'^#include "tools/pmxboard/(\w+)/', re.M)
 
 

@@ -16,10 +16,18 @@ DESCRIPTION_COLUMN = 30  # of the help
 ENTRY = re.compile(r"  (\S.*?)(?: {2,}(\S.*))?$")
 
 ENVIRONMENT_AND_FILES = r""".Sh ENVIRONMENT
-.Bl -tag -width PMXBOARD_HISTORY
+.Bl -tag -width PMXBOARD_GRAPHICS
+.It Ev KITTY_WINDOW_ID
+Where it is set the terminal takes pictures as kitty does.
 .It Ev NO_COLOR
 When it is set and not empty, there is no colour but with
 .Fl -color Cm always .
+.It Ev PMXBOARD_GRAPHICS
+How
+.Cm shot
+draws, where
+.Fl -graphics
+does not say it.
 .It Ev PMXBOARD_HISTORY
 The file in which the shell keeps its history; empty for none.
 .It Ev TERM
@@ -91,7 +99,7 @@ def sentences(text):
 
 def flag(entry):
     """(names, value, what else is needed) of an option as its help shows it."""
-    shown, _, needed = entry.partition(" Needs: ")
+    shown, _, needed = re.sub(r" \(Env:\w+\)", "", entry).partition(" Needs: ")
     names, _, value = shown.partition(" ")
     return names.split(","), value.removesuffix(" ...").replace(" REQUIRED", ""), needed
 

@@ -86,7 +86,8 @@ _pmxboard()
         _pmxboard_files "$word" '*.toml' ;;
     --against) _pmxboard_files "$word" '*.pmx' ;;
     --trace-file | --junit | -o | --output) _pmxboard_files "$word" '*' ;;
-    --trace-format | --color | --colour) _pmxboard_take "$word" < <(_pmxboard_values "$tool" "$sub" "$previous") ;;
+    --trace-format | --color | --colour | --graphics)
+        _pmxboard_take "$word" < <(_pmxboard_values "$tool" "$sub" "$previous") ;;
     *)
         if [[ $word == -* ]]
         then

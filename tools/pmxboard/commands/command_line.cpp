@@ -46,6 +46,16 @@ void add_colour(CLI::App* sub, std::string& when)
         ->type_name("auto|always|never");
 }
 
+/** --graphics, for every sub-command that carries out `shot`; see drawing(). */
+void add_graphics(CLI::App* sub, std::string& how)
+{
+    sub->add_option("--graphics", how,
+                    "How shot draws: auto (as well as a terminal can), none (without colour), blocks, sixel or kitty")
+        ->envname("PMXBOARD_GRAPHICS")
+        ->check(CLI::IsMember({ "auto", "none", "blocks", "sixel", "kitty" }).description(""))
+        ->type_name("auto|none|blocks|sixel|kitty");
+}
+
 /** The parser's own help, its descriptions folded to 80 columns. Examples stay as they are, for they are copied. */
 std::string folded_help(const CLI::App* app, const std::string& name, CLI::AppFormatMode mode)
 {
@@ -108,6 +118,7 @@ void add_run(CLI::App& app, Chosen& chosen)
     sub->add_flag("--stores", run->stores, "Show what is stored into the layer's record between two calls");
     add_filter(sub, run->only, run->operations);
     add_colour(sub, run->colour);
+    add_graphics(sub, run->graphics);
     sub->add_flag("-q,--quiet", run->quiet, "Show failures only");
     sub->add_flag("-v,--verbose", run->verbose, "Show arguments by name, and expectations");
     sub->footer(run_examples);
@@ -150,6 +161,7 @@ void add_shell(CLI::App& app, Chosen& chosen)
         ->type_name("NAME|FILE");
     add_filter(sub, shell->only, shell->operations);
     add_colour(sub, shell->colour);
+    add_graphics(sub, shell->graphics);
     sub->add_flag("-q,--quiet", shell->quiet, "Show failures only");
     sub->add_flag("-v,--verbose", shell->verbose, "Show arguments by name, and expectations");
     sub->footer(shell_examples);

@@ -12,6 +12,7 @@
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/commands/junit.h"
 #include "tools/pmxboard/files/new_file.h"
+#include "tools/pmxboard/graphics/drawing.h"
 #include "tools/pmxboard/language/runner.h"
 #include "tools/pmxboard/text/paint.h"
 
@@ -161,6 +162,7 @@ int run_files(const RunOptions& run)
     output.to = &std::cout;
     output.filter = { run.only, run.operations };
     output.stores = run.stores;
+    output.draw = drawing(run.graphics, output.colour);
     if (const std::string wrong = complaint(run, output); !wrong.empty())
         return usage_error(wrong);
     try

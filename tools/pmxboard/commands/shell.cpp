@@ -15,6 +15,7 @@
 #include "tools/pmxboard/files/ending.h"
 #include "tools/pmxboard/files/new_file.h"
 #include "tools/pmxboard/functions/errors.h"
+#include "tools/pmxboard/graphics/drawing.h"
 #include "tools/pmxboard/language/runner.h"
 #include "tools/pmxboard/language/session.h"
 #include "tools/pmxboard/language/verbs.h"
@@ -36,7 +37,7 @@ class Shell
 {
 public:
     Shell(const ShellOptions& options, LineSource& lines, bool interactive)
-        : m_lines(lines), m_interactive(interactive), m_output(output_options(options, interactive)),
+        : m_lines(lines), m_interactive(interactive), m_output(output_options(options, lines, interactive)),
           m_session(m_output, options.board.empty() ? "default" : options.board, "."), m_look{
               text_width(), wants_colour(options.colour)
           }
@@ -103,7 +104,7 @@ private:
         return false;
     }
 
-    static OutputOptions output_options(const ShellOptions& shell, bool interactive)
+    static OutputOptions output_options(const ShellOptions& shell, LineSource& lines, bool interactive)
     {
         OutputOptions output;
         output.quiet = shell.quiet;
@@ -112,6 +113,10 @@ private:
         output.echo = !interactive;
         output.to = &std::cout;
         output.filter = { shell.only, shell.operations };
+        GiveBack give_back;
+        if (interactive && has_editor())
+            give_back = [&lines](const std::string& keys) { lines.take_back(keys); };
+        output.draw = drawing(shell.graphics, output.colour, give_back);
         return output;
     }
 

@@ -37,7 +37,6 @@ namespace picture = board::picture;
 constexpr unsigned usual_tolerance = 2; ///< what conversions of eight bits leave, one behind the other
 /** Enough for a Y4M's first frame, and for a PNG of sixteen bits that cannot be packed. */
 constexpr std::size_t most_of_file = 160 * board::files::mebibyte;
-constexpr int preview_columns = 64;
 constexpr std::string_view card = "card";
 /** What a source shows without a file, but for one colour. */
 constexpr std::array<std::string_view, 4> patterns = { "bars", "ramp", "checker", card };
@@ -162,6 +161,15 @@ std::string colour_text(picture::Pixel pixel)
     return level(0) + "," + level(1) + "," + level(2);
 }
 
+/** Nothing where nobody looks: a terminal would be asked for it. */
+std::string drawn(const Output& output, const picture::Image& image)
+{
+    if (!output.for_people())
+        return "";
+    const Drawing& draw = output.drawing();
+    return draw ? draw(image) : picture::preview(image, picture::preview_columns, output.look().colour);
+}
+
 /** Beside the picture that was expected, by a line that is carried out and not imagined; what cannot be written is no
  *  matter then. */
 std::string keep_difference(const Session& session, const std::filesystem::path& file, const picture::Image& shown)
@@ -220,8 +228,7 @@ void take_shot(Session& session, const Words& words)
     const Seen seen = seen_in_size(words, size);
     if (!to_file)
     {
-        session.output().text("  " + seen.description + "\n" +
-                              picture::preview(seen.image, preview_columns, session.output().look().colour));
+        session.output().text("  " + seen.description + "\n" + drawn(session.output(), seen.image));
         return;
     }
     const std::string name = file_name(words.at("FILE"));
@@ -322,8 +329,8 @@ std::vector<Verb> picture_verbs()
     return {
         { "shot",
           { { "shot OUTPUT",
-              "show in characters what a viewer sees on an output, which is also called `ccir`, `cav`; `shot all` "
-              "shows the four of them",
+              "show what a viewer sees on an output, which is also called `ccir`, `cav`, in characters where the "
+              "terminal takes no pictures; `shot all` shows the four of them",
               take_shot, looks },
             { "shot OUTPUT FILE [SIZE]",
               "write it to a PNG, relative to where the tool runs, as large as it is, all four as 960x540, or in "

@@ -116,6 +116,8 @@ public:
         return line;
     }
 
+    void take_back(const std::string& keys) override { el_push(m_editor, keys.c_str()); }
+
     void remember(const std::string& line) override
     {
         HistEvent event{};

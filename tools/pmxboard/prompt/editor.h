@@ -25,6 +25,8 @@ public:
 
     /** The next line; nothing at the end. */
     virtual std::optional<std::string> read() = 0;
+    /** Keys that somebody else has read are the next to be read, where there is an editor. */
+    virtual void take_back(const std::string&) {}
     /** Keep a line in the history. */
     virtual void remember(const std::string&) {}
 };

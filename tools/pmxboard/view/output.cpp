@@ -38,6 +38,7 @@ void Output::imagine(std::ostream& to)
     const bool as_lines = for_programs();
     m_options.to = &to;
     m_options.trace_to = nullptr;
+    m_options.draw = {}; // what is imagined asks nobody
     show_trace_as(as_lines ? "jsonl" : "text");
     m_trace_shown = true;
 }

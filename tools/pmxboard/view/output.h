@@ -5,6 +5,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <iosfwd>
 #include <memory>
 #include <string>
@@ -19,8 +20,16 @@
 #include "tools/pmxboard/view/trace_filter.h"
 #include "tools/pmxboard/view/trace_sink.h"
 
+namespace board::picture
+{
+class Image;
+}
+
 namespace pmxboard
 {
+
+/** Draws a picture where people read: whole lines. */
+using Drawing = std::function<std::string(const board::picture::Image&)>;
 
 struct OutputOptions
 {
@@ -33,6 +42,7 @@ struct OutputOptions
     std::ostream* trace_to = nullptr; ///< where the trace goes when that is somewhere else
     TraceFilter filter = {};
     bool stores = false; ///< what is stored into the layer's objects stands in the trace
+    Drawing draw = {};   ///< how pictures are drawn; empty: in characters
 };
 
 class Output
@@ -59,6 +69,9 @@ public:
 
     /** How a text for people is to look. */
     Look look() const { return { text_width(), m_options.colour }; }
+
+    /** How pictures are drawn; empty: in characters. */
+    const Drawing& drawing() const { return m_options.draw; }
 
     void powered_on();
     void refusal(const std::string& sentence) { m_trace->refusal(sentence); }

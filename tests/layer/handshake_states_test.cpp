@@ -27,6 +27,12 @@ Graph explore_with(std::vector<Event> others)
     return handshake::explore(events);
 }
 
+const Graph& graph_with_lifecycle()
+{
+    static const Graph graph = handshake::explore(handshake::events_with_lifecycle());
+    return graph;
+}
+
 struct NamedState
 {
     std::string name;
@@ -64,6 +70,13 @@ void lower(State& state)
         mix(state);
 }
 
+/** The timer that the layer forgets runs on. */
+void reset(State& state)
+{
+    state.old_armed = state.old_armed || state.armed;
+    state.flag = state.owed = state.timer_set = state.armed = state.has_timer = state.mode_set = false;
+}
+
 void set_mode(State& state, bool hdmi_changed, bool sink)
 {
     const bool everything = !state.mode_set; // the first mode after a reset
@@ -92,7 +105,7 @@ State meant(State state, Event event)
         set_mode(state, true, true);
         break;
     case Event::TimerRunsOut:
-        state.armed = false;
+        (state.old_armed ? state.old_armed : state.armed) = false;
         state.timer_set = false;
         lower(state);
         break;
@@ -102,7 +115,21 @@ State meant(State state, Event event)
         if (state.owed)
             mix(state);
         break;
-    case Event::Reset: state.flag = state.owed = state.timer_set = state.has_timer = state.mode_set = false; break;
+    case Event::Reset: reset(state); break;
+    case Event::ShutDown:
+    case Event::ShutDownWithResult:
+        if (state.started)
+            state.armed = state.has_timer = false; // its timer is deleted
+        state.started = false;
+        break;
+    case Event::Stop: state.started = false; break;
+    case Event::Start:
+        if (!state.started)
+        {
+            reset(state);
+            state.has_timer = state.started = true;
+        }
+        break;
     case Event::OsdEnableFlagSet:
     case Event::OsdEnableFlagCleared: state.owed = event == Event::OsdEnableFlagSet; break;
     }
@@ -223,9 +250,9 @@ TEST(HandshakeStates, Reset_WhileHeldBack_OnlyTheForgottenTimerBringsGraphicsBac
 {
     Bench bench;
     bench.run({ { Event::FlagRaised, Event::ModeHdmiChanged, Event::Reset } });
-    EXPECT_EQ("Forgotten, timer armed, no timer, no mode set", full_name(bench.state()));
+    EXPECT_EQ("Forgotten, old timer armed, no timer, no mode set", full_name(bench.state()));
     bench.run(Event::SetOsdEnable);
-    EXPECT_EQ("Forgotten, timer armed, no timer, no mode set", full_name(bench.state()));
+    EXPECT_EQ("Forgotten, old timer armed, no timer, no mode set", full_name(bench.state()));
     bench.run(Event::TimerRunsOut);
     EXPECT_EQ("Ready, no timer, no mode set", full_name(bench.state()));
 }
@@ -239,4 +266,119 @@ TEST(HandshakeStates, Reset_ThenHeldBack_NoTimerEndsTheWait)
     EXPECT_EQ("Held back, T, timer not armed, no timer", full_name(bench.state()));
     bench.run(Event::FlagLowered);
     EXPECT_EQ("Ready, T, timer not armed, no timer", full_name(bench.state()));
+}
+
+TEST(HandshakeStates, Reset_WhileTheReturnIsOwedAndNoTimerRuns_NobodyBringsGraphicsBack)
+{
+    Bench bench;
+    bench.run({ { Event::FlagRaised, Event::ModeHdmiChanged, Event::WaitForSync, Event::TimerRunsOut, Event::Reset,
+                  Event::SyncThere, Event::SetOsdEnable } });
+    board::advance(std::chrono::hours(1));
+    EXPECT_EQ("Forgotten, no timer, no mode set", full_name(bench.state()));
+}
+
+TEST(HandshakeStates, ShutDown_WhileHeldBack_TheTimerGoesAndOnlyTheDisplayPartIsLeft)
+{
+    for (const Event way : { Event::ShutDown, Event::ShutDownWithResult })
+    {
+        Bench bench;
+        bench.run({ { Event::FlagRaised, Event::ModeHdmiChanged, way } });
+        board::advance(std::chrono::hours(1));
+        EXPECT_EQ("Held back, T, timer not armed, no timer, not started", full_name(bench.state())) << name(way);
+        bench.run(Event::FlagLowered);
+        EXPECT_EQ(handshake::osd_planes, bench.state().mixed) << name(way);
+    }
+}
+
+TEST(HandshakeStates, StartAfterAShutDownWhileHeldBack_NobodyBringsGraphicsBack)
+{
+    for (const Event way : { Event::ShutDown, Event::ShutDownWithResult })
+    {
+        Bench bench;
+        bench.run({ { Event::FlagRaised, Event::ModeHdmiChanged, way, Event::Start, Event::SetOsdEnable } });
+        board::advance(std::chrono::hours(1));
+        EXPECT_EQ("Forgotten, no mode set", full_name(bench.state())) << name(way);
+        // Nor does a change that nobody announces.
+        bench.run(Event::ModeHdmiChanged);
+        EXPECT_EQ("Forgotten", full_name(bench.state())) << name(way);
+        // One that the display part announces does, when it ends, however that is.
+        bench.run({ { Event::FlagRaised, Event::ModeHdmiChanged, Event::TimerRunsOut } });
+        EXPECT_EQ("Ready", full_name(bench.state())) << name(way);
+    }
+}
+
+TEST(HandshakeStates, StartAfterStopWhileHeldBack_TheTimerBeforeBringsGraphicsBack)
+{
+    Bench bench;
+    bench.run({ { Event::FlagRaised, Event::ModeHdmiChanged, Event::Stop, Event::Start } });
+    EXPECT_EQ("Forgotten, old timer armed, no mode set", full_name(bench.state()));
+    bench.run(Event::TimerRunsOut);
+    EXPECT_EQ("Ready, no mode set", full_name(bench.state()));
+}
+
+TEST(HandshakeStates, Lifecycle_LeadsWhereItIsMeantTo)
+{
+    expect_as_meant(handshake::explore(handshake::all_events()));
+    const Graph graph = explore_with({ Event::ShutDown, Event::Start });
+    EXPECT_EQ("flag raised > mode: HDMI changed > PMX_Uninit > PMX_Init", witness(graph, 'a'));
+}
+
+TEST(HandshakeStates, Lifecycle_WithoutTheDisplayPart_GraphicsComeBackUnlessTheyAreLeftAlone)
+{
+    const Graph& graph = graph_with_lifecycle();
+    Bench bench;
+    for (const State& state : graph.states)
+    {
+        bench.put(state);
+        while (bench.possible(Event::TimerRunsOut))
+            bench.run(Event::TimerRunsOut);
+        bench.run(Event::SyncThere);
+        bench.run(Event::SetOsdEnable);
+        EXPECT_EQ(left_alone(state) ? 0 : handshake::osd_planes, bench.state().mixed) << full_name(state);
+        bench.run(Event::FlagLowered);
+        EXPECT_EQ(handshake::osd_planes, bench.state().mixed) << full_name(state);
+    }
+}
+
+TEST(HandshakeStates, Lifecycle_FromStatesReachedByEventsAlone_LeadsToTheSame)
+{
+    const Graph& graph = graph_with_lifecycle();
+    Bench bench;
+    std::size_t compared = 0;
+    for (std::size_t i = 0; i < graph.transitions.size(); i += 13) // every event, from many states
+    {
+        const Transition& transition = graph.transitions[i];
+        bench.restart();
+        bench.run(graph.paths.at(transition.from));
+        ASSERT_EQ(full_name(transition.from), full_name(bench.state()));
+        // Started just behind one that has run out by now, a timer may run out within the next operation, which sleeps.
+        if (bench.runs_out_within(std::chrono::milliseconds(10)))
+            continue;
+        bench.run(transition.event);
+        EXPECT_EQ(full_name(transition.to), full_name(bench.state()))
+            << name(transition.event) << " in " << full_name(transition.from);
+        ++compared;
+    }
+    EXPECT_LT(graph.transitions.size() / 20, compared);
+}
+
+TEST(HandshakeStates, GraphicsAreLeftAlone_ByTheseEventsAndNoOthers)
+{
+    std::set<std::string> causes;
+    for (const Transition& transition : graph_with_lifecycle().transitions)
+    {
+        if (!left_alone(transition.from) && left_alone(transition.to))
+            causes.insert(name(transition.event) + " in " + name(transition.from));
+    }
+    EXPECT_EQ((std::set<std::string>{
+                  "PMX_Init in Held back, return owed",
+                  "PMX_Init in Released, video plane waiting",
+                  "PMX_Reset in Held back, return owed",
+                  "PMX_Reset in Released, video plane waiting",
+                  "PMX_Uninit in Held back",
+                  "i4PMX_Uninit in Held back",
+                  "mode: HDMI changed in Display part switching",
+                  "mode: HDMI unchanged in Display part switching",
+              }),
+              causes);
 }

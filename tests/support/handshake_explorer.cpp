@@ -2,7 +2,7 @@
 #include "tests/support/handshake_explorer.h"
 
 #include <algorithm>
-#include <chrono>
+#include <set>
 #include <stdexcept>
 
 #include "board/board.h"
@@ -13,6 +13,7 @@
 #include "drv_av_d.h"
 #include "pmx_hal.h"
 #include "tools/record_view/record_view.h"
+#include "u_os.h"
 
 namespace handshake
 {
@@ -22,11 +23,50 @@ namespace
 constexpr std::chrono::seconds timer_interval{ 10 };
 constexpr UINT32 timer_interval_ms = 10000;
 
+struct Timer
+{
+    HANDLE_T handle = 0;
+    bool running = false;
+    std::chrono::microseconds expiry{};
+};
+
+std::vector<Timer> timers()
+{
+    std::vector<Timer> found;
+    const board::Value state = board::timers::state();
+    for (const board::Value& timer : state.items())
+    {
+        const bool running = timer.find("running")->as_number() != 0;
+        found.push_back({ static_cast<HANDLE_T>(timer.find("handle")->as_number()), running,
+                          std::chrono::microseconds(running ? timer.find("expiry_us")->as_number() : 0) });
+    }
+    return found;
+}
+
+bool is_known(const Timer& timer)
+{
+    return timer.handle == _arPmxDispPartStatus.hPMXTimer;
+}
+
 bool timer_running()
 {
-    const board::Value timers = board::timers::state();
-    return std::any_of(timers.items().begin(), timers.items().end(),
-                       [](const board::Value& timer) { return timer.find("running")->as_number() != 0; });
+    const std::vector<Timer> all = timers();
+    return std::any_of(all.begin(), all.end(), [](const Timer& timer) { return timer.running; });
+}
+
+/** Let those run out that the layer no longer knows; when there are none, the one that it knows. */
+void run_timers_out()
+{
+    std::chrono::microseconds old{};
+    std::chrono::microseconds known{};
+    for (const Timer& timer : timers())
+    {
+        if (timer.running)
+            (is_known(timer) ? known : old) = std::max(is_known(timer) ? known : old, timer.expiry);
+    }
+    const std::chrono::microseconds last = old.count() != 0 ? old : known;
+    if (last.count() != 0)
+        board::advance(last - board::now());
 }
 
 bool touches_other_planes(const board::TraceEntry& entry)
@@ -51,6 +91,27 @@ void answer_at_once(const board::TraceEntry& entry)
 {
     if (entry.function == "fgPmxDrvSetAvd" && entry.arguments.at(0).value.as_number() == PMX_SET_HDMI_RES_CHG)
         PMX_SetFormatChangeFlag(FALSE);
+}
+
+std::vector<Event> events_up_to(Event last)
+{
+    std::vector<Event> events;
+    for (int event = 0; event <= static_cast<int>(last); ++event)
+        events.push_back(static_cast<Event>(event));
+    return events;
+}
+
+std::string letters(const State& state)
+{
+    const std::pair<char, bool> letters[] = {
+        { 'F', state.flag },      { 'E', state.owed },       { 'T', state.timer_set }, { 'A', state.armed },
+        { 'W', state.waiting },   { 'M', state.mixed != 0 }, { 'H', state.has_timer }, { 'S', state.mode_set },
+        { 'O', state.old_armed }, { 'I', state.started },
+    };
+    std::string text;
+    for (const auto& [letter, is_set] : letters)
+        text += (text.empty() ? "" : " ") + std::string(1, letter) + (is_set ? "1" : "0");
+    return text;
 }
 
 } // namespace
@@ -79,10 +140,14 @@ std::string full_name(const State& state)
         text += state.armed ? ", timer armed" : ", timer not armed";
     if (state.waiting)
         text += ", waiting";
+    if (state.old_armed)
+        text += ", old timer armed";
     if (!state.has_timer)
         text += ", no timer";
     if (!state.mode_set)
         text += ", no mode set";
+    if (!state.started)
+        text += ", not started";
     return text;
 }
 
@@ -101,6 +166,10 @@ std::string name(Event event)
         { Event::SyncThere, "video plane has its sync" },
         { Event::SetOsdEnable, "PMX_SetOsdEnable" },
         { Event::Reset, "PMX_Reset" },
+        { Event::ShutDown, "PMX_Uninit" },
+        { Event::ShutDownWithResult, "i4PMX_Uninit" },
+        { Event::Stop, "PMX_Stop" },
+        { Event::Start, "PMX_Init" },
         { Event::OsdEnableFlagSet, "PMX_SetOsdEnableFlag(TRUE)" },
         { Event::OsdEnableFlagCleared, "PMX_SetOsdEnableFlag(FALSE)" },
     };
@@ -109,10 +178,17 @@ std::string name(Event event)
 
 std::vector<Event> ordinary_events()
 {
-    std::vector<Event> events;
-    for (int event = 0; event <= static_cast<int>(Event::SetOsdEnable); ++event)
-        events.push_back(static_cast<Event>(event));
-    return events;
+    return events_up_to(Event::SetOsdEnable);
+}
+
+std::vector<Event> events_with_lifecycle()
+{
+    return events_up_to(Event::Start);
+}
+
+std::vector<Event> all_events()
+{
+    return events_up_to(Event::OsdEnableFlagCleared);
 }
 
 Bench::Outputs Bench::first_outputs()
@@ -144,22 +220,36 @@ State Bench::state() const
 {
     const PMX_DISPLAY_PART_STATUS_T& status = _arPmxDispPartStatus;
     State state;
+    bool has_timer = false;
     state.flag = status.fgPmxFormatChangeFlag != 0;
     state.owed = status.fgPmxEnabeOsdFlag != 0;
     state.timer_set = status.fgTimerAlreadySet != 0;
-    state.armed = timer_running();
+    for (const Timer& timer : timers())
+    {
+        (is_known(timer) ? state.armed : state.old_armed) |= timer.running;
+        has_timer |= is_known(timer);
+    }
     state.waiting = fgVdpIsWaitforSyncCtrl() != 0;
     state.mixed = 0;
     for (UCHAR plane = DRV_PMX_PLANE_3; plane <= DRV_PMX_PLANE_7; ++plane)
         state.mixed |= static_cast<std::uint8_t>(fgPmxHalMixPlane(0, plane) != 0 ? 1u << plane : 0u);
-    state.has_timer = status.hPMXTimer == m_timer;
+    state.has_timer = has_timer;
     state.mode_set = record_view::get("fgSetModeCalled").as_number() != 0;
+    state.started = record_view::get("_PmxInitiated").as_number() != 0;
     return state;
 }
 
 bool Bench::possible(Event event) const
 {
     return event != Event::TimerRunsOut || timer_running();
+}
+
+bool Bench::runs_out_within(std::chrono::microseconds duration) const
+{
+    const std::vector<Timer> all = timers();
+    return std::any_of(all.begin(), all.end(), [duration](const Timer& timer) {
+        return timer.running && timer.expiry <= board::now() + duration;
+    });
 }
 
 bool Bench::run(Event event)
@@ -174,11 +264,15 @@ bool Bench::run(Event event)
     case Event::ModeNoSink:
     case Event::ModeFlagClear:
     case Event::ModeRefused: set_mode(event); break;
-    case Event::TimerRunsOut: board::advance(timer_interval); break;
+    case Event::TimerRunsOut: run_timers_out(); break;
     case Event::WaitForSync:
     case Event::SyncThere: board::video_planes::set_waiting_for_sync(event == Event::WaitForSync); break;
     case Event::SetOsdEnable: PMX_SetOsdEnable(); break;
     case Event::Reset: PMX_Reset(0); break;
+    case Event::ShutDown: PMX_Uninit(); break;
+    case Event::ShutDownWithResult: i4PMX_Uninit(0); break;
+    case Event::Stop: PMX_Stop(); break;
+    case Event::Start: PMX_Init(); break;
     case Event::OsdEnableFlagSet:
     case Event::OsdEnableFlagCleared: PMX_SetOsdEnableFlag(event == Event::OsdEnableFlagSet ? TRUE : FALSE); break;
     }
@@ -210,8 +304,27 @@ void Bench::set_mode(Event event)
     board::hdmi_av::plug(true);
 }
 
+/** What shutting down and starting again have deleted and created, as it was; starting would take much longer. */
+void Bench::undo_lifecycle()
+{
+    bool has_timer = false;
+    for (const Timer& timer : timers())
+    {
+        if (timer.handle == m_timer)
+            has_timer = true;
+        else
+            x_timer_delete(timer.handle);
+    }
+    if (!has_timer)
+        x_timer_create(&m_timer);
+    if (MutexPMX == 0)
+        x_sema_create(&MutexPMX, X_SEMA_TYPE_MUTEX, 1);
+    record_view::set("_PmxInitiated", 1);
+}
+
 void Bench::restart()
 {
+    undo_lifecycle();
     _arPmxDispPartStatus = { m_timer, FALSE, FALSE, FALSE };
     board::video_planes::set_waiting_for_sync(false);
     if (timer_running())
@@ -226,6 +339,13 @@ void Bench::restart()
 void Bench::put(const State& state)
 {
     restart();
+    if (state.old_armed)
+    {
+        x_timer_create(&_arPmxDispPartStatus.hPMXTimer);
+        PMX_SetFormatChangeTimer(timer_interval_ms);
+        _arPmxDispPartStatus.hPMXTimer = m_timer;
+        board::advance(std::chrono::milliseconds(1)); // the layer's own is started later
+    }
     if (state.armed)
         PMX_SetFormatChangeTimer(timer_interval_ms);
     for (UCHAR plane = DRV_PMX_PLANE_3; plane <= DRV_PMX_PLANE_7; ++plane)
@@ -241,6 +361,8 @@ void Bench::put(const State& state)
         _arPmxDispPartStatus.hPMXTimer = 0;
     if (!state.mode_set)
         record_view::set("fgSetModeCalled", 0);
+    if (!state.started)
+        record_view::set("_PmxInitiated", 0);
     board::trace::clear();
     if (this->state() != state)
         throw std::logic_error(full_name(state) + " cannot be made");
@@ -283,16 +405,32 @@ std::string broken_rules(const State& state)
     std::string broken;
     if (out && !state.flag && !state.owed)
         broken += 'a';
-    if (out && !state.owed && !(state.flag && state.timer_set && state.armed))
+    if (out && !state.owed && !(state.flag && state.timer_set && (state.armed || state.old_armed)))
         broken += 'b';
-    if (state.timer_set != state.armed)
+    if (state.timer_set != (state.armed || state.old_armed))
         broken += 'c';
     return broken;
+}
+
+bool left_alone(const State& state)
+{
+    return state.mixed != osd_planes && !state.owed && !state.armed && !state.old_armed;
 }
 
 std::string broken_rules(const Transition& transition)
 {
     return broken_rules(transition.to) + (transition.other_planes ? "d" : "");
+}
+
+std::string table(const Graph& graph)
+{
+    std::set<std::string> lines;
+    for (const Transition& transition : graph.transitions)
+        lines.insert(letters(transition.from) + " | " + name(transition.event) + " | " + letters(transition.to) + "\n");
+    std::string text;
+    for (const std::string& line : lines)
+        text += line;
+    return text;
 }
 
 std::string witness(const Graph& graph, char rule)

@@ -5,6 +5,7 @@
 #pragma once
 
 #include <array>
+#include <chrono>
 #include <cstddef>
 #include <cstdint>
 #include <map>
@@ -26,11 +27,15 @@ struct State
     bool flag = false;      ///< F: raised by the display part and not lowered yet
     bool owed = false;      ///< E: the OSD planes are owed their return to the mix
     bool timer_set = false; ///< T: the layer takes its timer for armed
-    bool armed = false;     ///< the display timer is running
+    bool armed = false;     ///< the display timer that the layer knows is running
     bool waiting = false;   ///< the video plane driver waits for its sync control
     std::uint8_t mixed = osd_planes;
     bool has_timer = true; ///< the layer knows its timer; a reset forgets it
     bool mode_set = true;  ///< a mode was set since the last reset
+    /** Display timers are running that the layer no longer knows. What each of them does is the same, so that the last
+     *  one decides: they run out together. */
+    bool old_armed = false;
+    bool started = true;
 
     auto operator<=>(const State&) const = default;
 };
@@ -49,11 +54,15 @@ enum class Event
     ModeNoSink,        ///< PMX_SetModeEx with another HDMI resolution, no sink
     ModeFlagClear,     ///< as ModeHdmiChanged, and the display part lowers the flag before the call asks for it
     ModeRefused,       ///< PMX_SetModeEx with a format that no mixer has
-    TimerRunsOut,      ///< only while it is armed
+    TimerRunsOut,      ///< only while one is armed; those that the layer no longer knows were started earlier
     WaitForSync,
     SyncThere,
     SetOsdEnable,
     Reset,
+    ShutDown,           ///< PMX_Uninit
+    ShutDownWithResult, ///< i4PMX_Uninit
+    Stop,
+    Start, ///< PMX_Init
     OsdEnableFlagSet,
     OsdEnableFlagCleared
 };
@@ -61,6 +70,9 @@ std::string name(Event event);
 
 /** What a stack does to the handshake in its ordinary work: all up to SetOsdEnable. */
 std::vector<Event> ordinary_events();
+/** The same with resets, and with shutting down and starting: all up to Start. */
+std::vector<Event> events_with_lifecycle();
+std::vector<Event> all_events();
 
 /** A started mixer on a board of its own, with a first mode set. */
 class Bench
@@ -74,6 +86,8 @@ public:
     State state() const;
     /** Whether the event can happen now. */
     bool possible(Event event) const;
+    /** Whether a timer will have run out by then, if nobody stops it. */
+    bool runs_out_within(std::chrono::microseconds duration) const;
     /** Let it happen. @return whether a plane besides 2 to 6 was put into or taken out of the mix */
     bool run(Event event);
     void run(std::span<const Event> events);
@@ -88,6 +102,7 @@ public:
 
 private:
     void set_mode(Event event);
+    void undo_lifecycle();
 
     Outputs m_outputs;
     HANDLE_T m_timer = 0;
@@ -119,8 +134,15 @@ Graph explore(std::span<const Event> events);
  *  none: (a) an OSD plane is out of the mix only while F or E is set; (b) out with E clear: F and T are set and the
  *  timer is armed; (c) T is set exactly while the timer is armed. */
 std::string broken_rules(const State& state);
+/** Graphics are out, no timer is running, and no PMX_SetOsdEnable is owed that would bring them back: lowering the flag
+ *  alone does, if somebody does it. */
+bool left_alone(const State& state);
 /** The same of a state and of how it was reached: (d) no other plane is touched. */
 std::string broken_rules(const Transition& transition);
+
+/** All transitions in the order of their text, a line each: "F1 E0 T1 A1 W0 M0 H1 S1 O0 I1 | PMX_Uninit | F1 ...", with
+ *  A for armed, W waiting, M mixed, H has_timer, S mode_set, O old_armed, I started. */
+std::string table(const Graph& graph);
 
 /** A shortest sequence of events from Ready after which a rule does not hold: "flag raised > PMX_Reset"; "" when it
  *  always holds. */

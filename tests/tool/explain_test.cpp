@@ -378,6 +378,18 @@ TEST_F(Explain, WhyOsdTellsSinceWhenByWhomAndUntilWhen)
               "Record     outputs digital=off hdmi=720p50 component=off composite=576i at 50 Hz\n");
 }
 
+TEST_F(Explain, WhyOsdTellsWhoForgotGraphicsAndWhatBringsThemBack)
+{
+    carry_out({ "PMX_Init", "display-part never", "outputs hdmi=720p50 composite=576i", "PMX_Uninit" });
+    EXPECT_NE(shown_by("why osd").find("PMX_Uninit has deleted it"), std::string::npos);
+    carry_out({ "PMX_Init" });
+    const std::string shown = shown_by("why osd");
+    EXPECT_NE(shown.find("PMX_Init has forgotten that they were held back"), std::string::npos) << shown;
+    EXPECT_NE(shown.find("PMX_SetFormatChangeFlag(FALSE) brings them back"), std::string::npos) << shown;
+    carry_out({ "PMX_SetFormatChangeFlag FALSE" });
+    EXPECT_NE(shown_by("why osd").find("Graphics   shown"), std::string::npos);
+}
+
 TEST_F(Explain, WhyModeTellsWhichOutputDecided)
 {
     carry_out({ "PMX_Init", "outputs hdmi=720p50 composite=576i" });

@@ -146,6 +146,82 @@ TEST(Status, Graphics_InEachOtherState)
                        "advance 1500us\nadvance 1s\nstatus graphics"));
 }
 
+const std::string unanswered = std::string("PMX_Init\ndisplay-part never\n") + outputs_at_50;
+constexpr const char* forgotten =
+    "graphics: the record says that nothing waits, the hardware has planes 3 to 7 out of the mix";
+const std::string note = std::string("note: ") + forgotten + "\n";
+
+TEST(Status, Graphics_HeldBackAndNoTimer_WhoTookItAndWhatBringsThemBack)
+{
+    EXPECT_EQ("Graphics   held back by PMX_SetModeEx: planes 3 to 7 wait until the display part\n"
+              "           answers; no timer ends the wait: PMX_Uninit has deleted it, and\n"
+              "           PMX_Init would forget the wait. PMX_SetFormatChangeFlag(FALSE) brings\n"
+              "           them back\n",
+              shown_by(unanswered + "PMX_Uninit\nstatus graphics"));
+    EXPECT_EQ("PMX_Uninit", after(unanswered + "i4PMX_Uninit 0").graphics.lost_by);
+    EXPECT_EQ("Graphics   held back by PMX_SetModeEx: planes 3 to 7 wait until the display part\n"
+              "           answers; no timer ends the wait: the layer has none since PMX_Reset.\n"
+              "           PMX_SetFormatChangeFlag(FALSE) brings them back\n",
+              shown_by(std::string("PMX_Init\nPMX_Reset 0\ndisplay-part never\n") + outputs_at_50 + "status graphics"));
+    EXPECT_EQ(std::nullopt, after(unanswered + "PMX_Stop").graphics.lost_by) << "the timer runs on";
+    EXPECT_EQ(State::Shown, after(unanswered + "PMX_Uninit\nPMX_SetFormatChangeFlag FALSE").graphics.state);
+}
+
+TEST(Status, Graphics_Forgotten_WhoForgotThemAndWhatBringsThemBack)
+{
+    const std::string restarted = unanswered + "PMX_Uninit\nPMX_Init\n";
+    EXPECT_EQ("Graphics   planes 3 to 7 out of the mix, and nothing is announced that brings\n"
+              "           them back: PMX_Init has forgotten that they were held back.\n"
+              "           PMX_SetFormatChangeFlag(FALSE) brings them back, or the end of the\n"
+              "           next change that the display part announces\n" +
+                  note,
+              shown_by(restarted + "status graphics"));
+    EXPECT_EQ(std::vector<std::string>{ forgotten }, after(restarted).disagreements);
+    EXPECT_TRUE(run(restarted).shown.ends_with(note));
+    EXPECT_EQ("PMX_Init", Json::parse(pmxboard::to_json(after(restarted))).at("graphics").at("lost_by"));
+    EXPECT_EQ(State::Shown, after(restarted + "PMX_SetFormatChangeFlag FALSE").graphics.state);
+    EXPECT_EQ(State::Shown, after(restarted + outputs_at_50 + "advance 10s").graphics.state);
+
+    const std::string waiting = unanswered + "video-plane waiting on\nadvance 10s\n";
+    EXPECT_EQ("PMX_Reset", after(waiting + "PMX_Reset 0\nvideo-plane waiting off").graphics.lost_by);
+}
+
+TEST(Status, Graphics_ForgottenAndAModeSetSince_TheStateDoesNotTellByWhom)
+{
+    const std::string lines = unanswered + "PMX_Uninit\nPMX_Init\ndisplay-part off\n" + outputs_at_50;
+    EXPECT_EQ(std::nullopt, after(lines).graphics.lost_by);
+    EXPECT_EQ(std::vector<std::string>{ forgotten }, after(lines).disagreements);
+    EXPECT_EQ("Graphics   planes 3 to 7 out of the mix, and nothing is announced that brings\n"
+              "           them back: PMX_Init, PMX_Reset or PMX_SetOsdEnableFlag has forgotten\n"
+              "           them, or a neighbour has taken them out.\n"
+              "           PMX_SetFormatChangeFlag(FALSE) brings them back, or the end of the\n"
+              "           next change that the display part announces\n" +
+                  note,
+              shown_by(lines + "status graphics"));
+}
+
+TEST(Status, Graphics_OutAndSomethingStillBringsThemBack)
+{
+    EXPECT_EQ("Graphics   planes 3 to 7 out of the mix, owed by nobody; the timer brings them\n"
+              "           back at 10004 ms\n",
+              shown_by(unanswered + "PMX_Stop\nPMX_Init\nstatus graphics"));
+    const std::string answers =
+        std::string("PMX_Init\ndisplay-part answer 3s\n") + outputs_at_50 + "PMX_Uninit\nPMX_Init\n";
+    EXPECT_EQ("Graphics   planes 3 to 7 out of the mix, owed by nobody; the display part's\n"
+              "           answer at 3004 ms brings them back\n",
+              shown_by(answers + "status graphics"));
+    EXPECT_EQ(std::nullopt, after(answers).graphics.lost_by);
+    EXPECT_EQ(State::Shown, after(answers + "advance 3s").graphics.state);
+}
+
+TEST(Status, Graphics_ANeighbourHasTakenThemOut_NobodyIsBlamed)
+{
+    std::string lines = "PMX_Init\n";
+    for (const char plane : { '2', '3', '4', '5', '6' })
+        lines += std::string("neighbour vPmxNotMixPlane 0 ") + plane + "\n";
+    EXPECT_EQ(std::nullopt, after(lines).graphics.lost_by);
+}
+
 TEST(Status, RecordAndHardwareDisagree_IsTold)
 {
     const std::string lines = std::string("PMX_Init\nfault fgPmxDrvSetAvd 0 always\n") + outputs_at_50;
@@ -215,7 +291,8 @@ TEST(Status, AsJson)
                      { "by", "PMX_SetModeEx" },
                      { "since_us", 4000 },
                      { "answer_us", 3004000 },
-                     { "timer_us", 10004000 } }),
+                     { "timer_us", 10004000 },
+                     { "lost_by", nullptr } }),
               json.at("graphics"));
     const std::string as_lines = tool_test::run_traced("PMX_Init\nstatus", "jsonl").shown;
     EXPECT_EQ("status", Json::parse(as_lines.substr(as_lines.rfind('\n', as_lines.size() - 2) + 1)).at("kind"));

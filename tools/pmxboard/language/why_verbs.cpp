@@ -132,7 +132,8 @@ std::vector<Verb> why_verbs()
               explain_command, looks } } },
         { "why",
           { { "why", "explain the last command", why_last, looks },
-            { "why osd", "tell who holds graphics back, since when, and what ends it", why_graphics, looks },
+            { "why osd", "tell who holds graphics back, since when, and what ends it; or who forgot them", why_graphics,
+              looks },
             { "why mode", "tell why the mixer runs the mode that it runs", why_mode, looks },
             { "why colour-space", "tell why the master colour space is what it is", why_colour_space, looks } } },
     };

@@ -209,6 +209,30 @@ State state_of_graphics(const View& view, bool is_out)
     return is_out ? State::Out : State::Shown;
 }
 
+bool anything_ends(const GraphicsStatus& graphics)
+{
+    return graphics.timer_us || graphics.answer_us;
+}
+
+/** Of graphics that nothing brings back. PMX_Reset leaves the layer without a timer, PMX_Init with one; video that was
+ *  never cleared tells that nobody has held them back. */
+std::optional<std::string> lost_by(const View& view, const GraphicsStatus& graphics)
+{
+    if (!view.has("status.hPMXTimer"))
+        return std::nullopt;
+    const bool has_timer = view.is_on("status.hPMXTimer");
+    if (graphics.state == State::Held && !anything_ends(graphics))
+    {
+        if (!has_timer)
+            return "PMX_Reset";
+        return view.is_on("module._PmxInitiated") ? std::nullopt : std::optional<std::string>("PMX_Uninit");
+    }
+    if (!are_forgotten(graphics) || view.is_on("record.fgSetModeCalled") ||
+        !view.has("video_planes.planes[0].clear_video"))
+        return std::nullopt;
+    return has_timer ? "PMX_Init" : "PMX_Reset";
+}
+
 GraphicsStatus graphics_of(const View& view)
 {
     GraphicsStatus graphics;
@@ -223,6 +247,7 @@ GraphicsStatus graphics_of(const View& view)
     graphics.timer_us = timer_expiry(view, started);
     if (graphics.state == State::Held)
         graphics.since_us = started;
+    graphics.lost_by = lost_by(view, graphics);
     return graphics;
 }
 
@@ -287,9 +312,12 @@ void compare_orders(Disagreements& found, const View& view)
         compare(found, "sources of the planes", packed(*order), packed(selected));
 }
 
-Disagreements disagreements_of(const View& view, const std::vector<OutputStatus>& outputs)
+Disagreements disagreements_of(const View& view, const std::vector<OutputStatus>& outputs,
+                               const GraphicsStatus& graphics)
 {
     Disagreements found;
+    if (are_forgotten(graphics))
+        found.push_back("graphics: the record says that nothing waits, the hardware has planes 3 to 7 out of the mix");
     compare(found, "mode", view.at("record.ucMode"), view.at("mixer.mode"));
     compare(found, "TV type", view.at("record.ucTvType"), view.at("mixer.tv_type"));
     compare(found, "background", view.at("record.u4BgColor"), view.at("mixer.background"));
@@ -304,6 +332,12 @@ Disagreements disagreements_of(const View& view, const std::vector<OutputStatus>
 }
 
 } // namespace
+
+bool are_forgotten(const GraphicsStatus& graphics)
+{
+    return graphics.state == State::Out && graphics.planes.size() == last_held - first_held + 1 &&
+           !anything_ends(graphics);
+}
 
 Status status_of(const Value& state, const std::string& board)
 {
@@ -331,7 +365,7 @@ Status status_of(const Value& state, const std::string& board)
     for (const Value& function : replaced.items())
         status.replaced.push_back(function.string());
     if (status.initialised && status.replaced.empty())
-        status.disagreements = disagreements_of(view, status.outputs);
+        status.disagreements = disagreements_of(view, status.outputs, status.graphics);
     return status;
 }
 

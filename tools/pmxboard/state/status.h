@@ -65,7 +65,13 @@ struct GraphicsStatus
     std::optional<std::int64_t> since_us;
     std::optional<std::int64_t> answer_us; ///< when the display part will answer, where that is settled
     std::optional<std::int64_t> timer_us;  ///< when the display timer runs out
+    /** The operation that has deleted or forgotten what would bring them back: PMX_Uninit, PMX_Reset or PMX_Init.
+     *  Nothing while something still does, and where a state does not tell. */
+    std::optional<std::string> lost_by;
 };
+
+/** Whether nothing is under way that brings graphics back, and no flag says that they are away. */
+bool are_forgotten(const GraphicsStatus& graphics);
 
 struct Status
 {

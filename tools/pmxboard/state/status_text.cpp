@@ -183,8 +183,33 @@ std::string ends_of_waiting(const GraphicsStatus& graphics)
 {
     std::string text = "until the display part answers";
     text += graphics.answer_us ? " at " + moment(*graphics.answer_us) : "";
-    return text + (graphics.timer_us ? "; the timer ends the wait at " + moment(*graphics.timer_us)
-                                     : "; no timer ends the wait");
+    if (graphics.timer_us)
+        return text + "; the timer ends the wait at " + moment(*graphics.timer_us);
+    text += "; no timer ends the wait";
+    if (!graphics.lost_by)
+        return text;
+    text += *graphics.lost_by == "PMX_Uninit" ? ": PMX_Uninit has deleted it, and PMX_Init would forget the wait"
+                                              : ": the layer has none since " + *graphics.lost_by;
+    return text + ". PMX_SetFormatChangeFlag(FALSE) brings them back";
+}
+
+/** Of graphics that are out while both flags are clear. */
+std::string why_out(const GraphicsStatus& graphics)
+{
+    const std::string out = named_planes(graphics.planes) + " out of the mix, ";
+    if (graphics.answer_us && (!graphics.timer_us || *graphics.answer_us < *graphics.timer_us))
+        return out + "owed by nobody; the display part's answer at " + moment(*graphics.answer_us) +
+               " brings them back";
+    if (graphics.timer_us)
+        return out + "owed by nobody; the timer brings them back at " + moment(*graphics.timer_us);
+    if (!are_forgotten(graphics))
+        return out + "and nothing is announced that brings them back";
+    return out + "and nothing is announced that brings them back: " +
+           (graphics.lost_by ? *graphics.lost_by + " has forgotten that they were held back"
+                             : "PMX_Init, PMX_Reset or PMX_SetOsdEnableFlag has forgotten them, or a neighbour has "
+                               "taken them out") +
+           ". PMX_SetFormatChangeFlag(FALSE) brings them back, or the end of the next change that the display part "
+           "announces";
 }
 
 std::string graphics_sentence(const GraphicsStatus& graphics)
@@ -197,8 +222,7 @@ std::string graphics_sentence(const GraphicsStatus& graphics)
     case State::AwaitsVideoPlane:
         return "held back by the video plane: " + named_planes(graphics.planes) +
                " wait until it has its sync control and calls PMX_SetOsdEnable";
-    case State::Out:
-        return named_planes(graphics.planes) + " out of the mix, and nothing is announced that brings them back";
+    case State::Out: return why_out(graphics);
     case State::Switching: return "shown, while the display part switches";
     case State::Shown: break;
     }
@@ -301,7 +325,8 @@ Json json_of(const GraphicsStatus& graphics)
                                                                  : Json() },
              { "since_us", number_or_null(graphics.since_us) },
              { "answer_us", number_or_null(graphics.answer_us) },
-             { "timer_us", number_or_null(graphics.timer_us) } };
+             { "timer_us", number_or_null(graphics.timer_us) },
+             { "lost_by", graphics.lost_by ? Json(*graphics.lost_by) : Json() } };
 }
 
 Json json_of(const Status& status)

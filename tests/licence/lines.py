@@ -19,7 +19,8 @@ import whole_file  # noqa: E402
 TAG = "SPDX-License-" + "Identifier:"  # apart, so that nobody takes this for a licence of its own
 LICENCE = f"{TAG} MIT OR GPL-2.0-only"
 COMMENTS = {".c": "// {}", ".cpp": "// {}", ".h": "// {}", ".h.in": "// {}", ".s.in": "/* {} */", ".pc.in": "# {}",
-            ".cmake.in": "# {}", ".md": "<!-- {} -->", ".html": "<!-- {} -->", ".css": "/* {} */", ".js": "// {}"}
+            ".cmake.in": "# {}", ".md": "<!-- {} -->", ".html": "<!-- {} -->", ".css": "/* {} */", ".js": "// {}",
+            ".pml": "/* {} */"}
 HASH = {".bash", ".clang-format", ".clang-tidy", ".cmake", ".fragment", ".gitignore", ".pmx", ".py", ".sh", ".supp",
         ".toml", ".txt", "Doxyfile", "Kbuild", "dev", "run"}
 LICENCES = ("LICENSE", "LICENSES/*")

@@ -28,6 +28,8 @@ gcc-bare
 g++-linux   # why
 [test]
 gcovr
+[coverage]
+clang-19
 [kernel]
 qemu
 [own]
@@ -60,6 +62,14 @@ class Packages(TreeTest):
                 (self.stubs / "installed").write_text("", encoding="utf-8")
                 self.expect(0, "", *arguments)
                 self.assertEqual(set(needed.split()), self.installed())
+
+    def test_what_counts_conditions_is_installed_where_it_can_be(self):
+        self.expect(0, "installing with apt-get: clang-19\n", "setup", "coverage")
+        others = "python3 cmake libx-dev g++ clang gcc-bare g++-linux gcovr"
+        (self.stubs / "installed").write_text("\n".join(others.split()) + "\n", encoding="utf-8")
+        self.expect(0, "could not be installed\ndev: going on without them", "build", "debug", BREAK_APT="1")
+        self.expect(0, "installing with apt-get: clang-19\n", "build", "debug")
+        self.assertEqual({*others.split(), "clang-19"}, self.installed())
 
     def test_setup_installs_all_and_what_is_there_not_again(self):
         (self.stubs / "installed").write_text("cmake\n", encoding="utf-8")

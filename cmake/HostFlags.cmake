@@ -54,6 +54,17 @@ if(PMX_SANITIZE)
     target_link_options(pmx_host INTERFACE ${PMX_SANITIZE_FLAGS})
 endif()
 
+# What tests run of board and tool is counted by clang, in a build of its own. It warns of nothing: other builds do.
+option(PMX_COVERAGE "Count what the tests run of board and tool; clang alone can" OFF)
+set(PMX_COVERAGE_FLAGS "")
+if(PMX_COVERAGE)
+    set(PMX_COVERAGE_FLAGS -fprofile-instr-generate -fcoverage-mapping -w)
+    add_library(pmx_counted_exit STATIC ${PROJECT_SOURCE_DIR}/tests/coverage/counted_exit.c)
+    target_compile_options(pmx_host INTERFACE ${PMX_COVERAGE_FLAGS})
+    target_link_options(pmx_host INTERFACE -fprofile-instr-generate LINKER:--wrap=_exit)
+    target_link_libraries(pmx_host INTERFACE pmx_counted_exit)
+endif()
+
 # What nearly every source includes, compiled once for all libraries. Headers of the library alone: a header of the
 # project that is changed would have everything compiled again.
 set(PMX_PRECOMPILED

@@ -1,7 +1,11 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "device_test.h"
 
+#include <array>
 #include <climits>
+#include <cstddef>
+#include <cstdint>
+#include <cstdio>
 
 #include "u_os.h"
 
@@ -127,6 +131,20 @@ TEST_F(Console, NarrowConversions_CutTheirValue)
     const char* volatile format = "%hd %hhu %hx";
     Printf(format, 70000, 257, -1);
     EXPECT_EQ("4464 1 ffff", board::console_text());
+}
+
+TEST_F(Console, FloatingPointAndLongNumbers_AsInTheCLibrary)
+{
+    const char* const format = "%F %e %E %g %G %a %A %.1Lf|%jd %td %Li";
+    const auto print = [format](auto&& printer) {
+        return printer(format, 1.5, -2e10, 2e-10, 1e20, 1e-20, 0.5, 0.25, 2.25L, std::intmax_t{ LONG_MIN },
+                       std::ptrdiff_t{ -3 }, LLONG_MAX);
+    };
+    std::array<char, 256> expected{};
+    print([&](auto... arguments) { return std::snprintf(expected.data(), expected.size(), arguments...); });
+    print([](auto... arguments) { Printf(arguments...); });
+    EXPECT_EQ(expected.data(), board::console_text());
+    EXPECT_EQ(0u, board::misuses());
 }
 
 TEST_F(Console, WhatIsNoConversion_IsPrintedAsItStands)

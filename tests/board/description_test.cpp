@@ -379,9 +379,24 @@ TEST_F(BoardFile, ProductsThatThereCannotBe)
         { "source = [{ name = \"vdp0\", size = { width = 0, height = 1 } }]\n",
           "width of a source has to be 1 to 65535" },
         { "source = [{ name = \"vdp0\", size = { width = 1 } }]\n", "size of a source needs width and height" },
+        { "source = [{ name = \"vdp0\", size = { height = 1 } }]\n", "size of a source needs width and height" },
+        { "source = [{ name = \"vdp0\", size = 1 }]\n", "size of a source has to be a table: { width = " },
+        { "source = [{ name = \"osd0\", luma_key = 1, size = { width = 1, height = 1 } }]\n",
+          "a luma key goes with a video plane that has a size" },
+        { "source = [{ name = \"osd0\", colour = \"rgb\" }]\n", "a colour goes with an OSD plane that has a size" },
+        { "source = [1]\n", "a source has to be a table: [[source]]" },
+        { "hdmi.modes = 1\n", "modes of hdmi has to be a list of 1 to 128 tables" },
+        { "flash = { \"\" = \"images/boot.bin\" }\n", "a flash partition has a name" },
     };
     for (const auto& [text, complaint] : wrongs)
         EXPECT_TRUE(wrong(text).starts_with(std::string("/player/board.toml:1: ") + complaint)) << text << wrong(text);
+}
+
+TEST_F(BoardFile, Lines_AreNotLongerThanIsTold)
+{
+    const std::string comment = "# " + std::string(4094, 'x');
+    EXPECT_EQ("nothing", wrong(comment + "\n"));
+    EXPECT_EQ("/player/board.toml:2: a line is longer than 4096 bytes", wrong("\n" + comment + "x\n"));
 }
 
 TEST_F(BoardFile, MissingImages_AndTextThatIsNoToml)

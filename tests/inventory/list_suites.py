@@ -8,6 +8,7 @@ usage: list_suites.py PROGRAM PREFIX DIRECTORY TIMEOUT OUTPUT EXCEPT [ENVIRONMEN
 EXCEPT are patterns of cases that are not run, as GoogleTest's filter has them; it may be empty.
 """
 
+import collections
 import pathlib
 import re
 import subprocess
@@ -18,20 +19,32 @@ class Unreadable(Exception):
     """The program's list of cases is not one."""
 
 
-def suites(listing):
-    """{suite: number of its cases}, in the program's order; instances of a parametrised suite count as that suite."""
-    found, current = {}, None
+def cases(listing):
+    """The names of all cases, in the program's order: "Mute.Off", "All/Modes.Each/0"."""
+    found, current, empty = [], "", False
     for line in listing.splitlines():
-        if match := re.fullmatch(r"(?:\w+/)?(\w+)\.(?:\s*#.*)?", line):
-            current = match[1]
-            found.setdefault(current, 0)
-        elif re.match(r"  \S", line) and current:
-            found[current] += 1
+        if match := re.fullmatch(r"((?:\w+/)?\w+\.)(?:\s*#.*)?", line):
+            if empty:
+                raise Unreadable(f"no cases: {current}")
+            current, empty = match[1], True
+        elif (match := re.match(r"  (\S+)", line)) and current:
+            found.append(current + match[1])
+            empty = False
         elif not line.startswith("Running main()"):
             raise Unreadable(f"not a list of cases: {line}")
-    if not found or not all(found.values()):
+    if not found or empty:
         raise Unreadable("no cases")
     return found
+
+
+def suite_of(case):
+    """Instances of a parametrised suite are of that suite: All/Modes.Each/1 is one of Modes."""
+    return case.split(".")[0].split("/")[-1]
+
+
+def suites(listing):
+    """{suite: number of its cases}, in the program's order."""
+    return collections.Counter(map(suite_of, cases(listing)))
 
 
 def quoted(text):

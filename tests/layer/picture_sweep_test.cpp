@@ -8,7 +8,7 @@ using picture::adjustments;
 using picture::applied;
 using picture::refused;
 
-class PictureSweep : public LayerTest
+class Adjustments : public LayerTest
 {
 protected:
     static constexpr UINT32 default_capability = 0x7FFBFFFF;
@@ -20,7 +20,7 @@ protected:
     }
 };
 
-TEST_F(PictureSweep, SetAdjustment_EachValueForTheAnalogueOutputs)
+TEST_F(Adjustments, SetAdjustment_EachValueForTheAnalogueOutputs)
 {
     for (const Adjustment& adjustment : adjustments)
     {
@@ -34,7 +34,7 @@ TEST_F(PictureSweep, SetAdjustment_EachValueForTheAnalogueOutputs)
     }
 }
 
-TEST_F(PictureSweep, SetAdjustment_EachValueForHdmi_TheAnalogueSettingStays)
+TEST_F(Adjustments, SetAdjustment_EachValueForHdmi_TheAnalogueSettingStays)
 {
     for (const Adjustment& adjustment : adjustments)
     {
@@ -48,7 +48,7 @@ TEST_F(PictureSweep, SetAdjustment_EachValueForHdmi_TheAnalogueSettingStays)
     }
 }
 
-TEST_F(PictureSweep, SetAdjustment_AnyTargetButZero_MeansTheAnalogueOutputsAndIsLoggedAsGiven)
+TEST_F(Adjustments, SetAdjustment_AnyTargetButZero_MeansTheAnalogueOutputsAndIsLoggedAsGiven)
 {
     for (const Adjustment& adjustment : adjustments)
     {
@@ -63,7 +63,7 @@ TEST_F(PictureSweep, SetAdjustment_AnyTargetButZero_MeansTheAnalogueOutputsAndIs
     }
 }
 
-TEST_F(PictureSweep, SetAdjustment_TheStoredValueAgain_IsAppliedAgain)
+TEST_F(Adjustments, SetAdjustment_TheStoredValueAgain_IsAppliedAgain)
 {
     for (const Adjustment& adjustment : adjustments)
     {
@@ -76,7 +76,7 @@ TEST_F(PictureSweep, SetAdjustment_TheStoredValueAgain_IsAppliedAgain)
     }
 }
 
-TEST_F(PictureSweep, SetAdjustment_OtherMixerId_RefusedWithoutALine)
+TEST_F(Adjustments, SetAdjustment_OtherMixerId_RefusedWithoutALine)
 {
     const RecordSnapshot before;
     for (const Adjustment& adjustment : adjustments)
@@ -94,7 +94,7 @@ TEST_F(PictureSweep, SetAdjustment_OtherMixerId_RefusedWithoutALine)
     EXPECT_RECORD_CHANGED(before, "u4Capability");
 }
 
-TEST_F(PictureSweep, SetAdjustment_ItsOwnCapabilityBitAloneCounts)
+TEST_F(Adjustments, SetAdjustment_ItsOwnCapabilityBitAloneCounts)
 {
     for (const Adjustment& adjustment : adjustments)
     {
@@ -113,7 +113,7 @@ TEST_F(PictureSweep, SetAdjustment_ItsOwnCapabilityBitAloneCounts)
     }
 }
 
-TEST_F(PictureSweep, SetAdjustment_HdmiDriverRefuses_DoesNotMatter)
+TEST_F(Adjustments, SetAdjustment_HdmiDriverRefuses_DoesNotMatter)
 {
     board::faults::set({ "fgPmxDrvSetAvd", FALSE, board::Fault::When::Always });
     const RecordSnapshot before;
@@ -127,7 +127,7 @@ TEST_F(PictureSweep, SetAdjustment_HdmiDriverRefuses_DoesNotMatter)
     EXPECT_RECORD_UNCHANGED(before);
 }
 
-TEST_F(PictureSweep, SetAdjustment_IsStoredBeforeTheHardware)
+TEST_F(Adjustments, SetAdjustment_IsStoredBeforeTheHardware)
 {
     for (const Adjustment& adjustment : adjustments)
     {
@@ -139,7 +139,7 @@ TEST_F(PictureSweep, SetAdjustment_IsStoredBeforeTheHardware)
     }
 }
 
-TEST_F(PictureSweep, SetAdjustment_BeforeStartUp_NothingIsPossible)
+TEST_F(Adjustments, SetAdjustment_BeforeStartUp_NothingIsPossible)
 {
     power_on();
     const RecordSnapshot before;
@@ -154,7 +154,7 @@ TEST_F(PictureSweep, SetAdjustment_BeforeStartUp_NothingIsPossible)
     EXPECT_RECORD_UNCHANGED(before);
 }
 
-TEST_F(PictureSweep, SetAdjustment_ResetReturnsTheDefaultsToTheRecord)
+TEST_F(Adjustments, SetAdjustment_ResetReturnsTheDefaultsToTheRecord)
 {
     for (const Adjustment& adjustment : adjustments)
         EXPECT_EQ(1u, adjustment.set(0, 77, 1));
@@ -163,7 +163,7 @@ TEST_F(PictureSweep, SetAdjustment_ResetReturnsTheDefaultsToTheRecord)
         EXPECT_EQ(adjustment.by_default, record(adjustment.field)) << adjustment.name;
 }
 
-TEST_F(PictureSweep, GetAdjustment_Default)
+TEST_F(Adjustments, GetAdjustment_Default)
 {
     for (const Adjustment& adjustment : adjustments)
     {
@@ -174,7 +174,7 @@ TEST_F(PictureSweep, GetAdjustment_Default)
     EXPECT_NO_TRACE();
 }
 
-TEST_F(PictureSweep, GetAdjustment_EachReadsItsOwnFieldAndChangesNothing)
+TEST_F(Adjustments, GetAdjustment_EachReadsItsOwnFieldAndChangesNothing)
 {
     UCHAR given = 1;
     for (const Adjustment& adjustment : adjustments)
@@ -191,7 +191,7 @@ TEST_F(PictureSweep, GetAdjustment_EachReadsItsOwnFieldAndChangesNothing)
     EXPECT_NO_TRACE();
 }
 
-TEST_F(PictureSweep, GetAdjustment_AfterASettingForHdmi_KeepsReportingTheAnalogueOne)
+TEST_F(Adjustments, GetAdjustment_AfterASettingForHdmi_KeepsReportingTheAnalogueOne)
 {
     for (const Adjustment& adjustment : adjustments)
     {
@@ -203,7 +203,7 @@ TEST_F(PictureSweep, GetAdjustment_AfterASettingForHdmi_KeepsReportingTheAnalogu
     }
 }
 
-TEST_F(PictureSweep, GetAdjustment_OtherMixerIdNullPointerOrNoCapability_RefusedWithoutALine)
+TEST_F(Adjustments, GetAdjustment_OtherMixerIdNullPointerOrNoCapability_RefusedWithoutALine)
 {
     for (const Adjustment& adjustment : adjustments)
     {
@@ -225,7 +225,7 @@ TEST_F(PictureSweep, GetAdjustment_OtherMixerIdNullPointerOrNoCapability_Refused
     EXPECT_NO_TRACE();
 }
 
-TEST_F(PictureSweep, d_PMX_SetAdjustment_IsForTheAnalogueOutputs)
+TEST_F(Adjustments, d_PMX_SetAdjustment_IsForTheAnalogueOutputs)
 {
     for (const Adjustment& adjustment : adjustments)
     {
@@ -243,7 +243,7 @@ TEST_F(PictureSweep, d_PMX_SetAdjustment_IsForTheAnalogueOutputs)
     }
 }
 
-TEST_F(PictureSweep, d_PMX_GetAdjustment_WritesTheSettingOrNothing)
+TEST_F(Adjustments, d_PMX_GetAdjustment_WritesTheSettingOrNothing)
 {
     for (const Adjustment& adjustment : adjustments)
     {

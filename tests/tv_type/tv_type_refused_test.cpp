@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** Mode setting when the TV type is refused: the assertion says so in its place, and the sequence goes on. */
+#include "tests/support/assertion_places.h"
 #include "tests/support/layer_fixture.h"
 
 namespace
@@ -59,6 +60,7 @@ protected:
         started();
         refused = true;
         const std::vector<std::string> lines = trace_of(operation);
+        const std::vector<AssertionReport> reports = assertion_reports();
         refused = false;
         expect_asserts(1);
 
@@ -73,6 +75,8 @@ protected:
             EXPECT_TRUE(lines[i].starts_with(assertion)) << lines[i];
         }
         EXPECT_EQ(1u, different);
+        ASSERT_EQ(1u, reports.size());
+        EXPECT_NE(nullptr, place_of(reports[0], assertion_places()));
     }
 };
 

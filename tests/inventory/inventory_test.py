@@ -54,8 +54,8 @@ class Inventory(unittest.TestCase):
 class LeftOut(unittest.TestCase):
     KNOWN = {"layer": ["Mute.Off", "Mute.On", "MuteSweep.Each", "All/Modes.Each/0", "All/Modes.Each/1"]}
 
-    def found(self, *wanted, path="/b/tests/layer", **properties):
-        return left_out.places([{"command": [path, *wanted], "properties": [
+    def found(self, *wanted, path=("/b/tests/layer",), **properties):
+        return left_out.places([{"command": [*path, *wanted], "properties": [
             {"name": name, "value": value} for name, value in properties.items()]}],
             pathlib.Path("/b"), pathlib.Path("/arm"), self.KNOWN)
 
@@ -82,7 +82,7 @@ class LeftOut(unittest.TestCase):
                          self.complaints(self.found(), "layer Mute all why not"))
 
     def test_left_out_here_and_run_on_the_target(self):
-        found = self.found("--gtest_filter=-Mute.*") | self.found(path="/arm/tests/layer")
+        found = self.found("--gtest_filter=-Mute.*") | self.found(path=("/qemu", "/arm/tests/layer"))
         self.assertEqual([], self.complaints(found, "layer Mute all"))
 
     def test_parts(self):
@@ -90,7 +90,7 @@ class LeftOut(unittest.TestCase):
         self.assertEqual(["layer: not every part of * runs"], self.complaints(self.found(**part)))
 
     def test_a_program_that_nobody_runs(self):
-        for found in ({}, self.found(DISABLED=True)):
+        for found in ({}, self.found(DISABLED=True), self.found(path=("/python", "/a/check", "/b/tests/layer"))):
             self.assertNotEqual([], self.complaints(found))
 
     def test_the_list(self):

@@ -64,13 +64,13 @@ def places(tests, build, target, programs):
     """{place: Place} of what ctest has."""
     found = collections.defaultdict(Place)
     for test in tests:
-        for word in test.get("command", []):
-            path = pathlib.Path(word)
-            if path.name not in programs:
-                continue
-            if path.is_relative_to(build):
+        words = list(map(pathlib.Path, test.get("command", [])))
+        # Checks that are handed a program run it as they like; on the target an emulator stands in front.
+        for path in words[:1]:
+            if path.name in programs and path.is_relative_to(build):
                 found[path.name].add(test)
-            elif path.is_relative_to(target):
+        for path in words[1:]:
+            if path.name in programs and path.is_relative_to(target):
                 found[f"target:{path.name}"].add(test)
     return found
 

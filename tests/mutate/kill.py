@@ -10,6 +10,7 @@ import json
 import os
 import pathlib
 import re
+import resource
 import shutil
 import signal
 import subprocess
@@ -18,8 +19,9 @@ import threading
 from mutants import Failed
 
 STARTED = re.compile(r"^\[ RUN      \] (\S+)\.(\S+)$", re.M)
+FAILED = re.compile(r"^\[  FAILED  \] (\S+)\.([^\s,]+)", re.M)
 FINISHED = re.compile(r"^\[-+\] \d+ tests? from ([^\s,]+)(?:, .*)? \((\d+) ms total\)$", re.M)
-FIRST_MS, QUICK_MS = 150, 60  # all that run first, and each of those that run next
+FIRST, QUICK, SLOWER = 0.015, 0.1, 0.4  # parts of the time of all: what runs first, next, and then
 MOST_PRINTED = 50_000_000  # bytes
 MOST_MEMORY = 4_000_000_000
 
@@ -31,13 +33,13 @@ class Settings:
         told = json.loads(path.read_text(encoding="utf-8"))
         self.root, self.layer = pathlib.Path(told["root"]), pathlib.Path(told["layer"])
         self.read, self.compile, self.product = told["read"], told["compile"], told["product"]
-        self.link, self.behind = told["link"], told["behind"]
+        self.link, self.programs, self.behind = told["link"], told["programs"], told["behind"]
         self.sources = sorted(self.layer.glob("*.cpp"))
 
     def key(self):
         """What the verdicts hang on, but for the mutant."""
         digest = hashlib.sha256(json.dumps([self.compile, self.product, self.link, self.behind]).encode())
-        tests = [pathlib.Path(word) for word in self.link if word.endswith((".o", ".cpp"))]
+        tests = [pathlib.Path(path) for _, path in sorted(self.programs.items())]
         for path in [*tests, *sorted(self.layer.glob("*.[ch]*")), *sorted(self.root.glob("src/*/*inc/*.h"))]:
             digest.update(hashlib.sha256(path.read_bytes()).digest())
         return digest.hexdigest()
@@ -48,10 +50,10 @@ def key_of(settings_key, mutant):
 
 
 class Suites:
-    """How long each suite takes, and which have seen what."""
+    """How long each suite of each program takes, and which have seen what."""
 
-    def __init__(self, milliseconds):
-        self._milliseconds, self._lock = milliseconds, threading.Lock()
+    def __init__(self, seconds):
+        self._seconds, self._lock, self._whole = seconds, threading.Lock(), sum(seconds.values())
         self._kills = collections.defaultdict(collections.Counter)
 
     def note(self, file, function, suite):
@@ -63,41 +65,52 @@ class Suites:
         """Suites, those first that find most in their time."""
         with self._lock:
             here = self._kills[mutant.file, mutant.function]
-            score = {suite: (here[suite] * 10 + number) / (self._milliseconds.get(suite, 0) + 2)
-                     for suite, number in self._kills[mutant.file].items() if suite in self._milliseconds}
+            score = {suite: (here[suite] * 10 + number) / (self._seconds[suite] + self._whole / 10_000)
+                     for suite, number in self._kills[mutant.file].items() if suite in self._seconds}
         return sorted(score, key=score.get, reverse=True)
 
+    def _within(self, suites, part):
+        """As many of them as fit into that part of the time."""
+        fitting, total = [], 0
+        for suite in suites:
+            total += self._seconds[suite]
+            if total <= part * self._whole:
+                fitting.append(suite)
+        return fitting
+
     def stages(self, mutant):
-        """What runs in one go, then what, and then all the rest."""
-        first, total = [], 0
-        for suite in self._likely(mutant):
-            total += self._milliseconds[suite]
-            if total > FIRST_MS:
-                break
-            first.append(suite)
-        rest = [suite for suite in self._milliseconds if suite not in first]
-        quick = [suite for suite in rest if self._milliseconds[suite] <= QUICK_MS]
-        return [stage for stage in (first, quick, [suite for suite in rest if suite not in quick]) if stage]
+        """(program, what of it runs in one go, in how many seconds at most), one after the other."""
+        likely = self._likely(mutant)
+        best = likely[0][0] if likely else ""
+        first = self._within([suite for suite in likely if suite[0] == best], FIRST)
+        rest = sorted((suite for suite in self._seconds if suite not in first), key=self._seconds.get)
+        goes = [first]
+        for part in (QUICK, SLOWER, None):
+            fitting = self._within(rest, part) if part else rest
+            rest = [suite for suite in rest if suite not in fitting]
+            programs = sorted({suite[0] for suite in fitting}, key=lambda program: (program != best, program))
+            goes += [[suite for suite in fitting if suite[0] == program] for program in programs]
+        return [(go[0][0], [suite for _, suite in go], 1 + 4 * sum(map(self._seconds.get, go))) for go in goes if go]
 
 
 class Tests:
-    """The linked tests, run within limits."""
+    """Linked tests, run within limits."""
 
-    def __init__(self, root, seconds):
-        self._root, self._seconds = root, seconds
+    def __init__(self, root):
+        self._root = root
 
-    def run(self, program, suites=None):
-        """(signal or answer, what was printed)"""
-        limits = ["prlimit", f"--cpu={self._seconds}:{self._seconds + 2}", "--core=0", f"--fsize={MOST_PRINTED}",
-                  f"--as={MOST_MEMORY}"]
-        command = [*limits, "--", str(program), "--gtest_break_on_failure", "--gtest_color=no"]
+    def run(self, program, suites, seconds):
+        """(answer, or the signal less than 0; what was printed)"""
+        whole = int(seconds) + 1
+        limits = ["prlimit", f"--cpu={whole}:{whole + 2}", "--core=0", f"--fsize={MOST_PRINTED}", f"--as={MOST_MEMORY}"]
+        command = [*limits, "--", str(program), "--gtest_fail_fast", "--gtest_color=no"]
         if suites:
             command.append("--gtest_filter=" + ":".join(f"{suite}.*" for suite in suites))
         printed = program.with_suffix(".printed")
         with printed.open("wb") as out, subprocess.Popen(command, stdout=out, stderr=subprocess.STDOUT, cwd=self._root,
                                                          stdin=subprocess.DEVNULL, start_new_session=True) as ran:
             try:
-                answer = ran.wait(3 * self._seconds)
+                answer = ran.wait(10 * whole)
             except subprocess.TimeoutExpired:
                 answer = -signal.SIGXCPU
             finally:
@@ -146,11 +159,12 @@ class Bench:
             if not made:
                 raise Failed(told[-3000:])
 
-    def link(self, changed):
-        program = self._folder / "tests"
+    def link(self, name, changed):
+        """(the program of that name, what the linker says); no program when it cannot be linked"""
+        program = self._folder / name
         layer = [changed.get(source, self._originals / f"{source.stem}.o") for source in self._settings.sources]
-        ran = subprocess.run([*self._settings.link, *map(str, layer), *self._settings.behind, "-o", str(program)],
-                             capture_output=True, check=False)
+        ran = subprocess.run([*self._settings.link, self._settings.programs[name], *map(str, layer),
+                              *self._settings.behind, "-o", str(program)], capture_output=True, check=False)
         return (program if ran.returncode == 0 else None), ran.stderr.decode(errors="replace")
 
     def has_same_code(self, mutant, text):
@@ -162,34 +176,58 @@ class Bench:
     def judge(self, mutant, text, suites, tests):
         """(verdict, the test that has seen it)"""
         changed = self.objects(self._settings.compile, mutant, text)
-        program = self.link(changed)[0] if changed else None
-        if program is None:
-            return "refused", ""
-        for stage in suites.stages(mutant):
-            answer, printed = tests.run(program, stage)
+        programs = {}
+        for name, some, seconds in suites.stages(mutant) if changed else ():
+            if name not in programs:
+                programs[name] = self.link(name, changed)[0]
+            if programs[name] is None:
+                return "refused", ""
+            answer, printed = tests.run(programs[name], some, seconds)
             if answer != 0:
-                seen = STARTED.findall(printed)
-                suite, case = seen[-1] if seen else ("", "")
-                if suite:
-                    suites.note(mutant.file, mutant.function, suite)
-                return "hung" if answer in (-signal.SIGXCPU, 128 + signal.SIGXCPU) else "killed", f"{suite}.{case}"
+                suite, case = saw_it(printed)
+                suites.note(mutant.file, mutant.function, (name, suite))
+                return "hung" if answer == -signal.SIGXCPU else "killed", f"{name}:{suite}.{case}"
+        if not changed:
+            return "refused", ""
         return ("same code" if self.has_same_code(mutant, text) else "survived"), ""
+
+
+def saw_it(printed):
+    """(suite, case) that failed, or was running when the program ended."""
+    failed, started = FAILED.search(printed), STARTED.findall(printed)
+    return failed.groups() if failed else started[-1] if started else ("", "")
+
+
+def spent(work):
+    """What the work gives, and the processor's seconds of what it started."""
+    before = resource.getrusage(resource.RUSAGE_CHILDREN)
+    result = work()
+    after = resource.getrusage(resource.RUSAGE_CHILDREN)
+    return result, after.ru_utime + after.ru_stime - before.ru_utime - before.ru_stime
+
+
+def run_original(bench, tests, name):
+    """By suite of a program, how many seconds of the processor it takes, whoever else uses the machine."""
+    program, told = bench.link(name, {})
+    if program is None:
+        raise Failed(told[-3000:])
+    (answer, printed), seconds = spent(lambda: tests.run(program, [], 600))
+    if answer != 0:
+        raise Failed(f"the tests fail without any mutant ({answer}):\n{printed[-2000:]}")
+    milliseconds = {(name, suite): int(lasted) + 1 for suite, lasted in FINISHED.findall(printed)}
+    if not milliseconds:
+        raise Failed(f"{name} has no tests")
+    whole = sum(milliseconds.values())
+    return {suite: seconds * lasted / whole for suite, lasted in milliseconds.items()}
 
 
 def prepare(settings, folder):
     """The original compiled, and its tests run: (the folder of its objects, suites, tests)."""
-    originals = folder / "original"
+    originals, tests = folder / "original", Tests(settings.root)
     bench = Bench(settings, originals, originals)
     bench.original(settings.compile)
     bench.original(settings.product, ".product.o")
-    program, told = bench.link({})
-    if program is None:
-        raise Failed(told[-3000:])
-    answer, printed = Tests(settings.root, 600).run(program)
-    if answer != 0:
-        raise Failed(f"the tests fail without any mutant ({answer}):\n{printed[-2000:]}")
-    milliseconds = {suite: int(spent) for suite, spent in FINISHED.findall(printed)}
-    if not milliseconds:
-        raise Failed("there are no tests")
-    seconds = max(3, 3 * sum(milliseconds.values()) // 1000)
-    return originals, Suites(milliseconds), Tests(settings.root, seconds)
+    seconds = {}
+    for name in settings.programs:
+        seconds.update(run_original(bench, tests, name))
+    return originals, Suites(seconds), tests

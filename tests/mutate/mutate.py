@@ -161,7 +161,8 @@ class Campaign:
         originals, suites, tests = kill.prepare(self._settings, self._made)
         for result in self._results.all():
             if result["by"]:
-                suites.note(*result["name"].split(":")[:2], result["by"].partition(".")[0])
+                program, _, case = result["by"].partition(":")
+                suites.note(*result["name"].split(":")[:2], (program, case.rpartition(".")[0]))
         workers = len(os.sched_getaffinity(0))
         for number in range(workers):
             self._benches.put(kill.Bench(self._settings, self._made / f"bench-{number}", originals))

@@ -165,7 +165,7 @@ class Planting(unittest.TestCase):
         self.test.write_text(PROGRAM, encoding="utf-8")
         subprocess.run(["g++", f"-I{self.layer}", "-c", self.test, "-o", rest], check=True)
         settings = {"root": str(self.folder), "layer": str(self.layer), "read": READ, "compile": ["g++", *FLAGS],
-                    "product": ["g++", *FLAGS, "-O2"], "link": ["g++", str(rest)], "behind": []}
+                    "product": ["g++", *FLAGS, "-O2"], "link": ["g++"], "programs": {"tests": str(rest)}, "behind": []}
         (self.made / "settings.json").write_text(json.dumps(settings), encoding="utf-8")
         self.equivalents = self.folder / "equivalent.txt"
         self.equivalents.write_text("", encoding="utf-8")
@@ -199,7 +199,7 @@ class Planting(unittest.TestCase):
         self.assertEqual({"killed", "refused"}, {of[name] for name in self.name("iCount:statement")})
         self.assertIn("hung", {of[name] for name in self.name("iCount:operator")})
         self.assertEqual({"killed"}, {of[name] for name in self.name("count.h:iTwice:operator")})
-        self.assertEqual({"Count.Counts"}, {result["by"] for result in self.results().values() if result["by"]})
+        self.assertEqual({"tests:Count.Counts"}, {result["by"] for result in self.results().values() if result["by"]})
         self.assertRegex(printed, rf"(?m)^{len(of)} mutants, 0 of them judged before;")
 
     def test_one_that_does_not_compile_is_no_killed_one(self):
@@ -236,7 +236,7 @@ class Planting(unittest.TestCase):
         self.mutate("fgOverlooked:operator", "iCount:statement")
         killed = [name for name, result in self.results().items() if result["verdict"] == "killed"][0]
         name = self.name("fgOverlooked:operator")[0]
-        for text, message in ((f"{killed} it is so\n", "is on the list of equivalents, and Count.Counts sees it"),
+        for text, message in ((f"{killed} it is so\n", "is on the list of equivalents, and tests:Count.Counts sees it"),
                               ("count.cpp:f:cell:1-0 it is so\n", "and there is no such mutant"),
                               (f"{name}\n", f"equivalent.txt:1: {name} has no reason"),
                               (f"{name} it is so\n" * 2, "equivalent.txt:2")):
@@ -254,7 +254,7 @@ class Planting(unittest.TestCase):
 
     def test_a_mutant_is_shown(self):
         self.mutate("fgOverlooked:operator")
-        answer, printed = self.mutate("--show", self.name("fgOverlooked:operator")[0])
+        answer, printed = self.mutate("--show", sorted(self.name("fgOverlooked:operator"))[0])
         self.assertEqual(0, answer)
         self.assertIn("-    return iValue > 3;\n+    return iValue >= 3;\n", printed)
         self.assertEqual((1, "there is no mutant x"), self.mutate("--show", "x"))

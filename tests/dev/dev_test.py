@@ -173,6 +173,14 @@ class Caches(TreeTest):
         self.expect(0, "", "clean")
         self.assertTrue((self.tree / ".cache/prove").is_dir())
 
+    def test_verdicts_on_mutants_are_kept_there_too(self):
+        made = f"{self.tree}/build/mutate/planted"
+        self.expect(0, f"mutate {self.tree}/.cache/mutate {made} 100\n", "mutate", "100")
+        self.assertEqual(["cmake --build --preset mutate --target mutate_tests"], self.calls("cmake --build"))
+        self.expect(0, f"mutate {self.space}/kept/mutate {made} --show x\n", "mutate", "--show", "x", PMX_CACHE="kept")
+        self.expect(0, "", "clean")
+        self.assertTrue((self.tree / ".cache/mutate").is_dir())
+
     def test_the_users_own_is_used(self):
         self.expect(0, "cache /elsewhere", "run", CCACHE_DIR="/elsewhere")
         self.expect(0, "cache none", "run", CCACHE_CONFIGPATH="/elsewhere/ccache.conf")

@@ -54,6 +54,7 @@ class Packages(TreeTest):
                                   (("kernel", "--debug"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu flex"),
                                   (("kernel", "--all"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu flex"),
                                   (("prove",), "python3 gcc-bare clang"),
+                                  (("mutate",), "python3 cmake libx-dev g++ g++-linux clang gcc-bare gcovr"),
                                   (("docs",), ""),
                                   (("clean",), ""),
                                   (("help",), ""),

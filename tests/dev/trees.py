@@ -95,7 +95,8 @@ class TreeTest(unittest.TestCase):
         (tree / "CMakePresets.json").write_text("{}\n", encoding="utf-8")
         for name in KERNEL_PROGRAMS:
             self.make_program(tree / f"tests/kernel/{name}.py", name.replace("run", "kernel"))
-        self.make_program(tree / "tests/prove/prove.py", "prove")
+        for name in ("prove", "mutate"):
+            self.make_program(tree / f"tests/{name}/{name}.py", name)
         return tree
 
     @staticmethod

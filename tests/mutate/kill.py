@@ -18,10 +18,9 @@ import threading
 
 from mutants import Failed
 
-STARTED = re.compile(r"^\[ RUN      \] (\S+)\.(\S+)$", re.M)
-FAILED = re.compile(r"^\[  FAILED  \] (\S+)\.([^\s,]+)", re.M)
-FINISHED = re.compile(r"^\[-+\] \d+ tests? from ([^\s,]+)(?:, .*)? \((\d+) ms total\)$", re.M)
-FIRST, QUICK, SLOWER = 0.015, 0.1, 0.4  # parts of the time of all: what runs first, next, and then
+STARTED = re.compile(r"^\[ RUN      \] (\S+)$", re.M)
+FAILED = re.compile(r"^\[  FAILED  \] ([^\s,]+)", re.M)
+FIRST, QUICK, SLOWER = 0.01, 0.02, 0.2  # parts of the time of all: what runs first, next, and then
 MOST_PRINTED = 50_000_000  # bytes
 MOST_MEMORY = 4_000_000_000
 
@@ -34,11 +33,12 @@ class Settings:
         self.root, self.layer = pathlib.Path(told["root"]), pathlib.Path(told["layer"])
         self.read, self.compile, self.product = told["read"], told["compile"], told["product"]
         self.link, self.programs, self.behind = told["link"], told["programs"], told["behind"]
+        self.runs, self.without = told["runs"], told["without"]
         self.sources = sorted(self.layer.glob("*.cpp"))
 
     def key(self):
         """What the verdicts hang on, but for the mutant."""
-        digest = hashlib.sha256(json.dumps([self.compile, self.product, self.link, self.behind]).encode())
+        digest = hashlib.sha256(json.dumps([self.compile, self.product, self.link, self.behind, self.without]).encode())
         tests = [pathlib.Path(path) for _, path in sorted(self.programs.items())]
         for path in [*tests, *sorted(self.layer.glob("*.[ch]*")), *sorted(self.root.glob("src/*/*inc/*.h"))]:
             digest.update(hashlib.sha256(path.read_bytes()).digest())
@@ -49,48 +49,67 @@ def key_of(settings_key, mutant):
     return hashlib.sha256(f"{settings_key} {mutant}".encode()).hexdigest()[:24]
 
 
-class Suites:
-    """How long each suite of each program takes, and which have seen what."""
+class Cases:
+    """How long each case of each program takes, what of the layer it runs, and what it has seen."""
 
-    def __init__(self, seconds):
-        self._seconds, self._lock, self._whole = seconds, threading.Lock(), sum(seconds.values())
+    def __init__(self, noted, users):
+        self._seconds = {tuple(case): seconds for case, seconds, _ in noted}
+        self._runs = {tuple(case): set(functions) for case, _, functions in noted}
+        self._users, self._lock, self._whole = users, threading.Lock(), sum(self._seconds.values())
         self._kills = collections.defaultdict(collections.Counter)
 
-    def note(self, file, function, suite):
-        with self._lock:
-            for place in (file, (file, function)):
-                self._kills[place][suite] += 1
+    def note(self, file, function, case):
+        if case in self._seconds:
+            with self._lock:
+                self._kills[file, function][case] += 1
+
+    def _functions(self, name):
+        """The functions that a function or table is in, or is used by."""
+        found, names = set(), [name]
+        while names:
+            name = names.pop()
+            if name not in found:
+                found.add(name)
+                names += [] if any(name in functions for functions in self._runs.values()) else self._users[name]
+        return found
+
+    def _covering(self, mutant):
+        """Cases that run the place, those first that do little else."""
+        functions = self._functions(mutant.function)
+        return sorted((case for case, runs in self._runs.items() if runs & functions),
+                      key=lambda case: self._seconds[case] * len(self._runs[case]))
 
     def _likely(self, mutant):
-        """Suites, those first that find most in their time."""
+        """Cases that have seen something here, those first that find most in their time."""
         with self._lock:
-            here = self._kills[mutant.file, mutant.function]
-            score = {suite: (here[suite] * 10 + number) / (self._seconds[suite] + self._whole / 10_000)
-                     for suite, number in self._kills[mutant.file].items() if suite in self._seconds}
-        return sorted(score, key=score.get, reverse=True)
+            kills = dict(self._kills[mutant.file, mutant.function])
+        return sorted(kills, key=lambda case: (self._seconds[case] + self._whole / 10_000) / kills[case])
 
-    def _within(self, suites, part):
+    def _within(self, cases, part):
         """As many of them as fit into that part of the time."""
         fitting, total = [], 0
-        for suite in suites:
-            total += self._seconds[suite]
+        for case in cases:
+            total += self._seconds[case]
             if total <= part * self._whole:
-                fitting.append(suite)
+                fitting.append(case)
         return fitting
 
     def stages(self, mutant):
-        """(program, what of it runs in one go, in how many seconds at most), one after the other."""
-        likely = self._likely(mutant)
-        best = likely[0][0] if likely else ""
-        first = self._within([suite for suite in likely if suite[0] == best], FIRST)
-        rest = sorted((suite for suite in self._seconds if suite not in first), key=self._seconds.get)
-        goes = [first]
+        """What runs in one go, one after the other: (program, cases, in how many seconds at most); the last are those
+        that do not run the place: what is computed once for several cases is noted for one of them alone."""
+        left = self._covering(mutant)
+        goes = [self._within(self._likely(mutant), FIRST)]
         for part in (QUICK, SLOWER, None):
-            fitting = self._within(rest, part) if part else rest
-            rest = [suite for suite in rest if suite not in fitting]
-            programs = sorted({suite[0] for suite in fitting}, key=lambda program: (program != best, program))
-            goes += [[suite for suite in fitting if suite[0] == program] for program in programs]
-        return [(go[0][0], [suite for _, suite in go], 1 + 4 * sum(map(self._seconds.get, go))) for go in goes if go]
+            left = [case for case in left if case not in set(goes[-1])]
+            goes.append(self._within(left, part) if part else left)
+        done = {case for go in goes for case in go}
+        return self._by_program(goes), self._by_program([[case for case in self._seconds if case not in done]])
+
+    def _by_program(self, goes):
+        for go in goes:
+            for program in sorted({program for program, _ in go}):
+                cases = [case for case in go if case[0] == program]
+                yield program, [case for _, case in cases], 1 + 4 * sum(map(self._seconds.get, cases))
 
 
 class Tests:
@@ -99,16 +118,18 @@ class Tests:
     def __init__(self, root):
         self._root = root
 
-    def run(self, program, suites, seconds):
+    def run(self, program, cases, seconds, **environment):
         """(answer, or the signal less than 0; what was printed)"""
         whole = int(seconds) + 1
         limits = ["prlimit", f"--cpu={whole}:{whole + 2}", "--core=0", f"--fsize={MOST_PRINTED}", f"--as={MOST_MEMORY}"]
         command = [*limits, "--", str(program), "--gtest_fail_fast", "--gtest_color=no"]
-        if suites:
-            command.append("--gtest_filter=" + ":".join(f"{suite}.*" for suite in suites))
+        flags = program.with_suffix(".flags")
+        flags.write_text("--gtest_filter=" + ":".join(cases) + "\n", encoding="utf-8")
+        command.append(f"--gtest_flagfile={flags}")
         printed = program.with_suffix(".printed")
         with printed.open("wb") as out, subprocess.Popen(command, stdout=out, stderr=subprocess.STDOUT, cwd=self._root,
-                                                         stdin=subprocess.DEVNULL, start_new_session=True) as ran:
+                                                         stdin=subprocess.DEVNULL, start_new_session=True,
+                                                         env=os.environ | environment) as ran:
             try:
                 answer = ran.wait(10 * whole)
             except subprocess.TimeoutExpired:
@@ -123,28 +144,28 @@ class Bench:
     """A folder in which one mutant after the other is made and killed."""
 
     def __init__(self, settings, folder, originals):
-        self._settings, self._folder, self._originals = settings, folder, originals
+        self._settings, self.folder, self._originals = settings, folder, originals
         shutil.rmtree(folder, ignore_errors=True)
         (folder / "header").mkdir(parents=True)
 
     def _compile(self, command, source, text, made):
         """Nothing but the text differs: the compiler is told the name that it has."""
         given = f'# 1 "{source}"\n{text}'
-        where = ["-I", str(self._folder / "header"), "-I", str(self._settings.layer)]
+        where = ["-I", str(self.folder / "header"), "-I", str(self._settings.layer)]
         ran = subprocess.run([*command, *where, "-x", "c++", "-c", "-", "-o", str(made)], input=given.encode(),
-                             cwd=self._folder, capture_output=True, check=False)
+                             cwd=self.folder, capture_output=True, check=False)
         return ran.returncode == 0, ran.stderr.decode(errors="replace")
 
     def objects(self, command, mutant, text, suffix=".o"):
         """By source: those that differ from the original's. None when one does not compile."""
-        header = self._folder / "header" / mutant.file
+        header = self.folder / "header" / mutant.file
         sources = [self._settings.layer / mutant.file]
         if mutant.file.endswith(".h"):
             header.write_text(text, encoding="utf-8")
             sources = self._settings.sources
         made = {}
         for source in sources:
-            made[source] = self._folder / f"{source.stem}{suffix}"
+            made[source] = self.folder / f"{source.stem}{suffix}"
             given = text if source.name == mutant.file else source.read_text(encoding="utf-8")
             if not self._compile(command, source, given, made[source])[0]:
                 made = None
@@ -155,15 +176,15 @@ class Bench:
     def original(self, command, suffix=".o"):
         for source in self._settings.sources:
             made, told = self._compile(command, source, source.read_text(encoding="utf-8"),
-                                       self._folder / f"{source.stem}{suffix}")
+                                       self.folder / f"{source.stem}{suffix}")
             if not made:
                 raise Failed(told[-3000:])
 
-    def link(self, name, changed):
+    def link(self, name, changed, *more):
         """(the program of that name, what the linker says); no program when it cannot be linked"""
-        program = self._folder / name
+        program = self.folder / name
         layer = [changed.get(source, self._originals / f"{source.stem}.o") for source in self._settings.sources]
-        ran = subprocess.run([*self._settings.link, self._settings.programs[name], *map(str, layer),
+        ran = subprocess.run([*self._settings.link, self._settings.programs[name], *map(str, layer), *more,
                               *self._settings.behind, "-o", str(program)], capture_output=True, check=False)
         return (program if ran.returncode == 0 else None), ran.stderr.decode(errors="replace")
 
@@ -173,29 +194,37 @@ class Bench:
         return changed is not None and all(
             made.read_bytes() == (self._originals / made.name).read_bytes() for made in changed.values())
 
-    def judge(self, mutant, text, suites, tests):
-        """(verdict, the test that has seen it)"""
-        changed = self.objects(self._settings.compile, mutant, text)
-        programs = {}
-        for name, some, seconds in suites.stages(mutant) if changed else ():
-            if name not in programs:
-                programs[name] = self.link(name, changed)[0]
-            if programs[name] is None:
+    def _first_to_see(self, stages, changed, tests):
+        """(verdict, the case); none when no case sees it"""
+        for name, cases, seconds in stages:
+            if name not in self._programs:
+                self._programs[name] = self.link(name, changed)[0]
+            if self._programs[name] is None:
                 return "refused", ""
-            answer, printed = tests.run(programs[name], some, seconds)
+            answer, printed = tests.run(self._programs[name], cases, seconds)
             if answer != 0:
-                suite, case = saw_it(printed)
-                suites.note(mutant.file, mutant.function, (name, suite))
-                return "hung" if answer == -signal.SIGXCPU else "killed", f"{name}:{suite}.{case}"
+                return "hung" if answer == -signal.SIGXCPU else "killed", f"{name}:{saw_it(printed)}"
+        return None
+
+    def judge(self, mutant, text, cases, tests):
+        """(verdict, the case that has seen it)"""
+        changed, self._programs = self.objects(self._settings.compile, mutant, text), {}
         if not changed:
             return "refused", ""
-        return ("same code" if self.has_same_code(mutant, text) else "survived"), ""
+        running, others = cases.stages(mutant)
+        seen = self._first_to_see(running, changed, tests)
+        if seen is None and self.has_same_code(mutant, text):
+            return "same code", ""
+        seen = seen or self._first_to_see(others, changed, tests) or ("survived", "")
+        program, _, case = seen[1].partition(":")
+        cases.note(mutant.file, mutant.function, (program, case))
+        return seen
 
 
 def saw_it(printed):
-    """(suite, case) that failed, or was running when the program ended."""
+    """The case that failed, or was running when the program ended."""
     failed, started = FAILED.search(printed), STARTED.findall(printed)
-    return failed.groups() if failed else started[-1] if started else ("", "")
+    return failed[1] if failed else started[-1] if started else ""
 
 
 def spent(work):
@@ -206,28 +235,46 @@ def spent(work):
     return result, after.ru_utime + after.ru_stime - before.ru_utime - before.ru_stime
 
 
-def run_original(bench, tests, name):
-    """By suite of a program, how many seconds of the processor it takes, whoever else uses the machine."""
-    program, told = bench.link(name, {})
+def names_of(program):
+    """By address, the names of its functions."""
+    listed = subprocess.run(["nm", "--demangle", str(program)], capture_output=True, check=True).stdout.decode()
+    return {int(words[0], 16): words[2].partition("(")[0]
+            for words in (line.split(" ", 2) for line in listed.splitlines()) if words[0] and words[1] in "tTwW"}
+
+
+def note_cases(settings, bench, tests, name):
+    """Of each case of a program: its name, how many seconds of the processor it takes, whoever else uses the machine,
+    and which functions of the layer it runs."""
+    layer = {source: bench.folder / f"{source.stem}.runs.o" for source in settings.sources}
+    program, told = bench.link(name, layer, settings.runs)
     if program is None:
         raise Failed(told[-3000:])
-    (answer, printed), seconds = spent(lambda: tests.run(program, [], 600))
+    noted = bench.folder / f"{name}.runs"
+    noted.unlink(missing_ok=True)
+    (answer, printed), seconds = spent(lambda: tests.run(program, [f"-{settings.without}"], 600, PMX_RUNS=str(noted)))
     if answer != 0:
         raise Failed(f"the tests fail without any mutant ({answer}):\n{printed[-2000:]}")
-    milliseconds = {(name, suite): int(lasted) + 1 for suite, lasted in FINISHED.findall(printed)}
-    if not milliseconds:
+    lines = [line.split() for line in noted.read_text(encoding="utf-8").splitlines()] if noted.exists() else []
+    if not lines:
         raise Failed(f"{name} has no tests")
-    whole = sum(milliseconds.values())
-    return {suite: seconds * lasted / whole for suite, lasted in milliseconds.items()}
+    whole, names = sum(int(words[1]) + 1 for words in lines), names_of(program)
+    return [[[name, words[0]], seconds * (int(words[1]) + 1) / whole,
+             sorted({names.get(int(address, 16), "") for address in words[2:]})] for words in lines]
 
 
-def prepare(settings, folder):
-    """The original compiled, and its tests run: (the folder of its objects, suites, tests)."""
+def prepare(settings, folder, users):
+    """The original compiled, and its tests run, unless it was before: (the folder of its objects, cases, tests)."""
     originals, tests = folder / "original", Tests(settings.root)
-    bench = Bench(settings, originals, originals)
-    bench.original(settings.compile)
-    bench.original(settings.product, ".product.o")
-    seconds = {}
-    for name in settings.programs:
-        seconds.update(run_original(bench, tests, name))
-    return originals, Suites(seconds), tests
+    kept, key = originals / "cases.json", settings.key()
+    told = json.loads(kept.read_text(encoding="utf-8")) if kept.exists() else {}
+    if told.get("key") != key:
+        bench = Bench(settings, originals, originals)
+        bench.original(settings.compile)
+        bench.original([*settings.compile, "-finstrument-functions"], ".runs.o")
+        bench.original(settings.product, ".product.o")
+        told = {"key": key, "cases": [case for name in settings.programs
+                                      for case in note_cases(settings, bench, tests, name)]}
+        unfinished = kept.with_suffix(".unfinished")
+        unfinished.write_text(json.dumps(told), encoding="utf-8")
+        unfinished.rename(kept)
+    return originals, Cases(told["cases"], users), tests

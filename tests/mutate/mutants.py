@@ -452,12 +452,24 @@ def of_file(path, text, syntax):
     return list(file.mutants())
 
 
+def used_by(syntax):
+    """By name of a table or constant, the functions and tables that have it in them."""
+    users = collections.defaultdict(set)
+    for node in syntax.tree["inner"]:
+        for reference in within(node, "DeclRefExpr") if "name" in node else ():
+            users[reference["referencedDecl"].get("name", "")].add(node["name"])
+    return users
+
+
 def of_layer(folder, command):
-    """All mutants of the sources of a folder, and of the header that has the same name as one of them."""
-    found = []
+    """All mutants of the sources of a folder, and of the header that has the same name as one of them; and who uses
+    what."""
+    found, users = [], collections.defaultdict(set)
     for path in sorted(folder.glob("*.cpp")):
         syntax = Syntax(path, command)
+        for name, its_users in used_by(syntax).items():
+            users[name] |= its_users
         for each in (path, path.with_suffix(".h")):
             if each.exists():
                 found += of_file(each, each.read_text(encoding="utf-8"), syntax)
-    return found
+    return found, users

@@ -3,13 +3,14 @@
 """Plants small faults in the layer, one after the other, and tells those that no test sees. What was found is kept, and
 found once for the same layer and tests. Ends with 1 when one survives that is not on the list of equivalents.
 
-usage: mutate.py CACHE MADE [--seed S] [NUMBER | WORD...]
+usage: mutate.py CACHE MADE [--seed S] [--jobs N] [NUMBER | WORD...]
        mutate.py CACHE MADE --show NAME
     CACHE     folder in which verdicts are kept
     MADE      the build's folder, with settings.json
     NUMBER    plant so many, spread over kinds and files; none: all
     WORD      plant those whose names have one of these in them
     --seed    draw others
+    --jobs    plant so many at once; without it, as many as there are processors
     --show    print what a mutant changes
 """
 
@@ -135,14 +136,15 @@ class Results:
 class Campaign:
     """Plants mutants, as many at once as there are processors."""
 
-    def __init__(self, settings, made, results, texts):
-        self._settings, self._made, self._results, self._texts = settings, made, results, texts
+    def __init__(self, settings, made, users, results, texts):
+        self._settings, self._made, self._users = settings, made, users
+        self._results, self._texts = results, texts
         self._benches, self._told = queue.SimpleQueue(), time.monotonic()
 
-    def _plant(self, mutant, suites, tests):
+    def _plant(self, mutant, cases, tests):
         bench, began = self._benches.get(), time.monotonic()
         try:
-            verdict, seen = bench.judge(mutant, mutant.applied(self._texts[mutant.file]), suites, tests)
+            verdict, seen = bench.judge(mutant, mutant.applied(self._texts[mutant.file]), cases, tests)
         finally:
             self._benches.put(bench)
         return self._results.keep(mutant, verdict, seen, time.monotonic() - began)
@@ -154,20 +156,19 @@ class Campaign:
             self._told = time.monotonic()
             print(f"{number} of {whole}", file=sys.stderr)
 
-    def carry_out(self, chosen):
+    def carry_out(self, chosen, workers):
         """Tells each that survives when it has."""
         if not chosen:
             return
-        originals, suites, tests = kill.prepare(self._settings, self._made)
+        originals, cases, tests = kill.prepare(self._settings, self._made, self._users)
         for result in self._results.all():
             if result["by"]:
                 program, _, case = result["by"].partition(":")
-                suites.note(*result["name"].split(":")[:2], (program, case.rpartition(".")[0]))
-        workers = len(os.sched_getaffinity(0))
+                cases.note(*result["name"].split(":")[:2], (program, case))
         for number in range(workers):
             self._benches.put(kill.Bench(self._settings, self._made / f"bench-{number}", originals))
         with concurrent.futures.ThreadPoolExecutor(workers) as pool:
-            planted = [pool.submit(self._plant, mutant, suites, tests) for mutant in chosen]
+            planted = [pool.submit(self._plant, mutant, cases, tests) for mutant in chosen]
             try:
                 for number, future in enumerate(concurrent.futures.as_completed(planted), start=1):
                     self._tell(future.result(), number, len(chosen))
@@ -222,10 +223,12 @@ def show(all_mutants, name, texts):
 
 
 def asked_for(words):
-    parser = argparse.ArgumentParser(usage="./dev mutate [--seed S] [NUMBER | WORD...] | --show NAME", add_help=False)
+    parser = argparse.ArgumentParser(usage="./dev mutate [--seed S] [--jobs N] [NUMBER | WORD...] | --show NAME",
+                                     add_help=False)
     parser.add_argument("cache", type=pathlib.Path)
     parser.add_argument("made", type=pathlib.Path)
     parser.add_argument("--seed", type=int, default=1)
+    parser.add_argument("--jobs", type=int, default=len(os.sched_getaffinity(0)))
     parser.add_argument("--show")
     parser.add_argument("--equivalents", type=pathlib.Path, default=EQUIVALENT)
     parser.add_argument("what", nargs="*")
@@ -235,14 +238,14 @@ def asked_for(words):
 def carry_out(arguments):
     began = time.monotonic()
     settings = kill.Settings(arguments.made / "settings.json")
-    all_mutants, texts = mutants.of_layer(settings.layer, settings.read), Texts(settings.layer)
+    (all_mutants, users), texts = mutants.of_layer(settings.layer, settings.read), Texts(settings.layer)
     if arguments.show:
         return show(all_mutants, arguments.show, texts)
     equivalents = read_equivalents(arguments.equivalents)
     results = Results(arguments.cache, settings.key())
     chosen = chosen_of(all_mutants, arguments)
     new = [mutant for mutant in chosen if not results.get(mutant)]
-    Campaign(settings, arguments.made.resolve(), results, texts).carry_out(new)
+    Campaign(settings, arguments.made.resolve(), users, results, texts).carry_out(new, max(1, arguments.jobs))
     judged = [(mutant, results.get(mutant)) for mutant in chosen]
     wrong = gone(equivalents, all_mutants) + verdict_on(judged, equivalents, texts)
     for line in wrong:

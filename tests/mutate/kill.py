@@ -95,17 +95,13 @@ class Cases:
         return fitting
 
     def stages(self, mutant):
-        """What runs in one go, one after the other: (program, cases, in how many seconds at most); the last are those
-        that do not run the place: what is computed once for several cases is noted for one of them alone."""
+        """What runs in one go, one after the other: (program, cases, in how many seconds at most). Cases that do not
+        run the place cannot see it: none keeps what it has from the layer for another one."""
         left = self._covering(mutant)
         goes = [self._within(self._likely(mutant), FIRST)]
         for part in (QUICK, SLOWER, None):
             left = [case for case in left if case not in set(goes[-1])]
             goes.append(self._within(left, part) if part else left)
-        done = {case for go in goes for case in go}
-        return self._by_program(goes), self._by_program([[case for case in self._seconds if case not in done]])
-
-    def _by_program(self, goes):
         for go in goes:
             for program in sorted({program for program, _ in go}):
                 cases = [case for case in go if case[0] == program]
@@ -194,31 +190,21 @@ class Bench:
         return changed is not None and all(
             made.read_bytes() == (self._originals / made.name).read_bytes() for made in changed.values())
 
-    def _first_to_see(self, stages, changed, tests):
-        """(verdict, the case); none when no case sees it"""
-        for name, cases, seconds in stages:
-            if name not in self._programs:
-                self._programs[name] = self.link(name, changed)[0]
-            if self._programs[name] is None:
-                return "refused", ""
-            answer, printed = tests.run(self._programs[name], cases, seconds)
-            if answer != 0:
-                return "hung" if answer == -signal.SIGXCPU else "killed", f"{name}:{saw_it(printed)}"
-        return None
-
     def judge(self, mutant, text, cases, tests):
         """(verdict, the case that has seen it)"""
-        changed, self._programs = self.objects(self._settings.compile, mutant, text), {}
+        changed, programs = self.objects(self._settings.compile, mutant, text), {}
         if not changed:
             return "refused", ""
-        running, others = cases.stages(mutant)
-        seen = self._first_to_see(running, changed, tests)
-        if seen is None and self.has_same_code(mutant, text):
-            return "same code", ""
-        seen = seen or self._first_to_see(others, changed, tests) or ("survived", "")
-        program, _, case = seen[1].partition(":")
-        cases.note(mutant.file, mutant.function, (program, case))
-        return seen
+        for name, some, seconds in cases.stages(mutant):
+            if name not in programs:
+                programs[name] = self.link(name, changed)[0]
+            if programs[name] is None:
+                return "refused", ""
+            answer, printed = tests.run(programs[name], some, seconds)
+            if answer != 0:
+                cases.note(mutant.file, mutant.function, (name, saw_it(printed)))
+                return "hung" if answer == -signal.SIGXCPU else "killed", f"{name}:{saw_it(printed)}"
+        return ("same code" if self.has_same_code(mutant, text) else "survived"), ""
 
 
 def saw_it(printed):

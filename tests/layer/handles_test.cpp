@@ -85,6 +85,19 @@ TEST_F(Handles, Init_KeepsWhateverItIsGiven)
     work(given);
 }
 
+TEST_F(Handles, Init_KeepsThoseThatSixteenBitsDoNotHold)
+{
+    for (unsigned i = 0; i < 0x100; ++i)
+    {
+        others_take(0x100);
+        board::trace::clear();
+    }
+    const Pair given = start(0);
+    EXPECT_LT(0x10000u, given.mutex);
+    EXPECT_EQ(given.mutex + 1, given.timer);
+    work(given);
+}
+
 TEST_F(Handles, Restart_WorksWithTheNewOnes_AndGivesThoseBack)
 {
     Pair last{};

@@ -92,7 +92,7 @@ TEST_F(InformVdp, InformVdpColorSpace_TheWholeStoredComponentIsTheKey)
     PMX_InformVdpColorSpace(0);
     EXPECT_TRACE(inform(1, { wide }));
 
-    constexpr Plane foreign{ 0x77, 9, 0x7709 };
+    constexpr Plane foreign{ 0x1041, 0x2009, 0x7709 };
     publish(foreign);
     set_record("arPortInfo[0].u2CompType", foreign.type);
     set_record("arPortInfo[0].u2CompId", foreign.id);

@@ -19,7 +19,10 @@ import sys
 
 sys.dont_write_bytecode = True
 
+sys.path.append(str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))
+
 import counted  # noqa: E402
+import whole_file  # noqa: E402
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 HERE = pathlib.Path(__file__).resolve().parent
@@ -115,7 +118,7 @@ def renew(missing, named, file):
     rest = without(missing, named)
     complaints = list(worse(rest, read_yet(file.read_text(encoding="utf-8")))) if file.exists() else []
     if not complaints:
-        file.write_text(written(rest), encoding="utf-8")
+        whole_file.write(file, written(rest))
     return complaints
 
 

@@ -54,7 +54,7 @@ class Packages(TreeTest):
                                   (("kernel", "--debug"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu flex"),
                                   (("kernel", "--all"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu flex"),
                                   (("prove",), "python3 gcc-bare clang"),
-                                  (("mutate",), "python3 cmake libx-dev g++ g++-linux clang gcc-bare gcovr"),
+                                  (("mutate",), "python3 cmake libx-dev g++ g++-linux clang gcc-bare gcovr clang-19"),
                                   (("docs",), ""),
                                   (("clean",), ""),
                                   (("help",), ""),

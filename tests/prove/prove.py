@@ -94,10 +94,11 @@ class Program:
 
 
 class Verdict:
-    """How many checks the checker made, and what is wrong."""
+    """How many checks the checker made, what is wrong, and (place, words) of what was refuted: behind that much is
+    unknown, and complaints of the checker itself say nothing of the layer."""
 
     def __init__(self, text, worlds=len(harness.WORLDS), complaint=""):
-        place, self.number, self.wrong, reached = "", 0, [], []
+        place, self.number, self.wrong, self.failed, reached = "", 0, [], [], []
         for line in text.splitlines():
             where, checked = PLACE.match(line), CHECKED.match(line)
             if where:
@@ -106,6 +107,8 @@ class Verdict:
                 reached.append(checked[4])
             elif checked:
                 self.number += 1
+                if checked[4] == "FAILURE":
+                    self.failed.append((f"{place}:{checked[2]}", checked[3]))
                 if checked[4] != "SUCCESS":
                     self.wrong.append(f"{place}:{checked[2]}: {checked[3]}: {checked[4]}")
         # Behind what fails the checker does not know; what fails goes first.
@@ -171,16 +174,22 @@ def planted(fault, folder):
     return folder
 
 
+def seen_as(fault, verdict):
+    """Where a fault was seen, in the words and the file that are noted with it; or nothing."""
+    return next((f"{place}: {words}" for place, words in verdict.failed
+                 if fault["seen"] in words and fault.get("at", "") in place), "")
+
+
 def find(base, cbmc, fault, folder):
     """What is wrong with finding a fault, and what was seen of it."""
     try:
         program = Program(cbmc, planted(fault, folder / "tree"), folder / "view", base)
         program.build()
-        wrong = program.check(fault["operation"], fault.get("world", harness.WORLDS[0])).wrong
+        verdict = program.check(fault["operation"], fault.get("world", harness.WORLDS[0]))
     except view.Failed as reason:
         return str(reason).splitlines(), ""
-    seen = [line for line in wrong if fault["seen"] in line]
-    return [] if seen else [f"it was not seen as: {fault['seen']}", *wrong], (seen or [""])[0]
+    seen = seen_as(fault, verdict)
+    return [] if seen else [f"it was not seen as: {fault['seen']}", *verdict.wrong], seen
 
 
 def sample(faults, everything):

@@ -93,6 +93,20 @@ class Verdicts(unittest.TestCase):
 
 
 class Faults(unittest.TestCase):
+    def seen(self, text, **words):
+        verdict = prove.Verdict(f"src/x.cpp function f\n{text}{REACHED}")
+        return prove.seen_as({"seen": "division by zero", **words}, verdict)
+
+    def test_one_is_seen_in_what_was_refuted_alone(self):
+        refuted = "[f.1] line 7 division by zero in a / b: FAILURE\n"
+        self.assertEqual("src/x.cpp:7: division by zero in a / b", self.seen(refuted))
+        self.assertEqual("src/x.cpp:7: division by zero in a / b", self.seen(refuted, at="x.cpp"))
+        self.assertEqual("", self.seen(refuted, at="y.cpp"))
+        self.assertEqual("", self.seen(refuted, seen="x.cpp"))
+        self.assertEqual("", self.seen("[f.1] line 7 division by zero in a / b: UNKNOWN\n"))
+        died = prove.Verdict("", complaint="division by zero: FAILURE")
+        self.assertEqual("", prove.seen_as({"seen": "division by zero"}, died))
+
     def test_each_can_be_planted_and_belongs_to_an_operation(self):
         names = {function.name for function in harness.operations(harness.ROOT)}
         faults = prove.all_faults()

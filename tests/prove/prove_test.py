@@ -41,8 +41,16 @@ class View(unittest.TestCase):
                          read("x->arPortInfo[a[b + 1]].fgEnabled"))
         self.assertEqual("f() { P* p = x->arPortInfo;\n p[PMX_WITHIN(i, PMX_PORT_NUM)];\n}\np[i];",
                          read("f() { P* p = x->arPortInfo;\n p[i];\n}\np[i];"))
+        self.assertEqual("f() { P* p = x->arPortInfo;\n return p[PMX_WITHIN(i, PMX_PORT_NUM)];\n}\n",
+                         read("f() { P* p = x->arPortInfo;\n return p[i];\n}\n"))
         self.assertEqual('"x.arPortInfo[%d]"', read('"x.arPortInfo[%d]"'))
         self.assertEqual({"aucPlaneOrder", "arPortInfo", "arOutputConf"}, view.member_arrays(view.ROOT).keys())
+
+    def test_what_cannot_be_guarded_is_refused(self):
+        for text in ("memcpy(x->arPortInfo, y, 9);", "*(x.arPortInfo + 9) = y;", "f(y, x->arPortInfo);",
+                     "x->arPortInfo[i++].fgEnabled", "x->arPortInfo[f(i)].fgEnabled", "x->arPortInfo[i = 3].fgEnabled"):
+            with self.subTest(text), self.assertRaises(view.Failed):
+                read(text)
 
 
 class Promises(unittest.TestCase):

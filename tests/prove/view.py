@@ -54,15 +54,18 @@ def member_arrays(root):
 
 
 def _guard(text, name, length):
-    """NAME[index] becomes NAME[PMX_WITHIN(index, length)], whatever brackets the index has."""
+    """NAME[index] becomes NAME[PMX_WITHIN(index, length)], whatever brackets the index has; the guard looks at it
+    twice."""
     done, at = "", 0
-    for match in re.finditer(rf"(?<=[>.]){name}\[|\b(?<!\w ){name}\[", text):
+    for match in re.finditer(rf"(?<=[>.]){name}\[|\b(?:(?<!\w )|(?<=return )|(?<=else )){name}\[", text):
         if match.start() < at:
             continue
         depth, end = 1, match.end()
         while depth:
             depth += {"[": 1, "]": -1}.get(text[end], 0)
             end += 1
+        if re.search(r"\+\+|--|(?<![=!<>])=(?!=)|\(", text[match.end():end - 1]):
+            raise Failed(f"{name}[{text[match.end():end - 1]}]: an index that does something cannot be guarded")
         done += f"{text[at:match.end()]}{GUARD}({text[match.end():end - 1]}, {length})]"
         at = end
     return done + text[at:]
@@ -70,6 +73,8 @@ def _guard(text, name, length):
 
 def _guarded(text, arrays):
     for name, length in arrays.items():
+        if re.search(rf"(?:->|\.){name}\s*[,)+]", text):
+            raise Failed(f"{name}: handed over or moved along, an array inside a record goes on behind its end unseen")
         text = _guard(text, name, length)
     # A pointer that is set to such an array is one until its function ends.
     for name, length in arrays.items():

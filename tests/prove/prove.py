@@ -52,13 +52,19 @@ class Program:
         shutil.rmtree(folder, ignore_errors=True)
         folder.mkdir(parents=True)
         sources = view.write(root, folder)
+        self._headers = {path.name: path.read_text(encoding="utf-8") for path in (folder / "include").iterdir()}
+        alike = others and others._headers == self._headers
+        self._harness = others._harness if alike else harness.text(root)
         written = folder / "harness.c"
-        written.write_text(harness.text(root), encoding="utf-8")
+        written.write_text(self._harness, encoding="utf-8")
         names = [source.name for source in (*sources, written)] + [str(HERE / "surroundings.c")]
-        self._preprocessed = {pathlib.PurePath(name).stem: self._preprocess(name) for name in names}
+        self._texts = {name: (folder / name).read_text(encoding="utf-8") for name in names}
+        known = {name for name in names if others._texts.get(name) == self._texts[name]} if alike else ()
+        self._preprocessed = {stem: others._preprocessed[stem] if name in known else self._preprocess(name)
+                              for name, stem in ((name, pathlib.PurePath(name).stem) for name in names)}
         whole = "".join([cbmc.version, *OPTIONS, *self._preprocessed.values()])
         self.key = hashlib.sha256(whole.encode()).hexdigest()[:32]
-        self._others = others  # a program whose objects are used where they are of the same text
+        self._others = others  # a program whose texts and objects are used where they are the same
 
     def _preprocess(self, name):
         """The same wherever the folder is: what has no fault in it is compiled once."""

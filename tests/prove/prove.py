@@ -259,7 +259,7 @@ def asked_for(words):
     parser.add_argument("made", type=pathlib.Path)
     parser.add_argument("--faults", action="store_true")
     parser.add_argument("operation", nargs="*")
-    chosen = parser.parse_args(words)
+    chosen = parser.parse_intermixed_args(words)  # the option may stand in front of the operations
     names = [function.name for function in harness.operations(ROOT)]
     for name in chosen.operation:
         if name not in names:

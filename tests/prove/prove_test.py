@@ -132,6 +132,15 @@ class Faults(unittest.TestCase):
         self.assertEqual([1], prove.sample([1], False))
 
 
+class Arguments(unittest.TestCase):
+    def test_the_option_stands_where_it_likes(self):
+        for words in (["--faults", "PMX_SetMode"], ["PMX_SetMode", "--faults"]):
+            chosen, names, faults = prove.asked_for(["cache", "made", *words])
+            self.assertTrue(chosen.faults)
+            self.assertEqual(["PMX_SetMode"], names)
+            self.assertEqual({"PMX_SetMode"}, {fault["operation"] for fault in faults})
+
+
 class Page(unittest.TestCase):
     def test_it_tells_what_is_presumed_and_excepted(self):
         for names in (harness.STORED_ALL_THE_SAME, harness.LOWERS_THE_FLAG, harness.PRESUMED):

@@ -27,6 +27,7 @@ sys.dont_write_bytecode = True
 
 import checker  # noqa: E402
 import harness  # noqa: E402
+import promises  # noqa: E402
 import view  # noqa: E402
 from ktap import Ktap  # noqa: E402
 
@@ -38,7 +39,6 @@ LIMIT = 600  # seconds for one operation
 # A place beyond the longest loop: what goes round more often is an error, told as such.
 OPTIONS = ["--nondet-static", "--unwind", "9", "--object-bits", "10", "--drop-unused-functions"]
 GUARD = '(__CPROVER_assert((size_t)(i)<(n),"index within the array of a record"),(i))'
-REACHED = "the end is reached"
 CHECKED = re.compile(r"^\[(\S+)\] (?:line (\d+) )?(.*): (SUCCESS|FAILURE|UNKNOWN|ERROR)$", re.M)
 PLACE = re.compile(r"^(\S+) function (\w+)$", re.M)
 COMPILER = ["--native-compiler", "arm-none-eabi-gcc", "-mcpu=cortex-a9"]
@@ -91,25 +91,25 @@ class Program:
     def check(self, operation, world=None):
         """What the checker says of an operation, in every world or in one."""
         entry = f"{world}_{operation}" if world else f"{harness.ENTRY}{operation}"
-        worlds = 1 if world else len(harness.WORLDS)
+        ends = sum(harness.ends(self._harness, operation, each) for each in ([world] if world else harness.WORLDS))
         try:
             ran = self._cbmc.run("cbmc", self._folder / "whole", *OPTIONS, "--function", entry, timeout=LIMIT)
         except subprocess.TimeoutExpired:
-            return Verdict("", worlds, f"the checker took longer than {LIMIT} s")
-        return Verdict(ran.stdout, worlds, (ran.stdout + ran.stderr)[-300:])
+            return Verdict("", ends, f"the checker took longer than {LIMIT} s")
+        return Verdict(ran.stdout, ends, (ran.stdout + ran.stderr)[-300:])
 
 
 class Verdict:
     """How many checks the checker made, what is wrong, and (place, words) of what was refuted: behind that much is
     unknown, and complaints of the checker itself say nothing of the layer."""
 
-    def __init__(self, text, worlds=len(harness.WORLDS), complaint=""):
+    def __init__(self, text, ends=len(harness.WORLDS), complaint=""):
         place, self.number, self.wrong, self.failed, reached = "", 0, [], [], []
         for line in text.splitlines():
             where, checked = PLACE.match(line), CHECKED.match(line)
             if where:
                 place = where[1].removeprefix(f"{ROOT}/")
-            elif checked and checked[3] == REACHED:
+            elif checked and checked[3].startswith(harness.REACHED):
                 reached.append(checked[4])
             elif checked:
                 self.number += 1
@@ -124,7 +124,7 @@ class Verdict:
         # presumed too much.
         if not reached:
             self.wrong.append(f"nothing was proved: {complaint}")
-        elif reached != ["FAILURE"] * worlds:
+        elif reached != ["FAILURE"] * ends:
             self.wrong.append("an end is not reached: what is presumed cannot be")
 
 
@@ -276,7 +276,7 @@ def main():
     except checker.Unavailable as reason:
         ktap.skip("proof", str(reason).replace("\n", " "))
         skipped = True
-    except view.Failed as reason:
+    except (view.Failed, promises.Unclear) as reason:
         ktap.verdict("proof", str(reason).splitlines())
     ktap.end()
     spent = os.times()

@@ -3,6 +3,7 @@
 """The layer as C is the layer; each fault can be planted; what the checker says is read; and the page about it tells
 what is presumed. The proof itself needs the checker, and is ./dev prove."""
 
+import dataclasses
 import pathlib
 import re
 import sys
@@ -12,11 +13,13 @@ import unittest
 sys.dont_write_bytecode = True
 
 import harness  # noqa: E402
+import pointers  # noqa: E402
+import promises  # noqa: E402
 import prove  # noqa: E402
 import view  # noqa: E402
 
 PAGE = (prove.ROOT / "docs/proof.md").read_text(encoding="utf-8")
-REACHED = "".join(f"[{world}_x.assertion.1] line 9 {prove.REACHED}: FAILURE\n" for world in harness.WORLDS)
+REACHED = "".join(f"[{world}_x.assertion.1] line 9 {harness.REACHED}: FAILURE\n" for world in harness.WORLDS)
 
 
 def read(text):
@@ -46,6 +49,7 @@ class View(unittest.TestCase):
         self.assertEqual('"x.arPortInfo[%d]"', read('"x.arPortInfo[%d]"'))
         self.assertEqual({"aucPlaneOrder", "arPortInfo", "arOutputConf"}, view.member_arrays(view.ROOT).keys())
 
+
     def test_what_cannot_be_guarded_is_refused(self):
         for text in ("memcpy(x->arPortInfo, y, 9);", "*(x.arPortInfo + 9) = y;", "f(y, x->arPortInfo);",
                      "x->arPortInfo[i++].fgEnabled", "x->arPortInfo[f(i)].fgEnabled", "x->arPortInfo[i = 3].fgEnabled"):
@@ -58,17 +62,68 @@ class Promises(unittest.TestCase):
         self.functions = {function.name: function for function in harness.operations(harness.ROOT)}
 
     def of(self, name):
-        return [condition for condition, _ in harness.promises(self.functions[name], set())]
+        return promises.of_result(self.functions[name], set())
+
+    def told(self, result):
+        function = dataclasses.replace(self.functions["PMX_GetGamma"], contract=f"Read.\n@return {result}")
+        return promises.of_result(function, set())
 
     def test_they_are_read_from_the_contracts(self):
-        self.assertEqual(["!inRange || result <= 1", "ucPmxId == 0 || result == 0", "pucGamma != 0 || result == 0",
-                          "(_arPmxConf[0].u4Capability >> 20 & 1) != 0 || result == 0"], self.of("PMX_GetGamma"))
-        self.assertEqual(["result == 1"], self.of("PMX_SetOsdEnable"))
-        self.assertIn("(UCHAR)(size_t)pvTag == 0 || result == 0", self.of("i4PmxSetMode"))
+        self.assertEqual((["ucPmxId != 0", "pucGamma == 0", promises.LACKS.format(20)],
+                          [("!refused[0] || result == 0", "0: a mixer id other than 0"),
+                           ("!refused[1] || result == 0", "0: a null pointer"),
+                           ("!refused[2] || result == 0", "0: capability bit 20 is clear"),
+                           ("refused[0] || refused[1] || refused[2] || result == 1", "1: all else")]),
+                         self.of("PMX_GetGamma"))
+        self.assertEqual(([], [("result == 1", "1: all else")]), self.of("PMX_SetOsdEnable"))
+        self.assertIn(("!refused[0] || result == 0", "0: a tag whose low 8 bits are not 0"), self.of("i4PmxSetMode")[1])
+        self.assertIn((f"!({promises.HDMI_REFUSES}) || result == 0", "0: the HDMI/AV driver refuses it"),
+                      self.of("PMX_SetAspectRatio")[1])
+        self.assertEqual("result == PMX_NO_SUCH_PORT", promises.refusal_of(self.functions["i4Pmx_Connect"], set()))
+        self.assertEqual("", promises.refusal_of(self.functions["PMX_SetOsdEnable"], set()))
+
+    def test_words_that_nobody_understands_are_refused(self):
+        self.assertEqual(["ucPmxId != 0"], self.told("1; 0 for a mixer id other than 0, and then it rains")[0])
+        for result in ("a number", "1; 0 for a blue moon", "1; sometimes 0", "1 on Mondays; 0 for a null pointer",
+                       "1; 0 for a plane without a port"):
+            with self.subTest(result), self.assertRaises(promises.Unclear):
+                self.told(result)
+
+    def test_who_stores_nothing_says_so(self):
+        nothing = {name for name, function in self.functions.items()
+                   if promises.stores_nothing(function, self.functions)}
+        self.assertLessEqual({"PMX_GetCap", "i4PmxGetMode", "PMX_QueryStatus", "PMX_SetMediaType", "i4PMX_Suspend",
+                              "PMX_Printf", "i4PmxOsdEnabled", "PMX_CheckCap"}, nothing)
+        self.assertFalse({"d_PMX_Set2DSmooth", "PMX_SetMode", "PMX_SetDelay", "PMX_SetForceMode"} & nothing)
+
+    def test_who_may_sleep_says_so(self):
+        for context in ("a thread that may sleep; takes no lock", "any thread that may sleep",
+                        "the framework's thread, with no other mixer call running; sleeps"):
+            self.assertTrue(promises.may_sleep(context))
+        for context in ("any thread; takes no lock", "the timer's", "any thread, and the timer's; any time", "any"):
+            self.assertFalse(promises.may_sleep(context))
 
     def test_whatever_is_named_is_an_operation(self):
-        for names in (harness.STORED_ALL_THE_SAME, harness.LOWERS_THE_FLAG, harness.PRESUMED, harness.ALSO):
+        for names in (promises.STORED_ALL_THE_SAME, promises.OTHER_WORDS, promises.UNSAID, promises.NOTHING_DONE,
+                      harness.PRESUMED, harness.ALSO, harness.CALLED_BY, harness.FORGETS_THE_TIMER):
             self.assertLessEqual(set(names), self.functions.keys())
+
+    def test_what_is_handed_over_is_looked_at_where_it_is_written(self):
+        text = harness.stand_ins(harness.ROOT)
+        for name, (condition, what) in harness.HANDED.items():
+            self.assertIn(f'CLAIM({condition}, "{name}: {what}");', text)
+        self.assertIn('CLAIM(!mind.mayNotSleep, "x_thread_delay: called where it may sleep");', text)
+        self.assertNotIn('"PMX_IsLog: called where it may sleep"', text)
+
+    def test_each_symbol_is_compared_with_what_it_names(self):
+        by_hand = {"x_timer_start", "i4ImQueryInterface"}
+        callbacks = harness.callback_types(harness.ROOT)
+        for header in harness.PLATFORM_HEADERS:
+            for function in harness.functions(harness.ROOT / header):
+                if any(pointers.pointer_of(function, type_name, name, callbacks).kind == "symbol"
+                       for type_name, name in pointers.declared_parameters(function)
+                       if pointers.is_pointer(type_name, callbacks)):
+                    self.assertIn(function.name, harness.HANDED.keys() | by_hand)
 
     def test_every_operation_is_called_in_every_world(self):
         text = harness.text(harness.ROOT)
@@ -143,7 +198,7 @@ class Arguments(unittest.TestCase):
 
 class Page(unittest.TestCase):
     def test_it_tells_what_is_presumed_and_excepted(self):
-        for names in (harness.STORED_ALL_THE_SAME, harness.LOWERS_THE_FLAG, harness.PRESUMED):
+        for names in (promises.STORED_ALL_THE_SAME, promises.UNSAID, harness.PRESUMED, harness.FORGETS_THE_TIMER):
             for name in names:
                 self.assertIn(f"`{name}`", PAGE)
 

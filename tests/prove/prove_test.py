@@ -186,6 +186,23 @@ class Faults(unittest.TestCase):
         self.assertEqual(faults, prove.sample(faults, True))
         self.assertEqual([1], prove.sample([1], False))
 
+    def test_each_claim_has_one(self):
+        seen = [fault["seen"] for fault in prove.all_faults()]
+        by_hand = re.findall(r'CLAIM\([^"]*"([^"]*)"\)', (prove.HERE / "surroundings.c").read_text(encoding="utf-8"))
+        of_the_checker = ("upper bound", "pointer NULL in", "pointer outside object bounds", "arithmetic overflow",
+                          "shift distance too large", "shift distance is negative", "unwinding assertion",
+                          "source region readable", "index within the array of a record")
+        of_contracts = ("can be read", "can be written", "has a meaning", "called where it may sleep", "takes no lock",
+                        "a refusal leaves", "it leaves", "what is given stays", "flags stay in their ranges",
+                        "refused, ", "the layer knows its timer", "0: a mixer id", "0: a null pointer",
+                        "0: capability bit", "0: a tag", "PMX_NO_SUCH_PORT: ", "1: all else")
+        more = [condition for conditions in harness.ALSO.values() for condition in conditions]
+        handed = [f"{name}: {what}" for name, (_, what) in harness.HANDED.items() if not name.startswith("unregister")]
+        for words in (*by_hand, *of_the_checker, *of_contracts, *more, *handed):
+            words = re.sub(r".*: (?=called where)", "", words)
+            with self.subTest(words):
+                self.assertTrue(any(words in each or each.rpartition(": ")[2] in words for each in seen))
+
 
 class Arguments(unittest.TestCase):
     def test_the_option_stands_where_it_likes(self):

@@ -4,10 +4,11 @@
 what docs/proof.md says; and that faults which are planted in copies of the sources are found. Prints KTAP; ends with 1
 when something does not hold, and with 77 when the checker is not to be had.
 
-usage: prove.py CACHE MADE [--faults] [OPERATION...]
+usage: prove.py CACHE MADE [--faults | --sample NUMBER] [OPERATION...]
     CACHE      folder in which the checker is kept, and what was proved of these very sources
     MADE       folder for all that is written on the way
-    --faults   plant every fault of faults.toml, not a sample
+    --faults   plant every fault of faults.toml
+    --sample   plant so many of them, those of the day; 8 when nothing is said
     OPERATION  prove these alone, and plant the faults that are theirs
 """
 
@@ -198,9 +199,15 @@ def find(base, cbmc, fault, folder):
     return [] if seen else [f"it was not seen as: {fault['seen']}", *verdict.wrong], seen
 
 
-def sample(faults, everything):
-    """All faults, or some that are spread over the list."""
-    return faults if everything else faults[::max(1, len(faults) // SAMPLE)][:SAMPLE]
+def sample(faults, number, turn):
+    """So many faults that are spread over the list, in each turn others. A quarter each is from the worlds in which
+    somebody acts, as far as they have so many."""
+    theirs = {world: [fault for fault in faults if fault.get("world", harness.WORLDS[0]) == world]
+              for world in harness.WORLDS}
+    share = {world: min(len(theirs[world]), number // 4) for world in harness.WORLDS[1:]}
+    share[harness.WORLDS[0]] = min(len(theirs[harness.WORLDS[0]]), number - sum(share.values()))
+    return [theirs[world][(turn + each * len(theirs[world]) // share[world]) % len(theirs[world])]
+            for world in harness.WORLDS for each in range(share[world])]
 
 
 def in_turn(pool, work, things):
@@ -244,22 +251,27 @@ def carry_out(ktap, chosen, names, faults):
     the_view(ktap, made / "view")
     program = Program(cbmc, ROOT, made / "whole")
     program.build()
-    planting = sample(faults, chosen.faults or chosen.operation)
+    day = int(time.time()) // 86400
+    planting = faults if chosen.faults or chosen.operation else sample(faults, chosen.sample, day)
     with concurrent.futures.ThreadPoolExecutor(len(os.sched_getaffinity(0))) as pool:
         if not the_operations(ktap, pool, program, Results(chosen.cache / "proved", program.key), names):
             ktap.verdict("proof", ["nothing was proved"])
         the_faults(ktap, pool, program, cbmc, planting, made)
-    print(f"# {len(planting)} of {len(faults)} faults planted")
+    which = f", those of day {day}" if planting != faults else ""
+    print(f"# {len(planting)} of {len(faults)} faults planted{which}")
 
 
 def asked_for(words):
     """(what was asked for, the operations to prove, the faults that are theirs)"""
-    parser = argparse.ArgumentParser(usage="./dev prove [--faults] [OPERATION...]", add_help=False)
+    parser = argparse.ArgumentParser(usage="./dev prove [--faults | --sample NUMBER] [OPERATION...]", add_help=False)
     parser.add_argument("cache", type=pathlib.Path)
     parser.add_argument("made", type=pathlib.Path)
     parser.add_argument("--faults", action="store_true")
+    parser.add_argument("--sample", type=int, default=SAMPLE)
     parser.add_argument("operation", nargs="*")
     chosen = parser.parse_intermixed_args(words)  # the option may stand in front of the operations
+    if chosen.sample < 1:
+        parser.error("--sample: at least 1")
     names = [function.name for function in harness.operations(ROOT)]
     for name in chosen.operation:
         if name not in names:

@@ -179,12 +179,19 @@ class Faults(unittest.TestCase):
                 self.assertNotEqual(prove.faulty(fault), (view.ROOT / view.LAYER / fault["file"]).read_text("utf-8"))
                 self.assertIn(fault["operation"], names)
 
-    def test_a_sample_is_spread_over_the_list(self):
-        faults = list(range(78))
-        self.assertEqual(prove.SAMPLE, len(set(prove.sample(faults, False))))
-        self.assertGreater(max(prove.sample(faults, False)), 60)
-        self.assertEqual(faults, prove.sample(faults, True))
-        self.assertEqual([1], prove.sample([1], False))
+    def test_a_sample_has_some_of_each_world_and_others_in_each_turn(self):
+        numbers = {"NOBODY": 31, "ANYBODY": 3, "HANDSHAKE": 11}
+        faults = [{"what": number, "world": world} for world in harness.WORLDS for number in range(numbers[world])]
+        for number, shares in ((8, (4, 2, 2)), (20, (12, 3, 5)), (len(faults), (31, 3, 11)), (1, (1, 0, 0))):
+            seen = []
+            for turn in range(31):
+                chosen = prove.sample(faults, number, turn)
+                self.assertEqual(len(chosen), len({(fault["world"], fault["what"]) for fault in chosen}))
+                for world, share in zip(harness.WORLDS, shares):
+                    self.assertEqual(share, len([fault for fault in chosen if fault["world"] == world]))
+                seen += [fault for fault in chosen if fault not in seen]
+            self.assertEqual(31 if number == 1 else len(faults), len(seen))
+        self.assertEqual([{"what": 1}], prove.sample([{"what": 1}], 8, 3))
 
     def test_each_claim_has_one(self):
         seen = [fault["seen"] for fault in prove.all_faults()]
@@ -203,12 +210,12 @@ class Faults(unittest.TestCase):
             with self.subTest(words):
                 self.assertTrue(any(words in each or each.rpartition(": ")[2] in words for each in seen))
 
-
 class Arguments(unittest.TestCase):
     def test_the_option_stands_where_it_likes(self):
         for words in (["--faults", "PMX_SetMode"], ["PMX_SetMode", "--faults"]):
             chosen, names, faults = prove.asked_for(["cache", "made", *words])
             self.assertTrue(chosen.faults)
+            self.assertEqual(prove.SAMPLE, chosen.sample)
             self.assertEqual(["PMX_SetMode"], names)
             self.assertEqual({"PMX_SetMode"}, {fault["operation"] for fault in faults})
 
@@ -222,6 +229,9 @@ class Page(unittest.TestCase):
     def test_its_numbers_are_right(self):
         self.assertEqual(len(harness.operations(harness.ROOT)), int(re.search(r"\b(\d+) operations\b", PAGE)[1]))
         self.assertEqual(len(prove.all_faults()), int(re.search(r"\b(\d+) faults\b", PAGE)[1]))
+        self.assertEqual(prove.SAMPLE, int(re.search(r"`./dev prove` plants (\d+)\b", PAGE)[1]))
+        run = (prove.ROOT / ".ci/run").read_text(encoding="utf-8")
+        self.assertIn(f"`{re.search(r'./dev prove .*', run)[0]}`", PAGE)
 
 
 if __name__ == "__main__":

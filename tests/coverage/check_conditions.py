@@ -14,8 +14,10 @@ import pathlib
 import sys
 
 sys.dont_write_bytecode = True
+sys.path.append(str(pathlib.Path(__file__).resolve().parents[1] / "common"))
 
 import counted  # noqa: E402
+import figures  # noqa: E402
 from check_coverage import SWEEPS  # noqa: E402
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
@@ -45,6 +47,10 @@ def main():
     if not sum(file.totals()["condition"].all for file in files):
         sys.exit("no condition of the layer was counted")
     tools.page(arguments.programs, counts, [ROOT / file.name for file in files], counts / "page")
+
+    total = counted.sum_of(files, counted.KINDS)
+    figures.note("coverage", **{f"{kind}_{part}": number for kind in counted.KINDS
+                                for part, number in total[kind]._asdict().items()})
 
     named, complaints = counted.read_list(arguments.list.read_text(encoding="utf-8"))
     named = {missing: number for missing, number in named.items() if missing.file.startswith(LAYER)}

@@ -221,12 +221,15 @@ def judge(missing, known):
             yield f"{one}\n    {never} {NEVER[one.kind]}, {expected} in the list"
 
 
+def sum_of(files, kinds):
+    return {kind: sum((file.totals()[kind] for file in files), Total(0, 0)) for kind in kinds}
+
+
 def table(files, kinds):
     """One row a file, and their sum."""
     yield f"{'':52}" + "".join(f"{kind:>22}" for kind in kinds)
-    total = {kind: Total(0, 0) for kind in kinds}
     for file in files:
         here = file.totals()
-        total = {kind: total[kind] + here[kind] for kind in kinds}
         yield f"{file.name:52}" + "".join(f"{here[kind]!s:>22}" for kind in kinds)
+    total = sum_of(files, kinds)
     yield f"{'all':52}" + "".join(f"{total[kind]!s:>22}" for kind in kinds)

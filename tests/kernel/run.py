@@ -29,6 +29,7 @@ import scenarios  # noqa: E402
 HERE = pathlib.Path(__file__).resolve().parent
 sys.path[:0] = [str(HERE.parent / "recorder"), str(HERE.parent / "common")]
 
+import figures  # noqa: E402
 from ktap import Ktap  # noqa: E402
 from recordings import Recording  # noqa: E402
 
@@ -346,6 +347,7 @@ def compare_all(ktap, cache, made, program, shipped):
     has_processors(ktap, console)
     compare(ktap, "several processors:", expected_of(expected, commands), console)
     replays(ktap, "several processors:", program, commands, console, made / "several-recordings")
+    figures.note("kernel", verdicts=ktap.number)
 
 
 def carried_out(work, words):

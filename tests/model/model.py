@@ -15,6 +15,11 @@ import subprocess
 import sys
 import tempfile
 
+sys.dont_write_bytecode = True
+sys.path.append(str(pathlib.Path(__file__).resolve().parents[1] / "common"))
+
+import figures  # noqa: E402
+
 HERE = pathlib.Path(__file__).resolve().parent
 MODEL = HERE / "handshake.pml"
 CLAIM = "graphics_come_back"
@@ -114,6 +119,7 @@ def check(writer, folder):
         print(f"{'found' if found else 'NOT FOUND'} by the {by}: {what}")
         if not found:
             wrong.append(f"planted and not found: {what}")
+    figures.note("model", transitions=len(layer), causes=len(causes), planted=len(PLANTED))
     return wrong
 
 

@@ -28,7 +28,9 @@ import threading
 import time
 
 sys.dont_write_bytecode = True
+sys.path.append(str(pathlib.Path(__file__).resolve().parents[1] / "common"))
 
+import figures  # noqa: E402
 import kill  # noqa: E402
 import mutants  # noqa: E402
 from mutants import Failed  # noqa: E402
@@ -250,6 +252,8 @@ def carry_out(arguments):
     wrong = gone(equivalents, all_mutants) + verdict_on(judged, equivalents, texts)
     for line in wrong:
         print(line)
+    if arguments.equivalents == EQUIVALENT:
+        figures.note("mutate", mutants=len(all_mutants), equivalent=len(equivalents))
     summary(judged, time.monotonic() - began, [results.get(mutant) for mutant in new])
     return 1 if wrong else 0
 

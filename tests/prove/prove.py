@@ -27,6 +27,7 @@ import tomllib
 sys.dont_write_bytecode = True
 
 import checker  # noqa: E402
+import figures  # noqa: E402
 import harness  # noqa: E402
 import promises  # noqa: E402
 import view  # noqa: E402
@@ -254,9 +255,12 @@ def carry_out(ktap, chosen, names, faults):
     day = int(time.time()) // 86400
     planting = faults if chosen.faults or chosen.operation else sample(faults, chosen.sample, day)
     with concurrent.futures.ThreadPoolExecutor(len(os.sched_getaffinity(0))) as pool:
-        if not the_operations(ktap, pool, program, Results(chosen.cache / "proved", program.key), names):
+        checks = the_operations(ktap, pool, program, Results(chosen.cache / "proved", program.key), names)
+        if not checks:
             ktap.verdict("proof", ["nothing was proved"])
         the_faults(ktap, pool, program, cbmc, planting, made)
+    if not chosen.operation:
+        figures.note("prove", operations=len(names), checks=checks, faults=len(faults))
     which = f", those of day {day}" if planting != faults else ""
     print(f"# {len(planting)} of {len(faults)} faults planted{which}")
 

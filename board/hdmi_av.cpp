@@ -10,6 +10,7 @@
 #include "board/device_values.h"
 #include "board/devices.h"
 #include "board/display_part.h"
+#include "board/shown.h"
 #include "board/trace.h"
 #include "drv_av_d.h"
 
@@ -101,6 +102,16 @@ Value content(const Command& command, const void* parameter)
     return board::named(command.family, *static_cast<const UINT8*>(parameter));
 }
 
+/** Of the last call of a command that changes a resolution; nothing while there was none. */
+std::optional<board::hdmi_av::Told> told_by(UINT32 u4Command, std::string_view enable, std::string_view mode)
+{
+    const auto row = static_cast<std::size_t>(find_command(u4Command) - COMMANDS.begin());
+    const Value& parameter = hdmi_av_state.parameters.at(row);
+    if (parameter.kind() == Value::Kind::Null)
+        return std::nullopt;
+    return board::hdmi_av::Told{ parameter.find(enable)->as_number() != 0, parameter.find(mode)->as_number() };
+}
+
 Value reported(const std::array<Value, COMMANDS.size()>& parameters)
 {
     Value value = Value::record({});
@@ -167,6 +178,12 @@ Value state()
                            { "posted_colour_space", setting(av.posted_colour_space, Family::ColorSpace) },
                            { "change_ok_notices", Value::number(av.change_ok_notices) },
                            { "ccir_before_mixer", setting(av.ccir_before_mixer) } });
+}
+
+Shown shown()
+{
+    return { hdmi_av_state.sink_plugged, told_by(PMX_SET_HDMI_RES_CHG, "fgHdmiOutEnable", "ucHdmiOutDisplayResolution"),
+             told_by(PMX_SET_CCIR_RES_CHG, "fgCCIROutEnable", "ucCCIROutResolution") };
 }
 
 CallArgument command_parameter(const void* parameter, std::uint32_t number)

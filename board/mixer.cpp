@@ -12,6 +12,7 @@
 #include "board/device_values.h"
 #include "board/devices.h"
 #include "board/layer_state.h"
+#include "board/shown.h"
 #include "board/trace.h"
 #include "pmx_hal.h"
 
@@ -274,6 +275,12 @@ Value state()
     value.add("vsync",
               Value::record({ { "initialised", flag(m.vsync_initialised) }, { "enabled", flag(m.vsync_enabled) } }));
     return value;
+}
+
+Shown shown()
+{
+    const Mixer& m = mixer_state;
+    return { m.mixed, m.muted, m.digital_out.enabled, m.digital_out.bits };
 }
 
 } // namespace board::mixer

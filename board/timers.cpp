@@ -7,6 +7,7 @@
 
 #include "board/device_values.h"
 #include "board/devices.h"
+#include "board/shown.h"
 #include "board/threads.h"
 
 #include "u_os.h"
@@ -165,6 +166,14 @@ Value state()
         timers.push_back(std::move(value));
     }
     return Value::list(std::move(timers));
+}
+
+const void* next_call_of(std::uint32_t handle)
+{
+    const auto timer = timers_state.timers.find(handle);
+    return timer != timers_state.timers.end() && timer->second.running
+               ? reinterpret_cast<const void*>(timer->second.callback)
+               : nullptr;
 }
 
 void set_alarm(std::chrono::microseconds due, void (*action)())

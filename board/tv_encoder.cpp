@@ -7,6 +7,7 @@
 
 #include "board/device_values.h"
 #include "board/devices.h"
+#include "board/shown.h"
 #include "board/trace.h"
 
 namespace
@@ -108,6 +109,12 @@ Value reported(const std::optional<BlackLevel>& level)
         { { "component", Value::number(level->component) }, { "composite", Value::number(level->composite) } });
 }
 
+board::tv_encoder::Shown shown_of(const Encoder& encoder)
+{
+    const Format format = encoder.format.value_or(Format{});
+    return { encoder.format.has_value(), format.target, format.frequency, encoder.enabled, encoder.black_screen };
+}
+
 } // namespace
 
 namespace board::tv_encoder
@@ -134,6 +141,11 @@ Value state()
           { "composite_pal60", flag(tve.composite_pal60) },
           { "media_type", setting(tve.media_type) },
           { "aspect", setting(tve.aspect, Family::TveAspect) } });
+}
+
+std::array<Shown, 2> shown()
+{
+    return { shown_of(tv_encoder_state.encoders[TVE_1]), shown_of(tv_encoder_state.encoders[TVE_2]) };
 }
 
 } // namespace board::tv_encoder

@@ -40,6 +40,20 @@ protected:
     void TearDown() override { board::power_on({}); }
 };
 
+TEST_F(RecordView, AFieldKeptAtHand_HasTheNumberOfNow)
+{
+    for (const record_view::FieldType& type : all_fields())
+    {
+        const record_view::Field field(type.path);
+        for (const std::int64_t number : { type.range().lowest, type.range().highest })
+        {
+            record_view::set(type.path, number);
+            EXPECT_EQ(number, field.number()) << type.path;
+        }
+    }
+    EXPECT_THROW(record_view::Field("arPortInfo"), record_view::FieldError);
+}
+
 // That every field of the headers is read is for tests/headers; here, what becomes of some of each form.
 TEST_F(RecordView, Fields_HaveTheirPathsAndWidths)
 {

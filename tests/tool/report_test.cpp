@@ -129,6 +129,23 @@ TEST(Storyboard, HeldGraphicsAreASpanFromStepToStep)
     EXPECT_TRUE(spans_of_lane(run, "digital output").empty());
 }
 
+TEST(Storyboard, ALaneFollowsTheRecordAndTheDevices)
+{
+    const Document run =
+        storyboard_of({ "PMX_Init\n"
+                        "PMX_SetModeEx 0 [ [0], [1, RES_1080P50HZ], [1, RES_576P], [1, RES_576I] ] 50 0 0\n"
+                        "poke ucVfreq 60\nneighbour TVE_SetBlackScreen 1 1\nPMX_SetMuteEnable 0 1\n" })["runs"][0];
+    const auto texts = [&](const char* lane) {
+        std::vector<std::string> found;
+        for (const Document& span : spans_of_lane(run, lane))
+            found.push_back(span.at("text"));
+        return found;
+    };
+    EXPECT_EQ((std::vector<std::string>{ "RES_1080P50HZ at 50 Hz", "RES_1080P50HZ at 60 Hz" }), texts("HDMI output"));
+    EXPECT_EQ("RES_576I at 50 Hz, black", texts("composite output").back());
+    EXPECT_EQ((std::vector<std::string>{ "muted" }), texts("mute"));
+}
+
 TEST(Storyboard, PowerOnsStandOneBehindTheOther)
 {
     const Document run = storyboard_of({ "PMX_Init\nadvance 1s\npower-on\nPMX_Init\nadvance 1s\n" })["runs"][0];

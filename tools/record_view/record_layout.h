@@ -54,5 +54,7 @@ unsigned char* address_of(const Object& object);
 
 /** What stands at a node's place, also in a copy of the object; numbers carry their names. */
 board::Value value_at(const Node& node, const unsigned char* at);
+/** The number alone, or a pointer's, of a single field. */
+std::int64_t plain_number_at(const Node& node, const unsigned char* at);
 
 } // namespace record_view

@@ -27,12 +27,7 @@ bool reads_best_in_hex(std::string_view name)
 
 Value number_at(const Node& node, const unsigned char* at)
 {
-    std::uint64_t bits = 0;
-    std::memcpy(&bits, at, node.size);
-    std::int64_t number = static_cast<std::int64_t>(bits);
-    if (node.is_signed && node.size == sizeof(std::int32_t))
-        number = static_cast<std::int32_t>(bits);
-
+    const std::int64_t number = plain_number_at(node, at);
     if (node.form == Node::Form::Pointer)
         return number == 0 ? Value::null() : Value::number(number, {}, Value::Base::Hex);
     return Value::number(number, board::names::name_of(board::names::family_of(node.owner, node.name), number),
@@ -67,6 +62,15 @@ unsigned char* address_of(const Object& object)
                                  " bytes, not " + std::to_string(object.node.size));
     address = static_cast<unsigned char*>(symbol->address);
     return address;
+}
+
+std::int64_t plain_number_at(const Node& node, const unsigned char* at)
+{
+    std::uint64_t bits = 0;
+    std::memcpy(&bits, at, node.size);
+    if (node.is_signed && node.size == sizeof(std::int32_t))
+        return static_cast<std::int32_t>(bits);
+    return static_cast<std::int64_t>(bits);
 }
 
 Value value_at(const Node& node, const unsigned char* at)

@@ -183,6 +183,19 @@ Value get(std::string_view path)
     return value_at(*place.node, address_of(*place.object) + place.offset);
 }
 
+Field::Field(std::string_view path)
+{
+    const Place place = single_place_of(path);
+    m_object = place.object;
+    m_node = place.node;
+    m_offset = place.offset;
+}
+
+std::int64_t Field::number() const
+{
+    return plain_number_at(*m_node, address_of(*m_object) + m_offset);
+}
+
 bool has(std::string_view path)
 {
     return path == "module" || find(path).has_value();

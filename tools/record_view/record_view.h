@@ -9,6 +9,7 @@
  *  "status.hPMXTimer", "module.MutexPMX". */
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <stdexcept>
 #include <string>
@@ -19,6 +20,9 @@
 
 namespace record_view
 {
+
+struct Node;
+struct Object;
 
 /** A field that does not exist, or a number that does not fit into it; the message says which and names the nearest
  *  fields. */
@@ -36,6 +40,21 @@ board::Value state();
 
 /** A field, or a record or array of fields. Throws FieldError. */
 board::Value get(std::string_view path);
+
+/** A single field that is read often: what its name leads to is looked up once. */
+class Field
+{
+public:
+    /** Throws FieldError. */
+    explicit Field(std::string_view path);
+
+    std::int64_t number() const;
+
+private:
+    const Object* m_object;
+    const Node* m_node;
+    std::size_t m_offset;
+};
 
 /** Whether path names something that get() can read. */
 bool has(std::string_view path);

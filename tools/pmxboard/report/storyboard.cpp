@@ -181,7 +181,7 @@ std::string Storyboard::entry(const board::TraceEntry& entry, bool)
 void Storyboard::follow_lanes()
 {
     if (m_is_powered)
-        m_lanes.follow(states_now(), moment());
+        m_lanes.follow(*states_now(), moment());
 }
 
 void Storyboard::end_step()

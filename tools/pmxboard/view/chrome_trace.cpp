@@ -206,14 +206,16 @@ void ChromeTrace::end_operation(const std::string& arguments)
     m_operation_told = false;
 }
 
-void ChromeTrace::show(const States& states)
+void ChromeTrace::show(const std::shared_ptr<const States>& states)
 {
+    if (states == m_states)
+        return;
     for (int lane = first_lane_of_states; lane <= last_lane_of_states; ++lane)
     {
-        const auto before = m_states.find(lane);
-        const auto after = states.find(lane);
-        const bool was = before != m_states.end();
-        const bool is = after != states.end();
+        const auto before = m_states->find(lane);
+        const auto after = states->find(lane);
+        const bool was = before != m_states->end();
+        const bool is = after != states->end();
         if (was && is && before->second == after->second)
             continue;
         if (was)
@@ -230,7 +232,7 @@ void ChromeTrace::close_process()
         return;
     release();
     end_operation("{}");
-    show({});
+    show(std::make_shared<const States>());
 }
 
 void ChromeTrace::advance_to(std::uint64_t time_us)

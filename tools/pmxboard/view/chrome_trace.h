@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
  *  A run as a Chrome trace: the JSON that chrome://tracing and Perfetto's viewer open. Each power-on is a process of
- *  its own; what happens there goes by lanes: operations, platform calls, console, the board's own doings, the three
- *  flags of the handshake, the display timer, the six OSD planes of the mixer.
+ *  its own; what happens there goes by lanes: operations, platform calls, console, the board's own doings, and those of
+ *  states.
  *
  *  Virtual time stands still while calls follow each other. So that their order can be seen, each beginning and each
  *  end is at least a nanosecond behind the one before. */
@@ -10,12 +10,13 @@
 
 #include <cstdint>
 #include <iosfwd>
-#include <map>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
 
 #include "board/trace.h"
+#include "tools/pmxboard/view/lanes.h"
 #include "tools/pmxboard/view/trace_sink.h"
 
 namespace pmxboard
@@ -39,15 +40,12 @@ public:
     std::string entry(const board::TraceEntry& entry, bool shown) override;
 
 private:
-    /** What the lanes of states show: lane to the name of what holds there. */
-    using States = std::map<int, std::string>;
-
     struct Finished
     {
         board::TraceEntry entry;
         std::uint64_t end_us = 0;
         bool shown = true;
-        States states; ///< when it ended
+        std::shared_ptr<const States> states; ///< when it ended
     };
 
     void release();
@@ -56,7 +54,7 @@ private:
     void end(const Finished& finished);
     void follow_operation(const board::TraceEntry& entry);
     void end_operation(const std::string& arguments);
-    void show(const States& states);
+    void show(const std::shared_ptr<const States>& states);
     void close_process();
 
     void advance_to(std::uint64_t time_us);
@@ -81,7 +79,7 @@ private:
     bool m_operation_told = false; ///< by operation_begins, not found out from an entry
     std::vector<Finished> m_waiting;
     std::vector<const Finished*> m_open; ///< while they are released
-    States m_states;
+    std::shared_ptr<const States> m_states = std::make_shared<const States>();
 };
 
 } // namespace pmxboard

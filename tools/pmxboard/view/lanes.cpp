@@ -1,7 +1,12 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "tools/pmxboard/view/lanes.h"
 
+#include <array>
+#include <compare>
+#include <cstdint>
+
 #include "board/devices.h"
+#include "board/shown.h"
 #include "tools/pmxboard/state/status.h"
 #include "tools/record_view/record_view.h"
 
@@ -30,8 +35,7 @@ int lane_of_plane(unsigned plane)
     return lane_osd_plane_3 + static_cast<int>(plane - first_osd_plane);
 }
 
-/** As much of the whole state as tells what outputs show and whether graphics wait. The whole takes too long for every
- *  call. */
+/** As much of the whole state as tells what outputs show and whether graphics wait. */
 Value part_of_state()
 {
     Value status = Value::record({});
@@ -75,6 +79,57 @@ std::string shown_on(const OutputStatus& output)
            (output.remark.empty() ? "" : ", " + output.remark);
 }
 
+/** All that the states come from. */
+struct Seen
+{
+    board::mixer::Shown mixer;
+    std::array<board::tv_encoder::Shown, 2> tv_encoder;
+    board::hdmi_av::Shown hdmi_av;
+    const void* timer = nullptr; ///< what the layer's will call, while it runs
+    std::int64_t format_change = 0;
+    std::int64_t osd_enable = 0;
+    std::int64_t timer_set = 0;
+    std::int64_t frequency = 0;
+
+    auto operator<=>(const Seen&) const = default;
+};
+
+Seen seen_now()
+{
+    using record_view::Field;
+    static const Field timer("status.hPMXTimer");
+    static const Field format_change("status.fgPmxFormatChangeFlag");
+    static const Field osd_enable("status.fgPmxEnabeOsdFlag");
+    static const Field timer_set("status.fgTimerAlreadySet");
+    static const Field frequency("record.ucVfreq");
+    return { board::mixer::shown(),   board::tv_encoder::shown(),
+             board::hdmi_av::shown(), board::timers::next_call_of(static_cast<std::uint32_t>(timer.number())),
+             format_change.number(),  osd_enable.number(),
+             timer_set.number(),      frequency.number() };
+}
+
+States states_by_name()
+{
+    const Value part = part_of_state();
+    const Status status = status_of(part, {});
+    States states;
+    states[lane_graphics] = shown_graphics(status.graphics);
+    for (const int lane : { lane_format_change_flag, lane_osd_enable_flag, lane_timer_set_flag })
+        states[lane] = record_view::get("status." + flag_field(lane)).as_number() != 0 ? flag_field(lane) : "";
+    states[lane_timer] = running_timer(*part.find("os.timers"));
+    for (const PlaneStatus& plane : status.planes)
+    {
+        if (plane.plane >= first_osd_plane && plane.mixed)
+            states[lane_of_plane(plane.plane)] = "plane " + std::to_string(plane.plane) + " mixed";
+    }
+    states[lane_sink] = status.sink.plugged ? "plugged in" : "";
+    states[lane_mute] = status.muted ? "muted" : "";
+    for (std::size_t output = 0; output < status.outputs.size(); ++output)
+        states[lane_digital + static_cast<int>(output)] = shown_on(status.outputs[output]);
+    std::erase_if(states, [](const auto& state) { return state.second.empty(); });
+    return states;
+}
+
 } // namespace
 
 std::map<int, std::string> lane_names()
@@ -98,26 +153,17 @@ std::map<int, std::string> lane_names()
     return names;
 }
 
-std::map<int, std::string> states_now()
+std::shared_ptr<const States> states_now()
 {
-    const Value part = part_of_state();
-    const Status status = status_of(part, {});
-    std::map<int, std::string> states;
-    states[lane_graphics] = shown_graphics(status.graphics);
-    for (const int lane : { lane_format_change_flag, lane_osd_enable_flag, lane_timer_set_flag })
-        states[lane] = record_view::get("status." + flag_field(lane)).as_number() != 0 ? flag_field(lane) : "";
-    states[lane_timer] = running_timer(*part.find("os.timers"));
-    for (const PlaneStatus& plane : status.planes)
-    {
-        if (plane.plane >= first_osd_plane && plane.mixed)
-            states[lane_of_plane(plane.plane)] = "plane " + std::to_string(plane.plane) + " mixed";
-    }
-    states[lane_sink] = status.sink.plugged ? "plugged in" : "";
-    states[lane_mute] = status.muted ? "muted" : "";
-    for (std::size_t output = 0; output < status.outputs.size(); ++output)
-        states[lane_digital + static_cast<int>(output)] = shown_on(status.outputs[output]);
-    std::erase_if(states, [](const auto& state) { return state.second.empty(); });
-    return states;
+    // A run goes to and fro between few of them.
+    constexpr std::size_t most_known = 256;
+    static std::map<Seen, std::shared_ptr<const States>> known;
+    const Seen seen = seen_now();
+    if (const auto before = known.find(seen); before != known.end())
+        return before->second;
+    if (known.size() == most_known)
+        known.clear();
+    return known[seen] = std::make_shared<const States>(states_by_name());
 }
 
 } // namespace pmxboard

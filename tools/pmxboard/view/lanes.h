@@ -4,6 +4,7 @@
 #pragma once
 
 #include <map>
+#include <memory>
 #include <string>
 
 namespace pmxboard
@@ -37,8 +38,11 @@ enum Lane
 /** What each lane is called, but for that of the stores. */
 std::map<int, std::string> lane_names();
 
-/** Lanes of states on which something holds now, and what: a raised flag, the running timer, a mixed plane, graphics
- *  that are held back, an output's mode. */
-std::map<int, std::string> states_now();
+/** Lanes of states on which something holds, and what: a raised flag, the running timer, a mixed plane, graphics that
+ *  are held back, an output's mode. */
+using States = std::map<int, std::string>;
+
+/** As it is now; the same object as before where nothing has changed. */
+std::shared_ptr<const States> states_now();
 
 } // namespace pmxboard

@@ -88,14 +88,14 @@ void VcdTrace::follow()
 {
     if (!m_is_powered)
         return;
-    const auto states = states_now();
+    const std::shared_ptr<const States> states = states_now();
     m_tick = std::max(m_tick, m_power_on + static_cast<std::uint64_t>(board::now().count()) * ns_per_us);
     if (std::any_of(m_wires.begin(), m_wires.end(), [&](const Wire& wire) {
-            return wire.level != 'x' && (wire.level == '1') != states.contains(wire.lane);
+            return wire.level != 'x' && (wire.level == '1') != states->contains(wire.lane);
         }))
         m_tick = std::max(m_tick, *m_written + 1);
     for (Wire& wire : m_wires)
-        set(wire, states.contains(wire.lane));
+        set(wire, states->contains(wire.lane));
 }
 
 void VcdTrace::set(Wire& wire, bool high)

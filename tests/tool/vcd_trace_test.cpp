@@ -21,6 +21,7 @@ struct Waves
 {
     std::map<std::string, Edges> wires; ///< by name
     std::uint64_t end = 0;
+    std::vector<std::string> comments;
 };
 
 /** Throws std::runtime_error for what no viewer would read. */
@@ -30,20 +31,30 @@ Waves read_waves(const std::string& text)
     std::map<std::string, std::string> names;
     std::istringstream lines(text);
     std::string line;
+    bool in_scope = false;
+    bool has_unit = false;
     while (std::getline(lines, line) && line != "$enddefinitions $end")
     {
+        in_scope = in_scope || line == "$scope module pmx $end";
+        has_unit = has_unit || line == "$timescale 1 ns $end";
         std::istringstream words(line);
         std::string keyword, kind, bits, code, name, end;
         words >> keyword >> kind >> bits >> code >> name >> end;
         if (keyword != "$var")
             continue;
-        if (kind != "wire" || bits != "1" || end != "$end" || !names.emplace(code, name).second)
+        if (!in_scope || !has_unit || kind != "wire" || bits != "1" || end != "$end" ||
+            !names.emplace(code, name).second)
             throw std::runtime_error("no declaration of a wire: " + line);
         waves.wires[name] = {};
     }
     bool has_time = false;
     while (std::getline(lines, line))
     {
+        if (line.starts_with("$comment ") && line.ends_with(" $end"))
+        {
+            waves.comments.push_back(line);
+            continue;
+        }
         if (line.starts_with('#'))
         {
             const std::uint64_t time = std::stoull(line.substr(1));
@@ -138,6 +149,36 @@ TEST(VcdTrace, EachPowerOnFollowsTheOneBefore)
         levels += level;
     EXPECT_EQ("10101", levels);
     EXPECT_NEAR(2e9, static_cast<double>(waves.end), 1e7);
+    EXPECT_EQ((std::vector<std::string>(2, "$comment here.pmx $end")), waves.comments);
+}
+
+TEST(VcdTrace, WithoutPowerNothingIsHigh)
+{
+    const Waves waves = waves_of({ "PMX_Init\nadvance 1s\npower-on\n" });
+    const std::uint64_t off = waves.wires.at("power").at(1).first;
+    const Edges& sink = waves.wires.at("HDMI_sink");
+    ASSERT_EQ(3u, sink.size());
+    EXPECT_EQ((std::pair{ off, '0' }), sink[1]);
+}
+
+TEST(VcdTrace, AFlagIsHighNoLongerThanItIs)
+{
+    const Waves waves = waves_of({ "PMX_Init\ndisplay-part never\n"
+                                   "PMX_SetModeEx 0 [ [0], [1, RES_1080P50HZ], [1, RES_576P], [1, RES_576I] ] 50 0 0\n"
+                                   "advance 20s\n" });
+    const Edges& flag = waves.wires.at("flag_fgPmxEnabeOsdFlag");
+    ASSERT_EQ((std::vector<char>{ '0', '1', '0' }),
+              (std::vector<char>{ flag.at(0).second, flag.at(1).second, flag.at(2).second }));
+    EXPECT_LT(first_pulse_ms(flag), 0.001) << "the last store of the timer's call is heard at once";
+}
+
+TEST(VcdTrace, ARestoredStateAddsNoTime)
+{
+    const std::string saved = testing::TempDir() + "pmx-vcd-test-saved.json";
+    const Waves waves = waves_of({ "PMX_Init\nadvance 4s\nsave " + saved + "\n" });
+    const Waves restored = waves_of({ "PMX_Init\nrestore " + saved + "\nadvance 1s\n" });
+    EXPECT_NEAR(4e9, static_cast<double>(waves.end), 1e7);
+    EXPECT_NEAR(1e9, static_cast<double>(restored.end), 1e7);
 }
 
 } // namespace

@@ -175,6 +175,7 @@ private:
         m_output.flush();
         const std::string message = place + ": " + presentable(what);
         m_diagnostics << message << '\n';
+        m_output.failure(message);
         if (m_scenario.failures != nullptr)
             m_scenario.failures->push_back(message);
     }
@@ -228,7 +229,7 @@ bool run_scenario(std::istream& lines, const Scenario& scenario, const OutputOpt
         return false;
     if (session.is_powered())
         note_disagreements(output);
-    if (session.expectations() != 0 && !output.is_short())
+    if (session.expectations() != 0 && !output.is_short() && output.for_people())
         output.text(file + ": " + std::to_string(session.expectations()) + " expectations met\n");
     return true;
 }

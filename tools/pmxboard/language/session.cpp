@@ -78,7 +78,7 @@ Session::Session(Output& output, std::string board, std::filesystem::path direct
             m_steps.lose(others_called);
         m_output.entry(entry);
     });
-    record_view::watch_stores(m_output.shows_stores());
+    record_view::watch_stores(m_output.hears_stores());
 }
 
 Session::~Session()
@@ -131,7 +131,7 @@ void Session::run_line(std::string_view text)
     keep_step(line);
     take_state();
     if (m_shows_explanations && m_commands != commands_before && m_explanation && m_explanation->refusal() != nullptr)
-        m_output.shown(to_json_line(*m_explanation), to_text(*m_explanation, m_output.look()));
+        m_output.added(to_json_line(*m_explanation), to_text(*m_explanation, m_output.look()));
 }
 
 void Session::notice_others()
@@ -237,7 +237,7 @@ bool Session::is_meanwhile()
 void Session::watch_stores(bool on)
 {
     m_watches_stores = on;
-    record_view::watch_stores(on || m_output.shows_stores());
+    record_view::watch_stores(on || m_output.hears_stores());
 }
 
 /** Nobody looks further back than the last command. In large pieces, so that it costs next to nothing. */

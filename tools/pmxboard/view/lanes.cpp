@@ -153,6 +153,19 @@ std::map<int, std::string> lane_names()
     return names;
 }
 
+std::string_view kind_of_lane(int lane)
+{
+    if (lane == lane_graphics)
+        return "graphics";
+    if (lane == lane_timer)
+        return "timer";
+    if (lane >= lane_format_change_flag && lane <= lane_timer_set_flag)
+        return "flag";
+    if (lane == lane_mute || (lane >= lane_osd_plane_3 && lane <= lane_osd_plane_8))
+        return "plane";
+    return "output";
+}
+
 std::shared_ptr<const States> states_now()
 {
     // A run goes to and fro between few of them.

@@ -6,6 +6,7 @@
 #include <map>
 #include <memory>
 #include <string>
+#include <string_view>
 
 namespace pmxboard
 {
@@ -37,6 +38,9 @@ enum Lane
 
 /** What each lane is called, but for that of the stores. */
 std::map<int, std::string> lane_names();
+
+/** What a lane of states is about: "graphics", "flag", "timer", "plane" or "output". */
+std::string_view kind_of_lane(int lane);
 
 /** Lanes of states on which something holds, and what: a raised flag, the running timer, a mixed plane, graphics that
  *  are held back, an output's mode. */

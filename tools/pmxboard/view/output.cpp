@@ -89,9 +89,22 @@ void Output::outcome(const Outcome& outcome)
     }
 }
 
+void Output::failure(const std::string& message)
+{
+    if (!m_hushed)
+        m_trace->failure(message);
+}
+
+void Output::tell(std::string_view text)
+{
+    if (!m_hushed && !text.empty())
+        m_trace->told(std::string(text));
+}
+
 void Output::text(std::string_view text)
 {
     flush();
+    tell(text);
     if (people() != nullptr)
         *people() << text;
 }
@@ -99,11 +112,18 @@ void Output::text(std::string_view text)
 void Output::remark(std::string_view text)
 {
     flush();
+    tell(text);
     if (people() != nullptr)
         *people() << m_paint(printable_lines(text), Colour::Magenta) << '\n';
 }
 
 void Output::shown(const std::string& json_line, std::string_view text)
+{
+    tell(text);
+    added(json_line, text);
+}
+
+void Output::added(const std::string& json_line, std::string_view text)
 {
     flush();
     if (m_hushed)
@@ -194,7 +214,9 @@ void Output::release_nested()
 
 void Output::flush()
 {
-    m_trace->settle();
+    // What is not told has changed nothing yet, its clock included.
+    if (!m_hushed)
+        m_trace->settle();
     release_nested();
     // A blank that the next console line begins with is no line of its own.
     if (m_console_line.find_first_not_of(' ') != std::string::npos)

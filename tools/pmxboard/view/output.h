@@ -60,6 +60,8 @@ public:
     void hush(bool on) { m_hushed = on; }
     /** Whether stores are shown whatever the scenario says. */
     bool shows_stores() const { return m_options.stores; }
+    /** Whether they are watched for the trace: shown, or heard alone. */
+    bool hears_stores() const { return m_options.stores || m_trace->hears_stores(); }
     /** Whether people see anything but failures. */
     bool for_people() const { return people() != nullptr; }
     /** Whether a run is only told in short. */
@@ -80,11 +82,15 @@ public:
     void command(std::string_view line);
     void expectation(std::string_view line);
     void outcome(const Outcome& outcome);
+    /** What the scenario does not do as it says; who reads is told elsewhere. */
+    void failure(const std::string& message);
     void text(std::string_view text);
     /** A text for people, painted as what deserves a look. */
     void remark(std::string_view text);
     /** What a verb shows of the state: a line for programs, or a text for people. */
     void shown(const std::string& json_line, std::string_view text);
+    /** The same, of what nobody asked for. */
+    void added(const std::string& json_line, std::string_view text);
     /** What `line` would do, as imagine() wrote it down. */
     void imagined(std::string_view line, const std::string& written, const std::string& outcome);
 
@@ -102,6 +108,7 @@ private:
         std::string text;
     };
 
+    void tell(std::string_view text);
     void show_trace_as(std::string_view form);
     bool is_machine_read() const;
     std::ostream* people() const;

@@ -84,7 +84,7 @@ std::string SummaryTrace::entry(const TraceEntry& entry, bool shown)
     return {};
 }
 
-std::string SummaryTrace::told() const
+std::string SummaryTrace::in_short() const
 {
     if (m_count == 0)
         return {};
@@ -100,7 +100,7 @@ std::string SummaryTrace::told() const
 
 void SummaryTrace::settle()
 {
-    m_to << told() << m_events;
+    m_to << in_short() << m_events;
     m_calls.clear();
     m_events.clear();
     m_count = 0;

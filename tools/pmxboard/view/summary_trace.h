@@ -33,7 +33,7 @@ private:
         unsigned count = 0;
     };
 
-    std::string told() const;
+    std::string in_short() const;
 
     TraceOptions m_options;
     std::ostream& m_to;

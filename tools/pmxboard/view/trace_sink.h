@@ -36,6 +36,10 @@ public:
     virtual void explanation(const std::string&) {}
     virtual void operation_begins(const std::string&) {}
     virtual void operation_ends(const Outcome&) {}
+    /** What a command shows to people: of a state, of a picture, of what would be done. */
+    virtual void told(const std::string&) {}
+    /** What the scenario does not do as it says. */
+    virtual void failure(const std::string&) {}
     /** The command is done: everything that it began has ended. */
     virtual void settle() {}
     /** What is to be written for an entry now; nothing for one that is only to be heard (`shown` false). */
@@ -45,6 +49,8 @@ public:
     virtual bool is_for_programs() const { return true; }
     /** Whether it tells of the console's lines, too, which then are not shown. */
     virtual bool stands_for_console() const { return false; }
+    /** Whether it has to hear of each store at its moment, shown or not. */
+    virtual bool hears_stores() const { return false; }
     /** Whether each line stands for itself, so that others may stand between. */
     virtual bool has_lines() const { return false; }
 };

@@ -12,7 +12,12 @@ namespace pmxboard
 namespace
 {
 
-constexpr std::uint64_t ns_per_us = 1000;
+constexpr std::int64_t ns_per_us = 1000;
+
+std::int64_t now_ns()
+{
+    return static_cast<std::int64_t>(board::now().count()) * ns_per_us;
+}
 
 /** A wire's name has no blanks. */
 std::string wire_name(std::string name)
@@ -48,8 +53,12 @@ VcdTrace::~VcdTrace()
     m_to << '#' << m_tick + 1 << '\n' << std::flush;
 }
 
-void VcdTrace::scenario(const std::string&)
+void VcdTrace::scenario(const std::string& name)
 {
+    // A dollar sign could end the comment.
+    std::string shown = name;
+    std::replace(shown.begin(), shown.end(), '$', '_');
+    m_to << "$comment " << shown << " $end\n";
     // The next one has a board of its own; what is left of this one is nobody's.
     m_is_powered = false;
 }
@@ -60,9 +69,11 @@ void VcdTrace::powered_on()
     {
         m_tick += ns_per_us;
         set(m_power, false);
+        for (Wire& wire : m_wires)
+            set(wire, false);
         m_tick += ns_per_us;
     }
-    m_power_on = m_tick;
+    m_clock_began = static_cast<std::int64_t>(m_tick) - now_ns();
     m_is_powered = true;
     set(m_power, true);
     follow();
@@ -89,7 +100,7 @@ void VcdTrace::follow()
     if (!m_is_powered)
         return;
     const std::shared_ptr<const States> states = states_now();
-    m_tick = std::max(m_tick, m_power_on + static_cast<std::uint64_t>(board::now().count()) * ns_per_us);
+    m_tick = std::max(m_tick, static_cast<std::uint64_t>(m_clock_began + now_ns()));
     if (std::any_of(m_wires.begin(), m_wires.end(), [&](const Wire& wire) {
             return wire.level != 'x' && (wire.level == '1') != states->contains(wire.lane);
         }))

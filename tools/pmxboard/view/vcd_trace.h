@@ -25,6 +25,7 @@ public:
     void powered_on() override;
     void operation_ends(const Outcome& outcome) override;
     void settle() override;
+    bool hears_stores() const override { return true; }
     std::string entry(const board::TraceEntry& entry, bool shown) override;
 
 private:
@@ -43,7 +44,7 @@ private:
     std::vector<Wire> m_wires;
     bool m_is_powered = false;
     std::uint64_t m_tick = 0;               ///< nanoseconds; what happens in one microsecond keeps its order
-    std::uint64_t m_power_on = 0;           ///< the tick at which the board's clock began
+    std::int64_t m_clock_began = 0;         ///< the tick of the board's time 0; before the first where it was restored
     std::optional<std::uint64_t> m_written; ///< the tick that was written last
 };
 

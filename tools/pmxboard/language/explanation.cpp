@@ -227,17 +227,22 @@ Explanation explain(Session& session, const std::string& command, const Search& 
     return explanation;
 }
 
+std::string verdict_of(const Explanation& explanation)
+{
+    if (!explanation.failure.empty())
+        return "failed";
+    const Reason* const refusal = explanation.refusal();
+    if (refusal == nullptr)
+        return "done";
+    return row_of(refusal->number).class_of == PMX_REASON_CLASS_SAME ? "nothing" : "refused";
+}
+
 std::string to_text(const Explanation& explanation, const Look& look)
 {
     const Reason* const refusal = explanation.refusal();
     const std::string what = explanation.operation.empty() ? explanation.command : explanation.operation;
     const std::string with_answer = what + (explanation.answer.empty() ? "" : " = " + explanation.answer);
-    const bool has_refused = refusal != nullptr && row_of(refusal->number).class_of != PMX_REASON_CLASS_SAME;
-    const std::string verdict = !explanation.failure.empty() ? "failed:"
-                                : refusal == nullptr         ? "done:"
-                                : has_refused                ? "refused:"
-                                                             : "nothing:";
-    std::string text = explanation.headline.empty() ? line_of(verdict, with_answer, look)
+    std::string text = explanation.headline.empty() ? line_of(verdict_of(explanation) + ":", with_answer, look)
                                                     : line_of(explanation.headline + ":", explanation.answer, look);
     std::string begin = "because";
     for (const Reason& reason : explanation.reasons)
@@ -267,6 +272,7 @@ std::string to_json_line(const Explanation& explanation)
                         { "command", printable(explanation.command) },
                         { "operation", explanation.operation },
                         { "outcome", Json::parse(explanation.outcome) },
+                        { "verdict", verdict_of(explanation) },
                         { "reason", refusal != nullptr ? board::json_of(json_of(*refusal)) : Json() },
                         { "advice", refusal != nullptr ? Json(row_of(refusal->number).advice) : Json() },
                         { "reasons", reasons },

@@ -47,6 +47,8 @@ inline constexpr Search none{};
 /** Carry a command out in a copy. Throws LineError when it is none, and StepFailed when there can be no copy. */
 Explanation explain(Session& session, const std::string& command, const Search& search = thorough);
 
+/** "done", "refused", "nothing" where it was so already, or "failed". */
+std::string verdict_of(const Explanation& explanation);
 std::string to_text(const Explanation& explanation, const Look& look);
 /** A line of a trace. */
 std::string to_json_line(const Explanation& explanation);

@@ -16,14 +16,14 @@ using Document = board::Json;
 
 TEST(ReportPictures, ThoseThatAreTheSameAreKeptOnce)
 {
-    pmxboard::Storyboard storyboard("default");
+    pmxboard::Storyboard storyboard;
     for (const char* const lines : { "PMX_Init\nPMX_GetTvType 0\n", "PMX_Init\noutputs hdmi=720p50\n" })
     {
         std::istringstream in(lines);
         std::ostringstream diagnostics;
         pmxboard::run_scenario(in, { "here.pmx", "default", "" }, { .trace = &storyboard }, diagnostics);
         EXPECT_EQ("", diagnostics.str());
-        storyboard.end_scenario({});
+        storyboard.end_scenario();
     }
     const Document page = Document::parse(storyboard.to_json());
     const auto seen = [&](std::size_t run, std::size_t step) {

@@ -20,15 +20,14 @@ using Document = board::Json;
 
 Document storyboard_of(const std::vector<std::string>& scenarios, const pmxboard::PageLimits& limits = {})
 {
-    pmxboard::Storyboard storyboard("default", limits);
+    pmxboard::Storyboard storyboard(limits);
     for (const std::string& lines : scenarios)
     {
         std::istringstream in(lines);
         std::ostringstream diagnostics;
-        std::vector<std::string> failures;
-        pmxboard::run_scenario(in, { "here.pmx", "default", "", false, true, &failures }, { .trace = &storyboard },
-                               diagnostics);
-        storyboard.end_scenario(failures);
+        pmxboard::run_scenario(in, { "here.pmx", "default", "", false, true },
+                               { .quiet = true, .trace = &storyboard, .stores = true }, diagnostics);
+        storyboard.end_scenario();
     }
     return Document::parse(storyboard.to_json());
 }
@@ -120,6 +119,8 @@ TEST(Storyboard, HeldGraphicsAreASpanFromStepToStep)
                         "PMX_SetModeEx 0 [ [0], [1, RES_1080P50HZ], [1, RES_576P], [1, RES_576I] ] 50 0 0\n"
                         "advance 20s\n" })["runs"][0];
     const Document held = spans_of_lane(run, "graphics")[0];
+    EXPECT_EQ(1u, spans_of_lane(run, "graphics").size()) << "no wait of no time when it ends";
+    EXPECT_EQ("held", run.at("steps")[2].at("graphics_state"));
     EXPECT_EQ("held back", held.at("text"));
     EXPECT_EQ(10'000'000, held.at("to").at("us").get<int>() - held.at("from").at("us").get<int>());
     EXPECT_EQ(2, held.at("from").at("step"));
@@ -152,6 +153,7 @@ TEST(Storyboard, PowerOnsStandOneBehindTheOther)
     EXPECT_EQ(1'002'000, run.at("steps")[2].at("from_us"));
     EXPECT_EQ(1'002'000, run.at("steps")[3].at("from_us"));
     EXPECT_EQ(2'004'000, run.at("to_us"));
+    EXPECT_GE(run.at("steps")[3].at("entries")[0].at("time_us"), 1'002'000) << "on the time line's clock";
     EXPECT_EQ(2u, spans_of_lane(run, "HDMI sink").size());
 }
 
@@ -159,7 +161,88 @@ TEST(Storyboard, AFailureLeavesWhatCameBefore)
 {
     const Document run = storyboard_of({ "PMX_Init\nPMX_GetMode 0\nexpect result 0\nPMX_Stop\n" })["runs"][0];
     EXPECT_EQ(2u, run.at("steps").size());
-    EXPECT_EQ(0u, run.at("failures")[0].get<std::string>().find("here.pmx:3: expected"));
+    EXPECT_EQ(0u, run.at("failures")[0].at("text").get<std::string>().find("here.pmx:3: expected"));
+    EXPECT_EQ(1, run.at("failures")[0].at("step"));
+}
+
+TEST(Storyboard, AFailureOfNoStepIsToldAllTheSame)
+{
+    const auto failure_of = [](const char* lines) { return storyboard_of({ lines })["runs"][0].at("failures").at(0); };
+    const Document unread = failure_of("PMX_Init\nprint \"no end\n");
+    EXPECT_TRUE(unread.at("step").is_null()) << unread;
+    EXPECT_EQ(0u, unread.at("text").get<std::string>().find("here.pmx:2: ")) << unread;
+    EXPECT_TRUE(failure_of("print \"no end\n").at("step").is_null());
+    EXPECT_TRUE(failure_of("PMX_Init\nmeanwhile x_thread_delay PMX_GetMode 0\n# the end\n").at("step").is_null());
+}
+
+TEST(Storyboard, AFailureBehindThePageIsOfNoStepOnIt)
+{
+    const Document run = storyboard_of({ "PMX_Init\nPMX_Stop\nPMX_GetMode 7 8 9\n" }, { 2, 1000 })["runs"][0];
+    EXPECT_TRUE(run.at("failures").at(0).at("step").is_null());
+}
+
+TEST(Storyboard, AStepHasWhatItShows)
+{
+    const Document steps = storyboard_of({ "print \"why this is\\n\"\nPMX_Init\nstatus graphics\nexpect result 0\n" },
+                                         { 500, 20000, 30 })["runs"][0]["steps"];
+    EXPECT_EQ("why this is\n", steps[0].at("told"));
+    EXPECT_EQ("", steps[1].at("told"));
+    EXPECT_EQ(0u, steps[2].at("told").get<std::string>().find("Graphics"));
+    EXPECT_LE(steps[2].at("told").get<std::string>().size(), 30u + std::string("…\n").size());
+}
+
+TEST(Storyboard, TheFirstCommandShowsWhatItChanged)
+{
+    const auto changes_of = [](const char* lines, std::size_t step) {
+        return storyboard_of({ lines })["runs"][0]["steps"][step].at("changes").size();
+    };
+    EXPECT_GT(changes_of("PMX_Init\n", 0), 0u);
+    EXPECT_EQ(changes_of("power-on\nPMX_Init\n", 1), changes_of("PMX_Init\n", 0));
+}
+
+TEST(Storyboard, WhatRunsInsideACallStandsBehindIt)
+{
+    const Document steps = storyboard_of(
+        { "PMX_Init\nmeanwhile x_thread_delay PMX_GetMode 0\n"
+          "PMX_SetModeEx 0 [ [0], [1, RES_1080P50HZ], [1, RES_576P], [1, RES_576I] ] 50 0 0\n" })["runs"][0]["steps"];
+    bool nested = false;
+    for (const Document& step : steps)
+    {
+        std::uint64_t last = 0;
+        for (const Document& entry : step.at("entries"))
+        {
+            EXPECT_LT(last, entry.at("sequence").get<std::uint64_t>()) << entry;
+            last = entry.at("sequence");
+            nested = nested || entry.at("depth") != 0;
+        }
+    }
+    EXPECT_TRUE(nested);
+}
+
+TEST(Storyboard, TheBoardIsTheOneThatRuns)
+{
+    const Document run = storyboard_of({ "PMX_Init\npower-on bedroom-player\nPMX_Init\n" })["runs"][0];
+    EXPECT_EQ((Document{ "default", "bedroom player" }), run.at("boards"));
+    EXPECT_NE(std::string::npos, run.at("steps")[2].at("status").get<std::string>().find("bedroom player"));
+}
+
+TEST(Storyboard, ARestoredStateAddsNoTime)
+{
+    const std::string saved = testing::TempDir() + "pmx-report-test-saved.json";
+    const Document run = storyboard_of({ "PMX_Init\nadvance 4s\nsave " + saved + "\n",
+                                         "PMX_Init\nrestore " + saved + "\nPMX_GetMode 0\nadvance 1s\n" })["runs"][1];
+    EXPECT_TRUE(run.at("failures").empty()) << run.at("failures");
+    EXPECT_EQ(run.at("steps")[0].at("to_us"), run.at("steps")[2].at("from_us"));
+    EXPECT_EQ(1'000'000 + run.at("steps")[0].at("to_us").get<int>(), run.at("to_us").get<int>());
+}
+
+TEST(Storyboard, WhatWasSoAlreadyIsNoRefusal)
+{
+    const Document run = storyboard_of({ "PMX_Init\nPMX_Init\nPMX_SetArbPlaneOrder 0 0x76543211\n" })["runs"][0];
+    const auto verdict = [&](std::size_t step) { return run.at("steps")[step].at("explanation").at("verdict"); };
+    EXPECT_EQ("done", verdict(0));
+    EXPECT_EQ("nothing", verdict(1));
+    EXPECT_EQ("refused", verdict(2));
 }
 
 TEST(Storyboard, WhatIsTooMuchIsCounted)

@@ -294,8 +294,11 @@ void add_report(CLI::App& app, Chosen& chosen)
         app.add_subcommand("report", "Tell scenarios as a storyboard: one page for a browser, with pictures.");
     sub->add_option("SCENARIO", report->files, "Scenarios; - reads the standard input")->required();
     sub->add_option("-o,--output", report->page, "Where to write the page")->required()->type_name("FILE");
-    sub->add_option("--board", report->board, "Board to power on: a name under boards/, a directory or a .toml file")
-        ->type_name("NAME|FILE");
+    sub->add_option("--board", report->boards,
+                    "Board to power on: a name under boards/, a directory or a .toml file; named several times, each "
+                    "scenario runs on each")
+        ->type_name("NAME|FILE")
+        ->allow_extra_args(false);
     sub->footer(report_examples);
     sub->callback([report, &chosen] { chosen = [report] { return report_scenarios(*report); }; });
 }

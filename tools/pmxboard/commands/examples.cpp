@@ -166,6 +166,8 @@ const char* const report_examples = R"(Examples:
       open story.html in a browser, and see why there were no graphics, and for how long
   pmxboard report scenarios/display-part-answers.pmx scenarios/display-part-never-answers.pmx -o two.html
       see what differs between two runs, side by side
+  pmxboard report --board default --board bedroom-player scenarios/frequency-change.pmx -o boards.html
+      the same of one scenario on two boards
 
 A scenario that fails is told as far as it came.
 Exit codes: 0 done, 1 a step failed, 2 wrong usage.)";

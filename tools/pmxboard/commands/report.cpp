@@ -8,6 +8,7 @@
 #include "board/board.h"
 #include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
+#include "tools/pmxboard/commands/repeat.h"
 #include "tools/pmxboard/files/new_file.h"
 #include "tools/pmxboard/language/runner.h"
 #include "tools/pmxboard/report/page.h"
@@ -18,18 +19,57 @@ namespace pmxboard
 namespace
 {
 
-/** Whether it did what it says. */
-bool tell(Storyboard& storyboard, std::istream& lines, const std::string& file, const std::string& board)
+/** One of the page's runs. */
+struct Planned
+{
+    std::string file;
+    std::string board; ///< empty where none was named
+    std::unique_ptr<std::istream> lines;
+};
+
+/** The usual one where none is named. */
+std::string board_of(const std::string& named)
+{
+    return named.empty() ? "default" : named;
+}
+
+/** As they are named; an empty name where none is. */
+std::vector<std::string> boards_of(const ReportOptions& options)
+{
+    return options.boards.empty() ? std::vector<std::string>{ "" } : options.boards;
+}
+
+/** All of them, open: what cannot be read is told before any runs. */
+std::vector<Planned> planned(const ReportOptions& options)
+{
+    std::vector<Planned> runs;
+    for (const std::string& file : options.files)
+    {
+        for (const std::string& board : boards_of(options))
+            runs.push_back({ file, board, board::files::open_lines(file) });
+    }
+    return runs;
+}
+
+/** The exit code. */
+int tell(Storyboard& storyboard, const Planned& run)
 {
     OutputOptions output;
     output.quiet = true;
     output.trace = &storyboard;
     output.stores = true;
-    std::vector<std::string> failures;
-    const Scenario scenario{ file, board, "pmxboard run " + file, false, true, &failures };
-    const bool is_done = run_scenario(lines, scenario, output, std::cerr);
-    storyboard.end_scenario(failures);
-    return is_done;
+    const Scenario scenario{ run.file, board_of(run.board), repeat_command(run.board, run.file), false, true };
+    try
+    {
+        const bool is_done = run_scenario(*run.lines, scenario, output, std::cerr);
+        storyboard.end_scenario();
+        return is_done ? exit_done : exit_failed;
+    }
+    catch (const board::files::FileError& error) // what happened until then is worth as much, and so are the others
+    {
+        storyboard.end_scenario(presentable(error.what()));
+        return usage_error(error.what());
+    }
 }
 
 } // namespace
@@ -37,21 +77,20 @@ bool tell(Storyboard& storyboard, std::istream& lines, const std::string& file, 
 int report_scenarios(const ReportOptions& options)
 try
 {
-    if (std::count(options.files.begin(), options.files.end(), "-") > 1)
-        return usage_error("the standard input holds one scenario only");
-    const std::string board = options.board.empty() ? "default" : options.board;
-    board::load_description(board);
-    std::vector<std::unique_ptr<std::istream>> opened;
-    for (const std::string& file : options.files)
-        opened.push_back(board::files::open_lines(file));
+    const auto standard_inputs = std::count(options.files.begin(), options.files.end(), "-");
+    if (standard_inputs > 1 || (standard_inputs == 1 && options.boards.size() > 1))
+        return usage_error("the standard input holds one scenario only, and is read once");
+    for (const std::string& board : boards_of(options))
+        board::load_description(board_of(board));
+    const std::vector<Planned> runs = planned(options);
     NewFile page(options.page);
-    Storyboard storyboard(board);
-    bool is_done = true;
-    for (std::size_t i = 0; i < opened.size(); ++i)
-        is_done = tell(storyboard, *opened[i], options.files[i], board) && is_done;
+    Storyboard storyboard;
+    int code = exit_done;
+    for (const Planned& run : runs)
+        code = std::max(code, tell(storyboard, run));
     page.stream() << page_with(storyboard.to_json());
     page.commit();
-    return is_done ? exit_done : exit_failed;
+    return code;
 }
 catch (const std::runtime_error& error) // a file or a board that cannot be used
 {

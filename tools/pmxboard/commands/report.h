@@ -12,8 +12,8 @@ namespace pmxboard
 struct ReportOptions
 {
     std::vector<std::string> files;
-    std::string page; ///< the file that is written
-    std::string board;
+    std::string page;                ///< the file that is written
+    std::vector<std::string> boards; ///< each scenario runs on each of them; none: on the usual one
 };
 
 /** The exit code. A scenario that fails is in the page, too, as far as it came. */

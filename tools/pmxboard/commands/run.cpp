@@ -11,6 +11,7 @@
 #include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/commands/junit.h"
+#include "tools/pmxboard/commands/repeat.h"
 #include "tools/pmxboard/files/new_file.h"
 #include "tools/pmxboard/graphics/drawing.h"
 #include "tools/pmxboard/language/runner.h"
@@ -20,23 +21,6 @@ namespace pmxboard
 {
 namespace
 {
-
-/** A word as a shell takes it. */
-std::string shell_word(const std::string& word)
-{
-    constexpr std::string_view plain = "abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789._-/+,:=@%";
-    if (!word.empty() && word.find_first_not_of(plain) == word.npos)
-        return word;
-    std::string quoted = "'";
-    for (const char c : word)
-        quoted += c == '\'' ? std::string("'\\''") : std::string(1, c);
-    return quoted + "'";
-}
-
-std::string repeat_command(const RunOptions& run, const std::string& file)
-{
-    return "pmxboard run " + (run.board.empty() ? "" : "--board " + shell_word(run.board) + " ") + shell_word(file);
-}
 
 /** Whether two names lead to one file, of which only what is written last would be left. */
 bool is_one_file(const std::string& one, const std::string& other)
@@ -104,7 +88,7 @@ int run_each(const RunOptions& run, const Opened& opened, const OutputOptions& o
         Verdict& verdict = verdicts.emplace_back(Verdict{ file, {} });
         const Scenario scenario{ file,
                                  run.board.empty() ? "default" : run.board,
-                                 repeat_command(run, file),
+                                 repeat_command(run.board, file),
                                  run.keep_going,
                                  run.explain,
                                  &verdict.failures };

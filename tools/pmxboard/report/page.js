@@ -2,7 +2,9 @@
 "use strict";
 
 const data = JSON.parse(document.getElementById("data").textContent);
+const MOST_COMPARED = 1e6;
 const shown = { run: 0, other: -1, step: 0, output: 0, filter: "", toScale: false };
+const large = { run: 0, step: 0 }; // what is enlarged, which may be of the run beside
 
 const part = (id) => document.getElementById(id);
 
@@ -28,10 +30,18 @@ function spoken(us) {
 }
 
 const run = () => data.runs[shown.run];
-const isRefused = (step) => Boolean(step.explanation && step.explanation.reason);
-const placesOf = (step) => [step.place, ...step.expectations.map((expected) => expected.place)];
-const failuresOf = (runShown, step) =>
-  runShown.failures.filter((failure) => placesOf(step).some((place) => failure.startsWith(`${place}:`)));
+const isRefused = (step) => Boolean(step.explanation && step.explanation.verdict === "refused");
+const isNothing = (step) => Boolean(step.explanation && step.explanation.verdict === "nothing");
+const failuresOf = (runShown, index) => runShown.failures.filter((failure) => failure.step === index);
+/** What went wrong without a refusal: assertions, and what the board found of wrong use. */
+const troublesOf = (step) => step.entries.filter((entry) =>
+  entry.kind === "assert" || (entry.kind === "notice" && (entry.function === "misuse" || entry.function === "fault")));
+const isBad = (runShown, index) => isRefused(runShown.steps[index]) || failuresOf(runShown, index).length > 0 ||
+  troublesOf(runShown.steps[index]).length > 0 || runShown.steps[index].graphics_state === "out";
+const boardsOf = (runShown) => runShown.boards.join(", ") || "none";
+/** What tells runs of the page apart. */
+const nameOf = (runShown) => data.runs.every((one) => boardsOf(one) === boardsOf(runShown)) ? runShown.name
+  : `${runShown.name} on board ${boardsOf(runShown)}`;
 const titleOf = (step) => step.command || "(before the first command)";
 
 /* In short: what somebody wants to know who does not read on. */
@@ -56,7 +66,7 @@ function linkTo(index) {
 }
 
 function waits(runShown) {
-  const lane = runShown.lanes.find((one) => one.name === "graphics");
+  const lane = runShown.lanes.find((one) => one.kind === "graphics");
   return lane.spans.filter((span) => span.to.us > span.from.us || span.open);
 }
 
@@ -65,7 +75,8 @@ function waitLine(runShown, span) {
   line.append(`Graphics were ${span.text} for `, make("strong", {}, spoken(span.to.us - span.from.us)),
               `: from ${spoken(span.from.us)}, in `, linkTo(span.from.step), `, until ${spoken(span.to.us)}, in `,
               linkTo(span.to.step));
-  line.append(span.open ? ", where the run ends and they still wait." : `: ${endOfWait(runShown, span)}.`);
+  const end = runShown.steps_left_out > 0 ? "where this page ends" : "where the run ends";
+  line.append(span.open ? `, ${end} and they still wait.` : `: ${endOfWait(runShown, span)}.`);
   const why = runShown.steps[span.from.step].graphics;
   return why ? [line, make("li", {}, `After step ${span.from.step + 1} they were ${why}.`)] : [line];
 }
@@ -75,17 +86,24 @@ function story(runShown) {
   runShown.steps.forEach((step, index) => {
     if (isRefused(step))
       lines.push(make("li", { class: "bad" }, linkTo(index), ` was refused: ${step.explanation.reason.text}.`));
-    for (const failure of failuresOf(runShown, step))
-      lines.push(make("li", { class: "bad" }, linkTo(index), ` failed: ${failure}`));
+    for (const trouble of troublesOf(step))
+      lines.push(make("li", { class: "bad" }, "In ", linkTo(index), `: ${trouble.brief}`));
+    if (step.graphics_state === "out" && (index === 0 || runShown.steps[index - 1].graphics_state !== "out"))
+      lines.push(make("li", { class: "bad" }, "After ", linkTo(index), ` graphics are ${step.graphics}.`));
   });
+  for (const { text, step } of runShown.failures)
+    lines.push(step === null ? make("li", { class: "bad failed" }, `Failed: ${text}`)
+      : make("li", { class: "bad failed" }, linkTo(step), ` failed: ${text}`));
   if (lines.length === 0) lines.push(make("li", {}, "Nothing was refused, and graphics never waited."));
   const expectations = runShown.steps.reduce((sum, step) => sum + step.expectations.length, 0);
   if (runShown.steps_left_out > 0)
     lines.push(make("li", {}, `${counted(runShown.steps_left_out, "more step")} ran that this page leaves out.`));
+  const left = runShown.steps.reduce((sum, step) => sum + step.entries_left_out, 0);
+  if (left > 0) lines.push(make("li", {}, `${counted(left, "line")} of the trace are left out, too.`));
   const verdict = runShown.failures.length > 0 ? "The scenario failed" : "The scenario did what it says";
   lines.push(make("li", {}, `${verdict}: ${counted(runShown.steps.length, "step")}, ` +
-                            `${counted(expectations, "expectation")}, ${spoken(runShown.to_us)} on board ` +
-                            `${runShown.board}.`));
+                            `${counted(expectations, "expectation")}, ${spoken(runShown.lasted_us)} on board ` +
+                            `${boardsOf(runShown)}.`));
   return lines;
 }
 
@@ -97,32 +115,32 @@ class Axis {
   constructor(runShown, toScale) {
     this.steps = runShown.steps;
     this.total = Math.max(1, runShown.to_us);
-    const each = toScale && runShown.to_us > 0 ? 0 : 0.5 / this.steps.length;
+    const each = toScale && runShown.to_us > 0 ? 0 : 0.5 / Math.max(1, this.steps.length);
     const time = runShown.to_us === 0 ? 0 : each === 0 ? 1 : 0.5;
     const room = 0.97; // what holds at the end is seen behind it
     this.starts = [0];
-    this.widths = this.steps.map((step) => each + time * (step.to_us - step.from_us) / this.total);
-    const sum = this.widths.reduce((one, other) => one + other, 0) || 1;
-    this.widths = this.widths.map((width) => width / sum * room);
+    const timed = this.steps.map((step) => time * (step.to_us - step.from_us) / this.total);
+    const sum = timed.reduce((one, other) => one + other, each * timed.length) || 1;
+    this.own = each / sum * room;
+    this.timed = timed.map((width) => width / sum * room);
+    this.widths = this.timed.map((width) => this.own + width);
     for (const width of this.widths) this.starts.push(this.starts.at(-1) + width);
   }
 
-  /** Within its step a moment stands by its time, or where none passes by its place in the trace. */
+  /** Within its step a moment stands by its time, and in what the step has of its own by its place in the trace: so
+   *  that what a step does at its end is seen within it. */
   at(moment) {
     const step = this.steps[moment.step];
+    if (step === undefined) return 0;
     const passed = step.to_us - step.from_us;
     const before = step.entries.filter((entry) => entry.sequence <= moment.sequence).length;
-    const share = passed > 0 ? (moment.us - step.from_us) / passed : before / Math.max(1, step.entries.length);
-    return this.starts[moment.step] + this.widths[moment.step] * Math.min(1, Math.max(0, share));
+    const share = (part, whole) => whole > 0 ? Math.min(1, Math.max(0, part / whole)) : 0;
+    return this.starts[moment.step] + this.own * share(before, step.entries.length) +
+      this.timed[moment.step] * share(moment.us - step.from_us, passed);
   }
 }
 
-function kindOf(lane) {
-  if (lane.name === "graphics") return "held";
-  if (lane.name.startsWith("flag ")) return "flag";
-  if (lane.name === "display timer") return "timer";
-  return lane.name.startsWith("OSD plane") || lane.name === "mute" ? "plane" : "output";
-}
+const kindOf = (lane) => lane.kind === "graphics" ? "held" : lane.kind;
 
 function bar(from, to, kind, text, label, onclick) {
   const width = to - from;
@@ -169,8 +187,8 @@ function showLanes() {
   const axis = new Axis(run(), shown.toScale);
   const steps = run().steps.map((step, index) => {
     const label = `Step ${index + 1}: ${titleOf(step)}, at ${spoken(step.from_us)}` +
-                  (isRefused(step) ? ", refused" : "");
-    const button = bar(axis.starts[index], axis.starts[index + 1], isRefused(step) ? "step refusing" : "step",
+                  (isRefused(step) ? ", refused" : "") + (failuresOf(run(), index).length > 0 ? ", failed" : "");
+    const button = bar(axis.starts[index], axis.starts[index + 1], isBad(run(), index) ? "step refusing" : "step",
                        String(index + 1), label, () => choose(index, true));
     button.dataset.step = index;
     return button;
@@ -225,6 +243,7 @@ function expectationsOf(step) {
 }
 
 function refusalOf(step) {
+  if (isNothing(step)) return make("p", { class: "when" }, `Nothing to do: ${step.explanation.reason.text}.`);
   if (!isRefused(step)) return null;
   const { reason, advice, accepted } = step.explanation;
   const refused = make("p", { class: "refused" }, `Refused: ${reason.text}.`);
@@ -246,7 +265,7 @@ function pictureOf(runIndex, index, output) {
 }
 
 function picturesOf(runIndex, index) {
-  const outputs = data.runs[runIndex].steps[index].outputs.filter((seen) => seen.picture !== null);
+  const { outputs } = data.runs[runIndex].steps[index];
   if (outputs.length === 0) return null;
   return make("div", { class: "pictures", role: "group", "aria-label": `What is seen after step ${index + 1}` },
               ...outputs.map((_, output) => pictureOf(runIndex, index, output)));
@@ -265,9 +284,14 @@ function detailsOf(step) {
   const told = others.length - calls;
   const title = counted(calls, "call") + (told > 0 ? `, ${counted(told, "line")} of log and board` : "") +
                 (step.entries_left_out > 0 ? `; ${step.entries_left_out} more that this page leaves out` : "");
-  return [reasonsOf(step), listOf(others, title, "calls"), listOf(stores, counted(stores.length, "store"), "stores"),
+  return [reasonsOf(step),
+          others.length === 0 && step.entries_left_out > 0
+            ? make("p", { class: "nothing" }, `${counted(step.entries_left_out, "line")} that this page leaves out`)
+            : null,
+          listOf(others, title, "calls"), listOf(stores, counted(stores.length, "store"), "stores"),
           changesOf(step), expectationsOf(step),
-          step.status ? folded("What this means", "status",
+          step.status ? folded("What this means" + (step.power_on_us > 0
+                                 ? `; its times count from the power-on at ${spoken(step.power_on_us)}` : ""), "status",
                                make("div", { class: "scroll", tabindex: "0", role: "group",
                                              "aria-label": "What this means" }, make("pre", {}, step.status))) : null];
 }
@@ -275,22 +299,52 @@ function detailsOf(step) {
 function card(runIndex, index, id) {
   const runShown = data.runs[runIndex];
   const step = runShown.steps[index];
-  const isHeld = step.graphics && step.graphics.startsWith("held back");
-  const failures = failuresOf(runShown, step).map((failure) => make("p", { class: "failed" }, `Failed: ${failure}`));
+  const isHeld = ["held", "awaits video plane", "out"].includes(step.graphics_state);
+  const failures = failuresOf(runShown, index).map(({ text }) => make("p", { class: "failed" }, `Failed: ${text}`));
+  const troubles = troublesOf(step).map(({ brief }) => make("p", { class: "failed" }, brief));
+  const whose = runIndex === shown.run ? "" : `${nameOf(runShown)}, `;
   const title = make("h3", {}, make("span", { class: "number" }, `${index + 1}  `), make("code", {}, titleOf(step)));
-  return make("article", { class: `card${isRefused(step) || failures.length > 0 ? " refusing" : ""}`, id,
-                           tabindex: "-1", "aria-label": `Step ${index + 1}: ${titleOf(step)}` },
+  return make("article", { class: `card${isBad(runShown, index) ? " refusing" : ""}`, id,
+                           tabindex: "-1", "aria-label": `${whose}Step ${index + 1}: ${titleOf(step)}` },
               title, make("p", { class: "when" }, whenOf(step)),
               ...step.results.map((line) => make("p", { class: "result" }, make("code", {}, line))),
-              refusalOf(step), ...failures,
+              step.told ? make("pre", { class: "told scroll", tabindex: "0", role: "group",
+                                      "aria-label": "What the command shows" }, step.told) : null,
+              refusalOf(step), ...failures, ...troubles,
               isHeld ? make("p", { class: "held-back" }, `Graphics are ${step.graphics}.`) : null,
               picturesOf(runIndex, index), ...detailsOf(step));
 }
 
 /* Two runs side by side. */
 
-/** What two lists have in common, in order: pairs of places, with -1 where there is none on the other side. */
+/** The same of lists that are too long to be compared in order: by what they hold. */
+function matched(older, newer) {
+  const places = new Map();
+  for (let j = newer.length - 1; j >= 0; --j) {
+    if (!places.has(newer[j])) places.set(newer[j], []);
+    places.get(newer[j]).push(j);
+  }
+  const pairs = older.map((text, i) => [i, places.get(text)?.pop() ?? -1]);
+  const found = new Set(pairs.map(([, j]) => j));
+  return [...pairs, ...newer.map((_, j) => [-1, j]).filter(([, j]) => !found.has(j))];
+}
+
+/** What two lists have in common, in order: pairs of places, with -1 where there is none on the other side. Time and
+ *  room go with the product of what is between a common beginning and a common end. */
 function aligned(older, newer) {
+  const longest = Math.min(older.length, newer.length);
+  let begin = 0;
+  while (begin < longest && older[begin] === newer[begin]) ++begin;
+  let end = 0;
+  while (end < longest - begin && older.at(-1 - end) === newer.at(-1 - end)) ++end;
+  const [one, other] = [older, newer].map((list) => list.slice(begin, list.length - end));
+  const inside = one.length * other.length > MOST_COMPARED ? matched(one, other) : inOrder(one, other);
+  const moved = ([i, j]) => [i < 0 ? -1 : i + begin, j < 0 ? -1 : j + begin];
+  return [...Array.from({ length: begin }, (_, i) => [i, i]), ...inside.map(moved),
+          ...Array.from({ length: end }, (_, i) => [older.length - end + i, newer.length - end + i])];
+}
+
+function inOrder(older, newer) {
   const lengths = Array.from({ length: older.length + 1 }, () => new Uint32Array(newer.length + 1));
   for (let i = older.length - 1; i >= 0; --i)
     for (let j = newer.length - 1; j >= 0; --j)
@@ -316,15 +370,63 @@ function differingLines(older, newer) {
   return items;
 }
 
-/** What differs between two steps: a line for each that is on one side alone. */
+/** What differs between two steps: a line for each that is on one side alone. Clocks and counters of calls do after
+ *  every other difference, and say nothing. */
 function differences(one, other) {
-  const briefs = (step) => step.entries.map((entry) => entry.brief);
-  const states = (step) => step.changes.map((change) => `${change.path}: ${change.older} → ${change.newer}`);
-  const seen = (step) => step.outputs.map((output) => `picture on ${output.output}: ${output.description}, ` +
-                                                      `picture ${output.picture}`);
-  return [[one.results, other.results], [[one.graphics ?? ""], [other.graphics ?? ""]], [seen(one), seen(other)],
-          [briefs(one), briefs(other)], [states(one), states(other)]]
-    .flatMap(([older, newer]) => differingLines(older, newer));
+  const briefs = (step) => step.entries.map((entry) => entry.brief + (entry.faulted ? "  (scripted)" : ""));
+  const states = (step) => step.changes.filter((change) => !change.counter)
+    .map((change) => `${change.path}: ${change.older} → ${change.newer}`);
+  const lasted = (step) => [`takes ${spoken(step.to_us - step.from_us)}`];
+  const reason = (step) => isRefused(step) ? [`refused: ${step.explanation.reason.text}`] : [];
+  const failures = (step) => data.runs.flatMap((of) => failuresOf(of, of.steps.indexOf(step))).map(({ text }) => text);
+  return [lasted, reason, failures, (step) => step.results, (step) => [step.graphics ?? ""],
+          (step) => step.told.split("\n"), briefs, states]
+    .flatMap((of) => differingLines(of(one), of(other)))
+    .concat(differingPictures(one, other));
+}
+
+/** The pictures themselves: a number would tell nothing. */
+function differingPictures(one, other) {
+  const image = (seen) => make("img", { src: data.pictures[seen.picture], alt: `${seen.output}: ${seen.description}` });
+  return one.outputs.flatMap((seen, index) => {
+    const beside = other.outputs[index];
+    if (!beside || beside.picture === seen.picture) return [];
+    return [make("li", { class: "apart-pictures" }, `${seen.output}: ${seen.description} / ${beside.description}`,
+                 make("span", { class: "both" }, image(seen), image(beside)))];
+  });
+}
+
+/** The pairs of steps with the same command. */
+function pairsOf(one, other) {
+  const commands = (of) => of.steps.map((step) => step.command);
+  return aligned(commands(one), commands(other));
+}
+
+/** How two runs differ, in words: what somebody wants to know who compares them. */
+function comparison(one, other) {
+  const line = (what, here, there) => here === there ? [] : [make("li", {}, `${what}: ${here} here, ${there} there.`)];
+  const waited = (of) => {
+    const all = waits(of);
+    return all.length === 0 ? "never" : all.map((span) => spoken(span.to.us - span.from.us)).join(", then ");
+  };
+  const count = (of, is) => of.steps.filter((_, index) => is(of, index)).length;
+  const refused = (of) => counted(count(of, (run_, index) => isRefused(run_.steps[index])), "step");
+  const last = (lane) => lane.spans.length > 0 && lane.spans.at(-1).open ? lane.spans.at(-1).text : "nothing";
+  const lines = [...line("Boards", boardsOf(one), boardsOf(other)),
+                 ...line("Graphics waited", waited(one), waited(other)),
+                 ...line("Refused", refused(one), refused(other)),
+                 ...line("Failures", one.failures.length, other.failures.length),
+                 ...line("The run takes", spoken(one.lasted_us), spoken(other.lasted_us)),
+                 ...one.lanes.flatMap((lane, index) => lane.kind !== "output" ? []
+                   : line(`In the end, ${lane.name}`, last(lane), last(other.lanes[index])))];
+  const pairs = pairsOf(one, other);
+  const apart = pairs.filter(([i, j]) => i >= 0 && j >= 0 && differences(one.steps[i], other.steps[j]).length > 0);
+  const alone = pairs.filter(([i, j]) => i < 0 || j < 0).length;
+  if (alone > 0) lines.push(make("li", {}, `${counted(alone, "step")} in one of them alone.`));
+  if (apart.length > 0)
+    lines.push(make("li", {}, `${counted(apart.length, "step")} with the same command differ, the first is `,
+                    linkTo(apart[0][0]), "."));
+  return lines.length > 0 ? lines : [make("li", {}, "Both do the same, and look the same.")];
 }
 
 function pair(index, otherIndex) {
@@ -347,14 +449,17 @@ function showCards() {
     part("cards").replaceChildren(...steps.map((_, index) => card(shown.run, index, `step-${index + 1}`)));
     return;
   }
-  const commands = (runShown) => runShown.steps.map((step) => step.command);
   part("cards").replaceChildren(
-    ...aligned(commands(run()), commands(data.runs[shown.other])).flatMap(([one, other]) => pair(one, other)));
+    ...pairsOf(run(), data.runs[shown.other]).flatMap(([one, other]) => pair(one, other)));
 }
 
 /* Choosing, filtering, enlarging. */
 
 function choose(index, moves) {
+  if (run().steps.length === 0) {
+    part("told").textContent = "No step of it ran.";
+    return;
+  }
   shown.step = Math.min(run().steps.length - 1, Math.max(0, index));
   const id = `step-${shown.step + 1}`;
   for (const element of document.querySelectorAll(".card")) {
@@ -398,40 +503,42 @@ function filter() {
   part("found").textContent = wanted === "" ? "" : `${counted(lines, "line")} in ${counted(steps, "step")}`;
 }
 
-function showLarge(runIndex) {
-  const step = data.runs[runIndex].steps[shown.step];
+function showLarge() {
+  const { run: runIndex, step: index } = large;
+  const step = data.runs[runIndex].steps[index];
   const seen = step.outputs[shown.output];
-  part("large-title").textContent = `${seen.output}, after step ${shown.step + 1}: ${titleOf(step)}`;
+  part("large-title").textContent = `${seen.output}, after step ${index + 1}: ${titleOf(step)}`;
   part("large-picture").src = data.pictures[seen.picture];
   part("large-picture").alt = `${seen.output}: ${seen.description}`;
-  part("large-text").textContent = `${seen.description}. Graphics: ${step.graphics}.`;
+  part("large-text").textContent =
+    `${seen.output} after step ${index + 1}: ${seen.description}. Graphics: ${step.graphics}.`;
 }
 
 function enlarge(runIndex, index, output) {
   if (runIndex === shown.run) choose(index, false);
-  shown.step = index;
+  large.run = runIndex;
+  large.step = index;
   shown.output = output;
-  part("large").runIndex = runIndex;
-  showLarge(runIndex);
+  showLarge();
   part("large").showModal();
 }
 
 function keyInLarge(event) {
-  const runIndex = part("large").runIndex;
-  const steps = data.runs[runIndex].steps;
+  const { steps } = data.runs[large.run];
   const by = { ArrowLeft: [-1, 0], ArrowRight: [1, 0], ArrowUp: [0, -1], ArrowDown: [0, 1] }[event.key];
   if (by === undefined) return;
   event.preventDefault();
   event.stopPropagation();
-  const outputs = steps[shown.step].outputs.length;
+  const outputs = steps[large.step].outputs.length;
   shown.output = (shown.output + by[1] + outputs) % outputs;
-  const next = shown.step + by[0];
-  if (next >= 0 && next < steps.length && steps[next].outputs.length > 0) shown.step = next;
-  if (runIndex === shown.run) choose(shown.step, false);
-  showLarge(runIndex);
+  const next = large.step + by[0];
+  if (next >= 0 && next < steps.length && steps[next].outputs.length > 0) large.step = next;
+  if (large.run === shown.run) choose(large.step, false);
+  showLarge();
 }
 
 function key(event) {
+  if (event.shiftKey && event.key !== "/") return; // it selects text
   if (event.ctrlKey || event.altKey || event.metaKey || part("large").open) return;
   if (event.target.closest("input, select, textarea, .scroll")) return;
   const steps = { ArrowLeft: shown.step - 1, ArrowRight: shown.step + 1, Home: 0, End: run().steps.length - 1 };
@@ -443,8 +550,11 @@ function key(event) {
 
 function show() {
   document.title = `${run().name} – storyboard`;
-  part("title").textContent = shown.other < 0 ? run().name : `${run().name} beside ${data.runs[shown.other].name}`;
+  const other = data.runs[shown.other];
+  part("title").textContent = other ? `${nameOf(run())} beside ${nameOf(other)}` : nameOf(run());
   part("story").replaceChildren(...story(run()));
+  part("beside").hidden = !other;
+  part("compared").replaceChildren(...(other ? comparison(run(), other) : []));
   showLanes();
   showCards();
   choose(shown.step, false);
@@ -452,7 +562,7 @@ function show() {
 }
 
 function offerRuns() {
-  const options = () => data.runs.map((one, index) => make("option", { value: index }, `${index + 1}  ${one.name}`));
+  const options = () => data.runs.map((one, index) => make("option", { value: index }, `${index + 1}  ${nameOf(one)}`));
   part("run").replaceChildren(...options());
   part("other").replaceChildren(make("option", { value: -1 }, "none"), ...options());
   for (const label of document.querySelectorAll(".runs")) label.hidden = data.runs.length < 2;

@@ -25,14 +25,13 @@ struct PageLimits
 {
     std::size_t steps = 500;     ///< of each run
     std::size_t entries = 20000; ///< of each run's trace
+    std::size_t told = 20000;    ///< letters that a step shows
 };
 
 class Storyboard : public TraceSink
 {
 public:
-    explicit Storyboard(std::string board, const PageLimits& limits = {}) : m_board(std::move(board)), m_limits(limits)
-    {
-    }
+    explicit Storyboard(const PageLimits& limits = {}) : m_limits(limits) {}
 
     void scenario(const std::string& name) override;
     void powered_on() override;
@@ -40,11 +39,14 @@ public:
     void expectation(std::string_view line) override;
     void explanation(const std::string& json) override;
     void operation_ends(const Outcome& outcome) override;
+    void told(const std::string& text) override;
+    void failure(const std::string& message) override;
     void settle() override;
     std::string entry(const board::TraceEntry& entry, bool shown) override;
 
-    /** The scenario is over. */
-    void end_scenario(const std::vector<std::string>& failures);
+    /** The scenario is over.
+     *  @param unreadable  why its lines could not be read to the end; empty when they could */
+    void end_scenario(const std::string& unreadable = {});
 
     /** {"runs": […], "pictures": […]}: what the page's script reads, and nobody else. */
     std::string to_json() const;
@@ -53,12 +55,12 @@ private:
     board::Json& step();
     Moment moment() const;
     void begin_step(std::string_view line);
+    void end_of_page();
     bool is_left_out() const { return m_steps_left_out > 0; }
     void end_step();
     void follow_lanes();
     board::Json lanes() const;
 
-    std::string m_board;
     PageLimits m_limits;
     SeenPictures m_pictures;
     board::Json m_runs = board::Json::array();
@@ -72,7 +74,9 @@ private:
     bool m_is_powered = false;
     std::int64_t m_offset_us = 0; ///< where the last power-on stands on the time line
     std::uint64_t m_sequence = 0;
-    std::optional<board::Value> m_before; ///< what the step found; nothing where the board lost its power
+    std::optional<board::Value> m_before; ///< what the step found, or the power-on within it
+    board::Json m_failures = board::Json::array();
+    std::string m_heard_place; ///< of the last line that was heard of
     LaneSpans m_lanes;
 };
 

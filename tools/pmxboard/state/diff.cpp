@@ -75,13 +75,6 @@ bool is_of_layer(const std::string& path)
     });
 }
 
-/** Clocks and counters change with nearly every command, and are seldom what one looks for. */
-bool is_counter(const std::string& path)
-{
-    const std::string last = path.substr(path.find_last_of('.') + 1);
-    return last == "now_us" || last == "reads" || last == "writes";
-}
-
 bool is_at(const std::string& path, std::string_view wanted)
 {
     const auto below = [&](std::string_view part) {
@@ -97,6 +90,12 @@ std::string text_of(const std::optional<Value>& value)
 }
 
 } // namespace
+
+bool is_counter(const std::string& path)
+{
+    const std::string last = path.substr(path.find_last_of('.') + 1);
+    return last == "now_us" || last == "reads" || last == "writes";
+}
 
 std::vector<Change> changes(const Value& older, const Value& newer)
 {

@@ -19,6 +19,9 @@ struct Change
     std::optional<board::Value> newer; ///< absent: it is gone
 };
 
+/** Clocks and counters change with nearly every command, and are seldom what one looks for. */
+bool is_counter(const std::string& path);
+
 /** The changed leaves: first the layer's, then the devices', then clocks and counters of calls, each in the order of
  *  the state. What is there on one side alone is one change, with all that is in it. */
 std::vector<Change> changes(const board::Value& older, const board::Value& newer);

@@ -85,7 +85,7 @@ def main():
         bad.write_text('<!DOCTYPE html><title>bad</title><img src="data:,">', encoding="utf-8")
         if not findings(browser, script, bad, ""):
             sys.exit("axe-core finds nothing wrong with a picture that has no text")
-        page = written.write("page", pages.REFUSED, pages.NEVER)
+        page = written.write(pages.REFUSED, pages.NEVER)
         for state, found in looked_at(browser, script, page):
             print(f"{state}: {len(found)} findings")
             for finding in found:

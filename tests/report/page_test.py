@@ -45,8 +45,8 @@ class PageTest(unittest.TestCase):
     def tearDown(self):
         self.assertEqual([], browser.complaints())
 
-    def open(self, name, *scenarios, code=0):
-        page = written.write(name, *scenarios, code=code)
+    def open(self, *arguments, code=0):
+        page = written.write(*arguments, code=code)
         browser.open(page)
         return page
 
@@ -82,17 +82,17 @@ class PageTest(unittest.TestCase):
 
 class Shown(PageTest):
     def test_it_opens_from_a_file_and_asks_for_nothing(self):
-        page = self.open("alone", pages.NEVER)
+        page = self.open(pages.NEVER)
         self.assertIn("display-part-never-answers.pmx", browser.driver.title)
         self.assertEqual([page.as_uri()], browser.requests())
 
     def test_every_step_is_shown_with_its_command(self):
-        self.open("steps", pages.NEVER)
+        self.open(pages.NEVER)
         self.assertEqual(pages.commands(pages.NEVER), self.texts(".card h3 code"))
         self.assertEqual(len(pages.commands(pages.NEVER)), len(self.all(".bar.step")))
 
     def test_all_that_a_trace_has_is_there(self):
-        self.open("trace", pages.NEVER)
+        self.open(pages.NEVER)
         trace = written.run("run", "--stores", "--trace-format", "jsonl", pages.NEVER).stdout.splitlines()
         self.assertEqual(len(trace), len(self.all(".calls li, .stores li")))
         calls = [json.loads(line)["function"] for line in trace if json.loads(line)["kind"] == "call"]
@@ -102,18 +102,18 @@ class Shown(PageTest):
             self.assertIn(f"  {call}(", line)
 
     def test_who_reads_no_code_learns_why_there_were_no_graphics(self):
-        self.open("why", pages.NEVER)
+        self.open(pages.NEVER)
         told = " ".join(self.texts("#story li"))
         self.assertIn("Graphics were held back for 10 s: from 4 ms", told)
         self.assertIn("the display timer ran out; the display part had not answered", told)
         self.assertIn("planes 3 to 7 wait until the display part answers", told)
-        self.open("answered", pages.FIRST_LOOK)
+        self.open(pages.FIRST_LOOK)
         told = " ".join(self.texts("#story li"))
         self.assertIn("Graphics were held back for 3 s", told)
         self.assertIn("the display part has switched", told)
 
     def test_held_graphics_are_a_bar_that_leads_to_their_step(self):
-        self.open("bar", pages.NEVER)
+        self.open(pages.NEVER)
         bar = self.all(".bar.held")[0]
         self.assertIn("held back for 10 s", bar.get_attribute("aria-label"))
         track = self.all(".track")[0].size["width"]
@@ -126,7 +126,7 @@ class Shown(PageTest):
         self.assertIn("held back for 10 s", self.one("#told").text)
 
     def test_what_was_refused_says_why_and_what_would_do(self):
-        self.open("refused", pages.REFUSED)
+        self.open(pages.REFUSED)
         self.assertIn("source 1 feeds two planes", " ".join(self.texts("#story li.bad")))
         refused = " ".join(self.texts(".refused"))
         self.assertIn("Refused: source 1 feeds two planes, 0 and 1.", refused)
@@ -134,25 +134,97 @@ class Shown(PageTest):
 
     def test_a_failure_is_told_where_it_happened(self):
         wrong = written.scenario("wrong.pmx", "PMX_Init\nPMX_GetMode 0\nexpect result 0\nPMX_Stop\n")
-        self.open("failed", wrong, code=1)
+        self.open(wrong, code=1)
         self.assertEqual(2, len(self.all(".card")))
         self.assertEqual(1, len(self.all("#step-2 .failed")))
         self.assertIn("The scenario failed", " ".join(self.texts("#story li")))
 
+    def test_a_failure_of_no_step_is_told_once(self):
+        self.open(written.scenario("unread.pmx", 'PMX_Init\nprint "no end\n'), code=1)
+        told = self.texts("#story .failed")
+        self.assertEqual(1, len(told))
+        self.assertIn("unread.pmx:2: ", told[0])
+        self.assertEqual([], self.all(".card .failed"))
+        written.scenario("within.pmx", "PMX_GetMode 0\nPMX_GetTvType 0\nexpect result 0\n")
+        self.open(written.scenario("including.pmx", f"PMX_Init\ninclude {written.folder}/within.pmx\n"), code=1)
+        self.assertEqual(1, len(self.texts("#story .failed")))
+        self.assertEqual(1, len(self.all(".card .failed")))
+
+    def test_a_run_without_steps_is_a_page(self):
+        for lines, code in (("", 0), ("# nothing\n", 0), ('print "no end\n', 1)):
+            self.open(written.scenario(f"none-{len(lines)}.pmx", lines), code=code)
+            self.press(Keys.ARROW_RIGHT, Keys.END, Keys.HOME)
+            self.assertIn("No step", self.one("#told").text)
+            self.assertEqual(code, len(self.texts("#story .failed")))
+            self.one("#scale").click()
+
+    def test_one_that_cannot_be_read_to_its_end_leaves_the_others(self):
+        endless = written.scenario("endless.pmx", "PMX_Init\n#" + "x" * (1 << 21) + "\n")
+        self.open(pages.FIRST_LOOK, endless, code=2)
+        self.assertEqual(pages.commands(pages.FIRST_LOOK), self.texts(".card h3 code"))
+        self.choose("#run", 1)
+        self.assertEqual(["PMX_Init"], self.texts(".card h3 code"))
+        self.assertIn("endless.pmx:2", self.texts("#story .failed")[0])
+
+    def test_how_to_repeat_a_failure_has_board_and_quotes(self):
+        wrong = written.scenario("sp ace.pmx", "PMX_Init\nPMX_GetMode 0\nexpect result 77\n")
+        found = written.run("report", "--board", "bedroom-player", wrong, "-o", written.folder / "repeat.html")
+        self.assertEqual(1, found.returncode)
+        self.assertIn(f"repeat: pmxboard run --board bedroom-player '{wrong}'\n", found.stderr)
+
+    def test_what_was_so_already_is_no_refusal(self):
+        self.open(written.scenario("again.pmx", "PMX_Init\nPMX_Init\n"))
+        self.assertEqual([], self.all("#story .bad"))
+        self.assertEqual([], self.all(".refusing"))
+        self.assertIn("Nothing to do: ", self.one("#step-2").text)
+
+    def test_what_a_command_shows_is_on_its_card(self):
+        self.open(written.scenario("shows.pmx", 'print "why this is\\n"\nPMX_Init\nstatus graphics\n'))
+        self.assertEqual("why this is", self.one("#step-1 .told").text)
+        self.assertIn("Graphics", self.one("#step-3 .told").text)
+
+    def test_left_out_lines_are_told(self):
+        def leave_out(data):
+            for step in data["runs"][0]["steps"]:
+                step["entries_left_out"], step["entries"] = len(step["entries"]), []
+            return data
+
+        browser.open(written.changed(written.write(pages.NEVER), leave_out))
+        self.assertIn("this page leaves out", self.one(f"#step-{HELD_STEP} .nothing").text)
+        self.assertTrue(any("left out" in line for line in self.texts("#story li")))
+
+    def test_assertions_and_misuses_are_told(self):
+        self.open(written.scenario("wrong-use.pmx", "PMX_Init\npoke MutexPMX 99\nPMX_Uninit\nexpect misuses 1\n"))
+        self.assertIn("step 3", " ".join(self.texts("#story .bad")))
+        self.assertEqual(1, len(self.all("#step-3.refusing")))
+
+    def test_time_goes_on_over_a_power_on(self):
+        self.open(written.scenario("twice.pmx", "PMX_Init\nadvance 1s\npower-on\nPMX_Init\n"))
+        begun = float(self.texts("#step-4 .entries .time")[0])
+        self.assertGreaterEqual(begun, 1000)
+        self.assertIn("count from the power-on at 1.", " ".join(self.texts("#step-4 .status summary")))
+
+    def test_what_a_step_does_at_its_end_is_seen_within_it(self):
+        self.open(pages.NEVER)
+        held = self.all(".bar.held")[0].rect
+        step = self.one(f".bar.step[data-step='{HELD_STEP - 1}']").rect
+        self.assertLess(held["x"], step["x"] + step["width"])
+        self.assertEqual(1, len(self.all(".bar.held")), "none of no time behind it")
+
     def test_what_a_scenario_holds_stays_text(self):
         text = "</script><b class=evil>&amp;<!--"
         hostile = written.scenario("hostile.pmx", f'poke PMX_debug_level 2\nPMX_Printf 1 "{text}\\n"\n')
-        self.open("hostile", hostile)
+        self.open(hostile)
         self.assertEqual([], self.all(".evil"))
         self.assertIn(text, self.texts(".card h3 code")[1])
 
     def test_the_page_of_the_longest_scenario_is_small(self):
-        page = self.open("longest", pages.LONGEST)
+        page = self.open(pages.LONGEST)
         self.assertLess(page.stat().st_size, LARGEST)
         self.assertEqual(pages.commands(pages.LONGEST), self.texts(".card h3 code"))
 
     def test_it_fits_on_screens_of_any_kind(self):
-        self.open("fits", pages.FIRST_LOOK)
+        self.open(pages.FIRST_LOOK)
         grounds = set()
         for width in (browsers.WIDE, browsers.NARROW):
             for scheme in (browsers.LIGHT, browsers.DARK):
@@ -161,12 +233,20 @@ class Shown(PageTest):
                 grounds.add(browser.run("return getComputedStyle(document.body).backgroundColor"))
         self.assertEqual(2, len(grounds), "light and dark")
 
+    def test_two_runs_fit_side_by_side_unfolded(self):
+        self.open(pages.ANSWERS, pages.NEVER)
+        self.choose("#other", 1)
+        browser.run("for (const one of document.querySelectorAll('details')) one.open = true")
+        for width in (browsers.WIDE, browsers.NARROW):
+            browser.look(width)
+            self.assertLessEqual(browser.run("return document.documentElement.scrollWidth"), width)
+
 
 class Pictures(PageTest):
     LAST = 8  # step of FIRST_LOOK, behind which graphics are back
 
     def test_all_of_them_are_whole(self):
-        self.open("pictures", pages.FIRST_LOOK)
+        self.open(pages.FIRST_LOOK)
         self.assertEqual(4 * len(pages.commands(pages.FIRST_LOOK)), len(self.all(".picture img")))
         broken = browser.run("""return Promise.all([...document.querySelectorAll(".picture img")].map((image) => {
             image.loading = "eager"; return image.decode().then(() => image.naturalWidth, () => 0); }))
@@ -177,12 +257,12 @@ class Pictures(PageTest):
         taken = written.folder / "hdmi.png"
         lines = f"{pages.FIRST_LOOK.read_text(encoding='utf-8')}shot hdmi {taken} 640x360\n"
         self.assertEqual(0, written.run("run", "-q", written.scenario("shot.pmx", lines)).returncode)
-        self.open("shot", pages.FIRST_LOOK)
+        self.open(pages.FIRST_LOOK)
         shown = self.one(f"#step-{self.LAST} .picture:nth-child(2) img").get_attribute("src")
         self.assertEqual(taken.read_bytes(), base64.b64decode(shown.partition("base64,")[2], validate=True))
 
     def test_enter_enlarges_and_arrows_step(self):
-        self.open("large", pages.FIRST_LOOK)
+        self.open(pages.FIRST_LOOK)
         thumbnail = self.one(f"#step-{self.LAST} .picture:nth-child(2)")
         browser.run("arguments[0].focus()", thumbnail)
         self.press(Keys.ENTER)
@@ -203,9 +283,24 @@ class Pictures(PageTest):
         self.assertTrue(browser.run("return document.activeElement === arguments[0]", thumbnail))
 
 
+    def test_what_is_enlarged_beside_leaves_the_position(self):
+        self.open(pages.ANSWERS, pages.NEVER)
+        self.choose("#other", 1)
+        self.assertEqual(1, self.current())
+        browser.run("document.querySelector('#other-step-3 .picture').click()")
+        self.assertIn("after step 3", self.one("#large-text[role=status]").text)
+        self.press(Keys.ARROW_RIGHT)
+        self.assertIn("after step 4", self.one("#large-text").text)
+        self.press(Keys.ESCAPE)
+        self.assertEqual(1, self.current())
+        browser.run("document.activeElement.blur()")
+        self.one("body").send_keys(Keys.ARROW_RIGHT)
+        self.assertEqual(2, self.current())
+
+
 class Used(PageTest):
     def test_the_keyboard_steps(self):
-        self.open("keys", pages.NEVER)
+        self.open(pages.NEVER)
         count = len(pages.commands(pages.NEVER))
         self.assertEqual(1, self.current())
         self.press(Keys.END)
@@ -222,13 +317,13 @@ class Used(PageTest):
         self.assertEqual(1, self.current(), "arrows in a field move in it")
 
     def test_an_address_names_a_step(self):
-        page = self.open("named", pages.NEVER)
+        page = self.open(pages.NEVER)
         browser.driver.get("about:blank")
         browser.driver.get(f"{page.as_uri()}#step-3")
         self.assertEqual(3, self.current())
 
     def test_the_filter_leaves_what_contains_it(self):
-        self.open("filter", pages.NEVER)
+        self.open(pages.NEVER)
         self.assertEqual([], self.visible(".entries li"), "folded at first")
         self.one("#filter").send_keys("tve_")
         shown = self.visible(".entries li")
@@ -242,14 +337,14 @@ class Used(PageTest):
         self.assertEqual("", self.one("#found").text)
 
     def test_lists_unfold(self):
-        self.open("unfold", pages.NEVER)
+        self.open(pages.NEVER)
         self.one(f"#step-{HELD_STEP} .calls summary").click()
         self.assertEqual(len(self.all(f"#step-{HELD_STEP} .calls li")), len(self.visible(".entries li")))
         self.one(f"#step-{HELD_STEP} .state summary").click()
         self.assertIn("record.ucMode", " ".join(self.visible(".state th")))
 
     def test_two_runs_stand_side_by_side(self):
-        self.open("two", pages.ANSWERS, pages.NEVER)
+        self.open(pages.ANSWERS, pages.NEVER)
         self.assertIn("display-part-answers", self.one("#title").text)
         self.choose("#run", 1)
         self.assertIn("display-part-never-answers", self.one("#title").text)
@@ -264,10 +359,62 @@ class Used(PageTest):
     def test_what_differs_between_two_runs_is_named(self):
         one = written.scenario("one.pmx", "PMX_Init\nPMX_GetTvType 0\n")
         other = written.scenario("other.pmx", "PMX_Init\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\nPMX_GetTvType 0\n")
-        self.open("differ", one, other)
+        self.open(one, other)
         self.choose("#other", 1)
         self.assertIn("*pucTvType = PMX_TV_TYPE_NTSC", self.texts(".apart .gone"))
         self.assertIn("*pucTvType = PMX_TV_TYPE_PAL", self.texts(".apart .new"))
+
+
+    ANSWER = ("PMX_Init\ndisplay-part answer {}\n"
+              "PMX_SetModeEx 0 [ [0], [1, RES_1080P50HZ], [1, RES_576P], [1, RES_576I] ] 50 0 0\nadvance 20s\n")
+
+    def test_how_two_runs_differ_is_told_in_words(self):
+        one, other = (written.scenario(f"{time}.pmx", self.ANSWER.format(time)) for time in ("2s", "3s"))
+        self.open(one, other)
+        self.assertFalse(self.one("#beside").is_displayed())
+        self.choose("#other", 1)
+        self.assertIn("Graphics waited: 2 s here, 3 s there.", self.texts("#compared li"))
+        self.choose("#other", 0)
+        self.assertEqual(["Both do the same, and look the same."], self.texts("#compared li"))
+
+    def test_one_scenario_runs_on_two_boards(self):
+        self.open("--board", "default", "--board", "bedroom-player", pages.SCENARIOS / "frequency-change.pmx")
+        self.choose("#other", 1)
+        self.assertIn("on board bedroom player", self.one("#title").text)
+        self.assertIn("Boards: default here, bedroom player there.", self.texts("#compared li"))
+
+    def test_pictures_that_differ_stand_beside_each_other(self):
+        one = written.scenario("whole.pmx", "PMX_Init\nPMX_SetMuteEnable 0 0\n")
+        other = written.scenario("muted.pmx", "PMX_Init\nPMX_SetMuteEnable 0 0\nPMX_SetMuteEnable 0 1\n"
+                                              "PMX_SetMuteEnable 0 0\n")
+        self.open(one, other)
+        self.choose("#other", 1)
+        self.assertEqual([], self.all(".apart-pictures"))
+        browser.open(written.changed(written.write(one, other), self.another_picture))
+        self.choose("#other", 1)
+        self.assertEqual(2, len(self.all(".apart-pictures img")))
+
+    @staticmethod
+    def another_picture(data):
+        data["pictures"].append(data["pictures"][0])
+        data["runs"][1]["steps"][0]["outputs"][0]["picture"] = len(data["pictures"]) - 1
+        return data
+
+    def test_long_lists_are_compared_in_bearable_time(self):
+        self.open(pages.NEVER)
+        script = '''const many = (salt) => Array.from({ length: 20000 }, (_, i) => `${i % 7}-${(i * salt) % 9001}`);
+            const begin = performance.now();
+            const same = aligned(many(3), many(3)).every(([i, j]) => i === j);
+            const other = aligned(["a", ...many(3), "z"], ["a", ...many(5), "z"]);
+            const whole = [0, 1].every((side) =>
+              new Set(other.map((pair) => pair[side]).filter((at) => at >= 0)).size === 20002);
+            return [same, whole, other[0], other.at(-1), performance.now() - begin]'''
+        same, whole, first, last, took_ms = browser.run(script)
+        self.assertTrue(same and whole)
+        self.assertEqual(([0, 0], [20001, 20001]), (first, last))
+        self.assertLess(took_ms, 5000)
+        self.assertEqual([[0, 0], [1, -1], [2, 1], [-1, 2]],
+                         browser.run("return aligned(['a', 'b', 'c'], ['a', 'c', 'd'])"))
 
 
 class TheWatch(unittest.TestCase):

@@ -1,6 +1,7 @@
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 """The pages that the tests look at, written by the tool."""
 
+import json
 import pathlib
 import subprocess
 import tempfile
@@ -12,21 +13,36 @@ REFUSED = SCENARIOS / "refused-orders.pmx"
 FIRST_LOOK = SCENARIOS / "first-look.pmx"
 LONGEST = max(SCENARIOS.glob("*.pmx"), key=lambda path: len(path.read_text(encoding="utf-8").splitlines()))
 
+DATA = '<script type="application/json" id="data">'
+
 
 class Pages:
     def __init__(self, tool, folder):
         self.tool, self.folder = tool, pathlib.Path(folder)
+        self.pages = {}
 
     def run(self, *arguments):
         return subprocess.run([self.tool, *map(str, arguments)], cwd=ROOT, capture_output=True, text=True,
                               check=False)
 
-    def write(self, name, *scenarios, code=0):
-        page = self.folder / f"{name}.html"
-        found = self.run("report", *scenarios, "-o", page)
-        if found.returncode != code:
-            raise AssertionError(f"report of {scenarios} ended with {found.returncode}: {found.stderr}")
-        return page
+    def write(self, *arguments, code=0):
+        """The page of these scenarios and options: one, however many look at it."""
+        if arguments not in self.pages:
+            page = self.folder / f"page-{len(self.pages)}.html"
+            found = self.run("report", *arguments, "-o", page)
+            if found.returncode != code:
+                raise AssertionError(f"report of {arguments} ended with {found.returncode}: {found.stderr}")
+            self.pages[arguments] = page
+        return self.pages[arguments]
+
+    def changed(self, page, change):
+        """A page with other data: what `change` makes of them."""
+        before, begin, rest = page.read_text(encoding="utf-8").partition(DATA)
+        data, end, behind = rest.partition("</script>")
+        other = page.with_name(f"changed-{page.name}")
+        other.write_text(before + begin + json.dumps(change(json.loads(data))).replace("<", "\\u003c") + end + behind,
+                         encoding="utf-8")
+        return other
 
     def scenario(self, name, lines):
         path = self.folder / name

@@ -26,7 +26,7 @@ def main():
                 ("report-wide", pages.NEVER, browsers.WIDE, browsers.LIGHT, CHANGE),
                 ("report-narrow", pages.FIRST_LOOK, browsers.NARROW, browsers.DARK, RETURN)):
             browser.look(width, scheme, HIGH)
-            browser.open(written.write(name, scenario.relative_to(pages.ROOT)))
+            browser.open(written.write(scenario.relative_to(pages.ROOT)))
             browser.run(prepare)
             browser.driver.save_screenshot(str(folder / f"{name}.png"))
 

@@ -31,8 +31,7 @@ void end(void)
 
 _Bool graphicsComeBack(void)
 {
-    return mind.outOfMix == 0 || mind.timerRuns ||
-           (_arPmxDispPartStatus.fgPmxEnabeOsdFlag != FALSE && mind.videoOwes);
+    return mind.outOfMix == 0 || mind.timerRuns || (_arPmxDispPartStatus.fgPmxEnabeOsdFlag != FALSE && mind.videoOwes);
 }
 
 _Bool knowsTheTimer(void)

@@ -33,26 +33,26 @@ typedef enum
 typedef struct
 {
     WORLD_T world;
-    unsigned locks;      /* of MutexPMX, not given back */
-    _Bool everLocked;    /* MutexPMX was taken */
-    _Bool mayNotSleep;   /* whoever called may not */
-    unsigned tables;     /* fetched from the interface manager, not given back */
-    UINT16 u2CompType;   /* whose table was fetched last */
+    unsigned locks;    /* of MutexPMX, not given back */
+    _Bool everLocked;  /* MutexPMX was taken */
+    _Bool mayNotSleep; /* whoever called may not */
+    unsigned tables;   /* fetched from the interface manager, not given back */
+    UINT16 u2CompType; /* whose table was fetched last */
     UINT16 u2CompId;
-    void* pvTag;         /* and with which tag */
-    void* given;         /* by the caller, who has other plans with it by now; or nothing */
-    UINT32 outOfMix;     /* planes that the layer took out, one bit each */
-    HANDLE_T hTimer;     /* of the timer that exists; 0: none does */
-    _Bool timerRuns;     /* some timer of the layer's */
-    _Bool expiryBegun;   /* of one that was stopped since */
-    _Bool videoWaited;   /* the video plane driver's last answer */
-    _Bool videoOwes;     /* it answered that it waits, and has not called PMX_SetOsdEnable since */
-    _Bool somebodyActs;  /* from inside a call */
-    _Bool everFetched;   /* a table was */
-    _Bool expired;       /* from inside a call the timer did */
-    _Bool raised;        /* the display part raised its flag */
-    _Bool lowered;       /* or lowered it */
-    _Bool videoCalled;   /* the video plane driver called PMX_SetOsdEnable */
+    void* pvTag;        /* and with which tag */
+    void* given;        /* by the caller, who has other plans with it by now; or nothing */
+    UINT32 outOfMix;    /* planes that the layer took out, one bit each */
+    HANDLE_T hTimer;    /* of the timer that exists; 0: none does */
+    _Bool timerRuns;    /* some timer of the layer's */
+    _Bool expiryBegun;  /* of one that was stopped since */
+    _Bool videoWaited;  /* the video plane driver's last answer */
+    _Bool videoOwes;    /* it answered that it waits, and has not called PMX_SetOsdEnable since */
+    _Bool somebodyActs; /* from inside a call */
+    _Bool everFetched;  /* a table was */
+    _Bool expired;      /* from inside a call the timer did */
+    _Bool raised;       /* the display part raised its flag */
+    _Bool lowered;      /* or lowered it */
+    _Bool videoCalled;  /* the video plane driver called PMX_SetOsdEnable */
 } MIND_T;
 
 extern MIND_T mind;

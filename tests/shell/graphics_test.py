@@ -19,7 +19,7 @@ import time
 import unittest
 import zlib
 
-from terminal import CTRL_D, ENTER, PROMPT, SKIPPED, Terminal, no_terminals
+from terminal import CTRL_D, ENTER, PROMPT, Terminal, program_of
 
 PROGRAM = ""
 KITTY_QUESTION = "\x1b_Gi=31,s=1,v=1,a=q,t=d,f=24;AAAA\x1b\\"
@@ -293,13 +293,7 @@ class Graphics(unittest.TestCase):
 
 def main():
     global PROGRAM
-    if len(sys.argv) < 2:
-        sys.exit(__doc__)
-    PROGRAM = os.path.abspath(sys.argv.pop(1))
-    why = no_terminals()
-    if why:
-        print(f"skipped: this machine gives out no terminals ({why})")
-        sys.exit(SKIPPED)
+    PROGRAM = program_of(sys.argv, __doc__)
     unittest.main()
 
 

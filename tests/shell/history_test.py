@@ -17,7 +17,7 @@ import tempfile
 import time
 import unittest
 
-from terminal import CTRL_C, CTRL_D, CTRL_R, ENTER, PROMPT, SKIPPED, UP, Terminal, no_terminals
+from terminal import CTRL_C, CTRL_D, CTRL_R, ENTER, PROMPT, UP, Terminal, program_of
 
 PROGRAM = ""
 NOBODY = 65534
@@ -225,13 +225,7 @@ class History(unittest.TestCase):
 
 def main():
     global PROGRAM
-    if len(sys.argv) < 2:
-        sys.exit(__doc__)
-    PROGRAM = os.path.abspath(sys.argv.pop(1))
-    why = no_terminals()
-    if why:
-        print(f"skipped: this machine gives out no terminals ({why})")
-        sys.exit(SKIPPED)
+    PROGRAM = program_of(sys.argv, __doc__)
     unittest.main()
 
 

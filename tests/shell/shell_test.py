@@ -7,15 +7,14 @@ usage: shell_test.py PMXBOARD
 Where the machine gives out no terminals the tests are skipped, exit code 77.
 """
 
-import os
 import pathlib
 import re
 import sys
 import tempfile
 import unittest
 
-from terminal import (CTRL_A, CTRL_C, CTRL_D, CTRL_E, CTRL_R, CTRL_U, DOWN, ENTER, PROMPT, RIGHT, SKIPPED, TAB, UP,
-                      Terminal, no_terminals)
+from terminal import (CTRL_A, CTRL_C, CTRL_D, CTRL_E, CTRL_R, CTRL_U, DOWN, ENTER, PROMPT, RIGHT, TAB, UP,
+                      Terminal, program_of)
 
 PROGRAM = ""
 
@@ -251,13 +250,7 @@ class Shell(unittest.TestCase):
 
 def main():
     global PROGRAM
-    if len(sys.argv) < 2:
-        sys.exit(__doc__)
-    PROGRAM = os.path.abspath(sys.argv.pop(1))
-    why = no_terminals()
-    if why:
-        print(f"skipped: this machine gives out no terminals ({why})")
-        sys.exit(SKIPPED)
+    PROGRAM = program_of(sys.argv, __doc__)
     unittest.main()
 
 

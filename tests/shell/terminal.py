@@ -6,6 +6,7 @@ import os
 import pty
 import select
 import struct
+import sys
 import termios
 import time
 
@@ -106,3 +107,14 @@ def no_terminals():
     except OSError as error:
         return str(error)
     return None
+
+
+def program_of(arguments, usage):
+    """The first argument, taken out: the program that is tested. Ends what runs where there can be no terminal."""
+    if len(arguments) < 2:
+        sys.exit(usage)
+    why = no_terminals()
+    if why:
+        print(f"skipped: this machine gives out no terminals ({why})")
+        sys.exit(SKIPPED)
+    return os.path.abspath(arguments.pop(1))

@@ -18,9 +18,12 @@ import argparse
 import collections
 import json
 import pathlib
-import re
 import subprocess
 import sys
+
+sys.dont_write_bytecode = True
+
+import counted  # noqa: E402
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 LAYER = "src/driver/pmx/"
@@ -39,21 +42,7 @@ class Branch(collections.namedtuple("Branch", "file function text")):
 
 def read_list(text):
     """({Branch: number}, complaints) of the list of branches that are never taken."""
-    allowed, complaints = {}, []
-    text = re.sub(r"^#.*\n", "", text, flags=re.M)
-    for entry in re.split(r"\n\s*\n", text.strip("\n")):
-        lines = [line.strip() for line in entry.splitlines()]
-        if not lines:
-            continue
-        head = re.fullmatch(r"(\S+) (\S+) ([1-9]\d*)", lines[0])
-        if not head or len(lines) < 3:
-            complaints.append(f"not an entry (FILE FUNCTION NUMBER, the line of source, why): {lines[0]}")
-            continue
-        branch = Branch(head.group(1), head.group(2), lines[1])
-        if branch in allowed:
-            complaints.append(f"listed twice: {branch}")
-        allowed[branch] = int(head.group(3))
-    return allowed, complaints
+    return counted.read_list(text, Branch, "FUNCTION", r"\S+")
 
 
 class File:

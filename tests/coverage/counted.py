@@ -194,22 +194,22 @@ def all_missing(files):
     return {missing: number for file in files for missing, number in file.missing().items()}
 
 
-def read_list(text):
-    """({Missing: number}, complaints) of the list of what cannot be."""
+def read_list(text, place=Missing, called="KIND", words="|".join(KINDS)):
+    """({place: number}, complaints) of the list of what cannot be."""
     named, complaints = {}, []
     text = re.sub(r"^#.*\n", "", text, flags=re.M)
     for entry in re.split(r"\n\s*\n", text.strip("\n")):
         lines = [line.strip() for line in entry.splitlines()]
         if not lines:
             continue
-        head = re.fullmatch(rf"(\S+) ({'|'.join(KINDS)}) ([1-9]\d*)", lines[0])
+        head = re.fullmatch(rf"(\S+) ({words}) ([1-9]\d*)", lines[0])
         if not head or len(lines) < 3:
-            complaints.append(f"not an entry (FILE KIND NUMBER, the line of source, why): {lines[0]}")
+            complaints.append(f"not an entry (FILE {called} NUMBER, the line of source, why): {lines[0]}")
             continue
-        missing = Missing(head[1], head[2], lines[1])
-        if missing in named:
-            complaints.append(f"listed twice: {missing.kind}: {missing}")
-        named[missing] = int(head[3])
+        one = place(head[1], head[2], lines[1])
+        if one in named:
+            complaints.append(f"listed twice: {head[2]}: {one}")
+        named[one] = int(head[3])
     return named, complaints
 
 

@@ -3,6 +3,7 @@
 
 #ifdef PMX_HAS_PICTURES
 #include <algorithm>
+#include <cmath>
 
 #include "board/picture/pixels.h"
 #include "board/picture/shot.h"
@@ -26,7 +27,7 @@ picture::Image fitted(const picture::Image& image)
 {
     const double scale =
         std::min({ 1.0, static_cast<double>(widest) / image.width(), static_cast<double>(tallest) / image.height() });
-    const auto side = [scale](int pixels) { return std::max(1, static_cast<int>(pixels * scale + 0.5)); };
+    const auto side = [scale](int pixels) { return std::max(1, static_cast<int>(std::lround(pixels * scale))); };
     return picture::scaled(image, side(image.width()), side(image.height()));
 }
 

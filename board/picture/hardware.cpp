@@ -57,7 +57,7 @@ ConverterState converter_at(const DeviceValues& values, const std::string& path)
     return { values.is_on(path + ".enable"), values.is_on(path + ".direction") };
 }
 
-Standard standard_of(std::int64_t colour_space)
+Standard told_standard(std::int64_t colour_space)
 {
     return colour_space == DRV_PMX_CS_YCBCR_601 ? Standard::Bt601 : Standard::Bt709;
 }
@@ -139,7 +139,7 @@ VideoPlaneState video_plane_in(const DeviceValues& values, std::size_t plane)
 OsdState osd_in(const DeviceValues& values)
 {
     OsdState osd;
-    osd.told = standard_of(values.number("osd_planes.colour_space").value_or(DRV_PMX_CS_YCBCR_709));
+    osd.told = told_standard(values.number("osd_planes.colour_space").value_or(DRV_PMX_CS_YCBCR_709));
     osd.full_range = values.is_on("osd_planes.full_range_conversion");
     osd.fifth_on_composite = values.is_on("osd_planes.osd5.on");
     osd.fifth_on_component = osd.fifth_on_composite && !values.is_on("osd_planes.osd5.composite_only");
@@ -193,7 +193,7 @@ SourceState source_in(const DeviceValues& values, std::string_view name)
                       static_cast<int>(values.number(path + ".size.height").value_or(0)),
                       values.number_or(path + ".luma_key", 0),
                       values.number_or(path + ".colour_mode", DRV_GFX_COLOR_MODE_YCBCR) == DRV_GFX_COLOR_MODE_YCBCR };
-    state.told = standard_of(values.number(path + ".colour_space").value_or(DRV_PMX_CS_YCBCR_709));
+    state.told = told_standard(values.number(path + ".colour_space").value_or(DRV_PMX_CS_YCBCR_709));
     const sources::Picture& picture = sources::picture_of(sources::find(name));
     state.picture = picture.name;
     state.image = picture.image;

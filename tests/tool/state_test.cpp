@@ -26,7 +26,7 @@ using tool_test::run;
 using Json = nlohmann::json;
 
 /** Why a text is no dump. */
-std::string refused(const std::string& text)
+std::string answer_to(const std::string& text)
 {
     try
     {
@@ -121,40 +121,40 @@ TEST(Dump, OfAnotherSchemaOrVersion_IsRefused)
     const std::string no_schema = "it has no \"schema\": \"pmxboard-state\"" + what;
     for (const char* const wrong : { "{}", "[]", "7", "null", R"({"schema": "pmxboard-diff", "version": 1})",
                                      R"({"schema": ["pmxboard-state"], "version": 1})" })
-        EXPECT_EQ(no_schema, refused(wrong)) << wrong;
+        EXPECT_EQ(no_schema, answer_to(wrong)) << wrong;
     EXPECT_EQ("it has version 2 of its schema, and this pmxboard reads 1",
-              refused(R"({"schema": "pmxboard-state", "version": 2, "state": {}})"));
+              answer_to(R"({"schema": "pmxboard-state", "version": 2, "state": {}})"));
     EXPECT_EQ("it has version \"1\" of its schema, and this pmxboard reads 1",
-              refused(R"({"schema": "pmxboard-state", "version": "1", "state": {}})"));
+              answer_to(R"({"schema": "pmxboard-state", "version": "1", "state": {}})"));
     EXPECT_EQ("it has version no number of its schema, and this pmxboard reads 1",
-              refused(R"({"schema": "pmxboard-state", "state": {}})"));
-    EXPECT_EQ("it has no record \"state\"" + what, refused(R"({"schema": "pmxboard-state", "version": 1})"));
-    EXPECT_EQ("it has no record \"state\"" + what, refused(with_state("[]")));
+              answer_to(R"({"schema": "pmxboard-state", "state": {}})"));
+    EXPECT_EQ("it has no record \"state\"" + what, answer_to(R"({"schema": "pmxboard-state", "version": 1})"));
+    EXPECT_EQ("it has no record \"state\"" + what, answer_to(with_state("[]")));
     EXPECT_EQ("it holds a few values, and no whole state" + what,
-              refused(R"({"schema": "pmxboard-state", "version": 1, "values": {}})"));
+              answer_to(R"({"schema": "pmxboard-state", "version": 1, "values": {}})"));
 }
 
 TEST(Dump, Broken_IsRefused_WithThePlace)
 {
-    EXPECT_EQ("it ends in the middle, at line 1, column 1", refused(""));
-    EXPECT_EQ("it ends in the middle, at line 2, column 12", refused("{\n\"schema\": \""));
-    EXPECT_EQ("it is no JSON from line 2, column 1 on", refused("{\n, }"));
-    EXPECT_EQ("it is no JSON from line 1, column 1 on", refused("PMX_Init\n"));
-    EXPECT_EQ("state.a.b: true is no value of a state", refused(with_state(R"({"a": {"b": true}})")));
-    EXPECT_EQ("state.a[1]: 1.5 is no value of a state", refused(with_state(R"({"a": [0, 1.5]})")));
+    EXPECT_EQ("it ends in the middle, at line 1, column 1", answer_to(""));
+    EXPECT_EQ("it ends in the middle, at line 2, column 12", answer_to("{\n\"schema\": \""));
+    EXPECT_EQ("it is no JSON from line 2, column 1 on", answer_to("{\n, }"));
+    EXPECT_EQ("it is no JSON from line 1, column 1 on", answer_to("PMX_Init\n"));
+    EXPECT_EQ("state.a.b: true is no value of a state", answer_to(with_state(R"({"a": {"b": true}})")));
+    EXPECT_EQ("state.a[1]: 1.5 is no value of a state", answer_to(with_state(R"({"a": [0, 1.5]})")));
     EXPECT_EQ("state.a: 18446744073709551615 is no value of a state",
-              refused(with_state(R"({"a": 18446744073709551615})")));
+              answer_to(with_state(R"({"a": 18446744073709551615})")));
     std::string deep;
     for (int i = 0; i < 5000; ++i)
         deep += "[";
-    EXPECT_NE(std::string::npos, refused(with_state(R"({"a": )" + deep + std::string(5000, ']') + "}"))
+    EXPECT_NE(std::string::npos, answer_to(with_state(R"({"a": )" + deep + std::string(5000, ']') + "}"))
                                      .find("values are nested more than 64 deep"));
-    EXPECT_NE(std::string::npos, refused(with_state(R"({"a": 1e400})")).find("a number is too large, or too small"));
-    EXPECT_NE(std::string::npos, refused(with_state(R"({"a\u001b": 1})")).find("no terminal shows it: a\\x1B"));
+    EXPECT_NE(std::string::npos, answer_to(with_state(R"({"a": 1e400})")).find("a number is too large, or too small"));
+    EXPECT_NE(std::string::npos, answer_to(with_state(R"({"a\u001b": 1})")).find("no terminal shows it: a\\x1B"));
     std::string keys;
     for (int i = 0; i < 5000; ++i)
         keys += (i == 0 ? "\"" : ", \"") + std::to_string(i) + "\": 1";
-    EXPECT_NE(std::string::npos, refused(with_state("{" + keys + "}")).find("a record has more than 1024 members"));
+    EXPECT_NE(std::string::npos, answer_to(with_state("{" + keys + "}")).find("a record has more than 1024 members"));
 }
 
 /** A dump with every kind of value, and short: what reads it takes its time for each character. */
@@ -172,9 +172,9 @@ std::string short_dump()
 TEST(Dump, CutShortAnywhere_IsRefused)
 {
     const std::string whole = short_dump();
-    ASSERT_EQ("taken", refused(whole));
+    ASSERT_EQ("taken", answer_to(whole));
     for (std::size_t length = 0; length < whole.size(); length += 11)
-        EXPECT_TRUE(refused(whole.substr(0, length)).starts_with("it ends in the middle, at line ")) << length;
+        EXPECT_TRUE(answer_to(whole.substr(0, length)).starts_with("it ends in the middle, at line ")) << length;
 }
 
 TEST(Dump, WithAnyByteChanged_IsReadOrRefused)
@@ -187,7 +187,7 @@ TEST(Dump, WithAnyByteChanged_IsReadOrRefused)
         {
             std::string changed = whole;
             changed[at] = byte;
-            taken += refused(changed) == "taken";
+            taken += answer_to(changed) == "taken";
         }
     }
     EXPECT_LT(0u, taken);

@@ -195,7 +195,7 @@ constexpr std::uint32_t wait_ms = static_cast<std::uint32_t>(timer_seconds * 100
 
 // docs/reasons.md lists them, written from these rows.
 // clang-format off
-constexpr Row rows[] = {
+constexpr Row reason_rows[] = {
     { PMX_REASON_MODE_NEVER, "[PMX] PMX_SetModeEx, PMX_CheckCap error", format, unknown, is_never_admitted },
     { PMX_REASON_MODE_BIT, "[PMX] PMX_SetModeEx, PMX_CheckCap error", bit_of_format, unknown, hangs_on_a_bit },
     { PMX_REASON_FEATURE_BIT, "[PMX] Seting Brightness fail", bit<"brightness"> },
@@ -240,7 +240,7 @@ using RowsByText = std::multimap<const Text*, const Row*>;
 RowsByText collect_rows()
 {
     RowsByText found;
-    for (const Row& row : rows)
+    for (const Row& row : reason_rows)
     {
         for (const Text& text : texts())
         {

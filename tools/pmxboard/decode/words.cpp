@@ -16,7 +16,7 @@ namespace
 
 using board::names::Family;
 
-constexpr const char* unknown = "?";
+constexpr const char* unknown_value = "?";
 
 /** `60`, `23_976`, and `23976` as the 4K mode has it. */
 std::string frequency_words(std::string written)
@@ -215,7 +215,7 @@ std::string sentence(std::string_view with_names, const std::function<std::strin
             const std::string_view name = with_names.substr(open + 1, close - open - 1);
             const std::size_t colon = name.find(':');
             const std::string printed = value_of(name.substr(0, colon));
-            said += printed == unknown ? printed : value_words(name.substr(colon + 1), printed);
+            said += printed == unknown_value ? printed : value_words(name.substr(colon + 1), printed);
         }
         with_names.remove_prefix(std::min(close + 1, with_names.size()));
     }

@@ -16,7 +16,7 @@ constexpr char done = 'd';
 constexpr char wrong_line = 'w';
 constexpr char failed = 'f';
 
-std::string carried_out(Session& session, const std::string& command, std::ostream& shown)
+std::string became_of(Session& session, const std::string& command, std::ostream& shown)
 {
     try
     {
@@ -41,7 +41,7 @@ void what_if(Session& session, const Words& words)
     if (const auto waiting = board::threads::waiting(); !waiting.empty())
         throw StepFailed("what-if copies the process, and a thread that waits cannot be copied: " + waiting.front());
     session.output().flush();
-    const Apart apart = run_apart([&](std::ostream& shown) { return carried_out(session, command, shown); });
+    const Apart apart = run_apart([&](std::ostream& shown) { return became_of(session, command, shown); });
     const std::string message = apart.answer.empty() ? std::string() : apart.answer.substr(1);
     const bool well = apart.death.empty() && !apart.answer.empty();
     if (well && apart.answer.front() == wrong_line)

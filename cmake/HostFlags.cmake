@@ -65,12 +65,6 @@ if(PMX_COVERAGE)
     target_link_libraries(pmx_host INTERFACE pmx_counted_exit)
 endif()
 
-# What nearly every source includes, compiled once for all libraries. Headers of the library alone: a header of the
-# project that is changed would have everything compiled again.
-set(PMX_PRECOMPILED
-    <algorithm> <chrono> <filesystem> <fstream> <functional> <iostream> <map> <memory> <optional> <span> <sstream>
-    <stdexcept> <string> <string_view> <utility> <vector>)
-
 # Sources that are compiled together, so that the headers that all of them include are read once.
 # Two sources of a library must not give the same name to two things, then, wherever they stand.
 set(PMX_BATCH 8 CACHE STRING "Sources of board, tool and tests that are compiled together; 1: each alone")
@@ -104,18 +98,4 @@ function(pmx_host_library name)
     target_link_libraries(${name} PUBLIC pmx_host)
     pmx_in_batches(${name})
     pmx_soon_compiled(${name})
-endfunction()
-
-# pmx_precompiled(<name> [<other>]): the library has these headers compiled, or those of another one. Not where it is
-# optimised: g++ 12 then takes precompiled headers of the library for the project's own, and warns of them.
-function(pmx_precompiled name)
-    if(CMAKE_CROSSCOMPILING OR NOT CMAKE_BUILD_TYPE STREQUAL Debug)
-        return()
-    endif()
-    target_compile_options(${name} PRIVATE -fpch-preprocess)   # for the compiler cache
-    if(ARGN)
-        target_precompile_headers(${name} REUSE_FROM ${ARGN})
-    else()
-        target_precompile_headers(${name} PRIVATE ${PMX_PRECOMPILED})
-    endif()
 endfunction()

@@ -21,7 +21,7 @@ from concurrent.futures import ThreadPoolExecutor
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 RULES = [ROOT / ".clang-tidy", ROOT / "tests/.clang-tidy", pathlib.Path(__file__).resolve()]
-NOT_FOR_ONE_SOURCE = ("-Winvalid-pch", "-fpch-preprocess", "-Wno-shadow", "-Wshadow=local", "-Wno-subobject-linkage")
+NOT_FOR_ONE_SOURCE = ("-Wno-shadow", "-Wshadow=local", "-Wno-subobject-linkage")
 MAIN_LINES = ("refs/remotes/origin/main", "@{upstream}")  # the first that is there
 
 
@@ -93,16 +93,9 @@ def compiled_with(command):
 
 
 def arguments_of(command):
-    """How a source is compiled, and the headers that it was given precompiled; clang-tidy reads those themselves."""
+    """How a source is compiled, where it is one of a batch as well."""
     words = [word for word in shlex.split(command["command"]) if word not in NOT_FOR_ONE_SOURCE]
-    kept, precompiled = [], []
-    while words:
-        word = words.pop(0)
-        if word == "-include" and words and words[0].endswith("/cmake_pch.hxx"):
-            precompiled.append(pathlib.Path(words.pop(0)))
-        else:
-            kept.append(command["file"] if word == command.get("given") else word)
-    return kept, precompiled
+    return [command["file"] if word == command.get("given") else word for word in words]
 
 
 def sources_of(commands, build):
@@ -110,10 +103,8 @@ def sources_of(commands, build):
     made_from, sources = dependencies(build), {}
     every_source = {pathlib.Path(command["file"]) for command in commands}
     for command in commands:
-        words, precompiled = arguments_of(command)
-        read = set(made_from.get(words[words.index("-o") + 1], ()))
-        for header in precompiled:
-            read |= made_from.get(f"{header.relative_to(build)}.gch", set())
+        words = arguments_of(command)
+        read = made_from.get(words[words.index("-o") + 1], set())
         source = pathlib.Path(command["file"])
         sources[source] = read and (read - every_source) | {source}   # a batch has read the others of it, too
     return sources
@@ -121,7 +112,7 @@ def sources_of(commands, build):
 
 def write_commands(commands, directory):
     directory.mkdir(exist_ok=True)
-    written = [{"directory": command["directory"], "file": command["file"], "arguments": arguments_of(command)[0]}
+    written = [{"directory": command["directory"], "file": command["file"], "arguments": arguments_of(command)}
                for command in commands]
     (directory / "compile_commands.json").write_text(json.dumps(written, indent=1), encoding="utf-8")
 

@@ -8,8 +8,10 @@ usage: run_test.py PMXBOARD
 
 import base64
 import contextlib
+import dataclasses
 import gzip
 import io
+import os
 import pathlib
 import re
 import shlex
@@ -119,6 +121,79 @@ class Recordings(unittest.TestCase):
                 ktap = run.Ktap()
                 run.has_processors(ktap, told)
             self.assertEqual(expected, ktap.failures)
+
+
+class Boots(unittest.TestCase):
+    ALONE = """#!/bin/sh
+echo "NICE $(nice)"
+"""
+    # Comes to its end when all of the others have begun, and tells who it is.
+    TOGETHER = """#!/bin/sh
+cd "${0%/*}" || exit
+while [ "$1" != -initrd ]
+do
+    shift
+done
+: >"began-$2"
+for tick in $(seq 300)
+do
+    [ "$(ls -d began-* | wc -l)" -eq 3 ] && echo "DONE $2" && exit
+    sleep 0.1
+done
+"""
+
+    def setUp(self):
+        directory = tempfile.TemporaryDirectory()
+        self.addCleanup(directory.cleanup)
+        self.folder = pathlib.Path(directory.name)
+
+    def kernel(self, script):
+        program = self.folder / "emulator"
+        program.write_text(script, encoding="utf-8")
+        program.chmod(0o755)
+        return debian.Kernel(self.folder, "1.2-x", dataclasses.replace(machines.ARM, emulator=(program,)))
+
+    def test_all_run_at_once_and_are_told_apart(self):
+        boots = {name: (name, *options) for name, *options in (
+            ("virtual", *run.VIRTUAL_TIME), ("real",), ("several", "-smp", "2"))}
+        with run.booted(self.kernel(self.TOGETHER), self.folder, boots) as console_of:
+            for name in reversed(boots):
+                self.assertEqual([f"DONE {name}"], console_of[name]())
+                self.assertTrue((self.folder / f"{name}.log").is_file())
+
+    def test_virtual_time_goes_behind_real_time(self):
+        kernel, own = self.kernel(self.ALONE), os.nice(0)
+        nice = {options: run.boot(kernel, "archive", self.folder / "log", *options)
+                for options in (tuple(run.VIRTUAL_TIME), (), ("-smp", "2"))}
+        self.assertEqual({tuple(run.VIRTUAL_TIME): [f"NICE {min(own + 10, 19)}"], (): [f"NICE {own}"],
+                          ("-smp", "2"): [f"NICE {own}"]}, nice)
+
+    def test_one_that_cannot_run_is_told_when_the_others_have_ended(self):
+        kernel = self.kernel("#!/bin/sh\nsleep 1\necho DONE 1\n")
+        (self.folder / "broken.log").mkdir()
+        with self.assertRaises(IsADirectoryError), \
+                run.booted(kernel, self.folder, {"broken": ("a",), "good": ("a",)}) as console_of:
+            console_of["broken"]()
+        self.assertEqual("DONE 1\n", (self.folder / "good.log").read_text(encoding="utf-8"))
+
+    def test_one_that_stops_halfway_is_told_beside_one_that_does_not(self):
+        kernel = self.kernel("""#!/bin/sh
+printf 'SCENARIO x\\n| f()\\nEND\\n'
+[ "$(echo "$*" | grep -c -e -smp)" -eq 1 ] || echo DONE 1
+""")
+        shown = io.StringIO()
+        with contextlib.redirect_stdout(shown), \
+                run.booted(kernel, self.folder, {"real": ("a",), "several": ("a", "-smp", "2")}) as console_of:
+            ktap = run.Ktap()
+            for name, console in console_of.items():
+                run.compare(ktap, name, {"x": (["f()"], [])}, console())
+        self.assertEqual("""KTAP version 1
+ok 1 real x
+ok 2 real boot: 1 scenarios, 1 lines
+ok 3 several x
+# the kernel did not come to its end
+not ok 4 several boot: 1 scenarios, 1 lines
+""", shown.getvalue())
 
 
 class RealTime(unittest.TestCase):

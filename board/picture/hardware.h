@@ -42,6 +42,8 @@ struct Delivery
     int height = 0;
     unsigned luma_key = 0; ///< of a video plane: what is darker is transparent
     bool ycbcr = true;     ///< of an OSD plane; video always is
+
+    bool operator==(const Delivery&) const = default;
 };
 
 struct SourceState
@@ -51,6 +53,8 @@ struct SourceState
     Standard told = Standard::Bt709;  ///< of a video plane: what it converts into
     std::string picture;              ///< as in sources::Picture
     std::shared_ptr<const Image> image;
+
+    bool operator==(const SourceState&) const = default;
 };
 
 /** A plane's selector names an input: the two ports of video planes, and six OSD planes. */
@@ -78,6 +82,8 @@ struct MixerState
     ConverterState scaler_converter;
     bool digital_port = false;
     unsigned digital_format = 0; ///< a PLA_MXR_DIGITAL_OUTPUT_FMT_T value: YCbCr
+
+    bool operator==(const MixerState&) const = default;
 };
 
 /** What a video plane shows; hidden ones do not. */
@@ -85,6 +91,8 @@ struct VideoPlaneState
 {
     bool shown = false;
     std::optional<Pixel> cleared; ///< filled with a colour until the next picture comes
+
+    bool operator==(const VideoPlaneState&) const = default;
 };
 
 struct OsdState
@@ -93,6 +101,8 @@ struct OsdState
     bool full_range = false;
     bool fifth_on_component = false;
     bool fifth_on_composite = false;
+
+    bool operator==(const OsdState&) const = default;
 };
 
 /** Picture settings; 128 is neutral. */
@@ -112,6 +122,8 @@ struct EncoderState
     std::optional<unsigned> mode;
     unsigned frequency = 60;
     bool black = false;
+
+    bool operator==(const EncoderState&) const = default;
 };
 
 /** What the HDMI/AV driver was told of an output. */
@@ -119,6 +131,8 @@ struct LinkState
 {
     bool enabled = false;
     unsigned mode = 0;
+
+    bool operator==(const LinkState&) const = default;
 };
 
 struct Hardware
@@ -136,6 +150,8 @@ struct Hardware
     bool digital_before_mixer = false;
     unsigned aspect = 3; ///< an ASPECT_RATIO_T value: what the mixer answers to the video planes that ask
     std::array<SourceState, video_source_count + osd_source_count> sources;
+
+    bool operator==(const Hardware&) const = default;
 };
 
 /** As it is now. */

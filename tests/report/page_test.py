@@ -9,8 +9,12 @@ usage: page_test.py TOOL [UNITTEST ARGUMENT...]
 import base64
 import contextlib
 import json
+import os
 import pathlib
+import signal
+import subprocess
 import sys
+import time
 import unittest
 
 sys.dont_write_bytecode = True
@@ -104,12 +108,12 @@ class Shown(PageTest):
     def test_who_reads_no_code_learns_why_there_were_no_graphics(self):
         self.open(pages.NEVER)
         told = " ".join(self.texts("#story li"))
-        self.assertIn("Graphics were held back for 10 s: from 4 ms", told)
+        self.assertIn("No graphics for 10 s: held back from 4 ms", told)
         self.assertIn("the display timer ran out; the display part had not answered", told)
         self.assertIn("planes 3 to 7 wait until the display part answers", told)
         self.open(pages.FIRST_LOOK)
         told = " ".join(self.texts("#story li"))
-        self.assertIn("Graphics were held back for 3 s", told)
+        self.assertIn("No graphics for 3 s: held back", told)
         self.assertIn("the display part has switched", told)
 
     def test_held_graphics_are_a_bar_that_leads_to_their_step(self):
@@ -166,6 +170,30 @@ class Shown(PageTest):
         self.assertEqual(["PMX_Init"], self.texts(".card h3 code"))
         self.assertIn("endless.pmx:2", self.texts("#story .failed")[0])
 
+    def test_a_step_that_breaks_the_program_down_is_the_last_on_the_page(self):
+        page, begun = written.folder / "broken.html", written.folder / "begun.json"
+        arguments = [str(TOOL), "report", str(pages.FIRST_LOOK), "-", "-o", str(page)]
+        with subprocess.Popen(arguments, stdin=subprocess.PIPE, stderr=subprocess.PIPE, cwd=pages.ROOT) as tool:
+            tool.stdin.write(f"PMX_Init\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\nsave {begun}\n".encode())
+            tool.stdin.flush()
+            while not begun.exists():
+                time.sleep(0.01)
+            copies = pathlib.Path(f"/proc/{tool.pid}/task/{tool.pid}/children").read_text(encoding="ascii").split()
+            os.kill(int(copies[-1]), signal.SIGSEGV)
+            said = tool.stderr.read().decode()
+        self.assertEqual(1, tool.returncode, said)
+        message = "<stdin>:3: the step broke the program down: "
+        self.assertIn(message, said)
+        browser.open(page)
+        self.choose("#run", 1)
+        self.assertEqual(["PMX_Init", "PMX_SetTvType 0 PMX_TV_TYPE_PAL", f"save {begun}"], self.texts(".card h3 code"))
+        self.assertIn(message, self.one("#step-3 .failed").text)
+        self.assertIn(f"step 3 failed: {message}", self.one("#story .failed").text)
+        self.assertIn("PMX_HalSetTvType", "".join(self.texts("#step-2 .calls li")))
+        browser.run("document.activeElement.blur()")
+        self.one("body").send_keys(Keys.END)
+        self.assertEqual(3, self.current())
+
     def test_how_to_repeat_a_failure_has_board_and_quotes(self):
         wrong = written.scenario("sp ace.pmx", "PMX_Init\nPMX_GetMode 0\nexpect result 77\n")
         found = written.run("report", "--board", "bedroom-player", wrong, "-o", written.folder / "repeat.html")
@@ -186,12 +214,15 @@ class Shown(PageTest):
     def test_left_out_lines_are_told(self):
         def leave_out(data):
             for step in data["runs"][0]["steps"]:
-                step["entries_left_out"], step["entries"] = len(step["entries"]), []
+                step["left_out"]["entries"], step["entries"] = len(step["entries"]), []
+            data["runs"][0]["steps"][0]["left_out"]["changes"] = 1
             return data
 
         browser.open(written.changed(written.write(pages.NEVER), leave_out))
-        self.assertIn("this page leaves out", self.one(f"#step-{HELD_STEP} .nothing").text)
-        self.assertTrue(any("left out" in line for line in self.texts("#story li")))
+        lines = len(written.run("run", "--stores", "--trace-format", "jsonl", pages.NEVER).stdout.splitlines())
+        self.assertRegex(self.one(f"#step-{HELD_STEP} .left-out").text, r"leaves out \d+ lines of the trace\.")
+        self.assertIn(f"Of its steps this page leaves out {lines} lines of the trace and 1 change of the state.",
+                      self.texts("#story li"))
 
     def test_assertions_and_misuses_are_told(self):
         self.open(written.scenario("wrong-use.pmx", "PMX_Init\npoke MutexPMX 99\nPMX_Uninit\nexpect misuses 1\n"))
@@ -218,10 +249,30 @@ class Shown(PageTest):
         self.assertEqual([], self.all(".evil"))
         self.assertIn(text, self.texts(".card h3 code")[1])
 
-    def test_the_page_of_the_longest_scenario_is_small(self):
+    def test_the_page_of_the_longest_scenario_leaves_nothing_out(self):
         page = self.open(pages.LONGEST)
         self.assertLess(page.stat().st_size, LARGEST)
         self.assertEqual(pages.commands(pages.LONGEST), self.texts(".card h3 code"))
+        self.assertEqual([], self.all(".left-out"))
+
+    # Limits of each kind but the pictures' are met: by new modes, by all that a step can show, and by too many steps.
+    ENDLESS = "".join((
+        "PMX_Init\ndisplay-part answer 1s\n",
+        *(f"PMX_SetModeEx 0 [ [0], [1, RES_1080P{hertz}HZ], [1, RES_576P], [1, RES_576I] ] {hertz} 0 0\nadvance 20s\n"
+          for hertz in (50, 60) * 30), "status\n" * 500))
+
+    def test_a_page_at_its_limits_opens_and_tells_what_is_missing(self):
+        page = self.open(written.scenario("endless.pmx", self.ENDLESS))
+        self.assertLess(page.stat().st_size, LARGEST)
+        self.assertGreater(page.stat().st_size, LARGEST / 2)
+        told = " ".join(self.texts("#story li"))
+        self.assertRegex(told, r"\d+ more steps ran that this page leaves out")
+        self.assertRegex(told, r"leaves out \d+ lines of the trace and \d+ changes of the state\.")
+        self.assertIn("The bars of its time line end at", told)
+        self.press(Keys.END)
+        self.assertEqual(len(self.all(".card")), self.current())
+        browser.look(browsers.NARROW)
+        self.assertLessEqual(browser.run("return document.documentElement.scrollWidth"), browsers.NARROW)
 
     def test_it_fits_on_screens_of_any_kind(self):
         self.open(pages.FIRST_LOOK)
@@ -252,6 +303,21 @@ class Pictures(PageTest):
             image.loading = "eager"; return image.decode().then(() => image.naturalWidth, () => 0); }))
             .then((widths) => widths.filter((width) => width === 0).length)""")
         self.assertEqual(0, broken)
+
+    def test_one_that_is_left_out_is_told(self):
+        def leave_out(data):
+            step = data["runs"][0]["steps"][self.LAST - 1]
+            step["outputs"][1]["picture"], step["left_out"]["pictures"] = None, 1
+            return data
+
+        browser.open(written.changed(written.write(pages.FIRST_LOOK), leave_out))
+        self.assertEqual(3, len(self.all(f"#step-{self.LAST} .picture img")))
+        self.assertIn("left out", self.one(f"#step-{self.LAST} .pictures .nothing").text)
+        self.assertIn("leaves out 1 picture.", self.one(f"#step-{self.LAST} .left-out").text)
+        browser.run("arguments[0].click()", self.all(f"#step-{self.LAST} .picture")[0])
+        self.press(Keys.ARROW_DOWN)
+        self.assertIn("This page leaves the picture out.", self.one("#large-text").text)
+        self.press(Keys.ESCAPE)
 
     def test_they_are_what_a_shot_is(self):
         taken = written.folder / "hdmi.png"
@@ -397,7 +463,9 @@ class Used(PageTest):
     @staticmethod
     def another_picture(data):
         data["pictures"].append(data["pictures"][0])
-        data["runs"][1]["steps"][0]["outputs"][0]["picture"] = len(data["pictures"]) - 1
+        first, second = data["runs"][1]["steps"][:2]
+        second["outputs"] = [dict(output) for output in first["outputs"]]
+        first["outputs"][0]["picture"] = len(data["pictures"]) - 1
         return data
 
     def test_long_lists_are_compared_in_bearable_time(self):

@@ -2,14 +2,18 @@
 // What the report's page is given; how it shows that is tested in a browser.
 #include <gtest/gtest.h>
 
+#include <csignal>
+#include <functional>
 #include <sstream>
 #include <string>
 #include <vector>
 
 #include "board/json.h"
 #include "scenario_run.h"
+#include "tools/pmxboard/language/apart.h"
 #include "tools/pmxboard/report/base64.h"
 #include "tools/pmxboard/report/lane_spans.h"
+#include "tools/pmxboard/report/onlooker.h"
 #include "tools/pmxboard/report/page.h"
 #include "tools/pmxboard/report/storyboard.h"
 
@@ -18,17 +22,23 @@ namespace
 
 using Document = board::Json;
 
+void look_at(const std::string& lines, const std::function<void(const Document&)>& tell,
+             const pmxboard::PageLimits& limits = {})
+{
+    pmxboard::Onlooker onlooker(tell, limits);
+    std::istringstream in(lines);
+    std::ostringstream diagnostics;
+    pmxboard::run_scenario(in, { "here.pmx", "default", "", false, true },
+                           { .quiet = true, .trace = &onlooker, .stores = true }, diagnostics);
+    onlooker.end_scenario();
+}
+
 Document storyboard_of(const std::vector<std::string>& scenarios, const pmxboard::PageLimits& limits = {})
 {
-    pmxboard::Storyboard storyboard(limits);
+    pmxboard::Storyboard storyboard;
     for (const std::string& lines : scenarios)
-    {
-        std::istringstream in(lines);
-        std::ostringstream diagnostics;
-        pmxboard::run_scenario(in, { "here.pmx", "default", "", false, true },
-                               { .quiet = true, .trace = &storyboard, .stores = true }, diagnostics);
-        storyboard.end_scenario();
-    }
+        look_at(
+            lines, [&](const Document& event) { storyboard.hear(event); }, limits);
     return Document::parse(storyboard.to_json());
 }
 
@@ -177,14 +187,14 @@ TEST(Storyboard, AFailureOfNoStepIsToldAllTheSame)
 
 TEST(Storyboard, AFailureBehindThePageIsOfNoStepOnIt)
 {
-    const Document run = storyboard_of({ "PMX_Init\nPMX_Stop\nPMX_GetMode 7 8 9\n" }, { 2, 1000 })["runs"][0];
+    const Document run = storyboard_of({ "PMX_Init\nPMX_Stop\nPMX_GetMode 7 8 9\n" }, { .steps = 2 })["runs"][0];
     EXPECT_TRUE(run.at("failures").at(0).at("step").is_null());
 }
 
 TEST(Storyboard, AStepHasWhatItShows)
 {
     const Document steps = storyboard_of({ "print \"why this is\\n\"\nPMX_Init\nstatus graphics\nexpect result 0\n" },
-                                         { 500, 20000, 30 })["runs"][0]["steps"];
+                                         { .told = 30 })["runs"][0]["steps"];
     EXPECT_EQ("why this is\n", steps[0].at("told"));
     EXPECT_EQ("", steps[1].at("told"));
     EXPECT_EQ(0u, steps[2].at("told").get<std::string>().find("Graphics"));
@@ -245,20 +255,120 @@ TEST(Storyboard, WhatWasSoAlreadyIsNoRefusal)
     EXPECT_EQ("refused", verdict(2));
 }
 
-TEST(Storyboard, WhatIsTooMuchIsCounted)
+// Names, results, texts and expectations, refusals, new pictures, changes and bars; and what a page writes longer.
+const char* const something_of_everything =
+    "PMX_Init\ndisplay-part never\nprint \"<<<<<<<<<<<<<<<<<<<<\\n\"\nstatus\n"
+    "PMX_SetModeEx 0 [ [0], [1, RES_1080P50HZ], [1, RES_576P], [1, RES_576I] ] 50 0 0\nexpect result 1\n"
+    "expect state record.ucMode RES_1080P50HZ\nadvance 20s\nPMX_SetArbPlaneOrder 0 0x76543211\nPMX_GetTvType 0\n"
+    "PMX_SetMuteEnable 0 1\nprint \"<<<<<<<<<<<<<<<<<<<<\\n\"\nPMX_SetMuteEnable 0 0\nstatus\n";
+
+std::size_t left_out(const Document& run, const char* kind)
 {
-    const std::string lines = "PMX_Init\nPMX_SetTvType 0 3\nPMX_SetTvType 0 1\nPMX_Stop\n";
-    const Document run = storyboard_of({ lines }, { 2, 40 })["runs"][0];
+    std::size_t sum = 0;
+    for (const Document& step : run.at("steps"))
+        sum += step.at("left_out").at(kind).get<std::size_t>();
+    return sum;
+}
+
+std::size_t on_page(const Document& run, const char* list)
+{
+    std::size_t sum = 0;
+    for (const Document& step : run.at("steps"))
+        sum += step.at(list).size();
+    return sum;
+}
+
+TEST(PageLimits, StepsBehindTheLastAreCounted)
+{
+    const Document run =
+        storyboard_of({ "PMX_Init\nPMX_SetTvType 0 3\nPMX_SetTvType 0 1\nPMX_Stop\n" }, { .steps = 2 })["runs"][0];
     EXPECT_EQ((std::vector<std::string>{ "PMX_Init", "PMX_SetTvType 0 3" }), commands_of(run));
     EXPECT_EQ(2, run.at("steps_left_out"));
-    EXPECT_EQ(40u, run.at("steps")[0].at("entries").size() + run.at("steps")[1].at("entries").size());
-    const Document whole = storyboard_of({ lines })["runs"][0];
-    EXPECT_EQ(0, whole.at("steps_left_out"));
-    const auto left_out = [&](std::size_t step) {
-        return run.at("steps")[step].at("entries_left_out").get<std::size_t>();
+    EXPECT_LT(run.at("to_us"), 10'000'000);
+}
+
+/** Nothing of it is left out. */
+const Document& whole_page()
+{
+    static const Document page = storyboard_of({ something_of_everything });
+    return page;
+}
+
+TEST(PageLimits, WhatFindsNoRoomIsCounted)
+{
+    const Document& whole = whole_page()["runs"][0];
+    ASSERT_TRUE(whole.at("failures").empty()) << whole.at("failures");
+    const Document run = storyboard_of({ something_of_everything }, { .entries = 4000, .changes = 2000 })["runs"][0];
+    for (const char* const list : { "entries", "changes" })
+    {
+        EXPECT_EQ(0u, left_out(whole, list)) << list;
+        EXPECT_LT(0u, left_out(run, list)) << list;
+        EXPECT_LT(0u, on_page(run, list)) << list;
+        EXPECT_EQ(on_page(whole, list), on_page(run, list) + left_out(run, list)) << list;
+    }
+    EXPECT_EQ(0u, left_out(whole, "texts"));
+    EXPECT_EQ(0u, left_out(whole, "pictures"));
+}
+
+TEST(PageLimits, ATimeLineEndsWhereItsRoomDoes)
+{
+    const Document run = storyboard_of({ something_of_everything }, { .spans = 3000 })["runs"][0];
+    EXPECT_EQ(0, run.at("steps_left_out"));
+    EXPECT_LT(run.at("lanes_end_us"), run.at("to_us"));
+    for (const Document& lane : run.at("lanes"))
+        for (const Document& span : lane.at("spans"))
+            EXPECT_LE(span.at("to").at("us"), run.at("lanes_end_us"));
+    EXPECT_TRUE(whole_page()["runs"][0].at("lanes_end_us").is_null());
+}
+
+TEST(PageLimits, APageIsNoLargerThanTheyAllow)
+{
+    const pmxboard::PageLimits limits{
+        .texts = 13'000, .entries = 4000, .changes = 2000, .spans = 6000, .pictures = 9000
     };
-    const auto all = [&](std::size_t step) { return whole.at("steps")[step].at("entries").size(); };
-    EXPECT_EQ(all(0) + all(1) - 40, left_out(0) + left_out(1));
+    const Document page = storyboard_of({ something_of_everything }, limits);
+    const std::size_t most = limits.texts + limits.entries + limits.changes + limits.spans + limits.pictures;
+    constexpr std::size_t frame = 3000; // of the run, and of lanes without bars
+    EXPECT_LT(page["runs"][0].at("steps").size(), whole_page()["runs"][0].at("steps").size());
+    EXPECT_LT(0, page["runs"][0].at("steps_left_out"));
+    EXPECT_LT(pmxboard::size_on_page(page), most + frame);
+    EXPECT_LT(2 * pmxboard::size_on_page(page), pmxboard::size_on_page(whole_page()));
+    const pmxboard::PageLimits usual;
+    EXPECT_LT(usual.texts + usual.entries + usual.changes + usual.spans + usual.pictures + frame +
+                  pmxboard::page_with("").size(),
+              2'000'000u);
+}
+
+TEST(PageLimits, OneLongLineIsShort)
+{
+    const std::string letters(100'000, 'x');
+    const Document page = storyboard_of({ "print \"" + letters + "\"\nPMX_Init\nexpect result 0\n" });
+    EXPECT_EQ(2u, page["runs"][0].at("steps").size());
+    EXPECT_LT(pmxboard::size_on_page(page["runs"][0]["steps"][0]), 40'000u);
+}
+
+TEST(Storyboard, AStepThatBreaksTheProgramDownLeavesWhatCameBefore)
+{
+    const pmxboard::Apart apart = pmxboard::run_apart([](std::ostream& told) {
+        look_at("PMX_Init\nPMX_GetMode 0\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\nPMX_Stop\n", [&](const Document& event) {
+            told << board::written(event) << '\n';
+            if (event.at("is") == "entry" && event.at("brief") == "PMX_HalSetTvType(0, PMX_TV_TYPE_PAL)")
+                raise(SIGKILL);
+        });
+        return std::string();
+    });
+    pmxboard::Storyboard storyboard;
+    std::istringstream told(apart.shown);
+    for (std::string event; std::getline(told, event);)
+        storyboard.hear(Document::parse(event));
+    EXPECT_EQ("here.pmx:3: the step broke the program down: Killed", storyboard.broke_down(apart.death));
+    const Document run = Document::parse(storyboard.to_json())["runs"][0];
+    EXPECT_EQ((std::vector<std::string>{ "PMX_Init", "PMX_GetMode 0", "PMX_SetTvType 0 PMX_TV_TYPE_PAL" }),
+              commands_of(run));
+    EXPECT_EQ("PMX_HalSetTvType", run.at("steps")[2].at("entries").back().at("function"));
+    EXPECT_EQ(2, run.at("failures").at(0).at("step"));
+    EXPECT_TRUE(spans_of_lane(run, "HDMI sink")[0].at("open").get<bool>());
+    EXPECT_EQ(run.at("steps")[1].at("to_us"), run.at("to_us"));
 }
 
 } // namespace

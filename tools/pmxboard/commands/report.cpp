@@ -4,13 +4,16 @@
 #include <algorithm>
 #include <iostream>
 #include <memory>
+#include <sstream>
 
 #include "board/board.h"
 #include "board/files.h"
 #include "tools/pmxboard/commands/exit_codes.h"
 #include "tools/pmxboard/commands/repeat.h"
 #include "tools/pmxboard/files/new_file.h"
+#include "tools/pmxboard/language/apart.h"
 #include "tools/pmxboard/language/runner.h"
+#include "tools/pmxboard/report/onlooker.h"
 #include "tools/pmxboard/report/page.h"
 #include "tools/pmxboard/report/storyboard.h"
 
@@ -51,25 +54,41 @@ std::vector<Planned> planned(const ReportOptions& options)
     return runs;
 }
 
-/** The exit code. */
-int tell(Storyboard& storyboard, const Planned& run)
+/** One run on a board of its own; the exit code. */
+int look_at(const Planned& run, Onlooker& onlooker)
 {
     OutputOptions output;
     output.quiet = true;
-    output.trace = &storyboard;
+    output.trace = &onlooker;
     output.stores = true;
     const Scenario scenario{ run.file, board_of(run.board), repeat_command(run.board, run.file), false, true };
     try
     {
         const bool is_done = run_scenario(*run.lines, scenario, output, std::cerr);
-        storyboard.end_scenario();
+        onlooker.end_scenario();
         return is_done ? exit_done : exit_failed;
     }
     catch (const board::files::FileError& error) // what happened until then is worth as much, and so are the others
     {
-        storyboard.end_scenario(presentable(error.what()));
+        onlooker.end_scenario(presentable(error.what()));
         return usage_error(error.what());
     }
+}
+
+/** The same in a copy of the process: a step that breaks it down leaves the page what was told until then. */
+int tell(Storyboard& storyboard, const Planned& run)
+{
+    const Apart apart = run_apart([&](std::ostream& told) {
+        Onlooker onlooker([&](const board::Json& event) { told << board::written(event) << '\n'; });
+        return std::to_string(look_at(run, onlooker));
+    });
+    std::istringstream told(apart.shown);
+    for (std::string event; std::getline(told, event) && !told.eof();) // one without an end was not told
+        storyboard.hear(board::Json::parse(event));
+    if (apart.death.empty())
+        return std::stoi(apart.answer);
+    std::cerr << storyboard.broke_down(apart.death) << '\n';
+    return exit_failed;
 }
 
 } // namespace

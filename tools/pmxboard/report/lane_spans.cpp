@@ -4,6 +4,16 @@
 namespace pmxboard
 {
 
+board::Json json_of(const Moment& moment)
+{
+    return { { "us", moment.us }, { "step", moment.step }, { "sequence", moment.sequence } };
+}
+
+Moment moment_of(const board::Json& json)
+{
+    return { json.at("us"), json.at("step"), json.at("sequence") };
+}
+
 void LaneSpans::follow(const std::map<int, std::string>& states, const Moment& now)
 {
     for (auto open = m_open.begin(); open != m_open.end();)

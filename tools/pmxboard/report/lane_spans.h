@@ -9,6 +9,8 @@
 #include <string>
 #include <vector>
 
+#include "board/json.h"
+
 namespace pmxboard
 {
 
@@ -19,6 +21,9 @@ struct Moment
     std::size_t step = 0;       ///< the step that runs, from 0
     std::uint64_t sequence = 0; ///< the last entry of the trace until then
 };
+
+board::Json json_of(const Moment& moment);
+Moment moment_of(const board::Json& json);
 
 struct LaneSpan
 {

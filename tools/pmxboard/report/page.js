@@ -3,8 +3,17 @@
 
 const data = JSON.parse(document.getElementById("data").textContent);
 const MOST_COMPARED = 1e6;
+const TIME_ROOM = 0.12; // what a time on the axis takes of the width
 const shown = { run: 0, other: -1, step: 0, output: 0, filter: "", toScale: false };
-const large = { run: 0, step: 0 }; // what is enlarged, which may be of the run beside
+const large = { side: 0, step: 0 }; // what is enlarged, which may be of the run beside
+
+/* What is as it was behind the step before is not written once more. */
+for (const { steps } of data.runs) {
+  steps.forEach((step, index) => {
+    step.outputs ??= steps[index - 1].outputs;
+    step.status ??= steps[index - 1].status;
+  });
+}
 
 const part = (id) => document.getElementById(id);
 
@@ -29,7 +38,25 @@ function spoken(us) {
   return `${us / 1e6} s`;
 }
 
+const enumerated = (words) => words.length < 2 ? words.join("")
+  : `${words.slice(0, -1).join(", ")} and ${words.at(-1)}`;
+
+/** What a page may have no room for, and what one and many of them are called. */
+const LEFT_OUT = [["entries", "line of the trace", "lines of the trace"],
+                  ["changes", "change of the state", "changes of the state"],
+                  ["pictures", "picture", "pictures"], ["texts", "other text", "other texts"]];
+
+/** What these steps have that the page does not; empty when that is nothing. */
+function leftOut(steps) {
+  const sum = (kind) => steps.reduce((before, step) => before + (step.left_out?.[kind] ?? 0), 0);
+  return enumerated(LEFT_OUT.filter(([kind]) => sum(kind) > 0)
+    .map(([kind, one, many]) => counted(sum(kind), one, many)));
+}
+
 const run = () => data.runs[shown.run];
+/** What stands beside each other: one run, or two. Cards of the second have names of their own. */
+const sides = () => [shown.run, shown.other].filter((index) => index >= 0).map((index) => data.runs[index]);
+const cardId = (side, index) => `${side === 0 ? "" : "other-"}step-${index + 1}`;
 const isRefused = (step) => Boolean(step.explanation && step.explanation.verdict === "refused");
 const isNothing = (step) => Boolean(step.explanation && step.explanation.verdict === "nothing");
 const failuresOf = (runShown, index) => runShown.failures.filter((failure) => failure.step === index);
@@ -56,11 +83,11 @@ function endOfWait(runShown, span) {
   return titleOf(step);
 }
 
-function linkTo(index) {
-  const link = make("a", { href: `#step-${index + 1}` }, `step ${index + 1}`);
+function linkTo(index, side = 0) {
+  const link = make("a", { href: `#${cardId(side, index)}` }, `step ${index + 1}`);
   link.addEventListener("click", (event) => {
     event.preventDefault();
-    choose(index, true);
+    goTo(side, index);
   });
   return link;
 }
@@ -70,61 +97,94 @@ function waits(runShown) {
   return lane.spans.filter((span) => span.to.us > span.from.us || span.open);
 }
 
-function waitLine(runShown, span) {
-  const line = make("li", { class: "bad" });
-  line.append(`Graphics were ${span.text} for `, make("strong", {}, spoken(span.to.us - span.from.us)),
-              `: from ${spoken(span.from.us)}, in `, linkTo(span.from.step), `, until ${spoken(span.to.us)}, in `,
-              linkTo(span.to.step));
-  const end = runShown.steps_left_out > 0 ? "where this page ends" : "where the run ends";
-  line.append(span.open ? `, ${end} and they still wait.` : `: ${endOfWait(runShown, span)}.`);
-  const why = runShown.steps[span.from.step].graphics;
-  return why ? [line, make("li", {}, `After step ${span.from.step + 1} they were ${why}.`)] : [line];
+/** Where what still holds is seen no longer. */
+function endOf(runShown) {
+  if (runShown.lanes_end_us !== null) return "where the bars of its time line end";
+  return runShown.steps_left_out > 0 ? "where this page ends" : "where the run ends";
 }
 
-function story(runShown) {
-  const lines = waits(runShown).flatMap((span) => waitLine(runShown, span));
+function waitLine(runShown, side, span) {
+  const line = make("li", { class: "bad" });
+  line.append("No graphics for ", make("strong", {}, spoken(span.to.us - span.from.us)),
+              `: ${span.text} from ${spoken(span.from.us)}, in `, linkTo(span.from.step, side),
+              `, until ${spoken(span.to.us)}, in `, linkTo(span.to.step, side));
+  line.append(span.open ? `, ${endOf(runShown)} and they still wait.` : `: ${endOfWait(runShown, span)}.`);
+  const why = runShown.steps[span.from.step].graphics;
+  return why ? [line, make("li", {}, `After step ${span.from.step + 1}, `,
+                           make("code", {}, titleOf(runShown.steps[span.from.step])), `, they were ${why}.`)] : [line];
+}
+
+/** What happened in a run, in sentences. */
+function story(runShown, side) {
+  const lines = waits(runShown).flatMap((span) => waitLine(runShown, side, span));
   runShown.steps.forEach((step, index) => {
     if (isRefused(step))
-      lines.push(make("li", { class: "bad" }, linkTo(index), ` was refused: ${step.explanation.reason.text}.`));
+      lines.push(make("li", { class: "bad" }, linkTo(index, side), ` was refused: ${step.explanation.reason.text}.`));
     for (const trouble of troublesOf(step))
-      lines.push(make("li", { class: "bad" }, "In ", linkTo(index), `: ${trouble.brief}`));
+      lines.push(make("li", { class: "bad" }, "In ", linkTo(index, side), `: ${trouble.brief}`));
     if (step.graphics_state === "out" && (index === 0 || runShown.steps[index - 1].graphics_state !== "out"))
-      lines.push(make("li", { class: "bad" }, "After ", linkTo(index), ` graphics are ${step.graphics}.`));
+      lines.push(make("li", { class: "bad" }, "After ", linkTo(index, side), ` graphics are ${step.graphics}.`));
   });
   for (const { text, step } of runShown.failures)
     lines.push(step === null ? make("li", { class: "bad failed" }, `Failed: ${text}`)
-      : make("li", { class: "bad failed" }, linkTo(step), ` failed: ${text}`));
+      : make("li", { class: "bad failed" }, linkTo(step, side), ` failed: ${text}`));
   if (lines.length === 0) lines.push(make("li", {}, "Nothing was refused, and graphics never waited."));
-  const expectations = runShown.steps.reduce((sum, step) => sum + step.expectations.length, 0);
+  return [...lines, ...missingOf(runShown), summaryOf(runShown)];
+}
+
+/** What a run has that the page does not. */
+function missingOf(runShown) {
+  const lines = [];
   if (runShown.steps_left_out > 0)
-    lines.push(make("li", {}, `${counted(runShown.steps_left_out, "more step")} ran that this page leaves out.`));
-  const left = runShown.steps.reduce((sum, step) => sum + step.entries_left_out, 0);
-  if (left > 0) lines.push(make("li", {}, `${counted(left, "line")} of the trace are left out, too.`));
+    lines.push(`${counted(runShown.steps_left_out, "more step")} ran that this page leaves out.`);
+  const left = leftOut(runShown.steps);
+  if (left) lines.push(`Of its steps this page leaves out ${left}.`);
+  if (runShown.lanes_end_us !== null)
+    lines.push(`The bars of its time line end at ${spoken(runShown.lanes_end_us)}: this page has no room for more.`);
+  if (!data.sees) lines.push("There are no pictures: this tool was built without.");
+  return lines.map((text) => make("li", {}, text));
+}
+
+function summaryOf(runShown) {
+  const expectations = runShown.steps.reduce((sum, step) => sum + step.expectations.length, 0);
   const verdict = runShown.failures.length > 0 ? "The scenario failed" : "The scenario did what it says";
-  lines.push(make("li", {}, `${verdict}: ${counted(runShown.steps.length, "step")}, ` +
-                            `${counted(expectations, "expectation")}, ${spoken(runShown.lasted_us)} on board ` +
-                            `${boardsOf(runShown)}.`));
-  return lines;
+  return make("li", {}, `${verdict}: ${counted(runShown.steps.length, "step")}, ` +
+                        `${counted(expectations, "expectation")}, ${spoken(runShown.lasted_us)} on board ` +
+                        `${boardsOf(runShown)}.`);
+}
+
+/** One story, or both with their names. */
+function showStories() {
+  const lists = sides().map((runShown, side) => {
+    const list = make("ul", {}, ...story(runShown, side));
+    rove(list, "a", ["ArrowUp"], ["ArrowDown"]);
+    return make("div", { class: "story" }, sides().length > 1 ? make("h3", {}, nameOf(runShown)) : null, list);
+  });
+  part("story").classList.toggle("two", lists.length > 1);
+  part("story").replaceChildren(...lists);
 }
 
 /* The time line. */
 
 /** Where moments stand, from 0 to 1. To scale, time alone decides; else half of the width is shared by all steps, so
- *  that those that take no time are seen, too. */
+ *  that those that take no time are seen, too. Of two runs beside each other both have the longer one's measure. */
 class Axis {
-  constructor(runShown, toScale) {
+  constructor(runShown, runs, toScale) {
     this.steps = runShown.steps;
-    this.total = Math.max(1, runShown.to_us);
-    const each = toScale && runShown.to_us > 0 ? 0 : 0.5 / Math.max(1, this.steps.length);
-    const time = runShown.to_us === 0 ? 0 : each === 0 ? 1 : 0.5;
+    const total = Math.max(...runs.map((one) => one.to_us));
+    const count = Math.max(1, ...runs.map((one) => one.steps.length));
+    const each = toScale && total > 0 ? 0 : 0.5 / count;
+    const time = total === 0 ? 0 : each === 0 ? 1 : 0.5;
     const room = 0.97; // what holds at the end is seen behind it
-    this.starts = [0];
-    const timed = this.steps.map((step) => time * (step.to_us - step.from_us) / this.total);
-    const sum = timed.reduce((one, other) => one + other, each * timed.length) || 1;
-    this.own = each / sum * room;
-    this.timed = timed.map((width) => width / sum * room);
+    const timed = (step) => time * (step.to_us - step.from_us) / Math.max(1, total);
+    const widest = Math.max(...runs.map(({ steps }) =>
+      steps.reduce((sum, step) => sum + timed(step) + each, 0))) || 1;
+    this.own = each / widest * room;
+    this.timed = this.steps.map((step) => timed(step) / widest * room);
     this.widths = this.timed.map((width) => this.own + width);
+    this.starts = [0];
     for (const width of this.widths) this.starts.push(this.starts.at(-1) + width);
+    this.end = this.starts.at(-1) + 1 - room;
   }
 
   /** Within its step a moment stands by its time, and in what the step has of its own by its place in the trace: so
@@ -151,52 +211,90 @@ function bar(from, to, kind, text, label, onclick) {
   return element;
 }
 
-function laneRow(name, bars) {
-  return make("div", { class: "lane", role: "group", "aria-label": name },
-              make("span", { class: "lane-name" }, name), make("div", { class: "track" }, ...bars));
+/** A lane: a name, and a track for each side. */
+function laneRow(name, tracks) {
+  return make("div", { class: "lane" }, make("span", { class: "lane-name" }, name), make("div", {}, ...tracks));
 }
 
-function laneBar(axis, lane, span) {
+function track(name, side, bars) {
+  const whose = sides().length > 1 ? `, ${nameOf(sides()[side])}` : "";
+  const element = make("div", { class: `track side-${side}`, role: "toolbar", "aria-label": name + whose }, ...bars);
+  rove(element, ".bar", ["ArrowLeft"], ["ArrowRight"]);
+  return element;
+}
+
+function laneBar(axis, side, lane, span) {
+  const runShown = sides()[side];
   const lasted = `${spoken(span.to.us - span.from.us)}, from ${spoken(span.from.us)} to ${spoken(span.to.us)}`;
-  const end = span.open ? "the end of the run" : `step ${span.to.step + 1}`;
+  const goesOn = runShown.lanes_end_us !== null; // behind the last bar
+  const end = !span.open ? `step ${span.to.step + 1}` : goesOn ? "where the bars end" : "the end of the run";
   const label = `${lane.name}: ${span.text} for ${lasted}, step ${span.from.step + 1} to ${end}`;
-  return bar(axis.at(span.from), span.open ? 1 : axis.at(span.to), kindOf(lane), span.text, label, () => {
-    choose(span.from.step, true);
+  const to = span.open && !goesOn ? axis.end : axis.at(span.to);
+  return bar(axis.at(span.from), to, kindOf(lane), span.text, label, () => {
+    goTo(side, span.from.step);
     part("told").textContent = label;
   });
 }
 
-function timesRow(axis, runShown) {
+function stepBar(axis, side, index) {
+  const runShown = sides()[side];
+  const step = runShown.steps[index];
+  const label = `Step ${index + 1}: ${titleOf(step)}, at ${spoken(step.from_us)}` +
+                (isRefused(step) ? ", refused" : "") + (failuresOf(runShown, index).length > 0 ? ", failed" : "");
+  const button = bar(axis.starts[index], axis.starts[index + 1], isBad(runShown, index) ? "step refusing" : "step",
+                     String(index + 1), label, () => goTo(side, index));
+  button.dataset.step = index;
+  return button;
+}
+
+/** Round times within a step, as far apart as they can be read. */
+function roundTimes(axis, index) {
+  const { from_us: from, to_us: to } = axis.steps[index];
+  const share = axis.timed[index] / TIME_ROOM;
+  if (share < 2) return [];
+  const least = (to - from) / share;
+  const power = 10 ** Math.floor(Math.log10(least));
+  const each = [1, 2, 5, 10].map((digit) => digit * power).find((round) => round >= least);
+  const times = [];
+  for (let us = Math.ceil(from / each) * each; us < to; us += each)
+    times.push([us, axis.starts[index] + axis.own + axis.timed[index] * (us - from) / (to - from)]);
+  return times;
+}
+
+/** When steps begin and the run ends, and round times between; as many as there is room for, in this order. */
+function timesRow(axis, side) {
+  const runShown = sides()[side];
+  const wanted = [...runShown.steps.map((step, index) => [step.from_us, axis.starts[index]]),
+                  [runShown.to_us, axis.starts.at(-1)],
+                  ...runShown.steps.flatMap((_, index) => roundTimes(axis, index))];
+  const taken = [];
   const times = make("div", { class: "times", "aria-hidden": "true" });
-  let free = 0;
-  let last = -1;
-  runShown.steps.forEach((step, index) => {
-    const at = axis.starts[index];
-    if (at < free || step.from_us === last) return;
-    const time = make("span", {}, spoken(step.from_us));
+  for (const [us, at] of wanted) {
+    const isLast = at > 1 - TIME_ROOM;
+    const left = isLast ? at - TIME_ROOM : at;
+    if (taken.some((one) => one.us === us || Math.abs(one.left - left) < TIME_ROOM)) continue;
+    taken.push({ us, left });
+    const time = make("span", isLast ? { class: "last" } : {}, spoken(us));
     time.style.left = `${at * 100}%`;
-    if (at > 0.8) time.style.transform = "translateX(-100%)";
     times.append(time);
-    free = at + 0.15;
-    last = step.from_us;
-  });
+  }
   return make("div", { class: "lane" }, make("span", { class: "lane-name" }), times);
 }
 
 function showLanes() {
-  const axis = new Axis(run(), shown.toScale);
-  const steps = run().steps.map((step, index) => {
-    const label = `Step ${index + 1}: ${titleOf(step)}, at ${spoken(step.from_us)}` +
-                  (isRefused(step) ? ", refused" : "") + (failuresOf(run(), index).length > 0 ? ", failed" : "");
-    const button = bar(axis.starts[index], axis.starts[index + 1], isBad(run(), index) ? "step refusing" : "step",
-                       String(index + 1), label, () => choose(index, true));
-    button.dataset.step = index;
-    return button;
-  });
-  const lanes = run().lanes.filter((lane) => lane.spans.length > 0)
-    .map((lane) => laneRow(lane.name, lane.spans.map((span) => laneBar(axis, lane, span))));
-  part("lanes").replaceChildren(timesRow(axis, run()), laneRow("steps", steps), ...lanes);
-  part("lanes").axis = axis;
+  const axes = sides().map((one) => new Axis(one, sides(), shown.toScale));
+  const tracksOf = (name, barsOf) => axes.map((axis, side) => track(name, side, barsOf(axis, side)));
+  const steps = tracksOf("steps", (axis, side) => axis.steps.map((_, index) => stepBar(axis, side, index)));
+  const lanes = run().lanes.flatMap((lane, place) => sides().every((one) => one.lanes[place].spans.length === 0) ? []
+    : [laneRow(lane.name, tracksOf(lane.name, (axis, side) =>
+      sides()[side].lanes[place].spans.map((span) => laneBar(axis, side, lane, span))))]);
+  part("lanes").classList.toggle("two", axes.length > 1);
+  part("lanes").replaceChildren(timesRow(axes[0], 0), laneRow("steps", steps), ...lanes,
+                                ...axes.slice(1).map((axis) => timesRow(axis, 1)));
+  part("whose").hidden = axes.length < 2;
+  part("whose").textContent = axes.length < 2 ? ""
+    : `In each lane, above: ${nameOf(sides()[0])}. Below: ${nameOf(sides()[1])}, whose times stand at the bottom.`;
+  part("lanes").axes = axes;
 }
 
 /* A step. */
@@ -252,23 +350,24 @@ function refusalOf(step) {
   return refused;
 }
 
-function pictureOf(runIndex, index, output) {
-  const steps = data.runs[runIndex].steps;
+function pictureOf(side, index, output) {
+  const { steps } = sides()[side];
   const seen = steps[index].outputs[output];
   const before = index > 0 ? steps[index - 1].outputs[output] : undefined;
   const isNew = before !== undefined && before.picture !== seen.picture;
   const label = `${seen.output}: ${seen.description}${isNew ? ", changed" : ""}`;
+  if (seen.picture === null) return make("p", { class: "nothing" }, `${label}; left out`);
   const image = make("img", { src: data.pictures[seen.picture], alt: label, loading: "lazy" });
   return make("button", { type: "button", class: `picture${isNew ? " changed" : ""}`,
-                          onclick: () => enlarge(runIndex, index, output) },
+                          onclick: () => enlarge(side, index, output) },
               image, make("span", { "aria-hidden": "true" }, label));
 }
 
-function picturesOf(runIndex, index) {
-  const { outputs } = data.runs[runIndex].steps[index];
+function picturesOf(side, index) {
+  const { outputs } = sides()[side].steps[index];
   if (outputs.length === 0) return null;
   return make("div", { class: "pictures", role: "group", "aria-label": `What is seen after step ${index + 1}` },
-              ...outputs.map((_, output) => pictureOf(runIndex, index, output)));
+              ...outputs.map((_, output) => pictureOf(side, index, output)));
 }
 
 function whenOf(step) {
@@ -282,12 +381,9 @@ function detailsOf(step) {
   const others = step.entries.filter((entry) => entry.kind !== "store");
   const calls = others.filter((entry) => entry.kind === "call").length;
   const told = others.length - calls;
-  const title = counted(calls, "call") + (told > 0 ? `, ${counted(told, "line")} of log and board` : "") +
-                (step.entries_left_out > 0 ? `; ${step.entries_left_out} more that this page leaves out` : "");
-  return [reasonsOf(step),
-          others.length === 0 && step.entries_left_out > 0
-            ? make("p", { class: "nothing" }, `${counted(step.entries_left_out, "line")} that this page leaves out`)
-            : null,
+  const title = counted(calls, "call") + (told > 0 ? `, ${counted(told, "line")} of log and board` : "");
+  const left = leftOut([step]);
+  return [left ? make("p", { class: "left-out" }, `This page leaves out ${left}.`) : null, reasonsOf(step),
           listOf(others, title, "calls"), listOf(stores, counted(stores.length, "store"), "stores"),
           changesOf(step), expectationsOf(step),
           step.status ? folded("What this means" + (step.power_on_us > 0
@@ -296,23 +392,24 @@ function detailsOf(step) {
                                              "aria-label": "What this means" }, make("pre", {}, step.status))) : null];
 }
 
-function card(runIndex, index, id) {
-  const runShown = data.runs[runIndex];
+function card(side, index) {
+  const runShown = sides()[side];
   const step = runShown.steps[index];
   const isHeld = ["held", "awaits video plane", "out"].includes(step.graphics_state);
   const failures = failuresOf(runShown, index).map(({ text }) => make("p", { class: "failed" }, `Failed: ${text}`));
   const troubles = troublesOf(step).map(({ brief }) => make("p", { class: "failed" }, brief));
-  const whose = runIndex === shown.run ? "" : `${nameOf(runShown)}, `;
+  const whose = side === 0 ? "" : `${nameOf(runShown)}, `;
   const title = make("h3", {}, make("span", { class: "number" }, `${index + 1}  `), make("code", {}, titleOf(step)));
-  return make("article", { class: `card${isBad(runShown, index) ? " refusing" : ""}`, id,
-                           tabindex: "-1", "aria-label": `${whose}Step ${index + 1}: ${titleOf(step)}` },
+  return make("article", { class: `card${isBad(runShown, index) ? " refusing" : ""}`,
+                           id: cardId(side, index), tabindex: "-1",
+                           "aria-label": `${whose}Step ${index + 1}: ${titleOf(step)}` },
               title, make("p", { class: "when" }, whenOf(step)),
               ...step.results.map((line) => make("p", { class: "result" }, make("code", {}, line))),
               step.told ? make("pre", { class: "told scroll", tabindex: "0", role: "group",
                                       "aria-label": "What the command shows" }, step.told) : null,
               refusalOf(step), ...failures, ...troubles,
               isHeld ? make("p", { class: "held-back" }, `Graphics are ${step.graphics}.`) : null,
-              picturesOf(runIndex, index), ...detailsOf(step));
+              picturesOf(side, index), ...detailsOf(step));
 }
 
 /* Two runs side by side. */
@@ -431,29 +528,72 @@ function comparison(one, other) {
 
 function pair(index, otherIndex) {
   const missing = () => make("p", { class: "nothing" }, "no such step in this run");
-  const row = make("div", { class: "pair" },
-                   index < 0 ? missing() : card(shown.run, index, `step-${index + 1}`),
-                   otherIndex < 0 ? missing() : card(shown.other, otherIndex, `other-step-${otherIndex + 1}`));
-  if (index < 0 || otherIndex < 0) return [row];
+  const both = make("div", { class: "pair" }, index < 0 ? missing() : card(0, index),
+                    otherIndex < 0 ? missing() : card(1, otherIndex));
+  if (index < 0 || otherIndex < 0) return make("div", { class: "row" }, both);
   const found = differences(run().steps[index], data.runs[shown.other].steps[otherIndex]);
   const text = found.length === 0 ? make("p", { class: "apart" }, "Both do the same, and look the same.")
     : make("div", { class: "apart" },
            folded(`${counted(found.length, "difference")}: − on the left, + on the right`, "differences",
                   make("ul", { class: "entries" }, ...found)));
-  return [row, text];
+  return make("div", { class: "row" }, both, text);
 }
 
 function showCards() {
-  const steps = run().steps;
-  if (shown.other < 0) {
-    part("cards").replaceChildren(...steps.map((_, index) => card(shown.run, index, `step-${index + 1}`)));
-    return;
-  }
-  part("cards").replaceChildren(
-    ...pairsOf(run(), data.runs[shown.other]).flatMap(([one, other]) => pair(one, other)));
+  shown.pairs = shown.other < 0 ? run().steps.map((_, index) => [index, -1]) : pairsOf(run(), data.runs[shown.other]);
+  part("cards").replaceChildren(...shown.pairs.map(([one, other]) => shown.other < 0
+    ? make("div", { class: "row" }, card(0, one)) : pair(one, other)));
+  for (const row of part("cards").children) letTab(row, false);
+}
+
+/* Of all steps one alone can be gone through by Tab, and of each lane and list one part: else there were thousands. */
+
+const TABBED = "button, summary, .told"; // what unfolds has been asked for
+
+function letTab(row, lets) {
+  for (const element of row.querySelectorAll(TABBED)) element.tabIndex = lets ? 0 : -1;
+  row.classList.toggle("open", lets);
+}
+
+function openToTab(row) {
+  if (row === shown.row) return;
+  if (shown.row) letTab(shown.row, false);
+  letTab(row, true);
+  shown.row = row;
+}
+
+/** One of these parts is reached by Tab, the one that was used last; keys go to the one before and the one behind. */
+function rove(container, selector, back, forth) {
+  const items = [...container.querySelectorAll(selector)];
+  items.forEach((item, index) => item.tabIndex = index === 0 ? 0 : -1);
+  container.addEventListener("focusin", (event) => {
+    const used = event.target.closest(selector);
+    if (used) for (const item of items) item.tabIndex = item === used ? 0 : -1;
+  });
+  container.addEventListener("keydown", (event) => {
+    const at = items.indexOf(event.target);
+    const to = back.includes(event.key) ? at - 1 : forth.includes(event.key) ? at + 1
+      : event.key === "Home" ? 0 : event.key === "End" ? items.length - 1 : -2;
+    if (at < 0 || to === -2 || event.shiftKey || event.ctrlKey || event.altKey || event.metaKey) return;
+    event.preventDefault();
+    event.stopPropagation();
+    items[Math.min(items.length - 1, Math.max(0, to))].focus();
+  });
 }
 
 /* Choosing, filtering, enlarging. */
+
+/** The place of the other run's step that stands beside this one; -1: none does. */
+const besideOf = (index) => shown.pairs.find(([one]) => one === index)?.[1] ?? -1;
+
+/** Show where a step stands in the tracks of a side. */
+function mark(side, index) {
+  const axis = part("lanes").axes[side];
+  part("lanes").style.setProperty(`--at-${side}`, axis.starts[index] ?? 0);
+  part("lanes").style.setProperty(`--wide-${side}`, axis.widths[index] ?? 0);
+  for (const button of document.querySelectorAll(`.side-${side} .bar.step`))
+    button.classList.toggle("chosen", Number(button.dataset.step) === index);
+}
 
 function choose(index, moves) {
   if (run().steps.length === 0) {
@@ -461,24 +601,46 @@ function choose(index, moves) {
     return;
   }
   shown.step = Math.min(run().steps.length - 1, Math.max(0, index));
-  const id = `step-${shown.step + 1}`;
+  const id = cardId(0, shown.step);
   for (const element of document.querySelectorAll(".card")) {
     element.classList.toggle("chosen", element.id === id);
     if (element.id === id) element.setAttribute("aria-current", "step");
     else element.removeAttribute("aria-current");
   }
-  for (const button of document.querySelectorAll(".bar.step"))
-    button.classList.toggle("chosen", Number(button.dataset.step) === shown.step);
-  const axis = part("lanes").axis;
-  part("lanes").style.setProperty("--at", axis.starts[shown.step]);
-  part("lanes").style.setProperty("--wide", axis.widths[shown.step]);
+  openToTab(part(id).closest(".row"));
+  mark(0, shown.step);
+  if (shown.other >= 0) mark(1, besideOf(shown.step));
   const step = run().steps[shown.step];
   part("told").textContent =
     `Step ${shown.step + 1} of ${run().steps.length}, at ${spoken(step.from_us)}: ${titleOf(step)}`;
   if (!moves) return;
   history.replaceState(null, "", `#${id}`);
+  lookAt(id);
+}
+
+function lookAt(id) {
   part(id).focus({ preventScroll: true });
   part(id).scrollIntoView({ block: "nearest" });
+}
+
+/** A step of either side. The position is one of the first; it moves along where the two have it in common. */
+function goTo(side, index) {
+  if (side === 0) {
+    choose(index, true);
+    return;
+  }
+  const beside = shown.pairs.find(([, other]) => other === index)?.[0] ?? -1;
+  if (beside >= 0) choose(beside, false);
+  lookAt(cardId(1, index));
+}
+
+/** Who works in a step is there. */
+function follow(event) {
+  const row = event.target.closest(".row");
+  const own = row?.querySelector("[id^=step-]");
+  if (own && event.target.id !== own.id && own.id !== cardId(0, shown.step))
+    choose(Number(own.id.slice("step-".length)) - 1, false);
+  if (row) openToTab(row);
 }
 
 function filter() {
@@ -504,19 +666,23 @@ function filter() {
 }
 
 function showLarge() {
-  const { run: runIndex, step: index } = large;
-  const step = data.runs[runIndex].steps[index];
+  const { side, step: index } = large;
+  const runShown = sides()[side];
+  const step = runShown.steps[index];
   const seen = step.outputs[shown.output];
-  part("large-title").textContent = `${seen.output}, after step ${index + 1}: ${titleOf(step)}`;
-  part("large-picture").src = data.pictures[seen.picture];
+  const whose = sides().length > 1 ? `${nameOf(runShown)}: ` : "";
+  part("large-title").textContent = `${whose}${seen.output}, after step ${index + 1}: ${titleOf(step)}`;
+  part("large-picture").hidden = seen.picture === null;
+  part("large-picture").src = data.pictures[seen.picture] ?? "data:,";
   part("large-picture").alt = `${seen.output}: ${seen.description}`;
   part("large-text").textContent =
-    `${seen.output} after step ${index + 1}: ${seen.description}. Graphics: ${step.graphics}.`;
+    `${whose}${seen.output} after step ${index + 1}: ${seen.description}. Graphics: ${step.graphics}.` +
+    (seen.picture === null ? " This page leaves the picture out." : "");
 }
 
-function enlarge(runIndex, index, output) {
-  if (runIndex === shown.run) choose(index, false);
-  large.run = runIndex;
+function enlarge(side, index, output) {
+  if (side === 0) choose(index, false);
+  large.side = side;
   large.step = index;
   shown.output = output;
   showLarge();
@@ -524,7 +690,7 @@ function enlarge(runIndex, index, output) {
 }
 
 function keyInLarge(event) {
-  const { steps } = data.runs[large.run];
+  const { steps } = sides()[large.side];
   const by = { ArrowLeft: [-1, 0], ArrowRight: [1, 0], ArrowUp: [0, -1], ArrowDown: [0, 1] }[event.key];
   if (by === undefined) return;
   event.preventDefault();
@@ -533,7 +699,7 @@ function keyInLarge(event) {
   shown.output = (shown.output + by[1] + outputs) % outputs;
   const next = large.step + by[0];
   if (next >= 0 && next < steps.length && steps[next].outputs.length > 0) large.step = next;
-  if (large.run === shown.run) choose(large.step, false);
+  if (large.side === 0) choose(large.step, false);
   showLarge();
 }
 
@@ -552,11 +718,12 @@ function show() {
   document.title = `${run().name} – storyboard`;
   const other = data.runs[shown.other];
   part("title").textContent = other ? `${nameOf(run())} beside ${nameOf(other)}` : nameOf(run());
-  part("story").replaceChildren(...story(run()));
   part("beside").hidden = !other;
   part("compared").replaceChildren(...(other ? comparison(run(), other) : []));
-  showLanes();
+  rove(part("compared"), "a", ["ArrowUp"], ["ArrowDown"]);
+  showStories();
   showCards();
+  showLanes();
   choose(shown.step, false);
   filter();
 }
@@ -590,6 +757,7 @@ function begin() {
   });
   part("controls").addEventListener("submit", (event) => event.preventDefault());
   part("large").addEventListener("keydown", keyInLarge);
+  part("cards").addEventListener("focusin", follow);
   document.addEventListener("keydown", key);
   const asked = /^#step-(\d+)$/.exec(location.hash);
   if (asked) shown.step = Number(asked[1]) - 1;

@@ -1,83 +1,65 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 /** @file
- *  Runs as a storyboard: step by step what was typed, what came of it, and what one would see then. It listens to a run
- *  as a form of the trace does, and keeps everything until the page is written. */
+ *  Runs as a storyboard: step by step what was typed, what came of it, and what one would see then. It is put together
+ *  of what onlookers tell, and knows nothing of the board. */
 #pragma once
 
 #include <cstddef>
-#include <cstdint>
-#include <optional>
+#include <map>
 #include <string>
-#include <string_view>
 #include <vector>
 
 #include "board/json.h"
-#include "board/value.h"
 #include "tools/pmxboard/report/lane_spans.h"
-#include "tools/pmxboard/report/seen_pictures.h"
-#include "tools/pmxboard/view/trace_sink.h"
 
 namespace pmxboard
 {
 
-/** A page of more would open slowly, or not at all. What is beyond is counted, and the page says so. */
-struct PageLimits
-{
-    std::size_t steps = 500;     ///< of each run
-    std::size_t entries = 20000; ///< of each run's trace
-    std::size_t told = 20000;    ///< letters that a step shows
-};
-
-class Storyboard : public TraceSink
+class Storyboard
 {
 public:
-    explicit Storyboard(const PageLimits& limits = {}) : m_limits(limits) {}
+    /** What an onlooker tells. Each scenario begins with one that says so, and ends with one or with broke_down(). */
+    void hear(const board::Json& event);
+    /** The scenario has ended in the middle of a step; the message, with the place in front.
+     *  @param how  "Segmentation fault" */
+    std::string broke_down(const std::string& how);
 
-    void scenario(const std::string& name) override;
-    void powered_on() override;
-    void command(std::string_view line) override;
-    void expectation(std::string_view line) override;
-    void explanation(const std::string& json) override;
-    void operation_ends(const Outcome& outcome) override;
-    void told(const std::string& text) override;
-    void failure(const std::string& message) override;
-    void settle() override;
-    std::string entry(const board::TraceEntry& entry, bool shown) override;
-
-    /** The scenario is over.
-     *  @param unreadable  why its lines could not be read to the end; empty when they could */
-    void end_scenario(const std::string& unreadable = {});
-
-    /** {"runs": […], "pictures": […]}: what the page's script reads, and nobody else. */
+    /** {"runs": […], "pictures": […], "sees": …}: what the page's script reads, and nobody else. */
     std::string to_json() const;
 
 private:
-    board::Json& step();
-    Moment moment() const;
-    void begin_step(std::string_view line);
-    void end_of_page();
-    bool is_left_out() const { return m_steps_left_out > 0; }
-    void end_step();
-    void follow_lanes();
-    board::Json lanes() const;
+    using Json = board::Json;
 
-    PageLimits m_limits;
-    SeenPictures m_pictures;
-    board::Json m_runs = board::Json::array();
+    void begin_run(const Json& event);
+    void begin_step(const Json& event);
+    void end_step(const Json& event);
+    void end_run(const Json& event);
+    void hear_entry(const Json& event);
+    void hear_expectation(const Json& event);
+    void hear_explanation(const Json& event);
+    void hear_results(const Json& event);
+    void hear_told(const Json& event);
+    void hear_failure(const Json& event);
+    void hear_picture(const Json& event);
+    void hear_power_on(const Json& event);
+    void hear_states(const Json& event);
+    void end_of_page(const Json& event);
+    void end_of_time_line(const Json& event);
+    void close(const Moment& at);
+    bool is_behind_page() const { return m_run.at("steps_left_out") != 0; }
+    Json& step() { return m_run.at("steps").back(); }
+    Json placed(const Json& outputs) const;
 
-    /* Of the scenario that runs */
-    board::Json m_steps = board::Json::array();
-    std::size_t m_entries = 0;
-    std::size_t m_steps_left_out = 0;
-    board::Json m_left_out; ///< the step that runs, where it is one too many
-    bool m_in_step = false;
-    bool m_is_powered = false;
-    std::int64_t m_offset_us = 0; ///< where the last power-on stands on the time line
-    std::uint64_t m_sequence = 0;
-    std::optional<board::Value> m_before; ///< what the step found, or the power-on within it
-    board::Json m_failures = board::Json::array();
-    std::string m_heard_place; ///< of the last line that was heard of
+    Json m_runs = Json::array();
+    std::map<std::string, std::size_t> m_places; ///< of the pictures
+    std::vector<std::string> m_pictures;
+
+    /* Of the scenario that is told */
+    Json m_run;
+    std::vector<std::size_t> m_told_pictures; ///< in the run's order: their places
+    Moment m_now;                             ///< of what was told last
     LaneSpans m_lanes;
+    std::string m_place; ///< of what was told last
 };
 
 } // namespace pmxboard

@@ -23,6 +23,7 @@ FAILED = re.compile(r"^\[  FAILED  \] ([^\s,]+)", re.M)
 FIRST, QUICK, SLOWER = 0.01, 0.02, 0.2  # parts of the time of all: what runs first, next, and then
 MOST_PRINTED = 50_000_000  # bytes
 MOST_MEMORY = 4_000_000_000
+GUARDED = ".guarded"  # a program whose layer stops where it leaves an object, or does what has no meaning
 
 
 class Settings:
@@ -32,31 +33,89 @@ class Settings:
         told = json.loads(path.read_text(encoding="utf-8"))
         self.root, self.layer = pathlib.Path(told["root"]), pathlib.Path(told["layer"])
         self.read, self.compile, self.product = told["read"], told["compile"], told["product"]
-        self.link, self.programs, self.behind = told["link"], told["programs"], told["behind"]
+        self.link, self.behind, self.rest = told["link"], told["behind"], told["rest"]
+        self.guards = told["guards"]  # flags of the compile that stops at what a program may not do
+        self.programs = {name: pathlib.Path(path) for name, path in told["programs"].items()}
+        self.options = told["options"]  # of the link, by program
         self.runs, self.without = told["runs"], told["without"]
         self.sources = sorted(self.layer.glob("*.cpp"))
 
-    def key(self):
-        """What the verdicts hang on, but for the mutant."""
-        digest = hashlib.sha256(json.dumps([self.compile, self.product, self.link, self.behind, self.without]).encode())
-        tests = [pathlib.Path(path) for _, path in sorted(self.programs.items())]
-        for path in [*tests, *sorted(self.layer.glob("*.[ch]*")), *sorted(self.root.glob("src/*/*inc/*.h"))]:
-            digest.update(hashlib.sha256(path.read_bytes()).digest())
-        return digest.hexdigest()
+    def layer_key(self):
+        """What every verdict hangs on, but for the mutant: the layer, and how it is compiled."""
+        return digest_of([self.compile, self.product, self.guards],
+                         [*sorted(self.layer.glob("*.[ch]*")), *sorted(self.root.glob("src/*/*inc/*.h"))])
+
+    def ground_key(self):
+        """What every case stands on: board and support as they are linked, and what they are linked with."""
+        return digest_of([self.link, self.options, self.behind], map(pathlib.Path, self.rest))
+
+    def tests_key(self):
+        """All cases, and what they stand on."""
+        return digest_of([self.ground_key(), self.without], [path for _, path in sorted(self.programs.items())])
 
 
-def key_of(settings_key, mutant):
-    return hashlib.sha256(f"{settings_key} {mutant}".encode()).hexdigest()[:24]
+def digest_of(words, paths):
+    digest = hashlib.sha256(json.dumps(words).encode())
+    for path in paths:
+        digest.update(hashlib.sha256(path.read_bytes()).digest())
+    return digest.hexdigest()[:24]
+
+
+def key_of(layer_key, mutant):
+    return hashlib.sha256(f"{layer_key} {mutant}".encode()).hexdigest()[:24]
+
+
+class Written:
+    """What cases are written in. A case is the same as long as its own lines are, what its file has outside of cases,
+    and what other files of the tests lend to all: those that have no cases."""
+
+    CASE = re.compile(r"^TEST(?:_[FP])?\(.*?^}$", re.M | re.S)
+
+    def __init__(self, root, ground_key):
+        self._root, self._ground, self._files, self._lent = root, ground_key, {}, {}
+
+    def digest(self, file, line):
+        path = self._root / file
+        if path not in self._files:
+            text = path.read_text(encoding="utf-8")
+            cases = [(text.count("\n", 0, found.start()) + 1, found[0]) for found in self.CASE.finditer(text)]
+            self._files[path] = self.CASE.sub("", text), cases
+        around, cases = self._files[path]
+        own = [case for first, case in cases if first <= line <= first + case.count("\n")]
+        return hashlib.sha256(json.dumps([self._lent_to(path), around, own]).encode()).hexdigest()[:24]
+
+    def _lent_to(self, path):
+        if path.parent not in self._lent:
+            folders = (self._root / "tests/support", path.parent)
+            lent = [each for folder in folders for each in sorted(folder.glob("*.[ch]*"))
+                    if not self.CASE.search(each.read_text(encoding="utf-8"))]
+            self._lent[path.parent] = digest_of([self._ground], lent)
+        return self._lent[path.parent]
 
 
 class Cases:
     """How long each case of each program takes, what of the layer it runs, and what it has seen."""
 
-    def __init__(self, noted, users):
-        self._seconds = {tuple(case): seconds for case, seconds, _ in noted}
-        self._runs = {tuple(case): set(functions) for case, _, functions in noted}
+    def __init__(self, noted, users, settings):
+        self._seconds = {tuple(case): seconds for case, seconds, *_ in noted}
+        self._runs = {tuple(case): set(functions) for case, _, functions, _ in noted}
+        self._places = {tuple(case): place for case, _, _, place in noted}
         self._users, self._lock, self._whole = users, threading.Lock(), sum(self._seconds.values())
-        self._kills = collections.defaultdict(collections.Counter)
+        self._kills, self._before = collections.defaultdict(collections.Counter), {}
+        self._written, self._all = Written(settings.root, settings.ground_key()), settings.tests_key()
+
+    def digest(self, verdict, seen):
+        """What a verdict hangs on, but for mutant and layer: a fault that was seen is seen as long as the case is the
+        same, and one that survived has to pass every other."""
+        if verdict in ("refused", "same code"):
+            return ""
+        place = self._places.get(plain(seen))
+        return self._written.digest(*place) if place else self._all
+
+    def note_before(self, name, seen):
+        """What has seen a mutant of that name before, and most likely sees it again."""
+        if plain(seen) in self._seconds:
+            self._before[name] = seen
 
     def note(self, file, function, case):
         if case in self._seconds:
@@ -102,10 +161,27 @@ class Cases:
         for part in (QUICK, SLOWER, None):
             left = [case for case in left if case not in set(goes[-1])]
             goes.append(self._within(left, part) if part else left)
-        for go in goes:
+        if mutant.name in self._before:
+            program, _, case = self._before[mutant.name].partition(":")
+            yield program, [case], self._limit([plain(self._before[mutant.name])], program)
+        guarded = [(program + GUARDED, case) for program, case in self._covering(mutant)]
+        for go in [*goes, guarded]:
             for program in sorted({program for program, _ in go}):
                 cases = [case for case in go if case[0] == program]
-                yield program, [case for _, case in cases], 1 + 4 * sum(map(self._seconds.get, cases))
+                yield program, [case for _, case in cases], self._limit(map(plain_case, cases), program)
+
+    def _limit(self, cases, program):
+        return 1 + (12 if program.endswith(GUARDED) else 4) * sum(map(self._seconds.get, cases))
+
+
+def plain_case(case):
+    return case[0].removesuffix(GUARDED), case[1]
+
+
+def plain(seen):
+    """(program, case) of "PROGRAM:CASE", whether guarded or not."""
+    program, _, case = seen.partition(":")
+    return plain_case((program, case))
 
 
 class Tests:
@@ -117,15 +193,18 @@ class Tests:
     def run(self, program, cases, seconds, **environment):
         """(answer, or the signal less than 0; what was printed)"""
         whole = int(seconds) + 1
-        limits = ["prlimit", f"--cpu={whole}:{whole + 2}", "--core=0", f"--fsize={MOST_PRINTED}", f"--as={MOST_MEMORY}"]
+        limits = ["prlimit", f"--cpu={whole}:{whole + 2}", "--core=0", f"--fsize={MOST_PRINTED}"]
+        if not program.name.endswith(GUARDED):  # that one takes addresses that it never fills
+            limits.append(f"--as={MOST_MEMORY}")
         command = [*limits, "--", str(program), "--gtest_fail_fast", "--gtest_color=no"]
         flags = program.with_suffix(".flags")
         flags.write_text("--gtest_filter=" + ":".join(cases) + "\n", encoding="utf-8")
         command.append(f"--gtest_flagfile={flags}")
         printed = program.with_suffix(".printed")
+        environment = os.environ | {"ASAN_OPTIONS": "detect_leaks=0"} | environment
         with printed.open("wb") as out, subprocess.Popen(command, stdout=out, stderr=subprocess.STDOUT, cwd=self._root,
                                                          stdin=subprocess.DEVNULL, start_new_session=True,
-                                                         env=os.environ | environment) as ran:
+                                                         env=environment) as ran:
             try:
                 answer = ran.wait(10 * whole)
             except subprocess.TimeoutExpired:
@@ -178,11 +257,19 @@ class Bench:
 
     def link(self, name, changed, *more):
         """(the program of that name, what the linker says); no program when it cannot be linked"""
-        program = self.folder / name
-        layer = [changed.get(source, self._originals / f"{source.stem}.o") for source in self._settings.sources]
-        ran = subprocess.run([*self._settings.link, self._settings.programs[name], *map(str, layer), *more,
+        program, plain_name = self.folder / name, name.removesuffix(GUARDED)
+        suffix, guards = (".o", []) if name == plain_name else (".guarded.o", self._settings.guards)
+        layer = [changed.get(source, self._originals / f"{source.stem}{suffix}") for source in self._settings.sources]
+        ran = subprocess.run([*self._settings.link, *guards, *self._settings.options.get(plain_name, []),
+                              str(self._settings.programs[plain_name]), *self._settings.rest, *map(str, layer), *more,
                               *self._settings.behind, "-o", str(program)], capture_output=True, check=False)
         return (program if ran.returncode == 0 else None), ran.stderr.decode(errors="replace")
+
+    def _program(self, name, mutant, text, changed):
+        """The program with the mutant in it; none when it cannot be made."""
+        if name.endswith(GUARDED):
+            changed = self.objects([*self._settings.compile, *self._settings.guards], mutant, text, ".guarded.o")
+        return self.link(name, changed)[0] if changed else None
 
     def has_same_code(self, mutant, text):
         """Whether what ships would be the same, byte by byte."""
@@ -197,7 +284,7 @@ class Bench:
             return "refused", ""
         for name, some, seconds in cases.stages(mutant):
             if name not in programs:
-                programs[name] = self.link(name, changed)[0]
+                programs[name] = self._program(name, mutant, text, changed)
             if programs[name] is None:
                 return "refused", ""
             answer, printed = tests.run(programs[name], some, seconds)
@@ -248,22 +335,24 @@ def note_cases(settings, bench, tests, name):
         raise Failed(f"{name} has no tests")
     whole, names = sum(int(words[1]) + 1 for words in lines), names_of(program)
     return [[[name, words[0]], seconds * (int(words[1]) + 1) / whole,
-             sorted({names.get(int(address, 16), "") for address in words[2:]})] for words in lines]
+             sorted({names.get(int(address, 16), "") for address in words[4:]}), [words[2], int(words[3])]]
+            for words in lines]
 
 
 def prepare(settings, folder, users):
     """The original compiled, and its tests run, unless it was before: (the folder of its objects, cases, tests)."""
     originals, tests = folder / "original", Tests(settings.root)
-    kept, key = originals / "cases.json", settings.key()
+    kept, key = originals / "cases.json", settings.layer_key() + settings.tests_key()
     told = json.loads(kept.read_text(encoding="utf-8")) if kept.exists() else {}
     if told.get("key") != key:
         bench = Bench(settings, originals, originals)
         bench.original(settings.compile)
         bench.original([*settings.compile, "-finstrument-functions"], ".runs.o")
         bench.original(settings.product, ".product.o")
+        bench.original([*settings.compile, *settings.guards], ".guarded.o")
         told = {"key": key, "cases": [case for name in settings.programs
                                       for case in note_cases(settings, bench, tests, name)]}
         unfinished = kept.with_suffix(".unfinished")
         unfinished.write_text(json.dumps(told), encoding="utf-8")
         unfinished.rename(kept)
-    return originals, Cases(told["cases"], users), tests
+    return originals, Cases(told["cases"], users, settings), tests

@@ -1,7 +1,8 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Plants small faults in the layer, one after the other, and tells those that no test sees. What was found is kept, and
-found once for the same layer and tests. Ends with 1 when one survives that is not on the list of equivalents.
+found once for the same layer and the tests that it hangs on. Ends with 1 when one survives that is not on the list of
+equivalents.
 
 usage: mutate.py CACHE MADE [--seed S] [--jobs N] [NUMBER | WORD...]
        mutate.py CACHE MADE --show NAME
@@ -101,11 +102,13 @@ class Texts:
 
 
 class Results:
-    """Verdicts, one a line; a line that was not written to its end is none."""
+    """Verdicts, one a line; a line that was not written to its end is none. One counts as long as the layer is what it
+    was, and what the verdict hangs on of the tests."""
 
-    def __init__(self, folder, key):
+    def __init__(self, folder, key, digest):
         folder.mkdir(parents=True, exist_ok=True)
-        self._path, self._key, self._lock, self._kept = folder / "results.jsonl", key, threading.Lock(), {}
+        self._path, self._key, self._digest = folder / "results.jsonl", key, digest
+        self._lock, self._kept = threading.Lock(), {}
         text = self._path.read_text(encoding="utf-8") if self._path.exists() else ""
         if text and not text.endswith("\n"):
             with self._path.open("a", encoding="utf-8") as file:
@@ -118,7 +121,8 @@ class Results:
                 continue
 
     def get(self, mutant):
-        return self._kept.get(self._of(mutant))
+        result = self._kept.get(self._of(mutant))
+        return result if result and result.get("tests") == self._digest(result["verdict"], result["by"]) else None
 
     def all(self):
         return list(self._kept.values())
@@ -128,7 +132,7 @@ class Results:
 
     def keep(self, mutant, verdict, seen, seconds):
         result = {"key": self._of(mutant), "name": mutant.name, "verdict": verdict, "by": seen,
-                  "seconds": round(seconds, 3)}
+                  "tests": self._digest(verdict, seen), "seconds": round(seconds, 3)}
         with self._lock, self._path.open("a", encoding="utf-8") as file:
             file.write(json.dumps(result) + "\n")
             self._kept[result["key"]] = result
@@ -138,13 +142,14 @@ class Results:
 class Campaign:
     """Plants mutants, as many at once as there are processors."""
 
-    def __init__(self, settings, made, users, results, texts):
-        self._settings, self._made, self._users = settings, made, users
+    def __init__(self, settings, made, prepared, results, texts):
+        self._settings, self._made, self._prepared = settings, made, prepared
         self._results, self._texts = results, texts
         self._benches, self._told = queue.SimpleQueue(), time.monotonic()
 
-    def _plant(self, mutant, cases, tests):
+    def _plant(self, mutant):
         bench, began = self._benches.get(), time.monotonic()
+        _, cases, tests = self._prepared
         try:
             verdict, seen = bench.judge(mutant, mutant.applied(self._texts[mutant.file]), cases, tests)
         finally:
@@ -162,15 +167,15 @@ class Campaign:
         """Tells each that survives when it has."""
         if not chosen:
             return
-        originals, cases, tests = kill.prepare(self._settings, self._made, self._users)
+        originals, cases, _ = self._prepared
         for result in self._results.all():
             if result["by"]:
-                program, _, case = result["by"].partition(":")
-                cases.note(*result["name"].split(":")[:2], (program, case))
+                cases.note(*result["name"].split(":")[:2], kill.plain(result["by"]))
+                cases.note_before(result["name"], result["by"])
         for number in range(workers):
             self._benches.put(kill.Bench(self._settings, self._made / f"bench-{number}", originals))
         with concurrent.futures.ThreadPoolExecutor(workers) as pool:
-            planted = [pool.submit(self._plant, mutant, cases, tests) for mutant in chosen]
+            planted = [pool.submit(self._plant, mutant) for mutant in chosen]
             try:
                 for number, future in enumerate(concurrent.futures.as_completed(planted), start=1):
                     self._tell(future.result(), number, len(chosen))
@@ -244,10 +249,12 @@ def carry_out(arguments):
     if arguments.show:
         return show(all_mutants, arguments.show, texts)
     equivalents = read_equivalents(arguments.equivalents)
-    results = Results(arguments.cache, settings.key())
+    made = arguments.made.resolve()
+    prepared = kill.prepare(settings, made, users)
+    results = Results(arguments.cache, settings.layer_key(), prepared[1].digest)
     chosen = chosen_of(all_mutants, arguments)
     new = [mutant for mutant in chosen if not results.get(mutant)]
-    Campaign(settings, arguments.made.resolve(), users, results, texts).carry_out(new, max(1, arguments.jobs))
+    Campaign(settings, made, prepared, results, texts).carry_out(new, max(1, arguments.jobs))
     judged = [(mutant, results.get(mutant)) for mutant in chosen]
     wrong = gone(equivalents, all_mutants) + verdict_on(judged, equivalents, texts)
     for line in wrong:

@@ -40,11 +40,19 @@ bool fgOverlooked(int iValue)
 {
     return iValue > 3;
 }
+int iSumOfThree(const int* piValues)
+{
+    int iSum = 0;
+    for (int i = 0; i < 3; i++)
+        iSum += piValues[i] != 0;
+    return iSum > 0;
+}
 """
 HEADER = """
 int iCount(int iFrom, int iTo);
 int iFourfold(int iValue);
 bool fgOverlooked(int iValue);
+int iSumOfThree(const int* piValues);
 static inline int iTwice(int iValue)
 {
     return iValue * 2;
@@ -67,6 +75,16 @@ int main()
     std::fflush(stdout);
     vExpect(iCount(2, 5) == 3 && iCount(0, 0) == 0 && iFourfold(3) == 12);
     fgOverlooked(4);
+    int* pi = (int*)std::calloc(3, sizeof(int));
+    iSumOfThree(pi);
+    std::free(pi);
+}
+"""
+CASES = """
+static int iShared = 3;
+TEST(Count, Counts)
+{
+    EXPECT_EQ(iShared, iCount(2, 5));
 }
 """
 
@@ -77,7 +95,7 @@ RUNS = """
 static struct Runs
 {
     FILE* pr = std::fopen(std::getenv("PMX_RUNS"), "w");
-    Runs() { std::fputs("Count.Counts 1", pr); }
+    Runs() { std::fputs("Count.Counts 1 tests/count_test.cpp 3", pr); }
     ~Runs() { std::fputs("\\n", pr); }
 } rRuns;
 extern "C" void __cyg_profile_func_enter(void* pv, void*) { std::fprintf(rRuns.pr, " %p", pv); }
@@ -174,16 +192,23 @@ class Planting(unittest.TestCase):
         self.made.mkdir()
         for name, text in (("count.cpp", LAYER), ("count.h", HEADER)):
             (self.layer / name).write_text(text, encoding="utf-8")
-        for name, text in (("rest", PROGRAM), ("runs", RUNS)):
-            source = self.folder / f"{name}.cpp"
-            source.write_text(text, encoding="utf-8")
-            subprocess.run(["g++", f"-I{self.layer}", "-c", source, "-o", source.with_suffix(".o")], check=True)
+        self.cases = self.folder / "tests/count_test.cpp"
+        self.cases.parent.mkdir()
+        self.cases.write_text(CASES, encoding="utf-8")
+        self.build("rest", PROGRAM)
+        self.build("runs", RUNS)
         settings = {"root": str(self.folder), "layer": str(self.layer), "read": READ, "compile": ["g++", *FLAGS],
                     "product": ["g++", *FLAGS, "-O2"], "link": ["g++", "-no-pie"], "behind": [], "without": "",
+                    "guards": ["-fsanitize=address"], "rest": [], "options": {},
                     "programs": {"tests": str(self.folder / "rest.o")}, "runs": str(self.folder / "runs.o")}
         (self.made / "settings.json").write_text(json.dumps(settings), encoding="utf-8")
         self.equivalents = self.folder / "equivalent.txt"
         self.equivalents.write_text("", encoding="utf-8")
+
+    def build(self, name, text):
+        source = self.folder / f"{name}.cpp"
+        source.write_text(text, encoding="utf-8")
+        subprocess.run(["g++", f"-I{self.layer}", "-c", source, "-o", source.with_suffix(".o")], check=True)
 
     def mutate(self, *words):
         """(answer, what was printed)"""
@@ -214,7 +239,8 @@ class Planting(unittest.TestCase):
         self.assertEqual({"killed", "refused"}, {of[name] for name in self.name("iCount:statement")})
         self.assertIn("hung", {of[name] for name in self.name("iCount:operator")})
         self.assertEqual({"killed"}, {of[name] for name in self.name("count.h:iTwice:operator")})
-        self.assertEqual({"tests:Count.Counts"}, {result["by"] for result in self.results().values() if result["by"]})
+        self.assertEqual({"tests:Count.Counts", "tests.guarded:Count.Counts"},
+                         {result["by"] for result in self.results().values() if result["by"]})
         self.assertRegex(printed, rf"(?m)^{len(of)} mutants, 0 of them judged before;")
 
     def test_one_that_does_not_compile_is_no_killed_one(self):
@@ -240,6 +266,28 @@ class Planting(unittest.TestCase):
         self.assertEqual(self.mutate("fgOverlooked")[0], 1)
         (self.layer / "count.cpp").write_text(LAYER + "int iMore;\n", encoding="utf-8")
         self.assertRegex(self.mutate("fgOverlooked")[1], rf"(?m)^{number} mutants, 0 of them judged before;")
+
+    def test_what_was_seen_stays_seen_when_tests_are_added(self):
+        self.mutate("fgOverlooked", "iFourfold")
+        of = collections.Counter(result["verdict"] == "survived" for result in self.results().values())
+        self.assertTrue(of[True] and of[False])
+        self.cases.write_text(CASES + "TEST(Count, More)\n{\n    EXPECT_TRUE(!fgOverlooked(3));\n}\n", "utf-8")
+        self.build("rest", PROGRAM.replace("fgOverlooked(4);", "vExpect(!fgOverlooked(3) && fgOverlooked(4));"))
+        _, printed = self.mutate("fgOverlooked", "iFourfold")
+        self.assertRegex(printed, rf"(?m)^{of.total()} mutants, {of[False]} of them judged before;")
+        self.assertEqual("killed", self.results()[self.name("fgOverlooked:operator")[0]]["verdict"])
+
+    def test_what_a_case_saw_is_judged_again_when_the_case_is_another(self):
+        self.mutate("iTwice:operator")
+        for text in (CASES.replace("iCount(2, 5)", "iCount(1, 4)"), CASES.replace("iShared = 3", "iShared = 1 + 2")):
+            self.cases.write_text(text, encoding="utf-8")
+            self.assertRegex(self.mutate("iTwice:operator")[1], r"(?m)^1 mutants, 0 of them judged before;")
+            self.assertRegex(self.mutate("iTwice:operator")[1], r"(?m)^1 mutants, 1 of them judged before;")
+
+    def test_a_fault_that_leaves_an_object_is_seen_by_whoever_guards_it(self):
+        self.mutate("iSumOfThree:operator")
+        of = {result["by"] for result in self.results().values() if result["verdict"] == "killed"}
+        self.assertIn("tests.guarded:Count.Counts", of)
 
     def test_equivalents_are_no_survivors(self):
         self.mutate("fgOverlooked")

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
-// Linked with the tests and the layer as it is: notes, in the file that PMX_RUNS names, which functions of the layer
-// each case runs. The layer is compiled so that it calls the hooks.
+// Linked with the tests and the layer as it is: notes, in the file that PMX_RUNS names, how long each case takes, where
+// it is written, and which functions of the layer it runs. The layer is compiled so that it calls the hooks.
 #include <gtest/gtest.h>
 
 #include <atomic>
@@ -27,7 +27,8 @@ class Noting : public testing::EmptyTestEventListener
     {
         const std::scoped_lock lock(mutex);
         static std::ofstream file(std::getenv("PMX_RUNS"));
-        file << info.test_suite_name() << '.' << info.name() << ' ' << info.result()->elapsed_time();
+        file << info.test_suite_name() << '.' << info.name() << ' ' << info.result()->elapsed_time() << ' '
+             << info.file() << ' ' << info.line();
         for (void* function : seen())
             file << ' ' << function;
         file << std::endl;

@@ -188,3 +188,19 @@ TEST_F(ArbOrder, GetArbPlaneOrder_SelectorsThatAreNoSources_AreAddedUpUnmasked)
         LOG9 "Get PlaneOrder = 0x[76543220],[16][1][2][3][4][5][6][247].\n"
     )");
 }
+
+TEST_F(ArbOrder, GetArbPlaneOrder_ChangedWhileItIsPrinted_AnswersWhatIsStoredThen)
+{
+    unsigned lines = 0;
+    at_call("PMX_IsLog", [&lines] { set_record("u4PlaneOrder", 0x76543211 + ++lines); });
+    UINT32 order = 0;
+    EXPECT_EQ(1u, PMX_GetArbPlaneOrder(0, &order));
+    EXPECT_EQ(3u, lines);
+    EXPECT_EQ(0x76543214u, order);
+    EXPECT_TRACE(R"(
+        LOG9 "[PMX0] Start to Get PlaneOrder.\n"
+        PMX_HalGetPlaneOrder(0, [0, 1, 2, 3, 4, 5, 6, 7]) = 0
+        LOG8 "Warning: PlaneOrder HW = [0x76543210], but SW = [0x76543212].\n"
+        LOG9 "Get PlaneOrder = 0x[76543210],[0][1][2][3][4][5][6][7].\n"
+    )");
+}

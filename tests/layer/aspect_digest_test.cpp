@@ -74,6 +74,18 @@ TEST_F(Digest, SetDigestAspectRatioEx_LeavingWith0Or10_16_9)
     }
 }
 
+TEST_F(Digest, SetDigestAspectRatioEx_LeavingWithTheLowBitsOfANarrowOne_16_9)
+{
+    for (const std::uint32_t above : { 0x100u, 0x10000u, 0x80000000u })
+    {
+        for (const std::uint32_t ratio : { above + ASP_4_3, above + ASP_4_3_LB, above + ASP_4_3_FULL })
+        {
+            EXPECT_EQ(1u, PMX_SetDigestAspectRatioEx(0, ratio, 0));
+            EXPECT_TRACE(left(ratio));
+        }
+    }
+}
+
 TEST_F(Digest, SetDigestAspectRatioEx_EachRatioInAndOut)
 {
     for (const std::uint32_t ratio : aspect::ratios)

@@ -165,3 +165,27 @@ TEST_F(BlackLevel, Reset_ReturnsTheDefaults)
     EXPECT_EQ(0, record("ucCAVBlackLv"));
     EXPECT_EQ(0, record("ucCVBSBlackLv"));
 }
+
+TEST_F(BlackLevel, GetBlackLv_ChangedWhileItIsPrinted_BothWereGivenBefore)
+{
+    set_record("ucCAVBlackLv", 1);
+    set_record("ucCVBSBlackLv", 2);
+    at_call("PMX_IsLog", [] {
+        set_record("ucCAVBlackLv", 3);
+        set_record("ucCVBSBlackLv", 4);
+    });
+    UCHAR component = 99;
+    UCHAR composite = 99;
+    EXPECT_EQ(1u, PMX_GetBlackLv(0, &component, &composite));
+    EXPECT_EQ(1, component);
+    EXPECT_EQ(2, composite);
+}
+
+TEST_F(BlackLevel, GetBlackLv_BothIntoOnePlace_TheCompositeLevelIsLeft)
+{
+    set_record("ucCAVBlackLv", 1);
+    set_record("ucCVBSBlackLv", 2);
+    UCHAR level = 99;
+    EXPECT_EQ(1u, PMX_GetBlackLv(0, &level, &level));
+    EXPECT_EQ(2, level);
+}

@@ -142,3 +142,14 @@ TEST_F(VideoPll, SetPLLGP_KeepsNoState)
     vSetPLLGP_HDMIDDS(RES_576I);
     EXPECT_RECORD_UNCHANGED(before);
 }
+
+TEST_F(VideoPll, SetPLLGP_ClearedByOthersInBetween_EachStepSetsItsOwnBitsAlone)
+{
+    unsigned writes = 0;
+    at_call("x_reg_write32", [&writes] {
+        if (++writes == 2) // the word, behind the first bits
+            x_reg_write32(sequences::pll_control_b, 0);
+    });
+    vSetPLLGP_HDMIDDS(RES_480P);
+    EXPECT_EQ(0x4010u, x_reg_read32(sequences::pll_control_b));
+}

@@ -276,3 +276,18 @@ TEST_F(PortFailure, Reset_ReturnsAllPortsToTheirDefaults)
     for (const RecordSnapshot::Change& change : fresh.changes())
         EXPECT_FALSE(change.field.starts_with("arPortInfo") || change.field == "eMasterColorSpace") << change.field;
 }
+
+TEST_F(PortFailure, ConnectAndDisconnect_LowEightBitsOfAKnownType_AreUnknown)
+{
+    for (const Operation& operation : operations)
+    {
+        prepare(operation);
+        const RecordSnapshot before;
+        for (const UINT16 type : { PMX_COMP_TYPE_VDP, PMX_COMP_TYPE_OSD })
+        {
+            for (const unsigned above : { 0x100u, 0x8000u, 0xFF00u })
+                EXPECT_EQ(no_such_port, operation.call(66, 0, static_cast<UINT16>(above + type), 1)) << above + type;
+        }
+        EXPECT_RECORD_UNCHANGED(before);
+    }
+}

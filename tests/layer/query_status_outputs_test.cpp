@@ -204,3 +204,25 @@ TEST_F(QueryStatusOutputs, OmittedLinesLeaveTheOrderOfTheOthersAlone)
                       "[PMX]PMX(0,) _arPmxConf[0].arOutputConf[3].eCcirDrvInfo.eDgoFmt(CCIR_NON_USED) \n " }),
               tail);
 }
+
+TEST_F(QueryStatusOutputs, ResMode_LowSixteenBitsOfAKnownOne_NoLine)
+{
+    const Place place = { "arOutputConf[1].eResMode", label(1) + "eResMode(RES_1080P60HZ)\n" };
+    for (std::int64_t mode = 0; mode < static_cast<std::int64_t>(reportedModes.size()); ++mode)
+    {
+        expect_line(place, 0x10000 + mode, {});
+        expect_line(place, 0x100 + mode, {});
+    }
+}
+
+TEST_F(QueryStatusOutputs, ResMode_IsReadBehindTheFrequencysLine)
+{
+    board::at_every_call([](const board::TraceEntry& entry) {
+        if (entry.text == label(1) + "u4VFreq(60)\n")
+            set_record("arOutputConf[1].eResMode", RES_480P);
+    });
+    const Lines lines = report();
+    board::at_every_call({});
+    EXPECT_EQ(with(defaultReport, label(1) + "eResMode(RES_1080P60HZ)\n", { label(1) + "eResMode(RES_480P)\n" }),
+              lines);
+}

@@ -1,14 +1,16 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
-"""Runs the object that ships, and holds its loads and stores in the handshake's status against what is written here:
-which, in which order, between which calls, and that each is of its own and as wide as its field.
+"""Runs the object that ships, and holds its loads and stores in the handshake's status, and those that connecting makes
+in a port, against what is written here: which, in which order, between which calls, and that each is of its own and as
+wide as its field.
 
-The flags are read and written by callers' threads, by the timer and by the display part without a lock. A compiler that
-merges two of them, or moves one past another, gives the others a state that nobody wrote.
+The flags are read and written by callers' threads, by the timer and by the display part without a lock, and a port by
+the sources' threads. A compiler that merges two of them, or moves one past another, gives the others a state that
+nobody wrote.
 
 Running it rather than reading its assembly: where an access goes is then a number, not the end of a chain of registers,
 inlining does not matter, and one check serves every processor. What a run cannot see is code that it does not reach: a
-place that names the status and was not reached is therefore a complaint.
+place that names the status and was not reached is therefore a complaint; the record is named nearly everywhere.
 
 usage: check_stores.py OBJECT...    the objects of one link: pmx_if.o, or one for each source
 """
@@ -18,8 +20,31 @@ import sys
 
 import layer_machine
 
-STATUS, STATUS_SIZE = "_arPmxDispPartStatus", 7
-FIELDS = {(0, 4): "timer", (4, 1): "change", (5, 1): "osd", (6, 1): "set"}
+
+
+class Watched:
+    """What is looked at: an object's bytes, from a place on that depends on how wide its pointers are."""
+
+    def __init__(self, name, size, at, fields):
+        self.name, self.size, self.at, self.fields = name, size, at, fields
+
+    def start(self, machine):
+        return self.at.get(machine.processor.word, 0)
+
+    def word_of(self, access, start):
+        """An access as the expectations spell it."""
+        field = self.fields.get((access.offset - start, access.size))
+        if field is None:
+            what = "store" if access.is_store else "load"
+            return f"{what}-of-{access.size}-bytes-at-{access.offset - start}"
+        return f"{field}={access.value}" if access.is_store else f"{field}?"
+
+
+STATUS = Watched("_arPmxDispPartStatus", 7, {},
+                 {(0, 4): "timer", (4, 1): "change", (5, 1): "osd", (6, 1): "set"})
+PORT_SIZE, PORT = 28, 4
+RECORDS_PORT = Watched("_arPmxConf", PORT_SIZE, {4: 60 + PORT * PORT_SIZE, 8: 80 + PORT * PORT_SIZE},
+                       {(0, 2): "type", (2, 2): "id", (4, 1): "connected", (5, 1): "enabled"})
 
 RES_1080P60HZ, RES_2D_576I50HZ = 12, 38
 
@@ -28,12 +53,13 @@ class Scenario:
     """One operation, and what it does in the status.
 
     Expected are words: "change?" loads the format-change flag, "osd=1" stores 1 in the OSD-enable flag; "timer" is the
-    timer's handle, "set" the flag that it is set. Every other word is a platform function: its calls are looked at
-    then, those of others are not.
+    timer's handle, "set" the flag that it is set; of a port, "type" and "id" are the source's. Every other word is a
+    platform function: its calls are looked at then, those of others are not.
     """
 
-    def __init__(self, operation, expected, flags=(0, 0, 0), boot=False, **answers):
+    def __init__(self, operation, expected, flags=(0, 0, 0), boot=False, watched=STATUS, **answers):
         self.function, *self.arguments = operation
+        self.watched = watched
         self.expected, self.flags, self.boot, self.answers = expected.split(), flags, boot, answers
 
     def __str__(self):
@@ -98,23 +124,19 @@ SCENARIOS = [
              f"PMX_HalScalerReset set? i4GetHotPlugStatus {HELD_BACK}", flags=(1, 0, 2)),
     Scenario(("PMX_SetModeEx", 0, request(RES_1080P60HZ), 60, 1, 0),
              "PMX_HalScalerReset set? i4GetHotPlugStatus change? change?", flags=(0, 1, 1)),
+
+    # Each on its own, between lock and unlock: who looks without the mutex finds a port that is on its way.
+    Scenario(("i4Pmx_Connect", 66, 0, 0xB0, 2), "x_sema_lock connected=1 type=176 id=2 x_sema_unlock",
+             watched=RECORDS_PORT),
+    Scenario(("i4Pmx_Disconnect", 66, 0, 0xB0, 2), "x_sema_lock connected=0 type=0 id=0 enabled=0 x_sema_unlock",
+             watched=RECORDS_PORT),
 ]
-
-
-def word_of(event):
-    """An event as the expectations spell it."""
-    if isinstance(event, layer_machine.Call):
-        return event.name
-    field = FIELDS.get((event.offset, event.size))
-    if field is None:
-        what = "store" if event.is_store else "load"
-        return f"{what}-of-{event.size}-bytes-at-{event.offset}"
-    return f"{field}={event.value}" if event.is_store else f"{field}?"
 
 
 def observed(machine, scenario):
     """What an operation did, in the words of its expectation."""
-    if not scenario.boot:
+    watched, start = scenario.watched, scenario.watched.start(machine)
+    if watched is STATUS and not scenario.boot:
         machine.write(machine.watched, struct.pack("<I3B", 0x51, *scenario.flags))
     machine.answers = {"fgPmxDrvSetAvd": 1, "TVE_SetFmtEx": 1, "i4GetHotPlugStatus": 1, **scenario.answers}
     arguments = [machine.caller_memory(argument) if isinstance(argument, tuple) else argument
@@ -122,12 +144,20 @@ def observed(machine, scenario):
     if scenario.function in ("PMX_Uninit", "i4PMX_Uninit"):
         machine.write(machine.image.symbols["_PmxInitiated"], [1])
     machine.call(scenario.function, *arguments)
-    words = [word_of(event) for event in machine.events]
+    words = [event.name if isinstance(event, layer_machine.Call) else watched.word_of(event, start)
+             for event in machine.events if isinstance(event, layer_machine.Call) or event.offset + event.size > start]
     return [word for word in words if word[-1] == "?" or "=" in word or "-of-" in word or word in scenario.expected]
 
 
 def complaints(objects, scenarios):
-    machine = layer_machine.Machine(objects, STATUS, STATUS_SIZE)
+    for watched in (STATUS, RECORDS_PORT):
+        of_this = [scenario for scenario in scenarios if scenario.watched is watched]
+        if of_this:
+            yield from complaints_of(objects, watched, of_this)
+
+
+def complaints_of(objects, watched, scenarios):
+    machine = layer_machine.Machine(objects, watched.name, watched.size + max([0, *watched.at.values()]))
     for scenario in sorted(scenarios, key=lambda scenario: not scenario.boot):
         try:
             words = observed(machine, scenario)
@@ -136,13 +166,13 @@ def complaints(objects, scenarios):
             continue
         if words != scenario.expected:
             yield f"{scenario}:\n    expected: {' '.join(scenario.expected)}\n    found:    {' '.join(words)}"
-    places = list(machine.image.places_that_name(STATUS, STATUS_SIZE))
+    places = list(machine.image.places_that_name(watched.name, watched.size))
     for place in places:
-        if place not in machine.reached:
-            yield f"{machine.image.function_at(place)}: names {STATUS}, and nothing here reaches it"
+        if watched is STATUS and place not in machine.reached:
+            yield f"{machine.image.function_at(place)}: names {watched.name}, and nothing here reaches it"
     if not places:
-        yield f"nothing in it names {STATUS}"
+        yield f"nothing in it names {watched.name}"
 
 
 if __name__ == "__main__":
-    sys.exit(layer_machine.check(__doc__, complaints, SCENARIOS, "operations, each flag by itself and in its order"))
+    sys.exit(layer_machine.check(__doc__, complaints, SCENARIOS, "operations, each field by itself and in its order"))

@@ -38,6 +38,7 @@ class Settings:
         self.programs = {name: pathlib.Path(path) for name, path in told["programs"].items()}
         self.options = told["options"]  # of the link, by program
         self.runs, self.without = told["runs"], told["without"]
+        self.checks = told["checks"]  # commands that look at the objects that ship
         self.sources = sorted(self.layer.glob("*.cpp"))
 
     def layer_key(self):
@@ -50,8 +51,10 @@ class Settings:
         return digest_of([self.link, self.options, self.behind], map(pathlib.Path, self.rest))
 
     def tests_key(self):
-        """All cases, and what they stand on."""
-        return digest_of([self.ground_key(), self.without], [path for _, path in sorted(self.programs.items())])
+        """All cases and checks, and what they stand on."""
+        checks = [path for *_, check in self.checks for path in sorted(pathlib.Path(check).parent.glob("*.py"))]
+        programs = [path for _, path in sorted(self.programs.items())]
+        return digest_of([self.ground_key(), self.without], [*checks, *programs])
 
 
 def digest_of(words, paths):
@@ -79,7 +82,7 @@ class Written:
         if path not in self._files:
             text = path.read_text(encoding="utf-8")
             cases = [(text.count("\n", 0, found.start()) + 1, found[0]) for found in self.CASE.finditer(text)]
-            self._files[path] = self.CASE.sub("", text), cases
+            self._files[path] = self.CASE.sub("", text).split(), cases
         around, cases = self._files[path]
         own = [case for first, case in cases if first <= line <= first + case.count("\n")]
         return hashlib.sha256(json.dumps([self._lent_to(path), around, own]).encode()).hexdigest()[:24]
@@ -271,15 +274,27 @@ class Bench:
             changed = self.objects([*self._settings.compile, *self._settings.guards], mutant, text, ".guarded.o")
         return self.link(name, changed)[0] if changed else None
 
-    def has_same_code(self, mutant, text):
-        """Whether what ships would be the same, byte by byte."""
+    def shipped(self, mutant, text):
+        """What would ship, by source; none when it is the same, byte by byte."""
         changed = self.objects(self._settings.product, mutant, text, ".product.o")
-        return changed is not None and all(
-            made.read_bytes() == (self._originals / made.name).read_bytes() for made in changed.values())
+        if changed is None:
+            raise Failed(f"{mutant.name} compiles, but not as it would ship")
+        return {source: made for source, made in changed.items()
+                if made.read_bytes() != (self._originals / made.name).read_bytes()}
+
+    def check(self, changed):
+        """The check that complains of what would ship, and of what; none: ("", "")"""
+        objects = [str(changed.get(source, self._originals / f"{source.stem}.product.o"))
+                   for source in self._settings.sources]
+        for command in self._settings.checks:
+            ran = subprocess.run([*command, *objects], cwd=self.folder, capture_output=True, check=False)
+            if ran.returncode != 0:
+                return pathlib.Path(command[-1]).name, (ran.stdout + ran.stderr).decode(errors="replace")
+        return "", ""
 
     def judge(self, mutant, text, cases, tests):
         """(verdict, the case that has seen it)"""
-        changed, programs, asked = self.objects(self._settings.compile, mutant, text), {}, False
+        changed, programs, shipped = self.objects(self._settings.compile, mutant, text), {}, None
         if not changed:
             return "refused", ""
         for name, some, seconds in cases.stages(mutant):
@@ -291,10 +306,16 @@ class Bench:
             if answer != 0:
                 cases.note(mutant.file, mutant.function, (name, saw_it(printed)))
                 return "hung" if answer == -signal.SIGXCPU else "killed", f"{name}:{saw_it(printed)}"
-            if not asked and self.has_same_code(mutant, text):
+            if shipped is None:  # the compiler is quicker than the longer cases
+                shipped = self.shipped(mutant, text)
+            if not shipped:
                 return "same code", ""
-            asked = True  # the compiler is quicker than the longer cases
-        return ("same code" if not asked and self.has_same_code(mutant, text) else "survived"), ""
+        if shipped is None:
+            shipped = self.shipped(mutant, text)
+        if not shipped:
+            return "same code", ""
+        check = self.check(shipped)[0]
+        return ("killed", f"check:{check}") if check else ("survived", "")
 
 
 def saw_it(printed):
@@ -350,6 +371,9 @@ def prepare(settings, folder, users):
         bench.original([*settings.compile, "-finstrument-functions"], ".runs.o")
         bench.original(settings.product, ".product.o")
         bench.original([*settings.compile, *settings.guards], ".guarded.o")
+        check, complaint = bench.check({})
+        if check:
+            raise Failed(f"{check} fails without any mutant:\n{complaint[-2000:]}")
         told = {"key": key, "cases": [case for name in settings.programs
                                       for case in note_cases(settings, bench, tests, name)]}
         unfinished = kept.with_suffix(".unfinished")

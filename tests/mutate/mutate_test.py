@@ -199,7 +199,7 @@ class Planting(unittest.TestCase):
         self.build("runs", RUNS)
         settings = {"root": str(self.folder), "layer": str(self.layer), "read": READ, "compile": ["g++", *FLAGS],
                     "product": ["g++", *FLAGS, "-O2"], "link": ["g++", "-no-pie"], "behind": [], "without": "",
-                    "guards": ["-fsanitize=address"], "rest": [], "options": {},
+                    "guards": ["-fsanitize=address"], "rest": [], "options": {}, "checks": [],
                     "programs": {"tests": str(self.folder / "rest.o")}, "runs": str(self.folder / "runs.o")}
         (self.made / "settings.json").write_text(json.dumps(settings), encoding="utf-8")
         self.equivalents = self.folder / "equivalent.txt"
@@ -271,7 +271,7 @@ class Planting(unittest.TestCase):
         self.mutate("fgOverlooked", "iFourfold")
         of = collections.Counter(result["verdict"] == "survived" for result in self.results().values())
         self.assertTrue(of[True] and of[False])
-        self.cases.write_text(CASES + "TEST(Count, More)\n{\n    EXPECT_TRUE(!fgOverlooked(3));\n}\n", "utf-8")
+        self.cases.write_text(CASES + "\nTEST(Count, More)\n{\n    EXPECT_TRUE(!fgOverlooked(3));\n}\n", "utf-8")
         self.build("rest", PROGRAM.replace("fgOverlooked(4);", "vExpect(!fgOverlooked(3) && fgOverlooked(4));"))
         _, printed = self.mutate("fgOverlooked", "iFourfold")
         self.assertRegex(printed, rf"(?m)^{of.total()} mutants, {of[False]} of them judged before;")
@@ -288,6 +288,20 @@ class Planting(unittest.TestCase):
         self.mutate("iSumOfThree:operator")
         of = {result["by"] for result in self.results().values() if result["verdict"] == "killed"}
         self.assertIn("tests.guarded:Count.Counts", of)
+
+    def test_a_fault_that_a_check_of_what_ships_sees(self):
+        (self.layer / "count.cpp").write_text(LAYER + 'const char* szName() { return "count"; }\n', encoding="utf-8")
+        self.mutate("szName:text")
+        self.assertEqual({"survived"}, {result["verdict"] for result in self.results().values()})
+        check = self.folder / "check_names.py"
+        check.write_text("import pathlib, sys\n"
+                         "sys.exit(any(b'~count' in pathlib.Path(made).read_bytes() for made in sys.argv[1:]))\n",
+                         encoding="utf-8")
+        settings = json.loads((self.made / "settings.json").read_text(encoding="utf-8"))
+        settings["checks"] = [[sys.executable, str(check)]]
+        (self.made / "settings.json").write_text(json.dumps(settings), encoding="utf-8")
+        self.mutate("szName:text")
+        self.assertEqual({"check:check_names.py"}, {result["by"] for result in self.results().values()})
 
     def test_equivalents_are_no_survivors(self):
         self.mutate("fgOverlooked")

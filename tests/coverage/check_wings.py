@@ -7,8 +7,8 @@ What cannot be reached stands in unreached.txt, each with its reason. What is no
 unreached_yet.txt, which a program writes: it fails when something else is missing, or when something of it was reached.
 --renew writes it anew, but not when a wing reaches less than before.
 
-usage: check_wings.py --build DIRECTORY --profdata PROGRAM --cov PROGRAM --tool PMXBOARD --product PROGRAM [--renew]
-                      TEST_PROGRAM...
+usage: check_wings.py --build DIRECTORY --profdata PROGRAM --cov PROGRAM --tool PMXBOARD
+                      --recorder PRODUCT INTERRUPTED LATE [--renew] TEST_PROGRAM...
 """
 
 import argparse
@@ -48,12 +48,12 @@ def wing_of(name):
 
 def commands(arguments):
     """The tests that run these wings."""
-    tool, product = str(arguments.tool), str(arguments.product)
+    tool = str(arguments.tool)
     for program in arguments.programs:
         yield [str(program), "--gtest_brief=1", ELSEWHERE]
     for scenario in sorted((ROOT / "scenarios").glob("*.pmx")):
         yield [tool, "run", "--quiet", str(scenario)]
-    yield [sys.executable, "tests/recorder/replay_test.py", tool, product]
+    yield [sys.executable, "tests/recorder/replay_test.py", tool, *map(str, arguments.recorder)]
     yield [sys.executable, "tests/decode/to_scenario.py", tool]
 
 
@@ -129,7 +129,8 @@ def measure(arguments):
     if failed:
         sys.exit(failed)
     tools = counted.Tools(arguments.profdata, arguments.cov)
-    programs = [*arguments.programs, arguments.tool, arguments.product]
+    product, interrupted, _ = arguments.recorder
+    programs = [*arguments.programs, arguments.tool, product, interrupted]
     files = [file for file in counted.files_of(tools.export(programs, counts), ROOT, ("board/", "tools/", "recorder/"))
              if wing_of(file.name)]
     found = {wing_of(file.name) for file in files}
@@ -145,7 +146,7 @@ def main():
     parser.add_argument("--profdata", required=True, help="llvm-profdata of the compiler's version")
     parser.add_argument("--cov", required=True, help="llvm-cov of the compiler's version")
     parser.add_argument("--tool", required=True, type=pathlib.Path, help="pmxboard")
-    parser.add_argument("--product", required=True, type=pathlib.Path, help="a product with the recorder in it")
+    parser.add_argument("--recorder", required=True, type=pathlib.Path, nargs=3, help="what replay_test.py takes")
     parser.add_argument("--renew", action="store_true", help="write unreached_yet.txt anew")
     parser.add_argument("programs", nargs="+", type=pathlib.Path)
     arguments = parser.parse_args()

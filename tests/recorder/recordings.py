@@ -11,7 +11,8 @@ sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "recorder")
 import interface  # noqa: E402
 
 HEADER_WORDS = 28
-RING_WORDS, HEAD, SNAPSHOT_COUNT = 8, 10, 11  # words of the header
+POINTER_SIZE, EXPORTED_SIZE, STATE_SIZE, RING_WORDS = range(5, 9)  # words of the header
+HEAD, SNAPSHOT_COUNT, FIRST_SNAPSHOT = 10, 11, 12
 OPERATION, CALL, RETURN, CHANGE, SNAPSHOT = range(1, 6)
 ANSWERED = 0x80
 

@@ -20,8 +20,9 @@ import unittest
 
 sys.dont_write_bytecode = True
 
-from recordings import (ANSWERED, CALL, HEAD, HEADER_WORDS, OPERATION, RING_WORDS, SNAPSHOT_COUNT,  # noqa: E402
-                        Recording, interface)
+from recordings import (ANSWERED, CALL, CHANGE, EXPORTED_SIZE, FIRST_SNAPSHOT, HEAD, HEADER_WORDS,  # noqa: E402
+                        OPERATION, POINTER_SIZE, RETURN, RING_WORDS, SNAPSHOT, SNAPSHOT_COUNT, STATE_SIZE, Recording,
+                        interface)
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 # What no scenario can say.
@@ -348,6 +349,61 @@ class Replay(unittest.TestCase):
             ended = self.replay(changed)
             self.assertEqual(2, ended.returncode, told)
             self.assertIn(told, ended.stderr)
+
+    def test_headers_that_cannot_be(self):
+        recording = self.record("PMX_Init\n")
+        head = recording.words[HEAD]
+        for word, value, told in (
+                (POINTER_SIZE, 2, "was made where pointers have 2 bytes"),
+                (EXPORTED_SIZE, recording.words[EXPORTED_SIZE] + 4, "another version of the layer's interface"),
+                (STATE_SIZE, recording.words[STATE_SIZE] - 4, "another version of the layer's interface"),
+                (RING_WORDS, recording.words[RING_WORDS] + 1, "ring has an impossible size"),
+                (RING_WORDS, 1024, "ring has an impossible size"),
+                (SNAPSHOT_COUNT, 0, "has no snapshot to begin with"),
+                (FIRST_SNAPSHOT, head, "has no snapshot to begin with"),
+                (FIRST_SNAPSHOT, head - recording.words[RING_WORDS] - 1, "has no snapshot to begin with"),
+                (FIRST_SNAPSHOT, list(recording.events())[1][0] - HEADER_WORDS, "has no snapshot where it says")):
+            changed = Recording(recording.bytes())
+            changed.words[word] = value & 0xFFFFFFFF
+            ended = self.replay(changed.bytes())
+            self.assertEqual((2, ""), (ended.returncode, ended.stdout), told)
+            self.assertIn(told, ended.stderr)
+
+    def test_events_that_cannot_be(self):
+        recording = self.record("PMX_Init\n")
+        for kind, function, words, told in (
+                (OPERATION, 255, 3, "no such operation"), (OPERATION, 0, 2, "it is too short"),
+                (CALL, 255, 3, "no such function"), (CALL, 0, 2, "it is too short"), (RETURN, 0, 3, "it is too short"),
+                (CHANGE, 0, 3, "it is no state"), (SNAPSHOT, 0, 3, "it is no state"),
+                (9, 0, 3, "no such kind of event"), (CHANGE, 0, 1, "it has an impossible length")):
+            event = [function << 16 | kind << 8 | words, *(words - 1) * [0]]
+            ended = self.replay(recording.of(event).bytes())
+            self.assertEqual((2, ""), (ended.returncode, ended.stdout), told)
+            self.assertIn(f": event 2 is damaged: {told}\n", ended.stderr)
+
+    def test_what_an_event_lacks_is_nothing(self):
+        recording = self.record("PMX_Init\n")
+        numbers = [function.name for function in interface.operations()]
+        shown = []
+        for name, *words in (("PMX_SetModeEx",), ("PMX_SetModeEx", 0, 0xFFFFFFFF), ("PMX_Printf", 0, 0x80000009)):
+            event = [numbers.index(name) << 16 | OPERATION << 8 | 3 + len(words), 0, 0, *words]
+            self.file.write_bytes(recording.of(event).bytes())
+            shown.append(self.run_tool("replay", "--show", self.file).stdout.splitlines()[-1].split("\t")[-1])
+            self.assertIn(self.run_tool("replay", self.file).returncode, (0, 1))
+        self.assertEqual(["PMX_SetModeEx(0, null, 0, DRV_NON_EXT_CHIP, 0)", "PMX_SetModeEx(0, [], 0, DRV_NON_EXT_CHIP, 0)",
+                          'PMX_Printf(0, "")'], shown)
+
+    def test_another_record_departs_there(self):
+        recording = self.record("PMX_Init\n")
+        snapshot = recording.event(next(recording.events())[0])
+        again = recording.of(snapshot)
+        self.assertEqual(0, self.replay(again.bytes()).returncode)
+        again.words[HEADER_WORDS + len(snapshot) + 2] ^= 1
+        ended = self.replay(again.bytes())
+        self.assertEqual(1, ended.returncode, ended.stderr)
+        self.assertRegex(ended.stdout, r"^departs at event 2 of 2")
+        self.assertRegex(ended.stdout, r"(?m)^  computed: another record$")
+        self.assertRegex(ended.stdout, r": \w+ was recorded, \w+ computed\b")
 
     def test_what_stands_before_damage_is_replayed(self):
         recording = self.record(MODE_CHANGE)

@@ -60,7 +60,6 @@ public:
     Reader(const Reader&) = delete;
     Reader& operator=(const Reader&) = delete;
 
-    const std::string& name() const { return m_name; }
     bool is_plain() const { return m_is_plain; }
 
     /** What there is, at least a byte; 0 at the end. */

@@ -107,13 +107,13 @@ try
         return Value::null();
     const Version version{ std::filesystem::last_write_time(partition.image),
                            std::filesystem::file_size(partition.image) };
-    auto& [of_version, content] = known[partition.image];
-    if (of_version != version || content.kind() == Value::Kind::Null)
+    auto found = known.find(partition.image);
+    if (found == known.end() || found->second.first != version)
     {
-        content = Value::text(board::digest_of(board::files::read(partition.image)));
-        of_version = version;
+        const Value content = Value::text(board::digest_of(board::files::read(partition.image)));
+        found = known.insert_or_assign(partition.image, std::pair(version, content)).first;
     }
-    return content;
+    return found->second.second;
 }
 catch (const std::exception&)
 {

@@ -65,7 +65,7 @@ std::string written(const Json& json, int indent)
     {
         const auto byte = static_cast<unsigned char>(text[i]);
         const auto next = static_cast<unsigned char>(i + 1 < text.size() ? text[i + 1] : '\0');
-        const bool is_second_control = byte == 0xC2 && next >= 0x80 && next < 0xA0; // U+0080 to U+009F
+        const bool is_second_control = byte == 0xC2 && next < 0xA0; // U+0080 to U+009F: it is UTF-8 by now
         if (byte == 0x7F || is_second_control)
             safe += escaped_code(is_second_control ? next : byte);
         else
@@ -81,7 +81,7 @@ namespace
 /** Line and column of a byte, both counted from 1. */
 std::string place_of(std::string_view text, std::size_t byte)
 {
-    const std::string_view before = text.substr(0, byte == 0 ? 0 : byte - 1);
+    const std::string_view before = text.substr(0, byte - 1);
     const auto line = 1 + std::count(before.begin(), before.end(), '\n');
     const std::size_t begin = before.find_last_of('\n');
     const std::size_t column = before.size() - (begin == before.npos ? 0 : begin + 1) + 1;

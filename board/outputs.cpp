@@ -67,8 +67,6 @@ std::int64_t read_number(std::string_view written, unsigned bits, names::Family 
             throw std::invalid_argument(std::string(written) + " is neither a number nor a name that goes here" +
                                         did_you_mean(written, names::all()));
     }
-    if (bits >= 64)
-        return *number;
     const std::int64_t lowest = -(std::int64_t{ 1 } << (bits - 1));
     const std::int64_t highest = (std::int64_t{ 1 } << bits) - 1;
     if (*number < lowest || *number > highest)
@@ -130,6 +128,7 @@ void put_record(Record* there, std::string_view written)
                 return;
             found = true;
             using Field = std::remove_reference_t<decltype(place)>;
+            static_assert(std::is_class_v<Field> || sizeof(Field) < sizeof(std::int64_t), "its range is no number");
             if constexpr (std::is_class_v<Field>)
                 put_record(&place, value);
             else

@@ -6,6 +6,8 @@
 #include <filesystem>
 #include <fstream>
 
+#include "board/files.h"
+
 namespace
 {
 
@@ -177,6 +179,54 @@ TEST_F(BoardFile, IsFoundByFileDirectoryOrName)
     }
 }
 
+TEST_F(BoardFile, Empty_TablesSayNothing)
+{
+    const Description description = load("[console]\n[display_part]\n[video_planes]\n[flash]\n[hdmi]\n[mixer]\n");
+    EXPECT_EQ(1, description.console_level);
+    EXPECT_EQ("off", board::display_part::to_text(description.display_part));
+    EXPECT_FALSE(description.waiting_for_sync);
+    EXPECT_TRUE(description.sink_plugged);
+}
+
+TEST_F(BoardFile, WhatCannotBeRead_IsToldWithItsReason)
+{
+    const auto told = [](const std::filesystem::path& board) {
+        try
+        {
+            board::load_description(board);
+        }
+        catch (const DescriptionError& error)
+        {
+            return std::string(error.what());
+        }
+        return std::string("nothing");
+    };
+    const std::string long_name(300, 'n');
+    EXPECT_EQ("cannot read " + long_name + ": File name too long", told(long_name));
+    std::ofstream(file()) << std::string(board::files::mebibyte + 1, '\n');
+    EXPECT_EQ(file().string() + " is larger than 1 MiB", told(file()));
+
+    board::set_boards_directory(m_directory);
+    std::filesystem::create_directories(m_directory / "playr");
+    EXPECT_EQ("no such board: playr; did you mean player?", told("playr")) << "a directory without a file is no board";
+    EXPECT_EQ("no such board: " + (file() / "x").string() + "; there are: player", told(file() / "x"));
+    board::set_boards_directory(m_directory / "playr");
+    EXPECT_EQ("no such board: player; there is none in " + (m_directory / "playr").string(), told("player"));
+    board::set_boards_directory(m_directory / "none");
+    EXPECT_EQ("no such board: player; there is none in " + (m_directory / "none").string(), told("player"));
+}
+
+TEST_F(BoardFile, HdmiTakesNoMoreModesThanThereCanBe)
+{
+    const std::string mode = "{ resolution = \"RES_480P\", frequency = 60 },\n";
+    std::string modes = "hdmi.modes = [";
+    for (unsigned i = 0; i < 128; ++i)
+        modes += mode;
+    EXPECT_EQ("nothing", wrong(modes + "]\n"));
+    EXPECT_TRUE(wrong(modes + mode + "]\n")
+                    .starts_with("/player/board.toml:1: modes of hdmi has to be a list of 1 to 128 tables"));
+}
+
 TEST_F(BoardFile, UnknownKeys_AreNamedWithFileLineAndTheNearestValidOne)
 {
     EXPECT_EQ("/player/board.toml:1: no such key: nam; did you mean name?", wrong("nam = \"x\"\n"));
@@ -216,6 +266,8 @@ TEST_F(BoardFile, WrongTypesAndRanges)
         { "display_part.answer = \"3\"\n",
           "the display part's answer is off, never, or the time it takes: 3s, 500ms or 2us" },
         { "display_part.answer = \"31622401s\"\n", "the time in s is 0 to 31622400, not 31622401" },
+        { "fault = [{ function = \"x_sema_lock\", answer = -1, for = \"31622401s\" }]\n",
+          "the time in s is 0 to 31622400, not 31622401" },
         { "mixer.plane_delay = 1\n", "plane_delay has to be a list of 8 numbers, plane 1 first" },
         { "mixer.plane_delay = [1, 2]\n", "plane_delay has to be a list of 8 numbers, plane 1 first" },
         { "mixer.plane_delay = [1, 2, 3, 4, 5, 6, 7, 2147483648]\n",
@@ -363,6 +415,7 @@ TEST_F(BoardFile, ProductsThatThereCannotBe)
         { "video_planes.waiting_for_sync = 1\n", "waiting_for_sync of video_planes has to be true or false" },
         { "hdmi.modes = []\n", "modes of hdmi has to be a list of 1 to 128 tables" },
         { "hdmi.modes = [1]\n", "a mode of hdmi has to be a table" },
+        { "source = [{ name = \"vdp0\", luma_key = 1 }]\n", "a luma key goes with a video plane that has a size" },
         { "hdmi.modes = [{ resolution = \"RES_480P\" }]\n", "a mode of hdmi needs resolution and frequency" },
         { "hdmi = { valid = { resolution = \"RES_480P\", frequency = 60 }, modes = [1] }\n",
           "hdmi takes valid or modes: what is valid is chosen whatever is asked" },

@@ -86,6 +86,8 @@ TEST_F(Faults, Arguments_TellTheCallsThatAreMeant)
     board::faults::set(fault_of("i4NFBPartitionRead(*, u4Offset=7, ...)", 5));
     EXPECT_EQ(-1, get_part_id_by_name("none"));
     EXPECT_EQ(5, get_part_id_by_name("other"));
+    board::faults::set(fault_of("get_part_id_by_name(null)", 6));
+    EXPECT_EQ(6, get_part_id_by_name(nullptr));
     EXPECT_EQ(-1, i4NFBPartitionRead(0, 6, nullptr, 4));
     EXPECT_EQ(5, i4NFBPartitionRead(0, 7, nullptr, 4));
 
@@ -136,6 +138,9 @@ TEST_F(Faults, Arguments_ThatMeanTheSame_AreTheSame)
         2u, left("fgPmxDrvGetAvdInfo(*, {u4ResCheck=RES_480P, ...})", "fgPmxDrvGetAvdInfo(*, {u4ResCheck=RES_480P})"));
     EXPECT_EQ(2u, left("get_part_id_by_name(\"1\")", "get_part_id_by_name(\"0x1\")")) << "texts are no numbers";
     EXPECT_EQ(2u, left("x_sema_lock(1, ...)", "x_sema_lock(2, ...)"));
+    EXPECT_EQ(1u, left("x_sema_lock(1, …)", "x_sema_lock(1, ...)"));
+    EXPECT_EQ(1u, left("PMX_HalSetPlaneOrder(*, [0, 1, 2, 3, 4, 5, 6, 7], *)",
+                       "PMX_HalSetPlaneOrder(*, [0x0, 1, 2, 3, 4, 5, 6, 0b111], ...)"));
     board::faults::clear("x_sema_lock", "0x2, *");
     EXPECT_EQ(1u, board::faults::active().size());
 }
@@ -191,6 +196,7 @@ TEST_F(Faults, For_LastsForATimeOfTheBoardsClock)
     EXPECT_EQ((Answers{ 7 }), ask(1));
     board::advance(std::chrono::microseconds(1));
     EXPECT_TRUE(board::faults::active().empty());
+    EXPECT_EQ("[]", board::faults::state().to_text());
     EXPECT_EQ((Answers{ -1 }), ask(1));
 
     board::Description description;
@@ -229,6 +235,10 @@ TEST_F(Faults, Outputs_AreSetAndTheOthersLeftAlone)
     EXPECT_EQ(TRUE, fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, &query));
     EXPECT_EQ(static_cast<UINT32>(RES_720P60HZ), query.u4ValidAutoRes);
     EXPECT_EQ(2, query.u2ValidAutoVfreq) << "a field that is left out stays as it is";
+    board::faults::set(
+        fault_of("fgPmxDrvGetAvdInfo", 1, When::On, { { "pvParameter", "{u2ValidAutoVfreq=TRUE, ..., …}" } }));
+    EXPECT_EQ(TRUE, fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, &query));
+    EXPECT_EQ(1, query.u2ValidAutoVfreq) << "a name that goes with any number";
 
     board::faults::set(fault_of("x_timer_create", 0, When::On, { { "phTimer", "77" } }));
     EXPECT_EQ(OSR_OK, x_timer_create(nullptr)) << "a null pointer takes nothing";
@@ -241,12 +251,21 @@ TEST_F(Faults, ArgumentsAndOutputs_AreRefusedWithTheReason)
     };
     EXPECT_EQ("x_sema_lock has 2 arguments (hSema, eOption), not 1; ... stands for the rest", of("x_sema_lock(1)"));
     EXPECT_EQ("accepted", of("x_sema_lock(1, ...)"));
+    EXPECT_EQ("x_sema_lock has 2 arguments (hSema, eOption), not 0; ... stands for the rest",
+              refusal({ "x_sema_lock", -1, When::Always, 1, " " }));
     EXPECT_EQ("x_sema_lock: here stands hSema, not hTimer", of("x_sema_lock(hTimer=1, ...)"));
+    EXPECT_EQ("x_sema_lock has 2 arguments (hSema, eOption), not 3; ... stands for the rest",
+              of("x_sema_lock(1, 2, 3)"));
     EXPECT_TRUE(of("fgPmxDrvSetAvd(PMX_SET_HDMI_HUI, ...)").ends_with("did you mean PMX_SET_HDMI_HUE?"));
+    EXPECT_EQ("x_sema_lock: eOption: RES_480PP is neither a number nor a name; did you mean RES_480P, RES_480I?",
+              of("x_sema_lock(1, RES_480PP)"));
+    EXPECT_EQ("x_sema_lock: hSema: ? is neither a number nor a name", of("x_sema_lock(?, *)"));
     EXPECT_EQ("x_sema_create: phSema is an output, and says nothing when the call begins; write *",
               of("x_sema_create(7, ...)"));
     EXPECT_EQ("fgPmxDrvSetAvd: pvParameter: a record's field is written NAME=VALUE, not 1",
               of("fgPmxDrvSetAvd(*, {1}, *)"));
+    EXPECT_EQ("accepted", of("fgPmxDrvSetAvd(*, {…}, *)"));
+    board::faults::clear("fgPmxDrvSetAvd");
     EXPECT_EQ("x_timer_create has no output hTimer; it has phTimer", of("x_timer_create", { { "hTimer", "1" } }));
     EXPECT_EQ("x_timer_create: phTimer is set twice", of("x_timer_create", { { "phTimer", "9" }, { "phTimer", "8" } }));
     EXPECT_EQ(1u, board::faults::state().items().size()) << "the one that was accepted";
@@ -261,6 +280,13 @@ TEST_F(Faults, ArgumentsAndOutputs_AreRefusedWithTheReason)
                     .ends_with("there is no field u4ValidAutoRe; did you mean u4ValidAutoRes?"));
     EXPECT_TRUE(of("fgPmxDrvGetAvdInfo", { { "pvParameter", "{u4ValidAutoRes=PMX_TV_TYPE_PAL}" } })
                     .find("PMX_TV_TYPE_PAL is neither a number nor a name that goes here") != std::string::npos);
+    for (const char* const number : { "4294967296", "-2147483649" })
+        EXPECT_EQ("x_timer_create: phTimer: " + std::string(number) + " does not fit into 32 bits",
+                  of("x_timer_create", { { "phTimer", number } }));
+    EXPECT_EQ("fgPmxDrvGetAvdInfo: pvParameter: a record's field is written NAME=VALUE, not 1",
+              of("fgPmxDrvGetAvdInfo", { { "pvParameter", "{1}" } }));
+    EXPECT_EQ("fgPmxDrvGetAvdInfo: pvParameter: there is no field zzz",
+              of("fgPmxDrvGetAvdInfo", { { "pvParameter", "{zzz=1}" } }));
     EXPECT_EQ("x_vsnprintf: szBuffer: a text stands in double quotes: text",
               of("x_vsnprintf", { { "szBuffer", "text" } }));
     Fault fault = fault_of("x_timer_stop", -1, When::For);

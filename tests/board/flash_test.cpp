@@ -103,6 +103,17 @@ TEST_F(Flash, Read_WithoutADestination_IsReported)
     EXPECT_EQ(1u, board::misuses());
 }
 
+TEST_F(Flash, Read_OfAWord_IsOfFourBytes)
+{
+    board::set_flash_word("boot", 0x04030201);
+    EXPECT_EQ(2, i4NFBPartitionRead(0, 2, m_bytes.data(), 2));
+    EXPECT_EQ((std::array<UINT8, 4>{ 3, 4, 0xAA, 0xAA }), m_bytes);
+    EXPECT_EQ(-1, i4NFBPartitionRead(0, 2, m_bytes.data(), 3));
+    EXPECT_EQ(-1, i4NFBPartitionRead(0, 0, m_bytes.data(), 0x80000000)) << "a number that no result can tell";
+    EXPECT_EQ("2", now("failed_reads"));
+    EXPECT_THROW(board::set_flash_word("", 7), std::invalid_argument);
+}
+
 TEST_F(Flash, Read_OfAnImageThatIsGone_Fails)
 {
     std::filesystem::remove(m_directory / "boot.bin");

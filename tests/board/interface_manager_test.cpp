@@ -185,6 +185,10 @@ TEST_F(InterfaceManager, Faults_AnswerInsteadOfActing)
     EXPECT_EQ(-3, query());
     EXPECT_EQ("i4ImQueryInterface(PMX_COMP_TYPE_VDP, 1, IID_IVdp, <unchanged>, <unchanged>) = -3", last_call());
     EXPECT_EQ(tag(0x11), m_table);
+    board::faults::set({ "i4ImQueryInterface", 2, board::Fault::When::Always, 1, {}, {}, { { "ppvTag", "0x33" } } });
+    EXPECT_EQ(2, query());
+    EXPECT_EQ(tag(0x33), m_tag);
+    EXPECT_EQ(0, release(7));
     board::faults::clear_all();
     query();
     answer_always("i4ImReleaseInterface", -4);
@@ -192,6 +196,7 @@ TEST_F(InterfaceManager, Faults_AnswerInsteadOfActing)
     answer_always("i4ImUnregisterInterface2", -5);
     EXPECT_EQ(-5, withdraw());
     EXPECT_EQ("1", member(board::interface_manager::state(), "interfaces[0].held"));
+    EXPECT_EQ(-4, i4ImReleaseInterface(PMX_COMP_TYPE_VDP, 9, IID_IVdp, tag(7))) << "which nobody has";
     power_on({});
     EXPECT_EQ("{interfaces=[]}", now());
 }

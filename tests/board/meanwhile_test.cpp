@@ -196,6 +196,13 @@ TEST_F(Meanwhile, AtEveryCall_MayClearTheTraceAndPowerTheBoardOn)
     board::at_every_call([](const board::TraceEntry&) { board::power_on({}); });
     EXPECT_EQ(-1, get_part_id_by_name("none"));
     EXPECT_TRUE(board::trace::entries().empty());
+    unsigned calls = 0;
+    board::at_every_call([&](const board::TraceEntry&) { ++calls; });
+    board::meanwhile("PMX_VsyncInit", 1, [] { board::trace::clear(); });
+    PMX_VsyncInit();
+    EXPECT_EQ(0u, calls) << "of what is forgotten nothing can be told";
+    PMX_VsyncInit();
+    EXPECT_EQ(1u, calls);
     board::at_every_call({});
     PMX_VsyncInit();
     EXPECT_EQ(0u, board::trace::entries().back().depth);
@@ -307,6 +314,61 @@ TEST_F(Threads, AThreadThatKeepsTheMutex_KeepsTheOthersWaiting)
               board::trace::entries().back().brief());
     x_sema_unlock(mutex);
     EXPECT_TRUE(board::threads::waiting().empty());
+}
+
+TEST_F(Threads, ASecondLockByTheHolder_IsRefusedInAnyThread)
+{
+    const HANDLE_T mutex = new_mutex();
+    board::meanwhile("PMX_VsyncInit", 1,
+                     [=] {
+                         x_sema_lock(mutex, X_SEMA_OPTION_WAIT);
+                         EXPECT_EQ(-1, x_sema_lock(mutex, X_SEMA_OPTION_WAIT));
+                         x_sema_unlock(mutex);
+                     },
+                     { .thread = true });
+    PMX_VsyncInit();
+    EXPECT_EQ(1u, board::misuses());
+    EXPECT_TRUE(board::threads::waiting().empty());
+}
+
+TEST_F(Threads, EachGoesOnWithWhatItWaitsFor)
+{
+    const HANDLE_T first = new_mutex();
+    const HANDLE_T second = new_mutex();
+    Lines order;
+    for (const HANDLE_T mutex : { first, second })
+        board::meanwhile("PMX_VsyncInit", 1,
+                         [&order, mutex] {
+                             x_sema_lock(mutex, X_SEMA_OPTION_WAIT);
+                             order.push_back(std::to_string(mutex));
+                             x_sema_unlock(mutex);
+                         },
+                         { .thread = true });
+    x_sema_lock(first, X_SEMA_OPTION_WAIT);
+    x_sema_lock(second, X_SEMA_OPTION_WAIT);
+    PMX_VsyncInit();
+    x_sema_unlock(second);
+    EXPECT_EQ((Lines{ "2" }), order);
+    x_sema_unlock(first);
+    EXPECT_EQ((Lines{ "2", "1" }), order);
+}
+
+TEST_F(Threads, WhileTheyAreEnded_NobodyWaitsAgain)
+{
+    const HANDLE_T first = new_mutex();
+    const HANDLE_T second = new_mutex();
+    std::vector<INT32> answers;
+    board::meanwhile("PMX_VsyncInit", 1,
+                     [&] {
+                         for (const HANDLE_T mutex : { first, second })
+                             answers.push_back(x_sema_lock(mutex, X_SEMA_OPTION_WAIT));
+                     },
+                     { .thread = true });
+    x_sema_lock(first, X_SEMA_OPTION_WAIT);
+    x_sema_lock(second, X_SEMA_OPTION_WAIT);
+    PMX_VsyncInit();
+    board::threads::end_all();
+    EXPECT_EQ((std::vector<INT32>{ -1, -1 }), answers);
 }
 
 TEST_F(Threads, Semaphore_IsWaitedForToo)

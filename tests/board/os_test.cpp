@@ -302,6 +302,22 @@ TEST_F(Os, Vsnprintf_Fault_LeavesTheBufferAlone)
     EXPECT_EQ(-2, formatted(buffer, sizeof buffer, "x"));
     EXPECT_STREQ("###", buffer);
     EXPECT_EQ("x_vsnprintf(<unchanged>, 4, \"x\") = -2", last_call());
+    board::faults::set({ "x_vsnprintf", 7, board::Fault::When::Always, 1, {}, {}, { { "szBuffer", "\"abcdef\"" } } });
+    EXPECT_EQ(7, formatted(buffer, sizeof buffer, "x"));
+    EXPECT_STREQ("abc", buffer) << "as much as there is room for";
+    EXPECT_EQ(7, formatted(buffer, 0, "x"));
+    EXPECT_EQ(7, formatted(nullptr, 4, "x"));
+    EXPECT_EQ("x_vsnprintf(null, 4, \"x\") = 7", last_call());
+}
+
+TEST_F(Os, Vsnprintf_OfAFormatThatIsWrong_IsReported)
+{
+    CHAR buffer[8] = "";
+    int count = 0;
+    EXPECT_EQ(6, formatted(buffer, sizeof buffer, "a%nb", &count));
+    EXPECT_STREQ("a<%n>b", buffer);
+    EXPECT_EQ("a console text has the conversion %n", misuse());
+    EXPECT_EQ(0, count);
 }
 
 TEST_F(Os, State_AsNew)

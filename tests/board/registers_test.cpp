@@ -147,7 +147,14 @@ TEST_F(Registers, Pll_PulsesThatArePending)
     EXPECT_EQ("1", now("pll.reset_pulse_pending"));
     EXPECT_EQ("\"50/24 Hz family\"", now("pll.family")) << "the load bit is no part of the word";
     EXPECT_EQ("0", now("pll.load_pulses"));
+    x_reg_write32(synthesiser, 0x12345679);
+    x_reg_write32(control_a, 0x6);
+    EXPECT_EQ("0", now("pll.load_pulses")) << "they last until they are taken back";
+    EXPECT_EQ("0", now("pll.reset_pulses"));
     x_reg_write32(synthesiser, 0x12345678);
+    x_reg_write32(control_a, 0x2);
+    EXPECT_EQ("1", now("pll.load_pulses"));
+    EXPECT_EQ("1", now("pll.reset_pulses"));
     EXPECT_EQ("null", now("pll.family"));
 }
 

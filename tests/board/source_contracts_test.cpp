@@ -1,4 +1,7 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
+#include <utility>
+
+#include "board/threads.h"
 #include "drv_if.h"
 #include "drv_if_vdp.h"
 #include "sources_test.h"
@@ -35,6 +38,8 @@ TEST_F(SourceContracts, SetColorMode_WithoutTheMutex_IsMisuse)
     table->pu4SetColorMode(tag, DRV_PMX_CS_YCBCR_709);
     x_sema_unlock(MutexPMX);
     EXPECT_EQ(1u, board::misuses()) << "with it, it is right";
+    table->pu4SetColorMode(tag, DRV_PMX_CS_YCBCR_601);
+    EXPECT_EQ(2u, board::misuses()) << "it was given back";
 }
 
 TEST_F(SourceContracts, SetColorMode_AfterARefusedLock_IsTheMixersDesign)
@@ -134,6 +139,19 @@ TEST_F(SourceContracts, ConnectsBack_TheDeadlockIsReportedAndDoesNotHang)
     board::sources::resize(source("osd0"), { 1280, 720 });
     EXPECT_EQ(3u, board::misuses()) << "and everything is well again";
     EXPECT_EQ("DRV_PMX_CS_YCBCR_709", now("vdp1.colour_space"));
+}
+
+TEST_F(SourceContracts, WhileAPlaneIsTold_AnotherThreadWaitsForTheMutex)
+{
+    board::sources::connect(source("vdp0"));
+    board::trace::set_sink([done = false](const board::TraceEntry& entry) mutable {
+        if (!std::exchange(done, done || entry.text.starts_with("vdp0 is told")) && done)
+            board::threads::run("neighbour", [] { board::sources::connect(source("osd5")); });
+    });
+    board::sources::start_graphics(0, { 720, 576 }, DRV_GFX_COLOR_MODE_YCBCR);
+    board::trace::set_sink({});
+    EXPECT_EQ(0u, board::misuses());
+    EXPECT_EQ("1", now("osd5.connected"));
 }
 
 TEST_F(SourceContracts, WhileAPlaneIsTold_NobodyMayChangeThePortsOrTheColourSpace)

@@ -109,6 +109,18 @@ TEST_F(Sources, Disconnect_WithdrawsTheTable)
     EXPECT_EQ((Lines{ "NOTICE source \"vdp1 disconnects\"" }), story({ "i4ImUnregisterInterface2" }));
 }
 
+TEST_F(Sources, Disconnect_ATableThatCannotBeWithdrawn_StaysPublished)
+{
+    board::sources::connect(source("vdp1"));
+    answer_always("i4ImUnregisterInterface2", -1);
+    board::sources::disconnect(source("vdp1"));
+    EXPECT_EQ("0", now("vdp1.connected"));
+    EXPECT_EQ("1", now("vdp1.published"));
+    board::faults::clear_all();
+    board::sources::disconnect(source("vdp1"));
+    EXPECT_EQ("0", now("vdp1.published"));
+}
+
 TEST_F(Sources, Start_ConnectsFirst_AndEnablesTheHardware)
 {
     EXPECT_EQ(1u, board::sources::start_video(1, { 1920, 1080 }, 16));

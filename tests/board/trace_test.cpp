@@ -153,13 +153,15 @@ TEST_F(Trace, Json_OfEachKind)
 TEST_F(Trace, Matches_Calls)
 {
     VDP_GetHwEnable(0);
-    for (const char* line : { "VDP_GetHwEnable(0) = VDP_ENABLED", "VDP_GetHwEnable(0x0)=2", "VDP_GetHwEnable(*)",
-                              " VDP_GetHwEnable ( 0 ) ", "VDP_GetHwEnable(ucVdpId=0)",
-                              "VDP_GetHwEnable(ucVdpId = *) = *", "VDP_GetHwEnable(...)", "VDP_GetHwEnable(FALSE)" })
+    for (const char* line :
+         { "VDP_GetHwEnable(0) = VDP_ENABLED", "VDP_GetHwEnable(0x0)=2", "VDP_GetHwEnable(*)",
+           " VDP_GetHwEnable ( 0 ) ", "VDP_GetHwEnable(ucVdpId=0)", "VDP_GetHwEnable(ucVdpId = *) = *",
+           "VDP_GetHwEnable(...)", "VDP_GetHwEnable(…)", "VDP_GetHwEnable(FALSE)" })
         EXPECT_TRUE(last().matches(line)) << line;
-    for (const char* line : { "VDP_GetHwEnable(1)", "VDP_GetHwEnable()", "VDP_GetHwEnable(0, 0)",
-                              "VDP_GetHwEnable(0) = VDP_HIDDEN", "VDP_GetHwEnabl(0)", "VDP_GetHwEnable(ucId=0)",
-                              "Printf \"0\"", "LOG2 \"\"", "NOTICE misuse \"\"", "vPmxMixPlane(0, 0)" })
+    for (const char* line :
+         { "VDP_GetHwEnable(1)", "VDP_GetHwEnable()", "VDP_GetHwEnable(0, 0)", "VDP_GetHwEnable(0) = VDP_HIDDEN",
+           "VDP_GetHwEnabl(0)", "VDP_GetHwEnable(ucId=0)", "Printf \"0\"", "Printf *", "LOG2 \"\"", "LOG(0)",
+           "NOTICE misuse \"\"", "vPmxMixPlane(0, 0)" })
         EXPECT_FALSE(last().matches(line)) << line;
     vPmxMixPlane(0, 1);
     EXPECT_TRUE(last().matches("vPmxMixPlane(0, DRV_PMX_PLANE_2)"));
@@ -262,6 +264,7 @@ TEST_F(Trace, Matches_RefusesWhatIsNotWellFormed_WhateverTheEntry)
     {
         EXPECT_STREQ("behind a call's arguments only = RESULT may stand: VDP_GetHwEnable(0) 2", error.what());
     }
+    EXPECT_THROW((void)board::trace::read_store_line("PUT ucMode 1 → 2"), std::invalid_argument);
 }
 
 TEST_F(Trace, Sink_GetsEveryFinishedEntry_NestedOnesFirst)
@@ -448,18 +451,23 @@ TEST_F(Stores, Matches)
     EXPECT_FALSE(last().matches("SET ucMode * → *"));
 }
 
-TEST_F(Trace, Objects_AreRecordedByName)
+TEST_F(Trace, Objects_AreRecordedByTheNameThatTheyWereGiven)
 {
     static const int unnamed = 0;
     int on_the_stack = 0;
+    EXPECT_EQ("<object>", board::trace_arguments::object_value(&on_the_stack).to_text());
+    EXPECT_EQ("null", board::trace_arguments::object_value(nullptr).to_text());
+    board::trace::name_object(&unnamed, "a table");
+    i4ImRegisterInterface2(1, 2, 3, &unnamed, nullptr);
+    EXPECT_EQ("a table", last().arguments[3].value.to_text());
+}
+
+TEST_F(Trace, Objects_AreRecordedByName)
+{
     const auto name_of = [](const void* object) {
         i4ImRegisterInterface2(1, 2, 3, object, nullptr);
         return last().arguments[3].value.to_text();
     };
-    EXPECT_EQ("<object>", name_of(&on_the_stack));
-    EXPECT_EQ("null", board::trace_arguments::object_value(nullptr).to_text());
-    board::trace::name_object(&unnamed, "a table");
-    EXPECT_EQ("a table", name_of(&unnamed));
     EXPECT_EQ("_rPMXIF", name_of(&_rPMXIF)) << "found in the symbol table";
     register_pm_ops(&pmx_pm_ops);
     EXPECT_EQ("register_pm_ops(pmx_pm_ops) = 0", last().brief());
@@ -475,7 +483,8 @@ INT32 test_call(UINT8* pu1Out, const UINT8* pu1In, CHAR* szText, PMX_SET_TV_SYS_
 {
     const INT32 before = 3;
     BOARD_CALL_ACTING(test_call, array(pu1Out, 2), array(pu1In, 2), text(szText, 4), record(prOut), record(prIn),
-                      input(&before, 1), value("eNamed", Value::text("any")), static_cast<UINT8>(fails));
+                      input(&before, 1), value("eNamed", Value::text("any")),
+                      value("u4Word", Value::number(0x10, {}, Value::Base::Hex)), static_cast<UINT8>(fails));
     if (fails)
         return boardCall.fail(-1);
     pu1Out[0] = 7;
@@ -498,11 +507,49 @@ TEST_F(Trace, Outputs_AreReadWhenTheCallEnds_InputsWhenItBegins)
               "prIn={u1ScaleMode=0, ucHdmiOutDisplayResolution=RES_480I, ucFmtOutResolution=RES_1080P60HZ, "
               "ucCCIROutResolution=RES_480I, ucHdmiOutMode=DRV_NON_EXT_CHIP, eCcirDrvInfo={eDgoMode=CCIR_INVALID, "
               "eDgoFmt=CCIR_YC422_16BIT, eDgiMode=CCIR_INVALID, eDgiFmt=CCIR_NON_USED}, fgOsdMsg=0, ucCCIROutMode=0, "
-              "fgCCIROutEnable=0, fgHdmiOutEnable=0, u2_Vfreq=0}, before=[3], eNamed=\"any\", fails=0) = 3",
+              "fgCCIROutEnable=0, fgHdmiOutEnable=0, u2_Vfreq=0}, before=[3], eNamed=\"any\", u4Word=0x10, "
+              "fails=0) = 3",
               last().named());
     test_call(out, in, text, &system, nullptr, true);
-    EXPECT_EQ("test_call(<unchanged>, [3, 4], <unchanged>, {u2_Vfreq=50, fgAutoEnable=1}, null, [3], \"any\", 1) = -1",
+    EXPECT_EQ("test_call(<unchanged>, [3, 4], <unchanged>, {u2_Vfreq=50, fgAutoEnable=1}, null, [3], \"any\", 0x10, "
+              "1) = -1",
               last().brief());
+}
+
+/** While they run something else happens. */
+INT32 test_interrupted(void (*pfMeanwhile)(), void** ppvTag, CHAR* szText)
+{
+    BOARD_CALL_ACTING(test_interrupted, ignored(nullptr), tag(ppvTag), text(szText, 4));
+    pfMeanwhile();
+    return boardCall.answer(7);
+}
+void test_print(void (*pfMeanwhile)())
+{
+    BOARD_CALL(test_print, ignored(nullptr));
+    pfMeanwhile();
+    boardCall.log(1, "x", true);
+}
+void test_failure(void (*pfMeanwhile)())
+{
+    BOARD_CALL(test_failure, ignored(nullptr));
+    pfMeanwhile();
+    boardCall.assertion();
+}
+
+TEST_F(Trace, ACallWhoseEntryIsForgotten_EndsAsUsual)
+{
+    const auto nothing = [] {};
+    test_interrupted(nothing, nullptr, nullptr);
+    EXPECT_EQ("test_interrupted(null, null, null) = 7", last().brief());
+    for (void (*const meanwhile)() : { +[] { board::trace::clear(); }, +[] { power_on({}); } })
+    {
+        EXPECT_EQ(7, test_interrupted(meanwhile, nullptr, nullptr));
+        test_print(meanwhile);
+        test_failure(meanwhile);
+        EXPECT_TRUE(board::trace::entries().empty());
+        PMX_VsyncInit();
+        EXPECT_EQ(0u, last().depth);
+    }
 }
 
 TEST_F(Trace, ValidResolutionRecord_ByField)

@@ -7,6 +7,8 @@
 #include <stdexcept>
 #include <string>
 
+#include "board/json.h"
+
 namespace
 {
 
@@ -54,6 +56,33 @@ TEST(Value, Json_OfEachKind)
     EXPECT_EQ("[]", Value::list({}).to_json());
     EXPECT_EQ("{}", Value::record({}).to_json());
     EXPECT_EQ("\"\xEF\xBF\xBD\"", Value::text("\xFF").to_json()) << "bytes that are no UTF-8 are replaced";
+    EXPECT_EQ(R"("\u007f\u0080\u009f)"
+              "\xC2\xA0\"",
+              Value::text("\x7F\xC2\x80\xC2\x9F\xC2\xA0").to_json())
+        << "nothing that a terminal obeys";
+}
+
+TEST(Value, Json_IsRefusedWhereItIsTooMuch)
+{
+    const auto refusal = [](const std::string& text) {
+        try
+        {
+            (void)board::read_json(text);
+        }
+        catch (const board::JsonError& error)
+        {
+            return std::string(error.what());
+        }
+        return std::string("nothing");
+    };
+    std::string many = "[0";
+    for (unsigned i = 0; i < 199'999; ++i)
+        many += ",0";
+    EXPECT_EQ("nothing", refusal(many + "]"));
+    EXPECT_EQ("line 1, column 400001: there are more than 200000 values", refusal(many + ",0]"));
+    EXPECT_EQ("line 2, column 2: a number is too large, or too small", refusal("[\n 1e999]"));
+    EXPECT_EQ("it is no JSON from line 1, column 2 on", refusal("1,2"));
+    EXPECT_EQ("it ends in the middle, at line 1, column 1", refusal(""));
 }
 
 TEST(Value, Find_FollowsNamesAndIndices)
@@ -66,8 +95,9 @@ TEST(Value, Find_FollowsNamesAndIndices)
     EXPECT_EQ(-1, value.find("items[0]")->as_number());
     ASSERT_NE(nullptr, value.find("items[1].held"));
     EXPECT_EQ(1, value.find("items[1].held")->as_number());
-    for (const char* path : { "mod", "mode.x", "items[2]", "items[-1]", "items[x]", "items[1", "items[]",
-                              "items[1]held", "items.0", "mode[0]", ".mode", "mode.", "items[1]..held" })
+    for (const char* path :
+         { "mod", "mode.x", "items[2]", "items[-1]", "items[x]", "items[1", "items[]", "items[1]held", "items.0",
+           "mode[0]", ".mode", "mode.", "items[1]..held", "items[0x]", "items[99999999999999999999]" })
         EXPECT_EQ(nullptr, value.find(path)) << path;
 }
 
@@ -118,6 +148,12 @@ TEST(Value, Matches_TextsListsRecordsSymbolsAndNothing)
                               "mode=RES_480P}"))
         << "members in any order";
     EXPECT_FALSE(value.matches("{mode=RES_480P}")) << "every member has to be there";
+    EXPECT_FALSE(value.matches("[RES_480P]"));
+    const Value one = Value::record({ { "a", Value::number(1) } });
+    for (const char* token : { "{a=1}", "{a=1, ...}", "{…}", "{as before}", "{a=1, …, as before}" })
+        EXPECT_TRUE(one.matches(token)) << token;
+    for (const char* token : { "{a=1, a=1}", "{a=2, ...}", "{b=1, …}", "{}" })
+        EXPECT_FALSE(one.matches(token)) << token;
 }
 
 TEST(Value, Matches_RefusesTokensThatAreNotWellFormed)

@@ -4,7 +4,8 @@
  *
  * usage: product FILE EVENT     the program kills itself inside that event, counted from 1; 0: never
  *        product +|- CHANGES     changes the mode so often, with a recorder or without; for counting instructions
- *        product print FILE|-    prints texts with values, with a recorder or without */
+ *        product print FILE|-    prints texts with values, with a recorder or without
+ *        product refused -       asks for recorders that there cannot be, and goes on without */
 #define _DEFAULT_SOURCE
 #include <fcntl.h>
 #include <signal.h>
@@ -121,6 +122,19 @@ static void vPrintLong(void)
     PMX_Printf(0, acFormat, 7, 8, "behind");
 }
 
+/* What few print: numbers of all widths, as many as are handed on, and what libraries do not agree on. */
+static void vPrintOdd(void)
+{
+    const char* volatile szNone = 0; /* or the compiler knows better */
+    const char* volatile szStrange = "%.+{d";
+    PMX_Printf(0, "%hd %zu %X", 3, (size_t)4, 0xABC);
+    PMX_Printf(0, "%.3ld %.9999s %s", 2L, "precise", szNone);
+    PMX_Printf(0, "%.511s", szMany('p', 600));
+    PMX_Printf(0, "%d%d%d%d%d%d%d%d%d%d%d%d%d%d%d%d", 1, 2, 3, 4, 5, 6, 7, 8, 9, 1, 2, 3, 4, 5, 6, 7);
+    PMX_Printf(0, "%.*s", -1, "any");
+    PMX_Printf(0, szStrange, 1);
+}
+
 static int iPrint(const char* szFile)
 {
     if (strcmp(szFile, "-") != 0 && iRecordInto(szFile) != 0)
@@ -136,7 +150,22 @@ static int iPrint(const char* szFile)
     PMX_Printf(-1, pcOfPage(""), "nor this");
     PMX_Printf(32, pcOfPage(""), "nor this");
     vPrintLong();
+    vPrintOdd();
     return 0;
+}
+
+static int iAreRefused(void)
+{
+    static UINT32 au4Memory[PMX_RECORDER_MEMORY(4 * PMX_RECORDER_LEAST_WORDS) / 4 + 1];
+    PMX_RECORDER_SETUP_T rHow = { (UCHAR*)au4Memory + 1, sizeof au4Memory - 4, u4Time, u4Thread, 1000, FALSE };
+    BOOL fgStarted = fgPmxRecorderStart(&rHow);
+    rHow.pvMemory = au4Memory;
+    rHow.u4Size -= 4;
+    fgStarted |= fgPmxRecorderStart(&rHow);
+    PMX_Init();
+    vChangeModes(1);
+    rHow.u4Size += 4;
+    return fgStarted == FALSE && u4Events == 0 && fgPmxRecorderStart(&rHow) != FALSE ? 0 : 1;
 }
 
 int main(int iCount, char** pszWords)
@@ -148,6 +177,8 @@ int main(int iCount, char** pszWords)
         return 2;
     if (strcmp(pszWords[1], "print") == 0)
         return iPrint(pszWords[2]);
+    if (strcmp(pszWords[1], "refused") == 0)
+        return iAreRefused();
     if (pszWords[1][0] == '-' || pszWords[1][0] == '+')
     {
         if (pszWords[1][0] == '+' && fgPmxRecorderStart(&rHow) == FALSE)

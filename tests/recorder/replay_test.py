@@ -245,7 +245,8 @@ class Replay(unittest.TestCase):
         printed = [subprocess.run([PRODUCT, "print", file], check=True, timeout=60, stdout=subprocess.PIPE,
                                   text=True).stdout for file in ("-", self.file)]
         self.assertEqual(["     42 behind a width", "thr, tw    .", "12345678% and    so, %s %d", "12345678 1234.",
-                          300 * "f" + 200 * "v" + ".", 500 * "a" + 11 * "b", "7" + 510 * "c"], printed[0].splitlines())
+                          300 * "f" + 200 * "v" + ".", 500 * "a" + 11 * "b", "7" + 510 * "c", "3 4 ABC",
+                          "002 precise (null)", 511 * "p", "1234567891234567", "any"], printed[0].splitlines()[:-1])
         self.assertEqual(printed[0], printed[1])
         ended = self.run_tool("replay", self.file)
         self.assertEqual(0, ended.returncode, ended.stdout + ended.stderr)
@@ -256,9 +257,11 @@ class Replay(unittest.TestCase):
         printed = [one["text"] for one in told if one.get("function") == "PMX_Printf" and one["kind"] == "operation"]
         self.assertEqual([f'PMX_Printf({level}, ""...)' for level in (2, -1, 32)], printed[4:7])
         kept = [re.findall(r'"([^"]*)"(\.\.\.)?', text) for text in printed[7:]]
+        self.assertEqual([("%.3ld %.9999s %s", ""), ("precise", "")], kept[4])
+        self.assertEqual([("%.511s", ""), (511 * "p", "")], kept[5])
         self.assertEqual([[(300 * "f" + "%s.", ""), (200 * "v", "")],
                           [("%s%s", ""), (500 * "a", ""), (388 * "b", "...")],
-                          [("%d" + 509 * "c", "...")]], kept)
+                          [("%d" + 509 * "c", "...")]], kept[:3])
         ended = self.run_tool("replay", "--to-scenario", self.file)
         self.assertEqual(1, ended.returncode)
         self.assertIn("# missing: all of the text, or the values that go with it, of PMX_Printf", ended.stdout)
@@ -375,8 +378,9 @@ class Replay(unittest.TestCase):
                 (OPERATION, 255, 3, "no such operation"), (OPERATION, 0, 2, "it is too short"),
                 (CALL, 255, 3, "no such function"), (CALL, 0, 2, "it is too short"), (RETURN, 0, 3, "it is too short"),
                 (CHANGE, 0, 3, "it is no state"), (SNAPSHOT, 0, 3, "it is no state"),
-                (9, 0, 3, "no such kind of event"), (CHANGE, 0, 1, "it has an impossible length")):
-            event = [function << 16 | kind << 8 | words, *(words - 1) * [0]]
+                (9, 0, 3, "no such kind of event"), (CHANGE, 0, 1, "it has an impossible length"),
+                (CHANGE, 0, 255, "it has an impossible length")):
+            event = [function << 16 | kind << 8 | words, *(min(words, 9) - 1) * [0]]
             ended = self.replay(recording.of(event).bytes())
             self.assertEqual((2, ""), (ended.returncode, ended.stdout), told)
             self.assertIn(f": event 2 is damaged: {told}\n", ended.stderr)
@@ -385,13 +389,80 @@ class Replay(unittest.TestCase):
         recording = self.record("PMX_Init\n")
         numbers = [function.name for function in interface.operations()]
         shown = []
-        for name, *words in (("PMX_SetModeEx",), ("PMX_SetModeEx", 0, 0xFFFFFFFF), ("PMX_Printf", 0, 0x80000009)):
+        for name, *words in (("PMX_SetModeEx",), ("PMX_SetModeEx", 0, 0xFFFFFFFF), ("PMX_Printf", 0),
+                             ("PMX_Printf", 0, 0x80000009)):
             event = [numbers.index(name) << 16 | OPERATION << 8 | 3 + len(words), 0, 0, *words]
             self.file.write_bytes(recording.of(event).bytes())
             shown.append(self.run_tool("replay", "--show", self.file).stdout.splitlines()[-1].split("\t")[-1])
             self.assertIn(self.run_tool("replay", self.file).returncode, (0, 1))
-        self.assertEqual(["PMX_SetModeEx(0, null, 0, DRV_NON_EXT_CHIP, 0)", "PMX_SetModeEx(0, [], 0, DRV_NON_EXT_CHIP, 0)",
-                          'PMX_Printf(0, "")'], shown)
+        self.assertEqual(["PMX_SetModeEx(0, null, 0, DRV_NON_EXT_CHIP, 0)",
+                          "PMX_SetModeEx(0, [], 0, DRV_NON_EXT_CHIP, 0)", "PMX_Printf(0, null)", 'PMX_Printf(0, "")'],
+                         shown)
+
+    def test_pointers_are_shown_by_what_is_known_of_them(self):
+        recording = self.record("PMX_Init\nsource vdp0 connect\nPMX_InformVdpColorSpace 0\nPMX_Printf 0 \"\"\n")
+        self.assertEqual(0, self.replay(recording.bytes()).returncode)
+        shown = self.run_tool("replay", "--show", self.file).stdout
+        for text in ("register_pm_ops(pmx_pm_ops)", "IID_IVdp, <place>, <place>)", 'PMX_Printf(0, ""...)'):
+            self.assertIn(text, shown)
+        symbol, (_, query) = recording.begin("register_pm_ops")[1][0], recording.begin("i4ImQueryInterface")
+        for word, text in ((0, "null"), (9, "<elsewhere>")):
+            recording.words[symbol + 3] = word
+            recording.words[query[0] + 6] = word
+            self.file.write_bytes(recording.bytes())
+            shown = self.run_tool("replay", "--show", self.file).stdout
+            self.assertIn(f"register_pm_ops({text})", shown)
+            self.assertIn(f"IID_IVdp, {'<place>' if word else 'null'}, <place>)", shown)
+
+    def test_an_end_without_a_beginning(self):
+        recording = self.record("PMX_Init\n")
+        self.file.write_bytes(recording.of([RETURN << 8 | 4, 0, 7, 0xFFFFFFF0]).bytes())
+        self.assertTrue(self.run_tool("replay", "--show", self.file).stdout.endswith("\tend of something before\n"))
+        end = self.events()[-1]
+        self.assertEqual(("return", 0), (end["kind"], end["depth"]))
+        self.assertNotIn("answer", end)
+        ended = self.run_tool("replay", self.file)
+        self.assertIn("  recorded: end of something before\n  computed: nothing: no operation runs\n", ended.stdout)
+
+    def test_what_contradicts_itself_departs_there(self):
+        recording = self.record(MODE_CHANGE + "PMX_GetMode 0\n")
+        began = len(recording.event(next(recording.events())[0]))
+        numbers = [function.name for function in interface.operations()]
+        init = [head for head, *_ in (recording.event(event[0]) for event in recording.events()
+                                      if event[1:] == (OPERATION, False, numbers.index("PMX_Init")))][0]
+        place = recording.begin("x_sema_create")[1][0]
+        asked = self.unanswered(recording, place)
+        first = [init, 0, 0]
+        answered = [init | ANSWERED << 8, 0, 0]
+        mode = [numbers.index("PMX_GetMode") << 16 | OPERATION << 8 | 5, 0, 0, 0, 0]
+        for events, recorded, computed, why in (
+                ([first, [RETURN << 8 | 4, 0, 0, began]], "end of PMX_Init", None, "another call"),
+                ([answered], "end of PMX_Init", None, "another call"),
+                ([first, first], "PMX_Init()", None, "another call"),
+                ([mode, asked], None, "end of PMX_GetMode = 0", "the operation ends too early")):
+            ended = self.replay(recording.of(*events).bytes())
+            self.assertEqual(1, ended.returncode, ended.stderr)
+            self.assertIn(f": {why}\n", ended.stdout)
+            self.assertIn(f"  recorded: {recorded}\n" if recorded else "  recorded: ", ended.stdout)
+            self.assertIn(f"  computed: {computed}\n" if computed else "  computed: ", ended.stdout)
+
+    def test_a_call_that_does_not_return(self):
+        recording = self.record(MODE_CHANGE)
+        events = list(recording.events())
+        number, (place, *_) = recording.begin("x_sema_create")
+        before = [recording.event(event[0]) for event in events[1:number]]
+        asked = self.unanswered(recording, place)
+        for next_one in (asked, [RETURN << 8 | 4, 0, 0, 0xFFFFFFF0]):
+            ended = self.replay(recording.of(*before, asked, next_one).bytes())
+            self.assertEqual(1, ended.returncode, ended.stderr)
+            self.assertIn(f"departs at event {number + 2} of {number + 2}", ended.stdout)
+            self.assertIn("computed: nothing: x_sema_create has not returned\n", ended.stdout)
+        longer = [recording.words[place] + 1, *recording.event(place)[1:], 0]
+        ended = self.replay(recording.of(*before, longer).bytes())
+        self.assertIn("PMX_Init: other arguments\n", ended.stdout)
+
+    def test_a_recorder_that_there_cannot_be_is_refused(self):
+        self.assertEqual(0, subprocess.run([PRODUCT, "refused", "-"], check=False, timeout=60).returncode)
 
     def test_another_record_departs_there(self):
         recording = self.record("PMX_Init\n")

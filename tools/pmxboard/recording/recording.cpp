@@ -131,8 +131,7 @@ public:
                 throw;
             m_recording.damaged = error.what();
         }
-        hold(!m_recording.events.empty() && m_recording.events.front().kind == PMX_RECORDER_SNAPSHOT,
-             "the recording has no snapshot where it says");
+        hold(m_recording.events.front().kind == PMX_RECORDER_SNAPSHOT, "the recording has no snapshot where it says");
     }
 
 private:

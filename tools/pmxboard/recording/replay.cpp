@@ -208,11 +208,12 @@ const Event& Performance::take()
     return taken;
 }
 
+/** What belongs to no thread has happened by now. */
 bool Performance::is_my_turn() const
 {
     if (m_next == m_events.size())
         return false;
-    return !m_runs_alone && m_events[m_next].thread == my_thread && happens_in_a_thread(m_events[m_next]);
+    return !m_runs_alone && m_events[m_next].thread == my_thread;
 }
 
 /** False when there is nothing left to do. */

@@ -44,7 +44,6 @@ public:
     Bytes bytes();
     /** What goes with a format; texts stay as long as this. */
     std::vector<long> values(const char* format);
-    std::size_t used() const { return m_at; }
 
 private:
     std::span<const UINT32> m_words;

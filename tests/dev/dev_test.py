@@ -366,6 +366,12 @@ class Usage(TreeTest):
         self.assertEqual(["cmake --build --preset arm-linux --target pmx_objects"],
                          self.calls("cmake --build --preset arm-linux"))
 
+    def test_a_long_life_needs_its_programs_and_no_more(self):
+        made = f"{self.tree}/build/release/soak {self.tree}/build/arm-linux/soak_emulated"
+        self.expect(0, f"soak {made} 1000\n", "soak", "1000")
+        built = [f"cmake --build --preset {preset} --target soak" for preset in ("release", "arm-linux")]
+        self.assertEqual(built, self.calls("cmake --build"))
+
     def test_a_repository_of_the_surroundings_is_not_ours(self):
         self.dev("test", GIT_DIR="/elsewhere/.git")
         self.assertEqual(["repository none"], self.calls("repository"))

@@ -53,6 +53,7 @@ class Packages(TreeTest):
                                   (("kernel", "--cost"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu"),
                                   (("kernel", "--debug"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu flex"),
                                   (("kernel", "--all"), "python3 cmake libx-dev g++ g++-linux gcc-bare qemu flex"),
+                                  (("soak",), "python3 cmake libx-dev g++ g++-linux"),
                                   (("prove",), "python3 gcc-bare clang"),
                                   (("mutate",), "python3 cmake libx-dev g++ g++-linux clang gcc-bare gcovr clang-19"),
                                   (("docs",), ""),

@@ -95,7 +95,7 @@ class TreeTest(unittest.TestCase):
         (tree / "CMakePresets.json").write_text("{}\n", encoding="utf-8")
         for name in KERNEL_PROGRAMS:
             self.make_program(tree / f"tests/kernel/{name}.py", name.replace("run", "kernel"))
-        for name in ("prove", "mutate"):
+        for name in ("prove", "mutate", "soak"):
             self.make_program(tree / f"tests/{name}/{name}.py", name)
         return tree
 

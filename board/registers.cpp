@@ -63,8 +63,8 @@ UINT32 word_at(UINT32 address)
 
 bool is_step(const Step& step, UINT32 address, UINT32 before, UINT32 value)
 {
-    using namespace std::chrono_literals;
-    if (address != step.address || (step.settled && board::now() - registers_state.last_step < 1ms))
+    if (address != step.address ||
+        (step.settled && board::now() - registers_state.last_step < std::chrono::milliseconds(1)))
         return false;
     switch (step.change)
     {

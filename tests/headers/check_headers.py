@@ -6,6 +6,7 @@ a kernel of today, and one that takes <stdarg.h> from the compiler.
 """
 
 import argparse
+import functools
 import itertools
 import pathlib
 import subprocess
@@ -45,13 +46,16 @@ def variants(compilers, kernel_directory):
 
 
 def texts(headers):
-    """(what it is called, text) for every file that is compiled."""
+    """(what it is called, text, what else to call it and the text that shows that it is the other) for every file that
+    is compiled. What a header lacks is missed twice as well, so that it is compiled alone only to tell what is wrong.
+    """
     for header in headers:
         include = f'#include "{header.name}"\n'
-        yield header.name, include + "extern int iNotEmpty;\n"
-        yield f"{header.name} twice", include * 2 + "extern int iNotEmpty;\n"
-    for order, together in (("all together", headers), ("all together, backwards", headers[::-1])):
-        yield order, "".join(f'#include "{header.name}"\n' for header in together)
+        yield (f"{header.name} twice", include * 2 + "extern int iNotEmpty;\n",
+               header.name, include + "extern int iNotEmpty;\n")
+    if len(headers) > 1:
+        for order, together in (("all together", headers), ("all together, backwards", headers[::-1])):
+            yield order, "".join(f'#include "{header.name}"\n' for header in together), None, None
 
 
 def compile_text(command, text, includes):
@@ -60,10 +64,24 @@ def compile_text(command, text, includes):
     return result.returncode, result.stderr
 
 
+def complaint(includes, job):
+    """(name, command, message) of what the compiler refuses, or nothing."""
+    command, (name, text, other_name, other_text) = job
+    code, message = compile_text(command, text, includes)
+    if code == 0:
+        return None
+    if other_text:
+        other_code, other_message = compile_text(command, other_text, includes)
+        if other_code != 0:
+            name, message = other_name, other_message
+    return name, command, message
+
+
 def main():
     parser = argparse.ArgumentParser(description="Compile every header alone.")
     for option in ("--gcc", "--gxx", "--clang", "--clangxx"):
         parser.add_argument(option, required=True)
+    parser.add_argument("--only", default="", metavar="WORDS", help="of the commands those with these words in them")
     parser.add_argument("directories", nargs="+", type=pathlib.Path)
     arguments = parser.parse_args()
 
@@ -78,12 +96,12 @@ def main():
             path.parent.mkdir(parents=True, exist_ok=True)
             path.write_text(text)
 
-        jobs = list(itertools.product(variants(arguments, scratch), texts(headers)))
+        commands = [command for command in variants(arguments, scratch) if arguments.only in " ".join(command)]
+        jobs = list(itertools.product(commands, texts(headers)))
         with ThreadPoolExecutor(max_workers=2) as pool:
-            results = pool.map(lambda job: compile_text(job[0], job[1][1], includes), jobs)
-            failures = [(job, message) for job, (code, message) in zip(jobs, results) if code != 0]
+            failures = [failure for failure in pool.map(functools.partial(complaint, includes), jobs) if failure]
 
-    for (command, (name, _)), message in failures:
+    for name, command, message in failures:
         print(f"{name}: {' '.join(command)}\n{message}")
     print(f"{len(headers)} headers, {len(jobs)} compilations, {len(failures)} failures")
     return 1 if failures else 0

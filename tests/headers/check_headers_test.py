@@ -28,15 +28,15 @@ int iNumber(NUMBER_T eNumber, size_t zSize);
 
 
 class CheckHeaders(unittest.TestCase):
-    def check(self, **headers):
+    def check(self, only="", **headers):
         with tempfile.TemporaryDirectory() as directory:
             for name, text in headers.items():
                 pathlib.Path(directory, name + ".h").write_text(text)
-            return subprocess.run([sys.executable, CHECKER, *COMPILERS, directory], capture_output=True, text=True,
-                                  check=False)
+            return subprocess.run([sys.executable, CHECKER, *COMPILERS, f"--only={only}", directory],
+                                  capture_output=True, text=True, check=False)
 
     def refused(self, text, variant, **headers):
-        result = self.check(**headers)
+        result = self.check(variant, **headers)
         self.assertEqual(1, result.returncode, result.stdout + result.stderr)
         self.assertIn(text, result.stdout)
         self.assertIn(variant, result.stdout)

@@ -7,10 +7,13 @@ usage: check_linear.py PMXBOARD
 """
 
 import pathlib
-import re
-import subprocess
 import sys
 import tempfile
+
+sys.dont_write_bytecode = True
+sys.path.append(str(pathlib.Path(__file__).resolve().parents[1] / "common"))
+
+import instructions as counted  # noqa: E402
 
 CAPTURED = pathlib.Path(__file__).with_name("player.log").read_bytes()
 FEW = 50_000  # bytes
@@ -31,11 +34,7 @@ KINDS = {
 def instructions(pmxboard, directory, content):
     log = directory / "log"
     log.write_bytes(content)
-    run = subprocess.run(["valgrind", "--tool=callgrind", f"--callgrind-out-file={directory / 'out'}", pmxboard,
-                          "decode", log], capture_output=True, text=True, check=False)
-    if run.returncode != 0:
-        sys.exit(run.stderr)
-    return int(re.search(r"Collected : (\d+)", run.stderr)[1])
+    return counted.of(pmxboard, "decode", log)
 
 
 def complaints(kind, content, few, many):

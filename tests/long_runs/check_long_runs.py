@@ -7,10 +7,14 @@ usage: check_long_runs.py PMXBOARD
 """
 
 import pathlib
-import re
 import subprocess
 import sys
 import tempfile
+
+sys.dont_write_bytecode = True
+sys.path.append(str(pathlib.Path(__file__).resolve().parents[1] / "common"))
+
+import instructions as counted  # noqa: E402
 
 MOST_INSTRUCTIONS = 2.1  # of twice the commands, in those of the commands
 MOST_MEMORY = 8 * 1024   # of a hundred times the commands, in KiB more than of the commands
@@ -32,9 +36,7 @@ def run(*command):
 
 
 def instructions(pmxboard, directory, commands):
-    text = run("valgrind", "--tool=callgrind", f"--callgrind-out-file={directory / 'out'}", pmxboard, "run", "--quiet",
-               scenario(directory, commands))
-    return int(re.search(r"Collected : (\d+)", text)[1])
+    return counted.of(pmxboard, "run", "--quiet", scenario(directory, commands))
 
 
 def memory(pmxboard, directory, commands):

@@ -2,7 +2,10 @@
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Pictures in a terminal: it is asked what it can show, and what it gets is what a PNG of the same has.
 
-usage: graphics_test.py PMXBOARD
+usage: graphics_test.py CHECKED OPTIMISED
+
+CHECKED and OPTIMISED are the tool with sanitizers and as it is shipped: pictures take the first one tens of times as
+long, and it shows one of each kind.
 
 Where the machine gives out no terminals the tests are skipped, exit code 77.
 """
@@ -21,7 +24,7 @@ import zlib
 
 from terminal import CTRL_D, ENTER, PROMPT, Terminal, program_of
 
-PROGRAM = ""
+CHECKED = OPTIMISED = ""
 KITTY_QUESTION = "\x1b_Gi=31,s=1,v=1,a=q,t=d,f=24;AAAA\x1b\\"
 ATTRIBUTES_QUESTION = "\x1b[c"
 # As terminals of each kind answer.
@@ -52,15 +55,32 @@ def read_png(data):
 
 
 def unfiltered(kind, line, above):
+    if kind == 0:
+        return line
+    predicted = (None, first, second, average, nearest)[kind]
     row = bytearray(line)
     for i, value in enumerate(line):
         left, up, corner = (row[i - 3], above[i], above[i - 3]) if i >= 3 else (0, above[i], 0)
-        row[i] = (value + (0, left, up, (left + up) // 2, nearest(left, up, corner))[kind]) & 255
+        row[i] = (value + predicted(left, up, corner)) & 255
     return bytes(row)
+
+
+def first(left, _up, _corner):
+    return left
+
+
+def second(_left, up, _corner):
+    return up
+
+
+def average(left, up, _corner):
+    return (left + up) // 2
 
 
 def nearest(left, up, corner):
     """What PNG calls the Paeth predictor."""
+    if left == up == corner:
+        return left
     return min((left, up, corner), key=lambda each: abs(left + up - corner - each))
 
 
@@ -110,14 +130,15 @@ def sixel_pictures(text):
     return [read_sixels(found) for found in re.findall(r"\x1bP[\d;]*q([^\x1b]*)\x1b\\", text)]
 
 
-class Graphics(unittest.TestCase):
+class PictureTest(unittest.TestCase):
     def setUp(self):
+        self.program = OPTIMISED
         directory = tempfile.TemporaryDirectory()
         self.addCleanup(directory.cleanup)
         self.home = pathlib.Path(directory.name)
 
     def start(self, *arguments, **environment):
-        shell = Terminal(PROGRAM, self.home, *arguments, **({"NO_COLOR": None} | environment))
+        shell = Terminal(self.program, self.home, *arguments, **({"NO_COLOR": None} | environment))
         shell.wait_for(PROMPT)
         for line in SCENE:
             shell.command(line)
@@ -154,6 +175,24 @@ class Graphics(unittest.TestCase):
                     apart = abs(sum(found[columns]) - sum(sought[columns]))
                     self.assertLessEqual(apart, 10 * side * side, f"at {left // 3},{top}")
 
+
+class UnderSanitizers(PictureTest):
+    def setUp(self):
+        super().setUp()
+        self.program = CHECKED
+
+    def test_each_kind_of_picture(self):
+        for answer, kind in ((KITTY_ANSWER + PLAIN, "kitty"), (WITH_SIXEL, "sixel"), (PLAIN, "blocks")):
+            shell = self.start(columns=80, pixels=80 * 2)
+            shown, png = self.shot(shell, answer), self.png(shell, "128x72")
+            self.assertEqual([png] if kind == "kitty" else [], kitty_pictures(shown))
+            self.assertEqual(kind == "blocks", BLOCK in shown)
+            if kind == "sixel":
+                self.assert_sixels(shown, png)
+            self.leave(shell)
+
+
+class Graphics(PictureTest):
     def test_a_terminal_that_takes_pictures_as_kitty_does(self):
         for answer in (PLAIN, WITH_SIXEL):
             shell = self.start()
@@ -265,7 +304,7 @@ class Graphics(unittest.TestCase):
         scenario = self.home / "scene.pmx"
         scenario.write_text("\n".join((*SCENE, "shot hdmi\n")), encoding="utf-8")
         for variables, is_kitty in (({}, False), ({"KITTY_WINDOW_ID": "1"}, True)):
-            run = Terminal(PROGRAM, self.home, str(scenario), command="run", NO_COLOR=None, **variables)
+            run = Terminal(self.program, self.home, str(scenario), command="run", NO_COLOR=None, **variables)
             self.assertEqual(0, run.end(), run.seen[-2000:])
             self.assertNotIn(ATTRIBUTES_QUESTION, run.seen)
             self.assertEqual(is_kitty, BLOCK not in run.seen)
@@ -274,7 +313,7 @@ class Graphics(unittest.TestCase):
     def test_a_pipe_gets_what_is_asked_for(self):
         def shown(*arguments, code=0, **variables):
             environment = os.environ | {"TERM": "xterm-kitty", "KITTY_WINDOW_ID": "1"} | variables
-            ended = subprocess.run([PROGRAM, "run", *arguments, "-"], input="\n".join((*SCENE, "shot hdmi\n")),
+            ended = subprocess.run([self.program, "run", *arguments, "-"], input="\n".join((*SCENE, "shot hdmi\n")),
                                    capture_output=True, text=True, check=False, env=environment)
             self.assertEqual(code, ended.returncode, ended.stderr)
             return ended.stdout + ended.stderr
@@ -292,8 +331,8 @@ class Graphics(unittest.TestCase):
 
 
 def main():
-    global PROGRAM
-    PROGRAM = program_of(sys.argv, __doc__)
+    global CHECKED, OPTIMISED
+    CHECKED, OPTIMISED = (program_of(sys.argv, __doc__) for _ in range(2))
     unittest.main()
 
 

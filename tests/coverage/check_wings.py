@@ -53,7 +53,7 @@ def commands(arguments):
         yield [str(program), "--gtest_brief=1", ELSEWHERE]
     for scenario in sorted((ROOT / "scenarios").glob("*.pmx")):
         yield [tool, "run", "--quiet", str(scenario)]
-    yield [sys.executable, "tests/recorder/replay_test.py", tool, *map(str, arguments.recorder)]
+    yield [sys.executable, "tests/recorder/replay_test.py", tool, tool, *map(str, arguments.recorder)]
     yield [sys.executable, "tests/decode/to_scenario.py", tool]
 
 

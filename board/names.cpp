@@ -2,33 +2,65 @@
 #include "board/names.h"
 
 #include <algorithm>
+#include <array>
 #include <tuple>
+#include <unordered_map>
 
 #include "board/name_table.h"
 
 namespace board::names
 {
 
+namespace
+{
+
+/** The rows of one family: every number that is traced is looked up among them. */
+struct Rows
+{
+    const Row* first = nullptr;
+    const Row* end = nullptr;
+};
+
+Rows rows_of(Family family)
+{
+    static const auto all = [] {
+        std::array<Rows, static_cast<std::size_t>(Family::ClosedCaption) + 1> found;
+        for (const Row& row : rows())
+        {
+            Rows& of_family = found.at(static_cast<std::size_t>(row.family));
+            of_family.first = of_family.first == nullptr ? &row : of_family.first;
+            of_family.end = &row + 1;
+        }
+        return found;
+    }();
+    return all[static_cast<std::size_t>(family)];
+}
+
+} // namespace
+
 std::string_view name_of(Family family, std::int64_t number)
 {
     if (family == Family::None)
         return {};
-    for (const Row& row : rows())
+    const Rows of_family = rows_of(family);
+    for (const Row* row = of_family.first; row != of_family.end; ++row)
     {
-        if (row.family == family && row.number == number)
-            return row.name;
+        if (row->number == number)
+            return row->name;
     }
     return {};
 }
 
 std::optional<std::int64_t> number_of(std::string_view name)
 {
-    for (const Row& row : rows())
-    {
-        if (row.name == name)
-            return row.number;
-    }
-    return std::nullopt;
+    static const auto numbers = [] {
+        std::unordered_map<std::string_view, std::int64_t> found;
+        for (const Row& row : rows())
+            found.emplace(row.name, row.number);
+        return found;
+    }();
+    const auto found = numbers.find(name);
+    return found != numbers.end() ? std::optional(found->second) : std::nullopt;
 }
 
 Family family_of(std::string_view owner, std::string_view argument)

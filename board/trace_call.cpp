@@ -28,19 +28,20 @@ Value::Base base_of(std::string_view function, std::string_view argument)
 }
 
 /** A number gets the name and the base of its parameter, a list's numbers get the names alone. */
-Value dressed(const Value& value, const CallSite::Parameter& parameter)
+Value dressed(Value value, names::Family family, Value::Base base)
 {
     if (value.kind() == Value::Kind::Number && value.string().empty())
     {
-        const bool hex = parameter.base == Value::Base::Hex || value.base() == Value::Base::Hex;
-        return Value::number(value.as_number(), names::name_of(parameter.family, value.as_number()),
+        const bool hex = base == Value::Base::Hex || value.base() == Value::Base::Hex;
+        return Value::number(value.as_number(), names::name_of(family, value.as_number()),
                              hex ? Value::Base::Hex : Value::Base::Decimal);
     }
-    if (value.kind() != Value::Kind::List)
+    if (value.kind() != Value::Kind::List || family == names::Family::None)
         return value;
     std::vector<Value> items;
+    items.reserve(value.items().size());
     for (const Value& item : value.items())
-        items.push_back(dressed(item, { parameter.name, parameter.family, item.base() }));
+        items.push_back(dressed(item, family, item.base()));
     return Value::list(std::move(items));
 }
 
@@ -106,10 +107,13 @@ CallRecord::CallRecord(const CallSite& site, std::vector<CallArgument> arguments
     trace::look();
     TraceEntry& entry = add_entry(TraceEntry::Kind::Call, site.function);
     m_sequence = entry.sequence;
+    entry.arguments.reserve(m_arguments.size());
     for (std::size_t i = 0; i < m_arguments.size(); ++i)
     {
+        const CallSite::Parameter& parameter = site.parameters[i];
         if (!m_arguments[i].left_out)
-            entry.arguments.push_back({ site.parameters[i].name, dressed(m_arguments[i].value, site.parameters[i]) });
+            entry.arguments.push_back(
+                { parameter.name, dressed(std::move(m_arguments[i].value), parameter.family, parameter.base) });
     }
     contained([&] { m_fault = faults::due(entry); });
     threads::Context& context = threads::context();
@@ -151,9 +155,10 @@ void CallRecord::write_outputs()
         if (argument.left_out)
             continue;
         const bool unchanged = m_outputs_unchanged && argument.unchanged_by_failure;
+        const CallSite::Parameter& parameter = m_site.parameters[i];
         if (argument.at_end)
             recorded->value =
-                unchanged ? Value::symbol("<unchanged>") : dressed(argument.at_end(), m_site.parameters[i]);
+                unchanged ? Value::symbol("<unchanged>") : dressed(argument.at_end(), parameter.family, parameter.base);
         ++recorded;
     }
 }
@@ -177,7 +182,7 @@ void CallRecord::set_result(std::int64_t result, bool faulted)
     TraceEntry* const entry = m_power_on == recorder().power_on ? entry_of(m_sequence) : nullptr;
     if (entry == nullptr)
         return;
-    entry->result = dressed(Value::number(result), m_site.result);
+    entry->result = dressed(Value::number(result), m_site.result.family, m_site.result.base);
     entry->faulted = faulted;
 }
 

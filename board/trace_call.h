@@ -67,6 +67,7 @@ Value list_value(const T* numbers, std::size_t count, Value::Base base = Value::
     if (numbers == nullptr)
         return Value::null();
     std::vector<Value> items;
+    items.reserve(count);
     for (std::size_t i = 0; i < count; ++i)
         items.push_back(number_value(numbers[i], base));
     return Value::list(std::move(items));
@@ -179,12 +180,12 @@ inline CallArgument ignored(const void* pointer)
 } // namespace trace_arguments
 
 template <typename T>
-CallArgument call_argument(const T& given)
+CallArgument call_argument(T given)
 {
     if constexpr (std::is_same_v<T, CallArgument>)
         return given;
     else if constexpr (std::is_same_v<T, Value>)
-        return { given };
+        return { std::move(given) };
     else if constexpr (trace_arguments::Numeric<T>)
         return { trace_arguments::number_value(given) };
     else
@@ -207,9 +208,12 @@ CallArgument call_argument(const T& given)
 }
 
 template <typename... T>
-std::vector<CallArgument> call_arguments(const T&... given)
+std::vector<CallArgument> call_arguments(T... given)
 {
-    return { call_argument(given)... };
+    std::vector<CallArgument> arguments; // an initializer list would be copied out of
+    arguments.reserve(sizeof...(given));
+    (arguments.push_back(call_argument(std::move(given))), ...);
+    return arguments;
 }
 
 /** What is known of a recording function before it is called: its name, and those of its arguments. */

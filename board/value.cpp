@@ -41,17 +41,70 @@ Value Value::list(std::vector<Value> items)
 {
     Value value;
     value.m_kind = Kind::List;
-    value.m_items = std::move(items);
+    if (!items.empty())
+        value.held_alone().items = std::move(items);
+    return value;
+}
+
+Value::Names::Names(std::vector<std::string> names)
+    : m_names(std::make_shared<std::vector<std::string>>(std::move(names)))
+{
+    std::vector<std::string_view> sorted(m_names->begin(), m_names->end());
+    std::sort(sorted.begin(), sorted.end());
+    const auto twice = std::adjacent_find(sorted.begin(), sorted.end());
+    if (twice != sorted.end())
+        throw std::logic_error("a record has two members of one name: " + std::string(*twice));
+}
+
+Value Value::record(const Names& names, std::vector<Value> items)
+{
+    if (names.m_names->size() != items.size())
+        throw std::logic_error("a record has another number of members than of names");
+    Value value;
+    value.m_kind = Kind::Record;
+    if (!items.empty())
+    {
+        Held& held = value.held_alone();
+        held.items = std::move(items);
+        held.keys = names.m_names;
+    }
     return value;
 }
 
 Value Value::record(std::vector<std::pair<std::string, Value>> members)
 {
-    Value value;
-    value.m_kind = Kind::Record;
+    std::vector<std::string> names;
+    std::vector<Value> items;
+    names.reserve(members.size());
+    items.reserve(members.size());
     for (auto& [key, member] : members)
-        value.add(std::move(key), std::move(member));
-    return value;
+    {
+        names.push_back(std::move(key));
+        items.push_back(std::move(member));
+    }
+    return record(Names(std::move(names)), std::move(items));
+}
+
+const std::vector<Value>& Value::items() const
+{
+    static const std::vector<Value> none;
+    return m_held ? m_held->items : none;
+}
+
+const std::vector<std::string>& Value::keys() const
+{
+    static const std::vector<std::string> none;
+    return m_held && m_held->keys ? *m_held->keys : none;
+}
+
+/** What this value holds, and no other one: to be changed. */
+Value::Held& Value::held_alone()
+{
+    if (!m_held)
+        m_held = std::make_shared<Held>();
+    else if (m_held.use_count() != 1)
+        m_held = std::make_shared<Held>(*m_held);
+    return *m_held;
 }
 
 Value& Value::add(std::string key, Value value)
@@ -60,11 +113,21 @@ Value& Value::add(std::string key, Value value)
         m_kind = Kind::Record;
     if (m_kind != Kind::Record)
         throw std::logic_error("a member was added to a value that is not a record: " + key);
-    if (std::find(m_keys.begin(), m_keys.end(), key) != m_keys.end())
+    if (std::find(keys().begin(), keys().end(), key) != keys().end())
         throw std::logic_error("a record has two members of one name: " + key);
-    m_keys.push_back(std::move(key));
-    m_items.push_back(std::move(value));
+    Held& held = held_alone();
+    if (held.keys.use_count() != 1)
+        held.keys = std::make_shared<std::vector<std::string>>(keys());
+    held.keys->push_back(std::move(key));
+    held.items.push_back(std::move(value));
     return *this;
+}
+
+bool Value::operator==(const Value& other) const
+{
+    return m_kind == other.m_kind && m_base == other.m_base && m_number == other.m_number &&
+           m_string == other.m_string &&
+           (m_held == other.m_held || (keys() == other.keys() && items() == other.items()));
 }
 
 const Value* Value::find(std::string_view path) const
@@ -80,18 +143,18 @@ const Value* Value::find(std::string_view path) const
                 return nullptr;
             const char* const end = path.data() + close;
             const auto [stop, error] = std::from_chars(path.data() + 1, end, index);
-            if (error != std::errc{} || stop != end || index >= value->m_items.size())
+            if (error != std::errc{} || stop != end || index >= value->items().size())
                 return nullptr;
-            value = &value->m_items[index];
+            value = &value->items()[index];
             path.remove_prefix(close + 1);
         }
         else
         {
             const std::string_view key = path.substr(0, path.find_first_of(".["));
-            const auto found = std::find(value->m_keys.begin(), value->m_keys.end(), key);
-            if (value->m_kind != Kind::Record || found == value->m_keys.end())
+            const auto found = std::find(value->keys().begin(), value->keys().end(), key);
+            if (value->m_kind != Kind::Record || found == value->keys().end())
                 return nullptr;
-            value = &value->m_items[static_cast<std::size_t>(found - value->m_keys.begin())];
+            value = &value->items()[static_cast<std::size_t>(found - value->keys().begin())];
             path.remove_prefix(key.size());
         }
         if (path.empty() || path.front() == '[')
@@ -143,13 +206,13 @@ std::string Value::to_text() const
     case Kind::Record: break;
     }
     std::string text(1, m_kind == Kind::List ? '[' : '{');
-    for (std::size_t i = 0; i < m_items.size(); ++i)
+    for (std::size_t i = 0; i < items().size(); ++i)
     {
         if (i != 0)
             text += ", ";
         if (m_kind == Kind::Record)
-            text += m_keys[i] + "=";
-        text += m_items[i].to_text();
+            text += keys()[i] + "=";
+        text += items()[i].to_text();
     }
     return text + (m_kind == Kind::List ? ']' : '}');
 }
@@ -169,9 +232,9 @@ bool Value::matches(std::string_view token) const
     {
         if (!token.starts_with('['))
             return false;
-        const auto items = tokens::split(tokens::inside(token, '[', ']'));
-        return items.size() == m_items.size() &&
-               std::equal(m_items.begin(), m_items.end(), items.begin(),
+        const auto written_items = tokens::split(tokens::inside(token, '[', ']'));
+        return written_items.size() == items().size() &&
+               std::equal(items().begin(), items().end(), written_items.begin(),
                           [](const Value& item, std::string_view written) { return item.matches(written); });
     }
     case Kind::Record: break;
@@ -182,15 +245,15 @@ bool Value::matches(std::string_view token) const
     const bool leaves_out = std::erase_if(members, [](std::string_view member) {
                                 return member == "…" || member == "..." || member == "as before";
                             }) != 0;
-    if (members.size() > m_items.size() || (members.size() < m_items.size() && !leaves_out))
+    if (members.size() > items().size() || (members.size() < items().size() && !leaves_out))
         return false;
     return std::all_of(members.begin(), members.end(), [this](std::string_view member) {
         const std::size_t equals = member.find('=');
         if (equals == member.npos)
             throw std::invalid_argument("a record's member is written NAME=VALUE, not " + std::string(member));
-        const auto key = std::find(m_keys.begin(), m_keys.end(), tokens::trim(member.substr(0, equals)));
-        return key != m_keys.end() &&
-               m_items[static_cast<std::size_t>(key - m_keys.begin())].matches(member.substr(equals + 1));
+        const auto key = std::find(keys().begin(), keys().end(), tokens::trim(member.substr(0, equals)));
+        return key != keys().end() &&
+               items()[static_cast<std::size_t>(key - keys().begin())].matches(member.substr(equals + 1));
     });
 }
 

@@ -4,6 +4,7 @@
 #pragma once
 
 #include <cstdint>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -40,13 +41,27 @@ public:
     static Value list(std::vector<Value> items);
     static Value record(std::vector<std::pair<std::string, Value>> members);
 
+    /** Names of members, for many records to have in common. */
+    class Names
+    {
+    public:
+        /** Throws std::logic_error when one is there twice. */
+        explicit Names(std::vector<std::string> names);
+
+    private:
+        friend class Value;
+        std::shared_ptr<std::vector<std::string>> m_names;
+    };
+    /** A record with these names: an item for each. */
+    static Value record(const Names& names, std::vector<Value> items);
+
     Kind kind() const { return m_kind; }
     std::int64_t as_number() const { return m_number; }
     Base base() const { return m_base; }
     /** Symbolic name of a number, text of a text, name of a symbol. */
     const std::string& string() const { return m_string; }
-    const std::vector<Value>& items() const { return m_items; }
-    const std::vector<std::string>& keys() const { return m_keys; }
+    const std::vector<Value>& items() const;
+    const std::vector<std::string>& keys() const;
 
     /** Append a member to a record (a null value becomes an empty record first). */
     Value& add(std::string key, Value value);
@@ -61,15 +76,22 @@ public:
     /** JSON, in the form that json.h describes. indent < 0: on one line. */
     std::string to_json(int indent = -1) const;
 
-    bool operator==(const Value& other) const = default;
+    bool operator==(const Value& other) const;
 
 private:
+    /** What a list or a record holds: copies have it in common, for whole states are copied at every command. */
+    struct Held
+    {
+        std::vector<Value> items;
+        std::shared_ptr<std::vector<std::string>> keys; ///< of a record
+    };
+    Held& held_alone();
+
     Kind m_kind = Kind::Null;
     Base m_base = Base::Decimal;
     std::int64_t m_number = 0;
     std::string m_string;
-    std::vector<Value> m_items;
-    std::vector<std::string> m_keys;
+    std::shared_ptr<Held> m_held; ///< none: nothing is held
 };
 
 /** Text in double quotes with \n, \t, \", \\ and \xNN escapes. */

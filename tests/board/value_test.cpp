@@ -112,6 +112,29 @@ TEST(Value, Add_MakesARecordOfNothingAndRefusesWhatIsWrong)
     EXPECT_THROW(number.add("a", Value::number(3)), std::logic_error);
 }
 
+TEST(Value, Record_OfNamesInCommon)
+{
+    const Value::Names names({ "a", "b" });
+    const Value one = Value::record(names, { Value::number(1), Value::number(2) });
+    EXPECT_EQ(Value::record({ { "a", Value::number(1) }, { "b", Value::number(2) } }), one);
+    EXPECT_NE(Value::record(names, { Value::number(1), Value::number(3) }), one);
+    EXPECT_EQ("{}", Value::record(Value::Names({}), {}).to_text());
+    EXPECT_THROW((void)Value::record(names, { Value::number(1) }), std::logic_error);
+    EXPECT_THROW(Value::Names({ "a", "b", "a" }), std::logic_error);
+}
+
+TEST(Value, Add_LeavesAloneWhatHasTheSameInCommon)
+{
+    const Value::Names names({ "a" });
+    Value value = Value::record(names, { Value::number(1) });
+    const Value copy = value;
+    const Value other = Value::record(names, { Value::number(2) });
+    value.add("b", Value::number(3));
+    EXPECT_EQ("{a=1, b=3}", value.to_text());
+    EXPECT_EQ("{a=1}", copy.to_text());
+    EXPECT_EQ("{a=2}", other.to_text());
+}
+
 TEST(Value, Matches_ANumberInAnyBaseOrByName)
 {
     for (const char* token : { "2", "0x2", "0X02", "0b10", "0o2", "+2", " 2 ", "RES_480P", "*" })

@@ -5,9 +5,11 @@
 #pragma once
 
 #include <cstddef>
+#include <optional>
 #include <string>
 #include <vector>
 
+#include "board/names.h"
 #include "board/value.h"
 
 namespace record_view
@@ -30,7 +32,9 @@ struct Node
     std::size_t size = 0;
     bool is_signed = false;
     std::string owner; ///< the record that holds it: "PMX_CONF_T"; empty for an object of its own
+    board::names::Family family = board::names::Family::None; ///< whose names its number has
     std::vector<Node> children;
+    std::optional<board::Value::Names> names; ///< of a record: its children's
 };
 
 /** An object of the module. */

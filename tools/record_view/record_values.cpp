@@ -30,7 +30,7 @@ Value number_at(const Node& node, const unsigned char* at)
     const std::int64_t number = plain_number_at(node, at);
     if (node.form == Node::Form::Pointer)
         return number == 0 ? Value::null() : Value::number(number, {}, Value::Base::Hex);
-    return Value::number(number, board::names::name_of(board::names::family_of(node.owner, node.name), number),
+    return Value::number(number, board::names::name_of(node.family, number),
                          reads_best_in_hex(node.name) ? Value::Base::Hex : Value::Base::Decimal);
 }
 
@@ -77,17 +77,12 @@ Value value_at(const Node& node, const unsigned char* at)
 {
     if (is_single(node))
         return number_at(node, at);
-    if (node.form == Node::Form::List)
-    {
-        std::vector<Value> items;
-        for (const Node& child : node.children)
-            items.push_back(value_at(child, at + child.offset));
-        return Value::list(std::move(items));
-    }
-    std::vector<std::pair<std::string, Value>> members;
+    std::vector<Value> items;
+    items.reserve(node.children.size());
     for (const Node& child : node.children)
-        members.emplace_back(child.name, value_at(child, at + child.offset));
-    return Value::record(std::move(members));
+        items.push_back(value_at(child, at + child.offset));
+    return node.form == Node::Form::List ? Value::list(std::move(items))
+                                         : Value::record(node.names.value(), std::move(items));
 }
 
 } // namespace record_view

@@ -99,25 +99,48 @@ std::optional<Place> walk(Place place, std::string_view path)
     return place;
 }
 
+/** Take a beginning away; whether it was there. */
+bool take(std::string_view& path, std::string_view beginning)
+{
+    if (!path.starts_with(beginning))
+        return false;
+    path.remove_prefix(beginning.size());
+    return true;
+}
+
+bool names_object(std::string_view path, const Object& object)
+{
+    return path == object.symbol || (take(path, object.group) && take(path, ".") && path == object.symbol);
+}
+
+/** What stands behind "group.", "symbol." or "symbol[0]."; empty when the path begins otherwise. */
+std::string_view path_below(std::string_view path, const Object& object)
+{
+    if (!take(path, object.group))
+    {
+        if (!take(path, object.symbol))
+            return {};
+        take(path, "[0]");
+    }
+    return take(path, ".") ? path : std::string_view();
+}
+
 std::optional<Place> find(std::string_view path)
 {
+    const auto root = [](const Object& object) { return Place{ &object.node, &object, 0, prefix_of(object) }; };
     const Object* record = nullptr;
     for (const Object& object : objects())
     {
-        const Place root{ &object.node, &object, 0, prefix_of(object) };
         if (object.group == "record")
             record = &object;
-        if (path == object.symbol || path == object.group + "." + object.symbol)
-            return root;
+        if (names_object(path, object))
+            return root(object);
         if (object.group == "module")
             continue;
         if (path == object.group)
-            return root;
-        for (const std::string& lead : { object.group + ".", object.symbol + ".", object.symbol + "[0]." })
-        {
-            if (path.starts_with(lead) && path.size() > lead.size())
-                return walk(root, path.substr(lead.size()));
-        }
+            return root(object);
+        if (const std::string_view below = path_below(path, object); !below.empty())
+            return walk(root(object), below);
     }
     return path.empty() ? std::nullopt : walk({ &record->node, record, 0, "" }, path);
 }

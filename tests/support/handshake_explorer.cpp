@@ -234,8 +234,10 @@ State Bench::state() const
     for (UCHAR plane = DRV_PMX_PLANE_3; plane <= DRV_PMX_PLANE_7; ++plane)
         state.mixed |= static_cast<std::uint8_t>(fgPmxHalMixPlane(0, plane) != 0 ? 1u << plane : 0u);
     state.has_timer = has_timer;
-    state.mode_set = record_view::get("fgSetModeCalled").as_number() != 0;
-    state.started = record_view::get("_PmxInitiated").as_number() != 0;
+    static const record_view::Field mode_called("fgSetModeCalled");
+    static const record_view::Field initiated("_PmxInitiated");
+    state.mode_set = mode_called.number() != 0;
+    state.started = initiated.number() != 0;
     return state;
 }
 
@@ -324,13 +326,19 @@ void Bench::undo_lifecycle()
 
 void Bench::restart()
 {
+    restart_with(osd_planes);
+}
+
+/** As Ready, but for what of the OSD planes is mixed. */
+void Bench::restart_with(std::uint8_t mixed)
+{
     undo_lifecycle();
     _arPmxDispPartStatus = { m_timer, FALSE, FALSE, FALSE };
     board::video_planes::set_waiting_for_sync(false);
     if (timer_running())
         board::advance(timer_interval);
     for (UCHAR plane = DRV_PMX_PLANE_3; plane <= DRV_PMX_PLANE_7; ++plane)
-        vPmxMixPlane(0, plane);
+        ((mixed & 1u << plane) != 0 ? vPmxMixPlane : vPmxNotMixPlane)(0, plane);
     std::copy(m_first_record.begin(), m_first_record.end(), m_record.begin());
     m_outputs = first_outputs();
     board::trace::clear();
@@ -338,7 +346,7 @@ void Bench::restart()
 
 void Bench::put(const State& state)
 {
-    restart();
+    restart_with(state.mixed);
     if (state.old_armed)
     {
         x_timer_create(&_arPmxDispPartStatus.hPMXTimer);
@@ -348,11 +356,6 @@ void Bench::put(const State& state)
     }
     if (state.armed)
         PMX_SetFormatChangeTimer(timer_interval_ms);
-    for (UCHAR plane = DRV_PMX_PLANE_3; plane <= DRV_PMX_PLANE_7; ++plane)
-    {
-        if ((state.mixed & 1u << plane) == 0)
-            vPmxNotMixPlane(0, plane);
-    }
     board::video_planes::set_waiting_for_sync(state.waiting);
     _arPmxDispPartStatus.fgPmxFormatChangeFlag = state.flag ? TRUE : FALSE;
     _arPmxDispPartStatus.fgPmxEnabeOsdFlag = state.owed ? TRUE : FALSE;
@@ -388,6 +391,36 @@ Graph explore(std::span<const Event> events)
             const bool other_planes = bench.run(event);
             const State to = now = bench.state();
             graph.transitions.push_back({ from, event, to, other_planes });
+            if (graph.paths.contains(to))
+                continue;
+            std::vector<Event> path = graph.paths.at(from);
+            path.push_back(event);
+            graph.paths[to] = std::move(path);
+            graph.states.push_back(to);
+        }
+    }
+    return graph;
+}
+
+Graph part_of(const Graph& whole, std::span<const Event> events)
+{
+    std::map<State, std::map<Event, const Transition*>> ways;
+    for (const Transition& transition : whole.transitions)
+        ways[transition.from][transition.event] = &transition;
+    Graph graph;
+    graph.states.push_back(whole.states.front());
+    graph.paths[graph.states.front()] = {};
+    for (std::size_t at = 0; at < graph.states.size(); ++at)
+    {
+        const State from = graph.states[at];
+        const auto& leading = ways.at(from);
+        for (const Event event : events)
+        {
+            const auto way = leading.find(event);
+            if (way == leading.end())
+                continue;
+            const State& to = way->second->to;
+            graph.transitions.push_back(*way->second);
             if (graph.paths.contains(to))
                 continue;
             std::vector<Event> path = graph.paths.at(from);

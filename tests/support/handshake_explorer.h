@@ -103,6 +103,7 @@ public:
 private:
     void set_mode(Event event);
     void undo_lifecycle();
+    void restart_with(std::uint8_t mixed);
 
     Outputs m_outputs;
     HANDLE_T m_timer = 0;
@@ -129,6 +130,9 @@ struct Graph
 
 /** All that can be reached from Ready by these events, breadth first. */
 Graph explore(std::span<const Event> events);
+/** The same taken out of a graph that was explored with these events and others: what an event does depends on the
+ *  state alone. */
+Graph part_of(const Graph& whole, std::span<const Event> events);
 
 /** What an observer may rely on between operations; the letters of the rules that do not hold in this state, "" for
  *  none: (a) an OSD plane is out of the mix only while F or E is set; (b) out with E clear: F and T are set and the

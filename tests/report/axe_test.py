@@ -85,7 +85,8 @@ def main():
         bad.write_text('<!DOCTYPE html><title>bad</title><img src="data:,">', encoding="utf-8")
         if not findings(browser, script, bad, ""):
             sys.exit("axe-core finds nothing wrong with a picture that has no text")
-        page = written.write(pages.REFUSED, pages.NEVER)
+        shows = written.scenario("shows.pmx", pages.REFUSED.read_text(encoding="utf-8") + "status\nstatus graphics\n")
+        page = written.write(shows, pages.NEVER)
         for state, found in looked_at(browser, script, page):
             print(f"{state}: {len(found)} findings")
             for finding in found:

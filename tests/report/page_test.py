@@ -76,6 +76,11 @@ class PageTest(unittest.TestCase):
     def press(self, *keys):
         browser.driver.switch_to.active_element.send_keys(*keys)
 
+    def tabbed(self):
+        """What Tab stops at, as the page has it."""
+        return browser.run("""return [...document.querySelectorAll("a, button, input, select, summary, [tabindex]")]
+            .filter((one) => one.tabIndex >= 0 && one.checkVisibility())""")
+
     def current(self):
         """The number of the step that is chosen."""
         return int(self.one("[aria-current=step]").get_attribute("id").removeprefix("step-"))
@@ -135,6 +140,64 @@ class Shown(PageTest):
         refused = " ".join(self.texts(".refused"))
         self.assertIn("Refused: source 1 feeds two planes, 0 and 1.", refused)
         self.assertIn("PMX_SetArbPlaneOrder 0 0x76543201", refused)
+        self.assertNotEqual([], self.all(".card.refusing .result.refusing"))
+        self.assertEqual([], self.all(".card:not(.refusing) .result.refusing"))
+
+    def test_answers_by_script_are_told(self):
+        self.open(pages.SCENARIOS / "os-failures-at-shutdown.pmx")
+        told = " ".join(self.texts("#story li"))
+        self.assertRegex(told, r"\d+ answers of the platform came by script, first in step \d+\.")
+
+    def test_times_stand_within_long_steps_and_at_the_end(self):
+        self.open(pages.NEVER)
+        self.assertIn("5 s", self.texts(".times span"))
+        self.one("#scale").click()
+        times = self.texts(".times span")
+        self.assertGreaterEqual(set(times), {"0 ms", "2 s", "4 s", "6 s"})
+        self.assertTrue(any(time_.startswith("10.00") for time_ in times), times)
+        places = browser.run(f"{ALL}.map((one) => one.getBoundingClientRect()).map((one) => [one.left, one.right])"
+                             ".sort((one, other) => one[0] - other[0])", ".times span")
+        for (_, end), (begin, _) in zip(places, places[1:]):
+            self.assertLess(end, begin, "they can be read")
+
+    def test_names_of_any_kind_stay_text(self):
+        for name in (b"a<b class=evil>&\"'.pmx", b"a\x01\x1b[31m\xc2\x9b.pmx", b"\xff\xfe\xc3.pmx"):
+            path = pathlib.Path(os.fsdecode(os.fsencode(written.folder / "") + b"/" + name))
+            path.write_bytes(b"PMX_Init\nprint \"\xff<b class=evil>\"\nPMX_GetMode 7 8 9\n")
+            self.open(path, code=1)
+            self.assertEqual([], self.all(".evil"))
+            shown = os.fsdecode(name) if b"<" in name else "\\x" + f"{name[1 if name[0] == 97 else 0]:02X}"
+            self.assertIn(shown.lower(), self.one("#title").get_attribute("textContent").lower())
+            self.assertNotRegex(self.one("body").get_attribute("textContent"), "[\x01\x1b\x9b]")
+
+    def test_the_standard_input_is_a_scenario_once(self):
+        page = written.folder / "stdin.html"
+        found = written.run("report", "-", "-o", page, stdin="PMX_Init\n")
+        self.assertEqual((0, ""), (found.returncode, found.stderr))
+        browser.open(page)
+        self.assertEqual("<stdin>", self.one("#title").text)
+        self.assertEqual(["PMX_Init"], self.texts(".card h3 code"))
+        again = written.folder / "again.html"
+        for arguments in (("-", "-"), ("-", "--board", "default", "--board", "bedroom-player")):
+            found = written.run("report", *arguments, "-o", again, stdin="PMX_Init\n")
+            self.assertEqual(2, found.returncode)
+            self.assertIn("the standard input holds one scenario only", found.stderr)
+            self.assertFalse(again.exists())
+
+    def test_the_page_goes_where_it_is_sent(self):
+        found = written.run("report", "-", "-o", "/dev/stdout", stdin="PMX_Init\n")
+        self.assertEqual((0, ""), (found.returncode, found.stderr))
+        page = written.folder / "stdout.html"
+        page.write_text(found.stdout, encoding="utf-8")
+        browser.open(page)
+        self.assertEqual(["PMX_Init"], self.texts(".card h3 code"))
+
+    def test_a_restored_state_takes_no_time(self):
+        saved = written.folder / "saved-at-4s.json"
+        self.assertEqual(0, written.run("run", "-q", "-", stdin=f"PMX_Init\nadvance 4s\nsave {saved}\n").returncode)
+        self.open(written.scenario("restores.pmx", f"PMX_Init\nrestore {saved}\nPMX_GetMode 0\n"))
+        self.assertNotIn("takes", self.one("#step-3 .when").text)
+        self.assertIn("3 steps, 0 expectations, 2 ms on board", " ".join(self.texts("#story li")))
 
     def test_a_failure_is_told_where_it_happened(self):
         wrong = written.scenario("wrong.pmx", "PMX_Init\nPMX_GetMode 0\nexpect result 0\nPMX_Stop\n")
@@ -221,6 +284,7 @@ class Shown(PageTest):
         browser.open(written.changed(written.write(pages.NEVER), leave_out))
         lines = len(written.run("run", "--stores", "--trace-format", "jsonl", pages.NEVER).stdout.splitlines())
         self.assertRegex(self.one(f"#step-{HELD_STEP} .left-out").text, r"leaves out \d+ lines of the trace\.")
+        self.assertIn("the display timer ran out", self.texts("#story li")[0], "that is known without them")
         self.assertIn(f"Of its steps this page leaves out {lines} lines of the trace and 1 change of the state.",
                       self.texts("#story li"))
 
@@ -263,6 +327,8 @@ class Shown(PageTest):
 
     def test_a_page_at_its_limits_opens_and_tells_what_is_missing(self):
         page = self.open(written.scenario("endless.pmx", self.ENDLESS))
+        self.assertLess(len(self.tabbed()), 60, "however many steps there are")
+        self.assertRegex(self.one("#story .waits summary").text, r"^\d+ more waits, \d+ s together$")
         self.assertLess(page.stat().st_size, LARGEST)
         self.assertGreater(page.stat().st_size, LARGEST / 2)
         told = " ".join(self.texts("#story li"))
@@ -306,8 +372,10 @@ class Pictures(PageTest):
 
     def test_one_that_is_left_out_is_told(self):
         def leave_out(data):
-            step = data["runs"][0]["steps"][self.LAST - 1]
-            step["outputs"][1]["picture"], step["left_out"]["pictures"] = None, 1
+            steps = data["runs"][0]["steps"][:self.LAST]
+            seen = [step["outputs"] for step in steps if step["outputs"]][-1]
+            steps[-1]["outputs"] = [dict(output) for output in seen]
+            steps[-1]["outputs"][1]["picture"], steps[-1]["left_out"]["pictures"] = None, 1
             return data
 
         browser.open(written.changed(written.write(pages.FIRST_LOOK), leave_out))
@@ -382,6 +450,48 @@ class Used(PageTest):
         self.press("a", Keys.ARROW_LEFT)
         self.assertEqual(1, self.current(), "arrows in a field move in it")
 
+    def test_arrows_go_through_a_lane(self):
+        self.open(pages.NEVER)
+        bars = self.all(".bar.step")
+        bars[0].send_keys(Keys.ARROW_RIGHT, Keys.NULL)
+        active = lambda: browser.driver.switch_to.active_element  # noqa: E731
+        self.assertEqual(bars[1], active())
+        self.assertEqual(1, self.current(), "nothing is chosen yet")
+        self.press(Keys.END)
+        self.assertEqual(bars[-1], active())
+        self.press(Keys.ARROW_RIGHT)
+        self.assertEqual(bars[-1], active(), "there is none behind the last")
+        self.assertEqual([bars[-1]], [bar for bar in bars if bar.get_property("tabIndex") == 0])
+        self.press(Keys.HOME, Keys.ARROW_RIGHT)
+        self.press(Keys.ENTER)
+        self.assertEqual((2, "step-2"), (self.current(), self.active()))
+
+    def test_arrows_go_through_the_story(self):
+        self.open(pages.NEVER)
+        links = self.all("#story a")
+        self.assertLess(1, len(links))
+        self.assertEqual([links[0]], [link for link in self.tabbed() if link in links])
+        links[0].send_keys(Keys.ARROW_DOWN)
+        self.assertEqual(links[1], browser.driver.switch_to.active_element)
+        self.press(Keys.ENTER)
+        self.assertEqual("step-6", self.active())
+
+    def test_tab_goes_through_the_chosen_step_alone(self):
+        def steps():
+            return {card for card in browser.run("return arguments[0].map((one) => one.closest('.card')?.id)",
+                                                 self.tabbed()) if card}
+
+        self.open(pages.NEVER)
+        self.assertEqual({"step-1"}, steps())
+        self.press(Keys.END)
+        self.press(Keys.TAB)
+        self.assertEqual({"step-6"}, steps())
+        self.assertTrue(browser.run("return document.activeElement.matches('#step-6 .picture')"))
+        self.one("#step-2 .calls summary").click()
+        self.assertEqual(({"step-2"}, 2), (steps(), self.current()))
+        bars = browser.run("return arguments[0].filter((one) => one.matches('.bar'))", self.tabbed())
+        self.assertEqual(len(self.all(".track")), len(bars))
+
     def test_an_address_names_a_step(self):
         page = self.open(pages.NEVER)
         browser.driver.get("about:blank")
@@ -442,6 +552,31 @@ class Used(PageTest):
         self.assertIn("Graphics waited: 2 s here, 3 s there.", self.texts("#compared li"))
         self.choose("#other", 0)
         self.assertEqual(["Both do the same, and look the same."], self.texts("#compared li"))
+
+    def test_time_lines_and_stories_of_both_runs_stand_beside_each_other(self):
+        self.open(*(written.scenario(f"{time_}.pmx", self.ANSWER.format(time_)) for time_ in ("2s", "3s")))
+        self.choose("#other", 1)
+        self.one("#scale").click()
+        held = [self.one(f".side-{side} .bar.held") for side in (0, 1)]
+        self.assertAlmostEqual(2 / 3, held[0].size["width"] / held[1].size["width"], delta=0.02)
+        self.assertLess(held[0].rect["y"], held[1].rect["y"])
+        self.assertEqual(len(self.all(".side-0")), len(self.all(".side-1")))
+        stories = self.texts("#story .story")
+        for story, time_ in zip(stories, ("2 s", "3 s"), strict=True):
+            self.assertIn(f"No graphics for {time_}", story)
+        above = [self.one(part).rect["y"] for part in ("#compared", "#story", "#whose", "#lanes")]
+        self.assertEqual(sorted(above), above)
+        self.assertIn("2s.pmx. Below: ", self.one("#whose").text)
+        held[1].click()
+        self.assertEqual((3, "other-step-3"), (self.current(), self.active()))
+        self.all("#story .story:nth-child(2) a")[-1].click()
+        self.assertEqual((4, "other-step-4"), (self.current(), self.active()))
+        browser.run("document.querySelector('#other-step-3 .picture').click()")
+        self.assertIn("3s.pmx", self.one("#large-title").text)
+        self.press(Keys.ESCAPE)
+        for width in (browsers.WIDE, browsers.NARROW):
+            browser.look(width)
+            self.assertLessEqual(browser.run("return document.documentElement.scrollWidth"), width)
 
     def test_one_scenario_runs_on_two_boards(self):
         self.open("--board", "default", "--board", "bedroom-player", pages.SCENARIOS / "frequency-change.pmx")

@@ -21,9 +21,9 @@ class Pages:
         self.tool, self.folder = tool, pathlib.Path(folder)
         self.pages = {}
 
-    def run(self, *arguments):
+    def run(self, *arguments, stdin=""):
         return subprocess.run([self.tool, *map(str, arguments)], cwd=ROOT, capture_output=True, text=True,
-                              check=False)
+                              check=False, input=stdin)
 
     def write(self, *arguments, code=0):
         """The page of these scenarios and options: one, however many look at it."""

@@ -136,6 +136,7 @@ TEST(Storyboard, HeldGraphicsAreASpanFromStepToStep)
     EXPECT_EQ(2, held.at("from").at("step"));
     EXPECT_EQ(3, held.at("to").at("step"));
     EXPECT_FALSE(held.at("open").get<bool>());
+    EXPECT_EQ("the display timer ran out; the display part had not answered", held.at("ended_by"));
     EXPECT_TRUE(spans_of_lane(run, "HDMI output")[0].at("open").get<bool>());
     EXPECT_TRUE(spans_of_lane(run, "digital output").empty());
 }

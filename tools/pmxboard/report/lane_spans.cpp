@@ -14,7 +14,7 @@ Moment moment_of(const board::Json& json)
     return { json.at("us"), json.at("step"), json.at("sequence") };
 }
 
-void LaneSpans::follow(const std::map<int, std::string>& states, const Moment& now)
+void LaneSpans::follow(const std::map<int, std::string>& states, const Moment& now, const std::string& told)
 {
     for (auto open = m_open.begin(); open != m_open.end();)
     {
@@ -25,11 +25,12 @@ void LaneSpans::follow(const std::map<int, std::string>& states, const Moment& n
             continue;
         }
         open->second.to = now;
+        open->second.ended_by = told;
         m_ended.push_back(open->second);
         open = m_open.erase(open);
     }
     for (const auto& [lane, text] : states)
-        m_open.try_emplace(lane, LaneSpan{ lane, text, now, now });
+        m_open.try_emplace(lane, LaneSpan{ lane, text, now, now, false, {} });
 }
 
 void LaneSpans::end(const Moment& now, bool run_is_over)

@@ -32,13 +32,14 @@ struct LaneSpan
     Moment from;
     Moment to;
     bool is_open = false; ///< it held when the run ended
+    std::string ended_by; ///< what the board told of before; empty where it told nothing
 };
 
 class LaneSpans
 {
 public:
-    /** What holds from now on; what held and does no more ends now. */
-    void follow(const std::map<int, std::string>& states, const Moment& now);
+    /** What holds from now on; what held and does no more ends now, by what was told of before. */
+    void follow(const std::map<int, std::string>& states, const Moment& now, const std::string& told = {});
     /** Everything ends: the board loses its power, or the run is over. */
     void end(const Moment& now, bool run_is_over);
 

@@ -104,6 +104,19 @@ Json event_of(const board::TraceEntry& entry, std::int64_t power_on_us)
     return event;
 }
 
+/** What may bring graphics back, where the board tells of it; else empty. */
+std::string end_of_wait(const board::TraceEntry& entry)
+{
+    if (entry.kind != board::TraceEntry::Kind::Notice)
+        return {};
+    if (entry.function == "expiry" && entry.text.ends_with("_PMX_TmrIsr"))
+        return "the display timer ran out; the display part had not answered";
+    if (entry.function == "display_part" || entry.function == "video_plane")
+        return std::string("the ") + (entry.function == "display_part" ? "display part " : "video plane ") +
+               printable(entry.text);
+    return {};
+}
+
 /** What the bars that begin now take. */
 std::size_t size_of_new(const States& states, const States* before)
 {
@@ -144,6 +157,7 @@ void Onlooker::begin_step(std::string_view line)
 {
     m_in_step = true;
     m_left_out = {};
+    m_heard.clear();
     m_step_told = 0;
     m_step_from_us = moment().us;
     if (is_behind_page() || m_steps == m_limits.steps || m_room.texts < bare_step)
@@ -243,6 +257,8 @@ std::string Onlooker::entry(const board::TraceEntry& entry, bool)
     need_step();
     if (is_behind_page())
         return {};
+    if (const std::string heard = end_of_wait(entry); !heard.empty())
+        m_heard = heard;
     const Json event = event_of(entry, m_offset_us);
     if (take(m_room.entries, size_on_page(event)))
         m_tell(event);
@@ -269,7 +285,7 @@ void Onlooker::follow_lanes()
     Json all = Json::array();
     for (const auto& [lane, text] : *states)
         all.push_back({ lane, text });
-    m_tell({ { "is", "states" }, { "at", json_of(moment()) }, { "states", all } });
+    m_tell({ { "is", "states" }, { "at", json_of(moment()) }, { "states", all }, { "heard", m_heard } });
 }
 
 void Onlooker::end_step()

@@ -86,6 +86,7 @@ private:
     std::uint64_t m_sequence = 0;
     std::optional<board::Value> m_before; ///< what the step found, or the power-on within it
     std::string m_heard_place;            ///< of the last line that was heard of
+    std::string m_heard;                  ///< what the board told in this step that may end a wait
     std::shared_ptr<const States> m_states;
     bool m_time_line_is_full = false;
     std::string m_status;  ///< of the step before, which is not told again

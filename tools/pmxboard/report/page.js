@@ -3,6 +3,7 @@
 
 const data = JSON.parse(document.getElementById("data").textContent);
 const MOST_COMPARED = 1e6;
+const MOST_TOLD = 5; // waits in the story; the others fold
 const TIME_ROOM = 0.12; // what a time on the axis takes of the width
 const shown = { run: 0, other: -1, step: 0, output: 0, filter: "", toScale: false };
 const large = { side: 0, step: 0 }; // what is enlarged, which may be of the run beside
@@ -73,16 +74,6 @@ const titleOf = (step) => step.command || "(before the first command)";
 
 /* In short: what somebody wants to know who does not read on. */
 
-/** Who ended a wait: what the board told last before it did. */
-function endOfWait(runShown, span) {
-  const step = runShown.steps[span.to.step];
-  const told = step.entries.filter((entry) => entry.sequence <= span.to.sequence && entry.kind === "notice").pop();
-  if (told && told.function === "expiry")
-    return "the display timer ran out; the display part had not answered";
-  if (told && told.function === "display_part") return `the display part ${told.text}`;
-  return titleOf(step);
-}
-
 function linkTo(index, side = 0) {
   const link = make("a", { href: `#${cardId(side, index)}` }, `step ${index + 1}`);
   link.addEventListener("click", (event) => {
@@ -108,15 +99,41 @@ function waitLine(runShown, side, span) {
   line.append("No graphics for ", make("strong", {}, spoken(span.to.us - span.from.us)),
               `: ${span.text} from ${spoken(span.from.us)}, in `, linkTo(span.from.step, side),
               `, until ${spoken(span.to.us)}, in `, linkTo(span.to.step, side));
-  line.append(span.open ? `, ${endOf(runShown)} and they still wait.` : `: ${endOfWait(runShown, span)}.`);
-  const why = runShown.steps[span.from.step].graphics;
-  return why ? [line, make("li", {}, `After step ${span.from.step + 1}, `,
-                           make("code", {}, titleOf(runShown.steps[span.from.step])), `, they were ${why}.`)] : [line];
+  line.append(span.open ? `, ${endOf(runShown)} and they still wait.`
+    : `: ${span.ended_by || titleOf(runShown.steps[span.to.step])}.`);
+  return line;
+}
+
+/** Why they wait, for those who know the system only from the outside. */
+function whyLine(runShown, span) {
+  const step = runShown.steps[span.from.step];
+  if (!step.graphics) return [];
+  const rule = step.graphics_state === "held"
+    ? " they come back when the display part says that it has switched, or when the display timer runs out." : "";
+  return [make("li", {}, "Why: after ", make("code", {}, titleOf(step)), `${rule} They were ${step.graphics}.`)];
+}
+
+/** All of them, or the first ones and how many more there are. */
+function waitLines(runShown, side) {
+  const all = waits(runShown);
+  const lines = (spans) => spans.map((span) => waitLine(runShown, side, span));
+  const told = lines(all.slice(0, MOST_TOLD));
+  const more = all.slice(MOST_TOLD);
+  if (all.length > 0) told.splice(1, 0, ...whyLine(runShown, all[0]));
+  if (more.length === 0) return told;
+  const sum = more.reduce((us, span) => us + span.to.us - span.from.us, 0);
+  return [...told, make("li", { class: "bad" }, folded(`${counted(more.length, "more wait")}, ${spoken(sum)} together`,
+                                                       "waits", make("ul", {}, ...lines(more))))];
 }
 
 /** What happened in a run, in sentences. */
 function story(runShown, side) {
-  const lines = waits(runShown).flatMap((span) => waitLine(runShown, side, span));
+  const lines = waitLines(runShown, side);
+  const scripted = runShown.steps.map((step) => step.entries.filter((entry) => entry.faulted).length);
+  const sum = scripted.reduce((one, other) => one + other, 0);
+  if (sum > 0)
+    lines.push(make("li", {}, `${counted(sum, "answer")} of the platform came by script, first in `,
+                    linkTo(scripted.findIndex((count) => count > 0), side), "."));
   runShown.steps.forEach((step, index) => {
     if (isRefused(step))
       lines.push(make("li", { class: "bad" }, linkTo(index, side), ` was refused: ${step.explanation.reason.text}.`));
@@ -404,7 +421,8 @@ function card(side, index) {
                            id: cardId(side, index), tabindex: "-1",
                            "aria-label": `${whose}Step ${index + 1}: ${titleOf(step)}` },
               title, make("p", { class: "when" }, whenOf(step)),
-              ...step.results.map((line) => make("p", { class: "result" }, make("code", {}, line))),
+              ...step.results.map((line) => make("p", { class: isRefused(step) ? "result refusing" : "result" },
+                                                 make("code", {}, line))),
               step.told ? make("pre", { class: "told scroll", tabindex: "0", role: "group",
                                       "aria-label": "What the command shows" }, step.told) : null,
               refusalOf(step), ...failures, ...troubles,
@@ -564,13 +582,14 @@ function openToTab(row) {
 
 /** One of these parts is reached by Tab, the one that was used last; keys go to the one before and the one behind. */
 function rove(container, selector, back, forth) {
-  const items = [...container.querySelectorAll(selector)];
-  items.forEach((item, index) => item.tabIndex = index === 0 ? 0 : -1);
+  const all = [...container.querySelectorAll(selector)];
+  all.forEach((item, index) => item.tabIndex = index === 0 ? 0 : -1);
   container.addEventListener("focusin", (event) => {
     const used = event.target.closest(selector);
-    if (used) for (const item of items) item.tabIndex = item === used ? 0 : -1;
+    if (used) for (const item of all) item.tabIndex = item === used ? 0 : -1;
   });
   container.addEventListener("keydown", (event) => {
+    const items = all.filter((item) => item.checkVisibility());
     const at = items.indexOf(event.target);
     const to = back.includes(event.key) ? at - 1 : forth.includes(event.key) ? at + 1
       : event.key === "Home" ? 0 : event.key === "End" ? items.length - 1 : -2;

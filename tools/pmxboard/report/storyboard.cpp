@@ -18,9 +18,11 @@ using board::Json;
 
 Json json_of(const LaneSpan& span)
 {
-    return {
-        { "text", span.text }, { "from", json_of(span.from) }, { "to", json_of(span.to) }, { "open", span.is_open }
-    };
+    return { { "text", span.text },
+             { "from", json_of(span.from) },
+             { "to", json_of(span.to) },
+             { "open", span.is_open },
+             { "ended_by", span.ended_by } };
 }
 
 /** Between two stores of a release both reasons to wait hold, for no time. */
@@ -200,7 +202,7 @@ void Storyboard::hear_states(const Json& event)
     States states;
     for (const Json& state : event.at("states"))
         states[state.at(0)] = state.at(1);
-    m_lanes.follow(states, m_now);
+    m_lanes.follow(states, m_now, event.at("heard"));
 }
 
 /** What holds here goes on where nobody sees it. */

@@ -39,6 +39,15 @@ class View(unittest.TestCase):
             path.write_text(changed, encoding="utf-8")
             self.assertIn("i4Pmx_Connect", view.disagreements(view.ROOT, folder)[1])
 
+    def test_members_of_a_table_that_change_places_are_noticed(self):
+        with tempfile.TemporaryDirectory() as directory:
+            folder = pathlib.Path(directory)
+            view.write(view.ROOT, folder)
+            path = folder / "pmx_if.c"
+            swapped = path.read_text(encoding="utf-8").replace("= i4PMX_Suspend", "= i4PMX_Resume", 1)
+            path.write_text(swapped, encoding="utf-8")
+            self.assertEqual(["pmx_pm_ops"], view.disagreements(view.ROOT, folder)[1])
+
     def test_each_index_into_a_record_states_its_bound(self):
         self.assertEqual("x->arPortInfo[PMX_WITHIN(a[b + 1], PMX_PORT_NUM)].fgEnabled",
                          read("x->arPortInfo[a[b + 1]].fgEnabled"))

@@ -17,7 +17,6 @@ import concurrent.futures
 import hashlib
 import os
 import pathlib
-import re
 import shutil
 import subprocess
 import sys
@@ -32,18 +31,12 @@ import harness  # noqa: E402
 import promises  # noqa: E402
 import view  # noqa: E402
 from ktap import Ktap  # noqa: E402
+from verdicts import COMPILER, GUARD, LIMIT, OPTIONS, Verdict  # noqa: E402
 
 HERE = pathlib.Path(__file__).resolve().parent
 ROOT = view.ROOT
 SKIPPED = 77
 SAMPLE = 8  # faults that are planted in every run
-LIMIT = 600  # seconds for one operation
-# A place beyond the longest loop: what goes round more often is an error, told as such.
-OPTIONS = ["--nondet-static", "--unwind", "9", "--object-bits", "10", "--drop-unused-functions"]
-GUARD = '(__CPROVER_assert((size_t)(i)<(n),"index within the array of a record"),(i))'
-CHECKED = re.compile(r"^\[(\S+)\] (?:line (\d+) )?(.*): (SUCCESS|FAILURE|UNKNOWN|ERROR)$", re.M)
-PLACE = re.compile(r"^(\S+) function (\w+)$", re.M)
-COMPILER = ["--native-compiler", "arm-none-eabi-gcc", "-mcpu=cortex-a9"]
 
 
 class Program:
@@ -99,35 +92,6 @@ class Program:
         except subprocess.TimeoutExpired:
             return Verdict("", ends, f"the checker took longer than {LIMIT} s")
         return Verdict(ran.stdout, ends, (ran.stdout + ran.stderr)[-300:])
-
-
-class Verdict:
-    """How many checks the checker made, what is wrong, and (place, words) of what was refuted: behind that much is
-    unknown, and complaints of the checker itself say nothing of the layer."""
-
-    def __init__(self, text, ends=len(harness.WORLDS), complaint=""):
-        place, self.number, self.wrong, self.failed, reached = "", 0, [], [], []
-        for line in text.splitlines():
-            where, checked = PLACE.match(line), CHECKED.match(line)
-            if where:
-                place = where[1].removeprefix(f"{ROOT}/")
-            elif checked and checked[3].startswith(harness.REACHED):
-                reached.append(checked[4])
-            elif checked:
-                self.number += 1
-                if checked[4] == "FAILURE":
-                    self.failed.append((f"{place}:{checked[2]}", checked[3]))
-                if checked[4] != "SUCCESS":
-                    self.wrong.append(f"{place}:{checked[2]}: {checked[3]}: {checked[4]}")
-        # Behind what fails the checker does not know; what fails goes first.
-        self.wrong.sort(key=lambda line: not line.endswith("FAILURE"))
-        self.wrong += re.findall(r"no body for .*", text)
-        # Of what is behind every call it is claimed that nothing gets there: who does not see that this is wrong has
-        # presumed too much.
-        if not reached:
-            self.wrong.append(f"nothing was proved: {complaint}")
-        elif reached != ["FAILURE"] * ends:
-            self.wrong.append("an end is not reached: what is presumed cannot be")
 
 
 class Results:

@@ -16,6 +16,7 @@ import harness  # noqa: E402
 import pointers  # noqa: E402
 import promises  # noqa: E402
 import prove  # noqa: E402
+import verdicts  # noqa: E402
 import view  # noqa: E402
 
 PAGE = (prove.ROOT / "docs/proof.md").read_text(encoding="utf-8")
@@ -143,16 +144,16 @@ class Promises(unittest.TestCase):
 
 class Verdicts(unittest.TestCase):
     def test_what_does_not_hold_is_told_with_its_place(self):
-        verdict = prove.Verdict("src/x.cpp function f\n[f.1] line 7 division by zero: SUCCESS\n"
+        verdict = verdicts.Verdict("src/x.cpp function f\n[f.1] line 7 division by zero: SUCCESS\n"
                                 f"[f.2] line 8 array 'a' upper bound in a[i]: FAILURE\n{REACHED}")
         self.assertEqual((2, ["src/x.cpp:8: array 'a' upper bound in a[i]: FAILURE"]), (verdict.number, verdict.wrong))
-        self.assertEqual([], prove.Verdict(REACHED).wrong)
+        self.assertEqual([], verdicts.Verdict(REACHED).wrong)
 
     def test_what_proves_nothing_is_wrong(self):
-        self.assertEqual(["nothing was proved: killed"], prove.Verdict("", complaint="killed").wrong)
+        self.assertEqual(["nothing was proved: killed"], verdicts.Verdict("", complaint="killed").wrong)
         for text in (REACHED.replace("FAILURE", "SUCCESS", 1), REACHED.partition("\n")[2]):
-            self.assertEqual(["an end is not reached: what is presumed cannot be"], prove.Verdict(text).wrong)
-        self.assertEqual(["no body for function f"], prove.Verdict(f"no body for function f\n{REACHED}").wrong)
+            self.assertEqual(["an end is not reached: what is presumed cannot be"], verdicts.Verdict(text).wrong)
+        self.assertEqual(["no body for function f"], verdicts.Verdict(f"no body for function f\n{REACHED}").wrong)
 
     def test_what_was_proved_is_kept_for_the_same_text_alone(self):
         with tempfile.TemporaryDirectory() as directory:
@@ -166,7 +167,7 @@ class Verdicts(unittest.TestCase):
 
 class Faults(unittest.TestCase):
     def seen(self, text, **words):
-        verdict = prove.Verdict(f"src/x.cpp function f\n{text}{REACHED}")
+        verdict = verdicts.Verdict(f"src/x.cpp function f\n{text}{REACHED}")
         return prove.seen_as({"seen": "division by zero", **words}, verdict)
 
     def test_one_is_seen_in_what_was_refuted_alone(self):
@@ -176,7 +177,7 @@ class Faults(unittest.TestCase):
         self.assertEqual("", self.seen(refuted, at="y.cpp"))
         self.assertEqual("", self.seen(refuted, seen="x.cpp"))
         self.assertEqual("", self.seen("[f.1] line 7 division by zero in a / b: UNKNOWN\n"))
-        died = prove.Verdict("", complaint="division by zero: FAILURE")
+        died = verdicts.Verdict("", complaint="division by zero: FAILURE")
         self.assertEqual("", prove.seen_as({"seen": "division by zero"}, died))
 
     def test_each_can_be_planted_and_belongs_to_an_operation(self):

@@ -170,6 +170,8 @@ class Caches(TreeTest):
         self.expect(0, f"prove {self.tree}/.cache/prove {self.tree}/build/prove\n", "prove")
         self.expect(0, f"prove {self.space}/kept/prove {self.tree}/build/prove --faults PMX_Init\n",
                     "prove", "--faults", "PMX_Init", PMX_CACHE="kept")
+        self.expect(0, f"prove {self.tree}/.cache/prove {self.tree}/build/prove --same-as HEAD~1\n",
+                    "prove", "--same-as", "HEAD~1")
         self.expect(0, "", "clean")
         self.assertTrue((self.tree / ".cache/prove").is_dir())
 

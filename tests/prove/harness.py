@@ -80,7 +80,7 @@ def callback_types(root):
             for pointer in function_pointers(root / header) if pointer.is_type}
 
 
-def _size(function, pointer, name, known):
+def size_of(function, pointer, name, known):
     if pointer.kind == "by":
         cases = pointers.types_by_value(function, pointer, known).items()
         return "".join(f"{pointer.size} == {value} ? sizeof({type_name}) : " for value, type_name in cases) + "0"
@@ -96,7 +96,7 @@ def _looks(function, pointer, name, known):
         return [], []
     if pointer.kind == "text":
         return [f'CLAIM(__CPROVER_r_ok({name}, 1), {told} read");'], []
-    size = _size(function, pointer, name, known)
+    size = size_of(function, pointer, name, known)
     may_be_null = f"{name} == 0 || " if "null when" in pointers.described(function)[name][0] else ""
     claims, does = [], []
     if pointer.kind == "by":

@@ -4,11 +4,12 @@
 what docs/proof.md says; and that faults which are planted in copies of the sources are found. Prints KTAP; ends with 1
 when something does not hold, and with 77 when the checker is not to be had.
 
-usage: prove.py CACHE MADE [--faults | --sample NUMBER] [OPERATION...]
+usage: prove.py CACHE MADE [--faults | --sample NUMBER | --same-as REVISION] [OPERATION...]
     CACHE      folder in which the checker is kept, and what was proved of these very sources
     MADE       folder for all that is written on the way
     --faults   plant every fault of faults.toml
     --sample   plant so many of them, those of the day; 8 when nothing is said
+    --same-as  prove instead that operations do what they did in that revision
     OPERATION  prove these alone, and plant the faults that are theirs
 """
 
@@ -29,6 +30,7 @@ import checker  # noqa: E402
 import figures  # noqa: E402
 import harness  # noqa: E402
 import promises  # noqa: E402
+import same  # noqa: E402
 import view  # noqa: E402
 from ktap import Ktap  # noqa: E402
 from verdicts import COMPILER, GUARD, LIMIT, OPTIONS, Verdict  # noqa: E402
@@ -152,6 +154,20 @@ def seen_as(fault, verdict):
                  if fault["seen"] in words and fault.get("at", "") in place), "")
 
 
+def told_apart(today, fault, folder, number):
+    """What is wrong with telling a layer with a fault from one without; nothing when they are found to differ."""
+    try:
+        found = today.against(planted(fault, folder / "tree"), f"{number}", fault["operation"])
+    except (view.Failed, same.Unlike) as reason:
+        return str(reason).splitlines()
+    wanted = "code" if fault.get("same_code") else "differs"
+    return [] if found.how == wanted else [f"held against today's layer: {same.WORDS[found.how]}", *found.why]
+
+
+def refactorings():
+    return tomllib.loads((HERE / "refactorings.toml").read_text(encoding="utf-8"))["refactoring"]
+
+
 def find(base, cbmc, fault, folder):
     """What is wrong with finding a fault, and what was seen of it."""
     try:
@@ -210,6 +226,19 @@ def the_faults(ktap, pool, program, cbmc, faults, folder):
         ktap.verdict(f"fault: {fault['what']}: {seen or fault['operation']}", wrong)
 
 
+def the_comparison(ktap, pool, today, faults, folder):
+    """Layers with faults are told from today's, and refactored ones are not."""
+    numbered = list(enumerate(faults))
+    told = in_turn(pool, lambda each: told_apart(today, each[1], folder / f"told-{each[0]}", each[0]), numbered)
+    for (_, fault), wrong in told:
+        ktap.verdict(f"told apart: {fault['what']}: {fault['operation']}", wrong)
+    for number, change in enumerate(refactorings()):
+        tree = planted(change, folder / f"refactored-{number}")
+        found = today.against(tree, f"refactored-{number}", change["operation"])
+        wrong = [] if found.how == "proved" else [same.WORDS[found.how], *found.why]
+        ktap.verdict(f"refactored, and the same: {change['what']}: {change['operation']}", wrong)
+
+
 def carry_out(ktap, chosen, names, faults):
     cbmc = checker.Checker(chosen.cache / "checker")
     made = chosen.made.resolve()
@@ -223,21 +252,32 @@ def carry_out(ktap, chosen, names, faults):
         if not checks:
             ktap.verdict("proof", ["nothing was proved"])
         the_faults(ktap, pool, program, cbmc, planting, made)
+        the_comparison(ktap, pool, same.Today(cbmc, made / "same"), planting, made)
     if not chosen.operation:
         figures.note("prove", operations=len(names), checks=checks, faults=len(faults))
     which = f", those of day {day}" if planting != faults else ""
     print(f"# {len(planting)} of {len(faults)} faults planted{which}")
 
 
+def compare(ktap, chosen, names):
+    cbmc = checker.Checker(chosen.cache / "checker")
+    with concurrent.futures.ThreadPoolExecutor(len(os.sched_getaffinity(0))) as pool:
+        same.with_revision(ktap, cbmc, pool, chosen.same_as, names, chosen.made.resolve())
+
+
 def asked_for(words):
     """(what was asked for, the operations to prove, the faults that are theirs)"""
-    parser = argparse.ArgumentParser(usage="./dev prove [--faults | --sample NUMBER] [OPERATION...]", add_help=False)
+    parser = argparse.ArgumentParser(usage="./dev prove [--faults | --sample NUMBER | --same-as REVISION] "
+                                           "[OPERATION...]", add_help=False)
     parser.add_argument("cache", type=pathlib.Path)
     parser.add_argument("made", type=pathlib.Path)
     parser.add_argument("--faults", action="store_true")
     parser.add_argument("--sample", type=int, default=SAMPLE)
+    parser.add_argument("--same-as", metavar="REVISION")
     parser.add_argument("operation", nargs="*")
     chosen = parser.parse_intermixed_args(words)  # the option may stand in front of the operations
+    if chosen.same_as and (chosen.faults or chosen.sample != SAMPLE):
+        parser.error("--same-as plants no faults")
     if chosen.sample < 1:
         parser.error("--sample: at least 1")
     names = [function.name for function in harness.operations(ROOT)]
@@ -252,11 +292,14 @@ def main():
     chosen, names, faults = asked_for(sys.argv[1:])
     began, skipped, ktap = time.monotonic(), False, Ktap()
     try:
-        carry_out(ktap, chosen, names, faults)
+        if chosen.same_as:
+            compare(ktap, chosen, names)
+        else:
+            carry_out(ktap, chosen, names, faults)
     except checker.Unavailable as reason:
         ktap.skip("proof", str(reason).replace("\n", " "))
         skipped = True
-    except (view.Failed, promises.Unclear) as reason:
+    except (view.Failed, promises.Unclear, same.Unlike) as reason:
         ktap.verdict("proof", str(reason).splitlines())
     ktap.end()
     spent = os.times()

@@ -16,6 +16,7 @@ import harness  # noqa: E402
 import pointers  # noqa: E402
 import promises  # noqa: E402
 import prove  # noqa: E402
+import same  # noqa: E402
 import verdicts  # noqa: E402
 import view  # noqa: E402
 
@@ -140,6 +141,77 @@ class Promises(unittest.TestCase):
         for name in self.functions:
             for world in harness.WORLDS:
                 self.assertEqual(1, text.count(f"void {world}_{name}(void)"), name)
+
+
+class Same(unittest.TestCase):
+    def test_texts_are_objects_by_their_contents(self):
+        texts = same.Texts()
+        self.assertEqual(texts.name('"a%d"'), texts.name('"a"\n   "%d"'))
+        self.assertNotEqual(texts.name('"a"'), texts.name('"b"'))
+        self.assertEqual(3, texts.defined().count("[1];"))
+
+    def test_calls_with_values_are_told_by_their_number(self):
+        known = set()
+        text = 'void Log(int, const char*, ...); f() { Log(0, x); Log(1, y[a, b], g(c, d), e); }'
+        self.assertEqual("void Log(int, const char*, ...); f() { Log_0(0, x); "
+                         "Log_2(1, y[a, b], (__SIZE_TYPE__)(g(c, d)), (__SIZE_TYPE__)(e)); }",
+                         same.by_number_of_values(text, "Log", 2, known))
+        self.assertEqual({("Log", 0), ("Log", 2)}, known)
+
+    def test_what_can_be_touched_is_read_from_the_text(self):
+        every = same.leaves(view.ROOT)
+        self.assertEqual(len(every), len({leaf.place for leaf in every}))
+
+        def touched(text):
+            return {leaf.place for leaf in same.mentioned(every, text)}
+
+        self.assertEqual({"_arPmxConf[0].ucMode", "MutexPMX"}, touched("const PMX_CONF_T* p; p->ucMode = MutexPMX;"))
+        self.assertEqual(8, len(touched("p->arPortInfo[i].fgConnected = 1;")))
+        self.assertEqual(8 * 9, len(touched("x = p->arPortInfo[i];")))
+        self.assertEqual(8 * 9, len(touched("memcpy(a, prPort, 3); p->arPortInfo[i].fgEnabled;")))
+        for text in ("memcpy(prConf, &_arPmxConfDefault, 9);", "PMX_CONF_T rConf;", "*prPmxConf() = x;"):
+            self.assertEqual(len(every), len(touched(text)))
+
+    def test_what_the_checker_says_is_taken_apart(self):
+        ends = "".join(f"[end.assertion.{i}] line 9 {harness.REACHED}: FAILURE\n" for i in range(2))
+        said = same.Said(f"[end.assertion.7] line 8 {same.SAME}result: FAILURE\n{ends}")
+        self.assertEqual(({"end.assertion.7": "same: result"}, [], []), (said.different, said.odd, said.undefined))
+        self.assertTrue(said.is_reached(True))
+        self.assertFalse(said.is_reached(False))
+        self.assertEqual(["f: division by zero in a / b"],
+                         same.Said(f"[f.1] line 2 division by zero in a / b: FAILURE\n{ends}").undefined)
+        for text in (f"[called.1] line 2 {same.ROOM}: FAILURE",
+                     "[f.unwind.0] line 3 unwinding assertion loop 0: FAILURE",
+                     "[f.1] line 2 division by zero: UNKNOWN", "no body for function f", "killed"):
+            self.assertEqual(1, len(same.Said(f"{text}\n").odd), text)
+
+    def test_code_is_the_same_when_all_that_it_rests_on_is(self):
+        with tempfile.TemporaryDirectory() as directory:
+            today = same.Today(None, pathlib.Path(directory))
+            tree = prove.planted({"file": "pmx_handshake.cpp", "from": "PMX_SetOsdEnableFlag(FALSE);",
+                                  "to": "PMX_SetOsdEnableFlag(TRUE);"}, pathlib.Path(directory) / "tree")
+            pair = today.pair(tree, "planted")
+            for name, is_same in (("PMX_SetOsdEnable", False), ("_PMX_TmrIsr", False), ("PMX_SetModeEx", False),
+                                  ("PMX_SetOsdEnableFlag", True), ("PMX_SetEnable", True)):
+                self.assertEqual(is_same, pair.same_code(name), name)
+            self.assertEqual([], pair.different_tables())
+            path = tree / view.LAYER / "pmx_lifecycle.cpp"
+            text = path.read_text(encoding="utf-8")
+            path.write_text(f"{text}\nUINT32 u4Secret = 0;\n", encoding="utf-8")
+            with self.assertRaisesRegex(same.Unlike, "u4Secret"):
+                today.pair(tree, "secret")
+            path.write_text(text, encoding="utf-8")
+            path = tree / view.LAYER / "pmx_if.cpp"
+            text = path.read_text(encoding="utf-8")
+            swapped = text.replace(".pi4OsdDisabled = i4PmxOsdDisabled", ".pi4OsdDisabled = i4PmxVdpDisabled")
+            path.write_text(swapped, encoding="utf-8")
+            self.assertEqual(["_rPMXIF"], today.pair(tree, "swapped").different_tables())
+
+    def test_each_refactoring_can_be_planted_and_belongs_to_an_operation(self):
+        names = {function.name for function in harness.operations(harness.ROOT)}
+        for change in prove.refactorings():
+            self.assertTrue(prove.faulty(change))
+            self.assertIn(change["operation"], names)
 
 
 class Verdicts(unittest.TestCase):

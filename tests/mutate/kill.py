@@ -21,6 +21,7 @@ from mutants import Failed
 STARTED = re.compile(r"^\[ RUN      \] (\S+)$", re.M)
 FAILED = re.compile(r"^\[  FAILED  \] ([^\s,]+)", re.M)
 FIRST, QUICK, SLOWER = 0.01, 0.02, 0.2  # parts of the time of all: what runs first, next, and then
+WATCHED = 0.05  # what runs guarded: whoever runs the place at all shows what it may not do
 MOST_PRINTED = 50_000_000  # bytes
 MOST_MEMORY = 4_000_000_000
 GUARDED = ".guarded"  # a program whose layer stops where it leaves an object, or does what has no meaning
@@ -167,7 +168,8 @@ class Cases:
         if mutant.name in self._before:
             program, _, case = self._before[mutant.name].partition(":")
             yield program, [case], self._limit([plain(self._before[mutant.name])], program)
-        guarded = [(program + GUARDED, case) for program, case in self._covering(mutant)]
+        covering = self._covering(mutant)
+        guarded = [(program + GUARDED, case) for program, case in self._within(covering, WATCHED) or covering[:1]]
         for go in [*goes, guarded]:
             for program in sorted({program for program, _ in go}):
                 cases = [case for case in go if case[0] == program]

@@ -9,6 +9,7 @@ operation, enumerator or text is in it without a further line here.
 """
 
 import functools
+import hashlib
 import json
 import pathlib
 import re
@@ -24,6 +25,7 @@ LOGS = sorted(pathlib.Path("tests/decode").glob("*.log"))
 # A state is large: a few tell all that there is in one.
 STATES = 4
 LONGEST_ENTRY = 60
+LIFE = 128  # bytes
 # Of a scenario that is not met: a test of its own tells that, and what it has shown is a seed all the same.
 FAILED_STEP = 1
 
@@ -50,6 +52,16 @@ def examples(tool):
     for operation in tool.json("ops", "--json"):
         if operation.get("example"):
             yield operation["name"], "\n".join([*operation["example_needs"], operation["example"], ""])
+
+
+def lives(tool):
+    """Any bytes are one: as many as there are operations, that have little in common."""
+    for operation in tool.json("ops", "--json"):
+        yield operation["name"], hashlib.shake_128(operation["name"].encode()).digest(LIFE)
+
+
+def words_of_lives(tool):
+    return [bytes([mode["number"]]) for mode in tool.json("modes", "--json")]
 
 
 def scenarios(tool):
@@ -214,6 +226,7 @@ def words_of_recordings(_):
 
 
 TARGETS = {
+    "operations": (lives, words_of_lives),
     "scenario": (scenarios, words_of_the_language),
     "state": (states, words_of_states),
     "board": (boards, lambda tool: [*words_of_files(BOARDS), *words_of_the_language(tool)]),

@@ -3,20 +3,16 @@
 #include <cstddef>
 #include <cstdint>
 
+#include "board/board.h"
 #include "fuzz/support/holds.h"
+#include "fuzz/support/life.h"
 #include "fuzz/support/place.h"
-#include "fuzz/support/scenario.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
-    fuzz::file_with({ reinterpret_cast<const char*>(data), size }, "image.bin");
-    const fuzz::Shown shown = fuzz::run("power-on\n"
-                                        "flash fast_init_param image.bin\n"
-                                        "PMX_Init\n"
-                                        "PMX_SetMode 0 RES_720P60HZ 60 FALSE\n"
-                                        "PMX_Reset 0\n"
-                                        "advance 20s\n"
-                                        "PMX_Uninit\n");
-    fuzz::must(shown.done, "the layer runs, whatever the boot partition holds");
+    board::Description description;
+    description.flash["fast_init_param"] = fuzz::file_with({ reinterpret_cast<const char*>(data), size }, "image.bin");
+    fuzz::run_layer(description);
+    fuzz::must(board::misuses() == 0, "the layer runs, whatever the boot partition holds");
     return 0;
 }

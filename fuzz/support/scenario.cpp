@@ -92,14 +92,13 @@ std::string harmless(std::string_view bytes)
     return kept;
 }
 
-Shown run(const std::string& lines, pmxboard::OutputOptions options, const std::string& board)
+Shown run(const std::string& lines, pmxboard::OutputOptions options)
 {
     std::istringstream in(lines);
     std::ostringstream people;
     std::ostringstream diagnostics;
     options.to = &people;
-    const std::string default_board = (project() / "boards" / "default").string();
-    const pmxboard::Scenario scenario{ (place() / "fuzz.pmx").string(), board.empty() ? default_board : board,
+    const pmxboard::Scenario scenario{ (place() / "fuzz.pmx").string(), (project() / "boards" / "default").string(),
                                        "pmxboard run fuzz.pmx" };
     const bool done = pmxboard::run_scenario(in, scenario, options, diagnostics);
     must_be_fit(people.str());

@@ -22,8 +22,7 @@ struct Shown
     std::string diagnostics;
 };
 
-/** Run lines that stand in place(), on a board file or, without one, on the default board. What is shown is fit for a
- *  terminal. */
-Shown run(const std::string& lines, pmxboard::OutputOptions options = {}, const std::string& board = {});
+/** Run lines that stand in place() on the default board. What is shown is fit for a terminal. */
+Shown run(const std::string& lines, pmxboard::OutputOptions options = {});
 
 } // namespace fuzz

@@ -22,8 +22,9 @@ bool begins_with(std::string_view candidate, std::string_view beginning)
            std::equal(beginning.begin(), beginning.end(), candidate.begin(), same_letter);
 }
 
-/** Number of letters to insert, delete, replace or exchange with their neighbour; case does not count. */
-std::size_t distance(std::string_view a, std::string_view b)
+/** Number of letters to insert, delete, replace or exchange with their neighbour; case does not count. More than `most`
+ *  are not counted to the end: it never gets less from row to row. */
+std::size_t distance(std::string_view a, std::string_view b, std::size_t most)
 {
     std::vector<std::size_t> before(b.size() + 1), above(b.size() + 1), row(b.size() + 1);
     std::iota(above.begin(), above.end(), std::size_t{ 0 });
@@ -39,6 +40,8 @@ std::size_t distance(std::string_view a, std::string_view b)
         }
         before = above;
         above = row;
+        if (const std::size_t least = *std::min_element(row.begin(), row.end()); least > most)
+            return least;
     }
     return above[b.size()];
 }
@@ -60,7 +63,7 @@ std::vector<std::string> nearest(std::string_view wrong, const std::vector<std::
             std::max(candidate.size(), wrong.size()) - std::min(candidate.size(), wrong.size());
         if (!is_begun && difference > most)
             continue;
-        const std::size_t changes = is_begun ? 0 : distance(wrong, candidate);
+        const std::size_t changes = is_begun ? 0 : distance(wrong, candidate, most);
         if (changes <= most && changes < candidate.size())
             near.emplace_back(changes, candidate);
     }

@@ -52,10 +52,18 @@ bool is_wide(char32_t code)
            (code >= 0x1F000 && code <= 0x1FAFF) || (code >= 0x20000 && code <= 0x3FFFD);
 }
 
+/** Characters of one byte and one column, as nearly all are. */
+bool is_plain(char c)
+{
+    return c >= ' ' && c <= '~';
+}
+
 } // namespace
 
 std::string printable(std::string_view bytes, std::size_t columns)
 {
+    if (bytes.size() <= columns && std::all_of(bytes.begin(), bytes.end(), is_plain))
+        return std::string(bytes);
     constexpr std::string_view hex = "0123456789ABCDEF";
     std::string text;
     std::size_t kept = 0; // bytes of text that leave a column for the mark

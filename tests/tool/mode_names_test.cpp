@@ -18,7 +18,7 @@ using pmxboard::refresh_of;
 using tool_test::diagnostics;
 using tool_test::run;
 
-std::string refused(const std::string& written)
+std::string refusal_of(const std::string& written)
 {
     try
     {
@@ -70,12 +70,12 @@ TEST(ModeNames, AsPeopleWriteThem)
 
 TEST(ModeNames, Unknown_IsAnsweredWithTheNearest)
 {
-    EXPECT_EQ(0u, refused("1080p").find("no mode is called 1080p; did you mean ")) << refused("1080p");
-    EXPECT_EQ("no mode is called 720p55; did you mean 720p50, 720p60?", refused("720p55"));
-    EXPECT_EQ("mode: PMX_TV_TYPE_PAL is the name of something else", refused("PMX_TV_TYPE_PAL").substr(0, 51));
-    EXPECT_EQ(0u, refused("RES_480PP").find("mode: RES_480PP is neither a number nor a name"));
-    EXPECT_EQ("10", refused("0x0A"));
-    EXPECT_EQ(0u, refused("").find("mode: ")) << refused("");
+    EXPECT_EQ(0u, refusal_of("1080p").find("no mode is called 1080p; did you mean ")) << refusal_of("1080p");
+    EXPECT_EQ("no mode is called 720p55; did you mean 720p50, 720p60?", refusal_of("720p55"));
+    EXPECT_EQ("mode: PMX_TV_TYPE_PAL is the name of something else", refusal_of("PMX_TV_TYPE_PAL").substr(0, 51));
+    EXPECT_EQ(0u, refusal_of("RES_480PP").find("mode: RES_480PP is neither a number nor a name"));
+    EXPECT_EQ("10", refusal_of("0x0A"));
+    EXPECT_EQ(0u, refusal_of("").find("mode: ")) << refusal_of("");
 }
 
 TEST(OutputsVerb, IsTheFullCall)

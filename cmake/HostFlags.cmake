@@ -58,6 +58,15 @@ if(PMX_SANITIZE)
     target_link_options(pmx_host INTERFACE ${PMX_SANITIZE_FLAGS})
 endif()
 
+# Half a hundred programs of a debug build are linked with the faster linker, where it is there. What others get is
+# linked by the compiler's own, and so is what has PMX_OWN_LINKER.
+if(PMX_SANITIZE STREQUAL ON)
+    find_program(PMX_LLD ld.lld)
+    if(PMX_LLD)
+        target_link_options(pmx_host INTERFACE $<$<NOT:$<BOOL:$<TARGET_PROPERTY:PMX_OWN_LINKER>>>:-fuse-ld=lld>)
+    endif()
+endif()
+
 # What tests run of board and tool is counted by clang, in a build of its own. It warns of nothing: other builds do.
 option(PMX_COVERAGE "Count what the tests run of board and tool; clang alone can" OFF)
 set(PMX_COVERAGE_FLAGS "")

@@ -88,7 +88,7 @@ endif()
 
 # Sources that are compiled together, so that the headers that all of them include are read once.
 # Two sources of a library must not give the same name to two things, then, wherever they stand.
-set(PMX_BATCH 8 CACHE STRING "Sources of board, tool and tests that are compiled together; 1: each alone")
+set(PMX_BATCH 24 CACHE STRING "Sources of board, tool and tests that are compiled together; 1: each alone")
 
 function(pmx_in_batches name)
     if(PMX_BATCH GREATER 1)

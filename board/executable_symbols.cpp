@@ -123,17 +123,22 @@ std::string_view name_of(const Table& from, const ElfW(Sym) & symbol)
     return { from.names + symbol.st_name, strnlen(from.names + symbol.st_name, from.names_size - symbol.st_name) };
 }
 
+/** Whether that many characters and an end can stand where the symbol's name begins. */
+bool has_room(const Table& from, const ElfW(Sym) & symbol, std::size_t size)
+{
+    return symbol.st_name < from.names_size && from.names_size - symbol.st_name > size;
+}
+
 bool has_name(const Table& from, const ElfW(Sym) & symbol, std::string_view name)
 {
     // Where the name ends tells nearly all others apart.
-    return symbol.st_name < from.names_size && from.names_size - symbol.st_name > name.size() &&
-           from.names[symbol.st_name + name.size()] == '\0' &&
+    return has_room(from, symbol, name.size()) && from.names[symbol.st_name + name.size()] == '\0' &&
            std::memcmp(from.names + symbol.st_name, name.data(), name.size()) == 0;
 }
 
 bool begins_with(const Table& from, const ElfW(Sym) & symbol, std::string_view prefix)
 {
-    return symbol.st_name < from.names_size && from.names_size - symbol.st_name > prefix.size() &&
+    return has_room(from, symbol, prefix.size()) &&
            std::memcmp(from.names + symbol.st_name, prefix.data(), prefix.size()) == 0;
 }
 
@@ -157,7 +162,7 @@ std::optional<Symbol> find_exactly(std::string_view name)
     bool ambiguous = false;
     for (const ElfW(Sym) & symbol : all)
     {
-        if (!has_name(all, symbol, name) || !is_defined(symbol))
+        if (!is_defined(symbol) || !has_name(all, symbol, name))
             continue;
         const Symbol candidate{ all.address(symbol), symbol.st_size };
         if (is_global(symbol))
@@ -223,7 +228,7 @@ std::string_view name_at(const void* address)
     std::string_view name;
     for (const ElfW(Sym) & symbol : all)
     {
-        if (symbol.st_value != value || !is_defined(symbol))
+        if (!is_defined(symbol) || symbol.st_value != value)
             continue;
         if (name.empty() || is_global(symbol))
             name = name_of(all, symbol);

@@ -16,50 +16,30 @@ template <typename T>
 Node single(std::string name, std::size_t offset, std::string owner)
 {
     static_assert(std::is_integral_v<T> || std::is_enum_v<T> || std::is_pointer_v<T>);
-    const auto family = board::names::family_of(owner, name);
     return { .name = std::move(name),
              .form = std::is_pointer_v<T> ? Node::Form::Pointer : Node::Form::Number,
              .offset = offset,
              .size = sizeof(T),
              .is_signed = std::is_signed_v<T>,
              .owner = std::move(owner),
-             .family = family,
-             .children = {},
-             .names = {} };
-}
-
-std::vector<std::string> names_of(const std::vector<Node>& children)
-{
-    std::vector<std::string> names;
-    for (const Node& child : children)
-        names.push_back(child.name);
-    return names;
-}
-
-Node several(Node::Form form, std::string name, std::size_t offset, std::size_t size, std::vector<Node> children)
-{
-    return { .name = std::move(name),
-             .form = form,
-             .offset = offset,
-             .size = size,
-             .is_signed = false,
-             .owner = {},
-             .family = board::names::Family::None,
-             .children = std::move(children),
-             .names = {} };
+             .children = {} };
 }
 
 Node record(std::string name, std::size_t offset, std::size_t size, std::vector<Node> children)
 {
-    board::Value::Names names(names_of(children));
-    Node node = several(Node::Form::Record, std::move(name), offset, size, std::move(children));
-    node.names = std::move(names);
-    return node;
+    return { .name = std::move(name),
+             .form = Node::Form::Record,
+             .offset = offset,
+             .size = size,
+             .is_signed = false,
+             .owner = {},
+             .children = std::move(children) };
 }
 
 Node list(std::string name, std::size_t offset, std::size_t count, const Node& item)
 {
-    Node node = several(Node::Form::List, std::move(name), offset, count * item.size, std::vector<Node>(count, item));
+    Node node = record(std::move(name), offset, count * item.size, std::vector<Node>(count, item));
+    node.form = Node::Form::List;
     for (std::size_t i = 0; i < count; ++i)
         node.children[i].offset = i * item.size;
     return node;

@@ -5,11 +5,9 @@
 #pragma once
 
 #include <cstddef>
-#include <optional>
 #include <string>
 #include <vector>
 
-#include "board/names.h"
 #include "board/value.h"
 
 namespace record_view
@@ -32,9 +30,7 @@ struct Node
     std::size_t size = 0;
     bool is_signed = false;
     std::string owner; ///< the record that holds it: "PMX_CONF_T"; empty for an object of its own
-    board::names::Family family = board::names::Family::None; ///< whose names its number has
     std::vector<Node> children;
-    std::optional<board::Value::Names> names; ///< of a record: its children's
 };
 
 /** An object of the module. */
@@ -56,7 +52,7 @@ const std::vector<Object>& objects();
 /** Where an object lies in this executable. Throws std::runtime_error. */
 unsigned char* address_of(const Object& object);
 
-/** What stands at a node's place, also in a copy of the object; numbers carry their names. */
+/** What stands at the place of a node of objects(), also in a copy of the object; numbers carry their names. */
 board::Value value_at(const Node& node, const unsigned char* at);
 /** The number alone, or a pointer's, of a single field. */
 std::int64_t plain_number_at(const Node& node, const unsigned char* at);

@@ -3,7 +3,9 @@
 #include <bit>
 #include <cstring>
 #include <map>
+#include <optional>
 #include <stdexcept>
+#include <unordered_map>
 
 #include "board/executable_symbols.h"
 #include "board/names.h"
@@ -25,12 +27,42 @@ bool reads_best_in_hex(std::string_view name)
     return name == "u4BgColor" || name == "u4Capability" || name == "u4PlaneOrder" || name == "PMX_debug_level";
 }
 
+/** What is known of a node before it is read. */
+struct Known
+{
+    board::names::Family family = board::names::Family::None; ///< whose names its number has
+    std::optional<Value::Names> names;                        ///< of a record: its children's
+};
+
+Known looked_up(const Node& node)
+{
+    Known known;
+    if (is_single(node))
+        known.family = board::names::family_of(node.owner, node.name);
+    if (node.form == Node::Form::Record)
+    {
+        std::vector<std::string> names;
+        for (const Node& child : node.children)
+            names.push_back(child.name);
+        known.names = Value::Names(std::move(names));
+    }
+    return known;
+}
+
+/** Looked up once: whole states are read at every command. All nodes are those of objects(), which stay. */
+const Known& known_of(const Node& node)
+{
+    static std::unordered_map<const Node*, Known> all;
+    const auto found = all.find(&node);
+    return found != all.end() ? found->second : all.emplace(&node, looked_up(node)).first->second;
+}
+
 Value number_at(const Node& node, const unsigned char* at)
 {
     const std::int64_t number = plain_number_at(node, at);
     if (node.form == Node::Form::Pointer)
         return number == 0 ? Value::null() : Value::number(number, {}, Value::Base::Hex);
-    return Value::number(number, board::names::name_of(node.family, number),
+    return Value::number(number, board::names::name_of(known_of(node).family, number),
                          reads_best_in_hex(node.name) ? Value::Base::Hex : Value::Base::Decimal);
 }
 
@@ -82,7 +114,7 @@ Value value_at(const Node& node, const unsigned char* at)
     for (const Node& child : node.children)
         items.push_back(value_at(child, at + child.offset));
     return node.form == Node::Form::List ? Value::list(std::move(items))
-                                         : Value::record(node.names.value(), std::move(items));
+                                         : Value::record(known_of(node).names.value(), std::move(items));
 }
 
 } // namespace record_view

@@ -75,20 +75,21 @@ std::string listing(const char* title, const std::vector<std::string>& lines, st
     return text;
 }
 
-testing::AssertionResult entries_are(const std::string& expected_lines,
-                                     const std::function<bool(const board::TraceEntry&)>& admitted)
+testing::AssertionResult compare_entries(const std::vector<std::string>& expected,
+                                         const std::function<bool(const board::TraceEntry&)>& admitted)
 {
-    const std::vector<std::string> expected = lines_of(expected_lines);
-    board::trace::look();
-    std::vector<board::TraceEntry> entries;
-    std::copy_if(board::trace::entries().begin(), board::trace::entries().end(), std::back_inserter(entries), admitted);
-    board::trace::clear();
+    std::vector<const board::TraceEntry*> entries;
+    for (const board::TraceEntry& entry : board::trace::entries())
+    {
+        if (admitted(entry))
+            entries.push_back(&entry);
+    }
 
     std::string reason;
     std::size_t same = 0;
     try
     {
-        while (same < expected.size() && same < entries.size() && entries[same].matches(expected[same]))
+        while (same < expected.size() && same < entries.size() && entries[same]->matches(expected[same]))
             ++same;
     }
     catch (const std::invalid_argument& error)
@@ -99,10 +100,19 @@ testing::AssertionResult entries_are(const std::string& expected_lines,
         return testing::AssertionSuccess();
 
     std::vector<std::string> actual;
-    for (const board::TraceEntry& entry : entries)
-        actual.push_back(entry.brief());
+    for (const board::TraceEntry* const entry : entries)
+        actual.push_back(entry->brief());
     return testing::AssertionFailure() << "The trace is different at line " << same + 1 << "." << reason << "\n"
                                        << listing("Expected:", expected, same) << listing("Actual:", actual, same);
+}
+
+testing::AssertionResult entries_are(const std::string& expected_lines,
+                                     const std::function<bool(const board::TraceEntry&)>& admitted)
+{
+    board::trace::look();
+    const testing::AssertionResult result = compare_entries(lines_of(expected_lines), admitted);
+    board::trace::clear();
+    return result;
 }
 
 std::vector<std::uint8_t> little_endian(std::uint32_t word)

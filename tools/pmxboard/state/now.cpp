@@ -19,11 +19,12 @@ board::Value whole_state()
 
 board::Value state_at(const std::string& path)
 {
+    // No field of the layer has a device's name, and the devices' states are made whole.
+    if (record_view::has(path))
+        return record_view::get(path);
     const board::Value board_state = board::state();
     if (const board::Value* const found = board_state.find(path); found != nullptr && !path.empty())
         return *found;
-    if (record_view::has(path))
-        return record_view::get(path);
     return part_of(whole_state(), path);
 }
 

@@ -280,7 +280,7 @@ Value state()
 Shown shown()
 {
     const Mixer& m = mixer_state;
-    return { m.mixed, m.muted, m.digital_out.enabled, m.digital_out.bits };
+    return { m.mixed, m.muted, m.digital_out.enabled, m.digital_out.bits, m.mode };
 }
 
 } // namespace board::mixer

@@ -20,6 +20,7 @@ struct Shown
     bool muted = false;
     bool digital_out = false;
     std::optional<std::uint8_t> digital_bits;
+    std::optional<std::uint8_t> mode;
 
     auto operator<=>(const Shown&) const = default;
 };

@@ -183,6 +183,22 @@ TEST(ChromeTrace, TheRulesFindFaults)
     EXPECT_FALSE(faults(changed).empty());
 }
 
+TEST(ChromeTrace, VideoPlanesMasterEnableAndMixersMode)
+{
+    const auto events = traced({ std::string(held_back) + "PMX_EnableVideoPlane 0 1\nneighbour vPmxNotMixPlane 0 0\n"
+                                                          "PMX_SetEnable 0 1\nPMX_SetEnable 0 0\n" });
+    const auto enables = spans(events, "master enable");
+    ASSERT_EQ(1u, enables.size());
+    EXPECT_EQ("on", enables[0].name);
+    EXPECT_LT(enables[0].end, spans(events, "mixer mode").back().end);
+    EXPECT_EQ("RES_1080P50HZ", spans(events, "mixer mode").back().name);
+    EXPECT_LT(span_of(spans(events, "video plane 1"), "plane 1 mixed").end, enables[0].begin);
+    const auto second = spans(events, "video plane 2");
+    ASSERT_EQ(2u, second.size()) << "out of the mix in PMX_Init, and back";
+    EXPECT_LT(second[1].begin, enables[0].begin);
+    EXPECT_LT(enables[0].end, second[1].end);
+}
+
 TEST(ChromeTrace, OperationsHoldTheirCalls)
 {
     const auto events = traced({ "PMX_Init\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\nPMX_GetTvType 0" });

@@ -146,7 +146,8 @@ TEST(Storyboard, ALaneFollowsTheRecordAndTheDevices)
     const Document run =
         storyboard_of({ "PMX_Init\n"
                         "PMX_SetModeEx 0 [ [0], [1, RES_1080P50HZ], [1, RES_576P], [1, RES_576I] ] 50 0 0\n"
-                        "poke ucVfreq 60\nneighbour TVE_SetBlackScreen 1 1\nPMX_SetMuteEnable 0 1\n" })["runs"][0];
+                        "poke ucVfreq 60\nneighbour TVE_SetBlackScreen 1 1\nPMX_SetMuteEnable 0 1\n"
+                        "PMX_EnableVideoPlane 0 1\nPMX_SetEnable 0 1\n" })["runs"][0];
     const auto texts = [&](const char* lane) {
         std::vector<std::string> found;
         for (const Document& span : spans_of_lane(run, lane))
@@ -156,6 +157,10 @@ TEST(Storyboard, ALaneFollowsTheRecordAndTheDevices)
     EXPECT_EQ((std::vector<std::string>{ "RES_1080P50HZ at 50 Hz", "RES_1080P50HZ at 60 Hz" }), texts("HDMI output"));
     EXPECT_EQ("RES_576I at 50 Hz, black", texts("composite output").back());
     EXPECT_EQ((std::vector<std::string>{ "muted" }), texts("mute"));
+    EXPECT_EQ((std::vector<std::string>{ "plane 1 mixed" }), texts("video plane 1"));
+    EXPECT_EQ((std::vector<std::string>{ "plane 2 mixed", "plane 2 mixed" }), texts("video plane 2"));
+    EXPECT_EQ((std::vector<std::string>{ "on" }), texts("master enable"));
+    EXPECT_EQ((std::vector<std::string>{ "RES_1080P60HZ", "RES_1080P50HZ" }), texts("mixer mode"));
 }
 
 TEST(Storyboard, PowerOnsStandOneBehindTheOther)

@@ -32,10 +32,10 @@ std::string flag_field(int lane)
 
 int lane_of_plane(unsigned plane)
 {
-    return lane_osd_plane_3 + static_cast<int>(plane - first_osd_plane);
+    return lane_plane_1 + static_cast<int>(plane - 1);
 }
 
-/** As much of the whole state as tells what outputs show and whether graphics wait. */
+/** As much of the whole state as tells what mixer and outputs show and whether graphics wait. */
 Value part_of_state()
 {
     Value status = Value::record({});
@@ -45,7 +45,8 @@ Value part_of_state()
                            { "tv_encoder", board::tv_encoder::state() },
                            { "hdmi_av", board::hdmi_av::state() },
                            { "os", Value::record({ { "timers", board::timers::state() } }) },
-                           { "record", Value::record({ { "ucVfreq", record_view::get("ucVfreq") } }) },
+                           { "record", Value::record({ { "ucVfreq", record_view::get("ucVfreq") },
+                                                       { "ucEnable", record_view::get("ucEnable") } }) },
                            { "status", status } });
 }
 
@@ -90,6 +91,7 @@ struct Seen
     std::int64_t osd_enable = 0;
     std::int64_t timer_set = 0;
     std::int64_t frequency = 0;
+    std::int64_t enable = 0;
 
     auto operator<=>(const Seen&) const = default;
 };
@@ -102,10 +104,12 @@ Seen seen_now()
     static const Field osd_enable("status.fgPmxEnabeOsdFlag");
     static const Field timer_set("status.fgTimerAlreadySet");
     static const Field frequency("record.ucVfreq");
+    static const Field enable("record.ucEnable");
     return { board::mixer::shown(),   board::tv_encoder::shown(),
              board::hdmi_av::shown(), board::timers::next_call_of(static_cast<std::uint32_t>(timer.number())),
              format_change.number(),  osd_enable.number(),
-             timer_set.number(),      frequency.number() };
+             timer_set.number(),      frequency.number(),
+             enable.number() };
 }
 
 States states_by_name()
@@ -117,9 +121,11 @@ States states_by_name()
     for (const int lane : { lane_format_change_flag, lane_osd_enable_flag, lane_timer_set_flag })
         states[lane] = record_view::get("status." + flag_field(lane)).as_number() != 0 ? flag_field(lane) : "";
     states[lane_timer] = running_timer(*part.find("os.timers"));
+    states[lane_enable] = status.enabled ? "on" : "";
+    states[lane_mixer_mode] = status.mode.kind() == Value::Kind::Null ? "" : status.mode.to_text();
     for (const PlaneStatus& plane : status.planes)
     {
-        if (plane.plane >= first_osd_plane && plane.mixed)
+        if (plane.mixed)
             states[lane_of_plane(plane.plane)] = "plane " + std::to_string(plane.plane) + " mixed";
     }
     states[lane_sink] = status.sink.plugged ? "plugged in" : "";
@@ -140,6 +146,8 @@ std::map<int, std::string> lane_names()
                                          { lane_board, "board" },
                                          { lane_graphics, "graphics" },
                                          { lane_timer, "display timer" },
+                                         { lane_enable, "master enable" },
+                                         { lane_mixer_mode, "mixer mode" },
                                          { lane_sink, "HDMI sink" },
                                          { lane_mute, "mute" },
                                          { lane_digital, "digital output" },
@@ -148,8 +156,8 @@ std::map<int, std::string> lane_names()
                                          { lane_composite, "composite output" } };
     for (const int lane : { lane_format_change_flag, lane_osd_enable_flag, lane_timer_set_flag })
         names[lane] = "flag " + flag_field(lane);
-    for (unsigned plane = first_osd_plane; plane <= last_osd_plane; ++plane)
-        names[lane_of_plane(plane)] = "OSD plane " + std::to_string(plane);
+    for (unsigned plane = 1; plane <= last_osd_plane; ++plane)
+        names[lane_of_plane(plane)] = (plane < first_osd_plane ? "video plane " : "OSD plane ") + std::to_string(plane);
     return names;
 }
 
@@ -161,7 +169,7 @@ std::string_view kind_of_lane(int lane)
         return "timer";
     if (lane >= lane_format_change_flag && lane <= lane_timer_set_flag)
         return "flag";
-    if (lane == lane_mute || (lane >= lane_osd_plane_3 && lane <= lane_osd_plane_8))
+    if (lane == lane_enable || lane == lane_mute || (lane >= lane_plane_1 && lane <= lane_plane_8))
         return "plane";
     return "output";
 }
@@ -177,6 +185,28 @@ std::shared_ptr<const States> states_now()
     if (known.size() == most_known)
         known.clear();
     return known[seen] = std::make_shared<const States>(states_by_name());
+}
+
+std::map<int, std::uint32_t> modes_now()
+{
+    std::map<int, std::uint32_t> modes;
+    if (const auto mode = board::mixer::shown().mode)
+        modes[lane_mixer_mode] = *mode;
+    const board::hdmi_av::Shown told = board::hdmi_av::shown();
+    int lane = lane_digital;
+    for (const auto& output : { told.digital, told.hdmi })
+    {
+        if (output && output->enabled)
+            modes[lane] = static_cast<std::uint32_t>(output->mode);
+        ++lane;
+    }
+    for (const board::tv_encoder::Shown& encoder : board::tv_encoder::shown())
+    {
+        if (encoder.has_format && encoder.enabled)
+            modes[lane] = encoder.target;
+        ++lane;
+    }
+    return modes;
 }
 
 } // namespace pmxboard

@@ -2,10 +2,12 @@
 #include "tools/pmxboard/view/vcd_trace.h"
 
 #include <algorithm>
+#include <array>
+#include <charconv>
 #include <ostream>
+#include <utility>
 
 #include "board/board.h"
-#include "tools/pmxboard/view/lanes.h"
 
 namespace pmxboard
 {
@@ -13,44 +15,60 @@ namespace
 {
 
 constexpr std::int64_t ns_per_us = 1000;
+constexpr int lane_power = lane_process;
+constexpr char first_code = '!';
+/** With a number's blank in front of the code. */
+constexpr const char* no_mode = "bx ";
 
 std::int64_t now_ns()
 {
     return static_cast<std::int64_t>(board::now().count()) * ns_per_us;
 }
 
-/** A wire's name has no blanks. */
-std::string wire_name(std::string name)
+std::string binary(std::uint32_t number)
 {
-    std::replace(name.begin(), name.end(), ' ', '_');
-    return name;
+    std::array<char, 32> digits{};
+    char* const end = std::to_chars(digits.data(), digits.data() + digits.size(), number, 2).ptr;
+    return "b" + std::string(digits.data(), end) + " ";
 }
 
-void declare(std::ostream& to, const std::string& code, const std::string& name)
+bool is_of_mode(int lane)
 {
-    to << "$var wire 1 " << code << ' ' << wire_name(name) << " $end\n";
+    return lane == lane_mixer_mode || (lane >= lane_digital && lane <= lane_composite);
 }
 
 } // namespace
 
-VcdTrace::VcdTrace(std::ostream& to) : m_to(to), m_power{ 0, "!" }
+VcdTrace::VcdTrace(std::ostream& to) : m_to(to)
 {
     m_to << "$version pmxboard $end\n$timescale 1 ns $end\n$scope module pmx $end\n";
-    declare(m_to, m_power.code, "power");
+    declare(lane_power, false, "power");
     for (const auto& [lane, name] : lane_names())
     {
         if (lane < first_lane_of_states)
             continue;
-        m_wires.push_back({ lane, std::string(1, static_cast<char>(m_power.code[0] + 1 + m_wires.size())) });
-        declare(m_to, m_wires.back().code, lane == lane_graphics ? "graphics held back" : name);
+        if (lane != lane_mixer_mode)
+            declare(lane, false, lane == lane_graphics ? "graphics held back" : name);
+        if (is_of_mode(lane))
+            declare(lane, true, lane == lane_mixer_mode ? name : name + " mode");
     }
     m_to << "$upscope $end\n$enddefinitions $end\n";
 }
 
-/** The last levels hold until here. */
+/** The last values hold until here. */
 VcdTrace::~VcdTrace()
 {
+    if (!m_written)
+        write({});
     m_to << '#' << m_tick + 1 << '\n' << std::flush;
+}
+
+void VcdTrace::declare(int lane, bool is_mode, std::string name)
+{
+    std::replace(name.begin(), name.end(), ' ', '_');
+    const std::string code(1, static_cast<char>(first_code + m_signals.size()));
+    m_to << "$var " << (is_mode ? "integer 32 " : "wire 1 ") << code << ' ' << name << " $end\n";
+    m_signals.push_back({ lane, is_mode, code, {} });
 }
 
 void VcdTrace::scenario(const std::string& name)
@@ -68,14 +86,11 @@ void VcdTrace::powered_on()
     if (m_written)
     {
         m_tick += ns_per_us;
-        set(m_power, false);
-        for (Wire& wire : m_wires)
-            set(wire, false);
+        write({});
         m_tick += ns_per_us;
     }
     m_clock_began = static_cast<std::int64_t>(m_tick) - now_ns();
     m_is_powered = true;
-    set(m_power, true);
     follow();
 }
 
@@ -99,26 +114,42 @@ void VcdTrace::follow()
 {
     if (!m_is_powered)
         return;
-    const std::shared_ptr<const States> states = states_now();
     m_tick = std::max(m_tick, static_cast<std::uint64_t>(m_clock_began + now_ns()));
-    if (std::any_of(m_wires.begin(), m_wires.end(), [&](const Wire& wire) {
-            return wire.level != 'x' && (wire.level == '1') != states->contains(wire.lane);
-        }))
-        m_tick = std::max(m_tick, *m_written + 1);
-    for (Wire& wire : m_wires)
-        set(wire, states->contains(wire.lane));
+    write({ true, states_now(), modes_now() });
 }
 
-void VcdTrace::set(Wire& wire, bool high)
+std::string VcdTrace::value_of(const Signal& signal, const Seen& seen)
 {
-    const char level = high ? '1' : '0';
-    if (wire.level == level)
+    if (signal.is_mode)
+    {
+        const auto mode = seen.modes.find(signal.lane);
+        return mode == seen.modes.end() ? no_mode : binary(mode->second);
+    }
+    const bool high = signal.lane == lane_power ? seen.has_power : seen.states->contains(signal.lane);
+    return high ? "1" : "0";
+}
+
+/** What differs; the first time that is everything. */
+void VcdTrace::write(const Seen& seen)
+{
+    if (m_written && seen == m_seen)
         return;
-    if (m_written != m_tick)
-        m_to << '#' << m_tick << '\n';
+    m_seen = seen;
+    std::string changes;
+    for (Signal& signal : m_signals)
+    {
+        std::string value = value_of(signal, seen);
+        if (signal.value == value)
+            continue;
+        changes += value + signal.code + '\n';
+        signal.value = std::move(value);
+    }
+    if (changes.empty())
+        return;
+    if (m_written == m_tick)
+        ++m_tick;
+    m_to << '#' << m_tick << '\n' << (m_written ? changes : "$dumpvars\n" + changes + "$end\n");
     m_written = m_tick;
-    m_to << level << wire.code << '\n';
-    wire.level = level;
 }
 
 } // namespace pmxboard

@@ -118,6 +118,17 @@ TEST(DecodeStory, ModeChange_NamesOutputsFormatAndFifthOsd)
                    "CCIR(0, 0, 0, 0)\nOSD5(2)\nHD Exist(1)\nPMX Start to set OSD Display mode:9.\n"));
 }
 
+TEST(DecodeStory, AModeWithoutANameOfItsOwn_IsToldAsFarAsItIsPrinted)
+{
+    const auto told_of = [](const std::string& printed) {
+        return told("SetModeEx\nCCIR(0, RES_480I)\nHDMI(1, " + printed +
+                    ")\nCAV (0, RES_480I)\nCVBS(0, RES_480I)\nCCIR(0, 0, 0, 0)\nOSD5(0)\n");
+    };
+    EXPECT_NE(std::string::npos, told_of("(null)").find("HDMI a mode without a name (4K)"));
+    EXPECT_NE(std::string::npos, told_of("(null)").find("gives the mixer mode without a name (4K)\n"));
+    EXPECT_NE(std::string::npos, told_of("RES_1080P50HZ").find("gives the mixer mode RES_1080P50HZ (13)\n"));
+}
+
 TEST(DecodeStory, AllOutputsOff_IsAProblem)
 {
     EXPECT_EQ("! 1-2 PMX_SetModeEx: mode change requested (its outputs are logged at level 9) | all outputs "

@@ -7,6 +7,7 @@
 
 #include "drv_if_pmx.h"
 #include "tools/pmxboard/decode/knowledge.h"
+#include "tools/pmxboard/decode/words.h"
 #include "tools/record_view/mode_table.h"
 
 namespace pmxboard::decode
@@ -191,6 +192,11 @@ struct Row
     Holds holds = nullptr;
 };
 
+bool tells_format(const Row& row)
+{
+    return row.a == format || row.b == format;
+}
+
 constexpr std::uint32_t wait_ms = static_cast<std::uint32_t>(timer_seconds * 1000);
 
 // docs/reasons.md lists them, written from these rows.
@@ -266,6 +272,12 @@ Value mode_called(const std::string& printed)
     return found;
 }
 
+/** What is printed of a mode, as it is read behind that word. */
+std::string words_behind_mode(const std::string& printed)
+{
+    return printed == "(null)" ? "without a name (4K)" : mode_words(printed);
+}
+
 } // namespace
 
 std::optional<std::uint32_t> CallSoFar::value_before(std::string_view text, std::string_view name) const
@@ -289,6 +301,7 @@ void CallSoFar::take_output(const Item& item)
         {
             m_decider = output;
             m_format = mode_called(item.value("eResMode"));
+            m_format_words = words_behind_mode(item.value("eResMode"));
         }
         ++m_outputs;
     }
@@ -315,7 +328,10 @@ std::vector<Determined> CallSoFar::take(const Item& item)
     {
         const auto& [reason, text, a, b, holds] = *row->second;
         if (holds == nullptr || holds(item, *this))
-            determined.push_back({ reason, { a(item, *this), b(item, *this) }, item.line });
+            determined.push_back({ reason,
+                                   { a(item, *this), b(item, *this) },
+                                   tells_format(*row->second) ? format_words() : "?",
+                                   item.line });
     }
     m_before = &item;
     return determined;

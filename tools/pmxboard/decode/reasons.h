@@ -8,6 +8,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <optional>
+#include <string>
 #include <string_view>
 #include <vector>
 
@@ -22,7 +23,8 @@ struct Determined
 {
     PMX_REASON_T number;
     ReasonValues values;
-    std::size_t line = 0; ///< that determines it, with those of its call before it
+    std::string unknown = "?"; ///< what stands in its sentence for a value that no line has
+    std::size_t line = 0;      ///< that determines it, with those of its call before it
 };
 
 /** What the lines of a call have told so far. */
@@ -51,6 +53,8 @@ public:
     std::optional<std::uint32_t> deciding_output() const { return m_decider; }
     /** The mode that the outputs give the mixer. */
     std::optional<std::uint32_t> format() const { return m_format; }
+    /** In words, where its number is not known: its name is that of several modes, or it has none. */
+    const std::string& format_words() const { return m_format_words; }
 
 private:
     void take_output(const Item& item);
@@ -62,6 +66,7 @@ private:
     std::uint32_t m_outputs = 0; ///< how many in a row, from the first on, are off
     std::optional<std::uint32_t> m_decider;
     std::optional<std::uint32_t> m_format;
+    std::string m_format_words = "?";
 };
 
 } // namespace pmxboard::decode

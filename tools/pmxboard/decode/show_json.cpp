@@ -34,7 +34,7 @@ Json json_of(const Determined& reason)
              { "name", row.name },
              { "class", row.class_name },
              { "values", values },
-             { "text", sentence_of(reason.number, reason.values) },
+             { "text", sentence_of(reason.number, reason.values, reason.unknown) },
              { "line", reason.line } };
 }
 

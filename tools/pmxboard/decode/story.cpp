@@ -183,7 +183,7 @@ void Teller::tell_reasons(const Item& item)
         event().reasons.push_back(determined);
         // Two are told by their rules, with how long after what.
         if (determined.number != PMX_REASON_TIMED_OUT && determined.number != PMX_REASON_MIXED_AGAIN)
-            event().details.push_back(sentence_of(determined.number, determined.values));
+            event().details.push_back(sentence_of(determined.number, determined.values, determined.unknown));
     }
 }
 

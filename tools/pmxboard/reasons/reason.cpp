@@ -158,11 +158,11 @@ bool is_refusal(const Reason& reason)
     return row_of(reason.number).class_of != PMX_REASON_CLASS_NOTE;
 }
 
-std::string sentence_of(PMX_REASON_T reason, const ReasonValues& values)
+std::string sentence_of(PMX_REASON_T reason, const ReasonValues& values, std::string_view unknown)
 {
     const ReasonRow& row = row_of(reason);
     return filled(row, [&](std::size_t i, std::string_view conversion) {
-        return values.at(i) ? shown(row.kinds.at(i), conversion, *values.at(i)) : "?";
+        return values.at(i) ? shown(row.kinds.at(i), conversion, *values.at(i)) : std::string(unknown);
     });
 }
 

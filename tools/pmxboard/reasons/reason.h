@@ -53,8 +53,8 @@ using ReasonValues = std::array<std::optional<std::uint32_t>, 2>;
 
 /** What it means with its values, by their names: "capability bit 9 is clear in 0x7FFBFDFF". */
 std::string sentence_of(const Reason& reason);
-/** The same, with a question mark for what nobody knows. */
-std::string sentence_of(PMX_REASON_T reason, const ReasonValues& values = {});
+/** The same, with that for what nobody knows. */
+std::string sentence_of(PMX_REASON_T reason, const ReasonValues& values = {}, std::string_view unknown = "?");
 /** The same for any values: "capability bit N is clear in WORD". */
 std::string general_sentence_of(const ReasonRow& row);
 /** "PMX_CheckCap, src/driver/pmx/pmx_mode.cpp:20" */

@@ -92,7 +92,7 @@ const Told each_reason[] = {
       { "PMX_SetMode 0 RES_1080P50HZ 50 0" } },
     { { "poke u4Capability 0" }, "PMX_SetGamma 0 1", { "capability bit 20 (gamma) is clear in 0x00000000" }, {} },
     { { "PMX_Init" }, "PMX_Init", { "the layer has been started already" }, {} },
-    { {}, "PMX_Stop", { "the layer is not started: its mark is 0" }, { "PMX_Init", "PMX_Stop" } },
+    { {}, "PMX_Stop", { "the layer is not started: its mark is 0" }, {} },
     { { "PMX_SetCBEnable 0 1" }, "PMX_SetCBEnable 0 1", { "it is set to 1 already" }, {} },
     { {},
       "PMX_EnableVideoPlane 0 2",
@@ -321,6 +321,28 @@ TEST_F(Explain, ACommandThatWouldFail_IsTold)
 {
     const std::string shown = shown_by("explain power-on no-such-board");
     EXPECT_NE(shown.find("  failed:  power-on no-such-board\n  but      "), shown.npos) << shown;
+}
+
+TEST_F(Explain, WhoEndsWhatIsNotStarted_HasNothingToDo)
+{
+    for (const char* const end : { "PMX_Uninit", "i4PMX_Uninit 2", "PMX_Stop" })
+    {
+        const std::string shown = shown_by(std::string("explain ") + end);
+        EXPECT_NE(shown.find("  nothing: "), shown.npos) << shown;
+        EXPECT_NE(shown.find("  so       nothing is to be done: it is so already\n"), shown.npos) << shown;
+        EXPECT_EQ(shown.find("PMX_Init"), shown.npos) << shown;
+        EXPECT_EQ("nothing", pmxboard::verdict_of(pmxboard::explain(m_session, end)));
+    }
+}
+
+TEST_F(Explain, AVerbIsToldByItsLine)
+{
+    carry_out({ "PMX_Init", "source vdp0 start 100x100", "i4Pmx_Disconnect PMX_COMP_TYPE_PMX 0 PMX_COMP_TYPE_VDP 0" });
+    const std::string shown = shown_by("explain source vdp0 size 200x200");
+    EXPECT_NE(shown.find("  refused: source vdp0 size 200x200 (answer: 0)\n"), shown.npos) << shown;
+    EXPECT_NE(shown.find("nobody has connected video plane 0"), shown.npos) << shown;
+    EXPECT_NE(shown_by("explain suspend").find("  done:    suspend (answer: 0)\n"), shown.npos);
+    EXPECT_NE(shown_by("explain PMX_SetMode 0 RES_2160P 50 0").find("  refused: PMX_SetMode = 0\n"), shown.npos);
 }
 
 TEST_F(Explain, WorksWhileStoresAreShown_AndAfterAnotherPowerOn)

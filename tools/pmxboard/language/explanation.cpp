@@ -194,6 +194,28 @@ std::string line_of(const std::string& begin, const std::string& text, const Loo
 
 } // namespace
 
+/** Who finds that the layer is not started wants to end it. */
+static bool is_so_already(const Reason& refusal)
+{
+    return refusal.number == PMX_REASON_NOT_STARTED || row_of(refusal.number).class_of == PMX_REASON_CLASS_SAME;
+}
+
+static std::string advice_of(const Reason& refusal)
+{
+    return std::string(row_of(is_so_already(refusal) ? PMX_REASON_STARTED_ALREADY : refusal.number).advice);
+}
+
+/** The operation with its answer, or a verb's line, for a verb's name alone would tell less. */
+static std::string name_of(const Explanation& explanation)
+{
+    const std::string& operation = explanation.operation;
+    const std::string& answer = explanation.answer;
+    const bool is_verb = find(operations(), operation) == nullptr && Line(explanation.command).word(0) == operation;
+    if (operation.empty() || is_verb)
+        return explanation.command + (answer.empty() ? "" : " (answer: " + answer + ")");
+    return operation + (answer.empty() ? "" : " = " + answer);
+}
+
 /** Whether an operation gives a reason itself. */
 static bool is_own(const std::string& operation, const Reason& reason)
 {
@@ -234,15 +256,13 @@ std::string verdict_of(const Explanation& explanation)
     const Reason* const refusal = explanation.refusal();
     if (refusal == nullptr)
         return "done";
-    return row_of(refusal->number).class_of == PMX_REASON_CLASS_SAME ? "nothing" : "refused";
+    return is_so_already(*refusal) ? "nothing" : "refused";
 }
 
 std::string to_text(const Explanation& explanation, const Look& look)
 {
     const Reason* const refusal = explanation.refusal();
-    const std::string what = explanation.operation.empty() ? explanation.command : explanation.operation;
-    const std::string with_answer = what + (explanation.answer.empty() ? "" : " = " + explanation.answer);
-    std::string text = explanation.headline.empty() ? line_of(verdict_of(explanation) + ":", with_answer, look)
+    std::string text = explanation.headline.empty() ? line_of(verdict_of(explanation) + ":", name_of(explanation), look)
                                                     : line_of(explanation.headline + ":", explanation.answer, look);
     std::string begin = "because";
     for (const Reason& reason : explanation.reasons)
@@ -252,7 +272,7 @@ std::string to_text(const Explanation& explanation, const Look& look)
         if (&reason == refusal)
         {
             text += line_of("at", place_of(reason), look);
-            text += line_of("so", std::string(row_of(reason.number).advice), look);
+            text += line_of("so", advice_of(reason), look);
         }
     }
     if (!explanation.failure.empty())
@@ -274,7 +294,7 @@ std::string to_json_line(const Explanation& explanation)
                         { "outcome", Json::parse(explanation.outcome) },
                         { "verdict", verdict_of(explanation) },
                         { "reason", refusal != nullptr ? board::json_of(json_of(*refusal)) : Json() },
-                        { "advice", refusal != nullptr ? Json(row_of(refusal->number).advice) : Json() },
+                        { "advice", refusal != nullptr ? Json(advice_of(*refusal)) : Json() },
                         { "reasons", reasons },
                         { "accepted", explanation.accepted },
                         { "failure", explanation.failure.empty() ? Json() : Json(printable(explanation.failure)) } };

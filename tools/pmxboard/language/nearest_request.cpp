@@ -318,7 +318,6 @@ Requests near_of_call(const WrittenCall& call, const Explanation& explanation, c
     switch (row_of(refusal.number).class_of)
     {
     case PMX_REASON_CLASS_MODE: return calls_with_other_modes(call, explanation);
-    case PMX_REASON_CLASS_START: return { { "PMX_Init", explanation.command } };
     case PMX_REASON_CLASS_CONNECT:
         return { { "i4Pmx_Connect PMX_COMP_TYPE_PMX 0 PMX_COMP_TYPE_VDP " + std::to_string(refusal.a),
                    explanation.command } };
@@ -329,6 +328,7 @@ Requests near_of_call(const WrittenCall& call, const Explanation& explanation, c
             return orders_without_doubles(call);
         return is_replaceable(refusal.number) ? calls_with_other_numbers(call, refusal) : Requests();
     case PMX_REASON_CLASS_NOTE:
+    case PMX_REASON_CLASS_START: // who finds that out wants to end it
     case PMX_REASON_CLASS_SAME:
     case PMX_REASON_CLASS_FEATURE:
     case PMX_REASON_CLASS_NEIGHBOUR: break;

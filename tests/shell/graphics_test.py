@@ -327,7 +327,27 @@ class Graphics(PictureTest):
         self.assertEqual(1, len(kitty_pictures(shown(PMXBOARD_GRAPHICS="kitty"))))
         self.assertEqual(plain, shown("--graphics", "none", PMXBOARD_GRAPHICS="kitty"))
         self.assertIn("--graphics", shown("--graphics", "sixels", code=2))
-        self.assertIn("paint", shown(code=2, PMXBOARD_GRAPHICS="paint"))
+
+    def test_a_variable_that_says_nothing_that_can_be_meant(self):
+        told = "PMXBOARD_GRAPHICS is \\x1Bpaint; it may be auto, none, blocks, sixel or kitty"
+        wrong = os.environ | {"PMXBOARD_GRAPHICS": "\x1bpaint"}
+
+        def ended(*arguments, lines=SCENE, code=0):
+            ran = subprocess.run([PROGRAM, *arguments], input="\n".join((*lines, "")), capture_output=True, text=True,
+                                 check=False, env=wrong)
+            self.assertEqual(code, ran.returncode, ran.stderr)
+            return ran.stdout + ran.stderr
+
+        for arguments in (("modes",), ("ops",), ("decode", "-"), ("run", "-"), ("shell",), ("--version",)):
+            with self.subTest(arguments=arguments):
+                self.assertNotIn("PMXBOARD_GRAPHICS", ended(*arguments, lines=()))
+        shot = (*SCENE, f"shot hdmi {self.home / 'menu.png'}", "shot hdmi")
+        self.assertIn(f"<stdin>:{len(shot)}: {told}\n", ended("run", "-", lines=shot, code=1))
+        self.assertIn(f"<stdin>:{len(shot)}: {told}\n", ended("shell", lines=shot, code=1))
+        self.assertNotIn("PMXBOARD_GRAPHICS", ended("run", "--graphics", "blocks", "-", lines=shot))
+        self.assertNotIn("PMXBOARD_GRAPHICS", ended("run", "--quiet", "-", lines=shot))
+        wrong["PMXBOARD_GRAPHICS"] = ""
+        self.assertNotIn("PMXBOARD_GRAPHICS", ended("run", "-", lines=shot))
 
 
 def main():

@@ -99,7 +99,7 @@ def sentences(text):
 
 def flag(entry):
     """(names, value, what else is needed) of an option as its help shows it."""
-    shown, _, needed = re.sub(r" \(Env:\w+\)", "", entry).partition(" Needs: ")
+    shown, _, needed = entry.partition(" Needs: ")
     names, _, value = shown.partition(" ")
     return names.split(","), value.removesuffix(" ...").replace(" REQUIRED", ""), needed
 

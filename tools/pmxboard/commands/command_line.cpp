@@ -22,6 +22,7 @@
 #include "tools/pmxboard/commands/run.h"
 #include "tools/pmxboard/commands/shell.h"
 #include "tools/pmxboard/commands/state.h"
+#include "tools/pmxboard/graphics/drawing.h"
 #include "tools/pmxboard/prompt/help.h"
 #include "tools/pmxboard/text/layout.h"
 #include "tools/pmxboard/text/printable.h"
@@ -49,10 +50,11 @@ void add_colour(CLI::App* sub, std::string& when)
 /** --graphics, for every sub-command that carries out `shot`; see drawing(). */
 void add_graphics(CLI::App* sub, std::string& how)
 {
+    // The parser would look into the variable for every sub-command, and not say what it does not like.
     sub->add_option("--graphics", how,
-                    "How shot draws: auto (as well as a terminal can), none (without colour), blocks, sixel or kitty")
-        ->envname("PMXBOARD_GRAPHICS")
-        ->check(CLI::IsMember({ "auto", "none", "blocks", "sixel", "kitty" }).description(""))
+                    "How shot draws: auto (as well as a terminal can), none (without colour), blocks, sixel or kitty; "
+                    "where it is missing PMXBOARD_GRAPHICS says so")
+        ->check(CLI::IsMember(ways_to_draw()).description(""))
         ->type_name("auto|none|blocks|sixel|kitty");
 }
 

@@ -16,7 +16,7 @@ struct RunOptions
     std::string trace_format = "text";
     std::string trace_file;
     std::string colour = "auto";
-    std::string graphics = "auto"; ///< see drawing()
+    std::string graphics; ///< see drawing()
     std::vector<std::string> only;
     std::vector<std::string> operations;
     std::string junit; ///< a file for the verdicts, as JUnit writes them

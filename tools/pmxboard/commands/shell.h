@@ -16,7 +16,7 @@ struct ShellOptions
 {
     std::string board;
     std::string colour = "auto";
-    std::string graphics = "auto"; ///< see drawing()
+    std::string graphics; ///< see drawing()
     std::vector<std::string> only;
     std::vector<std::string> operations;
     bool quiet = false;

@@ -14,12 +14,20 @@
 
 #include "board/picture/pixels.h"
 #include "board/picture/preview.h"
+#include "tools/pmxboard/functions/errors.h"
 #include "tools/pmxboard/graphics/terminal.h"
 #include "tools/pmxboard/report/base64.h"
+#include "tools/pmxboard/text/printable.h"
 #endif
 
 namespace pmxboard
 {
+
+const std::vector<std::string>& ways_to_draw()
+{
+    static const std::vector<std::string> ways = { "auto", "none", "blocks", "sixel", "kitty" };
+    return ways;
+}
 
 #ifdef PMX_HAS_PICTURES
 
@@ -30,6 +38,7 @@ namespace picture = board::picture;
 
 constexpr int widest_drawn = 960; ///< some terminals take no picture of more than 1000 pixels
 constexpr int most_colours = 256;
+constexpr std::size_t longest_told = 60;
 
 /** What a C library hands over, piece by piece. */
 struct Collected
@@ -71,6 +80,21 @@ std::string_view variable(const char* name)
 {
     const char* const value = std::getenv(name);
     return value == nullptr ? std::string_view() : value;
+}
+
+std::string way_of_surroundings()
+{
+    const std::string_view way = variable("PMXBOARD_GRAPHICS");
+    return way.empty() ? "auto" : std::string(way);
+}
+
+/** "one, two or three" */
+std::string all_ways()
+{
+    std::string all;
+    for (const std::string& way : ways_to_draw())
+        all += (all.empty() ? "" : &way == &ways_to_draw().back() ? " or " : ", ") + way;
+    return all;
 }
 
 /** What the terminal can: a word of --graphics. */
@@ -143,8 +167,13 @@ std::string as_sixels(const picture::Image& image)
     return collected.text;
 }
 
-Drawing drawing(const std::string& how, bool colour, const GiveBack& give_back)
+Drawing drawing(const std::string& said, bool colour, const GiveBack& give_back)
 {
+    const std::string how = said.empty() ? way_of_surroundings() : said;
+    if (std::find(ways_to_draw().begin(), ways_to_draw().end(), how) == ways_to_draw().end())
+        return [how](const picture::Image&) -> std::string {
+            throw StepFailed("PMXBOARD_GRAPHICS is " + printable(how, longest_told) + "; it may be " + all_ways());
+        };
     if (how != "auto")
         return [how](const picture::Image& image) { return drawn_as(how, image); };
     if (!colour)

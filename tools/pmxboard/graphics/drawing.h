@@ -5,6 +5,7 @@
 
 #include <functional>
 #include <string>
+#include <vector>
 
 #include "tools/pmxboard/view/output.h"
 
@@ -14,9 +15,13 @@ namespace pmxboard
 /** Takes the keys back that somebody typed while the terminal was asked: they are the next to be read. */
 using GiveBack = std::function<void(const std::string& keys)>;
 
-/** What pictures are drawn with; empty: characters without colour.
+/** The words of --graphics and of PMXBOARD_GRAPHICS. */
+const std::vector<std::string>& ways_to_draw();
+
+/** What pictures are drawn with; empty: characters without colour. What cannot be drawn with throws StepFailed at each
+ *  picture, for who draws none need not care for the user's surroundings.
  *  @param how  what --graphics says: "none", "blocks", "sixel", "kitty", or "auto", which is as good as a terminal can
- *              that may get colour, and "none" otherwise
+ *              that may get colour, and "none" otherwise; empty: what PMXBOARD_GRAPHICS says, or "auto"
  *  @param colour  what wants_colour() says
  *  @param give_back  empty: the terminal is not asked, for keys would be lost. It is asked at the first picture */
 Drawing drawing(const std::string& how, bool colour, const GiveBack& give_back = {});

@@ -22,7 +22,7 @@ import time
 import unittest
 import zlib
 
-from terminal import CTRL_D, ENTER, PROMPT, Terminal, program_of
+from terminal import CTRL_C, CTRL_D, ENTER, PROMPT, Terminal, program_of
 
 CHECKED = OPTIMISED = ""
 KITTY_QUESTION = "\x1b_Gi=31,s=1,v=1,a=q,t=d,f=24;AAAA\x1b\\"
@@ -259,6 +259,48 @@ class Graphics(PictureTest):
         shell.wait_for("ucTvType = ")
         shell.wait_for(PROMPT)
         self.leave(shell)
+
+    def still_works(self, shell):
+        """An empty line is left, and what is typed is what is read."""
+        shell.type(CTRL_C)
+        shell.wait_for("^C\r\n" + PROMPT)
+        self.assertRegex(shell.command("state ucTvType"), r"^ *\S*ucTvType = ")
+        self.leave(shell)
+
+    def asked(self):
+        shell = self.start(LC_ALL="C.UTF-8")
+        shell.type("shot hdmi", ENTER)
+        shell.wait_for(ATTRIBUTES_QUESTION)
+        return shell
+
+    def test_an_answer_that_breaks_off_is_not_typed(self):
+        for answer in (WITH_SIXEL[:-1], WITH_SIXEL[:3], KITTY_ANSWER[:-2], KITTY_ANSWER[:3], KITTY_ANSWER + PLAIN[:5]):
+            with self.subTest(answer=answer):
+                shell = self.asked()
+                shell.type(answer)
+                shown = shell.wait_for(PROMPT)
+                self.assertEqual(KITTY_ANSWER not in answer, BLOCK in shown)
+                self.assertRegex(shell.command("state ucTvType"), r"^ *\S*ucTvType = ")
+                self.leave(shell)
+
+    def test_an_answer_that_comes_too_late_is_not_typed(self):
+        shell = self.asked()
+        self.assertIn(BLOCK, shell.wait_for(PROMPT))
+        shell.type("sta", KITTY_ANSWER, "te uc", WITH_SIXEL, "TvType", KITTY_REFUSAL, PLAIN, ENTER)
+        self.assertIn("ucTvType = ", shell.wait_for(PROMPT).replace("\r\n", "\n"))
+        shell.type(KITTY_ANSWER[:-2], CTRL_C)
+        shell.wait_for("^C\r\n" + PROMPT)
+        shell.type(WITH_SIXEL[:-1], CTRL_C)
+        shell.wait_for("^C\r\n" + PROMPT)
+        self.still_works(shell)
+
+    def test_bytes_that_are_no_text_take_no_key_along(self):
+        shell = self.asked()
+        os.write(shell.terminal, b"sta\0te\xff \xc3uc\0T\x80vType" + PLAIN.encode() + b"\r")
+        self.assertIn(BLOCK, shell.wait_for(PROMPT))
+        shell.wait_for("ucTvType = ")
+        shell.wait_for(PROMPT)
+        self.still_works(shell)
 
     def test_control_c_meanwhile_is_a_key(self):
         shell = self.start()

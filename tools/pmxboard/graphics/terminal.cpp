@@ -7,6 +7,7 @@
 #include <termios.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <array>
 #include <chrono>
 #include <iostream>
@@ -24,19 +25,66 @@ constexpr std::string_view attributes_question = "\x1b[c";
 /** Reached by what is no terminal, or very far away. */
 constexpr std::chrono::milliseconds longest_wait{ 2000 };
 
-/** Cut out what begins and ends so; what stood between. */
-std::optional<std::string> cut(std::string& text, std::string_view begin, std::string_view end)
+/** A terminal's answers are short; what is longer is none. */
+constexpr std::size_t longest_answer = 1000;
+/** Nobody types so much in that time: what is behind it stays with the terminal, and is read as keys are. */
+constexpr std::size_t most_received = 65536;
+
+/** What only a terminal sends: no key begins so. It may break off. */
+struct Report
 {
-    const std::size_t from = text.find(begin);
-    if (from == text.npos)
+    std::string_view begin;
+    std::string_view content;
+    std::size_t length = 0;
+    bool is_whole = false;
+};
+
+constexpr std::string_view kitty_begin = "\x1b_G";
+constexpr std::string_view attributes_begin = "\x1b[?";
+
+std::optional<Report> report_at(std::string_view text, std::string_view begin, bool (*is_content)(char),
+                                std::string_view end)
+{
+    if (!text.starts_with(begin))
         return std::nullopt;
-    const std::size_t inner = from + begin.size();
-    const std::size_t to = text.find(end, inner);
-    if (to == text.npos)
-        return std::nullopt;
-    std::string between = text.substr(inner, to - inner);
-    text.erase(from, to + end.size() - from);
-    return between;
+    const std::string_view rest = text.substr(begin.size(), longest_answer);
+    const std::string_view content(rest.begin(), std::find_if_not(rest.begin(), rest.end(), is_content));
+    const std::size_t length = begin.size() + content.size();
+    const std::string_view behind = text.substr(length, end.size());
+    const bool is_whole = behind == end;
+    return Report{ begin, content, length + (end.starts_with(behind) ? behind.size() : 0), is_whole };
+}
+
+bool is_printed(char c)
+{
+    return c >= ' ' && c <= '~';
+}
+
+bool is_of_number(char c)
+{
+    return (c >= '0' && c <= '9') || c == ';';
+}
+
+std::optional<Report> report_at(std::string_view text)
+{
+    const auto kitty = report_at(text, kitty_begin, is_printed, "\x1b\\");
+    return kitty ? kitty : report_at(text, attributes_begin, is_of_number, "c");
+}
+
+void take(TerminalAnswer& answer, const Report& report)
+{
+    const std::string_view content = report.content;
+    if (!report.is_whole || answer.complete)
+        return;
+    if (report.begin == kitty_begin)
+    {
+        answer.kitty = answer.kitty || (content.starts_with("i=31;") && content.ends_with(";OK"));
+        return;
+    }
+    answer.complete = true;
+    // The first number is the terminal's class; its abilities come behind that.
+    const std::size_t abilities = std::min(content.find(';'), content.size());
+    answer.sixel = (std::string(content.substr(abilities)) + ";").find(";4;") != std::string::npos;
 }
 
 /** While it lives keys come as they are typed, all of them, and are not shown. No signal ends the tool meanwhile: the
@@ -90,20 +138,21 @@ std::string keys_until(std::chrono::steady_clock::time_point limit)
 
 } // namespace
 
-TerminalAnswer answer_in(std::string received)
+TerminalAnswer answer_in(std::string_view received)
 {
     TerminalAnswer answer;
-    if (const auto kitty = cut(received, "\x1b_Gi=31", "\x1b\\"))
-        answer.kitty = kitty->ends_with(";OK");
-    if (const auto attributes = cut(received, "\x1b[?", "c"))
+    while (!received.empty())
     {
-        answer.complete = true;
-        // The first number is the terminal's class; its abilities come behind that.
-        const std::size_t abilities = attributes->find(';');
-        answer.sixel =
-            abilities != attributes->npos && (attributes->substr(abilities) + ";").find(";4;") != attributes->npos;
+        if (const auto report = report_at(received))
+        {
+            take(answer, *report);
+            received.remove_prefix(report->length);
+            continue;
+        }
+        const std::size_t next = std::min(received.find('\x1b', 1), received.size());
+        answer.typed += received.substr(0, next);
+        received.remove_prefix(next);
     }
-    answer.typed = std::move(received);
     return answer;
 }
 
@@ -116,7 +165,7 @@ TerminalAnswer ask_terminal(bool kitty)
     const auto limit = std::chrono::steady_clock::now() + longest_wait;
     std::string received;
     TerminalAnswer answer;
-    while (!answer.complete)
+    while (!answer.complete && received.size() < most_received)
     {
         const std::string more = keys_until(limit);
         if (more.empty())

@@ -18,8 +18,8 @@ struct TerminalAnswer
     std::string typed = {}; ///< what somebody typed meanwhile
 };
 
-/** Tell the answer from the keys among which it came. */
-TerminalAnswer answer_in(std::string received);
+/** Tell the answer from the keys among which it came. A report that breaks off is none of them, either. */
+TerminalAnswer answer_in(std::string_view received);
 
 /** Ask the terminal that is standard input and standard output, and give it a moment to answer.
  *  @param kitty  about kitty's graphics, too */

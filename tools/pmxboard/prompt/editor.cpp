@@ -15,6 +15,7 @@
 #include <algorithm>
 #include <cstdio>
 #include <cstdlib>
+#include <cwchar>
 
 #include "tools/pmxboard/prompt/help.h"
 #include "tools/pmxboard/prompt/history_file.h"
@@ -56,6 +57,24 @@ bool is_shown(const std::string& line)
     return std::mbstowcs(nullptr, line.c_str(), 0) != static_cast<std::size_t>(-1);
 }
 
+/** Keys without those that are no text of the user's language, and without zeroes: the editor would take none. */
+std::string only_text(std::string_view keys)
+{
+    std::string text;
+    std::mbstate_t state{};
+    while (!keys.empty())
+    {
+        const std::size_t length = std::mbrtowc(nullptr, keys.data(), keys.size(), &state);
+        const bool is_text = length != 0 && length <= keys.size();
+        if (is_text)
+            text += keys.substr(0, length);
+        else
+            state = {};
+        keys.remove_prefix(is_text ? length : 1);
+    }
+    return text;
+}
+
 class Editor : public LineSource
 {
 public:
@@ -82,6 +101,10 @@ public:
         el_set(m_editor, EL_BIND, "^R", "em-inc-search-prev", nullptr);
         el_wset(m_editor, EL_ADDFN, L"pmx-drop-line", L"drop the line", &Editor::on_drop);
         el_set(m_editor, EL_BIND, "^C", "pmx-drop-line", nullptr);
+        // A terminal that was asked for its pictures, and is slower than anybody waits, answers all the same.
+        el_wset(m_editor, EL_ADDFN, L"pmx-drop-report", L"drop what the terminal reports", &Editor::on_report);
+        el_set(m_editor, EL_BIND, "^[[?", "pmx-drop-report", nullptr);
+        el_set(m_editor, EL_BIND, "^[_G", "pmx-drop-report", nullptr);
         // While a line is edited Ctrl-C is a key like any other; while a command runs it ends the tool as ever.
         el_set(m_editor, EL_SETTY, "-d", "-isig", nullptr);
         el_set(m_editor, EL_SIGNAL, 1);
@@ -116,7 +139,7 @@ public:
         return line;
     }
 
-    void take_back(const std::string& keys) override { el_push(m_editor, keys.c_str()); }
+    void take_back(const std::string& keys) override { el_push(m_editor, only_text(keys).c_str()); }
 
     void remember(const std::string& line) override
     {
@@ -142,6 +165,27 @@ private:
         std::fputs("^C\n", stdout);
         std::fflush(stdout);
         return CC_EOF;
+    }
+
+    /** Numbers up to a letter; or, of kitty's graphics, all up to an escape and a backslash. One that breaks off ends
+     *  where a control character is typed. */
+    static unsigned char on_report(EditLine* editor, int last_of_begin)
+    {
+        constexpr int longest = 1000;
+        constexpr char escape = '\x1b';
+        const bool is_kitty = last_of_begin == 'G';
+        char key = 0;
+        char before = 0;
+        for (int count = 0; count < longest && el_getc(editor, &key) == 1; ++count, before = key)
+        {
+            const bool is_control = key >= 0 && key < ' ' && key != escape;
+            if (is_control)
+                el_push(editor, std::string(1, key).c_str());
+            const bool is_number = (key >= '0' && key <= '9') || key == ';';
+            if (is_control || (is_kitty ? before == escape : !is_number))
+                break;
+        }
+        return CC_NORM;
     }
 
     /** The library that calls it is no C++. */

@@ -115,11 +115,16 @@ class Shown(PageTest):
         told = " ".join(self.texts("#story li"))
         self.assertIn("No graphics for 10 s: held back from 4 ms", told)
         self.assertIn("the display timer ran out; the display part had not answered", told)
-        self.assertIn("planes 3 to 7 wait until the display part answers", told)
+        self.assertIn("Graphics are taken out of the picture while the display part switches the outputs", told)
+        self.assertIn("A timer brings them back if it never does.", told)
+        self.assertEqual([], self.all(".looks"), "nothing is drawn on them")
         self.open(pages.FIRST_LOOK)
         told = " ".join(self.texts("#story li"))
         self.assertIn("No graphics for 3 s: held back", told)
         self.assertIn("the display part has switched", told)
+        self.assertEqual(["before, after step 4", "meanwhile, after step 6", "afterwards, after step 7"],
+                         [text.partition(":")[0] for text in self.texts(".looks figcaption")])
+        self.assertEqual(3, len(set(browser.run(f"{ALL}.map((one) => one.src)", ".looks img"))))
 
     def test_held_graphics_are_a_bar_that_leads_to_their_step(self):
         self.open(pages.NEVER)
@@ -569,7 +574,7 @@ class Used(PageTest):
         self.assertIn("2s.pmx. Below: ", self.one("#whose").text)
         held[1].click()
         self.assertEqual((3, "other-step-3"), (self.current(), self.active()))
-        self.all("#story .story:nth-child(2) a")[-1].click()
+        self.all("#story .story:nth-child(2) a")[1].click()
         self.assertEqual((4, "other-step-4"), (self.current(), self.active()))
         browser.run("document.querySelector('#other-step-3 .picture').click()")
         self.assertIn("3s.pmx", self.one("#large-title").text)

@@ -104,13 +104,39 @@ function waitLine(runShown, side, span) {
   return line;
 }
 
-/** Why they wait, for those who know the system only from the outside. */
-function whyLine(runShown, span) {
+const WHY = {
+  held: "Graphics are taken out of the picture while the display part switches the outputs, and come back when it " +
+        "says that it is done. A timer brings them back if it never does.",
+  "awaits video plane": "Graphics come back when the video plane has its sync control.",
+};
+
+/** Why they wait, for those who know the system only from the outside, and what that looked like. */
+function whyLine(runShown, side, span) {
   const step = runShown.steps[span.from.step];
-  if (!step.graphics) return [];
-  const rule = step.graphics_state === "held"
-    ? " they come back when the display part says that it has switched, or when the display timer runs out." : "";
-  return [make("li", {}, "Why: after ", make("code", {}, titleOf(step)), `${rule} They were ${step.graphics}.`)];
+  const why = make("li", {}, "Why: ", linkTo(span.from.step, side), " is ", make("code", {}, titleOf(step)),
+                   `. ${WHY[step.graphics_state] ?? ""}`);
+  const looks = looksOf(runShown, span);
+  if (looks.length > 0) why.append(make("div", { class: "looks" }, ...looks));
+  return why;
+}
+
+/** One output before a wait, within it and behind it: the first on which that makes a difference. */
+function looksOf(runShown, span) {
+  const { steps } = runShown;
+  const moments = [["before", span.from.step - 1], ["meanwhile", Math.max(span.from.step, span.to.step - 1)],
+                   ["afterwards", span.to.step]].filter(([, index]) => steps[index] && steps[index].outputs.length > 0);
+  const pictureAt = (index, output) => steps[index].outputs[output].picture;
+  if (span.open || moments.length < 2) return [];
+  const [[, within], [, behind]] = moments.slice(-2);
+  const hasAll = (place) => moments.every(([, index]) => pictureAt(index, place) !== null);
+  const output = steps[within].outputs.findIndex((_, place) =>
+    pictureAt(within, place) !== pictureAt(behind, place) && hasAll(place));
+  return output < 0 ? [] : moments.map(([when, index]) => {
+    const seen = steps[index].outputs[output];
+    const label = `${when}, after step ${index + 1}: ${seen.output}, ${seen.description}`;
+    return make("figure", {}, make("img", { src: data.pictures[seen.picture], alt: label }),
+                make("figcaption", { "aria-hidden": "true" }, label));
+  });
 }
 
 /** All of them, or the first ones and how many more there are. */
@@ -119,7 +145,7 @@ function waitLines(runShown, side) {
   const lines = (spans) => spans.map((span) => waitLine(runShown, side, span));
   const told = lines(all.slice(0, MOST_TOLD));
   const more = all.slice(MOST_TOLD);
-  if (all.length > 0) told.splice(1, 0, ...whyLine(runShown, all[0]));
+  if (all.length > 0) told.splice(1, 0, whyLine(runShown, side, all[0]));
   if (more.length === 0) return told;
   const sum = more.reduce((us, span) => us + span.to.us - span.from.us, 0);
   return [...told, make("li", { class: "bad" }, folded(`${counted(more.length, "more wait")}, ${spoken(sum)} together`,

@@ -237,7 +237,7 @@ void Storyboard::close(const Moment& at)
     m_run["lanes"] = json_of(m_lanes);
     for (Json& step : m_run.at("steps"))
         sort_entries(step);
-    m_runs.push_back(std::move(m_run));
+    m_runs.push_back(std::exchange(m_run, Json()));
 }
 
 std::string Storyboard::broke_down(const std::string& how)

@@ -24,6 +24,9 @@ public:
      *  @param how  "Segmentation fault" */
     std::string broke_down(const std::string& how);
 
+    /** Whether a scenario has begun and not ended. */
+    bool is_in_run() const { return !m_run.is_null(); }
+
     /** {"runs": […], "pictures": […], "sees": …}: what the page's script reads, and nobody else. */
     std::string to_json() const;
 
@@ -55,7 +58,7 @@ private:
     std::vector<std::string> m_pictures;
 
     /* Of the scenario that is told */
-    Json m_run;
+    Json m_run;                               ///< null between two of them
     std::vector<std::size_t> m_told_pictures; ///< in the run's order: their places
     Moment m_now;                             ///< of what was told last
     LaneSpans m_lanes;

@@ -16,13 +16,22 @@ from packages import Apt, Unavailable, emptied, kept, unpack  # noqa: E402, F401
 PACKAGES = ("cbmc", "minisat", "libc6", "libstdc++6", "libgcc-s1", "zlib1g")
 
 
+KNOWN = "6."  # what its options mean, and how it says what it found
+
+
+def hold_known(version):
+    if not version.startswith(KNOWN):
+        raise Unavailable(f"the checker's version is {version or 'unknown'}, and {KNOWN}x is what is understood")
+
+
 def _fetch(folder):
     if platform.machine() != "x86_64":
         raise Unavailable(f"the checker's loader is known for x86-64 alone, not for {platform.machine()}")
     apt = Apt(folder / "apt")
     apt.update()
     apt.prefer_next_release()
-    version = apt.version("cbmc")
+    version = " ".join(apt.version(name) for name in PACKAGES)
+    hold_known(version)
     archives, unpacked = emptied(folder / "archives"), emptied(folder / "unpacked")
     apt.download([f"{name}={apt.version(name)}" for name in PACKAGES], archives)
     for archive in sorted(archives.iterdir()):
@@ -36,6 +45,7 @@ class Checker:
 
     def __init__(self, cache):
         folder, self.version = kept(cache, " ".join(PACKAGES), _fetch)
+        hold_known(self.version)
         root = folder / "unpacked"
         libraries = [root / "usr/lib/x86_64-linux-gnu", root / "usr/lib"]
         loader = next((path for path in (root / "usr/lib64/ld-linux-x86-64.so.2", libraries[0] / "ld-linux-x86-64.so.2")

@@ -15,7 +15,6 @@ usage: prove.py CACHE MADE [--faults | --sample NUMBER | --same-as REVISION] [OP
 
 import argparse
 import concurrent.futures
-import hashlib
 import os
 import pathlib
 import shutil
@@ -31,6 +30,7 @@ import figures  # noqa: E402
 import harness  # noqa: E402
 import promises  # noqa: E402
 import same  # noqa: E402
+import verdicts  # noqa: E402
 import view  # noqa: E402
 from ktap import Ktap  # noqa: E402
 from verdicts import COMPILER, GUARD, LIMIT, OPTIONS, Verdict  # noqa: E402
@@ -59,8 +59,7 @@ class Program:
         known = {name for name in names if others._texts.get(name) == self._texts[name]} if alike else ()
         self._preprocessed = {stem: others._preprocessed[stem] if name in known else self._preprocess(name)
                               for name, stem in ((name, pathlib.PurePath(name).stem) for name in names)}
-        whole = "".join([cbmc.version, *OPTIONS, *self._preprocessed.values()])
-        self.key = hashlib.sha256(whole.encode()).hexdigest()[:32]
+        self.key = verdicts.key(cbmc.version, self._preprocessed.values())
         self._others = others  # a program whose texts and objects are used where they are the same
 
     def _preprocess(self, name):

@@ -12,6 +12,7 @@ import unittest
 
 sys.dont_write_bytecode = True
 
+import checker  # noqa: E402
 import harness  # noqa: E402
 import pointers  # noqa: E402
 import promises  # noqa: E402
@@ -174,16 +175,17 @@ class Same(unittest.TestCase):
 
     def test_what_the_checker_says_is_taken_apart(self):
         ends = "".join(f"[end.assertion.{i}] line 9 {harness.REACHED}: FAILURE\n" for i in range(2))
-        said = same.Said(f"[end.assertion.7] line 8 {same.SAME}result: FAILURE\n{ends}")
+        said = same.Said(whole(f"[end.assertion.7] line 8 {same.SAME}result: FAILURE\n{ends}"))
         self.assertEqual(({"end.assertion.7": "same: result"}, [], []), (said.different, said.odd, said.undefined))
         self.assertTrue(said.is_reached(True))
         self.assertFalse(said.is_reached(False))
         self.assertEqual(["f: division by zero in a / b"],
-                         same.Said(f"[f.1] line 2 division by zero in a / b: FAILURE\n{ends}").undefined)
+                         same.Said(whole(f"[f.1] line 2 division by zero in a / b: FAILURE\n{ends}")).undefined)
+        self.assertEqual(["the checker did not come to its end"], same.Said(ends).odd)
         for text in (f"[called.1] line 2 {same.ROOM}: FAILURE",
                      "[f.unwind.0] line 3 unwinding assertion loop 0: FAILURE",
                      "[f.1] line 2 division by zero: UNKNOWN", "no body for function f", "killed"):
-            self.assertEqual(1, len(same.Said(f"{text}\n").odd), text)
+            self.assertEqual(1, len(same.Said(whole(f"{text}\n")).odd), text)
 
     def test_code_is_the_same_when_all_that_it_rests_on_is(self):
         with tempfile.TemporaryDirectory() as directory:
@@ -214,18 +216,54 @@ class Same(unittest.TestCase):
             self.assertIn(change["operation"], names)
 
 
+def whole(text):
+    """What the checker says, with its sum."""
+    lines = [line for line in text.splitlines() if verdicts.CHECKED.match(line)]
+    failed = sum(line.endswith("FAILURE") for line in lines)
+    return f"{text}\n** {failed} of {len(lines)} failed (2 iterations)\nVERIFICATION FAILED\n"
+
+
 class Verdicts(unittest.TestCase):
+    def test_an_output_that_lacks_something_is_wrong(self):
+        text = whole(f"[f.1] line 7 division by zero: SUCCESS\n{REACHED}")
+        self.assertEqual([], verdicts.Verdict(text).wrong)
+        for cut in (text.partition("**")[0], text.replace("VERIFICATION FAILED", "")):
+            self.assertEqual(["the checker did not come to its end"], verdicts.Verdict(cut).wrong)
+        for odd in (text.replace("zero: SUCCESS", "zero: VANISHED"), text.replace("[f.1] line 7 division", "")):
+            self.assertEqual(["3 of 3 checks failed by its lines, 3 of 4 by its sum"], verdicts.Verdict(odd).wrong)
+        self.assertEqual(1, len(verdicts.Verdict(text.replace("3 of 4", "4 of 4")).wrong))
+
     def test_what_does_not_hold_is_told_with_its_place(self):
-        verdict = verdicts.Verdict("src/x.cpp function f\n[f.1] line 7 division by zero: SUCCESS\n"
-                                f"[f.2] line 8 array 'a' upper bound in a[i]: FAILURE\n{REACHED}")
+        verdict = verdicts.Verdict(whole("src/x.cpp function f\n[f.1] line 7 division by zero: SUCCESS\n"
+                                         f"[f.2] line 8 array 'a' upper bound in a[i]: FAILURE\n{REACHED}"))
         self.assertEqual((2, ["src/x.cpp:8: array 'a' upper bound in a[i]: FAILURE"]), (verdict.number, verdict.wrong))
-        self.assertEqual([], verdicts.Verdict(REACHED).wrong)
+        self.assertEqual([], verdicts.Verdict(whole(REACHED)).wrong)
 
     def test_what_proves_nothing_is_wrong(self):
         self.assertEqual(["nothing was proved: killed"], verdicts.Verdict("", complaint="killed").wrong)
         for text in (REACHED.replace("FAILURE", "SUCCESS", 1), REACHED.partition("\n")[2]):
-            self.assertEqual(["an end is not reached: what is presumed cannot be"], verdicts.Verdict(text).wrong)
-        self.assertEqual(["no body for function f"], verdicts.Verdict(f"no body for function f\n{REACHED}").wrong)
+            self.assertEqual(["an end is not reached: what is presumed cannot be"], verdicts.Verdict(whole(text)).wrong)
+        without_body = whole(f"no body for function f\n{REACHED}")
+        self.assertEqual(["no body for function f"], verdicts.Verdict(without_body).wrong)
+
+    def test_each_check_is_asked_for_by_its_name(self):
+        for name in ("bounds", "pointer", "div-by-zero", "signed-overflow", "undefined-shift"):
+            self.assertIn(f"--{name}-check", verdicts.OPTIONS)
+        self.assertIn("--unwinding-assertions", verdicts.OPTIONS)
+        checker.hold_known("6.7.1-1 1.2")
+        for version in ("5.95.1-1", "7.0.0-1", ""):
+            with self.subTest(version), self.assertRaises(checker.Unavailable):
+                checker.hold_known(version)
+
+    def test_what_judges_is_part_of_what_was_proved(self):
+        with tempfile.TemporaryDirectory() as directory:
+            judge = pathlib.Path(directory) / "judge.py"
+            keys = set()
+            for version, texts, judged in (("1", ["a"], "x"), ("2", ["a"], "x"), ("1", ["b"], "x"), ("1", ["a"], "y")):
+                judge.write_text(judged, encoding="utf-8")
+                keys.add(verdicts.key(version, texts, [judge]))
+                self.assertIn(verdicts.key(version, texts, [judge]), keys)
+            self.assertEqual(4, len(keys))
 
     def test_what_was_proved_is_kept_for_the_same_text_alone(self):
         with tempfile.TemporaryDirectory() as directory:
@@ -239,7 +277,7 @@ class Verdicts(unittest.TestCase):
 
 class Faults(unittest.TestCase):
     def seen(self, text, **words):
-        verdict = verdicts.Verdict(f"src/x.cpp function f\n{text}{REACHED}")
+        verdict = verdicts.Verdict(whole(f"src/x.cpp function f\n{text}{REACHED}"))
         return prove.seen_as({"seen": "division by zero", **words}, verdict)
 
     def test_one_is_seen_in_what_was_refuted_alone(self):

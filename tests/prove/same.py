@@ -46,8 +46,8 @@ ONE_TEXT, FEW_BYTES = "one text is formatted in an operation", "no more than 8 b
 OPEN = (ROOM, ONE_TEXT, FEW_BYTES)
 NOT_REACHED = "an end is not reached: what is presumed cannot be"
 VALUE = re.compile(r"^  ([\w.]+)((?:\[\d+)?)l*((?:\].*?)?)=(-?\d+)", re.M)
-OPTIONS = ["--nondet-static", "--unwind", "9", "--unwinding-assertions", "--object-bits", "12",
-           "--drop-unused-functions", "--slice-formula"]
+OPTIONS = ["--nondet-static", "--unwind", "9", "--object-bits", "12", "--drop-unused-functions", "--slice-formula",
+           *verdicts.CHECKS]
 EXPORTED = re.compile(r"^extern (?:PMX_API )?const \w+\*? (?:const )?(\w+)", re.M)
 LITERAL = re.compile(r'"(?:[^"\\\n]|\\.)*"(?:\s*"(?:[^"\\\n]|\\.)*")*')
 
@@ -711,6 +711,7 @@ class Said:
         self.odd += [words for _, _, words, status in checked if status not in ("FAILURE", "SUCCESS")]
         self.odd += re.findall(r"no body for .*", text)
         self.odd += [] if checked or self.odd else [text[-300:]]
+        self.odd += verdicts.incomplete(text)
         self.undefined = [f"{name.partition('.')[0]}: {words}" for name, words in self.refuted.items()
                           if words not in (*self.different.values(), *self.odd, *self._ends)]
 

@@ -17,6 +17,9 @@
 #include "pmx_if.h"
 #include "u_os.h"
 
+/* What is proved is proved of the target's numbers. */
+_Static_assert(sizeof(void*) == 4 && sizeof(long) == 4 && (char)-1 > 0 && sizeof(PMX_CONF_T) == 436, "");
+
 /* Who acts while the platform is called. */
 typedef enum
 {

@@ -109,8 +109,8 @@ def release_after(release, lines):
 
 def unpack(archive, folder, *members):
     with subprocess.Popen(["dpkg-deb", "--fsys-tarfile", archive], stdout=subprocess.PIPE) as unpacked:
-        subprocess.run(["tar", "x", "-C", folder, *members], stdin=unpacked.stdout, check=True)
-    if unpacked.returncode != 0:
+        taken = subprocess.run(["tar", "x", "-C", folder, *members], stdin=unpacked.stdout, check=False)
+    if unpacked.returncode != 0 or taken.returncode != 0:
         raise Unavailable(f"{archive} cannot be unpacked")
 
 
@@ -135,10 +135,12 @@ def kept(folder, wanted, fetch):
     with _held(folder):
         usable = folder / USABLE
         if usable.exists():
-            place, found, *wish = usable.read_text(encoding="utf-8").splitlines()
-            if place == str(folder) and wish == [wanted]:
+            place, found, *wish = [*usable.read_text(encoding="utf-8").splitlines(), "", ""]  # cut short: not usable
+            if place == str(folder) and wish[:1] == [wanted]:
                 return folder, found
             usable.unlink()
         found = fetch(folder)
-        usable.write_text(f"{folder}\n{found}\n{wanted}\n", encoding="utf-8")
+        unfinished = folder / f"{USABLE}.unfinished"
+        unfinished.write_text(f"{folder}\n{found}\n{wanted}\n", encoding="utf-8")
+        unfinished.rename(usable)
         return folder, found

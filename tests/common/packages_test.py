@@ -2,7 +2,9 @@
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Where packages are looked for follows from the package sources of the machine."""
 
+import pathlib
 import sys
+import tempfile
 import unittest
 
 sys.dont_write_bytecode = True
@@ -26,6 +28,35 @@ class Releases(unittest.TestCase):
         self.assertEqual("trixie", packages.release_after("bookworm", RELEASES))
         self.assertIsNone(packages.release_after("trixie", RELEASES))
         self.assertIsNone(packages.release_after("sid", RELEASES))
+
+
+class Kept(unittest.TestCase):
+    def setUp(self):
+        directory = tempfile.TemporaryDirectory()
+        self.addCleanup(directory.cleanup)
+        self.folder = pathlib.Path(directory.name).resolve()
+        self.fetched = 0
+
+    def fetch(self, _):
+        self.fetched += 1
+        return f"version {self.fetched}"
+
+    def test_it_is_fetched_once_for_each_wish(self):
+        for wish, version in (("a", 1), ("a", 1), ("b", 2), ("b", 2)):
+            self.assertEqual((self.folder, f"version {version}"), packages.kept(self.folder, wish, self.fetch))
+
+    def test_a_note_that_was_cut_short_is_none(self):
+        for text in ("", f"{self.folder}\n", f"{self.folder}\nversion 1\n"):
+            (self.folder / packages.USABLE).write_text(text, encoding="utf-8")
+            before = self.fetched
+            packages.kept(self.folder, "a", self.fetch)
+            self.assertEqual(before + 1, self.fetched)
+
+    def test_a_broken_archive_is_told(self):
+        archive = self.folder / "broken.deb"
+        archive.write_bytes(b"none")
+        with self.assertRaisesRegex(packages.Unavailable, "broken.deb cannot be unpacked"):
+            packages.unpack(archive, self.folder)
 
 
 if __name__ == "__main__":

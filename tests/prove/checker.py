@@ -10,13 +10,19 @@ import sys
 
 sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "common"))
 
-from packages import Apt, Unavailable, emptied, kept, unpack  # noqa: E402, F401
+from packages import USABLE, Apt, Unavailable, emptied, kept, unpack  # noqa: E402, F401
 
-# The checker, and what its programs are linked with.
+# The checker, and what its programs are linked with; unpacked, never installed, so that packages.txt lacks them.
 PACKAGES = ("cbmc", "minisat", "libc6", "libstdc++6", "libgcc-s1", "zlib1g")
 
 
+PROGRAMS = ("usr/lib64/ld-linux-x86-64.so.2", "usr/bin/cbmc", "usr/bin/goto-cc")
 KNOWN = "6."  # what its options mean, and how it says what it found
+
+
+def lacks(folder):
+    """What is needed and is not there."""
+    return [name for name in PROGRAMS if not (folder / "unpacked" / name).exists()]
 
 
 def hold_known(version):
@@ -45,13 +51,16 @@ class Checker:
 
     def __init__(self, cache):
         folder, self.version = kept(cache, " ".join(PACKAGES), _fetch)
+        if lacks(folder):  # somebody cleaned up
+            (folder / USABLE).unlink()
+            folder, self.version = kept(cache, " ".join(PACKAGES), _fetch)
+        if lacks(folder):
+            (folder / USABLE).unlink()
+            raise Unavailable(f"the checker that was fetched has no {' and no '.join(lacks(folder))}")
         hold_known(self.version)
         root = folder / "unpacked"
         libraries = [root / "usr/lib/x86_64-linux-gnu", root / "usr/lib"]
-        loader = next((path for path in (root / "usr/lib64/ld-linux-x86-64.so.2", libraries[0] / "ld-linux-x86-64.so.2")
-                       if path.exists()), None)
-        if not loader:
-            raise Unavailable("the checker's C library has no loader")
+        loader = root / PROGRAMS[0]
         self._start = [loader, "--library-path", ":".join(map(str, libraries))]
         self._programs = root / "usr/bin"
 

@@ -38,6 +38,7 @@ from verdicts import COMPILER, GUARD, LIMIT, OPTIONS, Verdict  # noqa: E402
 HERE = pathlib.Path(__file__).resolve().parent
 ROOT = view.ROOT
 SKIPPED = 77
+KEPT = 4  # trees whose results are kept
 SAMPLE = 8  # faults that are planted in every run
 
 
@@ -96,20 +97,22 @@ class Program:
 
 
 class Results:
-    """What was proved before of the same text."""
+    """What was proved before of the same text. Other trees keep theirs beside it; the oldest goes."""
 
     def __init__(self, folder, key):
         self._folder = folder / key
-        for other in folder.iterdir() if folder.exists() else ():
-            if other != self._folder:
-                shutil.rmtree(other)
         self._folder.mkdir(parents=True, exist_ok=True)
+        self._folder.touch()
+        for other in sorted(folder.iterdir(), key=lambda each: each.stat().st_mtime)[:-KEPT]:
+            shutil.rmtree(other, ignore_errors=True)
 
     def get(self, operation):
         kept = self._folder / operation
-        return int(kept.read_text(encoding="utf-8")) if kept.exists() else None
+        number = kept.read_text(encoding="utf-8").strip() if kept.exists() else ""
+        return int(number) if number.isdigit() else None  # a file that was cut short is none
 
     def keep(self, operation, number):
+        self._folder.mkdir(parents=True, exist_ok=True)  # another tree may have taken it for an old one
         unfinished = self._folder / f"{operation}.unfinished"
         unfinished.write_text(f"{number}\n", encoding="utf-8")
         unfinished.rename(self._folder / operation)

@@ -4,11 +4,13 @@
 what is presumed. The proof itself needs the checker, and is ./dev prove."""
 
 import dataclasses
+import os
 import pathlib
 import re
 import sys
 import tempfile
 import unittest
+import unittest.mock
 
 sys.dont_write_bytecode = True
 
@@ -255,6 +257,30 @@ class Verdicts(unittest.TestCase):
             with self.subTest(version), self.assertRaises(checker.Unavailable):
                 checker.hold_known(version)
 
+    def test_a_checker_that_is_not_whole_is_fetched_once_more(self):
+        def fetch(folder, programs=checker.PROGRAMS):
+            fetched.append(folder)
+            for name in programs:
+                path = folder / "unpacked" / name
+                path.parent.mkdir(parents=True, exist_ok=True)
+                path.touch()
+            return "6.6.0-4"
+
+        fetched = []
+        with tempfile.TemporaryDirectory() as directory, unittest.mock.patch.object(checker, "_fetch", fetch):
+            cache = pathlib.Path(directory)
+            checker.Checker(cache)
+            checker.Checker(cache)
+            self.assertEqual(1, len(fetched))
+            (cache / "unpacked/usr/bin/cbmc").unlink()
+            checker.Checker(cache)
+            self.assertEqual(2, len(fetched))
+            (cache / "unpacked/usr/bin/cbmc").unlink()
+            with unittest.mock.patch.object(checker, "_fetch", lambda folder: fetch(folder, ())):
+                with self.assertRaisesRegex(checker.Unavailable, "has no usr/bin/cbmc"):
+                    checker.Checker(cache)
+            self.assertEqual(3, len(fetched))
+
     def test_what_judges_is_part_of_what_was_proved(self):
         with tempfile.TemporaryDirectory() as directory:
             judge = pathlib.Path(directory) / "judge.py"
@@ -272,7 +298,21 @@ class Verdicts(unittest.TestCase):
             self.assertEqual(7, prove.Results(folder, "one").get("f"))
             self.assertIsNone(prove.Results(folder, "one").get("g"))
             self.assertIsNone(prove.Results(folder, "two").get("f"))
+            self.assertEqual(7, prove.Results(folder, "one").get("f"))
+            (folder / "one/f").write_text("", encoding="utf-8")
             self.assertIsNone(prove.Results(folder, "one").get("f"))
+
+    def test_the_oldest_results_go_and_whoever_uses_them_goes_on(self):
+        with tempfile.TemporaryDirectory() as directory:
+            folder = pathlib.Path(directory)
+            first = prove.Results(folder, "0")
+            for number in range(prove.KEPT + 1):
+                prove.Results(folder, str(number))
+                os.utime(folder / str(number), (number, number))
+            prove.Results(folder, str(prove.KEPT))
+            self.assertEqual([str(number + 1) for number in range(prove.KEPT)], sorted(os.listdir(folder)))
+            first.keep("f", 7)
+            self.assertEqual(7, first.get("f"))
 
 
 class Faults(unittest.TestCase):

@@ -18,7 +18,7 @@ BESIDE = {"<": ("<=", ">="), "<=": ("<", ">"), ">": (">=", "<="), ">=": (">", "<
 OF_TWO = {"&&", "||", "|", "&"}  # either side could have been forgotten
 COMPARES = {"<", "<=", ">", ">=", "==", "!="}
 TRUTHS = {"TRUE": 1, "FALSE": 0, "0": 0, "1": 1}
-NARROWER = {"unsigned long": "UINT32", "unsigned int": "UINT16", "int": "INT16", "unsigned short": "UCHAR"}
+NARROWER = {"unsigned long": "UINT32", "unsigned int": "UINT16", "int": "short", "unsigned short": "UCHAR"}
 WIDTH = {"bool": 1, "char": 8, "unsigned char": 8, "signed char": 8, "short": 16, "unsigned short": 16, "int": 32,
          "unsigned int": 32, "long": 64, "unsigned long": 64}
 WITHOUT_OPERATION = ("ImplicitCastExpr", "ParenExpr", "ConstantExpr", "ExprWithCleanups", "MaterializeTemporaryExpr")

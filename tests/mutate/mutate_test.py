@@ -117,7 +117,7 @@ class Reading(unittest.TestCase):
     def becomes(self, kind, before, *after, around="void f(int a, int b, unsigned c) {{ {} }}"):
         """The changes of that kind are these and no others."""
         heads = "#define FALSE 0\n#define TRUE 1\ntypedef unsigned char BOOL; typedef unsigned char UCHAR;\n" \
-                "typedef unsigned short UINT16; typedef short INT16; typedef unsigned UINT32; typedef int INT32;\n" \
+                "typedef unsigned short UINT16; typedef unsigned UINT32; typedef int INT32;\n" \
                 "enum E { E_A, E_B }; void vCall(int x, int y); void g(); extern BOOL fg; bool fgIs();\n"
         text = heads + around.format(before)
         found = [changed for mutant, changed in read(text) if mutant.kind == kind]
@@ -163,6 +163,7 @@ class Reading(unittest.TestCase):
 
     def test_types(self):
         self.becomes("narrow", "UINT32 d = c;", "UINT16 d = c;", "UINT32 d = (UINT16)(c);")
+        self.becomes("narrow", "INT32 d = a;", "short d = a;", "INT32 d = (short)(a);")
         self.becomes("narrow", "b = (UCHAR)a;", "b = (a);")
 
     def test_what_is_nothing_in_what_ships_is_left_out(self):
@@ -352,6 +353,9 @@ class List(unittest.TestCase):
         self.assertEqual(len(found), len({mutant.name for mutant in found}))
         self.assertEqual([], mutate.gone(mutate.read_equivalents(mutate.EQUIVALENT), found))
         self.assertEqual(set(mutants.KINDS), {mutant.kind for mutant in found})
+        types = (ROOT / "src/system/inc/x_typedef.h").read_text(encoding="utf-8")
+        named = [each for each in mutants.NARROWER.values() if each != "short"]
+        self.assertEqual([], [each for each in named if f" {each};" not in types])
 
 
 if __name__ == "__main__":

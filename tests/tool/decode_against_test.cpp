@@ -74,8 +74,8 @@ TEST(DecodeAgainst, ChangedValue_IsFoundByName)
     const Comparison found = against(with(captured(), "HDMI(1, RES_1080P60HZ)", "HDMI(1, RES_1080P50HZ)"));
     ASSERT_TRUE(found.departure);
     EXPECT_EQ(Departure::Kind::Value, found.departure->kind);
-    EXPECT_EQ(11u, found.departure->found->line);
-    EXPECT_EQ("HDMI(1, RES_1080P50HZ)", found.departure->found->shown);
+    EXPECT_EQ(11u, found.departure->found.line);
+    EXPECT_EQ("HDMI(1, RES_1080P50HZ)", found.departure->found.shown);
     EXPECT_EQ("HDMI(1, RES_1080P60HZ)", found.departure->expected->item.shown);
     EXPECT_EQ(mode_line(), std::to_string(found.departure->expected->line));
     EXPECT_EQ("PMX_SetModeEx", operation_of(*found.departure));
@@ -91,8 +91,8 @@ TEST(DecodeAgainst, MissingLine_IsNamedWithWhatStandsInItsPlace)
     ASSERT_TRUE(found.departure);
     EXPECT_EQ(Departure::Kind::Missing, found.departure->kind);
     EXPECT_EQ("Mode(12), eMixerOutCS(1)", found.departure->expected->item.shown);
-    EXPECT_EQ("CC_A disable", found.departure->found->shown);
-    EXPECT_EQ(23u, found.departure->found->line);
+    EXPECT_EQ("CC_A disable", found.departure->found.shown);
+    EXPECT_EQ(23u, found.departure->found.line);
     EXPECT_EQ(16u, found.agreeing);
 }
 
@@ -101,8 +101,8 @@ TEST(DecodeAgainst, LineTooMany_IsFound)
     const Comparison found = against(with_line(captured(), 24, line_of(captured(), 24) + "CC_A enable, 601->709\n"));
     ASSERT_TRUE(found.departure);
     EXPECT_EQ(Departure::Kind::Extra, found.departure->kind);
-    EXPECT_EQ(25u, found.departure->found->line);
-    EXPECT_EQ("CC_A enable, 601->709", found.departure->found->shown);
+    EXPECT_EQ(25u, found.departure->found.line);
+    EXPECT_EQ("CC_A enable, 601->709", found.departure->found.shown);
     EXPECT_EQ("Scaler CC enable, 709->601", found.departure->expected->item.shown);
 }
 
@@ -115,8 +115,8 @@ TEST(DecodeAgainst, SwappedLines_AreFound)
     const Comparison found = against(log);
     ASSERT_TRUE(found.departure);
     EXPECT_EQ(Departure::Kind::Swapped, found.departure->kind);
-    EXPECT_EQ(12u, found.departure->found->line);
-    EXPECT_EQ("CVBS(1, RES_480I)", found.departure->found->shown);
+    EXPECT_EQ(12u, found.departure->found.line);
+    EXPECT_EQ("CVBS(1, RES_480I)", found.departure->found.shown);
     EXPECT_EQ("CAV (1, RES_480P)", found.departure->expected->item.shown);
 }
 
@@ -125,7 +125,7 @@ TEST(DecodeAgainst, AnotherLine_IsFound)
     const Comparison found = against(with(captured(), "CC_A disable", "CC_A enable, 601->709"));
     ASSERT_TRUE(found.departure);
     EXPECT_EQ(Departure::Kind::Different, found.departure->kind);
-    EXPECT_EQ(24u, found.departure->found->line);
+    EXPECT_EQ(24u, found.departure->found.line);
 }
 
 TEST(DecodeAgainst, LogFromTheMiddle_IsAligned)
@@ -143,7 +143,7 @@ TEST(DecodeAgainst, LogFromTheMiddleWithADeparture_IsAlignedAndFound)
     const Comparison found = against(with(log.substr(begin_of(log, 13)), "HD Exist(1)", "HD Exist(0)"));
     ASSERT_TRUE(found.departure);
     EXPECT_EQ(Departure::Kind::Value, found.departure->kind);
-    EXPECT_EQ(5u, found.departure->found->line);
+    EXPECT_EQ(5u, found.departure->found.line);
     EXPECT_EQ(9u, found.skipped);
     EXPECT_EQ(3u, found.agreeing);
 }
@@ -264,6 +264,113 @@ TEST_F(DecodeProgram, WhatScenariosPrint_DoesNotDepartFromThem)
         const Ended ended = run("decode --against " + file + " -", run("run " + file).out);
         EXPECT_EQ(0, ended.code) << name << "\n" << ended.out << ended.err;
     }
+}
+
+/** Blanks and ends of lines, however long the line was, are one blank. */
+std::string flowing(const std::string& text)
+{
+    std::string words;
+    for (const char c : text)
+    {
+        if (c != ' ' && c != '\n')
+            words += c;
+        else if (!words.ends_with(' '))
+            words += ' ';
+    }
+    return words;
+}
+
+TEST_F(DecodeProgram, APieceOfALog_IsToldWithWhatIsLeftOut)
+{
+    const std::string log = captured();
+    const std::string piece = log.substr(begin_of(log, 13), begin_of(log, 25) - begin_of(log, 13));
+    EXPECT_EQ("standard input against scenarios/first-mode-after-boot.pmx: no departure agreement 9 lines agree, from "
+              "line 1 of the log to line 12; compared up to level 9; the log begins 9 lines into the scenario; it ends "
+              "2 lines before the scenario does ",
+              flowing(run(compare_input, piece).out));
+    const std::string cut = flowing(run(compare_input, piece.substr(19, piece.size() - 28)).out);
+    EXPECT_NE(std::string::npos, cut.find(": no departure agreement 7 lines agree, from line 2")) << cut;
+    const std::string one = flowing(run(compare_input, line_of(log, 22)).out);
+    EXPECT_NE(std::string::npos, one.find("agreement 1 line agrees, from line 1 of the log to line 1;")) << one;
+    const std::string none = flowing(run(compare_input, "VDP_1 Disabled\n").out);
+    EXPECT_NE(std::string::npos, none.find("departs at line 1: a line too many agreement no line agrees;")) << none;
+}
+
+TEST_F(DecodeProgram, ManyDepartures_AreShownUpToANumber)
+{
+    std::string lines = "loglevel 9\nPMX_Init\n", log;
+    for (int i = 0; i < 42; ++i)
+    {
+        lines += "PMX_VdpDisabled 0 1\nPMX_Stop\n";
+        log += "VDP_2 Disabled\nPMX_Stop\n";
+    }
+    std::ofstream(file("many.pmx")) << lines;
+    const std::string compare = "decode --against '" + file("many.pmx") + "' -";
+    const std::string begin = run("run '" + file("many.pmx") + "'").out;
+    log = begin.substr(0, begin.find("VDP_1")) + log;
+    const auto departures = [](const std::string& shown) {
+        std::size_t count = 0;
+        for (std::size_t at = shown.find(" again at "); at != shown.npos; at = shown.find(" again at ", at + 1))
+            ++count;
+        return count;
+    };
+    const std::string shown = run(compare, log).out;
+    EXPECT_EQ(40u, departures(shown));
+    EXPECT_NE(std::string::npos, flowing(shown).find("42 departures: 42 of other values; 47 lines agree; --verbose"))
+        << shown.substr(shown.size() - 200);
+    EXPECT_EQ(41u, departures(run(compare + " -v", log).out));
+}
+
+TEST_F(DecodeProgram, Departures_OfSeveralLinesAndBehindTheEnd)
+{
+    const std::string log = captured();
+    std::string shown = flowing(run(compare_input, with_line(with_line(log, 13, ""), 12, "")).out);
+    EXPECT_NE(std::string::npos, shown.find(": 2 lines are missing ")) << shown;
+    shown = flowing(run(compare_input, log + "PMX_Stop\nPMX_Stop\n").out);
+    EXPECT_NE(std::string::npos, shown.find(": 2 lines too many ")) << shown;
+    EXPECT_NE(std::string::npos, shown.find("expected nothing more: the scenario is over found PMX_Stop operation"))
+        << shown;
+    EXPECT_EQ(std::string::npos, shown.find(" scenario scenarios/")) << shown;
+    shown = run("decode --json --against scenarios/first-mode-after-boot.pmx -",
+                with(log, "HDMI(1, RES_1080P60HZ)", "HDMI(1, RES_1080P50HZ)") + "PMX_Stop\n")
+                .out;
+    const std::string last = R"("further":[{"kind":"extra","line":29,"found":"PMX_Stop","expected":null,"operation":)"
+                             R"("PMX_Stop","scenario_line":null,"count":1,"values":[]}],"agreeing_behind":12)";
+    EXPECT_NE(std::string::npos, shown.find(last)) << shown.substr(shown.find("\"against\""));
+    shown = run("decode --json --against scenarios/first-mode-after-boot.pmx -", log).out;
+    EXPECT_NE(std::string::npos, shown.find(R"("departure":null,"further":[])")) << shown;
+}
+
+TEST_F(DecodeProgram, WhatIsReadTwiceCutOrFromATrace_IsSummedUp)
+{
+    const std::string log = captured();
+    const std::string cut = log.substr(399, 300);
+    EXPECT_NE(std::string::npos, flowing(run("decode -", cut).out).find(" cut ")) << run("decode -", cut).out;
+    const std::string twice = line_of(log, 17) + line_of(log, 18) + line_of(log, 18);
+    EXPECT_NE(std::string::npos, flowing(run("decode -", twice).out).find(", 1 twice ")) << run("decode -", twice).out;
+    run("run -q --trace-format jsonl --trace-file " + file("trace") + " scenarios/first-mode-after-boot.pmx");
+    EXPECT_NE(
+        std::string::npos,
+        flowing(run("decode " + file("trace")).out).find("; a trace in JSON lines, read as the console of its run"));
+    EXPECT_NE(std::string::npos, run("decode --json " + file("trace")).out.find("\"form\":\"trace\""));
+    EXPECT_EQ("standard input: 1 line, 0 texts of the mixer layer, 1 foreign\n"
+              "Nothing in it comes from the mixer layer.\n",
+              run("decode -q -", "Booting...\n").out);
+}
+
+TEST_F(DecodeProgram, Texts_AreThoseThatTheLayerPrints)
+{
+    const std::string shown = run("decode --texts").out;
+    for (const char* const text :
+         { "\"PMX_Stop\\n\"\n  level 1, PMX_Stop: light stop\n", "  print, ", "  assertion, " })
+        EXPECT_NE(std::string::npos, shown.find(text)) << text << shown.substr(0, 2000);
+    const std::string json = run("decode --texts --json").out;
+    for (const char* const text :
+         { R"({"format":"PMX_Stop\n","source":"log","level":1,"values":[],"operations":["PMX_Stop"],)",
+           R"({"format":"RES_MODE_NUM","source":"value"})", R"({"format":"DRV_NON_EXT_CHIP","source":"value"})",
+           R"({"format":"fast_init_param","source":"other"})" })
+        EXPECT_NE(std::string::npos, json.find(text)) << text << json.substr(0, 2000);
+    EXPECT_EQ(std::string::npos, json.find("DRV_RX_BYPASS_TX"));
 }
 
 TEST_F(DecodeProgram, ToScenario_WritesOneThatPrintsTheSame)

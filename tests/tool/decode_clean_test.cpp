@@ -15,6 +15,17 @@ TEST(DecodeClean, TerminalSequencesAndControlCharactersGo)
     EXPECT_EQ("a b", clean("a\tb"));
     EXPECT_EQ("ab", clean(std::string_view("a\0b\x7f\b", 5)));
     EXPECT_EQ("ü", clean("ü"));
+    EXPECT_EQ("PMX_Init", clean("PMX_Init\x1b["));
+    EXPECT_EQ("PMX_Init1;3", clean("PMX_Init\x1b[1;3")) << "what does not end is none";
+    EXPECT_EQ("PMX_Init1x", clean("PMX_Init\x1b[1\x01x"));
+}
+
+TEST(DecodeClean, ATextInTheTraceHasItsLineEndWrittenOut)
+{
+    EXPECT_EQ("LOG1 \"PMX_Stop", clean(R"(LOG1 "PMX_Stop\n")"));
+    EXPECT_EQ("UTIL_Printf \"TESTPMX: Get pard ID:0.", clean(R"(UTIL_Printf "TESTPMX: Get pard ID:0.\n")"));
+    for (const char* const as_it_stands : { R"(LOG1 "PMX_Stop")", R"(LOG1 "Main")", R"(LOG"")", R"("PMX_Stop\n")" })
+        EXPECT_EQ(as_it_stands, clean(as_it_stands));
 }
 
 TEST(DecodeClean, TimeStampsAreReadWhateverTheirForm)
@@ -26,7 +37,8 @@ TEST(DecodeClean, TimeStampsAreReadWhateverTheirForm)
     EXPECT_EQ("12:34:56", stamp_of("ttyS0 12:34:56: PMX_Init").text);
     EXPECT_EQ("5.25", stamp_of("(  5.25) PMX_Init").text);
     EXPECT_EQ("", stamp_of("HDMI(1, RES_480I)").text);
-    for (const char* other : { "x1.12:34:56", "112:34:56", "12:34:5", "v 5.25 x", "[5.25x]", "[5.]", "12:34:" })
+    for (const char* other : { "x1.12:34:56", "112:34:56", "12:34:5", "v 5.25 x", "[5.25x]", "[5.]",
+                               "12:34:", "ab:34:56", "12:ab:56", "12:34:ab" })
         EXPECT_EQ("", stamp_of(other).text) << other;
 }
 
@@ -38,6 +50,7 @@ TEST(DecodeClean, OfSeveralTimeStamps_TheFinestIsMeant)
     EXPECT_EQ("12.5", stamp_of("<6>[   12.5] ").text);
     EXPECT_DOUBLE_EQ(13 * 3600, stamp_of("01:00:00 PM ").seconds.value_or(0));
     EXPECT_DOUBLE_EQ(0, stamp_of("12:00:00 AM ").seconds.value_or(1));
+    EXPECT_DOUBLE_EQ(11 * 3600, stamp_of("11:00:00 AM ").seconds.value_or(0));
 }
 
 TEST(DecodeClean, APrefixDoesNotEndInAWord)

@@ -65,6 +65,34 @@ TEST(DecodeLog, ForeignLines_AreNotTaken)
         EXPECT_TRUE(read_log(line).items.empty()) << line;
 }
 
+TEST(DecodeLog, OneTextIsReadAlone_AndWhole)
+{
+    EXPECT_TRUE(read_text("PMX_Stop"));
+    for (const char* const none :
+         { "", "player: hello", "PMX_Stop PMX_Init", "HDMI(1, RES_108", "PMX Finished to set OSD Dis" })
+        EXPECT_FALSE(read_text(none)) << none;
+}
+
+TEST(DecodeLog, ATraceWhoseLinesLackSomething_IsReadAsFarAsItGoes)
+{
+    const Log log = read_log("{\"sequence\":1,\"kind\":\"log\"}\n"
+                             "{\"sequence\":2,\"kind\":\"log\",\"text\":5,\"time_us\":7}\n"
+                             "{\"sequence\":3,\"kind\":\"log\",\"text\":\"PMX_Stop\\n\",\"time_us\":\"x\"}\n"
+                             "{\"sequence\":4,\"kind\":\"log\",\"text\":\"PMX_Init\\n\"}\n"
+                             "{\"sequence\":5,\"kind\":\"assert\"}\n"
+                             "{\"sequence\":6,\"kind\":\"assert\",\"arguments\":[]}\n"
+                             "{\"sequence\":7,\"kind\":\"assert\",\"time_us\":1,\"arguments\":{\"szExpression\":\"0\","
+                             "\"szFile\":\"src/driver/pmx/pmx_colour.cpp\"}}\n"
+                             "{\"sequence\":8,\"kind\":\"call\",\"function\":\"x\"}\n");
+    EXPECT_EQ(Log::Form::Trace, log.form);
+    ASSERT_EQ(3u, log.items.size());
+    EXPECT_EQ("PMX_Stop", log.items[0].shown);
+    EXPECT_EQ(3u, log.items[0].line);
+    EXPECT_EQ("PMX_Init", log.items[1].shown);
+    EXPECT_EQ("0, pmx_colour.cpp", log.items[2].shown);
+    EXPECT_EQ(7u, log.items[2].line);
+}
+
 TEST(DecodeLog, Assertion_IsKnownByExpressionAndFile)
 {
     const auto one = read_text("ASSERT x_sema_delete (MutexPMX) == OSR_OK, src/driver/pmx/pmx_lifecycle.cpp:88");

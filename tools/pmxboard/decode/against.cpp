@@ -104,8 +104,7 @@ Alignment::Alignment(Found found, Printed expected)
 
 bool Alignment::agree(std::size_t i, std::size_t j) const
 {
-    return i < m_found.size() && j < m_expected.size() && same(m_expected[j]->item, *m_found[i]) &&
-           at(i, j) == at(i + 1, j + 1);
+    return j < m_expected.size() && same(m_expected[j]->item, *m_found[i]) && at(i, j) == at(i + 1, j + 1);
 }
 
 /** Whether too little is left of a line to tell. */
@@ -141,8 +140,6 @@ std::vector<ValueDifference> differences(const Item& expected, const Item& found
  *  much is missing for the alignment, not a line too many. */
 bool Alignment::comes_later(std::size_t i, std::size_t j) const
 {
-    if (i >= m_found.size())
-        return true;
     const auto is_found = [&](const Expected* one) { return same(one->item, *m_found[i]); };
     const auto is_expected = [&](const Item* one) { return same(m_expected[j]->item, *one); };
     const auto next_expected = m_expected.begin() + static_cast<std::ptrdiff_t>(j);
@@ -154,8 +151,7 @@ bool Alignment::comes_later(std::size_t i, std::size_t j) const
 Departure Alignment::departure(std::size_t i, std::size_t j) const
 {
     Departure found;
-    if (i < m_found.size())
-        found.found = *m_found[i];
+    found.found = *m_found[i];
     if (j >= m_expected.size())
     {
         found.kind = Departure::Kind::Extra;
@@ -331,7 +327,7 @@ void Walk::tell(Departure departure)
 
 std::string operation_of(const Departure& departure)
 {
-    const Text* const text = departure.expected ? departure.expected->item.text : departure.found->text;
+    const Text* const text = departure.expected ? departure.expected->item.text : departure.found.text;
     if (departure.expected && has(text->operations, departure.expected->operation))
         return departure.expected->operation;
     return std::string(split(text->operations).front());

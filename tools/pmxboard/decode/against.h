@@ -42,7 +42,7 @@ struct Departure
 
     Kind kind = Kind::Value;
     std::optional<Expected> expected; ///< nothing: the scenario is over
-    std::optional<Item> found;        ///< what stands there; of a missing line what stands in its place
+    Item found;                       ///< what stands there; of a missing line what stands in its place
     std::vector<ValueDifference> values;
     std::size_t count = 1; ///< lines in a row that are missing, or too many
 };

@@ -131,8 +131,8 @@ void unquote_trace(std::string& line)
 {
     if (!line.ends_with('"') || (line.find("LOG") == line.npos && line.find("rintf \"") == line.npos))
         return;
-    const std::size_t end = line.find_last_not_of(" \"");
-    if (end != line.npos && end != 0 && line[end] == 'n' && line[end - 1] == '\\')
+    const std::size_t end = line.find_last_not_of(" \""); // there are letters, and not at the beginning alone
+    if (line[end] == 'n' && line[end - 1] == '\\')
         line.resize(end - 1);
 }
 

@@ -154,7 +154,7 @@ std::string kind_words(const Departure& departure)
 
 std::string place_of(const Departure& departure)
 {
-    return departure.found ? "line " + std::to_string(departure.found->line) : "its end";
+    return "line " + std::to_string(departure.found.line);
 }
 
 void show_field(std::ostream& out, std::string_view name, std::string_view text)
@@ -168,11 +168,10 @@ void show_departure(std::ostream& out, const Departure& departure, const std::st
 {
     show_field(out, "expected",
                departure.expected ? departure.expected->item.shown : "nothing more: the scenario is over");
-    if (departure.found)
-        show_field(out, departure.kind == Departure::Kind::Missing ? "instead" : "found", departure.found->shown);
+    show_field(out, departure.kind == Departure::Kind::Missing ? "instead" : "found", departure.found.shown);
     for (const ValueDifference& value : departure.values)
         show_field(out, "differs", value.name + ": " + value.expected + " expected, " + value.found + " found");
-    const Text* const text = departure.expected ? departure.expected->item.text : departure.found->text;
+    const Text* const text = departure.expected ? departure.expected->item.text : departure.found.text;
     show_field(out, "operation", operation_of(departure) + ": " + std::string(text->step));
     if (departure.expected)
         show_field(out, "scenario",

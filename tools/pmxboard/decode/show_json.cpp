@@ -94,8 +94,8 @@ Json json_of(const Departure& departure)
     constexpr const char* kinds[] = { "value", "missing", "extra", "different", "swapped" };
     Json json;
     json["kind"] = kinds[static_cast<std::size_t>(departure.kind)];
-    json["line"] = departure.found ? Json(departure.found->line) : Json();
-    json["found"] = departure.found ? Json(departure.found->shown) : Json();
+    json["line"] = departure.found.line;
+    json["found"] = departure.found.shown;
     json["expected"] = departure.expected ? Json(departure.expected->item.shown) : Json();
     json["operation"] = operation_of(departure);
     json["scenario_line"] = departure.expected ? Json(departure.expected->line) : Json();

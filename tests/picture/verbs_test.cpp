@@ -62,6 +62,18 @@ TEST(PictureVerbs, ExpectedColours_AreMetWithinTheTolerance)
               diagnostics(FILM + "expect picture hdmi 640,360 190,100,50"));
     EXPECT_EQ("here.pmx:5: expected a point at 1280,0, found HDMI: 1280x720" + repeat,
               diagnostics(FILM + "expect picture hdmi 1280,0 1,2,3"));
+    EXPECT_EQ("here.pmx:5: expected a point at 0,720, found HDMI: 1280x720" + repeat,
+              diagnostics(FILM + "expect picture hdmi 0,720 1,2,3"));
+}
+
+TEST(PictureVerbs, Outputs_HaveTheNamesOfTheLayersCalls)
+{
+    for (const auto& [ours, layers] : { std::pair{ "digital", "ccir" }, std::pair{ "component", "cav" } })
+    {
+        const std::string refused = diagnostics(FILM + "expect picture " + ours + " 8192,0 1,2,3");
+        EXPECT_TRUE(refused.starts_with("here.pmx:5: expected a point at 8192,0, found ")) << refused;
+        EXPECT_EQ(refused, diagnostics(FILM + "expect picture " + layers + " 8192,0 1,2,3"));
+    }
 }
 
 TEST(PictureVerbs, AnOutputWithoutSignal_SaysWhy)

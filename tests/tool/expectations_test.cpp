@@ -123,6 +123,9 @@ TEST(Expectations, Log)
     EXPECT_EQ("", after("PMX_Stop", "log 1 \"PMX_Stop\\n\""));
     EXPECT_EQ(failed("expected log 8 \"PMX_Stop\\n\", found no line of this level"),
               after("PMX_Stop", "log 8 \"PMX_Stop\\n\""));
+    EXPECT_EQ(failed("expected log 0 \"TESTPMX: Get pard ID:0.\\n\", found at last LOG0 \"[PMX] create a timer \\n\""),
+              after("PMX_Init", "log 0 \"TESTPMX: Get pard ID:0.\\n\""))
+        << "it is printed with no level";
     EXPECT_EQ(failed("expected log 1 \"PMX_Stop\", found at last LOG1 \"PMX_Stop\\n\""),
               after("PMX_Stop", "log 1 \"PMX_Stop\""));
 }
@@ -132,6 +135,9 @@ TEST(Expectations, Console)
     EXPECT_EQ("", after("PMX_Stop", "console \"MX_St\""));
     EXPECT_EQ(failed("expected console \"PMX_Init\", found \"PMX_Stop\\n\""),
               after("PMX_Stop", "console \"PMX_Init\""));
+    const std::string shortened = after("PMX_QueryStatus", "console \"nobody prints that\"");
+    EXPECT_TRUE(shortened.starts_with("here.pmx:2: expected console \"nobody prints that\", found …\"")) << shortened;
+    EXPECT_GT(std::size_t{ 400 }, shortened.size()) << "no more than fits";
     EXPECT_EQ("here.pmx:3: expected console \"PMX_Stop\", found \"\"" + repeat,
               diagnostics("PMX_Stop\nPMX_GetMode 0\nexpect console \"PMX_Stop\""));
 }
@@ -142,6 +148,10 @@ TEST(Expectations, State)
     EXPECT_EQ("", after("PMX_Init", "state record.aucPlaneOrder [4, 3, 1, 0, 2, 5, 6, 7]"));
     EXPECT_EQ("", after("PMX_Init", "state piVdp1 null"));
     EXPECT_EQ(failed("expected state ucMode 2, found RES_1080P60HZ"), after("PMX_Init", "state ucMode 2"));
+    EXPECT_EQ(failed("expected state ucMode null, found RES_1080P60HZ"), after("PMX_Init", "state ucMode null"));
+    EXPECT_EQ("here.pmx:2: no name _ucMode", after("PMX_Init", "state ucMode _ucMode").substr(0, 27));
+    EXPECT_EQ("here.pmx:2: nothing stands before or behind a comma: 4,,3\n",
+              after("PMX_Init", "state record.aucPlaneOrder [4,,3]"));
     EXPECT_EQ(failed("expected state record.aucPlaneOrder [4], found [4, 3, 1, 0, 2, 5, 6, 7]"),
               after("PMX_Init", "state record.aucPlaneOrder [4]"));
     EXPECT_TRUE(

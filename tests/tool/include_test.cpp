@@ -206,6 +206,8 @@ TEST(ExpectTimes, ExactAndAbout)
                                       "expect at about 11s\nexpect after about 10s"));
     EXPECT_EQ("here.pmx:5: expected at 10s, found 10002000us\nrepeat: pmxboard run here.pmx\n",
               diagnostics(lines + "expect at 10s"));
+    EXPECT_EQ("here.pmx:5: expected at 11s, found 10002000us\nrepeat: pmxboard run here.pmx\n",
+              diagnostics(lines + "expect at 11s"));
     EXPECT_EQ("here.pmx:5: expected after about 9s, found 10000000us\nrepeat: pmxboard run here.pmx\n",
               diagnostics(lines + "expect after about 9s"));
     EXPECT_EQ("", diagnostics("PMX_Init\nPMX_GetMode 0\nPMX_SetTvType 0 3\nexpect next PMX_HalSetTvType(...)\n"

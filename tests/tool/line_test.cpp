@@ -65,4 +65,15 @@ TEST(ScenarioLine, WhatDoesNotClose_IsRefused)
     EXPECT_EQ("a ']' closes nothing: {1]", reason("call {1]"));
 }
 
+TEST(ScenarioLine, WordsAndBracketsHaveALimit)
+{
+    std::string words;
+    for (unsigned i = 0; i < 1000; ++i)
+        words += " 0";
+    EXPECT_EQ("taken apart into 1000 words", reason(words));
+    EXPECT_EQ("a line has more than 1000 words", reason(words + " 0"));
+    EXPECT_EQ("taken apart into 1 words", reason(std::string(32, '[') + std::string(32, ']')));
+    EXPECT_EQ("brackets stand more than 32 deep in each other", reason(std::string(33, '[') + std::string(33, ']')));
+}
+
 } // namespace

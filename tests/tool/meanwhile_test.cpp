@@ -284,6 +284,11 @@ TEST(ThreadVerb, NobodyGivesTheMutexBack_IsAMisuse)
         "mutex 1" +
             repeat,
         diagnostics(lines + "what-if PMX_GetMode 0"));
+    EXPECT_EQ(
+        "here.pmx:8: explain copies the process, and a thread that waits cannot be copied: i4Pmx_Connect waits for "
+        "mutex 1" +
+            repeat,
+        diagnostics(lines + "explain PMX_GetMode 0"));
     EXPECT_EQ("", diagnostics("PMX_Init"));
 }
 

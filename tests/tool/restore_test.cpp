@@ -238,6 +238,25 @@ TEST_F(Restore, WhatLeadsElsewhere_IsRefused_AndNothingHasChanged)
               refused(steps + "1", steps + "2"));
 }
 
+TEST_F(Restore, AFileThatIsNoState_IsTold)
+{
+    std::ofstream(saved()) << "{";
+    EXPECT_EQ("here.pmx:1: " + saved() + ": it ends in the middle, at line 1, column 2" + tool_test::repeat,
+              run_here(restore()));
+}
+
+TEST_F(Restore, AThreadThatWaits_WouldNeverGoOn)
+{
+    ASSERT_EQ("", run_here("PMX_Init\n" + save()));
+    EXPECT_EQ("here.pmx:7: a thread waits in the midst of a call, and would never go on: i4Pmx_Connect waits for "
+              "mutex 1" +
+                  tool_test::repeat,
+              run_here("PMX_Init\nsource vdp0 connect\nmeanwhile as thread i4ImQueryInterface source osd1 connect\n"
+                       "meanwhile i4ImReleaseInterface poke MutexPMX 99\nPMX_InformVdpColorSpace 0\n"
+                       "expect misuses 1\n" +
+                       restore()));
+}
+
 TEST_F(Restore, StatesThatNoLinesLeadTo_AreToldApart)
 {
     const std::string save_told = "  to be looked at and compared, not restored: ";

@@ -27,6 +27,19 @@ TEST_F(ShellWords, Break_StopsInTheCall_LooksAndGoesOn)
     EXPECT_EQ(std::string::npos, ended.out.find("stopped", stopped + 1));
 }
 
+TEST_F(ShellWords, Break_WhereItStops_NothingIsCarriedOutThatTakesTheLayerAway)
+{
+    const Ended ended = run("shell", "PMX_Init\nbreak PMX_HalSetTvType\nPMX_SetTvType 0 PMX_TV_TYPE_PAL\npower-on\n"
+                                     "include x.pmx\nwhat-if PMX_Init\nrestore x.json\npoke ucHu 7\npoke ucHue 7\n"
+                                     "continue\nexpect state ucHue 7\n");
+    const std::string waits = " waits until the layer has gone on: continue\n";
+    EXPECT_TRUE(ended.err.starts_with("<stdin>:4: power-on" + waits + "<stdin>:5: include" + waits +
+                                      "<stdin>:6: what-if" + waits + "<stdin>:7: restore" + waits + "<stdin>:8: "))
+        << ended.err;
+    EXPECT_EQ(std::string::npos, ended.err.find("<stdin>:9")) << ended.err;
+    EXPECT_EQ(1, ended.code);
+}
+
 TEST_F(ShellWords, Break_AfterPowerOn_InAnExpiry_AndWhereTheLinesEnd)
 {
     const Ended ended = run("shell", "break vPmxMixPlane\npower-on\nPMX_Init\nPMX_SetFormatChangeTimer 10000\n"

@@ -91,6 +91,13 @@ TEST(Save, FailsWithTheReason)
               run("save no/such/directory/file.json").diagnostics);
 }
 
+TEST(Save, ANameThatNoFileCanHave_IsAWrongLine)
+{
+    for (const char* const name : { R"("")", R"("x\x00.json")" })
+        EXPECT_EQ("here.pmx:1: a file has a name, and no \\x00 in it\n", run(std::string("save ") + name).diagnostics);
+    EXPECT_EQ("here.pmx:1: no such escape in a text: \\q\n", run(R"(save "\q")").diagnostics);
+}
+
 TEST(Dump, ReadsBackWhatItWrote_InEverySituation)
 {
     unsigned dumps = 0;

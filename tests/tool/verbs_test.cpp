@@ -197,6 +197,22 @@ TEST(Verbs, SuspendAndResume_RunWhatIsRegistered)
                       "expect next PMX_HalClockSet(0, 0)\nresume\nexpect next PMX_HalClockSet(0, 1)\nexpect result 0"));
 }
 
+TEST(Verbs, WhatLiesFarBack_IsForgotten)
+{
+    std::string lines = "PMX_Init\n";
+    for (unsigned i = 0; i < 25; ++i)
+        lines += "PMX_QueryStatus\n";
+    EXPECT_EQ("", diagnostics(lines + "expect console \"fgOSD5\""));
+    const std::size_t kept = board::console_text().size();
+    diagnostics("PMX_Init\nPMX_QueryStatus\n");
+    EXPECT_GT(65536 + 2 * board::console_text().size(), kept);
+    lines = "PMX_Init\n";
+    for (unsigned i = 0; i < 60; ++i)
+        lines += "PMX_SetMode 0 RES_720P50HZ 50 0\nPMX_SetMode 0 RES_480P 60 0\n";
+    EXPECT_EQ("", diagnostics(lines + "expect call PMX_HalSetMode(0, RES_480P)"));
+    EXPECT_GT(std::size_t{ 4'300 }, board::trace::entries().size());
+}
+
 TEST(Verbs, Print_ShowsTheText)
 {
     EXPECT_EQ("> print \"a\\tb\\n\"\na\tb\n", run("print \"a\\tb\\n\"").shown);

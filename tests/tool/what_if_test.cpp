@@ -112,6 +112,10 @@ TEST_F(WhatIf, WithinItself)
 
 TEST(WhatIfLine, ThatIsWrong_EndsTheRun)
 {
+    std::string deep;
+    for (unsigned i = 0; i < 9; ++i)
+        deep += "what-if ";
+    EXPECT_EQ("here.pmx:1: what-if stands at most 8 times within itself\n", diagnostics(deep + "PMX_Init"));
     EXPECT_EQ("here.pmx:1: write: what-if COMMAND\n", diagnostics("what-if"));
     EXPECT_EQ("here.pmx:1: no command PMX_SetTvTyp; did you mean PMX_SetTvType?\n",
               diagnostics("what-if PMX_SetTvTyp 0 1"));
@@ -128,6 +132,19 @@ TEST(WhatIfLine, ThatWouldFail_SaysSo_AndTheRunGoesOn)
     EXPECT_TRUE(outcome.done) << outcome.diagnostics;
     EXPECT_NE(std::string::npos, outcome.shown.find("  would fail: no IPMX table is registered")) << outcome.shown;
     EXPECT_NE(std::string::npos, outcome.shown.find("*pucTvType")) << outcome.shown;
+}
+
+TEST(WhatIfLine, ThatWouldEndTheProgram_SaysSo)
+{
+    board::power_on({});
+    board::at_every_call([copied = getpid()](const board::TraceEntry& entry) {
+        if (getpid() != copied && entry.function == "PMX_HalSetTvType")
+            raise(SIGKILL);
+    });
+    const auto outcome = run("what-if PMX_SetTvType 0 3\nPMX_GetTvType 0");
+    board::at_every_call({});
+    EXPECT_TRUE(outcome.done) << outcome.diagnostics;
+    EXPECT_NE(std::string::npos, outcome.shown.find("  would end the program: Killed\n")) << outcome.shown;
 }
 
 TEST(WhatIfLine, MisuseAndAssertion_AreShownAndNotCounted)

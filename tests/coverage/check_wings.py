@@ -3,26 +3,27 @@
 """Runs the tests of board and tool in a build that counts, and prints which lines and branches of these wings they
 reach: the board's devices, the language of scenarios, the recorder, and the reader of logs.
 
-What cannot be reached stands in unreached.txt, each with its reason. What is not reached yet stands in
-unreached_yet.txt, which a program writes: it fails when something else is missing, or when something of it was reached.
---renew writes it anew, but not when a wing reaches less than before.
+What no test reaches stands in unreached_wings.txt, by the reason why: it fails when something else is missing, and when
+something of that list is reached. A reason begins a line and ends with an empty one; below it stands where it holds:
+
+    Why nothing of this is reached.
+     FILE line|branch
+      NUMBER the line of source
+
+What a NUMBER and a line of source are, counted.py tells.
 
 usage: check_wings.py --build DIRECTORY --profdata PROGRAM --cov PROGRAM --tool PMXBOARD
-                      --recorder PRODUCT INTERRUPTED LATE [--renew] TEST_PROGRAM...
+                      --recorder PRODUCT INTERRUPTED LATE TEST_PROGRAM...
 """
 
 import argparse
-import collections
 import pathlib
 import re
 import sys
 
 sys.dont_write_bytecode = True
 
-sys.path.append(str(pathlib.Path(__file__).resolve().parents[2] / "cmake"))
-
 import counted  # noqa: E402
-import whole_file  # noqa: E402
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 HERE = pathlib.Path(__file__).resolve().parent
@@ -35,11 +36,6 @@ WINGS = {
 }
 # A build that counts has symbols of its own, at no address and within functions.
 ELSEWHERE = "--gtest_filter=-Trace.Objects_AreRecordedByName:ExecutableSymbols.NameAt_TheBeginningOfWhatHasAName"
-HEAD = """# SPDX-License-Identifier: MIT OR GPL-2.0-only
-# What no test of board and tool reaches yet, and could: check_wings.py --renew writes this list. Behind its number each
-# has the text of its line; lines that follow one another are one, which has the first one's.
-"""
-RENEW = "cmake --build --preset coverage --target renew_coverage"
 
 
 def wing_of(name):
@@ -57,69 +53,24 @@ def commands(arguments):
     yield [sys.executable, "tests/decode/to_scenario.py", tool]
 
 
-def read_yet(text):
-    """{Missing: number} of what is not reached yet."""
-    known, file, kind = {}, "", ""
+def read_reasons(text):
+    """({Missing: number}, complaints) of what no test reaches, each for a reason."""
+    named, complaints, reason, place = {}, [], "", ()
     for line in text.splitlines():
-        if match := re.fullmatch(r"(\d+) (.*)", line):
-            known[counted.Missing(file, kind, match[2])] = int(match[1])
-        elif line and not line.startswith("#"):
-            file, kind = line.split()
-    return known
-
-
-def written(missing):
-    """The list, as read_yet reads it."""
-    entries = collections.defaultdict(list)
-    for one, number in missing.items():
-        entries[f"{one.file} {one.kind}"].append(f"{number} {one.text}\n")
-    return HEAD + "".join(f"\n{head}\n{''.join(lines)}" for head, lines in sorted(entries.items()))
-
-
-def sums(missing):
-    """Counter of (wing, kind)."""
-    found = collections.Counter()
-    for one, number in missing.items():
-        found[wing_of(one.file), one.kind] += number
-    return found
-
-
-def worse(missing, known):
-    """Wings that reach less than the list says."""
-    before = sums(known)
-    for (wing, kind), number in sorted(sums(missing).items()):
-        if number > before[wing, kind]:
-            yield f"{wing}: {number} {counted.NEVER[kind]}, {before[wing, kind]} before: write their tests"
-
-
-def without(missing, named):
-    """What is missing and has no reason."""
-    return {one: number - named.get(one, 0) for one, number in missing.items() if number > named.get(one, 0)}
-
-
-def stale(missing, named):
-    for one, number in named.items():
-        if number > missing.get(one, 0):
-            yield (f"{one}\n    {number} {counted.NEVER[one.kind]} in the list of what cannot be, "
-                   f"{missing.get(one, 0)} seen")
-
-
-def compare(missing, named, yet):
-    """What is wrong; a line for each."""
-    yield from stale(missing, named)
-    rest = without(missing, named)
-    different = list(counted.judge(rest, yet))
-    yield from different
-    if different and not list(worse(rest, yet)):
-        yield f"no wing reaches less than before; that the list says what is so now: {RENEW}"
-
-
-def renew(missing, named, file):
-    rest = without(missing, named)
-    complaints = list(worse(rest, read_yet(file.read_text(encoding="utf-8")))) if file.exists() else []
-    if not complaints:
-        whole_file.write(file, written(rest))
-    return complaints
+        if line.startswith("#"):
+            continue
+        if not line.startswith(" "):
+            reason, place = line, ()
+        elif (head := re.fullmatch(rf" (\S+) ({'|'.join(KINDS)})", line)) and reason:
+            place = head.groups()
+        elif (entry := re.fullmatch(r"  ([1-9]\d*) (.+)", line)) and place:
+            one = counted.Missing(*place, entry[2])
+            if one in named:
+                complaints.append(f"listed twice: {one.kind}: {one}")
+            named[one] = int(entry[1])
+        else:
+            complaints.append(f"neither a reason, nor where it holds: {line.strip()}")
+    return named, complaints
 
 
 def measure(arguments):
@@ -130,9 +81,14 @@ def measure(arguments):
         sys.exit(failed)
     tools = counted.Tools(arguments.profdata, arguments.cov)
     product, interrupted, _ = arguments.recorder
-    programs = [*arguments.programs, arguments.tool, product, interrupted]
-    files = [file for file in counted.files_of(tools.export(programs, counts), ROOT, ("board/", "tools/", "recorder/"))
-             if wing_of(file.name)]
+    programs = [*arguments.programs, arguments.tool, product]
+    files = {}
+    # What is compiled otherwise, of the same name, is counted apart.
+    for counted_together in (programs, [interrupted]):
+        for file in counted.files_of(tools.export(counted_together, counts), ROOT, ("board/", "tools/", "recorder/")):
+            if wing_of(file.name):
+                files.setdefault(file.name, file).count_also(file)
+    files = list(files.values())
     found = {wing_of(file.name) for file in files}
     if missing := set(WINGS) - found:
         sys.exit(f"nothing was counted of {', '.join(sorted(missing))}")
@@ -147,27 +103,16 @@ def main():
     parser.add_argument("--cov", required=True, help="llvm-cov of the compiler's version")
     parser.add_argument("--tool", required=True, type=pathlib.Path, help="pmxboard")
     parser.add_argument("--recorder", required=True, type=pathlib.Path, nargs=3, help="what replay_test.py takes")
-    parser.add_argument("--renew", action="store_true", help="write unreached_yet.txt anew")
     parser.add_argument("programs", nargs="+", type=pathlib.Path)
     arguments = parser.parse_args()
 
     files = measure(arguments)
-    missing = counted.all_missing(files)
-    named, complaints = counted.read_list((HERE / "unreached.txt").read_text(encoding="utf-8"))
-    named = {one: number for one, number in named.items() if wing_of(one.file)}
+    named, complaints = read_reasons((HERE / "unreached_wings.txt").read_text(encoding="utf-8"))
+    complaints += counted.judge(counted.all_missing(files), named)
     for wing in WINGS:
         print("\n".join([wing, *counted.table([file for file in files if wing_of(file.name) == wing], KINDS), ""]))
-
-    list_of_rest = HERE / "unreached_yet.txt"
-    if arguments.renew:
-        complaints += renew(missing, named, list_of_rest)
-    else:
-        complaints += compare(missing, named, read_yet(list_of_rest.read_text(encoding="utf-8")))
-    rest = sums(without(missing, named))
     print("\n".join(complaints))
-    print(f"wings: {len(complaints)} complaints, {sum(named.values())} that cannot come about, not reached yet: "
-          f"{sum(number for (_, kind), number in rest.items() if kind == 'line')} lines, "
-          f"{sum(number for (_, kind), number in rest.items() if kind == 'branch')} branches")
+    print(f"wings: {len(complaints)} complaints, {sum(named.values())} that no test reaches, for a reason each")
     return 1 if complaints else 0
 
 

@@ -1,10 +1,8 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
-"""The check of board and tool, held against what it must refuse, and what it must not write."""
+"""The check of board and tool, held against lists that it must refuse."""
 
-import pathlib
 import sys
-import tempfile
 import unittest
 
 sys.dont_write_bytecode = True
@@ -12,10 +10,23 @@ sys.dont_write_bytecode = True
 import check_wings  # noqa: E402
 from counted import Missing  # noqa: E402
 
+LIST = """# what it is
+
+No memory, and
+nobody can have none.
+ board/one.cpp branch
+  2 if (a && b)
+  1 if (c)
+ board/one.cpp line
+  12 return 1;
+
+Elsewhere.
+ recorder/ring.h line
+  1 }
+"""
+
 
 class Wings(unittest.TestCase):
-    IF, LINE = Missing("board/one.cpp", "branch", "if (a && b)"), Missing("board/one.cpp", "line", "return 1;")
-
     def test_files_belong_to_their_wing(self):
         tool = "tools/pmxboard/"
         for name, wing in (("board/mixer.cpp", "board"), ("board/picture/mix.cpp", None),
@@ -24,39 +35,23 @@ class Wings(unittest.TestCase):
                            (tool + "report/page.cpp", None)):
             self.assertEqual(wing, check_wings.wing_of(name))
 
-    def test_what_is_written_is_read(self):
-        missing = {self.IF: 2, self.LINE: 12, Missing("recorder/ring.h", "line", "}"): 1}
-        self.assertEqual(missing, check_wings.read_yet(check_wings.written(missing)))
+    def test_reasons_hold_for_what_stands_below_them(self):
+        self.assertEqual(({Missing("board/one.cpp", "branch", "if (a && b)"): 2,
+                           Missing("board/one.cpp", "branch", "if (c)"): 1,
+                           Missing("board/one.cpp", "line", "return 1;"): 12,
+                           Missing("recorder/ring.h", "line", "}"): 1}, []), check_wings.read_reasons(LIST))
 
-    def test_same_as_before_is_fine(self):
-        self.assertEqual([], list(check_wings.compare({self.IF: 2}, {}, {self.IF: 2})))
-        self.assertEqual([], list(check_wings.compare({self.IF: 2}, {self.IF: 2}, {})))
-        self.assertEqual([], list(check_wings.compare({self.IF: 2}, {self.IF: 1}, {self.IF: 1})))
+    def test_a_list_may_be_empty(self):
+        self.assertEqual(({}, []), check_wings.read_reasons("# nothing\n"))
 
-    def test_what_is_new_and_what_is_gone_are_told(self):
-        self.assertIn("2 branches never taken, 0 in the list", next(check_wings.compare({self.IF: 2}, {}, {})))
-        self.assertIn("0 branches never taken, 2 in the list", next(check_wings.compare({}, {}, {self.IF: 2})))
+    def test_what_has_no_reason_is_refused(self):
+        for bad in (" board/one.cpp line\n  1 }\n", "Why.\n  1 }\n", LIST.replace("\nElsewhere.\n", "\n\n"),
+                    LIST.replace("Elsewhere.\n", ""), "Why.\n board/one.cpp word\n", "Why.\n a.cpp line\n  0 }\n"):
+            self.assertIn("neither a reason, nor where it holds", "".join(check_wings.read_reasons(bad)[1]), bad)
 
-    def test_a_reason_for_what_is_reached_is_refused(self):
-        told = next(check_wings.compare({self.IF: 1}, {self.IF: 2}, {}))
-        self.assertIn("in the list of what cannot be, 1 seen", told)
-
-    def test_a_list_is_written_anew_when_nothing_became_worse(self):
-        with tempfile.TemporaryDirectory() as folder:
-            place = pathlib.Path(folder) / "list"
-            self.assertEqual([], check_wings.renew({self.IF: 3, self.LINE: 1}, {self.IF: 1}, place))
-            self.assertEqual({self.IF: 2, self.LINE: 1}, check_wings.read_yet(place.read_text(encoding="utf-8")))
-            elsewhere = self.IF._replace(text="if (c)")
-            self.assertEqual([], check_wings.renew({elsewhere: 2}, {}, place))
-            self.assertEqual({elsewhere: 2}, check_wings.read_yet(place.read_text(encoding="utf-8")))
-
-    def test_a_list_that_became_worse_stays(self):
-        with tempfile.TemporaryDirectory() as folder:
-            place = pathlib.Path(folder) / "list"
-            check_wings.renew({self.IF: 1}, {}, place)
-            self.assertEqual(["board: 2 branches never taken, 1 before: write their tests"],
-                             check_wings.renew({self.IF: 2}, {}, place))
-            self.assertEqual({self.IF: 1}, check_wings.read_yet(place.read_text(encoding="utf-8")))
+    def test_what_stands_twice_is_refused(self):
+        self.assertEqual(["listed twice: line: recorder/ring.h: }"],
+                         check_wings.read_reasons(LIST + "  1 }\n")[1])
 
 
 if __name__ == "__main__":

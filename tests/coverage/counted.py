@@ -78,6 +78,15 @@ class File:
             decisions[tuple(place)] = [one or other for one, other in zip(known, conditions)]
         return decisions
 
+    def count_also(self, other):
+        """What the same file has come to elsewhere."""
+        if other is self:
+            return
+        for number, count in other.lines.items():
+            self.lines[number] = max(count, self.lines.get(number, 0))
+        for place, outcomes in other.branches.items():
+            self.branches[place] = [one + more for one, more in zip(self.branches.get(place, [0, 0]), outcomes)]
+
     def text(self, number):
         return self.source[number - 1].strip()
 

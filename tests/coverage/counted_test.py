@@ -76,6 +76,13 @@ class Reading(unittest.TestCase):
             both[name] += other[name]
         self.assertEqual({}, File("board/one.cpp", both, SOURCE).missing())
 
+    def test_what_is_counted_apart_counts_together(self):
+        one, other = file(then=0, branches=((1, 0), (1, 0))), file(branches=((0, 1), (0, 1)))
+        one.count_also(other)
+        self.assertEqual({}, one.missing())
+        one.count_also(one)
+        self.assertEqual({(3, 9, 3, 10): [1, 1], (3, 14, 3, 15): [1, 1]}, one.branches)
+
     def test_lines_that_are_left_out_by_the_preprocessor_are_none(self):
         segments = [Segment(1, 1, 1, True, True, False), Segment(3, 1, 0, False, True, False),
                     Segment(5, 1, 1, True, False, False), Segment(6, 2, 0, False, False, False)]

@@ -485,6 +485,14 @@ class Replay(unittest.TestCase):
         ended = self.replay(recording.of(*before, longer).bytes())
         self.assertIn("PMX_Init: other arguments\n", ended.stdout)
 
+    def test_a_value_too_many_is_shown(self):
+        recording = self.record("PMX_Init\n")
+        began = recording.event(list(recording.events())[1][0])
+        head, *words = recording.event(recording.begin("PMX_IsLog")[1][0])
+        self.file.write_bytes(recording.of(began, [head + 1, *words, 7]).bytes())
+        shown = self.run_tool("replay", "--show", self.file).stdout
+        self.assertTrue(shown.endswith('  PMX_IsLog(1, "PMX_Init\\n", 0x7)\n'), shown)
+
     def test_a_recorder_that_there_cannot_be_is_refused(self):
         self.assertEqual(0, subprocess.run([PRODUCT, "refused", "-"], check=False, timeout=60).returncode)
 
@@ -493,12 +501,14 @@ class Replay(unittest.TestCase):
         snapshot = recording.event(next(recording.events())[0])
         again = recording.of(snapshot)
         self.assertEqual(0, self.replay(again.bytes()).returncode)
-        again.words[HEADER_WORDS + len(snapshot) + 2] ^= 1
-        ended = self.replay(again.bytes())
-        self.assertEqual(1, ended.returncode, ended.stderr)
-        self.assertRegex(ended.stdout, r"^departs at event 2 of 2")
-        self.assertRegex(ended.stdout, r"(?m)^  computed: another record$")
-        self.assertRegex(ended.stdout, r": \w+ was recorded, \w+ computed\b")
+        for word, field in ((2, r"\w+"), (len(snapshot) - 20, r"_arPmxConf\.ar\w+\[\d\]\.[\w.]+")):
+            again.words[HEADER_WORDS + len(snapshot) + word] ^= 1
+            ended = self.replay(again.bytes())
+            again.words[HEADER_WORDS + len(snapshot) + word] ^= 1
+            self.assertEqual(1, ended.returncode, ended.stderr)
+            self.assertRegex(ended.stdout, r"^departs at event 2 of 2")
+            self.assertRegex(ended.stdout, r"(?m)^  computed: another record$")
+            self.assertRegex(ended.stdout, rf": {field}: \w+ was recorded, \w+ computed\b")
 
     def test_what_stands_before_damage_is_replayed(self):
         recording = self.record(MODE_CHANGE)

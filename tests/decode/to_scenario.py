@@ -1,6 +1,7 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
-"""A log at level 9 becomes a scenario that prints the same log: for each scenario that there is, byte for byte.
+"""A log at level 9 becomes a scenario that prints the same log: for each scenario that there is, byte for byte. What is
+left of a log becomes one that can be run.
 
 usage: to_scenario.py PMXBOARD [DIRECTORY]    DIRECTORY keeps what is made
 """
@@ -17,6 +18,17 @@ WITHOUT = {
     "plane-connects-back": "that the video plane's driver connects from inside the call that tells it a colour space",
     "second-source-while-announcing": "that a second source connects, and inside which call of the platform",
     "timer-runs-out-during-change": "inside which call of the platform the timer runs out",
+}
+
+
+# What is left of a log, and a line of what is made of it.
+PIECES = {
+    "[PMX] create a timer \n": "PMX_Init",
+    "PMX_ID(0), Aspect Ratio(2)\n": "fault fgPmxDrvSetAvd FALSE",
+    "PMX_Init\nQuery VDP Interface Fail!\n": "fault i4ImQueryInterface -1 on 1",
+    "PMX_Init\n" + 2 * "Inform Vdp CS(0)\nQuery VDP Interface Fail!\n": "fault i4ImQueryInterface -1 from 1",
+    "PMX_Init\nSetMode, RES_576I\n": "PMX_SetMode 0 RES_576I 50 0",
+    "PMX_Init\nSetMode, RES_480P\n": "PMX_SetMode 0 RES_480P 60 0",
 }
 
 
@@ -61,6 +73,17 @@ def difference(pmxboard, scenario, directory):
     return first_difference(log, again) and f"{first_difference(log, again)} {said}".strip()
 
 
+def wrong_pieces(pmxboard):
+    """What is made of pieces, where it is no scenario, or another one."""
+    for piece, line in PIECES.items():
+        made = subprocess.run([pmxboard, "decode", "--to-scenario", "-"], input=piece, capture_output=True, text=True,
+                              check=False)
+        ended = subprocess.run([pmxboard, "run", "-q", "-"], input=made.stdout, capture_output=True, text=True,
+                               check=False)
+        if line not in made.stdout.splitlines() or ended.returncode != 0:
+            yield f"{piece!r} became {made.stdout!r}, which ends with {ended.returncode}: {made.stderr}{ended.stderr}"
+
+
 def main():
     pmxboard = pathlib.Path(sys.argv[1]).resolve()
     scenarios = sorted(pathlib.Path("scenarios").glob("*.pmx"))
@@ -73,6 +96,7 @@ def main():
                 said.append(f"{scenario.stem}: {differs}")
             elif not differs and scenario.stem in WITHOUT:
                 said.append(f"{scenario.stem} prints the same, although its log is without: {WITHOUT[scenario.stem]}")
+    said += wrong_pieces(pmxboard)
     said += [f"{name} is no scenario" for name in WITHOUT if not (pathlib.Path("scenarios") / f"{name}.pmx").exists()]
     print(*said, sep="\n")
     print(f"{len(scenarios) - len(WITHOUT)} of {len(scenarios)} scenarios are to be found again in their logs")

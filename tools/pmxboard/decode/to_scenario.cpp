@@ -237,7 +237,7 @@ void Writer::faults(const Lines& call)
     {
         told += item->text->format.starts_with("Inform Vdp") ? 1 : 0;
         if (item->text->format.starts_with("Query VDP"))
-            failed.push_back(told);
+            failed.push_back(std::max<std::size_t>(told, 1)); // the line before may be lost
     }
     if (failed.size() == 1)
         say("fault i4ImQueryInterface -1 on " + std::to_string(failed.front()));

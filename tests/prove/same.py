@@ -46,7 +46,8 @@ ONE_TEXT, FEW_BYTES = "one text is formatted in an operation", "no more than 8 b
 OPEN = (ROOM, ONE_TEXT, FEW_BYTES)
 NOT_REACHED = "an end is not reached: what is presumed cannot be"
 VALUE = re.compile(r"^  ([\w.]+)((?:\[\d+)?)l*((?:\].*?)?)=(-?\d+)", re.M)
-OPTIONS = ["--nondet-static", "--unwind", "9", "--object-bits", "12", "--drop-unused-functions", "--slice-formula",
+SLICED = "--slice-formula"
+OPTIONS = ["--nondet-static", "--unwind", "9", "--object-bits", "12", "--drop-unused-functions", SLICED,
            *verdicts.CHECKS]
 EXPORTED = re.compile(r"^extern (?:PMX_API )?const \w+\*? (?:const )?(\w+)", re.M)
 LITERAL = re.compile(r'"(?:[^"\\\n]|\\.)*"(?:\s*"(?:[^"\\\n]|\\.)*")*')
@@ -623,7 +624,8 @@ class Pair:
         return made
 
     def _check(self, program, world, *more):
-        return self._workshop.check(program, *OPTIONS, *more, "--function", f"{world}_same", seconds=self._limit)
+        options = [each for each in OPTIONS if each != SLICED or "--trace" not in more]  # all in a trace
+        return self._workshop.check(program, *options, *more, "--function", f"{world}_same", seconds=self._limit)
 
     def _said(self, name, world, last=254):
         """(the program, what the checker says of it)"""
@@ -653,7 +655,7 @@ class Pair:
         given = [each for _, each in pointers.declared_parameters(self._operations[name])]
         lines = [f"{'nobody else acts' if world == 'NOBODY' else 'others change what is kept'}; "
                  + ", ".join(f"{each} = {values[each]}" for each in given if each in values)]
-        words = [different[each].removeprefix(SAME) for each in at_a_call]
+        words = [different[each].removeprefix(AT_A_CALL).removeprefix(SAME) for each in at_a_call]
         if not different[at_a_call[0]].startswith(AT_A_CALL):
             return [*lines, "at the end: " + "; ".join(self._named(each, values) for each in words)], 0
         number = values.get("watched", 0)
@@ -668,12 +670,13 @@ class Pair:
             values.get("which", len(self._leaves)) < len(self._leaves) else words
 
     def _values(self, words, values):
-        """Both values of a number, or both texts."""
-        at = re.search(r"argument (\d+)$", words)
+        """Both values of a number, or of a byte; an address tells nobody anything."""
+        at = re.fullmatch(r"(bytes of )?argument (\d+)", words)
         if not at:
             return []
-        both = [values.get(f"noted[{side}].value[{int(at[1]) - 1}]", 0) for side in (0, 1)]
-        return [f"{both[0]} then, {both[1]} now"] if max(both) < 1 << 22 else []
+        part = "behind" if at[1] else "value"
+        both = [values.get(f"noted[{side}].{part}[{int(at[2]) - 1}]", 0) for side in (0, 1)]
+        return [f"{both[0]} then, {both[1]} now"] if max(both) < 1 << 20 else []
 
     def decide(self, name):
         """What becomes of an operation."""

@@ -76,10 +76,13 @@ TEST_F(Boot, GetHDMIDefaultRes_LongPartition_OnlyTheFirstWordIsRead)
 
 TEST_F(Boot, GetHDMIDefaultRes_PartitionIdIsHandedOnAsFound)
 {
-    board::faults::set({ "get_part_id_by_name", 7 });
-    board::faults::set({ "i4NFBPartitionRead", 4 });
-    EXPECT_EQ(RES_480I, PMX_GetHDMIDefaultRes());
-    EXPECT_TRACE(sequences::failed_boot_read("7"));
+    for (const int id : { 7, 0x12345 })
+    {
+        board::faults::set({ "get_part_id_by_name", id });
+        board::faults::set({ "i4NFBPartitionRead", 4 });
+        EXPECT_EQ(RES_480I, PMX_GetHDMIDefaultRes());
+        EXPECT_TRACE(sequences::failed_boot_read(std::to_string(id).c_str()));
+    }
 }
 
 TEST_F(TvType, SetTvType_StoresAndForwards)

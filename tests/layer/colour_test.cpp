@@ -148,6 +148,19 @@ TEST_F(Colour, ColorSpaceSetup_Rgb_ReportedAndConvertersKeepTheirs)
     expect_asserts(2);
 }
 
+TEST_F(Colour, ColorSpaceSetup_LowBitsOfAKnownColourSpace_IsReportedAsGiven)
+{
+    colour_setup(0x10001, RES_576P);
+    EXPECT_TRACE(R"(
+        LOG9 "Mode(3), eMixerOutCS(65537)\n"
+        PMX_HalSelectVdoutCconv(0, 1)
+        PMX_HalSelectScalerCconv(0, 0)
+        LOG5 "Invalid Color Space Id\n"
+        Assert("0", "src/driver/pmx/pmx_colour.cpp")
+    )");
+    expect_asserts(1);
+}
+
 TEST_F(Colour, ColorSpaceSetup_SelectorsAreProgrammedAnewEachTime)
 {
     PMX_HalSelectVdoutCconv(0, 0);

@@ -134,7 +134,7 @@ TEST_F(Lifecycle, Init_InitiatedByAnyOtherNumber_OnlyLogs)
 
 TEST_F(Lifecycle, Init_MutexCannotBeCreated_AssertsAndGoesOn)
 {
-    for (const std::int64_t answer : { -1, 1, 0x7FFFFFFF })
+    for (const std::int64_t answer : { -1, 1, 0x10000, 0x7FFFFFFF })
     {
         SCOPED_TRACE(answer);
         power_on();

@@ -39,9 +39,12 @@ TEST_F(Registration, RegisterIM_Fails_LoggedWithTheComponentIdAndReturned)
 
 TEST_F(Registration, RegisterIM_PositiveResult_IsNoFailure)
 {
-    board::faults::set({ "i4ImRegisterInterface2", 5 });
-    EXPECT_EQ(5, i4PmxRegisterIM(66, 0));
-    EXPECT_TRACE("i4ImRegisterInterface2(66, 0, 9, _rPMXIF, 0) = 5");
+    for (const int answer : { 5, 0x18000 })
+    {
+        board::faults::set({ "i4ImRegisterInterface2", answer });
+        EXPECT_EQ(answer, i4PmxRegisterIM(66, 0));
+        EXPECT_TRACE("i4ImRegisterInterface2(66, 0, 9, _rPMXIF, 0) = " + std::to_string(answer));
+    }
 }
 
 TEST_F(Registration, RegisterIM_Twice_TheSecondFails)
@@ -76,18 +79,21 @@ TEST_F(Registration, UnregisterIM_Fails_TheTextSaysRegisterToo)
         LOG9 "Fail to register IID_IPMX of PMX Comp 0\n"
     )");
     board::faults::set({ "i4ImUnregisterInterface2", -9 });
-    EXPECT_EQ(-9, i4PmxUnregisterIM(12, 34));
+    EXPECT_EQ(-9, i4PmxUnregisterIM(12, 0x8022));
     EXPECT_TRACE(R"(
-        i4ImUnregisterInterface2(12, 34, 9) = -9
-        LOG9 "Fail to register IID_IPMX of PMX Comp 34\n"
+        i4ImUnregisterInterface2(12, 32802, 9) = -9
+        LOG9 "Fail to register IID_IPMX of PMX Comp 32802\n"
     )");
 }
 
 TEST_F(Registration, UnregisterIM_PositiveResult_IsNoFailure)
 {
-    board::faults::set({ "i4ImUnregisterInterface2", 5 });
-    EXPECT_EQ(5, i4PmxUnregisterIM(66, 0));
-    EXPECT_TRACE("i4ImUnregisterInterface2(66, 0, 9) = 5");
+    for (const int answer : { 5, 0x18000 })
+    {
+        board::faults::set({ "i4ImUnregisterInterface2", answer });
+        EXPECT_EQ(answer, i4PmxUnregisterIM(66, 0));
+        EXPECT_TRACE("i4ImUnregisterInterface2(66, 0, 9) = " + std::to_string(answer));
+    }
 }
 
 TEST_F(Power, Suspend_GatesTheClocksZeroAndTwo)

@@ -227,6 +227,8 @@ TEST_F(SourceOsd, OsdEnabled_NamedSizes)
     EXPECT_EQ(DRV_PMX_CS_YCBCR_709, master_of(721, 480));
     EXPECT_EQ(DRV_PMX_CS_YCBCR_601, master_of(720, 576));
     EXPECT_EQ(DRV_PMX_CS_YCBCR_709, master_of(720, 577));
+    EXPECT_EQ(DRV_PMX_CS_YCBCR_709, master_of(0x10000, 480)); // all 32 bits count
+    EXPECT_EQ(DRV_PMX_CS_YCBCR_709, master_of(720, 0x10000));
     EXPECT_EQ(DRV_PMX_CS_YCBCR_601, master_of(-1920, -1080));
 }
 

@@ -258,6 +258,8 @@ TEST_F(SourceVdp, VdpEnabled_NamedSizes)
     EXPECT_EQ(DRV_PMX_CS_YCBCR_709, source(721, 480));
     EXPECT_EQ(DRV_PMX_CS_YCBCR_601, source(720, 576));
     EXPECT_EQ(DRV_PMX_CS_YCBCR_709, source(720, 577));
+    EXPECT_EQ(DRV_PMX_CS_YCBCR_709, source(0x10000, 480)); // all 32 bits count
+    EXPECT_EQ(DRV_PMX_CS_YCBCR_709, source(720, 0x10000));
     EXPECT_EQ(DRV_PMX_CS_YCBCR_601, source(0, 0));
     EXPECT_EQ(DRV_PMX_CS_YCBCR_601, source(-1920, -1080));
 }

@@ -263,3 +263,11 @@ TEST_F(Reset, Reset_VideoPlanesSwapped_TheSecondPlaneStaysInTheMix)
                  "PMX_HalPlaneOrder(...)\nPMX_HalInitPlaneOrder(0)\nfgPmxHalSwapPlane1_2(0) = TRUE\n"
                  "VDP_GlobalOutputChange()\nVDP_SetTvFormat(...)");
 }
+
+TEST_F(Reset, Reset_ModeChangedWhileItIsPrinted_TheTvTypeIsThatOfTheNewOne)
+{
+    at_call("UTIL_Printf", [] { set_record("ucMode", RES_576I); });
+    PMX_Reset(0);
+    EXPECT_EQ(RES_576I, record("ucMode"));
+    EXPECT_EQ(PMX_TV_TYPE_PAL, record("ucTvType"));
+}

@@ -375,7 +375,7 @@ class Graphics(PictureTest):
         wrong = os.environ | {"PMXBOARD_GRAPHICS": "\x1bpaint"}
 
         def ended(*arguments, lines=SCENE, code=0):
-            ran = subprocess.run([PROGRAM, *arguments], input="\n".join((*lines, "")), capture_output=True, text=True,
+            ran = subprocess.run([CHECKED, *arguments], input="\n".join((*lines, "")), capture_output=True, text=True,
                                  check=False, env=wrong)
             self.assertEqual(code, ran.returncode, ran.stderr)
             return ran.stdout + ran.stderr

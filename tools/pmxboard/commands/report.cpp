@@ -85,8 +85,8 @@ int tell(Storyboard& storyboard, const Planned& run)
     std::istringstream told(apart.shown);
     for (std::string event; std::getline(told, event) && !told.eof();) // one without an end was not told
         storyboard.hear(board::Json::parse(event));
-    if (storyboard.is_in_run() == apart.death.empty()) // it has ended and tells no end, or not even its beginning
-        throw std::runtime_error("no memory for what " + presentable(run.file) + " tells");
+    if (storyboard.is_in_run() == apart.death.empty()) // it broke down before its beginning or behind its end
+        throw std::runtime_error(presentable(run.file) + " cannot be told: " + apart.death);
     if (apart.death.empty())
         return std::stoi(apart.answer);
     std::cerr << storyboard.broke_down(apart.death) << '\n';

@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "tools/pmxboard/language/apart.h"
 
-#include <sys/mman.h>
+#include <fcntl.h>
+#include <poll.h>
 #include <sys/prctl.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -10,6 +11,7 @@
 #include <csignal>
 #include <cstdio>
 #include <cstring>
+#include <iterator>
 #include <ostream>
 #include <stdexcept>
 #include <streambuf>
@@ -21,24 +23,33 @@ namespace pmxboard
 namespace
 {
 
-/** A file in memory that parent and copy both have. Nothing waits for anybody, however much is written. */
-class MemoryFile
+/** From the copy to its parent, who reads while the copy runs: however much is written, it is kept in no file. */
+class Channel
 {
 public:
-    MemoryFile() : m_file(memfd_create("pmxboard", MFD_CLOEXEC))
+    Channel()
     {
-        if (m_file < 0)
-            throw std::runtime_error(std::string("no memory for a copy of the process: ") + std::strerror(errno));
+        if (pipe2(m_ends, O_CLOEXEC) != 0)
+            throw std::runtime_error(std::string("no channel to a copy of the process: ") + std::strerror(errno));
     }
-    ~MemoryFile() { close(m_file); }
-    MemoryFile(const MemoryFile&) = delete;
-    MemoryFile& operator=(const MemoryFile&) = delete;
+    ~Channel()
+    {
+        end_reading();
+        end_writing();
+    }
+    Channel(const Channel&) = delete;
+    Channel& operator=(const Channel&) = delete;
+
+    void end_reading() { end(m_ends[0]); }
+    void end_writing() { end(m_ends[1]); }
 
     void write(const char* text, std::size_t size) const
     {
         while (size > 0)
         {
-            const ssize_t written = ::write(m_file, text, size);
+            const ssize_t written = ::write(m_ends[1], text, size);
+            if (written < 0 && errno == EINTR)
+                continue;
             if (written <= 0)
                 return;
             text += written;
@@ -46,25 +57,38 @@ public:
         }
     }
 
-    std::string content() const
+    /** What poll waits for; nothing when it has ended. */
+    pollfd to_be_read() const { return { m_ends[0], POLLIN, 0 }; }
+
+    /** What there is; the channel ends when there will be no more. */
+    void read_into(std::string& text)
     {
-        std::string text;
-        char part[4096];
-        ssize_t size = 0;
-        while ((size = pread(m_file, part, sizeof part, static_cast<off_t>(text.size()))) > 0)
+        char part[65536];
+        const ssize_t size = ::read(m_ends[0], part, sizeof part);
+        if (size > 0)
             text.append(part, static_cast<std::size_t>(size));
-        return text;
+        else if (size == 0 || errno != EINTR)
+            end_reading();
     }
 
+    bool has_ended() const { return m_ends[0] < 0; }
+
 private:
-    int m_file;
+    static void end(int& file)
+    {
+        if (file >= 0)
+            close(file);
+        file = -1;
+    }
+
+    int m_ends[2] = { -1, -1 };
 };
 
 /** Writes through at once, so that nothing is lost when the process dies. */
-class MemoryStream : public std::streambuf
+class ChannelStream : public std::streambuf
 {
 public:
-    explicit MemoryStream(const MemoryFile& file) : m_file(file) {}
+    explicit ChannelStream(const Channel& channel) : m_channel(channel) {}
 
 protected:
     int_type overflow(int_type c) override
@@ -72,31 +96,48 @@ protected:
         if (!traits_type::eq_int_type(c, traits_type::eof()))
         {
             const char one = traits_type::to_char_type(c);
-            m_file.write(&one, 1);
+            m_channel.write(&one, 1);
         }
         return traits_type::not_eof(c);
     }
     std::streamsize xsputn(const char* text, std::streamsize size) override
     {
-        m_file.write(text, static_cast<std::size_t>(size));
+        m_channel.write(text, static_cast<std::size_t>(size));
         return size;
     }
 
 private:
-    const MemoryFile& m_file;
+    const Channel& m_channel;
 };
 
-[[noreturn]] void be_the_copy(const std::function<std::string(std::ostream&)>& function, const MemoryFile& shown,
-                              const MemoryFile& answer)
+[[noreturn]] void be_the_copy(const std::function<std::string(std::ostream&)>& function, Channel& shown,
+                              Channel& answer)
 {
     end_as_it_comes();
     prctl(PR_SET_PDEATHSIG, SIGKILL); // nobody would hear what it finds
-    MemoryStream buffer(shown);
+    shown.end_reading();
+    answer.end_reading();
+    ChannelStream buffer(shown);
     std::ostream stream(&buffer);
     const std::string text = function(stream);
     answer.write(text.data(), text.size());
     // Without the parent's clean-up: its files, its screen and its board are none of the copy's business.
     _exit(0);
+}
+
+/** Until both have ended, as they do when the copy does. */
+void listen(Channel& shown, std::string& text, Channel& answer, std::string& answered)
+{
+    while (!shown.has_ended() || !answer.has_ended())
+    {
+        pollfd both[] = { shown.to_be_read(), answer.to_be_read() };
+        if (poll(both, std::size(both), -1) < 0)
+            continue; // a signal
+        if (both[0].revents != 0)
+            shown.read_into(text);
+        if (both[1].revents != 0)
+            answer.read_into(answered);
+    }
 }
 
 std::string death_of(int status)
@@ -110,21 +151,26 @@ std::string death_of(int status)
 
 Apart run_apart(const std::function<std::string(std::ostream& shown)>& function)
 {
-    const MemoryFile shown;
-    const MemoryFile answer;
+    Channel shown;
+    Channel answer;
     std::fflush(nullptr); // or what waits in the buffers could be written by both
     const pid_t copy = fork();
     if (copy < 0)
         throw std::runtime_error(std::string("no copy of the process: ") + std::strerror(errno));
     if (copy == 0)
         be_the_copy(function, shown, answer);
+    shown.end_writing();
+    answer.end_writing();
+    Apart apart;
+    listen(shown, apart.shown, answer, apart.answer);
     int status = 0;
     while (waitpid(copy, &status, 0) < 0)
     {
         if (errno != EINTR)
             throw std::runtime_error(std::string("lost the copy of the process: ") + std::strerror(errno));
     }
-    return { shown.content(), answer.content(), death_of(status) };
+    apart.death = death_of(status);
+    return apart;
 }
 
 } // namespace pmxboard

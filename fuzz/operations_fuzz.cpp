@@ -7,7 +7,7 @@
 
 #include "board/board.h"
 #include "fuzz/support/holds.h"
-#include "tests/soak/drawn_steps.h"
+#include "tools/soak/drawn_steps.h"
 
 namespace
 {

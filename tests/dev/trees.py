@@ -95,8 +95,9 @@ class TreeTest(unittest.TestCase):
         (tree / "CMakePresets.json").write_text("{}\n", encoding="utf-8")
         for name in KERNEL_PROGRAMS:
             self.make_program(tree / f"tests/kernel/{name}.py", name.replace("run", "kernel"))
-        for name in ("prove", "mutate", "soak"):
-            self.make_program(tree / f"tests/{name}/{name}.py", name)
+        for name in ("tests/prove", "tests/mutate", "tools/soak"):
+            program = name.split("/")[1]
+            self.make_program(tree / f"{name}/{program}.py", program)
         return tree
 
     @staticmethod

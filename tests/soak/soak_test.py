@@ -13,7 +13,7 @@ import tempfile
 import unittest
 
 sys.dont_write_bytecode = True
-SOAK = pathlib.Path(__file__).with_name("soak.py")
+SOAK = pathlib.Path(__file__).resolve().parents[2] / "tools/soak/soak.py"
 PROGRAM, *EMULATED = sys.argv[1:]
 
 

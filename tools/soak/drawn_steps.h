@@ -7,8 +7,8 @@
 #include <optional>
 #include <string>
 
-#include "tests/soak/choices.h"
 #include "tools/pmxboard/functions/operation.h"
+#include "tools/soak/choices.h"
 
 namespace soak
 {

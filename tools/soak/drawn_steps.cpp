@@ -1,13 +1,13 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
-#include "tests/soak/drawn_steps.h"
+#include "tools/soak/drawn_steps.h"
 
 #include <span>
 #include <stdexcept>
 
 #include "board/board.h"
 #include "board/video_planes.h"
-#include "tests/soak/drawn_values.h"
 #include "tools/record_view/record_view.h"
+#include "tools/soak/drawn_values.h"
 
 namespace soak
 {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
-#include "tests/soak/drawn_values.h"
+#include "tools/soak/drawn_values.h"
 
 #include <map>
 

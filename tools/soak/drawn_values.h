@@ -3,8 +3,8 @@
  *  Arguments that are drawn: any value can come, and those that have names, or stand at an edge, come often. */
 #pragma once
 
-#include "tests/soak/choices.h"
 #include "tools/pmxboard/functions/operation.h"
+#include "tools/soak/choices.h"
 
 namespace soak
 {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
-#include "tests/soak/witness.h"
+#include "tools/soak/witness.h"
 
 #include "tests/lockstep/random.h"
 

@@ -14,9 +14,9 @@
 #include "board/board.h"
 #include "board/console.h"
 #include "tests/lockstep/random.h"
-#include "tests/soak/drawn_steps.h"
-#include "tests/soak/witness.h"
 #include "tools/record_view/record_view.h"
+#include "tools/soak/drawn_steps.h"
+#include "tools/soak/witness.h"
 
 namespace
 {

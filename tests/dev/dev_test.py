@@ -382,7 +382,7 @@ class Usage(TreeTest):
         self.dev("test")
         built = [line.split()[2] for line in self.calls("cmake --preset")]
         self.assertEqual(["debug", "release", "arm-bare", "arm-linux"], built)
-        self.assertEqual(["CMakeLists.txt", "CMakePresets.json", "build", "dev", "packages.txt", "tests"],
+        self.assertEqual(["CMakeLists.txt", "CMakePresets.json", "build", "dev", "packages.txt", "tests", "tools"],
                          sorted(set(os.listdir(self.tree)) - {".cache"}))
         self.assertEqual(["stubs", "tree"], sorted(os.listdir(self.space)))
 

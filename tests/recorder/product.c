@@ -127,7 +127,7 @@ static void vPrintOdd(void)
 {
     const char* volatile szNone = 0; /* or the compiler knows better */
     const char* volatile szStrange = "%.+{d";
-    PMX_Printf(0, "%hd %zu %X", 3, (size_t)4, 0xABC);
+    PMX_Printf(0, "%hd %zu %X", (short)3, (size_t)4, 0xABC);
     PMX_Printf(0, "%.3ld %.9999s %s", 2L, "precise", szNone);
     PMX_Printf(0, "%.511s", szMany('p', 600));
     PMX_Printf(0, "%d%d%d%d%d%d%d%d%d%d%d%d%d%d%d%d", 1, 2, 3, 4, 5, 6, 7, 8, 9, 1, 2, 3, 4, 5, 6, 7);

@@ -371,6 +371,23 @@ void Bench::put(const State& state)
         throw std::logic_error(full_name(state) + " cannot be made");
 }
 
+namespace
+{
+
+/** A transition, and the state that it leads to where none has led there before. */
+void add(Graph& graph, const Transition& transition)
+{
+    graph.transitions.push_back(transition);
+    if (graph.paths.contains(transition.to))
+        return;
+    std::vector<Event> path = graph.paths.at(transition.from);
+    path.push_back(transition.event);
+    graph.paths[transition.to] = std::move(path);
+    graph.states.push_back(transition.to);
+}
+
+} // namespace
+
 Graph explore(std::span<const Event> events)
 {
     Bench bench;
@@ -389,14 +406,8 @@ Graph explore(std::span<const Event> events)
             if (!bench.possible(event))
                 continue;
             const bool other_planes = bench.run(event);
-            const State to = now = bench.state();
-            graph.transitions.push_back({ from, event, to, other_planes });
-            if (graph.paths.contains(to))
-                continue;
-            std::vector<Event> path = graph.paths.at(from);
-            path.push_back(event);
-            graph.paths[to] = std::move(path);
-            graph.states.push_back(to);
+            now = bench.state();
+            add(graph, { from, event, now, other_planes });
         }
     }
     return graph;
@@ -417,16 +428,8 @@ Graph part_of(const Graph& whole, std::span<const Event> events)
         for (const Event event : events)
         {
             const auto way = leading.find(event);
-            if (way == leading.end())
-                continue;
-            const State& to = way->second->to;
-            graph.transitions.push_back(*way->second);
-            if (graph.paths.contains(to))
-                continue;
-            std::vector<Event> path = graph.paths.at(from);
-            path.push_back(event);
-            graph.paths[to] = std::move(path);
-            graph.states.push_back(to);
+            if (way != leading.end())
+                add(graph, *way->second);
         }
     }
     return graph;

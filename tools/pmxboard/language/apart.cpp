@@ -110,11 +110,14 @@ private:
     const Channel& m_channel;
 };
 
-[[noreturn]] void be_the_copy(const std::function<std::string(std::ostream&)>& function, Channel& shown,
-                              Channel& answer)
+/** What it throws ends the copy: what is on the stack is the parent's. */
+[[noreturn]] void be_the_copy(const std::function<std::string(std::ostream&)>& function, pid_t parent, Channel& shown,
+                              Channel& answer) noexcept
 {
     end_as_it_comes();
     prctl(PR_SET_PDEATHSIG, SIGKILL); // nobody would hear what it finds
+    if (getppid() != parent)
+        _exit(1); // it had died before
     shown.end_reading();
     answer.end_reading();
     ChannelStream buffer(shown);
@@ -132,7 +135,11 @@ void listen(Channel& shown, std::string& text, Channel& answer, std::string& ans
     {
         pollfd both[] = { shown.to_be_read(), answer.to_be_read() };
         if (poll(both, std::size(both), -1) < 0)
-            continue; // a signal
+        {
+            if (errno != EINTR)
+                throw std::runtime_error(std::string("lost the copy of the process: ") + std::strerror(errno));
+            continue;
+        }
         if (both[0].revents != 0)
             shown.read_into(text);
         if (both[1].revents != 0)
@@ -154,11 +161,12 @@ Apart run_apart(const std::function<std::string(std::ostream& shown)>& function)
     Channel shown;
     Channel answer;
     std::fflush(nullptr); // or what waits in the buffers could be written by both
+    const pid_t parent = getpid();
     const pid_t copy = fork();
     if (copy < 0)
         throw std::runtime_error(std::string("no copy of the process: ") + std::strerror(errno));
     if (copy == 0)
-        be_the_copy(function, shown, answer);
+        be_the_copy(function, parent, shown, answer);
     shown.end_writing();
     answer.end_writing();
     Apart apart;

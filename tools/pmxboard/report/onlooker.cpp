@@ -11,6 +11,7 @@
 #include "tools/pmxboard/state/now.h"
 #include "tools/pmxboard/state/status.h"
 #include "tools/pmxboard/text/printable.h"
+#include "tools/record_view/record_view.h"
 
 namespace pmxboard
 {
@@ -110,7 +111,11 @@ std::string end_of_wait(const board::TraceEntry& entry)
     if (entry.kind != board::TraceEntry::Kind::Notice)
         return {};
     if (entry.function == "expiry" && entry.text.ends_with("_PMX_TmrIsr"))
-        return "the display timer ran out; the display part had not answered";
+    {
+        static const record_view::Field is_changing("status.fgPmxFormatChangeFlag");
+        return std::string("the display timer ran out") +
+               (is_changing.number() != 0 ? "; the display part had not answered" : "");
+    }
     if (entry.function == "display_part" || entry.function == "video_plane")
         return std::string("the ") + (entry.function == "display_part" ? "display part " : "video plane ") +
                printable(entry.text);
@@ -367,12 +372,16 @@ Json Onlooker::told_picture(std::size_t png)
 /** What the state means; null where that is as before. */
 Json Onlooker::told_status(const std::string& text)
 {
-    if (text == std::exchange(m_status, text))
+    if (text == m_status)
         return nullptr;
-    if (take(m_room.texts, size_on_page(text)))
-        return text;
-    ++m_left_out.texts;
-    return "";
+    m_status.clear(); // where there is no room for it, it is not known on the next step either
+    if (!take(m_room.texts, size_on_page(text)))
+    {
+        ++m_left_out.texts;
+        return "";
+    }
+    m_status = text;
+    return text;
 }
 
 void Onlooker::end_scenario(const std::string& unreadable)

@@ -171,8 +171,11 @@ function story(runShown, side) {
   for (const { text, step } of runShown.failures)
     lines.push(step === null ? make("li", { class: "bad failed" }, `Failed: ${text}`)
       : make("li", { class: "bad failed" }, linkTo(step, side), ` failed: ${text}`));
-  if (lines.length === 0) lines.push(make("li", {}, "Nothing was refused, and graphics never waited."));
-  return [...lines, ...missingOf(runShown), summaryOf(runShown)];
+  const missing = missingOf(runShown);
+  if (lines.length === 0)
+    lines.push(make("li", {}, `Nothing was refused, and graphics never waited${
+      missing.length > 0 ? ", as far as this page tells" : ""}.`));
+  return [...lines, ...missing, summaryOf(runShown)];
 }
 
 /** What a run has that the page does not. */
@@ -270,7 +273,7 @@ function laneBar(axis, side, lane, span) {
   const runShown = sides()[side];
   const lasted = `${spoken(span.to.us - span.from.us)}, from ${spoken(span.from.us)} to ${spoken(span.to.us)}`;
   const goesOn = runShown.lanes_end_us !== null; // behind the last bar
-  const end = !span.open ? `step ${span.to.step + 1}` : goesOn ? "where the bars end" : "the end of the run";
+  const end = span.open ? endOf(runShown) : `step ${span.to.step + 1}`;
   const label = `${lane.name}: ${span.text} for ${lasted}, step ${span.from.step + 1} to ${end}`;
   const to = span.open && !goesOn ? axis.end : axis.at(span.to);
   return bar(axis.at(span.from), to, kindOf(lane), span.text, label, () => {

@@ -10,8 +10,9 @@
 namespace pmxboard
 {
 
-/** A page of more would open slowly, or not at all: together they stay below 2 MB. Whatever goes onto a page takes its
- *  room from one of them, in bytes as the page has it; what finds none is counted, and the page says so. */
+/** A page of more would open slowly, or not at all: together they stay below 2 MB for each of its runs. Whatever goes
+ *  onto a page takes its room from one of them, in bytes as the page has it; what finds none is counted, and the page
+ *  says so. */
 struct PageLimits
 {
     std::size_t steps = 500;

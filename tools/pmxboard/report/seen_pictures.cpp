@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <cmath>
 #include <functional>
+#include <iterator>
 
 #include "board/picture/pixels.h"
 #include "board/picture/shot.h"
@@ -63,10 +64,12 @@ std::vector<SeenOutput> SeenPictures::look()
 {
     constexpr std::size_t most_known = 16; // a run goes to and fro between few of them
     const auto now = std::make_shared<const picture::Hardware>(picture::hardware_now());
-    for (const Looked& looked : m_looked)
+    const auto known =
+        std::find_if(m_looked.begin(), m_looked.end(), [&](const Looked& looked) { return *looked.hardware == *now; });
+    if (known != m_looked.end())
     {
-        if (*looked.hardware == *now)
-            return looked.seen;
+        std::rotate(m_looked.begin(), known, std::next(known));
+        return m_looked.front().seen;
     }
     ++m_looks;
     std::vector<SeenOutput> seen;

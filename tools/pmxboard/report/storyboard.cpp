@@ -143,7 +143,7 @@ void Storyboard::hear_entry(const Json& event)
 {
     Json entry = event;
     entry.erase("is");
-    m_now.us = entry.at("time_us");
+    m_now.us = std::max<std::int64_t>(m_now.us, entry.at("time_us")); // a call is told behind what ran within it
     m_now.sequence = std::max<std::uint64_t>(m_now.sequence, entry.at("sequence"));
     step().at("entries").push_back(std::move(entry));
 }

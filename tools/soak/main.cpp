@@ -68,7 +68,7 @@ public:
                 continue;
             if (done % between_records == 0)
                 m_witness.see(record_view::state());
-            if (++done % between == 0)
+            if (++done % between == 0 || done == count)
                 tell(done);
         }
     }

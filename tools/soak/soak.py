@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 """Lets the mixer live long, on this machine and on the target, by the same random operations: both see the same calls,
-results and records, nobody misuses the platform who need not, and memory stays level.
+results and records, nobody misuses the platform who need not, and memory stays level here.
 
 usage: soak.py HOST TARGET [NUMBER [SEED]]
 
@@ -33,7 +33,10 @@ def positive(text):
 def reports(name, process):
     """What a program tells on its way; its diagnostics are shown as they come."""
     for line in process.stdout:
-        yield json.loads(line)
+        try:
+            yield json.loads(line)
+        except json.JSONDecodeError:
+            raise Failed(f"{name} tells what is no report: {line.strip()}") from None
     if process.wait() not in (0, MISUSED):
         raise Failed(f"{name} broke down: it ended with {process.returncode}")
 

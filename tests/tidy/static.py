@@ -85,7 +85,13 @@ def cppcheck(sources, folder, suffix, is_all):
     unmatched = [] if is_all and suffix == ".cpp" else ["--suppress=unmatchedSuppression"]
     result = subprocess.run(["cppcheck", *CHECKED, *WAYS[suffix], *unmatched, *includes, *wanted], cwd=folder,
                             capture_output=True, text=True, check=False)
-    return result.stdout + result.stderr
+    return told(result)
+
+
+def told(result):
+    """What a program found; that it broke down, where it says nothing else."""
+    text = result.stdout + result.stderr
+    return text or (f"{result.args[0]} ended with {result.returncode}\n" if result.returncode else "")
 
 
 def analyzed(command):
@@ -95,7 +101,7 @@ def analyzed(command):
     compiler = next(place for place, word in enumerate(words) if re.fullmatch(r"(.*/)?(cc|gcc)(-\d+)?", word))
     result = subprocess.run([*words[compiler:], "-fanalyzer"], cwd=command["directory"], capture_output=True, text=True,
                             check=False)
-    return result.stderr
+    return told(result)
 
 
 def c_commands(commands, sources, root, is_all):

@@ -341,18 +341,23 @@ def names_of(program):
             for words in (line.split(" ", 2) for line in listed.splitlines()) if words[0] and words[1] in "tTwW"}
 
 
+def pass_all(settings, tests, program, told, **environment):
+    """Runs the cases of a program that was linked from the originals: a case that fails here would see every mutant."""
+    if program is None:
+        raise Failed(told[-3000:])
+    answer, printed = tests.run(program, [f"-{settings.without}"], 600, **environment)
+    if answer != 0:
+        raise Failed(f"the tests fail without any mutant ({program.name}: {answer}):\n{printed[-2000:]}")
+
+
 def note_cases(settings, bench, tests, name):
     """Of each case of a program: its name, how many seconds of the processor it takes, whoever else uses the machine,
     and which functions of the layer it runs."""
     layer = {source: bench.folder / f"{source.stem}.runs.o" for source in settings.sources}
     program, told = bench.link(name, layer, settings.runs)
-    if program is None:
-        raise Failed(told[-3000:])
     noted = bench.folder / f"{name}.runs"
     noted.unlink(missing_ok=True)
-    (answer, printed), seconds = spent(lambda: tests.run(program, [f"-{settings.without}"], 600, PMX_RUNS=str(noted)))
-    if answer != 0:
-        raise Failed(f"the tests fail without any mutant ({answer}):\n{printed[-2000:]}")
+    _, seconds = spent(lambda: pass_all(settings, tests, program, told, PMX_RUNS=str(noted)))
     lines = [line.split() for line in noted.read_text(encoding="utf-8").splitlines()] if noted.exists() else []
     if not lines:
         raise Failed(f"{name} has no tests")
@@ -378,6 +383,8 @@ def prepare(settings, folder, users):
             raise Failed(f"{check} fails without any mutant:\n{complaint[-2000:]}")
         told = {"key": key, "cases": [case for name in settings.programs
                                       for case in note_cases(settings, bench, tests, name)]}
+        for name in settings.programs:
+            pass_all(settings, tests, *bench.link(name + GUARDED, {}))
         unfinished = kept.with_suffix(".unfinished")
         unfinished.write_text(json.dumps(told), encoding="utf-8")
         unfinished.rename(kept)

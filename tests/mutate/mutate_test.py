@@ -338,10 +338,11 @@ class Planting(unittest.TestCase):
         self.assertEqual((1, "there is no mutant x"), self.mutate("--show", "x"))
 
     def test_tests_that_fail_anyway_see_nothing(self):
-        (self.layer / "count.cpp").write_text(LAYER.replace("iSum = 0", "iSum = 1"), encoding="utf-8")
-        answer, printed = self.mutate("fgOverlooked")
-        self.assertEqual(1, answer)
-        self.assertIn("the tests fail without any mutant", printed)
+        for change, program in ((("iSum = 0", "iSum = 1"), "tests"), (("i < 3", "i < 4"), "tests.guarded")):
+            (self.layer / "count.cpp").write_text(LAYER.replace(*change), encoding="utf-8")
+            answer, printed = self.mutate("fgOverlooked")
+            self.assertEqual(1, answer)
+            self.assertIn(f"the tests fail without any mutant ({program}: ", printed)
 
 
 class List(unittest.TestCase):

@@ -271,10 +271,14 @@ class Bench:
         return (program if ran.returncode == 0 else None), ran.stderr.decode(errors="replace")
 
     def _program(self, name, mutant, text, changed):
-        """The program with the mutant in it; none when it cannot be made."""
-        if name.endswith(GUARDED):
+        """The program with the mutant in it; none when it cannot be linked."""
+        guarded = name.endswith(GUARDED)
+        if guarded:
             changed = self.objects([*self._settings.compile, *self._settings.guards], mutant, text, ".guarded.o")
-        return self.link(name, changed)[0] if changed else None
+        program = self.link(name, changed)[0] if changed else None
+        if guarded and program is None:
+            raise Failed(f"{mutant.name} passes the tests, but cannot be made as {name}")
+        return program
 
     def shipped(self, mutant, text):
         """What would ship, by source; none when it is the same, byte by byte."""

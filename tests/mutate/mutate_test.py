@@ -285,6 +285,14 @@ class Planting(unittest.TestCase):
             self.assertRegex(self.mutate("iTwice:operator")[1], r"(?m)^1 mutants, 0 of them judged before;")
             self.assertRegex(self.mutate("iTwice:operator")[1], r"(?m)^1 mutants, 1 of them judged before;")
 
+    def test_one_that_passes_but_cannot_be_guarded_is_no_refused_one(self):
+        guarded = "constexpr int LIMIT = 3;\n#ifdef __SANITIZE_ADDRESS__\nstatic_assert(LIMIT == 3);\n#endif\n"
+        (self.layer / "count.cpp").write_text(
+            LAYER.replace("return iValue > 3", guarded + "return iValue > LIMIT"), encoding="utf-8")
+        answer, printed = self.mutate("fgOverlooked:constant")
+        self.assertEqual(1, answer)
+        self.assertIn("passes the tests, but cannot be made as tests.guarded", printed)
+
     def test_a_fault_that_leaves_an_object_is_seen_by_whoever_guards_it(self):
         self.mutate("iSumOfThree:operator")
         of = {result["by"] for result in self.results().values() if result["verdict"] == "killed"}

@@ -24,6 +24,8 @@ FIRST, QUICK, SLOWER = 0.01, 0.02, 0.2  # parts of the time of all: what runs fi
 WATCHED = 0.05  # what runs guarded: whoever runs the place at all shows what it may not do
 MOST_PRINTED = 50_000_000  # bytes
 MOST_MEMORY = 4_000_000_000
+CASES = ("tests/support", "tests/layer", "tests/core", "tests/tv_type")  # include of each other
+JUDGES = (pathlib.Path(__file__), pathlib.Path(__file__).with_name("runs.cpp"))
 GUARDED = ".guarded"  # a program whose layer stops where it leaves an object, or does what has no meaning
 
 
@@ -43,17 +45,22 @@ class Settings:
         self.sources = sorted(self.layer.glob("*.cpp"))
 
     def layer_key(self):
-        """What every verdict hangs on, but for the mutant: the layer, and how it is compiled."""
-        return digest_of([self.compile, self.product, self.guards],
-                         [*sorted(self.layer.glob("*.[ch]*")), *sorted(self.root.glob("src/*/*inc/*.h"))])
+        """What every verdict hangs on, but for the mutant: the layer, its compilers, their flags, and what judges."""
+        versions = [subprocess.run([command[0], "--version"], capture_output=True, check=True).stdout.decode()
+                    for command in (self.read, self.compile, self.product, self.link)]
+        return digest_of([self.compile, self.product, self.guards, versions],
+                         [*sorted(self.layer.glob("*.[ch]*")), *sorted(self.root.glob("src/*/*inc/*.h")), *JUDGES])
 
     def ground_key(self):
-        """What every case stands on: board and support as they are linked, and what they are linked with."""
-        return digest_of([self.link, self.options, self.behind], map(pathlib.Path, self.rest))
+        """What every case stands on: board and support as they are linked, with what, and their headers."""
+        headers = [path for folder in ("board", "tools/record_view")
+                   for path in sorted((self.root / folder).glob("*.h"))]
+        return digest_of([self.link, self.options, self.behind], [*map(pathlib.Path, self.rest), *headers])
 
     def tests_key(self):
         """All cases and checks, and what they stand on."""
         checks = [path for *_, check in self.checks for path in sorted(pathlib.Path(check).parent.glob("*.py"))]
+        checks += sorted((self.root / "cmake").glob("*.py"))  # who checks reads the platform's functions by them
         programs = [path for _, path in sorted(self.programs.items())]
         return digest_of([self.ground_key(), self.without], [*checks, *programs])
 
@@ -76,7 +83,10 @@ class Written:
     CASE = re.compile(r"^TEST(?:_[FP])?\(.*?^}$", re.M | re.S)
 
     def __init__(self, root, ground_key):
-        self._root, self._ground, self._files, self._lent = root, ground_key, {}, {}
+        self._root, self._files = root, {}
+        lent = [each for folder in CASES for each in sorted((root / folder).glob("*.[ch]*"))
+                if not self.CASE.search(each.read_text(encoding="utf-8"))]
+        self._lent = digest_of([ground_key], lent)
 
     def digest(self, file, line):
         path = self._root / file
@@ -86,15 +96,7 @@ class Written:
             self._files[path] = self.CASE.sub("", text).split(), cases
         around, cases = self._files[path]
         own = [case for first, case in cases if first <= line <= first + case.count("\n")]
-        return hashlib.sha256(json.dumps([self._lent_to(path), around, own]).encode()).hexdigest()[:24]
-
-    def _lent_to(self, path):
-        if path.parent not in self._lent:
-            folders = (self._root / "tests/support", path.parent)
-            lent = [each for folder in folders for each in sorted(folder.glob("*.[ch]*"))
-                    if not self.CASE.search(each.read_text(encoding="utf-8"))]
-            self._lent[path.parent] = digest_of([self._ground], lent)
-        return self._lent[path.parent]
+        return hashlib.sha256(json.dumps([self._lent, around, own]).encode()).hexdigest()[:24]
 
 
 class Cases:

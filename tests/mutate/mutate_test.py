@@ -11,6 +11,7 @@ import subprocess
 import sys
 import tempfile
 import unittest
+import unittest.mock
 
 sys.dont_write_bytecode = True
 
@@ -95,7 +96,7 @@ RUNS = """
 static struct Runs
 {
     FILE* pr = std::fopen(std::getenv("PMX_RUNS"), "w");
-    Runs() { std::fputs("Count.Counts 1 tests/count_test.cpp 3", pr); }
+    Runs() { std::fputs("Count.Counts 1 tests/layer/count_test.cpp 3", pr); }
     ~Runs() { std::fputs("\\n", pr); }
 } rRuns;
 extern "C" void __cyg_profile_func_enter(void* pv, void*) { std::fprintf(rRuns.pr, " %p", pv); }
@@ -193,8 +194,8 @@ class Planting(unittest.TestCase):
         self.made.mkdir()
         for name, text in (("count.cpp", LAYER), ("count.h", HEADER)):
             (self.layer / name).write_text(text, encoding="utf-8")
-        self.cases = self.folder / "tests/count_test.cpp"
-        self.cases.parent.mkdir()
+        self.cases = self.folder / "tests/layer/count_test.cpp"
+        self.cases.parent.mkdir(parents=True)
         self.cases.write_text(CASES, encoding="utf-8")
         self.build("rest", PROGRAM)
         self.build("runs", RUNS)
@@ -284,6 +285,29 @@ class Planting(unittest.TestCase):
             self.cases.write_text(text, encoding="utf-8")
             self.assertRegex(self.mutate("iTwice:operator")[1], r"(?m)^1 mutants, 0 of them judged before;")
             self.assertRegex(self.mutate("iTwice:operator")[1], r"(?m)^1 mutants, 1 of them judged before;")
+
+    def test_what_cases_include_and_checks_import_is_part_of_them(self):
+        self.mutate("iTwice:operator", "fgOverlooked:operator")
+        number = len(self.results())
+        for file, lost in (("tests/core/numbers.h", 1), ("board/board.h", number), ("cmake/functions.py", number - 1)):
+            path = self.folder / file
+            path.parent.mkdir(parents=True)
+            path.write_text("// more\n", encoding="utf-8")
+            _, printed = self.mutate("iTwice:operator", "fgOverlooked:operator")
+            self.assertRegex(printed, rf"(?m)^{number} mutants, {number - lost} of them judged before;")
+
+    def test_another_compiler_or_judge_judges_anew(self):
+        compiler, judge = self.folder / "compiler", self.folder / "judge.py"
+        settings = kill.Settings(self.made / "settings.json")
+        settings.compile = [str(compiler)]
+        keys = set()
+        for version, text in ((1, "a"), (2, "a"), (2, "b")):
+            compiler.write_text(f"#!/bin/sh\necho {version}\n", encoding="utf-8")
+            compiler.chmod(0o755)
+            judge.write_text(text, encoding="utf-8")
+            with unittest.mock.patch.object(kill, "JUDGES", (judge,)):
+                keys.add(settings.layer_key())
+        self.assertEqual(3, len(keys))
 
     def test_one_that_passes_but_cannot_be_guarded_is_no_refused_one(self):
         guarded = "constexpr int LIMIT = 3;\n#ifdef __SANITIZE_ADDRESS__\nstatic_assert(LIMIT == 3);\n#endif\n"

@@ -7,8 +7,10 @@ import dataclasses
 import os
 import pathlib
 import re
+import subprocess
 import sys
 import tempfile
+import types
 import unittest
 import unittest.mock
 
@@ -210,6 +212,24 @@ class Same(unittest.TestCase):
             swapped = text.replace(".pi4OsdDisabled = i4PmxOsdDisabled", ".pi4OsdDisabled = i4PmxVdpDisabled")
             path.write_text(swapped, encoding="utf-8")
             self.assertEqual(["_rPMXIF"], today.pair(tree, "swapped").different_tables())
+
+    def test_the_first_call_is_told_although_the_end_differs_too(self):
+        at_a_call, at_the_end = f"{same.AT_A_CALL}what is kept", f"{same.SAME}result"
+        late = subprocess.TimeoutExpired("cbmc", 1)
+
+        def first(told, *said):
+            pair = same.Pair.__new__(same.Pair)
+            with unittest.mock.patch.object(pair, "_told", create=True, side_effect=told), \
+                    unittest.mock.patch.object(pair, "_said", create=True, side_effect=said):
+                return pair._first("f", "NOBODY", "program", types.SimpleNamespace(
+                    different={"end.1": at_a_call, "end.2": at_the_end}))
+
+        end_alone = ("program", types.SimpleNamespace(different={"end.2": at_the_end}))
+        both = ("program", types.SimpleNamespace(different={"end.1": at_a_call, "end.2": at_the_end}))
+        self.assertEqual(["call 5"], first([(["call 5"], 4), (["at the end: result"], 0)], end_alone))
+        self.assertEqual(["call 3"], first([(["call 5"], 4), (["call 3"], 2)], both, end_alone))
+        self.assertEqual(["call 5"], first([(["call 5"], 4)], late))
+        self.assertEqual(["at a call, what is kept; result"], first([late]))
 
     def test_each_refactoring_can_be_planted_and_belongs_to_an_operation(self):
         names = {function.name for function in harness.operations(harness.ROOT)}

@@ -302,6 +302,8 @@ class Verdicts(unittest.TestCase):
             self.assertEqual(3, len(fetched))
 
     def test_what_judges_is_part_of_what_was_proved(self):
+        self.assertLessEqual({pathlib.Path(module.__file__).resolve() for module in
+                              (prove, verdicts, checker, harness)}, set(verdicts.JUDGES))
         with tempfile.TemporaryDirectory() as directory:
             judge = pathlib.Path(directory) / "judge.py"
             keys = set()

@@ -15,6 +15,7 @@ usage: prove.py CACHE MADE [--faults | --sample NUMBER | --same-as REVISION] [OP
 
 import argparse
 import concurrent.futures
+import contextlib
 import os
 import pathlib
 import shutil
@@ -39,6 +40,7 @@ HERE = pathlib.Path(__file__).resolve().parent
 ROOT = view.ROOT
 SKIPPED = 77
 KEPT = 4  # trees whose results are kept
+TRIES = 3  # to keep one in a folder that another tree may delete
 SAMPLE = 8  # faults that are planted in every run
 COMPARED = "PMX_SetFormatChangeFlag"  # its faults are told apart in every run: others take minutes each
 
@@ -97,26 +99,41 @@ class Program:
         return Verdict(ran.stdout, ends, (ran.stdout + ran.stderr)[-300:])
 
 
+def last_used(folder):
+    """When a folder was used; one that another tree has deleted meanwhile is the oldest."""
+    try:
+        return folder.stat().st_mtime
+    except FileNotFoundError:
+        return 0.0
+
+
 class Results:
     """What was proved before of the same text. Other trees keep theirs beside it; the oldest goes."""
 
     def __init__(self, folder, key):
         self._folder = folder / key
         self._folder.mkdir(parents=True, exist_ok=True)
-        self._folder.touch()
-        for other in sorted(folder.iterdir(), key=lambda each: each.stat().st_mtime)[:-KEPT]:
+        with contextlib.suppress(FileNotFoundError):
+            os.utime(self._folder)
+        for other in sorted(folder.iterdir(), key=last_used)[:-KEPT]:
             shutil.rmtree(other, ignore_errors=True)
 
     def get(self, operation):
-        kept = self._folder / operation
-        number = kept.read_text(encoding="utf-8").strip() if kept.exists() else ""
+        try:
+            number = (self._folder / operation).read_text(encoding="utf-8").strip()
+        except FileNotFoundError:
+            return None
         return int(number) if number.isdigit() else None  # a file that was cut short is none
 
     def keep(self, operation, number):
-        self._folder.mkdir(parents=True, exist_ok=True)  # another tree may have taken it for an old one
-        unfinished = self._folder / f"{operation}.unfinished"
-        unfinished.write_text(f"{number}\n", encoding="utf-8")
-        unfinished.rename(self._folder / operation)
+        """What another tree deletes again and again, for it is the oldest, is not kept, and is proved once more."""
+        for _ in range(TRIES):
+            with contextlib.suppress(FileNotFoundError):
+                self._folder.mkdir(parents=True, exist_ok=True)
+                unfinished = self._folder / f"{operation}.unfinished"
+                unfinished.write_text(f"{number}\n", encoding="utf-8")
+                unfinished.rename(self._folder / operation)
+                return
 
 
 def prove(program, results, operation):

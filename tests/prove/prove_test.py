@@ -7,6 +7,7 @@ import dataclasses
 import os
 import pathlib
 import re
+import shutil
 import subprocess
 import sys
 import tempfile
@@ -335,6 +336,26 @@ class Verdicts(unittest.TestCase):
             self.assertEqual([str(number + 1) for number in range(prove.KEPT)], sorted(os.listdir(folder)))
             first.keep("f", 7)
             self.assertEqual(7, first.get("f"))
+
+
+    def test_results_that_another_tree_deletes_meanwhile_are_no_error(self):
+        def write_text(path, text, **how):
+            deleted.append(path)
+            if len(deleted) == 1:
+                shutil.rmtree(path.parent)
+            return written(path, text, **how)
+
+        deleted, written = [], pathlib.Path.write_text
+        with tempfile.TemporaryDirectory() as directory:
+            folder = pathlib.Path(directory)
+            results = prove.Results(folder, "one")
+            with unittest.mock.patch.object(pathlib.Path, "write_text", write_text):
+                results.keep("f", 7)
+            self.assertEqual((7, 2), (results.get("f"), len(deleted)))
+            there = [folder / "gone", folder / "one"]
+            with unittest.mock.patch.object(pathlib.Path, "iterdir", lambda _: iter(there)):
+                prove.Results(folder, "one")
+            self.assertEqual(7, results.get("f"))
 
 
 class Faults(unittest.TestCase):

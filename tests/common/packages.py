@@ -129,14 +129,14 @@ def _held(folder):
     return lock
 
 
-def kept(folder, wanted, fetch):
+def kept(folder, wanted, fetch, is_whole=lambda folder: True):
     """What the folder has, fetched if it is not there whole, or was fetched for another place or another wish."""
     folder = pathlib.Path(folder).resolve()
     with _held(folder):
         usable = folder / USABLE
         if usable.exists():
             place, found, *wish = [*usable.read_text(encoding="utf-8").splitlines(), "", ""]  # cut short: not usable
-            if place == str(folder) and wish[:1] == [wanted]:
+            if place == str(folder) and wish[:1] == [wanted] and is_whole(folder):
                 return folder, found
             usable.unlink()
         found = fetch(folder)

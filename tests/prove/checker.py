@@ -10,7 +10,7 @@ import sys
 
 sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "common"))
 
-from packages import USABLE, Apt, Unavailable, emptied, kept, unpack  # noqa: E402, F401
+from packages import Apt, Unavailable, emptied, kept, unpack  # noqa: E402, F401
 
 # The checker, and what its programs are linked with; unpacked, never installed, so that packages.txt lacks them.
 PACKAGES = ("cbmc", "minisat", "libc6", "libstdc++6", "libgcc-s1", "zlib1g")
@@ -50,12 +50,9 @@ class Checker:
     """The unpacked programs."""
 
     def __init__(self, cache):
-        folder, self.version = kept(cache, " ".join(PACKAGES), _fetch)
-        if lacks(folder):  # somebody cleaned up
-            (folder / USABLE).unlink()
-            folder, self.version = kept(cache, " ".join(PACKAGES), _fetch)
+        # Where somebody cleaned up, one of those who wait for the folder fetches, and the others find it whole.
+        folder, self.version = kept(cache, " ".join(PACKAGES), _fetch, lambda place: not lacks(place))
         if lacks(folder):
-            (folder / USABLE).unlink()
             raise Unavailable(f"the checker that was fetched has no {' and no '.join(lacks(folder))}")
         hold_known(self.version)
         root = folder / "unpacked"

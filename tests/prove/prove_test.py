@@ -3,7 +3,9 @@
 """The layer as C is the layer; each fault can be planted; what the checker says is read; and the page about it tells
 what is presumed. The proof itself needs the checker, and is ./dev prove."""
 
+import contextlib
 import dataclasses
+import fcntl
 import os
 import pathlib
 import re
@@ -301,6 +303,31 @@ class Verdicts(unittest.TestCase):
                 with self.assertRaisesRegex(checker.Unavailable, "has no usr/bin/cbmc"):
                     checker.Checker(cache)
             self.assertEqual(3, len(fetched))
+            checker.Checker(cache)  # what was not whole is not taken for whole by the next
+            self.assertEqual(4, len(fetched))
+
+    def test_a_checker_that_another_tree_mends_is_left_to_it(self):
+        def fetch(folder):
+            for name in checker.PROGRAMS:
+                path = folder / "unpacked" / name
+                path.parent.mkdir(parents=True, exist_ok=True)
+                path.touch()
+            return "6.6.0-4"
+
+        def mended_while_it_is_looked_at(folder):
+            found = lacks(folder)
+            with open(folder / "lock", "w", encoding="utf-8") as lock:  # nobody else could mend it now
+                with self.assertRaises(BlockingIOError) if found else contextlib.nullcontext():
+                    fcntl.flock(lock, fcntl.LOCK_EX | fcntl.LOCK_NB)
+            return found
+
+        lacks = checker.lacks
+        with tempfile.TemporaryDirectory() as directory, unittest.mock.patch.object(checker, "_fetch", fetch):
+            cache = pathlib.Path(directory)
+            checker.Checker(cache)
+            (cache / "unpacked/usr/bin/cbmc").unlink()
+            with unittest.mock.patch.object(checker, "lacks", mended_while_it_is_looked_at):
+                checker.Checker(cache)
 
     def test_what_judges_is_part_of_what_was_proved(self):
         self.assertLessEqual({pathlib.Path(module.__file__).resolve() for module in

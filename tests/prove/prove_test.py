@@ -6,6 +6,7 @@ what is presumed. The proof itself needs the checker, and is ./dev prove."""
 import contextlib
 import dataclasses
 import fcntl
+import io
 import os
 import pathlib
 import re
@@ -233,6 +234,31 @@ class Same(unittest.TestCase):
         self.assertEqual(["call 3"], first([(["call 5"], 4), (["call 3"], 2)], both, end_alone))
         self.assertEqual(["call 5"], first([(["call 5"], 4)], late))
         self.assertEqual(["at a call, what is kept; result"], first([late]))
+
+    def test_what_is_gone_is_told(self):
+        with tempfile.TemporaryDirectory() as directory:
+            tree = pathlib.Path(directory)
+            shutil.copytree(view.ROOT / "src", tree / "src")
+            for name, change in ((same.LAYER_HEADER, lambda text: text.replace("PMX_GetGamma(", "PMX_GetGone(")),
+                                 (harness.OBJECT_HEADERS[0], lambda text: f"{text}\nextern const UINT32 u4Gone;\n")):
+                text = (tree / name).read_text(encoding="utf-8")
+                self.assertNotEqual(text, change(text))
+                (tree / name).write_text(change(text), encoding="utf-8")
+            pair = same.Pair.__new__(same.Pair)
+            pair.old = types.SimpleNamespace(root=tree, code={"u4Gone": ["00"]})
+            pair.new = types.SimpleNamespace(root=view.ROOT, code={})
+            self.assertEqual(["u4Gone"], pair.different_tables())
+            self.assertEqual({"PMX_GetGamma": "there was none", "PMX_GetGone": "there is none any more"},
+                             same.unlike(pair))
+            pair.same_code = lambda name: True
+            for names, told in ((same.declared(view.ROOT), {"PMX_GetGamma", "PMX_GetGone"}), (["PMX_GetMode"], set())):
+                ktap = unittest.mock.Mock()
+                pool = unittest.mock.Mock()
+                pool.submit.return_value.result.return_value = same.Found("code")
+                with contextlib.redirect_stdout(io.StringIO()):
+                    same.compare(ktap, pool, pair, names)
+                wrong = {call.args[0] for call in ktap.verdict.call_args_list if call.args[1]}
+                self.assertEqual({"tables and first values", *told}, wrong)
 
     def test_each_refactoring_can_be_planted_and_belongs_to_an_operation(self):
         names = {function.name for function in harness.operations(harness.ROOT)}

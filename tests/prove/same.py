@@ -416,13 +416,12 @@ def _symbols(old, new):
     shared = sorted({name for layer in (old, new) for text in layer.texts.values()
                      for name in re.findall(r"[(,]\s*&?(\w+)\s*(?=[,)])", text)} & old.defined & new.defined)
     return "\n".join(f"    if (p == (const void*)&{name} || p == (const void*)&{OLD}{name})\n        return {at + 1};"
-                     for at, name in enumerate(shared) if name in _exported())
+                     for at, name in enumerate(shared) if name in _exported(ROOT))
 
 
-def _exported():
-    return {name for _, name in harness.objects(ROOT)} | set(
-        EXPORTED.findall(declarations.read(ROOT / harness.OBJECT_HEADERS[0]))) | {
-            function.name for function in harness.operations(ROOT)}
+def _exported(root):
+    return {name for _, name in harness.objects(root)} | set(
+        EXPORTED.findall(declarations.read(root / harness.OBJECT_HEADERS[0]))) | declared(root).keys()
 
 
 def _kept(side, numbered):
@@ -605,8 +604,9 @@ class Pair:
 
     def different_tables(self):
         """Tables and first values that others see and that are not the same."""
-        return sorted(name for name in _exported() - set(self._operations)
-                      if self.old.code.get(name) != self.new.code.get(name))
+        roots = (self.old.root, self.new.root)
+        names = set().union(*map(_exported, roots)).difference(*map(declared, roots))
+        return sorted(name for name in names if self.old.code.get(name) != self.new.code.get(name))
 
     def _touched(self, name):
         return self.old.reached(name) + self.new.reached(name)
@@ -733,8 +733,9 @@ class Said:
 def unlike(pair):
     """{operation: in words} of those that cannot be held against each other."""
     then, now = declared(pair.old.root), declared(pair.new.root)
-    return {name: "there was none" if name not in then else "it takes or returns something else now"
-            for name in now if then.get(name) != now[name]}
+    other = {name: "there was none" if name not in then else "it takes or returns something else now"
+             for name in now if then.get(name) != now[name]}
+    return other | {name: "there is none any more" for name in then if name not in now}
 
 
 def decided(pair, name):
@@ -748,8 +749,9 @@ WORDS = {"code": "the same code", "proved": "proved", "differs": "differs", "und
 def compare(ktap, pool, pair, names):
     """Tells of each operation whether it is the same."""
     ktap.verdict("tables and first values", [f"{name} differs" for name in pair.different_tables()])
-    other = unlike(pair)
-    for name in other.keys() & set(names):
+    other, today = unlike(pair), declared(pair.new.root).keys()
+    gone = other.keys() - today if today <= set(names) else set()  # nobody can name these
+    for name in sorted(other.keys() & set(names) | gone):
         ktap.verdict(name, [other[name]])
     asked = [name for name in names if name not in other]
     if not all(pair.same_code(name) for name in asked):

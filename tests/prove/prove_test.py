@@ -38,26 +38,37 @@ def read(text):
 
 
 class View(unittest.TestCase):
+    def changed(self, name, before, after):
+        """What is told of a source in whose view that stands instead."""
+        path = self.folder / f"{name}.c"
+        text = path.read_text(encoding="utf-8")
+        self.assertEqual(1, text.count(before), before)
+        path.write_text(text.replace(before, after), encoding="utf-8")
+        with unittest.mock.patch.object(view, "sources", lambda root: [root / view.LAYER / f"{name}.cpp"]):
+            return view.disagreements(view.ROOT, self.folder)[1]
+
+    def setUp(self):
+        folder = tempfile.TemporaryDirectory()
+        self.addCleanup(folder.cleanup)
+        self.folder = pathlib.Path(folder.name)
+        view.write(view.ROOT, self.folder)
+
     def test_it_compiles_to_the_layers_own_code(self):
-        with tempfile.TemporaryDirectory() as directory:
-            folder = pathlib.Path(directory)
-            view.write(view.ROOT, folder)
-            number, different = view.disagreements(view.ROOT, folder)
-            self.assertEqual([], different)
-            self.assertGreater(number, 126)
-            path = folder / "pmx_port.c"
-            changed = path.read_text(encoding="utf-8").replace("fgConnected = TRUE", "fgConnected = FALSE")
-            path.write_text(changed, encoding="utf-8")
-            self.assertIn("i4Pmx_Connect", view.disagreements(view.ROOT, folder)[1])
+        number, different = view.disagreements(view.ROOT, self.folder)
+        self.assertEqual([], different)
+        self.assertGreater(number, 126)
+
+    def test_another_statement_is_noticed(self):
+        self.assertEqual(["i4Pmx_Connect"], self.changed("pmx_port", "fgConnected = TRUE", "fgConnected = FALSE"))
 
     def test_members_of_a_table_that_change_places_are_noticed(self):
-        with tempfile.TemporaryDirectory() as directory:
-            folder = pathlib.Path(directory)
-            view.write(view.ROOT, folder)
-            path = folder / "pmx_if.c"
-            swapped = path.read_text(encoding="utf-8").replace("= i4PMX_Suspend", "= i4PMX_Resume", 1)
-            path.write_text(swapped, encoding="utf-8")
-            self.assertEqual(["pmx_pm_ops"], view.disagreements(view.ROOT, folder)[1])
+        self.assertEqual(["pmx_pm_ops"], self.changed("pmx_if", "= i4PMX_Suspend,", "= i4PMX_Resume,"))
+
+    def test_a_sign_is_noticed_where_the_code_is_the_same(self):
+        was, signed = "- (UINT32)pi4PlnDelay", "- pi4PlnDelay"
+        self.assertEqual(["PMX_SetArbPlaneOrder"], self.changed("pmx_arb_order", was, signed))
+        with unittest.mock.patch.object(view, "TRAPS", []):
+            self.assertEqual([], self.changed("pmx_arb_order", signed, signed))
 
     def test_each_index_into_a_record_states_its_bound(self):
         self.assertEqual("x->arPortInfo[PMX_WITHIN(a[b + 1], PMX_PORT_NUM)].fgEnabled",
@@ -68,7 +79,6 @@ class View(unittest.TestCase):
                          read("f() { P* p = x->arPortInfo;\n return p[i];\n}\n"))
         self.assertEqual('"x.arPortInfo[%d]"', read('"x.arPortInfo[%d]"'))
         self.assertEqual({"aucPlaneOrder", "arPortInfo", "arOutputConf"}, view.member_arrays(view.ROOT).keys())
-
 
     def test_what_cannot_be_guarded_is_refused(self):
         for text in ("memcpy(x->arPortInfo, y, 9);", "*(x.arPortInfo + 9) = y;", "f(y, x->arPortInfo);",

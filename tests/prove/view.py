@@ -1,7 +1,8 @@
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 """The layer as C, for a checker that reads no C++20: the same text, but for the constructs below. What they become
 need not be believed: disagreements() compiles both, and holds the code of each function, and the tables, against the
-other's.
+other's; and once more with a trap wherever a number overflows or is shifted too far, for such code is the same whether
+that may happen or not.
 
 With guards, each index into an array inside a record states its bound: the checker knows of whole objects alone, and a
 record goes on behind its arrays. The guards are macros, and compiled to nothing."""
@@ -30,6 +31,7 @@ COMPILERS = [(["arm-none-eabi-g++"], ["arm-none-eabi-gcc"]),
              (["clang++", "--target=arm-none-eabi"], ["clang", "--target=arm-none-eabi"])]
 FLAGS = [*TARGET, "-O1", "-w", "-fno-pic", "-fno-stack-protector", "-fno-asynchronous-unwind-tables",
          "-fno-unwind-tables", "-fdata-sections"]
+TRAPS = ["-fsanitize=signed-integer-overflow,shift", "-fsanitize-undefined-trap-on-error"]
 APART = ["-ffunction-sections", "-fno-section-anchors"]  # what refers to what is told by names
 SECTION = re.compile(r"(?<=[ [])\.(?:data|rodata)\.?([\w.]*)")
 EMPTY = re.compile(r"^ +\d+ \.bss\.(\S+) +([0-9a-f]+) ", re.M)
@@ -176,32 +178,33 @@ def named_in(lines):
     return {match[1] for line in lines for match in REFERENCE.finditer(line)}
 
 
-def _pair(root, folder, compilers, path):
+def _pair(root, folder, compilers, path, flags):
     """The code of a source, and of its view."""
     includes = [f"-I{root / directory}" for directory in HEADERS]
     made = [folder / f"{path.stem}.{kind}.o" for kind in ("cpp", "c")]
-    run(*compilers[0], "-std=c++20", "-fno-exceptions", "-fno-rtti", *FLAGS, *includes, f"-ffile-prefix-map={root}/=",
-        "-c", path, "-o", made[0])
-    run(*compilers[1], "-std=gnu11", *FLAGS, *defines(), f"-I{folder / 'include'}", "-c", folder / f"{path.stem}.c",
-        "-o", made[1])
+    run(*compilers[0], "-std=c++20", "-fno-exceptions", "-fno-rtti", *FLAGS, *flags, *includes,
+        f"-ffile-prefix-map={root}/=", "-c", path, "-o", made[0])
+    run(*compilers[1], "-std=gnu11", *FLAGS, *flags, *defines(), f"-I{folder / 'include'}", "-c",
+        folder / f"{path.stem}.c", "-o", made[1])
     return [code(each) for each in made]
 
 
-def _different(root, folder, compilers, path):
+def _different(root, folder, compilers, path, flags):
     """(all that a source compiles to, what its view compiles to differently)"""
-    original, made = _pair(root, folder, compilers, path)
+    original, made = _pair(root, folder, compilers, path, flags)
     names = original.keys() | made.keys()
     return names, {name for name in names if original.get(name) != made.get(name)}
 
 
 def disagreements(root, folder):
     """(how many functions and tables the layer has, those that no compiler makes the same of in source and view)"""
-    number, left = 0, []
+    number, left = 0, set()
     for path in sources(root):
-        names, different = _different(root, folder, COMPILERS[0], path)
-        for compilers in COMPILERS[1:] if different else ():
-            with contextlib.suppress(Failed):  # one that cannot read the view's C says nothing of it
-                different &= _different(root, folder, compilers, path)[1]
+        for flags in [], TRAPS:
+            names, different = _different(root, folder, COMPILERS[0], path, flags)
+            for compilers in COMPILERS[1:] if different else ():
+                with contextlib.suppress(Failed):  # one that cannot read the view's C says nothing of it
+                    different &= _different(root, folder, compilers, path, flags)[1]
+            left |= different
         number += len(names)
-        left += sorted(different)
-    return number, left
+    return number, sorted(left)

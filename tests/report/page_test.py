@@ -600,6 +600,19 @@ class Used(PageTest):
         self.choose("#other", 1)
         self.assertEqual(2, len(self.all(".apart-pictures img")))
 
+    def test_a_picture_that_is_left_out_differs_from_none(self):
+        def leave_out(data):
+            steps = self.another_picture(data)["runs"][1]["steps"]
+            steps[0]["outputs"][0]["picture"] = None
+            return data
+
+        muted = written.scenario("muted.pmx", "PMX_Init\nPMX_SetMuteEnable 0 1\nPMX_SetMuteEnable 0 0\n")
+        browser.open(written.changed(written.write(muted, muted), leave_out))
+        self.choose("#other", 1)
+        self.assertEqual([], self.all(".apart-pictures"))
+        self.assertTrue(any("left out" in text for text in self.texts(".nothing")))
+        self.assertFalse(any("changed; left out" in text for text in self.texts(".nothing")))
+
     @staticmethod
     def another_picture(data):
         data["pictures"].append(data["pictures"][0])

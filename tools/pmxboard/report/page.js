@@ -396,11 +396,16 @@ function refusalOf(step) {
   return refused;
 }
 
+/** Whether two pictures are known to differ: of one that is left out nothing is known. */
+function lookApart(one, other) {
+  return one.picture !== null && other.picture !== null && one.picture !== other.picture;
+}
+
 function pictureOf(side, index, output) {
   const { steps } = sides()[side];
   const seen = steps[index].outputs[output];
   const before = index > 0 ? steps[index - 1].outputs[output] : undefined;
-  const isNew = before !== undefined && before.picture !== seen.picture;
+  const isNew = before !== undefined && lookApart(before, seen);
   const label = `${seen.output}: ${seen.description}${isNew ? ", changed" : ""}`;
   if (seen.picture === null) return make("p", { class: "nothing" }, `${label}; left out`);
   const image = make("img", { src: data.pictures[seen.picture], alt: label, loading: "lazy" });
@@ -534,7 +539,7 @@ function differingPictures(one, other) {
   const image = (seen) => make("img", { src: data.pictures[seen.picture], alt: `${seen.output}: ${seen.description}` });
   return one.outputs.flatMap((seen, index) => {
     const beside = other.outputs[index];
-    if (!beside || beside.picture === seen.picture) return [];
+    if (!beside || !lookApart(seen, beside)) return [];
     return [make("li", { class: "apart-pictures" }, `${seen.output}: ${seen.description} / ${beside.description}`,
                  make("span", { class: "both" }, image(seen), image(beside)))];
   });

@@ -16,17 +16,12 @@ namespace board::outputs
 namespace
 {
 
-bool belongs_to(names::Family family, std::string_view name, std::int64_t number)
-{
-    return family != names::Family::None && names::name_of(family, number) == name;
-}
-
 /** Whether a name goes with any number: TRUE, OSR_OK. */
 bool is_general(std::string_view name, std::int64_t number)
 {
     const auto families = names::families();
     return std::none_of(families.begin(), families.end(),
-                        [&](const auto& titled) { return belongs_to(titled.family, name, number); });
+                        [&](const auto& titled) { return names::name_of(titled.family, number) == name; });
 }
 
 /** The parts of "{a=1, b=2}" by name; "..." says what is so anyway: the other fields stay as they are. */
@@ -61,7 +56,7 @@ std::int64_t read_number(std::string_view written, unsigned bits, names::Family 
     if (!number)
     {
         number = names::number_of(written);
-        const bool fits = number && (family == names::Family::None || belongs_to(family, written, *number) ||
+        const bool fits = number && (family == names::Family::None || names::name_of(family, *number) == written ||
                                      is_general(written, *number));
         if (!fits)
             throw std::invalid_argument(std::string(written) + " is neither a number nor a name that goes here" +

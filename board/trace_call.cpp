@@ -27,22 +27,14 @@ Value::Base base_of(std::string_view function, std::string_view argument)
     return hex ? Value::Base::Hex : Value::Base::Decimal;
 }
 
-/** A number gets the name and the base of its parameter, a list's numbers get the names alone. */
+/** A number gets the name and the base of its parameter. */
 Value dressed(Value value, names::Family family, Value::Base base)
 {
-    if (value.kind() == Value::Kind::Number && value.string().empty())
-    {
-        const bool hex = base == Value::Base::Hex || value.base() == Value::Base::Hex;
-        return Value::number(value.as_number(), names::name_of(family, value.as_number()),
-                             hex ? Value::Base::Hex : Value::Base::Decimal);
-    }
-    if (value.kind() != Value::Kind::List || family == names::Family::None)
+    if (value.kind() != Value::Kind::Number || !value.string().empty())
         return value;
-    std::vector<Value> items;
-    items.reserve(value.items().size());
-    for (const Value& item : value.items())
-        items.push_back(dressed(item, family, item.base()));
-    return Value::list(std::move(items));
+    const bool hex = base == Value::Base::Hex || value.base() == Value::Base::Hex;
+    return Value::number(value.as_number(), names::name_of(family, value.as_number()),
+                         hex ? Value::Base::Hex : Value::Base::Decimal);
 }
 
 /** "pu4PlaneOrder" of "array(pu4PlaneOrder, 8)", "pvParameter" of "value(\"pvParameter\", …)". */

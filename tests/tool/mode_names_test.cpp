@@ -113,4 +113,15 @@ TEST(OutputsVerb, WrittenWrong)
               diagnostics("outputs hdmi"));
 }
 
+/** Requests near one that was refused are told apart by it. */
+TEST(ModeNames, TheLetterI_MeansInterlacedAlone)
+{
+    for (const std::string_view mode : pmxboard::names_in(board::names::Family::ResolutionMode))
+    {
+        const std::size_t i = mode.find('I');
+        const std::string_view before = mode.substr(0, i == mode.npos ? 0 : i);
+        EXPECT_EQ(before.size(), before.find_last_of("0123456789") + 1) << mode;
+    }
+}
+
 } // namespace

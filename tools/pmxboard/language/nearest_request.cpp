@@ -81,14 +81,10 @@ double refresh(unsigned mode)
     return std::strtod(refresh_of(record_view::mode_row(mode).name).c_str(), nullptr);
 }
 
+/** No other word in the modes' names has that letter. */
 bool is_interlaced(std::string_view name)
 {
-    for (std::size_t i = 1; i < name.size(); ++i)
-    {
-        if (name[i] == 'I' && name[i - 1] >= '0' && name[i - 1] <= '9')
-            return true;
-    }
-    return false;
+    return name.find('I') != name.npos;
 }
 
 /** All modes but one, those nearest to it first; `asked` is the frequency where its name has none. */

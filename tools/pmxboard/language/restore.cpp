@@ -34,11 +34,11 @@ bool is_step(const Line& line)
 /** Where an image lies: elsewhere in another installation, and what it holds is compared by itself. */
 bool is_path_of_image(const Change& change)
 {
-    const auto is_word = [](const std::optional<board::Value>& value) {
-        return !value || value->kind() != board::Value::Kind::Text || value->string().starts_with("word ");
+    const auto is_path = [](const std::optional<board::Value>& value) {
+        return value && value->kind() == board::Value::Kind::Text && !value->string().starts_with("word ");
     };
-    return change.path.starts_with("flash.partitions[") && change.path.ends_with("].image") && !is_word(change.older) &&
-           !is_word(change.newer);
+    return change.path.starts_with("flash.partitions[") && change.path.ends_with("].image") && is_path(change.older) &&
+           is_path(change.newer);
 }
 
 std::string first_difference(const StateDump& wanted, const StateDump& found)

@@ -56,13 +56,10 @@ private:
 /** An outcome in a notice: "= 1, *pucMode = RES_480P". */
 std::string outcome_text(const Outcome& outcome)
 {
-    std::string text = outcome.result ? "= " + outcome.result->to_text() : std::string();
+    std::string text = outcome.result ? ", = " + outcome.result->to_text() : std::string();
     for (const OutputValue& output : outcome.outputs)
-    {
-        text += (text.empty() ? "*" : ", *") + output.name +
-                (output.value ? " = " + output.value->to_text() : std::string(" untouched"));
-    }
-    return text;
+        text += ", *" + output.name + (output.value ? " = " + output.value->to_text() : std::string(" untouched"));
+    return text.empty() ? text : text.substr(2);
 }
 
 } // namespace
@@ -150,7 +147,7 @@ void Session::look_for_others()
 void Session::take_state()
 {
     m_left.reset();
-    if (m_notices_others && m_running <= 1 && m_powered && m_steps.lost().empty())
+    if (m_notices_others && m_running <= 1 && m_steps.lost().empty())
         m_left = whole_state();
 }
 

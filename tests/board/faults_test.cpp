@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
+#include "board/outputs.h"
 #include "device_test.h"
 
 #include <algorithm>
@@ -9,6 +10,7 @@
 
 #include "drv_av_d.h"
 #include "drv_if.h"
+#include "drv_if_pmx.h"
 #include "drv_vdp.h"
 #include "pmx_hal.h"
 #include "u_os.h"
@@ -239,6 +241,9 @@ TEST_F(Faults, Outputs_AreSetAndTheOthersLeftAlone)
         fault_of("fgPmxDrvGetAvdInfo", 1, When::On, { { "pvParameter", "{u2ValidAutoVfreq=TRUE, ..., …}" } }));
     EXPECT_EQ(TRUE, fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, &query));
     EXPECT_EQ(1, query.u2ValidAutoVfreq) << "a name that goes with any number";
+    board::faults::set(fault_of("fgPmxDrvGetAvdInfo", 1, When::On, { { "pvParameter", "{u4ValidAutoRes=TRUE}" } }));
+    EXPECT_EQ(TRUE, fgPmxDrvGetAvdInfo(PMX_GET_VALID_RES_AND_VFREQ, &query));
+    EXPECT_EQ(1u, query.u4ValidAutoRes) << "one that has names of its own, too";
 
     board::faults::set(fault_of("x_timer_create", 0, When::On, { { "phTimer", "77" } }));
     EXPECT_EQ(OSR_OK, x_timer_create(nullptr)) << "a null pointer takes nothing";
@@ -280,6 +285,8 @@ TEST_F(Faults, ArgumentsAndOutputs_AreRefusedWithTheReason)
                     .ends_with("there is no field u4ValidAutoRe; did you mean u4ValidAutoRes?"));
     EXPECT_TRUE(of("fgPmxDrvGetAvdInfo", { { "pvParameter", "{u4ValidAutoRes=PMX_TV_TYPE_PAL}" } })
                     .find("PMX_TV_TYPE_PAL is neither a number nor a name that goes here") != std::string::npos);
+    EXPECT_TRUE(of("fgPmxDrvGetAvdInfo", { { "pvParameter", "{u4ValidAutoRes=RES_480PP}" } })
+                    .ends_with("goes here; did you mean RES_480P, RES_480I?"));
     for (const char* const number : { "4294967296", "-2147483649" })
         EXPECT_EQ("x_timer_create: phTimer: " + std::string(number) + " does not fit into 32 bits",
                   of("x_timer_create", { { "phTimer", number } }));
@@ -459,6 +466,19 @@ TEST_F(Faults, PlatformFunctions_AreThoseOfTheHeaders)
         with_result += function.has_result ? 1 : 0;
     EXPECT_EQ(109u, board::platform_functions().size());
     EXPECT_EQ(37u, with_result);
+}
+
+TEST(Outputs, ARecordWithinARecord_IsWrittenLikeOne)
+{
+    PMX_RESOLUTION_T output{};
+    output.u4VFreq = 60;
+    output.eCcirDrvInfo.eDgoMode = CCIR_656_MODE;
+    board::outputs::put_record(&output, "{eResMode=RES_480P, eCcirDrvInfo={eDgoFmt=CCIR_YC422_16BIT}}");
+    EXPECT_EQ(RES_480P, output.eResMode);
+    EXPECT_EQ(60u, output.u4VFreq) << "what is left out stays as it is";
+    EXPECT_EQ(CCIR_YC422_16BIT, output.eCcirDrvInfo.eDgoFmt);
+    EXPECT_EQ(CCIR_656_MODE, output.eCcirDrvInfo.eDgoMode);
+    EXPECT_THROW(board::outputs::put_record(&output, "{eCcirDrvInfo={eResMode=RES_480P}}"), std::invalid_argument);
 }
 
 } // namespace

@@ -55,6 +55,29 @@ TEST_F(SourceContracts, SetColorMode_AfterARefusedLock_IsTheMixersDesign)
               story());
 }
 
+TEST_F(SourceContracts, SetColorMode_WhileALockWaits_IsMisuse)
+{
+    void* tag = nullptr;
+    board::sources::connect(source("vdp0"));
+    const IVdp* const table = table_of(0, &tag);
+    const HANDLE_T mutex = MutexPMX;
+    x_sema_lock(mutex, X_SEMA_OPTION_WAIT);
+    board::threads::run("neighbour", [mutex] {
+        x_sema_lock(mutex, X_SEMA_OPTION_WAIT);
+        x_sema_unlock(mutex);
+    });
+    ASSERT_EQ((Lines{ "neighbour waits for mutex 1" }), board::threads::waiting());
+    MutexPMX = 0; // forgotten: nobody holds what is the mixer's now, and the lock that waits was not refused
+    table->pu4SetColorMode(tag, DRV_PMX_CS_YCBCR_601);
+    MutexPMX = mutex;
+    const Lines lines = story();
+    EXPECT_EQ(1, std::count(lines.begin(), lines.end(),
+                            "NOTICE misuse \"pu4SetColorMode of vdp0: called without MutexPMX held\""));
+    x_sema_unlock(mutex);
+    EXPECT_EQ(1u, board::misuses());
+    EXPECT_TRUE(board::threads::waiting().empty());
+}
+
 TEST_F(SourceContracts, SetColorMode_WithoutHoldingTheTable_IsMisuse)
 {
     void* tag = nullptr;

@@ -517,9 +517,9 @@ TEST_F(Trace, Outputs_AreReadWhenTheCallEnds_InputsWhenItBegins)
 }
 
 /** While they run something else happens. */
-INT32 test_interrupted(void (*pfMeanwhile)(), void** ppvTag, CHAR* szText)
+INT32 test_interrupted(void (*pfMeanwhile)(), void** ppvTag, void** ppvTable, CHAR* szText)
 {
-    BOARD_CALL_ACTING(test_interrupted, ignored(nullptr), tag(ppvTag), text(szText, 4));
+    BOARD_CALL_ACTING(test_interrupted, ignored(nullptr), tag(ppvTag), object(ppvTable), text(szText, 4));
     pfMeanwhile();
     return boardCall.answer(7);
 }
@@ -539,11 +539,11 @@ void test_failure(void (*pfMeanwhile)())
 TEST_F(Trace, ACallWhoseEntryIsForgotten_EndsAsUsual)
 {
     const auto nothing = [] {};
-    test_interrupted(nothing, nullptr, nullptr);
-    EXPECT_EQ("test_interrupted(null, null, null) = 7", last().brief());
+    test_interrupted(nothing, nullptr, nullptr, nullptr);
+    EXPECT_EQ("test_interrupted(null, null, null, null) = 7", last().brief());
     for (void (*const meanwhile)() : { +[] { board::trace::clear(); }, +[] { power_on({}); } })
     {
-        EXPECT_EQ(7, test_interrupted(meanwhile, nullptr, nullptr));
+        EXPECT_EQ(7, test_interrupted(meanwhile, nullptr, nullptr, nullptr));
         test_print(meanwhile);
         test_failure(meanwhile);
         EXPECT_TRUE(board::trace::entries().empty());

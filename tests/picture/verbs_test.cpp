@@ -135,6 +135,29 @@ TEST(PictureVerbs, Preview_InColour)
     EXPECT_NE(run.shown.npos, run.shown.find("\x1b[38;2;200;100;50m\x1b[48;2;200;100;50m▀")) << run.shown;
 }
 
+TEST(PictureVerbs, Preview_IsDrawnAsTheTerminalCan_WhereSomebodyLooks)
+{
+    unsigned drawn = 0;
+    pmxboard::OutputOptions options;
+    options.draw = [&](const board::picture::Image& image) {
+        ++drawn;
+        return "drawn, " + std::to_string(image.width()) + " wide\n";
+    };
+    EXPECT_EQ("  HDMI: 1280x720\ndrawn, 1280 wide\n",
+              tool_test::behind_last(tool_test::run(FILM + "shot hdmi", options).shown));
+    options.quiet = true;
+    EXPECT_TRUE(tool_test::run(FILM + "shot hdmi", options).done);
+    EXPECT_EQ(1u, drawn) << "nobody looks";
+}
+
+TEST_F(PictureFilesOfVerbs, ASizeThatNoPictureHas_IsAWrongLine)
+{
+    EXPECT_EQ(
+        "here.pmx:5: no picture is 100000x100000: sides are 1 to 8192 pixels, and there are at most 2^24 of them\n",
+        diagnostics(FILM + "shot hdmi " + file("x.png") + " 100000x100000"));
+    EXPECT_FALSE(std::filesystem::exists(file("x.png")));
+}
+
 TEST_F(PictureFilesOfVerbs, AShot_IsExpectedAsItWasTaken)
 {
     const std::string name = file("hdmi.png");
@@ -156,6 +179,11 @@ TEST_F(PictureFilesOfVerbs, AnotherPicture_IsNotMet_AndTheDifferenceIsKept)
         << found;
     EXPECT_NE(found.npos, found.find("; the difference is in " + file("hdmi.difference.png"))) << found;
     EXPECT_EQ(32, read(file("hdmi.difference.png")).width());
+    std::filesystem::remove(file("hdmi.difference.png"));
+    std::filesystem::create_directory(file("hdmi.difference.png"));
+    const std::string unkept = diagnostics(FILM + "source vdp0 picture solid 200,110,50\nexpect picture hdmi " + name);
+    EXPECT_TRUE(unkept.starts_with("here.pmx:6: expected the picture " + name)) << unkept;
+    EXPECT_TRUE(unkept.ends_with("; HDMI: 1280x720" + repeat)) << "it cannot be kept there: " << unkept;
 }
 
 TEST_F(PictureFilesOfVerbs, APictureOfALargerMode_IsNotMet)
@@ -163,6 +191,8 @@ TEST_F(PictureFilesOfVerbs, APictureOfALargerMode_IsNotMet)
     const std::string name = file("hdmi.png");
     EXPECT_EQ("here.pmx:7: expected a picture of 1280x720, found HDMI: 720x480" + repeat,
               diagnostics(FILM + "shot hdmi " + name + "\noutputs hdmi=480p60 cvbs=480i\nexpect picture hdmi " + name));
+    EXPECT_EQ("here.pmx:6: expected a picture of 1280x1000, found HDMI: 1280x720" + repeat,
+              diagnostics(FILM + "shot hdmi " + name + " 1280x1000\nexpect picture hdmi " + name));
 }
 
 TEST_F(PictureFilesOfVerbs, AnExpectedPicture_MayBeTakenAnew)

@@ -122,6 +122,8 @@ TEST(Completion, Verbs_ByTheirUsage)
     EXPECT_THAT(candidates("fault x_sema_lock of"), ElementsAre("off"));
     EXPECT_THAT(candidates("plane-delay "), ElementsAre("order"));
     EXPECT_THAT(candidates("state --"), ElementsAre("--json"));
+    EXPECT_THAT(candidates("status outputs "), ElementsAre("--json"));
+    EXPECT_THAT(candidates("status --json pl"), ElementsAre("planes"));
     EXPECT_THAT(candidates("no-such-verb "), IsEmpty());
 }
 

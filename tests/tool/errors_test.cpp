@@ -35,6 +35,7 @@ TEST(ScenarioErrors, OperationWithBrackets)
     EXPECT_EQ("here.pmx:1: PMX_SetEnable(0, 1): arguments stand behind the name, separated by blanks: PMX_SetEnable "
               "ucPmxId ucEnable\n",
               diagnostics("PMX_SetEnable(0, 1)"));
+    EXPECT_EQ("here.pmx:1: no command qqqqqqqqqqqq(1)\n", diagnostics("qqqqqqqqqqqq(1)"));
 }
 
 TEST(ScenarioErrors, PlatformFunctionAsACommand)

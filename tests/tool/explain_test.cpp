@@ -81,6 +81,25 @@ const Told each_reason[] = {
       { "output PMX_OUTPUT_HDMI (1) is the first that is on, and gives the mixer mode RES_1080P50HZ (13)",
         "capability bit 9 (RES_1080P50HZ) is clear in 0x7FFBFDFF" },
       { "outputs hdmi=1080p60 composite=576i" } },
+    { { "poke u4Capability 0x7FFBFDFF" },
+      "outputs component=off hdmi=1080p50",
+      { "capability bit 9 (RES_1080P50HZ) is clear in 0x7FFBFDFF" },
+      { "outputs component=off hdmi=1080p60" } },
+    { { "poke u4Capability 0x7FFBFFFE" },
+      "outputs hdmi=off",
+      { "all outputs are off, and HDMI gives the mixer mode RES_480I (0)" },
+      {} },
+    { { "poke u4Capability 0x7FFBFDFF" },
+      "PMX_SetMode 0 RES_1080P50HZ 55 0",
+      { "capability bit 9 (RES_1080P50HZ) is clear in 0x7FFBFDFF" },
+      { "PMX_SetMode 0 RES_1080P60HZ 55 0" } },
+    { { "poke u4Capability 0x7FFBFDFF" },
+      "PMX_SetModeEx 0 [[0], {fgOutputEnable=1, eResMode=RES_1080P50HZ, u4VFreq=50, "
+      "eCcirDrvInfo={eDgoMode=CCIR_656_MODE}}, [0], [0]] 50 0 0",
+      { "capability bit 9 (RES_1080P50HZ) is clear in 0x7FFBFDFF" },
+      { "PMX_SetModeEx 0 [{fgOutputEnable=0}, {fgOutputEnable=1, eResMode=RES_1080P60HZ, u4VFreq=50, "
+        "eCcirDrvInfo={eDgoMode=CCIR_656_MODE, eDgoFmt=CCIR_NON_USED, eDgiMode=CCIR_INVALID, "
+        "eDgiFmt=CCIR_NON_USED}}, {fgOutputEnable=0}, {fgOutputEnable=0}] 60 0 0" } },
     { { "PMX_Init" },
       "PMX_SetModeEx 0 [[0],[0,RES_2160P],[0],[0]] 60 0 0",
       { "all outputs are off, and HDMI gives the mixer mode RES_2160P (49)", "no product admits mode RES_2160P (49)" },
@@ -275,6 +294,45 @@ TEST_F(Explain, EachReason_IsToldWithItsValuesAndWithWhatWouldBeAccepted)
         EXPECT_TRUE(seen.contains(row.number)) << row.name << " is told by none of these";
 }
 
+TEST_F(Explain, WhatWouldFail_IsNotProposed)
+{
+    carry_out({ "PMX_Init", "meanwhile PMX_HalSetMode flash nothing off" });
+    const pmxboard::Search few{ 5, std::chrono::seconds(10) };
+    EXPECT_EQ(std::vector<std::string>{}, pmxboard::explain(m_session, "PMX_SetMode 0 RES_2160P 50 0", few).accepted)
+        << "each of them would, though it fails once: none is tried behind another one that has changed something";
+    carry_out({ "meanwhile off" });
+    EXPECT_EQ((std::vector<std::string>{ "PMX_SetMode 0 RES_1080P50HZ 50 0" }),
+              pmxboard::explain(m_session, "PMX_SetMode 0 RES_2160P 50 0", few).accepted);
+}
+
+TEST_F(Explain, BehindALongTrace_WhatIsAcceptedIsFound)
+{
+    carry_out({ "PMX_Init" });
+    while (board::trace::entries().size() <= 4096)
+        carry_out({ "PMX_SetArbPlaneOrder 0 0x76543210" }); // the next one would forget them
+    EXPECT_EQ((std::vector<std::string>{ "PMX_SetPlaneOrder 0 1 7" }),
+              pmxboard::explain(m_session, "PMX_SetPlaneOrder 0 1 9").accepted);
+    EXPECT_LT(4096u, board::trace::entries().size());
+}
+
+TEST_F(Explain, RequestsNear_InTheirOrder)
+{
+    const auto near = [this](const std::string& command) {
+        return pmxboard::requests_near(pmxboard::explain(m_session, command, pmxboard::none));
+    };
+    carry_out({ "PMX_Init", "poke u4Capability 0x7FFBFFF7" });
+    const auto modes = near("PMX_SetMode 0 RES_576P 50 0");
+    ASSERT_LT(3u, modes.size());
+    EXPECT_EQ("PMX_SetMode 0 RES_576P_1440 50 0", modes[0].at(0));
+    EXPECT_EQ("PMX_SetMode 0 RES_576P_2880 50 0", modes[1].at(0));
+    EXPECT_EQ("PMX_SetMode 0 RES_576I 50 0", modes[2].at(0)) << "of another scan, and no other height at 60 Hz";
+    std::set<std::string> numbers;
+    for (const auto& request : near("PMX_SetPlaneOrder 0 1 255"))
+        numbers.insert(request.at(0));
+    EXPECT_TRUE(numbers.contains("PMX_SetPlaneOrder 0 1 254"));
+    EXPECT_FALSE(numbers.contains("PMX_SetPlaneOrder 0 1 256")) << "which no argument of 8 bits holds";
+}
+
 TEST_F(Explain, ChangesNothing)
 {
     carry_out({ "PMX_Init" });
@@ -301,6 +359,15 @@ TEST_F(Explain, ShowsPathPlaceAdviceAndWhatIsAccepted)
         << shown;
     EXPECT_NE(shown.find("  so       ask for another mode\n"), shown.npos) << shown;
     EXPECT_NE(shown.find("  accepted: outputs hdmi=1080p60\n"), shown.npos) << shown;
+}
+
+TEST_F(Explain, WhatTakesTwoCommands_IsShownBelowEachOther)
+{
+    const std::string shown = shown_by("explain PMX_VdpEnabled 0 1 720 576 1");
+    EXPECT_NE(shown.find("  accepted: i4Pmx_Connect PMX_COMP_TYPE_PMX 0 PMX_COMP_TYPE_VDP 1\n"
+                         "           PMX_VdpEnabled 0 1 720 576 1\n"),
+              shown.npos)
+        << shown;
 }
 
 TEST_F(Explain, TakesTheStateThatThereIs)
@@ -426,6 +493,23 @@ TEST_F(Explain, WhyModeTellsWhichOutputDecided)
         << shown;
 }
 
+TEST_F(Explain, WhyModeTellsThatAllOutputsAreOff)
+{
+    carry_out({ "PMX_Init", "PMX_SetModeEx 0 [[0], [0, RES_720P60HZ], [0], [0]] 60 0 0" });
+    const std::string off = "because  all outputs are off, and HDMI gives the mixer mode RES_720P60HZ";
+    std::string shown = shown_by("why mode");
+    EXPECT_NE(shown.find(off), shown.npos) << shown;
+    EXPECT_EQ(shown.find("  but "), shown.npos) << shown;
+    carry_out({ "poke u4Capability 0x7FFBFFEF" });
+    shown = shown_by("why mode");
+    EXPECT_NE(shown.find("capability bit 4 (RES_720P60HZ"), shown.npos) << shown;
+    EXPECT_EQ(shown.find("  but "), shown.npos) << shown;
+    carry_out({ "PMX_SetMode 0 RES_480P 60 0" });
+    shown = shown_by("why mode");
+    EXPECT_NE(shown.find(off), shown.npos) << shown;
+    EXPECT_NE(shown.find("  but      not the outputs decided: "), shown.npos) << shown;
+}
+
 TEST_F(Explain, WhyColourSpaceTellsWhoDelivers)
 {
     carry_out({ "PMX_Init" });
@@ -443,13 +527,15 @@ TEST_F(Explain, WhyColourSpaceTellsWhoDelivers)
 /* Without asking */
 
 /** Lines in a file of their own, run with or without explanations; what is shown, and what is told of failures. */
-std::pair<std::string, std::string> run_from_file(const std::string& lines, bool explain)
+std::pair<std::string, std::string> run_from_file(const std::string& lines, bool explain, bool keep_going = false)
 {
     const std::string name = testing::TempDir() + "explained-" + std::to_string(getpid()) + ".pmx";
     std::ofstream(name) << lines;
     std::ostringstream shown;
     std::ostringstream diagnostics;
-    const pmxboard::Scenario scenario{ .name = name, .board = "default", .repeat = "again", .explain = explain };
+    const pmxboard::Scenario scenario{
+        .name = name, .board = "default", .repeat = "again", .keep_going = keep_going, .explain = explain
+    };
     std::ifstream file(name);
     pmxboard::run_scenario(file, scenario, { .to = &shown, .filter = { { "TVE_" }, {} } }, diagnostics);
     std::filesystem::remove(name);
@@ -492,6 +578,39 @@ TEST(ExplainedRun, WhatCannotBeRunAgain_FailsAsBefore)
 {
     EXPECT_EQ(diagnostics(std::string(refused) + "expect result 1\n"),
               "here.pmx:3: expected result 1, found 0" + tool_test::repeat);
+}
+
+TEST(ExplainedRun, OfManyFailures_TheFirstAreExplained)
+{
+    std::string lines = "PMX_Init\n";
+    for (unsigned i = 0; i < 5; ++i)
+        lines += "PMX_SetMode 0 RES_2160P 60 0\nexpect result 1\n";
+    const auto [shown, diagnostics] = run_from_file(lines, false, true);
+    const auto count = [&told = diagnostics](const std::string& text) {
+        unsigned found = 0;
+        for (std::size_t at = told.find(text); at != told.npos; at = told.find(text, at + 1))
+            ++found;
+        return found;
+    };
+    EXPECT_EQ(5u, count("expected result 1, found 0")) << diagnostics;
+    EXPECT_EQ(3u, count("no product admits mode RES_2160P (49)")) << diagnostics;
+}
+
+TEST(ExplainedRun, AFileThatIsAnotherOneNow_FailsAsBefore)
+{
+    const std::string unreadable = testing::TempDir() + "unreadable-" + std::to_string(getpid()) + ".pmx";
+    std::ofstream(unreadable) << std::string(2'000'000, 'x');
+    for (const std::string& name : { unreadable, std::string(5'000, 'x') + ".pmx" })
+    {
+        std::istringstream lines(std::string(refused) + "expect result 1\n");
+        std::ostringstream shown;
+        std::ostringstream diagnostics;
+        const pmxboard::Scenario scenario{ .name = name, .board = "default", .repeat = "again" };
+        EXPECT_FALSE(pmxboard::run_scenario(lines, scenario, { .to = &shown }, diagnostics));
+        EXPECT_TRUE(diagnostics.str().ends_with(":3: expected result 1, found 0\nrepeat: again\n"))
+            << diagnostics.str().substr(0, 1000);
+    }
+    std::filesystem::remove(unreadable);
 }
 
 } // namespace

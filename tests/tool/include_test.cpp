@@ -36,6 +36,15 @@ TEST_F(Include, CarriesOutTheLinesOfAnotherFile)
     EXPECT_NE(std::string::npos, ended.out.find("> include below/start.pmx\n> PMX_Init\n")) << ended.out;
 }
 
+TEST_F(Include, ABoardFile_IsFoundBesideTheScenario)
+{
+    std::filesystem::create_directory(m_directory / "below");
+    write("below/own.toml", "name = \"own\"\n[[fault]]\nfunction = \"PMX_HalSetPlaneOrder\"\nanswer = 1\n");
+    write("below/start.pmx", "power-on own.toml\n");
+    write("main.pmx", "include below/start.pmx\nPMX_SetArbPlaneOrder 0 0x76543210\nexpect result 0\n");
+    EXPECT_EQ("", run_file("-q", "main.pmx").err);
+}
+
 TEST_F(Include, AnError_HasTheChainOfPlaces)
 {
     write("main.pmx", "PMX_Init\ninclude one.pmx\n");

@@ -38,6 +38,8 @@ TEST(MeanwhileVerb, ResultAndOutputs_AreNotices_AndTheOuterCommandKeepsItsOwn)
     EXPECT_EQ(
         "", diagnostics("poke ucMode RES_576P\nmeanwhile PMX_HalSetTvType PMX_GetMode 0\nPMX_SetTvType 0 3\n"
                         "expect result 1\nexpect call NOTICE meanwhile \"= 1, *pucMode = RES_576P\"\nexpect no-more"));
+    EXPECT_EQ("", diagnostics("meanwhile PMX_HalSetTvType PMX_GetMode 1\nPMX_SetTvType 0 3\n"
+                              "expect call NOTICE meanwhile \"= 0, *pucMode untouched\"\nexpect no-more"));
     EXPECT_EQ(
         "", diagnostics("PMX_Init\nmeanwhile PMX_HalSetTvType ipmx pi4GetOutSize tag\nPMX_SetTvType 0 3\n"
                         "expect next PMX_HalSetTvType(0, 3)\nexpect next NOTICE meanwhile \"ipmx pi4GetOutSize tag\"\n"

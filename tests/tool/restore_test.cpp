@@ -179,9 +179,27 @@ TEST_F(Restore, AnotherBoardFile_IsRefused)
     ASSERT_EQ("", run_here("power-on " + board + "\nPMX_Init\n" + save()));
     std::ofstream(board) << "# with a comment\n\nname =   \"own\"\n[console]\nlevel=0\n";
     EXPECT_EQ("", run_here(restore())) << "the same in other words";
+    const std::string good = content(saved());
     std::ofstream(board) << says << "[[fault]]\nfunction = \"PMX_HalSetPlaneOrder\"\nanswer = 1\n";
     EXPECT_NE(std::string::npos, run_here(restore()).find(": its board file says something else than it did then"))
         << run_here(restore());
+    std::string silent = good;
+    silent.replace(silent.find("\"board\"", silent.find("\"steps\"")), 7, "\"bored\"");
+    std::ofstream(saved()) << silent;
+    EXPECT_NE(std::string::npos, run_here(restore()).find(": its commands lead to another state: faults[0] becomes "))
+        << "what it said is not known: " << run_here(restore());
+    EXPECT_NE(std::string::npos, run_here(restore()).find(", and the file has nothing")) << run_here(restore());
+}
+
+TEST_F(Restore, BoardFilesWithOddNames)
+{
+    for (const char* const name : { "my own.toml", "my\"own.toml" })
+    {
+        std::filesystem::remove(saved());
+        std::ofstream(file(name)) << "name = \"own\"\n";
+        EXPECT_EQ("", run_here("power-on " + board::quote(file(name)) + "\nPMX_Init\n" + save())) << name;
+        EXPECT_EQ("", run_here(restore() + "expect state _PmxInitiated 1")) << name;
+    }
 }
 
 TEST_F(Restore, FilesAreFoundWhereTheLinesStood)
@@ -227,8 +245,9 @@ TEST_F(Restore, WhatLeadsElsewhere_IsRefused_AndNothingHasChanged)
               refused("PMX_SetTvType 0 PMX_TV_TYPE_PAL", "PMX_SetTvType 0 PMX_TV_TYPE_NTSC"));
     EXPECT_EQ("its command 3, save x.json: it does nothing to a state" + tool_test::repeat,
               refused("PMX_SetTvType 0 PMX_TV_TYPE_PAL", "save x.json"));
-    EXPECT_EQ("its command 3, restore x.json: it does nothing to a state" + tool_test::repeat,
-              refused("PMX_SetTvType 0 PMX_TV_TYPE_PAL", "restore x.json"));
+    for (const char* const idle : { "restore x.json", "expect", "expect result 1", "# PMX_Stop" })
+        EXPECT_EQ("its command 3, " + std::string(idle) + ": it does nothing to a state" + tool_test::repeat,
+                  refused("PMX_SetTvType 0 PMX_TV_TYPE_PAL", idle));
     EXPECT_TRUE(
         refused("PMX_SetTvType 0 PMX_TV_TYPE_PAL", "PMX_SetTvTyp 0").starts_with("its command 3, PMX_SetTvTyp 0: "));
     EXPECT_EQ("it was saved without the commands that led to it" + tool_test::repeat,
@@ -310,6 +329,32 @@ TEST_F(Restore, ImagesAreComparedByWhatTheyHold)
     std::fstream(file("there/boot.bin"), std::ios::in | std::ios::out).seekp(-1, std::ios::end).put('x');
     EXPECT_NE(std::string::npos, run_here(restore()).find("another state: flash.partitions[0].content becomes "))
         << run_here(restore());
+}
+
+TEST_F(Restore, AnImageIsNoWord)
+{
+    const auto told = [this](const std::string& image, const std::string& instead) {
+        std::filesystem::remove(saved());
+        EXPECT_EQ("", run_here("flash fast_init_param " + image + "\nPMX_Init\n" + save()));
+        std::string changed = content(saved());
+        const std::size_t begin = changed.find("\"image\": ");
+        changed.replace(begin, changed.find('\n', begin) - begin, instead);
+        std::ofstream(saved()) << changed;
+        return run_here(restore());
+    };
+    const std::string file = PMX_SOURCE_DIR "/scenarios/images/boot-576p.bin";
+    EXPECT_EQ("", told(file, "\"image\": \"elsewhere/boot-576p.bin\","));
+    const std::string becomes = "another state: flash.partitions[0].image becomes ";
+    for (const auto& [instead, found] :
+         { std::pair{ "\"image\": \"word 0x14\",", "\"word 0x14\"" }, { "\"image\": 20,", "20" }, { "", "nothing" } })
+    {
+        const std::string said = told(file, instead);
+        EXPECT_NE(std::string::npos, said.find(becomes)) << said;
+        EXPECT_NE(std::string::npos, said.find(", and the file has " + std::string(found) + tool_test::repeat)) << said;
+    }
+    EXPECT_NE(
+        std::string::npos,
+        told("word 20", "\"image\": \"boot.bin\",").find(becomes + "\"word 0x14\", and the file has \"boot.bin\""));
 }
 
 TEST_F(Restore, TheFileMayBeSavedAnew_UnlessSomethingElseReadsIt)

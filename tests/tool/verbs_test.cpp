@@ -207,7 +207,7 @@ TEST(Verbs, WhatLiesFarBack_IsForgotten)
     diagnostics("PMX_Init\nPMX_QueryStatus\n");
     EXPECT_GT(65536 + 2 * board::console_text().size(), kept);
     lines = "PMX_Init\n";
-    for (unsigned i = 0; i < 60; ++i)
+    for (unsigned i = 0; i < 200; ++i)
         lines += "PMX_SetMode 0 RES_720P50HZ 50 0\nPMX_SetMode 0 RES_480P 60 0\n";
     EXPECT_EQ("", diagnostics(lines + "expect call PMX_HalSetMode(0, RES_480P)"));
     EXPECT_GT(std::size_t{ 4'300 }, board::trace::entries().size());
@@ -241,6 +241,13 @@ TEST(Verbs, Ipmx_CallsWithAnotherTag)
 {
     EXPECT_EQ("", diagnostics("PMX_Init\nipmx pi4GetMode 1\nexpect result 0\nexpect out pucMode untouched\n"
                               "ipmx pi4GetMode 0x100\nexpect result 1\nipmx pi4GetMode tag null\nexpect result 0"));
+}
+
+TEST(Verbs, Ipmx_ATableThatCannotBeGivenBack_Fails)
+{
+    EXPECT_EQ("here.pmx:3: the IPMX table cannot be given back: i4ImReleaseInterface answers -5\n"
+              "repeat: pmxboard run here.pmx\n",
+              diagnostics("PMX_Init\nfault i4ImReleaseInterface -5\nipmx pi4GetMode tag"));
 }
 
 TEST(Verbs, Ipmx_WithoutATable_Fails)

@@ -2,11 +2,17 @@
 #include <gtest/gtest.h>
 
 #include <signal.h>
+#include <sys/resource.h>
+#include <sys/time.h>
 #include <unistd.h>
 
+#include <chrono>
+#include <csignal>
 #include <filesystem>
 #include <ostream>
 #include <sstream>
+#include <stdexcept>
+#include <thread>
 
 #include "board/board.h"
 #include "scenario_run.h"
@@ -213,6 +219,70 @@ TEST(Apart, Death_IsReported_WithWhatCameBefore)
     EXPECT_EQ("", killed.answer);
     const auto ended = pmxboard::run_apart([](std::ostream&) -> std::string { _exit(3); });
     EXPECT_EQ("exit code 3", ended.death);
+}
+
+volatile std::sig_atomic_t alarms = 0;
+
+/** While it lives this process is interrupted each millisecond; a copy does not inherit that. */
+class Interrupted
+{
+public:
+    Interrupted()
+    {
+        struct sigaction counts
+        {
+        };
+        counts.sa_handler = [](int) { alarms = 1; };
+        sigaction(SIGALRM, &counts, &m_before);
+        const itimerval often = { { 0, 1000 }, { 0, 1000 } };
+        setitimer(ITIMER_REAL, &often, nullptr);
+    }
+    ~Interrupted()
+    {
+        const itimerval never{};
+        setitimer(ITIMER_REAL, &never, nullptr);
+        sigaction(SIGALRM, &m_before, nullptr);
+    }
+    Interrupted(const Interrupted&) = delete;
+    Interrupted& operator=(const Interrupted&) = delete;
+
+private:
+    struct sigaction m_before
+    {
+    };
+};
+
+TEST(Apart, WhoIsInterrupted_HearsTheCopyToItsEnd)
+{
+    const Interrupted interrupted;
+    const auto apart = pmxboard::run_apart([](std::ostream& shown) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(20));
+        shown << "all of it";
+        return std::string("done");
+    });
+    EXPECT_EQ(1, alarms);
+    EXPECT_EQ("all of it", apart.shown);
+    EXPECT_EQ("done", apart.answer);
+    EXPECT_EQ("", apart.death);
+}
+
+TEST(Apart, WithoutAChannel_ThereIsNoCopy)
+{
+    rlimit before{};
+    ASSERT_EQ(0, getrlimit(RLIMIT_NOFILE, &before));
+    const rlimit none = { 0, before.rlim_max };
+    ASSERT_EQ(0, setrlimit(RLIMIT_NOFILE, &none));
+    std::string said;
+    try
+    {
+        pmxboard::run_apart([](std::ostream&) { return std::string(); });
+    }
+    catch (const std::runtime_error& error)
+    {
+        said = error.what();
+    }
+    setrlimit(RLIMIT_NOFILE, &before);
+    EXPECT_EQ("no channel to a copy of the process: Too many open files", said);
 }
 
 } // namespace

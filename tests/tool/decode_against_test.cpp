@@ -396,6 +396,23 @@ TEST_F(DecodeProgram, ToScenario_SaysWhatTheLogLeavesOpen)
     EXPECT_NE(std::string::npos, run("decode --to-scenario -", "PMX_Stop\n").out.find(low));
 }
 
+TEST_F(DecodeProgram, ToScenario_FindsAgainWhatEarlierCallsLeave)
+{
+    const std::string scenarios[] = {
+        // a partition that is not there
+        "flash fast_init_param off\nPMX_GetHDMIDefaultRes\nPMX_GetHDMIDefaultRes\nPMX_Init\nPMX_Uninit\nPMX_Init\n",
+    };
+    for (const std::string& scenario : scenarios)
+    {
+        std::ofstream(file("first.pmx")) << "power-on\nloglevel 9\n" << scenario;
+        const std::string log = run("run '" + file("first.pmx") + "'").out;
+        std::ofstream(file("made.pmx")) << run("decode --to-scenario -", log).out;
+        const Ended compared = run("decode --against '" + file("made.pmx") + "' -", log);
+        EXPECT_EQ(0, compared.code) << scenario << compared.out << compared.err;
+        EXPECT_EQ(std::string::npos, compared.out.find("it ends")) << scenario << compared.out;
+    }
+}
+
 TEST_F(DecodeProgram, TraceForAViewer_IsRefusedByItsName)
 {
     const Ended ended = run("decode -", "{\"displayTimeUnit\":\"ms\",\"traceEvents\":[\n");

@@ -284,10 +284,11 @@ bool Writer::start(const Lines& call)
     const bool inits = is_start(call);
     const bool ends = line_in(call, "PMX_Uninit") != nullptr;
     const Item* const ends_so = line_in(call, "i4PMX_Uninit u4Case");
-    m_held.no_partition = partition != nullptr && partition->number("i4_id").value_or(0) < 0;
-    if (m_held.no_partition)
+    const bool no_partition = partition != nullptr && partition->number("i4_id").value_or(0) < 0;
+    if (no_partition && !m_held.no_partition)
         say("flash fast_init_param off");
-    else if (boot != nullptr)
+    m_held.no_partition = m_held.no_partition || no_partition;
+    if (boot != nullptr && !m_held.no_partition)
         say("flash fast_init_param word 0x" + boot->value("u4TestData"));
     const bool fails = line_in(call, "Fail to register") != nullptr;
     m_held.registered = (m_held.registered || fails) && !inits;

@@ -399,6 +399,11 @@ TEST_F(DecodeProgram, ToScenario_SaysWhatTheLogLeavesOpen)
 TEST_F(DecodeProgram, ToScenario_FindsAgainWhatEarlierCallsLeave)
 {
     const std::string scenarios[] = {
+        // a registration that stays
+        "PMX_Init\nfault i4ImUnregisterInterface2 -1\nPMX_Uninit\nPMX_Init\nPMX_Stop\n"
+        "i4PmxRegisterIM PMX_COMP_TYPE_PMX 0\n",
+        // one that is refused although nothing is registered
+        "fault i4ImRegisterInterface2 -1\ni4PmxRegisterIM PMX_COMP_TYPE_PMX 0\nPMX_Init\n",
         // a partition that is not there
         "flash fast_init_param off\nPMX_GetHDMIDefaultRes\nPMX_GetHDMIDefaultRes\nPMX_Init\nPMX_Uninit\nPMX_Init\n",
     };

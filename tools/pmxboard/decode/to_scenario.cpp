@@ -292,8 +292,8 @@ bool Writer::start(const Lines& call)
         say("flash fast_init_param word 0x" + boot->value("u4TestData"));
     const bool fails = line_in(call, "Fail to register") != nullptr;
     m_held.registered = (m_held.registered || fails) && !inits;
-    if (fails && (inits || ends || ends_so != nullptr))
-        say(inits ? "fault i4ImRegisterInterface2 -1" : "fault i4ImUnregisterInterface2 -1");
+    if (fails)
+        say(ends || ends_so != nullptr ? "fault i4ImUnregisterInterface2 -1" : "fault i4ImRegisterInterface2 -1");
     if (const Item* const result = line_in(call, "i4PMX_Uninit return");
         result != nullptr && result->number("i4Ret") != 0)
         say("fault x_sema_delete -1");

@@ -398,6 +398,8 @@ TEST_F(DecodeProgram, ToScenario_SaysWhatTheLogLeavesOpen)
 
 TEST_F(DecodeProgram, ToScenario_FindsAgainWhatEarlierCallsLeave)
 {
+    const std::string same_mode =
+        "PMX_SetModeEx 0 [ [0, RES_480I], [1, RES_1080P60HZ], [0, RES_480P], [0, RES_480I] ] 60 DRV_NON_EXT_CHIP 0\n";
     const std::string scenarios[] = {
         // a registration that stays
         "PMX_Init\nfault i4ImUnregisterInterface2 -1\nPMX_Uninit\nPMX_Init\nPMX_Stop\n"
@@ -406,6 +408,8 @@ TEST_F(DecodeProgram, ToScenario_FindsAgainWhatEarlierCallsLeave)
         "fault i4ImRegisterInterface2 -1\ni4PmxRegisterIM PMX_COMP_TYPE_PMX 0\nPMX_Init\n",
         // a partition that is not there
         "flash fast_init_param off\nPMX_GetHDMIDefaultRes\nPMX_GetHDMIDefaultRes\nPMX_Init\nPMX_Uninit\nPMX_Init\n",
+        // a change that only waits along, for the timer runs
+        "display-part never\nPMX_Init\n" + same_mode + same_mode,
     };
     for (const std::string& scenario : scenarios)
     {
@@ -416,6 +420,21 @@ TEST_F(DecodeProgram, ToScenario_FindsAgainWhatEarlierCallsLeave)
         EXPECT_EQ(0, compared.code) << scenario << compared.out << compared.err;
         EXPECT_EQ(std::string::npos, compared.out.find("it ends")) << scenario << compared.out;
     }
+}
+
+TEST_F(DecodeProgram, ToScenario_ADisplayPartThatRaisesWasGivenAResolution)
+{
+    const std::string mode = "SetModeEx\n[PMX] VDP_SetClearVideo & Not Mix OSD..\nDisplay Format Change Timer Set.\n";
+    const std::string raised = "SetModeEx\nDisplay Format Change :1.\n[PMX] VDP_SetClearVideo & Not Mix OSD..\n"
+                               "Display Format Change Timer Set.\n";
+    const std::string start = "[PMX] create a timer \nDisplay Format Change :1.\n";
+    std::ofstream(file("made.pmx")) << run("decode --to-scenario -", start + mode + raised).out;
+    const std::string shown = run("run '" + file("made.pmx") + "'").out;
+    std::size_t count = 0;
+    for (std::size_t at = shown.find("| Display Format Change :1."); at != shown.npos;
+         at = shown.find("| Display Format Change :1.", at + 1))
+        ++count;
+    EXPECT_EQ(2u, count) << content(file("made.pmx")) << shown;
 }
 
 TEST_F(DecodeProgram, TraceForAViewer_IsRefusedByItsName)

@@ -524,19 +524,19 @@ void Writer::display_part(const Call& call, bool sends_hdmi, bool is_full)
     if (plugged != m_held.sink)
         say(plugged ? "sink plug" : "sink unplug");
     m_held.sink = plugged;
-    const bool exists =
-        nobody == nullptr ? is_full || sends_hdmi || !m_held.timer : nobody->value("fgHdmiExist") != "0";
-    const bool requests = exists && !is_full && !sends_hdmi;
-    if (requests != m_held.requests)
-        say(requests ? "sink request-resolution on" : "sink request-resolution off");
-    m_held.requests = requests;
     bool raises = false;
     for (std::size_t place = call.begin + 1; place < call.end; ++place)
     {
         const Item& item = m_log.items[m_log.order[place]];
         raises = raises || (item.text->rule == rules::flag && item.values.front() != "0");
     }
-    if (raises != m_held.raises && (exists || raises))
+    const bool exists =
+        nobody == nullptr ? is_full || sends_hdmi || raises || !m_held.timer : nobody->value("fgHdmiExist") != "0";
+    const bool requests = exists && !is_full && !sends_hdmi;
+    if (requests != m_held.requests)
+        say(requests ? "sink request-resolution on" : "sink request-resolution off");
+    m_held.requests = requests;
+    if (exists && raises != m_held.raises)
     {
         say(raises ? "display-part never" : "display-part off");
         m_held.raises = raises;

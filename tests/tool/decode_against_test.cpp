@@ -208,6 +208,37 @@ TEST(DecodeAgainst, ALongLog_IsComparedToItsEnd)
     EXPECT_EQ(6001u, found.departure->count);
 }
 
+TEST(DecodeAgainst, AnAssertion_AgreesByExpressionAndFile)
+{
+    const std::vector<Expected> expected = run_for_texts(PMX_SOURCE_DIR "/scenarios/os-failures-at-start.pmx", "");
+    std::string log;
+    for (const Expected& one : expected)
+    {
+        const bool is_assertion = one.item.text->level == level_assertion;
+        log += is_assertion ? "ASSERT " + std::string(one.item.text->format) + ", src/driver/pmx/" +
+                                  one.item.value("file") + ":" + one.item.value("line") + "\n"
+                            : one.item.shown + "\n";
+    }
+    const std::string timer = "hPMXTimer)==OSR_OK";
+    const std::size_t behind = log.find(timer) + timer.size();
+    ASSERT_NE(std::string::npos, log.find(timer));
+    const std::size_t length = log.find('\n', behind) - behind;
+    const auto departs = [&](const std::string& place) {
+        return compare(read_log(std::string(log).replace(behind, length, place)), expected, 9).departure;
+    };
+    EXPECT_FALSE(departs(log.substr(behind, length)));
+    EXPECT_FALSE(departs(", src/driver/pmx/pmx_lifecycle.cpp:1")) << "code may move";
+    EXPECT_FALSE(departs(""));
+    const auto departure = departs(", src/driver/pmx/pmx_port.cpp:1");
+    ASSERT_TRUE(departure);
+    EXPECT_EQ(Departure::Kind::Value, departure->kind);
+    ASSERT_EQ(2u, departure->values.size());
+    EXPECT_EQ("file", departure->values[0].name);
+    EXPECT_EQ("pmx_lifecycle.cpp", departure->values[0].expected);
+    EXPECT_EQ("pmx_port.cpp", departure->values[0].found);
+    EXPECT_NE("", departure->values[1].expected) << "the line of the scenario's assertion";
+}
+
 using DecodeProgram = ProgramRun;
 
 constexpr const char* compare_input = "decode --against scenarios/first-mode-after-boot.pmx -";

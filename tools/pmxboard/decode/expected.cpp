@@ -21,7 +21,8 @@ std::optional<std::string> printed(const board::TraceEntry& entry)
         return entry.text;
     if (entry.kind != board::TraceEntry::Kind::Assert)
         return {};
-    return "ASSERT " + entry.arguments[0].value.string() + ", " + entry.arguments[1].value.string();
+    return "ASSERT " + entry.arguments[0].value.string() + ", " + entry.arguments[1].value.string() + ":" +
+           entry.arguments[2].value.to_text();
 }
 
 /** What the lines of a scenario make the layer print. */

@@ -161,9 +161,7 @@ Departure Alignment::departure(std::size_t i, std::size_t j) const
     const auto are_same = [&](std::size_t one, std::size_t other) {
         return one < m_found.size() && other < m_expected.size() && same(m_expected[other]->item, *m_found[one]);
     };
-    const Cost extra = cost_of_extra(*m_found[i]);
     const bool is_missing = at(i, j) == at(i, j + 1) + cost_missing;
-    const bool is_extra = at(i, j) == at(i + 1, j) + extra;
     if (at(i, j) == pair(i, j))
     {
         found.kind = Departure::Kind::Value;
@@ -173,8 +171,7 @@ Departure Alignment::departure(std::size_t i, std::size_t j) const
     {
         found.kind = Departure::Kind::Swapped;
     }
-    else if ((is_missing && at(i, j + 1) == at(i + 1, j + 1) + extra) ||
-             (is_extra && at(i + 1, j) == at(i + 1, j + 1) + cost_missing))
+    else if (at(i, j) == at(i + 1, j + 1) + cost_missing + cost_of_extra(*m_found[i]))
     {
         found.kind = Departure::Kind::Different;
     }

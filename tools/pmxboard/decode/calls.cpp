@@ -334,8 +334,7 @@ Places Grammar::matching(const Places& of, const Item& item) const
 
 Places Grammar::every(const Item& item) const
 {
-    const auto found = m_by_text.find(item.text);
-    return found == m_by_text.end() ? Places() : matching(found->second, item);
+    return matching(m_by_text.at(item.text), item);
 }
 
 Places Grammar::follow(const Places& at) const
@@ -437,24 +436,10 @@ private:
     std::vector<Running> m_running; ///< the one that printed last at the end
     Calls m_calls;
     std::size_t m_before = 0; ///< place of the line before that some call prints in a known order
-    bool m_goes_on = false;   ///< the line that was taken is not the first of its call
+    bool m_goes_on = false;   ///< the line that is looked at is known as not the first of its call
     bool m_anywhere = true;   ///< the next line may stand in the middle of a call: the capture begins there
     bool m_outer = true;      ///< a call may have been running there that has printed nothing since
 };
-
-/** What is missing at one place is one gap. */
-void join_gaps(std::vector<Gap>& gaps)
-{
-    std::vector<Gap> joined;
-    for (Gap& gap : gaps)
-    {
-        if (!joined.empty() && joined.back().at == gap.at && joined.back().is_end == gap.is_end)
-            joined.back().what += "; " + gap.what;
-        else
-            joined.push_back(std::move(gap));
-    }
-    gaps = std::move(joined);
-}
 
 void Follower::tell_gap(std::size_t place, std::string what)
 {
@@ -476,14 +461,13 @@ void Follower::look(std::size_t place)
     const Item& one = item(place);
     m_anywhere = m_anywhere && one.text->is_assertion();
     m_outer = m_outer && !one.text->format.starts_with(reset);
-    const bool goes_on = m_goes_on && !m_running.empty() && m_running.back().last == place;
     if (auto missing = m_knowledge.take_time(one.moment))
         tell_gap(place, std::move(*missing));
-    if (auto missing = m_knowledge.take(one, goes_on, is_in_mode_change()))
+    if (auto missing = m_knowledge.take(one, m_goes_on, is_in_mode_change()))
     {
-        const bool of_line_before = one.text->rule == rules::osd_flag && place != 0; // which could not have been so
+        const bool of_line_before = one.text->rule == rules::osd_flag; // which could not have been so
         tell_gap(place - (of_line_before ? 1 : 0), std::move(*missing));
-        m_knowledge.take(one, goes_on, is_in_mode_change());
+        m_knowledge.take(one, m_goes_on, is_in_mode_change());
     }
 }
 
@@ -513,6 +497,7 @@ Calls Follower::follow()
         }
         boot = one.boot;
         take_level(one.text->level);
+        m_goes_on = false;
         if (one.cut != Item::Cut::None)
             begin_anywhere(); // it may be any of several
         else if (m_grammar->knows(one))
@@ -535,7 +520,6 @@ Calls Follower::follow()
     give_up_all();
     std::stable_sort(m_calls.gaps.begin(), m_calls.gaps.end(),
                      [](const Gap& one, const Gap& other) { return one.at < other.at; });
-    join_gaps(m_calls.gaps);
     return std::move(m_calls);
 }
 

@@ -120,12 +120,6 @@ bool is_before_seconds(std::string_view before)
            (last == 0 || before[last - 1] == ' ' || before[last - 1] == '>');
 }
 
-/** Whether a second stamp tells the time better. A whole number beside a clock is something else. */
-bool is_finer(const Stamp& found, const Stamp& finest)
-{
-    return !finest.seconds || (found.decimals >= finest.decimals && (found.decimals != 0 || found.clock == Clock::Day));
-}
-
 /** The trace of `pmxboard run` shows a text in quotes, with its line end written out. */
 void unquote_trace(std::string& line)
 {
@@ -173,7 +167,7 @@ Stamp stamp_of(std::string_view lead)
         if (!found && is_before_seconds(before))
             found = seconds_at(number);
         at += found ? found->text.size() : digits_in(number);
-        if (found && is_finer(*found, finest))
+        if (found && found->decimals >= finest.decimals)
             finest = std::move(*found);
     }
     return finest;

@@ -38,12 +38,10 @@ struct Whole
     Match match;
 };
 
-/** The longest text that stands whole at the beginning. */
+/** The longest text that stands whole at the beginning of a line that has one. */
 Whole longest_at_begin(std::string_view line)
 {
     Whole best;
-    if (line.empty())
-        return best;
     for (const Pattern* const pattern : patterns_of(line.front()))
     {
         if (!line.starts_with(pattern->lead))
@@ -74,13 +72,13 @@ Whole find_at(std::string_view line, std::size_t from, std::size_t at)
 /** The assertion of a source file whose expression stands before the file's name; else the file itself. */
 const Text& assertion_of(const Text& file, std::string_view lead)
 {
+    const std::string padded = " " + std::string(lead) + " ";
     for (const Text& text : texts())
     {
-        const std::size_t stands = lead.rfind(text.format);
-        if (text.level != level_assertion || text.file != file.file || stands == lead.npos)
+        const std::size_t stands = padded.rfind(text.format);
+        if (text.level != level_assertion || text.file != file.file || stands == padded.npos)
             continue;
-        const std::size_t end = stands + text.format.size();
-        if ((stands == 0 || !is_word(lead[stands - 1])) && (end == lead.size() || !is_word(lead[end])))
+        if (!is_word(padded[stands - 1]) && !is_word(padded[stands + text.format.size()]))
             return text;
     }
     return file;

@@ -127,8 +127,8 @@ Match match(std::string_view format, std::string_view line)
         }
         if (conversion == 0)
             ++found.literal;
-        else if (found.count < found.values.size())
-            found.values[found.count++] = board::tokens::trim(rest.substr(0, length));
+        else
+            found.values.at(found.count++) = board::tokens::trim(rest.substr(0, length));
         found.end += length;
         format.remove_prefix(std::max<std::size_t>(conversion, 1));
     }

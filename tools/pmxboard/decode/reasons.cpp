@@ -161,7 +161,7 @@ bool goes_behind_a_return(const Item& item, const CallSoFar& call)
 /** One-mode setting sets up colours when it programs a mode, and only then. */
 bool sets_one_mode(const Item&, const CallSoFar& call)
 {
-    return call.operation() == "PMX_SetMode" && !call.is_first();
+    return call.operation() == "PMX_SetMode";
 }
 
 /** Which output a line of a request is of. */

@@ -40,7 +40,6 @@ public:
 
     /* What the rows of reasons ask. */
     std::string_view operation() const { return m_operation; }
-    bool is_first() const { return m_before == nullptr; }
     bool is_behind(std::string_view text) const
     {
         return m_before != nullptr && m_before->text->format.starts_with(text);

@@ -92,7 +92,7 @@ StatusReport::Fields* StatusReport::group(const Item& item)
     const auto has_part = [&](std::string_view part) { return item.text->format.find(part) != std::string_view::npos; };
     const auto index = static_cast<std::size_t>(item.number("i").value_or(-1));
     if (is_order_line(item))
-        return &m_order;
+        return index < m_ports.size() ? &m_order : nullptr;
     if (has_part("arPortInfo"))
         return index < m_ports.size() ? &m_ports[index] : nullptr;
     if (has_part("arOutputConf"))
@@ -103,7 +103,7 @@ StatusReport::Fields* StatusReport::group(const Item& item)
 bool StatusReport::wants(const Item& item)
 {
     const Fields* const fields = group(item);
-    if (fields == nullptr || m_lines == 0)
+    if (fields == nullptr)
         return true;
     if (item.text->format.starts_with("Mode("))
         return false;
@@ -119,14 +119,12 @@ bool StatusReport::wants(const Item& item)
 
 void StatusReport::add(const Item& item)
 {
-    ++m_lines;
     Fields* const fields = group(item);
-    if (fields == nullptr || item.cut != Item::Cut::None)
+    if (fields == nullptr)
         return;
     if (is_order_line(item))
     {
-        if (const auto position = item.number("i"); position && *position >= 0 && *position < 8)
-            (*fields)[item.value("i")] = item.value("aucPlaneOrder");
+        (*fields)[item.value("i")] = item.value("aucPlaneOrder");
         return;
     }
     m_external_line = m_external_line || has(item.text->values, "rDrvExtScl");

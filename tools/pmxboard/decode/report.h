@@ -48,7 +48,6 @@ private:
     void tell_outputs(std::vector<std::string>& lines) const;
     static std::string mode_of(const Fields& output);
 
-    std::size_t m_lines = 0;
     bool m_external_line = false;
     Fields m_record;
     Fields m_order; ///< by position

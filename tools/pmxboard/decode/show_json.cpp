@@ -64,7 +64,7 @@ Json values_of(const Item& item)
 {
     Json values = Json::object();
     const std::vector<std::string_view> names = split(item.text->values);
-    for (std::size_t i = 0; i < names.size() && i < item.values.size() && item.cut == Item::Cut::None; ++i)
+    for (std::size_t i = 0; i < item.values.size(); ++i)
     {
         const auto number = number_of(item.values[i]);
         values[std::string(names[i])] = number ? Json(*number) : Json(item.values[i]);

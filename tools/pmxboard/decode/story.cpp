@@ -119,8 +119,7 @@ void Teller::open(const Item& item, std::vector<std::string_view> operations, st
 
 void Teller::join(const Item& item, std::string detail)
 {
-    if (joins(item))
-        std::erase_if(candidates, [&](std::string_view one) { return !has(item.text->operations, one); });
+    std::erase_if(candidates, [&](std::string_view one) { return !has(item.text->operations, one); });
     event().first_line = std::min(event().first_line, item.line);
     event().lines.push_back(item.line);
     event().last_line = std::max(event().last_line, item.last_line);
@@ -196,7 +195,7 @@ bool Teller::is_next(Rule rule) const
 /** Whether so much time lies before an item that it was another call. */
 bool Teller::is_later(const Item& item) const
 {
-    const std::optional<double> passed = index == 0 ? std::nullopt : between(at(index - 1).moment, item.moment);
+    const std::optional<double> passed = between(at(index - 1).moment, item.moment);
     return passed && *passed > one_call + item.moment->exact;
 }
 

@@ -112,7 +112,7 @@ struct Held
     bool first = true;     ///< no mode was set
     std::string format;    ///< of the mixer
     std::string hdmi;      ///< what was asked for
-    int frequency = 60;
+    std::int64_t frequency = 60;
     bool external = false;
     bool on_top = false;
     int bar = 0;
@@ -457,14 +457,10 @@ bool Writer::order(const Lines& call)
 }
 
 /** The frequency of a mode's name, which a caller mostly asks for. */
-int frequency_of(const std::string& mode, int usual)
+std::int64_t frequency_of(const std::string& mode, std::int64_t usual)
 {
-    constexpr std::int64_t most = 255;
     const std::string refresh = refresh_of(mode);
-    const auto whole = number_of(std::string_view(refresh).substr(0, refresh.find('.')));
-    if (whole && *whole > 0 && *whole <= most)
-        return static_cast<int>(*whole);
-    return mode.find("576") != mode.npos ? 50 : mode.find("480") != mode.npos ? 60 : usual;
+    return number_of(std::string_view(refresh).substr(0, refresh.find('.'))).value_or(usual);
 }
 
 bool Writer::one_mode(const Lines& call)
@@ -473,7 +469,7 @@ bool Writer::one_mode(const Lines& call)
         return false;
     const std::string mode = call.front()->value("eResMode");
     const bool is_set = line_in(call, "Mode(%d), ") != nullptr;
-    int frequency = frequency_of(mode, m_held.frequency);
+    std::int64_t frequency = frequency_of(mode, m_held.frequency);
     if (is_set && !m_held.first && mode == m_held.format && frequency == m_held.frequency)
         frequency = frequency == 60 ? 59 : 60;
     say(mode.starts_with("RES_") ? "PMX_SetMode 0 " + mode + " " + std::to_string(frequency) + " 0"
@@ -518,9 +514,7 @@ std::string Writer::requested(const Lines& call, std::string& format, std::strin
 void Writer::display_part(const Call& call, bool sends_hdmi, bool is_full)
 {
     const Item* const nobody = line_in(call.lines, "[PMX] fgHdmiExist");
-    const bool sink = nobody == nullptr || (nobody->value("fgHdmiExist") == "0" && !m_held.timer && !m_held.sink);
-    const bool plugged =
-        nobody == nullptr || (nobody->value("fgHdmiExist") == "0" ? !m_held.timer && m_held.sink : sink);
+    const bool plugged = nobody == nullptr || (nobody->value("fgHdmiExist") == "0" && !m_held.timer && m_held.sink);
     if (plugged != m_held.sink)
         say(plugged ? "sink plug" : "sink unplug");
     m_held.sink = plugged;
@@ -552,7 +546,7 @@ bool Writer::mode_change(const Call& call)
     const std::string outputs = requested(call.lines, format, hdmi);
     const bool is_full = line_in(call.lines, "Adjust PMX") != nullptr;
     const bool is_refused = line_in(call.lines, "[PMX] PMX_SetModeEx, PMX_CheckCap") != nullptr;
-    int frequency = is_full || is_refused ? frequency_of(format, m_held.frequency) : m_held.frequency;
+    std::int64_t frequency = is_full || is_refused ? frequency_of(format, m_held.frequency) : m_held.frequency;
     bool external = m_held.external;
     if (is_full && !m_held.first && format == m_held.format && frequency == m_held.frequency)
     {

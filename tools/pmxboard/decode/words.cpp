@@ -62,10 +62,10 @@ std::string hex_words(const std::string& printed)
 /** What feeds each plane in a packed order, plane 1 first: `0 1 2 3 4 5 6 7`. */
 std::string sources_words(const std::string& hex)
 {
-    const auto order = number_of(hex, 16);
+    const auto order = static_cast<std::uint32_t>(number_of(hex, 16).value_or(0));
     std::vector<std::string> sources;
-    for (unsigned plane = 0; order && plane < 8; ++plane)
-        sources.push_back(std::to_string(*order >> (4 * plane) & 7));
+    for (unsigned plane = 0; plane < 8; ++plane)
+        sources.push_back(std::to_string(order >> (4 * plane) & 7));
     return joined(sources, " ");
 }
 

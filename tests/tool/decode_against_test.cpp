@@ -1,10 +1,12 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include <algorithm>
+#include <sstream>
 
 #include <gtest/gtest.h>
 
 #include "program_run.h"
 #include "tools/pmxboard/decode/against.h"
+#include "tools/pmxboard/decode/show.h"
 
 namespace
 {
@@ -208,6 +210,80 @@ TEST(DecodeAgainst, ALongLog_IsComparedToItsEnd)
     EXPECT_EQ(6001u, found.departure->count);
 }
 
+struct CutLog
+{
+    const char* what;
+    std::string log;
+    std::size_t skipped;
+    std::size_t agreeing;
+};
+
+TEST(DecodeAgainst, CutLines_AgreeAsFarAsTheyGoOrAreLeftOut)
+{
+    const std::string log = captured();
+    const std::string whole = "PMX Finished to set OSD Display mode.";
+    const std::string begin = "PMX Finished to set OSD Di";
+    const std::string end = "hed to set OSD Display mode.\n";
+    const CutLog cases[] = {
+        { "end is missing", with(log, whole, begin), 0, 20 },
+        { "begin is missing", end + log.substr(begin_of(log, 20)), 14, 6 },
+        { "end of several is missing", with(log, "Scaler CC enable, 709->601", "Scaler CC "), 0, 20 },
+        { "begin of several is missing", "able, 709->601\n" + log.substr(begin_of(log, 26)), 18, 2 },
+        { "begin of what stands there whole", with_line(log, 19, begin + "\n" + line_of(log, 19)), 0, 20 },
+        { "end of what stands nowhere there", end + log, 0, 20 },
+        { "begin of what stands nowhere there", with_line(log, 18, "CC_A enable, 601->7\n" + line_of(log, 18)), 0, 20 },
+    };
+    for (const CutLog& one : cases)
+    {
+        const Comparison found = against(one.log);
+        EXPECT_FALSE(found.departure) << one.what;
+        EXPECT_EQ(one.skipped, found.skipped) << one.what;
+        EXPECT_EQ(one.agreeing, found.agreeing) << one.what;
+    }
+    const Comparison found = against(with_line(with(log, whole, begin), 18, ""));
+    ASSERT_TRUE(found.departure);
+    EXPECT_EQ(Departure::Kind::Missing, found.departure->kind);
+    EXPECT_EQ("PMX Start to set OSD Display mode:12.", found.departure->expected->item.shown);
+    EXPECT_EQ(begin, found.departure->found.shown);
+    EXPECT_TRUE(found.further.empty());
+}
+
+TEST(DecodeAgainst, ALineThatStandsTooEarly_IsTooManyThereAndMissingLater)
+{
+    const std::string log = with_line(captured(), 24, "");
+    const Comparison found = against(with_line(log, 18, "CC_A disable\n" + line_of(log, 18)));
+    ASSERT_TRUE(found.departure);
+    EXPECT_EQ(Departure::Kind::Extra, found.departure->kind);
+    EXPECT_EQ(18u, found.departure->found.line);
+    ASSERT_EQ(1u, found.further.size());
+    EXPECT_EQ(Departure::Kind::Missing, found.further[0].kind);
+    EXPECT_EQ("CC_A disable", found.further[0].expected->item.shown);
+}
+
+TEST(DecodeAgainst, AtTheEndOfEitherSide_NothingIsSwapped)
+{
+    const std::string log = captured();
+    const Comparison missing = against(with_line(log.substr(0, begin_of(log, 25)), 22, ""));
+    ASSERT_TRUE(missing.departure);
+    EXPECT_EQ(Departure::Kind::Missing, missing.departure->kind);
+    EXPECT_EQ("Mode(12), eMixerOutCS(1)", missing.departure->expected->item.shown);
+    const Comparison other = against(with(log, "[PMX] fgPMX_DisplayModeReady is 0.", "PMX_Stop"));
+    ASSERT_TRUE(other.departure);
+    EXPECT_EQ(Departure::Kind::Extra, other.departure->kind);
+    EXPECT_EQ("PMX_Stop", other.departure->found.shown);
+    EXPECT_EQ(1u, other.left);
+}
+
+TEST(DecodeAgainst, MissingLinesWithOneThatAgreesBetween_AreTwoDepartures)
+{
+    const Comparison found = against(with_line(with_line(captured(), 14, ""), 12, ""));
+    ASSERT_TRUE(found.departure);
+    EXPECT_EQ(1u, found.departure->count);
+    ASSERT_EQ(1u, found.further.size());
+    EXPECT_EQ(1u, found.further[0].count);
+    EXPECT_EQ("CCIR(0, 0, 0, 0)", found.further[0].expected->item.shown);
+}
+
 TEST(DecodeAgainst, AnAssertion_AgreesByExpressionAndFile)
 {
     const std::vector<Expected> expected = run_for_texts(PMX_SOURCE_DIR "/scenarios/os-failures-at-start.pmx", "");
@@ -237,6 +313,80 @@ TEST(DecodeAgainst, AnAssertion_AgreesByExpressionAndFile)
     EXPECT_EQ("pmx_lifecycle.cpp", departure->values[0].expected);
     EXPECT_EQ("pmx_port.cpp", departure->values[0].found);
     EXPECT_NE("", departure->values[1].expected) << "the line of the scenario's assertion";
+}
+
+/** Blanks and ends of lines, however long the line was, are one blank. */
+std::string flowing(const std::string& text)
+{
+    std::string words;
+    for (const char c : text)
+    {
+        if (c != ' ' && c != '\n')
+            words += c;
+        else if (!words.ends_with(' '))
+            words += ' ';
+    }
+    return words;
+}
+
+std::string times(std::size_t count, const std::string& line)
+{
+    std::string lines;
+    for (; count > 0; --count)
+        lines += line;
+    return lines;
+}
+
+TEST(DecodeAgainst, LongDepartures_AreComparedPieceByPiece)
+{
+    const std::string log = "PMX_Init\nPMX_Stop\nPMX_Init\n" + times(240, "VDP_2 Disabled\n");
+    std::vector<Expected> expected;
+    const auto print = [&](std::size_t count, const std::string& text) {
+        expected.insert(expected.end(), count, Expected{ *read_text(text), "", 1, "" });
+    };
+    for (const char* const text : { "PMX_Init", "PMX_Stop", "PMX_Init" })
+        print(1, text);
+    print(240, "VDP_1 Disabled");
+    const Comparison alike = compare(read_log(log), expected, 9);
+    EXPECT_EQ(239u, alike.further.size());
+    EXPECT_EQ(0u, alike.left);
+    print(20, "PMX_Stop");
+    print(1, "Mute Enable");
+    print(100, "PMX_Stop");
+    // What the log ends with comes later than what is looked at together.
+    const Comparison found = compare(read_log(log + "Mute Enable\n"), expected, 9);
+    EXPECT_EQ(3u, found.agreeing);
+    ASSERT_EQ(240u, found.further.size());
+    EXPECT_EQ(Departure::Kind::Value, found.further[238].kind);
+    EXPECT_EQ(Departure::Kind::Missing, found.further[239].kind);
+    EXPECT_EQ(20u, found.further[239].count);
+    EXPECT_EQ(1u, found.agreeing_behind);
+    EXPECT_EQ(100u, found.left);
+}
+
+TEST(DecodeAgainst, BehindAThousandDepartures_NoneIsLookedFor)
+{
+    const Log log = read_log(times(1001, "VDP_2 Disabled\n"));
+    const std::vector<Expected> expected(1001, Expected{ *read_text("VDP_1 Disabled"), "", 1, "" });
+    const Comparison found = compare(log, expected, 9);
+    EXPECT_EQ(999u, found.further.size());
+    std::ostringstream shown;
+    show_comparison(shown, found, {});
+    EXPECT_NE(std::string::npos, flowing(shown.str()).find("; further ones are not looked for")) << shown.str();
+    std::ostringstream json;
+    show_json(json, log, tell(log), found, "log");
+    EXPECT_NE(std::string::npos, json.str().find(R"("whole":0)"));
+}
+
+TEST(DecodeAgainst, WhatIsPrintedByItself_IsOfTheOperationThatPrintsIt)
+{
+    Departure missing;
+    missing.kind = Departure::Kind::Missing;
+    for (const char* const running : { "", "PMX_Stop" })
+    {
+        missing.expected = Expected{ *read_text("PMX timeout."), running, 7, "advance 10s" };
+        EXPECT_EQ("_PMX_TmrIsr", operation_of(missing)) << running;
+    }
 }
 
 using DecodeProgram = ProgramRun;
@@ -297,20 +447,6 @@ TEST_F(DecodeProgram, WhatScenariosPrint_DoesNotDepartFromThem)
     }
 }
 
-/** Blanks and ends of lines, however long the line was, are one blank. */
-std::string flowing(const std::string& text)
-{
-    std::string words;
-    for (const char c : text)
-    {
-        if (c != ' ' && c != '\n')
-            words += c;
-        else if (!words.ends_with(' '))
-            words += ' ';
-    }
-    return words;
-}
-
 TEST_F(DecodeProgram, APieceOfALog_IsToldWithWhatIsLeftOut)
 {
     const std::string log = captured();
@@ -350,6 +486,27 @@ TEST_F(DecodeProgram, ManyDepartures_AreShownUpToANumber)
     EXPECT_NE(std::string::npos, flowing(shown).find("42 departures: 42 of other values; 47 lines agree; --verbose"))
         << shown.substr(shown.size() - 200);
     EXPECT_EQ(41u, departures(run(compare + " -v", log).out));
+}
+
+TEST_F(DecodeProgram, ALogOfPlainLinesAlone_HasNoLevel)
+{
+    const std::string log = line_of(captured(), 4) + line_of(captured(), 5) + line_of(captured(), 6);
+    const std::string agreement = flowing(run(compare_input, log).out);
+    EXPECT_NE(std::string::npos, agreement.find("agreement 3 lines agree, from line 1 of the log to line 3 "))
+        << agreement;
+    const std::string summary = run("decode -", log).out;
+    EXPECT_EQ(0u, summary.find("standard input: 3 lines, 3 texts of the mixer layer, 0 foreign\n")) << summary;
+}
+
+TEST_F(DecodeProgram, WhatIsAssumed_IsShown)
+{
+    const std::string shown =
+        flowing(run("decode -", "[PMX] VDP_SetClearVideo & Not Mix OSD..\nDisplay Format Change Timer Set.\n"
+                                "HD Exist(1)\nDisplay Format Change :0.\nSet Osd Enable :1.\nPMX_SetOsdEnable.\n"
+                                "Set Osd Enable :0.\n")
+                    .out);
+    EXPECT_NE(std::string::npos, shown.find("assumed, for lines are missing: graphics are mixed again, after line 1 "))
+        << shown;
 }
 
 TEST_F(DecodeProgram, Departures_OfSeveralLinesAndBehindTheEnd)
@@ -432,6 +589,10 @@ TEST_F(DecodeProgram, ToScenario_FindsAgainWhatEarlierCallsLeave)
     const std::string same_mode =
         "PMX_SetModeEx 0 [ [0, RES_480I], [1, RES_1080P60HZ], [0, RES_480P], [0, RES_480I] ] 60 DRV_NON_EXT_CHIP 0\n";
     const std::string scenarios[] = {
+        // the frequency of a mode that is set again
+        "PMX_Init\nPMX_SetMode 0 RES_480P 60 0\nPMX_SetMode 0 RES_480P 59 0\nPMX_SetMode 0 RES_480P 60 0\n"
+        "PMX_SetMode 0 RES_576P 50 0\nPMX_SetMode 0 RES_576P 60 0\n"
+        "PMX_SetModeEx 0 [ [0, RES_480I], [1, RES_576P], [0, RES_480P], [0, RES_480I] ] 50 DRV_NON_EXT_CHIP 0\n",
         // a registration that stays
         "PMX_Init\nfault i4ImUnregisterInterface2 -1\nPMX_Uninit\nPMX_Init\nPMX_Stop\n"
         "i4PmxRegisterIM PMX_COMP_TYPE_PMX 0\n",
@@ -439,8 +600,13 @@ TEST_F(DecodeProgram, ToScenario_FindsAgainWhatEarlierCallsLeave)
         "fault i4ImRegisterInterface2 -1\ni4PmxRegisterIM PMX_COMP_TYPE_PMX 0\nPMX_Init\n",
         // a partition that is not there
         "flash fast_init_param off\nPMX_GetHDMIDefaultRes\nPMX_GetHDMIDefaultRes\nPMX_Init\nPMX_Uninit\nPMX_Init\n",
+        // a sink that wants its resolution again, of a display part that takes no notice
+        "PMX_Init\n" + same_mode + "sink request-resolution on\n" + same_mode,
         // a change that only waits along, for the timer runs
         "display-part never\nPMX_Init\n" + same_mode + same_mode,
+        // a sink that goes while the timer runs, and stays away
+        "display-part never\nPMX_Init\n" + same_mode + "sink unplug\n" + same_mode +
+            "PMX_SetFormatChangeFlag 0\nadvance 11s\n" + same_mode + same_mode,
     };
     for (const std::string& scenario : scenarios)
     {
@@ -466,6 +632,22 @@ TEST_F(DecodeProgram, ToScenario_ADisplayPartThatRaisesWasGivenAResolution)
          at = shown.find("| Display Format Change :1.", at + 1))
         ++count;
     EXPECT_EQ(2u, count) << content(file("made.pmx")) << shown;
+}
+
+TEST_F(DecodeProgram, ToScenario_LinesFromWithinACall)
+{
+    const std::string held = "[PMX] VDP_SetClearVideo & Not Mix OSD..\nDisplay Format Change Timer Set.\n";
+    const std::string lowered =
+        "Display Format Change :0.\nSet Osd Enable :1.\nPMX_SetOsdEnable.\nSet Osd Enable :0.\n";
+    const std::string made = run("decode --to-scenario -", "[PMX] create a timer \nSetModeEx\n" + lowered + held).out;
+    EXPECT_NE(std::string::npos,
+              made.find("# from within the call above, between its lines\nPMX_SetFormatChangeFlag 0\n"))
+        << made;
+    const std::string begin = "ASSERT i4Ret == OSR_OK, src/driver/pmx/pmx_lifecycle.cpp:9\n"
+                              "Fail to register IID_IPMX of PMX Comp 0\n[PMX] create a timer \n";
+    const std::string start = run("decode --to-scenario -", begin).out;
+    EXPECT_NE(std::string::npos, start.find("fault i4ImRegisterInterface2 -1\nPMX_Init\n")) << start;
+    EXPECT_EQ(std::string::npos, start.find("i4PmxRegisterIM")) << start;
 }
 
 TEST_F(DecodeProgram, TraceForAViewer_IsRefusedByItsName)

@@ -38,7 +38,7 @@ TEST(DecodeClean, TimeStampsAreReadWhateverTheirForm)
     EXPECT_EQ("5.25", stamp_of("(  5.25) PMX_Init").text);
     EXPECT_EQ("", stamp_of("HDMI(1, RES_480I)").text);
     for (const char* other : { "x1.12:34:56", "112:34:56", "12:34:5", "v 5.25 x", "[5.25x]", "[5.]",
-                               "12:34:", "ab:34:56", "12:ab:56", "12:34:ab" })
+                               "12:34:", "ab:34:56", "1x:34:56", "12:ab:56", "12:34:ab" })
         EXPECT_EQ("", stamp_of(other).text) << other;
 }
 

@@ -61,7 +61,8 @@ TEST(DecodeLog, Level_IsTheHighestThatShows)
 
 TEST(DecodeLog, ForeignLines_AreNotTaken)
 {
-    for (const char* const line : { "player: calling SetModeEx again", "my_PMX_Initialise", "mode 0", "" })
+    for (const char* const line : { "player: calling SetModeEx again", "my_PMX_Initialise", "mode 0", "",
+                                    "cc: src/driver/pmx/pmx_mode.cpp: no such file" })
         EXPECT_TRUE(read_log(line).items.empty()) << line;
 }
 
@@ -103,6 +104,48 @@ TEST(DecodeLog, Assertion_IsKnownByExpressionAndFile)
     ASSERT_TRUE(nought);
     EXPECT_EQ("0", nought->text->format);
     EXPECT_EQ("0, pmx_colour.cpp", nought->shown);
+}
+
+TEST(DecodeLog, AnAssertionOfAnUnknownExpression_IsKnownByItsFileAlone)
+{
+    for (const char* const expression : { "fgMine", "i == 10", "i == 0x1" }) // and not by the 0 within a number
+    {
+        const auto one = read_text("ASSERT " + std::string(expression) + ", src/driver/pmx/pmx_colour.cpp:12");
+        ASSERT_TRUE(one) << expression;
+        EXPECT_EQ(level_file, one->text->level) << expression;
+        EXPECT_EQ("src/driver/pmx/pmx_colour.cpp", one->shown) << expression;
+        EXPECT_EQ((std::vector<std::string>{ "pmx_colour.cpp", "12" }), one->values) << expression;
+    }
+}
+
+TEST(DecodeLog, AFile_BelongsToTheExpressionOfItsOwnLine)
+{
+    const Log log = read_log("ASSERT x_sema_unlock(MutexPMX) == OSR_OK, src/dr\n"
+                             "ASSERT 0, src/driver/pmx/pmx_colour.cpp:12\n"
+                             "ASSERT 0, src/driver/pmx/pmx_colour.cpp:13 ASSERT 0, src/driver/pmx/pmx_source.cpp:14\n");
+    ASSERT_EQ(4u, log.items.size());
+    EXPECT_TRUE(log.items[0].values.empty());
+    EXPECT_EQ((std::vector<std::string>{ "pmx_colour.cpp", "12" }), log.items[1].values);
+    EXPECT_EQ((std::vector<std::string>{ "pmx_colour.cpp", "13" }), log.items[2].values);
+    EXPECT_EQ((std::vector<std::string>{ "pmx_source.cpp", "14" }), log.items[3].values);
+    EXPECT_EQ("0, pmx_source.cpp", log.items[3].shown);
+}
+
+TEST(DecodeLog, OnlyTheSameAgain_StandsTwice)
+{
+    EXPECT_EQ(1u, read_log("[    1.000001] Inform Vdp CS(0)\n[    1.000001] Inform Vdp CS(0)\n").twice);
+    EXPECT_EQ(0u, read_log("[    1.000001] Inform Vdp CS(0)\n[    1.000001] Inform Vdp CS(1)\n").twice);
+    EXPECT_EQ(0u, read_log("[    1.000001] Inform Vdp CS(0) Inform Vdp CS(0)\n").twice);
+}
+
+TEST(DecodeLog, ALine_PassesNoMoreThanABufferHolds)
+{
+    std::string younger;
+    for (int i = 10; i < 50; ++i)
+        younger += "[   10." + std::to_string(i) + "0000] PMX_Stop\n";
+    const Log log = read_log(younger + "[   10.000000] PMX_Stop\n");
+    EXPECT_EQ(1u, log.displaced);
+    EXPECT_EQ(40u, log.order[40 - 32]);
 }
 
 TEST(DecodeLog, Printable_HasNoControlCharactersAndIsShortened)

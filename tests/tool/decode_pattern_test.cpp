@@ -54,7 +54,7 @@ TEST(DecodePattern, ALineThatEndsWithinATextRanOut)
 {
     const Pattern* const pattern = pattern_of("HDMI(%d, %s)\n");
     ASSERT_NE(nullptr, pattern);
-    for (const char* cut : { "HD", "HDMI(", "HDMI(1", "HDMI(1, ", "HDMI(1, RES_10" })
+    for (const char* cut : { "HD", "HDMI(", "HDMI(1", "HDMI(1, ", "HDMI(1, RES_10", "HDMI(1, (nul" })
         EXPECT_EQ(Match::State::RanOut, match(pattern->format, cut).state) << cut;
     for (const char* other : { "HDCP", "HDMI(x", "HDMI(1; ", "HDMI(1, RES_10]" })
         EXPECT_EQ(Match::State::No, match(pattern->format, other).state) << other;

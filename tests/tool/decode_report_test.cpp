@@ -149,6 +149,66 @@ TEST(DecodeReport, TwelveBitInputFormat_StaysTheInputs)
     EXPECT_TRUE(words[0].ends_with("digital input CCIR_656_MODE CCIR_YCMIX_12BIT")) << words[0];
 }
 
+TEST(DecodeReport, TwelveBitOutputFormatBehindItsInputsMode_IsNotTheInputs)
+{
+    const auto words = words_of(ccir_line("eDgiMode(CCIR_601_MODE)") + ccir_line("eDgiFmt(CCIR_YCMIX_12BIT)") +
+                                ccir_line("eDgoMode(CCIR_656_MODE)"));
+    ASSERT_EQ(1u, words.size());
+    EXPECT_NE(std::string::npos, words[0].find(", digital output CCIR_656_MODE CCIR_YCMIX_12BIT (")) << words[0];
+}
+
+TEST(DecodeReport, NoLineOfTheExternalChip_IsToldWhereOneWasDue)
+{
+    const std::string last_port =
+        "[PMX] PMX(0 ), _arPmxConf[0].arPortInfo[7].eMasterColorSpace(DRV_PMX_CS_YCBCR_601)\n";
+    const std::string chip = "[PMX] PMX(0) _arPmxConf.rDrvExtSc(DRV_NON_EXT_CHIP) \n";
+    const std::string output = output_line(0, "fgOutputEnable(1)");
+    const std::string missing = "external chip: no line, as of DRV_RX_BYPASS_TX or a value without a name";
+    expect_line(words_of(last_port + output), missing);
+    for (const std::string& log : { last_port, output, last_port + chip + output })
+    {
+        const auto words = words_of(log);
+        EXPECT_EQ(words.end(), std::find(words.begin(), words.end(), missing)) << log;
+    }
+}
+
+TEST(DecodeReport, WhatNoPortOutputOrPositionHas_IsLeftOut)
+{
+    for (const std::string index : { "-1", "8", "99999999999999999999" })
+    {
+        const std::string lines = "[PMX] PMX(0 ), plane " + index + "'s order is 3 \n" +
+                                  "[PMX] PMX(0 ), _arPmxConf[0], arPortInfo[" + index +
+                                  "]'s CompT(65 ), CompId(0 ),  Connected(1 ) \n" +
+                                  "[PMX] PMX(0 ), _arPmxConf[0].arOutputConf[" + index + "].fgOutputEnable(1)\n";
+        EXPECT_TRUE(words_of(lines).empty()) << index;
+        const Story story = tell(read_log("Mode(12) CS(1)\n" + lines));
+        ASSERT_EQ(1u, story.events.size()) << index;
+        EXPECT_EQ(4u, story.events[0].last_line) << index;
+    }
+}
+
+TEST(DecodeReport, AnOrderThatIsNoNumberOfTheLayer_IsSaidAllTheSame)
+{
+    expect_line(words_of("[PMX] PMX(0 ), u4PlaneOrder(0xffffffffffffffffffff ), \n"),
+                "packed order 0xffffffffffffffffffff: planes 1 to 8 show sources 0 0 0 0 0 0 0 0");
+}
+
+TEST(DecodeReport, AReportThatLostItsBegin_IsAnother)
+{
+    const std::string fifth = "[PMX] PMX(0 ), fgOSD5(1 ), \n";
+    const std::string port = ccir_line("eDgiFmt(CCIR_YC422_16BIT)") + ccir_line("eDgiMode(CCIR_601_MODE)") +
+                             ccir_line("eDgoFmt(CCIR_NON_USED)") + ccir_line("eDgoMode(CCIR_INVALID)");
+    const std::string mislabelled = ccir_line("eDgiFmt(CCIR_YC422_16BIT)") + ccir_line("eDgiMode(CCIR_601_MODE)") +
+                                    ccir_line("eDgiFmt(CCIR_YCMIX_12BIT)") + ccir_line("eDgoMode(CCIR_656_MODE)");
+    for (const std::string& one : { fifth, port, mislabelled })
+    {
+        const Story story = tell(read_log(one + one));
+        ASSERT_EQ(2u, story.events.size()) << one;
+        EXPECT_EQ(story.events[0].last_line + 1, story.events[1].first_line) << one;
+        EXPECT_EQ(2 * story.events[0].last_line, story.events[1].last_line) << one;
+    }
+}
+
 TEST(DecodeReport, TwoReports_AreTwoEvents)
 {
     const std::string one = "Mode(12) CS(1)\n[PMX] PMX(0 ), fgOSD5(1 ), \n";

@@ -239,6 +239,19 @@ TEST(DecodeStory, WhatLinesDetermine_IsToldAsTheReason)
           "everything is programmed for mode RES_1080P60HZ (12) at ? Hz" },
         { "OSD_1 Enabled\nOSD_1's Src Color Space = DRV_PMX_CS_YCBCR_601\n",
           "colour space DRV_PMX_CS_YCBCR_601 (0) is what port 3 (OSD 1) asks for, over those before it" },
+        { "[PMX0] Set PlaneOrder = [0x76543211]\n[PMX]u1PlnSel[0]=1\n[PMX]u1PlnSel[1]=2\n"
+          "Plane[0] and Plane[1] connect to the same input source!\n",
+          "source ? feeds two planes, 0 and 1" },
+        { "[PMX0] Set PlaneOrder = [0x76543211]\n[PMX]u1PlnSel[9]=1\n"
+          "Plane[9] and Plane[1] connect to the same input source!\n",
+          "source ? feeds two planes, 9 and 1" },
+        { "Plane[-1] and Plane[1] connect to the same input source!\n", "source ? feeds two planes, ?" },
+        { "Plane[1] and Plane[-1] connect to the same input source!\n", "source ? feeds two planes, ?" },
+        { "Invalid Color Space Id\n", "the mixer is never set up for colour space ?" },
+        { "SetModeEx\n[PMX] Warning: Disable All output, set fmt as -1.\n",
+          "all outputs are off, and HDMI gives the mixer mode ?" },
+        { "OSD_1 Enabled\nOSD_99999999999's Src Color Space = DRV_PMX_CS_YCBCR_601\n",
+          "colour space DRV_PMX_CS_YCBCR_601 (0) is what port ? asks for, over those before it" },
         { "[PMX] Gfx enabled and Color Space is 1.\n",
           "colour space DRV_PMX_CS_YCBCR_709 (1) is what port ? asks for, over those before it" },
         { "[PMX]_arPmxConf[ucPmxId].ucMode=33\n",
@@ -259,6 +272,8 @@ TEST(DecodeStory, WhatLinesDoNotDetermine_HasNoReason)
         "Mode(99999999999), eMixerOutCS(4294967297)\n",   // numbers that the layer cannot print
         "i4PMX_Uninit u4Case 1\ni4PMX_Uninit return 0\n", // it was deleted, or not started
         "[PMX]_arPmxConf[ucPmxId].ucMode=12\n",           // a mode to start with
+        "[PMX]_arPmxConf[ucPmxId].ucMode=-1\n",           // a number that the layer cannot print
+        "[PMX] fgHdmiEx\nusb 1-1: new device\nist:1, Not wait display part...\n", // whose value may be another's
         "PMX_SetOsdEnable.\n",
         "OSD_1's Src Color Space = DRV_PMX_CS_RGB\n",
         "SetMode, RES_1080P60HZ\n",
@@ -268,6 +283,52 @@ TEST(DecodeStory, WhatLinesDoNotDetermine_HasNoReason)
         for (const Event& event : pmxboard::decode::tell(read_log(log)).events)
             EXPECT_TRUE(event.reasons.empty()) << log;
     }
+}
+
+TEST(DecodeStory, Modes4K_AreToldByTheirNumbers)
+{
+    EXPECT_THAT(told("[PMX]_arPmxConf[ucPmxId].ucMode=47\n"), testing::HasSubstr("starts from 4K2K 23.976 Hz"));
+    EXPECT_THAT(told("[PMX]_arPmxConf[ucPmxId].ucMode=48\n"), testing::HasSubstr("starts from 4K2K 24 Hz"));
+}
+
+TEST(DecodeStory, AssertionOfAnUnknownExpression_IsToldByItsFile)
+{
+    EXPECT_EQ("! 1-1 PMX_ColorSpaceSetup: ASSERTION: an assertion of pmx_colour.cpp\n",
+              told("ASSERT fgMine, src/driver/pmx/pmx_colour.cpp:12\n"));
+}
+
+TEST(DecodeStory, ColoursSetUpTwice_AreTwoEvents)
+{
+    const std::string one = "Mode(12), eMixerOutCS(0)\nCC_A disable\nScaler CC disable\n";
+    const std::string set_up =
+        "PMX_ColorSpaceSetup: colours for 1080p 60 Hz from BT.601 | converter A off | scaler's converter off\n";
+    EXPECT_EQ("1-3 " + set_up + "4-6 " + set_up, told(one + one));
+}
+
+TEST(DecodeStory, AFlagLoweredLater_IsNotTheTimers)
+{
+    EXPECT_EQ("1-1 _PMX_TmrIsr: the display timer has run out: no line before it has graphics wait for it\n"
+              "2-2 PMX_SetFormatChangeFlag: the display part's flag is lowered, as when it has switched\n"
+              "2-2 : the log ends within a call: next comes \"Set Osd Enable :%d.\" of _PMX_TmrIsr\n",
+              told("[   20.000000] PMX timeout.\n[   22.000000] Display Format Change :0.\n"));
+}
+
+TEST(DecodeStory, GraphicsAreBack_WhenTheyWaitNoLongerBehindTheirReturn)
+{
+    EXPECT_THAT(told("PMX_SetOsdEnable.\nSet Osd Enable :0.\n"), testing::HasSubstr("graphics are mixed again"));
+    EXPECT_THAT(told("PMX_SetOsdEnable.\nASSERT x_timer_stop(_arPmxDispPartStatus.hPMXTimer) == OSR_OK, "
+                     "src/driver/pmx/pmx_handshake.cpp:72\nSet Osd Enable :0.\n"),
+                testing::HasSubstr("graphics are mixed again"));
+    EXPECT_THAT(told("PMX_SetOsdEnable.\nSet Osd Enable :1.\n"),
+                testing::Not(testing::HasSubstr("graphics are mixed again")));
+}
+
+TEST(DecodeStory, AStampFromBefore_TellsNoTime)
+{
+    EXPECT_THAT(told("[   10.500000] [PMX] VDP_SetClearVideo & Not Mix OSD..\n"
+                     "[   10.500000] Display Format Change Timer Set.\nPMX_Stop\n"
+                     "[   10.200000] Display Format Change :0.\n"),
+                testing::HasSubstr("as when it has switched, after line 1"));
 }
 
 TEST(DecodeStory, WholeSeconds_AreNotShownWithTenths)
@@ -303,6 +364,7 @@ TEST(DecodeStory, AStart_EndsAllThatWasBefore)
         { "kernel", "[    0.000000] Linux version 2.6.35\n" + lines_back, "nothing before the new start brings" },
         { "clock", "[    1.500000] Display Format Change :0.\n" + lines_back, "nothing before the new start brings" },
         { "board", "> power-on\n" + lines_back, "nothing before the new start brings" },
+        { "named board", "> power-on default\n" + lines_back, "nothing before the new start brings" },
         { "layer", lines_start + lines_back, "nothing before this start-up brings" },
     };
     for (const Start& one : starts)
@@ -313,6 +375,21 @@ TEST(DecodeStory, AStart_EndsAllThatWasBefore)
         EXPECT_THAT(story, testing::Not(testing::HasSubstr("graphics are mixed again,"))) << one.what;
     }
 }
+
+TEST(DecodeStory, AVersionWithinASentence_IsNoStart)
+{
+    EXPECT_THAT(told(lines_held_back + "player runs on Linux version 2.6.35\n" + lines_back),
+                testing::Not(testing::HasSubstr("begins anew")));
+}
+
+TEST(DecodeStory, ALogThatEndsWithinACall_TellsWhatItsConsoleWouldShowNext)
+{
+    EXPECT_THAT(told("i4PMX_Uninit u4Case 1\n"),
+                testing::HasSubstr("within a call: next comes \"i4PMX_Uninit return %d\" of i4PMX_Uninit\n"));
+}
+
+const std::string lines_colours = "Mode(12), eMixerOutCS(1)\nCC_A disable\n";
+const std::string lines_one_mode = "SetMode, RES_1080P60HZ\n" + lines_colours + "Scaler CC disable\n";
 
 struct Hole
 {
@@ -333,11 +410,41 @@ TEST(DecodeStory, WhatCannotBe_IsNamedAGap)
         { lines_start + "HD Exist(1)\n", "what leads to \"HD Exist(1)\"" },
         { lines_start + "SetModeEx\nCCIR(0, RES_480I)\nSetModeEx\n", "\"HDMI(%d, %s)\" of PMX_SetModeEx" },
         { lines_start + "SetModeEx\nCCIR(0, RES_480I)\nDisplay Format Change Timer Set.\n", "\"HDMI(%d, %s)\"" },
+        { lines_start + "Display Format Change :1.\n[PMX] fgPMX_DisplayModeReady is 0.\n",
+          "\"Display Format Change :0\"" },
+        { lines_start + "SetModeEx\n[PMX] VDP_SetClearVideo & Not Mix OSD..\nDisplay Format Change Timer Set.\n",
+          "\"Display Format Change :1\"" },
+        { lines_start + "VDP_0 Enabled\nVDP_0's Src Color Space = DRV_PMX_CS_YCBCR_601\n"
+                        "[PMX] Master Color Space change from 1 to 0.\nInform Vdp CS(1)\n",
+          "another change of the master colour space" },
+        { lines_one_mode + "Mode(9) CS(1)\n", "a mode change" },
+        { lines_start + lines_colours + "Scaler CC disable Scaler CC disable\n",
+          "what leads to \"Scaler CC disable\"" },
+        // Nothing takes so long: the call of the first line is over.
+        { lines_start + "[   10.000000] Tp,Id=65,0\n[   50.000000] VDP_0 Disabled\nComp(0) connect\n",
+          "what leads to \"Comp(0) connect\"" },
     };
     for (const Hole& one : holes)
         EXPECT_THAT(told(one.lines), testing::HasSubstr("missing")) << one.lines;
     for (const Hole& one : holes)
         EXPECT_THAT(told(one.lines), testing::HasSubstr(one.what)) << one.lines;
+}
+
+TEST(DecodeStory, ANumberThatTheLayerCannotPrint_TellsNothing)
+{
+    const std::string known = "CC_A disable\nPMX_Init\n" + lines_start;
+    for (const std::string& log : { known + "[PMX] Master Color Space change from 99999999999999999999 to 1.\n",
+                                    lines_one_mode + "Mode(99999999999999999999) CS(1)\n" })
+        EXPECT_THAT(told(log), testing::Not(testing::HasSubstr("missing"))) << log;
+}
+
+TEST(DecodeStory, AnswersOnBothSidesOfACallThatWasBrokenOff_AreTwo)
+{
+    const std::string story = told(lines_start + "[   10.000000] Tp,Id=65,0\n"
+                                                 "[   20.000000] [PMX] fgPMX_DisplayModeReady is 1.\n"
+                                                 "[   45.000000] [PMX] fgPMX_DisplayModeReady is 0.\n");
+    EXPECT_THAT(story, testing::HasSubstr("whether graphics may be shown: no, the display part switches\n"));
+    EXPECT_THAT(story, testing::HasSubstr("whether graphics may be shown: yes\n"));
 }
 
 TEST(DecodeStory, ALevelThatIsRaised_IsNoGap)
@@ -367,6 +474,9 @@ TEST(DecodeStory, ADoubledLine_IsNotTwoEvents)
         "CC_A disable\nSetModeEx\nSetModeEx\nCCIR(0, RES_480I)\nCCIR(0, RES_480I)\nHDMI(0, RES_480I)\n";
     EXPECT_THAT(told(request), testing::HasSubstr("2-6 PMX_SetModeEx: mode change requested: digital port off, HDMI "
                                                   "off\n"));
+    const std::string colours = told(lines_start + lines_colours + "Scaler CC disable\nScaler CC disable\n");
+    EXPECT_THAT(colours, testing::EndsWith(" | converter A off | scaler's converter off\n"));
+    EXPECT_THAT(colours, testing::Not(testing::HasSubstr("missing")));
 }
 
 TEST(DecodeStory, LinesOutOfOrder_AreTakenByTheirStamps)

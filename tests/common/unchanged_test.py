@@ -8,8 +8,13 @@ import subprocess
 import sys
 import tempfile
 import unittest
+import unittest.mock
 
-UNCHANGED = pathlib.Path(__file__).with_name("unchanged.py")
+sys.dont_write_bytecode = True
+
+import unchanged  # noqa: E402
+
+UNCHANGED = pathlib.Path(unchanged.__file__)
 # Counts its runs, and ends as it is told.
 CHECK = """import pathlib, sys
 runs, code = (pathlib.Path(__file__).with_name(name) for name in ("runs", "code"))
@@ -36,10 +41,10 @@ class Unchanged(unittest.TestCase):
         return path
 
     def run_it(self, *more, inputs=None, environment=None):
-        ended = subprocess.run([sys.executable, UNCHANGED, self.place / "stamps/one", *(inputs or ["inputs"]), "--",
-                                sys.executable, self.check, *more], cwd=self.place, text=True,
-                               capture_output=True, check=False,
-                               env={**os.environ, "CI": "", **(environment or {})})
+        ended = subprocess.run([sys.executable, "-I", "-S", UNCHANGED, self.place / ".stamps/one",
+                                *(inputs or ["inputs"]), "--", sys.executable, self.check, *more], cwd=self.place,
+                               text=True, capture_output=True, check=False,
+                               env={**os.environ, "CI": "", "PMX_AGAIN": "", **(environment or {})})
         return ended.returncode, ended.stdout + ended.stderr
 
     def expect(self, runs, *more, code=0, **how):
@@ -49,7 +54,9 @@ class Unchanged(unittest.TestCase):
 
     def test_what_passed_is_told(self):
         self.assertNotIn("unchanged", self.expect(1))
-        self.assertRegex(self.expect(1), r"^unchanged since \d{4}-\d\d-\d\d \d\d:\d\d:\d\d, when it passed")
+        text = self.expect(1)
+        self.assertRegex(text, r"^unchanged since \d{4}-\d\d-\d\d \d\d:\d\d:\d\d, when it passed")
+        self.assertIn("<CTestLabel>unchanged</CTestLabel>\n", text)   # what ctest counts
 
     def test_what_changed_runs(self):
         self.expect(1)
@@ -80,9 +87,51 @@ class Unchanged(unittest.TestCase):
         self.expect(1)
         self.expect(2)
 
-    def test_continuous_integration_runs_everything(self):
+    def test_everything_is_run_where_that_is_said(self):
         self.expect(1)
-        self.expect(2, environment={"CI": "true"})
+        self.expect(2, environment={"PMX_AGAIN": "true"})
+        self.expect(2)
+        self.expect(3, environment={"CI": "true"})
+        self.expect(4, environment={"CI": "true"})
+
+    def test_what_fails_when_it_is_run_again_is_no_longer_unchanged(self):
+        self.expect(1)
+        self.code.write_text("1", encoding="utf-8")
+        self.expect(2, code=1, environment={"PMX_AGAIN": "true"})
+        self.expect(3, code=1)
+
+    def test_a_program_is_what_is_in_it(self):
+        program = self.write("program", "x" * (1 << 19))
+        for runs, content, day in ((1, "x", 1), (1, "x", 2), (2, "y", 2), (2, "y", 3), (3, "x", 3)):
+            program.write_text(content * (1 << 19), encoding="utf-8")
+            os.utime(program, (day, day))
+            self.expect(runs, program)
+
+    def test_what_is_in_a_large_file_is_read_once(self):
+        program = self.write("program", "x" * (1 << 19))
+        contents = unchanged.Contents(self.place / "kept")
+        with unittest.mock.patch.object(unchanged, "SETTLED", -1):
+            first = contents.of(str(program))
+        with unittest.mock.patch.object(contents, "read") as read:
+            self.assertEqual(first, contents.of(str(program)))
+            read.assert_not_called()
+            os.utime(program, (1, 1))
+            self.assertNotEqual(first, contents.of(str(program)))
+
+    def test_what_has_just_been_written_may_change_unseen(self):
+        program = self.write("program", "x" * (1 << 19))
+        unchanged.Contents(self.place / "kept").of(str(program))
+        self.assertFalse((self.place / "kept").exists())
+
+    def test_of_the_surroundings_it_sees_what_counts(self):
+        self.check.write_text("import os, sys\nsys.stdout.write(' '.join(sorted(os.environ)))\n", encoding="utf-8")
+        _, text = self.run_it(environment={"ELSEWHERE": "1", "PMX_DISTURBED": "all"})
+        self.assertIn("PMX_DISTURBED", text)
+        self.assertNotIn("ELSEWHERE", text)
+        for runs_again, more in ((False, {"ELSEWHERE": "2"}), (True, {"PMX_DISTURBED": ""}), (True, {"LANG": "x"})):
+            _, text = self.run_it(environment={"PMX_DISTURBED": "all", **more})
+            self.assertEqual(runs_again, "unchanged since" not in text, more)
+            self.run_it(environment={"PMX_DISTURBED": "all"})
 
     def test_an_input_that_is_not_there(self):
         code, text = self.run_it(inputs=["input"])

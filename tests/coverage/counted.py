@@ -18,6 +18,7 @@ import collections
 import json
 import os
 import re
+import shutil
 import subprocess
 
 KINDS = ("line", "branch", "condition")
@@ -182,9 +183,8 @@ def part_of_tests(part, parts):
 
 def run(commands, counts, root):
     """Runs the commands one by one, programs of GoogleTest in parts; what is printed by the first that fails."""
-    counts.mkdir(parents=True, exist_ok=True)
-    for old in counts.glob("*.profraw"):
-        old.unlink()
+    shutil.rmtree(counts, ignore_errors=True)
+    counts.mkdir(parents=True)
     # Processes of one program put their counts into a few files together.
     environment = dict(os.environ, LLVM_PROFILE_FILE=f"{counts}/%{SHARDS}m.profraw", PYTHONDONTWRITEBYTECODE="1")
     for command in commands:

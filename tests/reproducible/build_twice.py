@@ -15,7 +15,7 @@ import sys
 import tempfile
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
-NOT_TAKEN = shutil.ignore_patterns("build", ".cache", ".git", "__pycache__", "tests", "fuzz")
+NOT_TAKEN = shutil.ignore_patterns("build", ".*", "__pycache__", "tests", "fuzz")
 # (tree, build folder): one build folder within its tree, and one far from it.
 PLACES = (("a/tree", "a/tree/build/one"), ("b/rather/deep/down/another", "c/two"))
 

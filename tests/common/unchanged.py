@@ -9,7 +9,7 @@ that race. Whether a check reads no more than it names, inputs.py tells. CI=true
 PMX_AGAIN=true run everything.
 
 usage: unchanged.py STAMP INPUT... -- COMMAND...
-       INPUT is a file, or a folder with all that is below it
+       INPUT is a file, or a folder with all that is below it; ?PATH need not be there
 """
 
 import hashlib
@@ -36,14 +36,16 @@ def files_of(inputs):
     """Every file, once. What is not there is a mistake: nobody would notice that it changes."""
     found = set()
     for given in inputs:
-        if not os.path.exists(given):
+        if given.startswith("?"):
+            given = given[1:]
+        elif not os.path.exists(given):
             sys.exit(f"unchanged.py: no input {given}")
-        if not os.path.isdir(given):
+        if os.path.isfile(given):
             found.add(given)
         for folder, folders, names in os.walk(given):
             folders[:] = [name for name in folders if name != "__pycache__"]
             found.update(os.path.join(folder, name) for name in names)
-    return sorted(found)
+    return sorted(filter(os.path.isfile, found))   # and no link that leads nowhere, which editors leave meanwhile
 
 
 def state_of(path):

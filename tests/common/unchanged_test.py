@@ -137,6 +137,12 @@ class Unchanged(unittest.TestCase):
         code, text = self.run_it(inputs=["input"])
         self.assertEqual((1, "unchanged.py: no input input\n"), (code, text))
 
+    def test_an_input_that_need_not_be_there(self):
+        self.expect(1, inputs=["?inputs/more"])
+        self.expect(1, inputs=["?inputs/more"])
+        self.write("inputs/more", "")
+        self.expect(2, inputs=["?inputs/more"])
+
 
 if __name__ == "__main__":
     unittest.main()

@@ -355,8 +355,12 @@ class Usage(TreeTest):
 
     def test_words_go_on_as_they_are(self):
         self.expect(0, "run a b $c * --quiet\n", "run", "a b", "$c", "*", "--quiet")
-        self.expect(0, "", "test", "-R", "a b|c")
+        self.expect(0, "", "test", "-R", "a b|c", PMX_AGAIN="")
         self.assertEqual(["ctest --preset debug --label-exclude ^emulated$ -R a b|c"], self.calls("ctest"))
+        self.assertEqual(["again false"], self.calls("again"))
+        self.expect(0, "", "test", "--again", "-R", "x", PMX_AGAIN="")
+        self.assertEqual("ctest --preset debug --label-exclude ^emulated$ -R x", self.calls("ctest")[1])
+        self.assertEqual(["again false", "again true"], self.calls("again"))
 
     def test_the_target_s_tests_are_the_others(self):
         self.expect(0, "", "target", "-R", "a b|c")

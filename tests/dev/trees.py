@@ -59,7 +59,7 @@ do
 done
 """,
     "sudo": 'exec "$@"\n',
-    "ctest": 'note "repository ${GIT_DIR:-none}"\n',
+    "ctest": 'note "repository ${GIT_DIR:-none}"; note "again ${PMX_AGAIN:-false}"\n',
     "doxygen": "",
 }
 

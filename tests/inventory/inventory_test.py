@@ -28,11 +28,23 @@ class ListSuites(unittest.TestCase):
                 list_suites.suites(listing)
 
     def test_registration(self):
-        text = list_suites.registration("/b/tests", "layer", "/s", "60", "*/1", ["A=1", "B=x y"], LISTING)
-        self.assertIn("add_test([==[layer.Modes]==] [==[/b/tests]==] --gtest_brief=1 "
+        text = self.registered("--except=*/1", "--always", "Mute", "--environment", "A=1", "B=x y")
+        self.assertIn("add_test([==[layer.Modes]==] [==[python]==] [==[-I]==] [==[unchanged.py]==] "
+                      "[==[/stamps/layer.Modes]==] [==[boards]==] [==[--]==] [==[/b/tests]==] [==[--gtest_brief=1]==] "
                       "[==[--gtest_filter=Modes.*:*/Modes.*-*/1]==])", text)
+        self.assertIn("add_test([==[layer.Mute]==] [==[/b/tests]==] [==[--gtest_brief=1]==] ", text)
         self.assertIn("ENVIRONMENT [==[A=1;B=x y]==]", text)
         self.assertEqual(2, text.count("add_test("))
+
+    def test_a_suite_that_is_not_there_cannot_always_run(self):
+        with self.assertRaisesRegex(list_suites.Unreadable, "no such suites: Gone"):
+            self.registered("--always", "Mute", "Gone")
+
+    @staticmethod
+    def registered(*options):
+        return list_suites.registration(list_suites.arguments_of(
+            ["/b/tests", "layer", "/s", "60", "out", *options, "--unchanged", "python", "-I", "unchanged.py", "/stamps",
+             "boards"]), LISTING)
 
 
 class Inventory(unittest.TestCase):
@@ -71,6 +83,10 @@ class LeftOut(unittest.TestCase):
 
     def test_everything_runs(self):
         self.assertEqual([], self.complaints(self.found()))
+
+    def test_what_is_not_always_run_again_runs(self):
+        found = self.found(path=("/python", "unchanged.py", "stamp", "--", "/b/tests/layer"))
+        self.assertEqual([], self.complaints(found))
 
     def test_a_filter_takes_more_than_the_list_says(self):
         self.assertEqual(["layer: 1 cases of MuteSweep are left out, and 0 is what the list says",

@@ -64,7 +64,9 @@ def places(tests, build, target, programs):
     """{place: Place} of what ctest has."""
     found = collections.defaultdict(Place)
     for test in tests:
-        words = list(map(pathlib.Path, test.get("command", [])))
+        command = test.get("command", [])
+        # What is not run again while its inputs stay the same stands behind them.
+        words = list(map(pathlib.Path, command[command.index("--") + 1:] if "--" in command else command))
         # Checks that are handed a program run it as they like; on the target an emulator stands in front.
         for path in words[:1]:
             if path.name in programs and path.is_relative_to(build):

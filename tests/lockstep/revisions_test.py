@@ -66,6 +66,7 @@ class Built:
     @classmethod
     def make(cls, program=layers.HERE / "revisions.cpp"):
         if cls.layer is None:
+            shutil.rmtree(MADE, ignore_errors=True)   # nothing follows from what was there
             cls.objects = layers.compile_layer(layers.ROOT, layers.sources_of(layers.ROOT), MADE / "layer")
             cls.layer = layers.combine(cls.objects, MADE / "layer")
             cls.harness = layers.build_harness(MADE, program)
@@ -169,13 +170,6 @@ class Revisions(unittest.TestCase):
         header.write_text(text.replace("PMX_SetDigitalOutDrv(UINT32", "PMX_SetDigitalOutDrv(UINT16"), encoding="utf-8")
         with self.assertRaisesRegex(layers.Unlike, "PMX_SetDigitalOutDrv"):
             compare_revisions.hold_alike(made / "tree", Built.layer, Built.layer)
-
-    def test_an_unknown_revision_is_refused(self):
-        script = layers.HERE / "compare_revisions.py"
-        done = subprocess.run([sys.executable, script, "--made", MADE, "no-such-revision"], capture_output=True,
-                              text=True, check=False)
-        self.assertEqual(1, done.returncode)
-        self.assertRegex(done.stderr, "^compare: ")
 
 
 if __name__ == "__main__":

@@ -4,13 +4,14 @@
 unfolded: whoever listens to a page, or uses no mouse, gets at all of it. npm fetches axe-core, and takes none but the
 one whose hash package-lock.json has.
 
-usage: axe_test.py TOOL FOLDER      FOLDER: where axe-core is kept. Ends with 77 where it is not to be had.
+usage: axe_test.py TOOL      Ends with 77 where axe-core is not to be had.
 """
 
 import pathlib
 import shutil
 import subprocess
 import sys
+import tempfile
 
 sys.dont_write_bytecode = True
 
@@ -40,10 +41,9 @@ class Unavailable(Exception):
 
 
 def axe(folder):
-    """The script, fetched where it is missing: npm holds what it has against the hash, each time."""
+    """The script: npm keeps it, and holds it against the hash, each time."""
     if shutil.which("npm") is None:
         raise Unavailable("there is no npm")
-    folder.mkdir(parents=True, exist_ok=True)
     for name in ("package.json", "package-lock.json"):
         shutil.copy(PINNED / name, folder)
     found = subprocess.run(["npm", "ci", "--ignore-scripts", "--no-audit", "--no-fund", "--prefer-offline"], cwd=folder,
@@ -71,9 +71,10 @@ def looked_at(browser, script, page):
 
 
 def main():
-    tool, folder = (pathlib.Path(argument).resolve() for argument in sys.argv[1:])
+    tool = pathlib.Path(sys.argv[1]).resolve()
     try:
-        script = axe(folder)
+        with tempfile.TemporaryDirectory() as folder:
+            script = axe(pathlib.Path(folder))
     except (Unavailable, subprocess.TimeoutExpired) as reason:
         print(f"SKIPPED: no axe-core: {reason}")
         return SKIPPED

@@ -161,8 +161,7 @@ class PictureTest(unittest.TestCase):
         return taken.read_bytes()
 
     def assert_sixels(self, shown, png):
-        self.assertEqual(1, len(sixel_pictures(shown)))
-        width, height, rows = sixel_pictures(shown)[0]
+        (width, height, rows), = sixel_pictures(shown)
         wanted_width, wanted_height, wanted = read_png(png)
         self.assertEqual((wanted_width, wanted_height), (width, height))
         # Few colours are mixed into others: squares of so many pixels have the right one.

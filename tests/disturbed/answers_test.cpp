@@ -72,7 +72,7 @@ void script(const Answer& first, const Answer& second)
 }
 
 /** How a run differs: 'c' in calls and console lines, 'r' in result or outputs, 's' in what is stored, 'a' in
- *  assertions, 'n' in the next mode change. */
+ *  assertions, 'n' in the next mode change, 'f' in that graphics are out and nobody is to bring them back. */
 using Differences = std::set<char>;
 
 struct Recovered
@@ -80,6 +80,7 @@ struct Recovered
     Played run;
     std::vector<std::string> lines;
     std::string record;
+    bool forgotten;
     std::vector<std::string> next;
 };
 
@@ -87,7 +88,8 @@ struct Recovered
 Recovered run_and_recover(const Path& path, const std::function<void()>& disturb)
 {
     disturbed::prepare(path);
-    Recovered all{ disturbed::run(path, disturb), disturbed::lines(), disturbed::record(), {} };
+    Recovered all{ disturbed::run(path, disturb), disturbed::lines(), disturbed::record(),
+                   disturbed::forgotten(), {} };
     std::vector<std::string> wrong;
     EXPECT_FALSE(all.run.lock_held) << "a mutex is held";
     all.next = disturbed::recover(wrong);
@@ -119,6 +121,8 @@ Differences differences(const Recovered& clean, const Recovered& now, const std:
         found.insert('a');
     if (clean.next != now.next)
         found.insert('n');
+    if (now.forgotten && !clean.forgotten)
+        found.insert('f');
     return found;
 }
 
@@ -186,7 +190,8 @@ const std::vector<Dependence> dependences{
     { "x_sema_delete", "a", { "PMX_Uninit" } },
     { "x_timer_create", "ans", { "PMX_Init" } },
     { "x_timer_delete", "an", { "PMX_Uninit", "i4PMX_Uninit" } },
-    { "x_timer_start", "a", { "PMX_SetFormatChangeTimer", "PMX_SetModeEx" } },
+    { "x_timer_start", "a", { "PMX_SetFormatChangeTimer" } },
+    { "x_timer_start", "af", { "PMX_SetModeEx" } }, // the display part alone brings them back
     { "x_timer_stop", "a", { "PMX_SetFormatChangeTimer", "PMX_SetModeEx" } },
 };
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include "tests/disturbed/ground.h"
 
+#include <algorithm>
 #include <cstdlib>
 #include <map>
 #include <stdexcept>
@@ -158,6 +159,13 @@ std::vector<Path> all_paths()
     return paths;
 }
 
+bool timer_runs()
+{
+    const board::Value timers = board::timers::state();
+    return std::any_of(timers.items().begin(), timers.items().end(),
+                       [](const board::Value& timer) { return timer.find("running")->as_number() != 0; });
+}
+
 } // namespace
 
 const std::vector<Path>& every_path()
@@ -223,6 +231,13 @@ std::string planes_out()
     for (UCHAR plane = DRV_PMX_PLANE_3; plane <= DRV_PMX_PLANE_7; ++plane)
         planes += fgPmxHalMixPlane(0, plane) == FALSE ? std::to_string(plane) + " " : "";
     return planes;
+}
+
+bool forgotten()
+{
+    const PMX_DISPLAY_PART_STATUS_T& status = _arPmxDispPartStatus;
+    return !planes_out().empty() && status.fgPmxEnabeOsdFlag == FALSE &&
+           (status.fgPmxFormatChangeFlag == FALSE || !timer_runs());
 }
 
 std::vector<std::string> recover(std::vector<std::string>& wrong)

@@ -75,4 +75,7 @@ std::vector<std::string> recover(std::vector<std::string>& wrong);
 /** Planes 3 to 7 that are out of the mix. */
 std::string planes_out();
 
+/** Whether graphics are out of the mix and neither owed nor waited for. */
+bool forgotten();
+
 } // namespace disturbed

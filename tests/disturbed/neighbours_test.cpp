@@ -67,21 +67,6 @@ const std::vector<Situation> situations{
       } },
 };
 
-bool timer_runs()
-{
-    const board::Value timers = board::timers::state();
-    return std::any_of(timers.items().begin(), timers.items().end(),
-                       [](const board::Value& timer) { return timer.find("running")->as_number() != 0; });
-}
-
-/** Whether graphics are out of the mix and neither owed nor waited for. */
-bool forgotten()
-{
-    const PMX_DISPLAY_PART_STATUS_T& status = _arPmxDispPartStatus;
-    return !disturbed::planes_out().empty() && status.fgPmxEnabeOsdFlag == FALSE &&
-           (status.fgPmxFormatChangeFlag == FALSE || !timer_runs());
-}
-
 /** Run a path from a situation; the neighbour acts after the n-th call. @return that call's function; empty when there
  *  are fewer */
 std::string disturb(const Path& path, const Situation& situation, const Neighbour& neighbour, std::size_t n,
@@ -149,7 +134,7 @@ private:
     void take_clean(const Path& path, const Situation& situation)
     {
         disturb(path, situation, neighbours[0], ~std::size_t{ 0 }, clean.emplace_back());
-        forgets.push_back(forgotten());
+        forgets.push_back(disturbed::forgotten());
         calls = std::max(calls, clean.back().calls);
     }
 
@@ -167,7 +152,7 @@ private:
         EXPECT_EQ(clean[s].asserts, run.asserts) << where;
         // What is asked is how things are: the answer is younger than the console line in front of it.
         EXPECT_TRUE(clean[s].outcome == run.outcome || path.operation() == "fgPMX_DisplayModeReady") << where;
-        if (forgotten() && !forgets[s])
+        if (disturbed::forgotten() && !forgets[s])
             forgetting[path.operation() + ", " + neighbour.name].insert(point);
         board::advance(2 * timer_interval);
         EXPECT_TRUE(forgets[s] || _arPmxDispPartStatus.fgPmxEnabeOsdFlag != FALSE || disturbed::planes_out().empty())

@@ -49,9 +49,13 @@ extern "C" void __cyg_profile_func_enter(void* function, void*)
     // Most of what is called millions of times is what was called just before.
     static thread_local int its_case = 0;
     static thread_local void* before[2] = {};
-    if (its_case == cases && (function == before[0] || function == before[1]))
+    if (its_case != cases)
+    {
+        its_case = cases;
+        before[0] = before[1] = nullptr;
+    }
+    if (function == before[0] || function == before[1])
         return;
-    its_case = cases;
     before[1] = before[0];
     before[0] = function;
     const std::scoped_lock lock(mutex);

@@ -96,6 +96,8 @@ TEST_F(Handles, Init_KeepsThoseThatSixteenBitsDoNotHold)
     EXPECT_LT(0x10000u, given.mutex);
     EXPECT_EQ(given.mutex + 1, given.timer);
     work(given);
+    PMX_Uninit();
+    EXPECT_EQ(given_back(given), uses());
 }
 
 TEST_F(Handles, Restart_WorksWithTheNewOnes_AndGivesThoseBack)

@@ -124,7 +124,7 @@ TEST_F(InformVdp, InformVdpColorSpace_TellsTheRecordsMasterColourSpace)
 {
     for (const Plane& plane : { main_video, second_video })
         connect(plane);
-    for (const int colour_space : { 0, 1, 2, 3, 0x101 })
+    for (const int colour_space : { 0, 1, 2, 3, 0x101, 0x10001 })
     {
         set_record("eMasterColorSpace", colour_space);
         PMX_InformVdpColorSpace(0);

@@ -310,3 +310,27 @@ TEST_F(MasterColourSpace, DecideMasterColorSpace_OsdGetsEightBitsOfTheNewValueOt
     EXPECT_EQ(0x101, master());
     expect_asserts(1);
 }
+
+TEST_F(MasterColourSpace, DecideMasterColorSpace_EveryNumberIsToldWhole)
+{
+    constexpr int large = 0x10001;
+    master(large);
+    for (const unsigned port : { 0, 1, 2 })
+        source(port, large);
+    set_record("arPortInfo[1].ucLumaKey", 1);
+    mix_second_video(true);
+    decide();
+    EXPECT_TRACE(by_main(large) + asked_mixed + by_second(large) + by_graphics(large));
+    for (const unsigned port : { 0, 1, 2 })
+        set_record("arPortInfo[" + std::to_string(port) + "].fgEnabled", 0);
+    for (const auto& [was, becomes] : { std::pair(large, 0x20000), std::pair(0x20000, large) })
+    {
+        source(0, becomes);
+        decide();
+        EXPECT_EQ("[PMX] Master Color Space change from " + std::to_string(was) + " to " + std::to_string(becomes) +
+                      ".\n",
+                  board::trace::entries().at(1).text);
+        board::trace::clear();
+    }
+    expect_asserts(2); // converters know no such colour space
+}

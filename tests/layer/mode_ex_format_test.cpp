@@ -248,6 +248,17 @@ TEST_F(MixerFormat, SetModeEx_AllDisabledAndHdmisModeRefused_WarnsAndRefuses)
     EXPECT_RECORD_UNCHANGED(before);
 }
 
+TEST_F(MixerFormat, SetModeEx_NothingEnabled_TheWholeNumberOfTheHdmiModeIsTold)
+{
+    running();
+    EXPECT_EQ(0u, set_mode({ .digital_port = off(RES_480P),
+                             .hdmi = off(0x12300 | RES_2160P_4096),
+                             .component = off(RES_480P),
+                             .composite = off(RES_480I) }));
+    EXPECT_EQ("[PMX] Warning: Disable All output, set fmt as " + std::to_string(0x12300 | RES_2160P_4096) + ".\n",
+              board::trace::entries().at(7).text);
+}
+
 TEST_F(MixerFormat, SetModeEx_CapabilityDecidesOverTheMixersFormatAlone)
 {
     running();

@@ -106,16 +106,16 @@ TEST_F(OddRequest, SetModeEx_Logs_EveryNumberAsGiven)
                      .component = output(3, RES_1080P60HZ),
                      .composite = output(128, RES_480I),
                      .osd5 = 255 };
-    request.digital_port.eCcirDrvInfo.eDgoMode = static_cast<CCIR_IN_OUT_MODE_T>(0x102);
+    request.digital_port.eCcirDrvInfo.eDgoMode = static_cast<CCIR_IN_OUT_MODE_T>(0x10102);
     request.digital_port.eCcirDrvInfo.eDgoFmt = static_cast<CCIR_IN_OUT_FORMAT_T>(0x80000003);
-    request.digital_port.eCcirDrvInfo.eDgiMode = static_cast<CCIR_IN_OUT_MODE_T>(0xFFFFFFFF);
-    request.digital_port.eCcirDrvInfo.eDgiFmt = static_cast<CCIR_IN_OUT_FORMAT_T>(0x1FF);
+    request.digital_port.eCcirDrvInfo.eDgiMode = static_cast<CCIR_IN_OUT_MODE_T>(0xFFFF7FFF);
+    request.digital_port.eCcirDrvInfo.eDgiFmt = static_cast<CCIR_IN_OUT_FORMAT_T>(0x101FF);
     EXPECT_EQ("SetModeEx\n"
               "CCIR(2, RES_1080P60HZ)\n"
               "HDMI(255, RES_1080P60HZ)\n"
               "CAV (3, RES_1080P60HZ)\n"
               "CVBS(128, RES_480I)\n"
-              "CCIR(258, -2147483645, -1, 511)\n"
+              "CCIR(65794, -2147483645, -32769, 66047)\n"
               "OSD5(255)\n"
               "HD Exist(1)\n",
               logged_first(request));

@@ -67,6 +67,16 @@ TEST_F(PortFailure, ConnectAndDisconnect_IdWithoutAPort_RefusedWithTheTwoTracesA
     }
 }
 
+TEST_F(PortFailure, ConnectAndDisconnect_TheWholeTypeIsTold)
+{
+    for (const Operation& operation : operations)
+    {
+        EXPECT_EQ(no_such_port, operation.call(66, 0, 0x8041, 0xFFFF));
+        EXPECT_TRACE(lock() + log8("COMP ID to LOCAL ID Fail, CompType = %d, CompId = %d", 0x8041, 0xFFFF) +
+                     traces(operation, 0x8041, 0xFFFF, 8) + unlock());
+    }
+}
+
 TEST_F(PortFailure, ConnectAndDisconnect_UnknownType_ReportedBeforeTheTraces)
 {
     for (const Operation& operation : operations)

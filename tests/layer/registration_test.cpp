@@ -86,6 +86,14 @@ TEST_F(Registration, UnregisterIM_Fails_TheTextSaysRegisterToo)
     )");
 }
 
+TEST_F(Registration, UnregisterIM_TheWholeComponentIsTheKey)
+{
+    EXPECT_EQ(0, i4PmxRegisterIM(0x8142, 0x8001));
+    board::trace::clear();
+    EXPECT_EQ(0, i4PmxUnregisterIM(0x8142, 0x8001));
+    EXPECT_TRACE("i4ImUnregisterInterface2(0x8142, 0x8001, 9) = 0");
+}
+
 TEST_F(Registration, UnregisterIM_PositiveResult_IsNoFailure)
 {
     for (const int answer : { 5, 0x18000 })

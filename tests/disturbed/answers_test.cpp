@@ -88,8 +88,7 @@ struct Recovered
 Recovered run_and_recover(const Path& path, const std::function<void()>& disturb)
 {
     disturbed::prepare(path);
-    Recovered all{ disturbed::run(path, disturb), disturbed::lines(), disturbed::record(),
-                   disturbed::forgotten(), {} };
+    Recovered all{ disturbed::run(path, disturb), disturbed::lines(), disturbed::record(), disturbed::forgotten(), {} };
     std::vector<std::string> wrong;
     EXPECT_FALSE(all.run.lock_held) << "a mutex is held";
     all.next = disturbed::recover(wrong);

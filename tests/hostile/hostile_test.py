@@ -468,6 +468,21 @@ class Interrupts(Directory):
             for left in self.left_behind():
                 (self.place / left).unlink()
 
+    def test_interrupted_when_a_file_has_just_been_made(self):
+        if subprocess.run(["strace", "-o", "/dev/null", "true"], capture_output=True, check=False).returncode != 0:
+            self.skipTest("nobody may trace a process here")
+        kept = self.write("kept", self.state.read_bytes())
+        lines = self.write("saving.pmx", self.saving(kept, times=1))
+        for number in (signal.SIGINT, signal.SIGTERM, signal.SIGHUP):
+            # Its mode is set between the making of a file and whatever could be told of it.
+            interrupting = ["strace", "-qq", "-o", "/dev/null", "-e", "trace=fchmod",
+                            "-e", f"inject=fchmod:signal={number.name}:when=1"]
+            ended = subprocess.run([*interrupting, PROGRAM, "run", "-q", lines], cwd=self.place, capture_output=True,
+                                   check=False, timeout=PATIENCE, env=os.environ | {"ASAN_OPTIONS": "detect_leaks=0"})
+            self.assertEqual((-number, b""), (ended.returncode, ended.stderr))
+            self.assertEqual([], self.left_behind(), number)
+            json.loads(kept.read_text())
+
     def ended_while_it_traces(self, number, name="trace"):
         """What it said, and the trace that stays behind, if any; the file that it was for is as it was."""
         kept = self.write(name, b"before")

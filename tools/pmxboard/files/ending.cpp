@@ -266,4 +266,18 @@ void forget_temporary(const char* name)
     }
 }
 
+InterruptsWait::InterruptsWait()
+{
+    sigset_t waiting;
+    sigemptyset(&waiting);
+    for (const int number : interrupts)
+        sigaddset(&waiting, number);
+    pthread_sigmask(SIG_BLOCK, &waiting, &m_before);
+}
+
+InterruptsWait::~InterruptsWait()
+{
+    pthread_sigmask(SIG_SETMASK, &m_before, nullptr);
+}
+
 } // namespace pmxboard

@@ -3,6 +3,8 @@
  *  How the program ends when something ends it: in good order, and with a line that says where it was. */
 #pragma once
 
+#include <signal.h>
+
 #include <string>
 #include <string_view>
 
@@ -25,5 +27,18 @@ void end_as_it_comes();
  *  @param write_rest  of system calls alone: it runs in a signal handler; null: the file is removed in any case */
 void remember_temporary(const char* name, void (*write_rest)(void* writer) = nullptr, void* writer = nullptr);
 void forget_temporary(const char* name);
+
+/** As long as there is one, who interrupts the program waits: a file that has been made is remembered first. */
+class InterruptsWait
+{
+public:
+    InterruptsWait();
+    ~InterruptsWait();
+    InterruptsWait(const InterruptsWait&) = delete;
+    InterruptsWait& operator=(const InterruptsWait&) = delete;
+
+private:
+    sigset_t m_before{};
+};
 
 } // namespace pmxboard

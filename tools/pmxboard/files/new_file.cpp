@@ -162,6 +162,7 @@ void NewFile::create_beside(Unfinished unfinished)
     const std::string directory = parent.empty() ? "." : parent.string();
     const bool is_kept = unfinished == Unfinished::Kept;
     std::string temporary = is_kept ? unfinished_beside(m_target, directory) : directory + "/.pmxboard-XXXXXX";
+    const InterruptsWait wait;
     const int file = mkostemp(temporary.data(), O_CLOEXEC);
     if (file < 0)
         failed(errno);

@@ -137,7 +137,8 @@ def page(claims, known):
                 yield from claim(entry, known, used)
     yield "## By hand"
     yield ""
-    yield "What takes too long to be run at each change, with the revision that it was run on."
+    yield ("What takes too long to be run at each change, with the revision that it was run on. "
+           "It says nothing of later changes.")
     yield ""
     yield "| | Command | When | Revision | It showed |"
     yield "|---|---|---|---|---|"

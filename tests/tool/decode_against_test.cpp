@@ -608,14 +608,14 @@ TEST_F(DecodeProgram, ToScenario_FindsAgainWhatEarlierCallsLeave)
         "display-part never\nPMX_Init\n" + same_mode + "sink unplug\n" + same_mode +
             "PMX_SetFormatChangeFlag 0\nadvance 11s\n" + same_mode + same_mode,
     };
-    for (const std::string& scenario : scenarios)
+    for (const std::string& lines : scenarios)
     {
-        std::ofstream(file("first.pmx")) << "power-on\nloglevel 9\n" << scenario;
+        std::ofstream(file("first.pmx")) << "power-on\nloglevel 9\n" << lines;
         const std::string log = run("run '" + file("first.pmx") + "'").out;
         std::ofstream(file("made.pmx")) << run("decode --to-scenario -", log).out;
         const Ended compared = run("decode --against '" + file("made.pmx") + "' -", log);
-        EXPECT_EQ(0, compared.code) << scenario << compared.out << compared.err;
-        EXPECT_EQ(std::string::npos, compared.out.find("it ends")) << scenario << compared.out;
+        EXPECT_EQ(0, compared.code) << lines << compared.out << compared.err;
+        EXPECT_EQ(std::string::npos, compared.out.find("it ends")) << lines << compared.out;
     }
 }
 

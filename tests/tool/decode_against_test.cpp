@@ -590,12 +590,12 @@ TEST_F(DecodeProgram, ToScenario_FindsAgainWhatEarlierCallsLeave)
         "PMX_SetModeEx 0 [ [0, RES_480I], [1, RES_1080P60HZ], [0, RES_480P], [0, RES_480I] ] 60 DRV_NON_EXT_CHIP 0\n";
     const std::string scenarios[] = {
         // the frequency of a mode that is set again
-        "PMX_Init\nPMX_SetMode 0 RES_480P 60 0\nPMX_SetMode 0 RES_480P 59 0\nPMX_SetMode 0 RES_480P 60 0\n"
-        "PMX_SetMode 0 RES_576P 50 0\nPMX_SetMode 0 RES_576P 60 0\n"
-        "PMX_SetModeEx 0 [ [0, RES_480I], [1, RES_576P], [0, RES_480P], [0, RES_480I] ] 50 DRV_NON_EXT_CHIP 0\n",
+        ("PMX_Init\nPMX_SetMode 0 RES_480P 60 0\nPMX_SetMode 0 RES_480P 59 0\nPMX_SetMode 0 RES_480P 60 0\n"
+         "PMX_SetMode 0 RES_576P 50 0\nPMX_SetMode 0 RES_576P 60 0\n"
+         "PMX_SetModeEx 0 [ [0, RES_480I], [1, RES_576P], [0, RES_480P], [0, RES_480I] ] 50 DRV_NON_EXT_CHIP 0\n"),
         // a registration that stays
-        "PMX_Init\nfault i4ImUnregisterInterface2 -1\nPMX_Uninit\nPMX_Init\nPMX_Stop\n"
-        "i4PmxRegisterIM PMX_COMP_TYPE_PMX 0\n",
+        ("PMX_Init\nfault i4ImUnregisterInterface2 -1\nPMX_Uninit\nPMX_Init\nPMX_Stop\n"
+         "i4PmxRegisterIM PMX_COMP_TYPE_PMX 0\n"),
         // one that is refused although nothing is registered
         "fault i4ImRegisterInterface2 -1\ni4PmxRegisterIM PMX_COMP_TYPE_PMX 0\nPMX_Init\n",
         // a partition that is not there

@@ -48,6 +48,8 @@ def argument(parameter):
         return f"void* const {name} = reinterpret_cast<void*>(std::uintptr_t{{ given.number() }});", name
     if parameter.kind == "text":
         return f"Bytes {name} = given.bytes();", f"{name}.text()"
+    if not parameter.is_tested:
+        return f"Bytes {name} = given.bytes();", f"static_cast<{parameter.type}>({name}.pointer_or_spare())"
     if parameter.kind in ("data", "place"):
         return f"Bytes {name} = given.bytes();", f"static_cast<{parameter.type}>({name}.pointer())"
     return f"const auto {name} = static_cast<{parameter.type}>(given.number());", name
@@ -66,6 +68,8 @@ def thunk(function, index):
     call = f"{name}({', '.join(handed)});"
     lines.append(f"const auto result = {call}" if function.has_result else call)
     for output in interface.fixed_outputs(function):
+        if not output.is_tested:
+            lines.append(f'given.note_loss("{output.name}", {output.name});')
         lines.append(f"{output.name}.put_into(written);")
     lines.append("return static_cast<UINT32>(result);" if function.has_result else "return 0;")
     body = "\n    ".join(lines)

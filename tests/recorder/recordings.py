@@ -15,6 +15,7 @@ POINTER_SIZE, EXPORTED_SIZE, STATE_SIZE, RING_WORDS = range(5, 9)  # words of th
 HEAD, SNAPSHOT_COUNT, FIRST_SNAPSHOT = 10, 11, 12
 OPERATION, CALL, RETURN, CHANGE, SNAPSHOT = range(1, 6)
 ANSWERED = 0x80
+PRESENT = 0x80000000  # of what stands behind a pointer
 
 
 class Recording:

@@ -23,8 +23,8 @@ import unittest
 sys.dont_write_bytecode = True
 
 from recordings import (ANSWERED, CALL, CHANGE, EXPORTED_SIZE, FIRST_SNAPSHOT, HEAD, HEADER_WORDS,  # noqa: E402
-                        OPERATION, POINTER_SIZE, RETURN, RING_WORDS, SNAPSHOT, SNAPSHOT_COUNT, STATE_SIZE, Recording,
-                        interface)
+                        OPERATION, POINTER_SIZE, PRESENT, RETURN, RING_WORDS, SNAPSHOT, SNAPSHOT_COUNT, STATE_SIZE,
+                        Recording, interface)
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 # What no scenario can say.
@@ -346,6 +346,43 @@ class Replay(unittest.TestCase):
         ended = self.replay(recording.bytes())
         self.assertEqual(1, ended.returncode, ended.stderr)
         self.assertIn("computed: nothing: no table was handed out\n", ended.stdout)
+
+    def test_a_null_pointer_that_an_operation_does_not_test(self):
+        for name, given, place, parameter in (
+                ("d_PMX_GetOrderVdpComp0", "0", 4, "pu4OnTop"), ("PMX_GetArbPlaneOrder", "0", 4, "pu4PlaneOrder"),
+                ("PMX_GetSwapEnable", "0 1", 4, "pucEnable"),
+                ("PMX_ChkSupportedRes", "0 RES_480P 60", 6, "ucSupportedAutoRes"),
+                ("PMX_ChkSupportedRes", "0 RES_480P 60", 8, "ucSupportedAutoVsyncFreg")):
+            with self.subTest(name, parameter=parameter):
+                recording = self.record(f"PMX_Init\n{name} {given}\nPMX_SetBrightness 0 9 1\n")
+                self.make_null(recording, name, place)
+                ended = self.replay(recording.bytes())
+                self.assertEqual(1, ended.returncode, ended.stderr)
+                self.assertIn(f"recorded: end of {name} = 1\n", ended.stdout)
+                self.assertIn(f"computed: a write behind {parameter}, which is null\n", ended.stdout)
+                self.assertIn(f"{name} does not test {parameter} for null: its caller must", ended.stdout)
+
+    def test_a_recording_that_ends_with_what_a_null_pointer_stopped(self):
+        recording = self.record("PMX_Init\nd_PMX_GetOrderVdpComp0 0\n")
+        place = self.make_null(recording, "d_PMX_GetOrderVdpComp0", 4)
+        ended = self.replay(recording.of(self.unanswered(recording, place)).bytes())
+        self.assertEqual(1, ended.returncode, ended.stderr)
+        self.assertIn("recorded: nothing more\n", ended.stdout)
+        self.assertIn("computed: a write behind pu4OnTop, which is null\n", ended.stdout)
+
+    def test_a_null_pointer_behind_which_nothing_is_written(self):
+        recording = self.record("PMX_Init\nPMX_GetSwapEnable 0 9\n")
+        self.make_null(recording, "PMX_GetSwapEnable", 4)
+        ended = self.replay(recording.bytes())
+        self.assertEqual(0, ended.returncode, ended.stdout)
+
+    def make_null(self, recording, name, place):
+        """Of an output that is one word at most; where the operation begins."""
+        began = recording.begin(name)[1][0]
+        self.assertEqual(PRESENT, recording.words[began + place] & PRESENT)
+        recording.words[began + place:began + place + 2] = [0]
+        recording.words.insert(began + (recording.words[began] & 0xFF) - 1, 0)
+        return began
 
     def test_what_another_thread_does_within_a_call_is_no_operation_to_be_explained(self):
         recording = self.record("PMX_Init\nmeanwhile as thread PMX_HalSetMode PMX_SetBrightness 0 9 1\n"

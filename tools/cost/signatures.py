@@ -32,6 +32,7 @@ class Parameter:
     kind: str     # number, tag, text, symbol, values, list (va_list), data, table, place
     read: str     # bytes that are read behind the pointer, as a C++ expression over the parameters, or nothing
     written: str  # bytes that are written there, or nothing
+    is_tested: bool = True  # for null, by the function, where it leads somewhere
 
 
 @dataclasses.dataclass(frozen=True)
@@ -98,7 +99,7 @@ def _pointer(function, type_name, name):
         return Parameter(type_name, name, "text", "", "")
     size = _bytes(function, name, pointer)
     return Parameter(type_name, name, "data" if pointer.is_read else "place", size if pointer.is_read else "",
-                     size if pointer.is_written else "")
+                     size if pointer.is_written else "", pointer.may_be_null)
 
 
 def _function(declared):

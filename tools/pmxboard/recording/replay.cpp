@@ -115,6 +115,7 @@ private:
     void perform(unsigned thread);
     void run_operation(Lock& lock);
     Answer answered(const Described& function, std::uint32_t answer, std::span<const std::uint32_t> written);
+    void lose(const Event& begin, std::string_view parameter);
     void end_operation(Lock& lock, const Event& begin, std::uint32_t answer, const std::vector<UINT32>& written);
     const Event& take();
     bool is_my_turn() const;
@@ -161,7 +162,7 @@ void Performance::depart(std::string recorded, std::string computed, std::string
     if (!m_verdict.departure)
     {
         Departure& found = m_verdict.departure.emplace();
-        found.event = m_next + 1;
+        found.event = std::min(m_next + 1, m_events.size());
         found.time = m_events[std::min(m_next, m_events.size() - 1)].time;
         found.thread = my_thread;
         found.operation = my_operations.empty() ? "" : my_operations.front();
@@ -298,9 +299,25 @@ void Performance::run_operation(Lock& lock)
     const std::uint32_t answer = operation.run(given, written);
     my_operation_calls_nobody = false; // whoever called it out of an operation is one that calls
     lock.lock();
+    if (!given.loss().empty())
+        lose(begin, given.loss());
     end_operation(lock, begin, answer, written);
     --m_open;
     my_operations.pop_back();
+}
+
+/** A product has nothing there: it stops, and what is recorded behind it is not of this layer. */
+void Performance::lose(const Event& begin, std::string_view parameter)
+{
+    const Described& operation = replayed_layer().operations[begin.function].described;
+    const std::string name(parameter);
+    std::string recorded = "nothing more";
+    if (begin.is_answered)
+        recorded = "end of " + operation.name + " = " + described_answer(operation, begin.words[0]);
+    else if (m_next < m_events.size())
+        recorded = next_text();
+    depart(std::move(recorded), "a write behind " + name + ", which is null",
+           operation.name + " does not test " + name + " for null: its caller must");
 }
 
 void Performance::end_operation(Lock& lock, const Event& begin, std::uint32_t answer,

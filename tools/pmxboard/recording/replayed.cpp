@@ -13,15 +13,36 @@ __attribute__((weak)) const pmxboard::ReplayedLayer& pmxboard_replayed_layer();
 namespace pmxboard
 {
 
+/** What a spare place holds until it is written: no flag, no frequency, no order. */
+constexpr UINT32 spare = 0xA5A5A5A5;
+
 Bytes::Bytes(std::span<const UINT32> words, std::size_t size) : m_size(size), m_is_null(false)
 {
     std::copy(words.begin(), words.end(), m_content.begin());
+}
+
+void* Bytes::pointer_or_spare()
+{
+    if (m_is_null)
+        m_content.fill(spare);
+    return m_content.data();
+}
+
+bool Bytes::is_spare_written() const
+{
+    return m_is_null && m_content.front() != spare;
 }
 
 void Bytes::put_into(std::vector<UINT32>& words) const
 {
     if (!m_is_null)
         words.insert(words.end(), m_content.begin(), m_content.begin() + PMX_WORDS(m_size));
+}
+
+void Given::note_loss(std::string_view parameter, const Bytes& behind)
+{
+    if (behind.is_spare_written())
+        m_loss = parameter;
 }
 
 UINT32 Given::number()

@@ -9,6 +9,7 @@
 #include <cstdint>
 #include <span>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "x_typedef.h"
@@ -24,6 +25,9 @@ public:
     explicit Bytes(std::span<const UINT32> words, std::size_t size);
 
     void* pointer() { return m_is_null ? nullptr : m_content.data(); }
+    /** For what is written whatever the pointer is: where it is null, a place that keeps whether that was done. */
+    void* pointer_or_spare();
+    bool is_spare_written() const;
     const char* text() { return static_cast<const char*>(pointer()); }
     void put_into(std::vector<UINT32>& words) const;
 
@@ -44,10 +48,15 @@ public:
     Bytes bytes();
     /** What goes with a format; texts stay as long as this. */
     std::vector<long> values(const char* format);
+    /** Behind the operation: whether this pointer is null, and was written behind. */
+    void note_loss(std::string_view parameter, const Bytes& behind);
+    /** The parameter of which that was noted, or nothing. */
+    std::string_view loss() const { return m_loss; }
 
 private:
     std::span<const UINT32> m_words;
     std::size_t m_at = 0;
+    std::string_view m_loss;
     std::vector<Bytes> m_texts;
 };
 

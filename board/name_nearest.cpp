@@ -1,6 +1,5 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
 #include <algorithm>
-#include <cctype>
 #include <numeric>
 
 #include "board/names.h"
@@ -10,9 +9,15 @@ namespace board::names
 namespace
 {
 
+/** Names are of ASCII; the library's function asks for a locale at every letter. */
+char lower(char letter)
+{
+    return letter >= 'A' && letter <= 'Z' ? static_cast<char>(letter - 'A' + 'a') : letter;
+}
+
 bool same_letter(char a, char b)
 {
-    return std::tolower(static_cast<unsigned char>(a)) == std::tolower(static_cast<unsigned char>(b));
+    return lower(a) == lower(b);
 }
 
 /** Whether somebody stopped typing early. */
@@ -31,17 +36,19 @@ std::size_t distance(std::string_view a, std::string_view b, std::size_t most)
     for (std::size_t i = 1; i <= a.size(); ++i)
     {
         row[0] = i;
+        std::size_t least = i;
         for (std::size_t j = 1; j <= b.size(); ++j)
         {
             const bool same = same_letter(a[i - 1], b[j - 1]);
-            row[j] = std::min({ above[j] + 1, row[j - 1] + 1, above[j - 1] + (same ? 0 : 1) });
+            row[j] = std::min(std::min(above[j], row[j - 1]) + 1, above[j - 1] + (same ? 0 : 1));
             if (i > 1 && j > 1 && same_letter(a[i - 1], b[j - 2]) && same_letter(a[i - 2], b[j - 1]))
                 row[j] = std::min(row[j], before[j - 2] + 1);
+            least = std::min(least, row[j]);
         }
-        before = above;
-        above = row;
-        if (const std::size_t least = *std::min_element(row.begin(), row.end()); least > most)
+        if (least > most)
             return least;
+        before.swap(above);
+        above.swap(row);
     }
     return above[b.size()];
 }

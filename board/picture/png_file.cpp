@@ -80,14 +80,15 @@ std::string to_png(const Image& image)
 {
     const Image rgb = converted(image, full_rgb);
     const bool transparent = is_transparent(rgb);
-    std::vector<png_byte> samples;
-    samples.reserve(rgb.pixels().size() * BYTES);
+    std::vector<png_byte> samples(rgb.pixels().size() * (transparent ? 4 : 3));
+    png_byte* next = samples.data();
     for (const Pixel pixel : rgb.pixels())
     {
         for (unsigned index = 0; index < 3; ++index)
-            samples.push_back(without_opacity(code(pixel, index), opacity(pixel)));
+            *next++ = transparent ? without_opacity(code(pixel, index), opacity(pixel))
+                                  : static_cast<png_byte>(code(pixel, index));
         if (transparent)
-            samples.push_back(static_cast<png_byte>(opacity(pixel)));
+            *next++ = static_cast<png_byte>(opacity(pixel));
     }
 
     PngImage png;

@@ -65,7 +65,7 @@ endif()
 # accesses are checked by calls, which are compiled sooner than checks in place. Behind the flags of pmx_host.
 add_library(pmx_test_flags INTERFACE)
 if(PMX_SANITIZE STREQUAL ON AND CMAKE_CXX_COMPILER_ID STREQUAL GNU)
-    target_compile_options(pmx_test_flags INTERFACE -g1 -fno-sanitize=undefined
+    target_compile_options(pmx_test_flags INTERFACE -g1 -O0 -fno-sanitize=undefined
         --param=asan-instrumentation-with-call-threshold=0)
 endif()
 

@@ -6,7 +6,7 @@ class Ktap:
     """Verdicts, one a line, as kernel tests tell them."""
 
     def __init__(self):
-        self.number, self.failures = 0, 0
+        self.number, self.failures, self.skipped = 0, 0, 0
         print("KTAP version 1", flush=True)
 
     def verdict(self, name, wrong=()):
@@ -18,6 +18,7 @@ class Ktap:
 
     def skip(self, name, reason):
         self.number += 1
+        self.skipped += 1
         print(f"ok {self.number} {name} # SKIP {reason}", flush=True)
 
     def end(self):

@@ -358,7 +358,7 @@ def compare_all(ktap, cache, made, program, shipped):
         has_processors(ktap, console_of["several"]())
         compare(ktap, "several processors:", expected_of(expected, in_time), console_of["several"]())
         replays(ktap, "several processors:", program, in_time, console_of["several"](), made / "several-recordings")
-    figures.note("kernel", verdicts=ktap.number)
+    figures.note("kernel", verdicts=ktap.number - ktap.skipped, skipped=ktap.skipped)
 
 
 def carried_out(work, words):

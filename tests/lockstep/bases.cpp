@@ -2,7 +2,6 @@
 #include "tests/lockstep/bases.h"
 
 #include <cstdlib>
-#include <cstring>
 #include <fstream>
 #include <iostream>
 #include <set>
@@ -26,10 +25,11 @@ std::uint64_t site_of(const Trace& trace, const Call& call)
     const Function& function = platform[call.function];
     for (unsigned i = 0; i < function.count; ++i)
     {
-        if (std::strcmp(function.parameters[i].kind, "text") != 0)
+        if (function.parameters[i].kind != Kind::text)
             continue;
-        for (std::uint32_t k = 0; k < call.given[i].size; ++k)
-            site = mixed(site * 31 + trace.bytes[call.given[i].at + k]);
+        const Given& given = trace.given[call.first + i];
+        for (std::uint32_t k = 0; k < given.size; ++k)
+            site = mixed(site * 31 + trace.bytes[given.at + k]);
     }
     return site;
 }

@@ -4,6 +4,8 @@
 #include <algorithm>
 #include <cstdio>
 #include <cstring>
+#include <string_view>
+#include <type_traits>
 
 #include "drv_av_d.h"
 #include "drv_if_pmx.h"
@@ -60,30 +62,28 @@ std::string shown_pointer(std::uint64_t value)
 }
 
 /* Parameters of a function; those behind the last are the values of a format. */
-std::string kind_of(const Function& function, unsigned i)
+Kind kind_of(const Function& function, unsigned i)
 {
-    if (i < function.count)
-        return function.parameters[i].kind;
-    return "values";
+    return i < function.count ? function.parameters[i].kind : Kind::values;
 }
 
 std::string name_of(const Function& function, unsigned i)
 {
-    const bool is_value = i >= function.count || std::strcmp(function.parameters[i].kind, "values") == 0;
+    const bool is_value = kind_of(function, i) == Kind::values;
     return is_value ? "value " + std::to_string(i + 2 - function.count) : function.parameters[i].name;
 }
 
 std::string shown(const Trace& trace, const Call& call, unsigned i)
 {
     const Function& function = platform[call.function];
-    const Given& given = call.given[i];
+    const Given& given = trace.given[call.first + i];
     const unsigned char* const bytes = trace.bytes.data() + given.at;
-    const std::string kind = kind_of(function, i);
-    if (kind == "data")
+    const Kind kind = kind_of(function, i);
+    if (kind == Kind::data)
         return given.value == 0 ? "null" : hex(bytes, given.size);
-    if (kind == "text" || (kind == "values" && given.size != 0))
+    if (kind == Kind::text || (kind == Kind::values && given.size != 0))
         return given.value == 0 ? "null" : quoted(bytes, given.size);
-    if (kind == "place" || kind == "table" || kind == "symbol")
+    if (kind == Kind::place || kind == Kind::table || kind == Kind::symbol)
         return shown_pointer(given.value);
     return number(given.value);
 }
@@ -145,12 +145,12 @@ std::vector<bool> fields_of(const std::string& function, std::uint64_t command, 
 #undef COVER
 
 /* Differing bytes behind a pointer: "bytes", "padding" when no field differs, nothing when nothing counts. */
-std::string bytes_differ(const Call& call, const Given& first, const unsigned char* a, const unsigned char* b,
-                         bool padding_counts)
+std::string bytes_differ(const Function& function, std::uint64_t command, const Given& first, const unsigned char* a,
+                         const unsigned char* b, bool padding_counts)
 {
     if (std::memcmp(a, b, first.size) == 0)
         return "";
-    const std::vector<bool> fields = fields_of(platform[call.function].name, call.given[0].value, first.size);
+    const std::vector<bool> fields = fields_of(function.name, command, first.size);
     for (std::size_t i = 0; i < first.size; ++i)
     {
         if (a[i] != b[i] && fields[i])
@@ -162,19 +162,20 @@ std::string bytes_differ(const Call& call, const Given& first, const unsigned ch
 std::string argument_differs(const Trace& first, const Trace& second, const Call& a, const Call& b, unsigned i,
                              const Comparison& comparison)
 {
-    const Given& x = a.given[i];
-    const Given& y = b.given[i];
-    const std::string function = platform[a.function].name;
+    const Given& x = first.given[a.first + i];
+    const Given& y = second.given[b.first + i];
+    const std::string_view function = platform[a.function].name;
     if (function == "Assert" && (i == 2 || (i == 1 && !comparison.places_of_checks)))
         return "";
-    const std::string kind = kind_of(platform[a.function], i);
-    const bool is_text = kind == "text" || (kind == "values" && (x.size != 0 || y.size != 0));
+    const Kind kind = kind_of(platform[a.function], i);
+    const bool is_text = kind == Kind::text || (kind == Kind::values && (x.size != 0 || y.size != 0));
     if (x.size != y.size)
         return is_text ? "text" : "bytes";
     if (x.value != y.value)
         return "argument";
     const std::string differing =
-        bytes_differ(a, x, first.bytes.data() + x.at, second.bytes.data() + y.at, comparison.padding);
+        bytes_differ(platform[a.function], first.given[a.first].value, x, first.bytes.data() + x.at,
+                     second.bytes.data() + y.at, comparison.padding);
     return differing == "bytes" && is_text ? "text" : differing;
 }
 
@@ -192,10 +193,9 @@ std::string call_or_end(const Trace& trace, std::size_t i)
 
 std::optional<std::size_t> first_difference(const unsigned char* a, const unsigned char* b, std::size_t size)
 {
-    const auto found = std::mismatch(a, a + size, b);
-    if (found.first == a + size)
+    if (std::memcmp(a, b, size) == 0)
         return std::nullopt;
-    return static_cast<std::size_t>(found.first - a);
+    return static_cast<std::size_t>(std::mismatch(a, a + size, b).first - a);
 }
 
 /* The value of the field that a byte belongs to. */
@@ -207,20 +207,24 @@ std::string field_value(const Operation& operation, const unsigned char* image, 
         {
             if (offset < field.offset || offset >= field.offset + field.size)
                 continue;
-            std::uint64_t value = 0;
-            std::memcpy(&value, image + field.offset, field.size);
-            return number(value);
+            return number(get(image, field));
         }
     }
     return number(image[offset]);
 }
 
+template <typename T>
+bool same_bytes(const std::vector<T>& a, const std::vector<T>& b)
+{
+    static_assert(std::has_unique_object_representations_v<T>);
+    return a.size() == b.size() && (a.empty() || std::memcmp(a.data(), b.data(), a.size() * sizeof(T)) == 0);
+}
+
 /* Almost always, and found out at once. */
 bool same_calls(const Trace& first, const Trace& second)
 {
-    return first.calls.size() == second.calls.size() && first.bytes == second.bytes &&
-           (first.calls.empty() ||
-            std::memcmp(first.calls.data(), second.calls.data(), first.calls.size() * sizeof(Call)) == 0);
+    return first.bytes == second.bytes && same_bytes(first.calls, second.calls) &&
+           same_bytes(first.given, second.given);
 }
 
 } // namespace
@@ -232,11 +236,11 @@ std::string shown_operation(const Operation& operation, const Arguments& argumen
     for (unsigned i = 0; i < function.count; ++i)
     {
         const Parameter& parameter = function.parameters[i];
-        const std::string kind = parameter.kind;
+        const Kind kind = parameter.kind;
         text += (i == 0 ? "" : ", ") + std::string(parameter.name);
-        if (kind == "data" || kind == "place")
+        if (kind == Kind::data || kind == Kind::place)
             text += arguments[i] == 0 ? " = null" : "";
-        else if (kind == "number" || kind == "tag")
+        else if (kind == Kind::number || kind == Kind::tag)
             text += " = " + number(arguments[i]);
     }
     text += ")";

@@ -3,8 +3,6 @@
  *  Drawn states and arguments: any value can come, and those that decide something come often. */
 #pragma once
 
-#include <string>
-
 #include "tests/lockstep/lockstep.h"
 #include "tests/lockstep/random.h"
 
@@ -12,7 +10,10 @@ namespace lockstep
 {
 
 /** A value for a field of the state or of a caller's array. */
-std::uint64_t draw_value(Random& random, const std::string& name, std::size_t size);
+inline std::uint64_t draw_value(Random& random, const Field& field)
+{
+    return field.draw(random, field.size);
+}
 
 /** What a layer holds once it runs: the default record, an idle handshake, a mutex. */
 const Image& started_state();

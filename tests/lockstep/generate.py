@@ -29,7 +29,7 @@ def state():
 
 
 def parameters(function):
-    return ", ".join(f'{{ "{parameter.type}", "{parameter.name}", "{parameter.kind}" }}'
+    return ", ".join(f'{{ "{parameter.type}", "{parameter.name}", Kind::{parameter.kind} }}'
                      for parameter in function.parameters)
 
 

@@ -17,7 +17,8 @@ from tools import compiler, in_parallel, run, write  # noqa: E402
 ROOT = signatures.ROOT
 HERE = ROOT / "tests" / "lockstep"
 SOURCES = [HERE / f"{name}.cpp" for name in
-           ("layout", "recorder", "draw", "agreement", "compare", "findings", "options", "bases", "random_runs")]
+           ("layout", "recorder", "values", "draw", "agreement", "compare", "findings", "options", "bases",
+            "random_runs")]
 SOURCES += [ROOT / "tools" / "record_view" / "record_layout.cpp"]
 
 

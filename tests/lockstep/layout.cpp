@@ -21,7 +21,7 @@ void add_fields(const Node& node, const std::string& name, std::size_t offset, s
 {
     if (record_view::is_single(node))
     {
-        fields.push_back({ name, offset, node.size });
+        fields.push_back({ name, offset, node.size, draw_for_field(name) });
         return;
     }
     for (std::size_t i = 0; i < node.children.size(); ++i)
@@ -68,7 +68,10 @@ std::vector<Field> words_array()
 {
     std::vector<Field> fields;
     for (std::size_t i = 0; i < 8; ++i)
-        fields.push_back({ "pu4PlaneOrder[" + std::to_string(i) + "]", caller_offset() + 4 * i, 4 });
+    {
+        const std::string name = "pu4PlaneOrder[" + std::to_string(i) + "]";
+        fields.push_back({ name, caller_offset() + 4 * i, 4, draw_for_field(name) });
+    }
     return fields;
 }
 
@@ -109,7 +112,7 @@ const std::vector<Field>& array_fields(const Operation& operation)
     for (unsigned i = 0; i < operation.function.count; ++i)
     {
         const Parameter& parameter = operation.function.parameters[i];
-        if (std::strcmp(parameter.kind, "data") == 0)
+        if (parameter.kind == Kind::data)
             return std::strcmp(parameter.type, "PMX_RESOLUTION_T*") == 0 ? outputs : words;
     }
     return none;
@@ -133,11 +136,16 @@ std::string field_at(const Operation& operation, std::size_t offset)
     return "padding behind " + (before == nullptr ? std::string("nothing") : *before);
 }
 
-std::uint64_t get(const Image& image, const Field& field)
+std::uint64_t get(const unsigned char* image, const Field& field)
 {
     std::uint64_t value = 0;
-    std::memcpy(&value, &image.at(field.offset), field.size);
+    std::memcpy(&value, image + field.offset, field.size);
     return value;
+}
+
+std::uint64_t get(const Image& image, const Field& field)
+{
+    return get(image.data(), field);
 }
 
 void set(Image& image, const Field& field, std::uint64_t value)

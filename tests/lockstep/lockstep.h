@@ -14,14 +14,29 @@
 #include <string>
 #include <vector>
 
+#include "tests/lockstep/values.h"
+
 namespace lockstep
 {
+
+enum class Kind
+{
+    number,
+    tag,
+    text,
+    symbol,
+    values,
+    list,
+    data,
+    table,
+    place
+};
 
 struct Parameter
 {
     const char* type;
     const char* name;
-    const char* kind; ///< number, tag, text, symbol, values, list, data, table, place
+    Kind kind;
 };
 
 struct Function
@@ -72,6 +87,7 @@ struct Field
     std::string name;
     std::size_t offset;
     std::size_t size;
+    Draw draw; ///< as its name says
 };
 
 /** Every single field of the state; the caller's memory stands behind the last of them. */
@@ -86,6 +102,7 @@ const std::vector<Field>& array_fields(const Operation& operation);
 /** What a byte of an image belongs to, by name; "padding behind …" for those of no field. */
 std::string field_at(const Operation& operation, std::size_t offset);
 
+std::uint64_t get(const unsigned char* image, const Field& field);
 std::uint64_t get(const Image& image, const Field& field);
 void set(Image& image, const Field& field, std::uint64_t value);
 
@@ -127,14 +144,15 @@ inline constexpr std::uint64_t to_named = 4ull << 32;
 struct Call
 {
     unsigned function;
-    unsigned count;
-    std::array<Given, argument_limit> given;
+    unsigned count; ///< of its arguments
+    unsigned first; ///< of them in Trace::given
 };
 
 /** What one layer did. */
 struct Trace
 {
     std::vector<Call> calls;
+    std::vector<Given> given;
     std::vector<unsigned char> bytes;
     std::vector<unsigned char> images; ///< one for each call, as the call found it
     std::uint64_t result = 0;

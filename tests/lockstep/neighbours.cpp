@@ -53,7 +53,7 @@ std::vector<std::uint64_t> other_values(const Trial& trial, const Field& field, 
             values.push_back(other);
     };
     add(value == 0 ? 1 : 0);
-    add(draw_value(random, field.name, field.size));
+    add(draw_value(random, field));
     if (argument_count != 0)
         add(trial.arguments[random.below(argument_count)]);
     return values;
@@ -81,7 +81,7 @@ public:
             for (const std::vector<Field>* fields : { &state_fields(), &array_fields(*trial.operation) })
             {
                 for (const Field& field : *fields)
-                    change(trial, name, field, Image(image + field.offset, image + field.offset + field.size));
+                    change(trial, name, field, image);
             }
         }
     }
@@ -89,12 +89,12 @@ public:
     const Reached& reached() const { return m_reached; }
 
 private:
-    void change(Trial& trial, const std::string& name, const Field& field, const Image& bytes)
+    void change(Trial& trial, const std::string& name, const Field& field, const unsigned char* image)
     {
         const std::uint64_t turn = m_turn++;
         if (turn % m_options.parts != m_options.part)
             return;
-        const std::uint64_t value = get(bytes, { field.name, 0, field.size });
+        const std::uint64_t value = get(image, field);
         m_reached.changes.insert({ static_cast<unsigned>(trial.operation - operations), field.offset });
         for (const std::uint64_t other : other_values(trial, field, value, Random(turn)))
         {

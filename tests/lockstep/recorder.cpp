@@ -5,6 +5,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <iostream>
+#include <string_view>
 
 #include "tests/lockstep/lockstep.h"
 #include "tests/lockstep/random.h"
@@ -121,9 +122,7 @@ Recorder::Recorder(unsigned function)
     const std::size_t at = trace.images.size();
     trace.images.resize(at + image_size());
     take_image(&trace.images[at]);
-    call_now = &trace.calls.emplace_back();
-    call_now->function = function;
-    call_now->count = 0;
+    call_now = &trace.calls.emplace_back(Call{ function, 0, static_cast<unsigned>(trace.given.size()) });
 }
 
 std::uint64_t Recorder::draw()
@@ -140,8 +139,8 @@ void Recorder::add(std::uint64_t value, const void* first, std::size_t size)
         std::abort();
     }
     std::vector<unsigned char>& bytes = trace_now->bytes;
-    call_now->given[call_now->count++] = { value, static_cast<std::uint32_t>(bytes.size()),
-                                           static_cast<std::uint32_t>(size) };
+    ++call_now->count;
+    trace_now->given.push_back({ value, static_cast<std::uint32_t>(bytes.size()), static_cast<std::uint32_t>(size) });
     const auto* const from = static_cast<const unsigned char*>(first);
     bytes.insert(bytes.end(), from, from + size);
 }
@@ -179,11 +178,15 @@ void Recorder::place(const void* first)
 
 void Recorder::values(const char* format, va_list values)
 {
+    static constexpr std::string_view between = "0123456789-+ #.";
     for (const char* at = std::strchr(format, '%'); at != nullptr; at = std::strchr(at, '%'))
     {
-        at += 1 + std::strspn(at + 1, "0123456789-+ #.");
+        ++at;
+        while (between.find(*at) != std::string_view::npos)
+            ++at;
         const bool is_long = *at == 'l';
-        at += std::strspn(at, "l");
+        while (*at == 'l')
+            ++at;
         if (*at == '%')
             ++at;
         else if (*at == 's')
@@ -261,6 +264,7 @@ void run(const Operation& operation, unsigned layer, const Arguments& arguments,
     surroundings_now = &surroundings;
     trace_now = &trace;
     trace.calls.clear();
+    trace.given.clear();
     trace.bytes.clear();
     trace.images.clear();
     put_image(before);

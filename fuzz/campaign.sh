@@ -17,6 +17,7 @@ longest()
     shell) echo 512 ;;
     scenario) echo 1024 ;;
     board) echo 8192 ;;
+    recording) echo 26624 ;;
     decode | against) echo 4096 ;;
     *) echo 65536 ;;
     esac

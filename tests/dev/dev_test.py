@@ -166,6 +166,11 @@ class Caches(TreeTest):
             self.expect(0, f"{program} {self.tree}/.cache/kernel {self.tree}/build/kernel ", "kernel", option)
             self.expect(2, f"kernel {option} does not take: x", "kernel", option, "x")
 
+    def test_the_kernels_that_watch_do_so_for_some_minutes(self):
+        self.expect(0, "/arm-bare/kernel/pmx_if.o 60\n", "kernel", "--debug", "60")
+        for words in (("--debug", "0"), ("--debug", "99999"), ("--debug", "60", "1"), ("--all", "60"), ("60",)):
+            self.expect(2, "does not take: ", "kernel", *words)
+
     def test_the_proof_is_kept_there_too(self):
         self.expect(0, f"prove {self.tree}/.cache/prove {self.tree}/build/prove\n", "prove")
         self.expect(0, f"prove {self.space}/kept/prove {self.tree}/build/prove --faults PMX_Init\n",

@@ -5,9 +5,12 @@ sleeping, objects' lives and leaks on an emulated 32-bit ARM machine, data races
 held against the virtual board; three threads use the layer at once; faults that are planted have to be seen, and
 nothing else. Prints KTAP; ends with 1 when something is found, and with 77 when a kernel is not to be had.
 
-usage: debug_kernel.py CACHE MADE PMXBOARD OBJECT
+usage: debug_kernel.py CACHE MADE PMXBOARD OBJECT [MINUTES]
+    MINUTES   how long the three threads go on, at least
 """
 
+import functools
+import re
 import sys
 
 sys.dont_write_bytecode = True
@@ -47,19 +50,28 @@ def built(ktap, kernel, folder, name, sources, *variables):
     return modules
 
 
-def booted(kernel, modules, made, part, *options, commands=None):
+def booted(kernel, modules, made, part, *options, commands=None, minutes=0):
     archive = run.image(kernel, modules, commands or {}, made, GUEST)
-    return run.boot(kernel, archive, made / f"debug-{part}.log", *options, words=f"part={part}", memory=MEMORY,
-                    seconds=SECONDS)
+    return run.boot(kernel, archive, made / f"debug-{part}.log", *options, words=f"part={part} minutes={minutes}",
+                    memory=MEMORY, seconds=SECONDS + 60 * minutes)
 
 
 def watch(ktap, title, console, part):
     """What the boot told, scenarios apart."""
+    tell_use(console)
     run.checks(ktap, title, console, CHECKS[part])
     ktap.verdict(f"{title} boot", run.parsed(console)[1])
 
 
-def look(ktap, cache, made, program):
+def tell_use(console):
+    """What three threads did."""
+    for line in console:
+        told = re.match(r"# (\d+ calls, \d+ expiries)$", line)
+        if told:
+            print(f"# three threads: {told[1]}", flush=True)
+
+
+def look(ktap, cache, made, program, minutes):
     """Everything but data races, which take a kernel of their own."""
     kernel = own.kernel(cache, machines.ARM, "debug", debian.kernel(cache))
     recorded = built(ktap, kernel, made / "debug-recorded", "debug", run.HERE / "module")
@@ -68,7 +80,7 @@ def look(ktap, cache, made, program):
     console = booted(kernel, recorded, made, "scenarios", *run.VIRTUAL_TIME, commands=commands)
     run.compare(ktap, "watched:", expected, console)
     run.checks(ktap, "watched:", console, CHECKS["scenarios"])
-    watch(ktap, "three threads:", booted(kernel, watched, made, "threads", "-smp", "2"), "threads")
+    watch(ktap, "three threads:", booted(kernel, watched, made, "threads", "-smp", "2", minutes=minutes), "threads")
     watch(ktap, "planted:", booted(kernel, watched, made, "planted", *run.VIRTUAL_TIME), "planted")
 
 
@@ -80,13 +92,13 @@ def look_for_races(ktap, cache, made):
     races.judge(ktap, console)
 
 
-def debug(ktap, cache, made, program, _shipped):
+def debug(minutes, ktap, cache, made, program, _shipped):
     try:
-        look(ktap, cache, made, program)
+        look(ktap, cache, made, program, minutes)
         look_for_races(ktap, cache, made)
     except own.Broken as reason:
         raise run.Failed(str(reason)) from reason
 
 
 if __name__ == "__main__":
-    sys.exit(run.carried_out(debug, sys.argv[1:]))
+    sys.exit(run.carried_out(functools.partial(debug, int((sys.argv[5:] or [0])[0])), sys.argv[1:5]))

@@ -2,6 +2,8 @@
 # SPDX-License-Identifier: MIT OR GPL-2.0-only
 """What looks at kernels that watch finds what they report, and notices who does not watch."""
 
+import contextlib
+import io
 import pathlib
 import re
 import sys
@@ -118,6 +120,21 @@ class Watching(unittest.TestCase):
         counted = {name: len(re.findall(r"^ +check ", bodies[name], re.M)) for name in ("threads", "awake")}
         self.assertEqual({"scenarios": counted["awake"], "threads": sum(counted.values()), "races": counted["threads"]},
                          {name: number for name, number in debug_kernel.CHECKS.items() if name != "planted"})
+
+    def test_the_threads_go_on_for_as_long_as_is_asked_for(self):
+        for minutes, seconds in ((0, debug_kernel.SECONDS), (60, debug_kernel.SECONDS + 3600)):
+            with mock.patch.object(run, "image"), mock.patch.object(run, "boot") as boot:
+                debug_kernel.booted(None, None, pathlib.Path(), "threads", minutes=minutes)
+            self.assertEqual((f"part=threads minutes={minutes}", seconds),
+                             (boot.call_args.kwargs["words"], boot.call_args.kwargs["seconds"]))
+        script = debug_kernel.GUEST.read_text(encoding="utf-8")
+        self.assertIn('sed -n \'s/.*minutes=\\([0-9]*\\).*/\\1/p\' /proc/cmdline', script)
+
+    def test_what_the_threads_did_is_told_once(self):
+        shown = io.StringIO()
+        with contextlib.redirect_stdout(shown):
+            debug_kernel.tell_use(["# 12010 calls, 40 expiries, 0 misplaced", "# 24020 calls, 80 expiries", "DONE 1"])
+        self.assertEqual("# three threads: 24020 calls, 80 expiries\n", shown.getvalue())
 
     def test_settings_that_a_kernel_does_not_take(self):
         wanted = "# why\nCONFIG_A=y\nCONFIG_B=y\nCONFIG_C=3\nCONFIG_D=n\n"

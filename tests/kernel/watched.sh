@@ -5,6 +5,7 @@
 parameters=/sys/module/pmx/parameters
 leaks=/sys/kernel/debug/kmemleak
 part=$(sed -n 's/.*part=\([a-z]*\).*/\1/p' /proc/cmdline)
+minutes=$(sed -n 's/.*minutes=\([0-9]*\).*/\1/p' /proc/cmdline)
 
 check()
 {
@@ -50,11 +51,23 @@ planted()
     unload
 }
 
-# threads LEAST-CALLS LEAST-EXPIRIES
+up()
+{
+    cut -d. -f1 /proc/uptime
+}
+
+# threads LEAST-CALLS LEAST-EXPIRIES: again and again, as long as the command line asks for. The module counts on.
 threads()
 {
     load loglevel=-1
-    echo "$1" >"$parameters/threads" || echo "WRONG threads"
+    end=$(($(up) + 60 * ${minutes:-0}))
+    while
+        echo "$1" >"$parameters/threads" || echo "WRONG threads"
+        [ "$(up)" -lt "$end" ]
+    do
+        complain
+        echo "# $(cat "$parameters/threads")"
+    done
     read -r calls _ expiries _ misplaced _ <"$parameters/threads"
     echo "# $calls calls, $expiries expiries"
     check "three threads make $((3 * $1)) calls and more" "[ $calls -ge $((3 * $1)) ]"

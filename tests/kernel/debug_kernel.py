@@ -10,6 +10,7 @@ usage: debug_kernel.py CACHE MADE PMXBOARD OBJECT [MINUTES]
 """
 
 import functools
+import pathlib
 import re
 import sys
 
@@ -34,12 +35,19 @@ INSTRUMENTED = {"debug": ("__asan_load", "__ubsan_"), "kcsan": ("__tsan_read",)}
 MOST_UNWATCHED = 8
 
 
+def objects(folder):
+    """The names of the layer's objects, and of those of the port that are in the module: not all are in each."""
+    linked = {pathlib.PurePath(word).name for word in (folder / "pmx.mod").read_text(encoding="utf-8").split()}
+    port = {f"{path.stem}.o" for path in (run.ROOT / "linux").glob("*.c")}
+    layer = {f"{path.stem}.o" for path in (run.ROOT / "src/driver/pmx").glob("*.cpp")}
+    return sorted(layer | port & linked)
+
+
 def unwatched(kernel, folder, calls):
     """A complaint for each watcher whom too few objects of the layer and the port call."""
-    objects = [folder / f"{path.stem}.o" for path in sorted((run.ROOT / "src/driver/pmx").glob("*.cpp"))]
-    objects += [folder / f"{path.stem}.o" for path in sorted((run.ROOT / "linux").glob("*.c"))]
     for call in calls:
-        without = [path.name for path in objects if call not in run.run(f"{kernel.machine.cross}nm", "-u", path)]
+        without = [name for name in objects(folder)
+                   if call not in run.run(f"{kernel.machine.cross}nm", "-u", folder / name)]
         if len(without) > MOST_UNWATCHED:
             yield f"{call} is called by none of {', '.join(without)}"
 

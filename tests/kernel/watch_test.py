@@ -7,6 +7,7 @@ import io
 import pathlib
 import re
 import sys
+import tempfile
 import unittest
 from unittest import mock
 
@@ -97,14 +98,29 @@ class Watching(unittest.TestCase):
 
     def test_objects_that_nobody_watches(self):
         def complaints(names):
-            with mock.patch.object(run, "run", lambda program, option, path: names(path)):
-                return list(debug_kernel.unwatched(mock.Mock(), pathlib.Path(), debug_kernel.INSTRUMENTED["debug"]))
+            with mock.patch.object(run, "run", lambda program, option, path: names(path)), \
+                    tempfile.TemporaryDirectory() as folder:
+                pathlib.Path(folder, "pmx.mod").write_text("/made/pmx_port.o\n", encoding="utf-8")
+                return list(debug_kernel.unwatched(mock.Mock(), pathlib.Path(folder),
+                                                   debug_kernel.INSTRUMENTED["debug"]))
 
         self.assertEqual([], complaints(lambda path: "U __asan_load4 U __ubsan_handle_x"))
         self.assertEqual([], complaints(lambda path: "U __ubsan_x" + " U __asan_load1" * (path.name != "pmx_layout.o")))
         self.assertEqual(["__asan_load", "__ubsan_"], [line.split()[0] for line in complaints(lambda _: "U memcpy")])
         self.assertRegex(complaints(lambda path: "U __ubsan_x" + " U __asan_load1" * (path.name < "pmx_k"))[0],
                          "^__asan_load is called by none of .*pmx_port.o")
+
+    def test_of_the_port_what_is_in_the_module_is_looked_at(self):
+        with tempfile.TemporaryDirectory() as folder:
+            linked = pathlib.Path(folder, "pmx.mod")
+            linked.write_text("/made/pmx_mode.o\n/made/pmx_module.o\n/made/record.o\n", encoding="utf-8")
+            looked_at = debug_kernel.objects(pathlib.Path(folder))
+            self.assertIn("pmx_module.o", looked_at)
+            self.assertNotIn("pmx_recorder.o", looked_at)  # of modules that were asked for it
+            self.assertNotIn("record.o", looked_at)  # the tests' own
+            linked.write_text("/made/pmx_recorder.o\n", encoding="utf-8")
+            self.assertEqual({f"{path.stem}.o" for path in (run.ROOT / "src/driver/pmx").glob("*.cpp")},
+                             set(debug_kernel.objects(pathlib.Path(folder))) - {"pmx_recorder.o"})
 
     def test_every_fault_is_planted(self):
         script = debug_kernel.GUEST.read_text(encoding="utf-8")

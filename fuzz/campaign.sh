@@ -14,11 +14,12 @@ longest()
     case "$1" in
     flash) echo 16 ;;
     operations) echo 256 ;;
-    shell) echo 512 ;;
+    shell) echo 256 ;;
     scenario) echo 1024 ;;
     board) echo 8192 ;;
     recording) echo 26624 ;;
-    decode | against) echo 4096 ;;
+    against) echo 2048 ;;
+    decode) echo 4096 ;;
     *) echo 65536 ;;
     esac
 }

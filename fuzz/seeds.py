@@ -141,13 +141,14 @@ def compared(tool):
 
 
 def shell_lines(tool):
-    for path in SCENARIOS[::4]:
-        lines = [line for line in path.read_bytes().splitlines() if line and not line.startswith(b"#")]
-        for begin in range(0, len(lines), 4):
-            yield f"{path.stem}-{begin}", b"\n".join(lines[begin:begin + 4])
+    typed = dict.fromkeys(line for path in SCENARIOS[::4] for line in path.read_bytes().splitlines()
+                          if line and not line.startswith(b"#"))
+    for number, line in enumerate(typed):
+        yield f"line-{number}", line
     for number, word in enumerate(tool.lines("complete", "")):
         # Small letters complete, too.
-        yield f"word-{number}", f"{word[:-1].lower()}\n{word}\nhelp {word}\n{word} ".encode()
+        for how, line in (("begun", word[:-1].lower()), ("asked", f"help {word}"), ("ended", f"{word} ")):
+            yield f"word-{number}-{how}", line.encode()
 
 
 def quoted(entry):

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT OR GPL-2.0-only
-// Any text is what somebody types at the prompt: lines are taken apart, completed, explained and kept, not carried out.
+// Any text is a line that somebody types at the prompt: it is taken apart, completed, explained and kept, not carried
+// out. What stands behind its end is another line, and would be read alike.
 #include <algorithm>
 #include <cctype>
 #include <cstddef>
@@ -21,7 +22,6 @@ namespace
 
 using namespace pmxboard;
 
-constexpr std::size_t most_lines = 4;
 constexpr std::size_t most_words = 8;
 
 bool begins_in_any_case(std::string_view candidate, std::string_view replaced)
@@ -85,12 +85,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         fuzz::power_on();
         return true;
     }();
-    std::string_view bytes(reinterpret_cast<const char*>(data), size);
-    for (std::size_t number = 0; is_on && number < most_lines && !bytes.empty(); ++number)
-    {
-        const std::string_view line = bytes.substr(0, bytes.find('\n'));
-        bytes.remove_prefix(std::min(line.size() + 1, bytes.size()));
-        read_line(std::string(line));
-    }
+    const std::string_view bytes(reinterpret_cast<const char*>(data), size);
+    if (is_on && !bytes.empty())
+        read_line(std::string(bytes.substr(0, bytes.find('\n'))));
     return 0;
 }

@@ -32,7 +32,7 @@ WAYS = {"proved": "for all inputs, by a checker",
         "sampled": "many cases were run, drawn at random or chosen",
         "read": "somebody looked"}
 KEYS = {"area", "name", "way", "command", "says", "assumes", "leaves"}
-HAND = {"what", "command", "date", "revision", "layer", "result"}
+HAND = {"what", "command", "date", "revision", "of", "result"}
 DATE, REVISION = re.compile(r"\d{4}-\d\d-\d\d"), re.compile("[0-9a-f]{7,40}")
 REASON = re.compile(r"^    X\( ?\d+, \w+, +[A-Z]+, +[A-Z_]+, +[A-Z_]+,", re.M)
 MARK = re.compile(r"\{([a-z_.]+)\}")
@@ -47,12 +47,13 @@ def text_of(path):
 
 
 def tree(folder):
-    """What git rev-parse REVISION:FOLDER says of a folder with these files, none of which is executable."""
+    """What git rev-parse REVISION:FOLDER says of a folder with these files."""
     held = b""
     for path in sorted(folder.iterdir(), key=lambda one: one.name + "/" * one.is_dir()):
         content = b"" if path.is_dir() else path.read_bytes()
         name = tree(path) if path.is_dir() else hashlib.sha1(b"blob %d\0" % len(content) + content).hexdigest()
-        held += b"%s %s\0" % (b"40000" if path.is_dir() else b"100644", path.name.encode()) + bytes.fromhex(name)
+        mode = b"40000" if path.is_dir() else b"100755" if path.stat().st_mode & 0o100 else b"100644"
+        held += b"%s %s\0" % (mode, path.name.encode()) + bytes.fromhex(name)
     return hashlib.sha1(b"tree %d\0" % len(held) + held).hexdigest()
 
 
@@ -103,7 +104,7 @@ def has_all(entry, keys, name):
     if set(entry) != keys:
         raise Wrong(f"{name}: has {', '.join(sorted(set(entry) ^ keys))} too many, or too few")
     for key, value in entry.items():
-        if not str(value).strip():
+        if not value or not str(value).strip():
             raise Wrong(f"{name}: {key} is empty")
 
 
@@ -127,8 +128,19 @@ def fit(claims):
         has_all(entry, HAND, entry.get("what", "a run by hand"))
         if not DATE.fullmatch(entry["date"]) or not REVISION.fullmatch(entry["revision"]):
             raise Wrong(f"{entry['what']}: {entry['date']}, {entry['revision']} is no date and revision")
-        if not REVISION.fullmatch(entry["layer"]):
-            raise Wrong(f"{entry['what']}: {entry['layer']} is not what git rev-parse {entry['revision']}:src says")
+        for folder, then in entry["of"].items():
+            if not REVISION.fullmatch(then):
+                raise Wrong(f"{entry['what']}: {then} is not what git rev-parse {entry['revision']}:{folder} says")
+            if not (ROOT / folder).is_dir():
+                raise Wrong(f"{entry['what']}: there is no {folder}/")
+
+
+def since(of, now):
+    """What has become of the folders that a run by hand is of."""
+    changed = [folder for folder in of if not now[folder].startswith(of[folder])]
+    if not changed:
+        return "the same"
+    return "**changed**: " + ", ".join(f"`{folder}/`" for folder in changed)
 
 
 def page(claims, known):
@@ -151,15 +163,17 @@ def page(claims, known):
     yield "## By hand"
     yield ""
     yield from folded("What takes too long to be run at each change, with the revision that it was run on. It says "
-                      "nothing of later changes, and the table tells whether the layer (`src/`) had one since.")
+                      "nothing of later changes, and the table tells whether the folders that it is of had one since: "
+                      "the layer (`src/`), the port (`linux/`), the board and the tool (`board/`, `tools/`).")
     yield ""
-    yield "| | Command | When | Revision | The layer since | It showed |"
-    yield "|---|---|---|---|---|---|"
-    layer = tree(ROOT / "src")
+    yield "| | Command | When | Revision | Of | Since then | It showed |"
+    yield "|---|---|---|---|---|---|---|"
+    now = {folder: tree(ROOT / folder) for entry in claims["by_hand"] for folder in entry["of"]}
     for entry in claims["by_hand"]:
-        since = "the same" if layer.startswith(entry["layer"]) else "**changed**"
+        of = ", ".join(f"`{folder}/`" for folder in entry["of"])
         what, result = filled(entry["what"], known, used), filled(entry["result"], known, used)
-        yield f"| {what} | `{entry['command']}` | {entry['date']} | {entry['revision']} | {since} | {result} |"
+        yield (f"| {what} | `{entry['command']}` | {entry['date']} | {entry['revision']} | {of} | "
+               f"{since(entry['of'], now)} | {result} |")
     yield ""
     yield "## Not covered"
     yield ""

@@ -20,7 +20,7 @@ import claims  # noqa: E402
 ONE = {"area": "Layer", "name": "It works", "way": "measured", "command": "./dev run", "says": "{run.calls} calls",
        "assumes": "{boards} boards", "leaves": "nights"}
 HAND = {"what": "Long", "command": "./dev long", "date": "2026-11-22", "revision": "abcdef0",
-        "layer": claims.tree(claims.ROOT / "src")[:7], "result": "nothing"}
+        "of": {"src": claims.tree(claims.ROOT / "src")[:7]}, "result": "nothing"}
 ALL = {"introduction": "One", "claim": [ONE], "by_hand": [HAND], "not_covered": ["the sea"]}
 KNOWN = {"run.calls": 1234, "boards": 2}
 
@@ -41,7 +41,7 @@ class Page(unittest.TestCase):
         text = page()
         for part in ("## Layer", "### It works", "**Measured**, `./dev run`. 1,234 calls",
                      "Takes for granted: 2 boards", "Leaves open: nights",
-                     "| Long | `./dev long` | 2026-11-22 | abcdef0 | the same | nothing |", "- the sea"):
+                     "| Long | `./dev long` | 2026-11-22 | abcdef0 | `src/` | the same | nothing |", "- the sea"):
             self.assertIn(part, text)
 
     def test_a_figure_that_nobody_counts(self):
@@ -62,11 +62,16 @@ class Page(unittest.TestCase):
     def test_a_run_by_hand_without_its_day(self):
         self.refused("no date and revision", lambda told: told["by_hand"][0].update(date="lately"))
         self.refused("no date and revision", lambda told: told["by_hand"][0].update(revision="the last"))
-        self.refused("git rev-parse abcdef0:src", lambda told: told["by_hand"][0].update(layer="mine"))
+        self.refused("git rev-parse abcdef0:src", lambda told: told["by_hand"][0].update(of={"src": "mine"}))
+        self.refused("there is no source/", lambda told: told["by_hand"][0].update(of={"source": "0000000"}))
+        self.refused("of is empty", lambda told: told["by_hand"][0].update(of={}))
 
     def test_a_run_by_hand_of_another_layer(self):
-        self.assertIn("| abcdef0 | **changed** | nothing |",
-                      page(lambda told: told["by_hand"][0].update(layer="0000000")))
+        def change(told):
+            told["by_hand"][0]["of"] |= {"linux": "0000000", "board": "0000000"}
+
+        self.assertIn("| abcdef0 | `src/`, `linux/`, `board/` | **changed**: `linux/`, `board/` | nothing |",
+                      page(change))
 
     def test_what_git_says_of_a_folder(self):
         with tempfile.TemporaryDirectory() as place:
@@ -74,6 +79,7 @@ class Page(unittest.TestCase):
             for name in ("a/one", "a/two", "a.b", "ab"):  # git sorts a folder as if its name ended with a slash
                 (folder / name).parent.mkdir(exist_ok=True)
                 (folder / name).write_text(name, encoding="utf-8")
+            (folder / "a/two").chmod(0o755)
             git = ["git", "-C", folder, "-c", "core.autocrlf=false"]
             subprocess.run([*git, "init", "-q"], check=True)
             subprocess.run([*git, "add", "a", "a.b", "ab"], check=True)
@@ -81,14 +87,16 @@ class Page(unittest.TestCase):
             shutil.rmtree(folder / ".git")
             self.assertEqual(said, claims.tree(folder))
 
-    def test_the_layer_of_each_run_by_hand(self):
+    def test_what_each_run_by_hand_is_of(self):
         git = ["git", "-C", claims.ROOT, "rev-parse", "--verify", "--quiet"]
         for entry in tomllib.loads(claims.CLAIMS.read_text(encoding="utf-8"))["by_hand"]:
-            with self.subTest(entry["what"]):
-                said = subprocess.run([*git, f"{entry['revision']}:src"], check=False, capture_output=True, text=True)
-                if said.returncode != 0:
-                    self.skipTest("this copy has no such revision")
-                self.assertTrue(said.stdout.startswith(entry["layer"]))
+            for folder, then in entry["of"].items():
+                with self.subTest(entry["what"], folder=folder):
+                    said = subprocess.run([*git, f"{entry['revision']}:{folder}"], check=False, capture_output=True,
+                                          text=True)
+                    if said.returncode != 0:
+                        self.skipTest("this copy has no such revision")
+                    self.assertTrue(said.stdout.startswith(then), said.stdout)
 
 
 class Seen(unittest.TestCase):
